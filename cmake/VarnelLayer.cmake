@@ -1,0 +1,23 @@
+# What every target of the project is built with, and the one way to declare a layer.
+
+add_library(varnel_options INTERFACE)
+target_compile_options(varnel_options INTERFACE -Wall -Wextra -Wpedantic -Wnon-virtual-dtor
+                                                -Woverloaded-virtual -Wimplicit-fallthrough)
+target_include_directories(varnel_options INTERFACE ${PROJECT_SOURCE_DIR})
+# A program carries only the libraries that it really calls: the offline decoder needs no Qt.
+target_link_options(varnel_options INTERFACE -Wl,--as-needed)
+if(VARNEL_SANITIZE)
+  target_compile_options(varnel_options INTERFACE -fsanitize=${VARNEL_SANITIZE} -fno-sanitize-recover=all
+                                                  -fno-omit-frame-pointer)
+  target_link_options(varnel_options INTERFACE -fsanitize=${VARNEL_SANITIZE})
+endif()
+if(VARNEL_FUZZ)
+  target_compile_options(varnel_options INTERFACE -fsanitize=fuzzer-no-link)
+endif()
+
+# varnel_layer(NAME SOURCES a.cpp ... USES lower_layer ...): a static library and what it may use.
+function(varnel_layer name)
+  cmake_parse_arguments(ARG "" "" "SOURCES;USES" ${ARGN})
+  add_library(${name} STATIC ${ARG_SOURCES})
+  target_link_libraries(${name} PUBLIC varnel_options ${ARG_USES})
+endfunction()

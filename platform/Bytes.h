@@ -1,0 +1,15 @@
+#pragma once
+
+#include <cstdint>
+#include <span>
+#include <vector>
+
+namespace varnel {
+
+/// Bytes that somebody owns.
+using Bytes = std::vector<std::uint8_t>;
+
+/// Bytes that somebody else owns, for the length of a call.
+using ByteView = std::span<const std::uint8_t>;
+
+}  // namespace varnel

@@ -1,0 +1,54 @@
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+#include "platform/Value.h"
+
+namespace varnel {
+
+/// String keys in the order in which they were first set. Setting a key again keeps its place; a key that was
+/// removed and is set again goes to the end. No key ever holds the absent value.
+class Dictionary {
+ public:
+  struct Entry {
+    std::string key;
+    Value value;
+  };
+
+  /// The key's value; the absent value when there is no such key.
+  const Value& get(std::string_view key) const;
+  bool has(std::string_view key) const { return find(key) != nowhere; }
+
+  /// Setting the absent value changes nothing.
+  void set(std::string_view key, Value value);
+  /// Sets a text. Where a text stands already its room is used again, so rewriting rows of a like length
+  /// allocates nothing.
+  void setText(std::string_view key, std::string_view text);
+  void remove(std::string_view key);
+
+  std::size_t size() const { return _entries.size(); }
+  bool empty() const { return _entries.empty(); }
+  std::vector<Entry>::const_iterator begin() const { return _entries.begin(); }
+  std::vector<Entry>::const_iterator end() const { return _entries.end(); }
+
+ private:
+  static constexpr std::size_t nowhere = static_cast<std::size_t>(-1);
+  // Up to here a walk over the entries beats hashing the key.
+  static constexpr std::size_t largestUnindexed = 48;
+
+  std::size_t find(std::string_view key) const;
+  Value& append(std::string_view key);
+  void indexAll();
+
+  std::vector<Entry> _entries;
+  // Where each key stands; empty as long as the dictionary is small.
+  std::unordered_map<std::string, std::size_t> _positions;
+  // A packet sets its rows in the same order each time, so the next key is looked for behind the last one.
+  mutable std::size_t _next = 0;
+};
+
+}  // namespace varnel

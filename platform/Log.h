@@ -1,0 +1,123 @@
+#pragma once
+
+#include <atomic>
+#include <concepts>
+#include <cstdint>
+#include <initializer_list>
+#include <string_view>
+#include <type_traits>
+
+namespace varnel {
+
+/// Priorities of the system log, numbered as syslog(3) has them.
+enum LogPriority : int {
+  logErrorPriority = 3,
+  logWarningPriority = 4,
+  logNoticePriority = 5,
+  /// Kept: no priority of syslog(3). The two failures of the binary-log export carry it, and it is passed on
+  /// raw.
+  logExportFailurePriority = 16,
+};
+
+/// Where log lines go.
+class LogSink {
+ public:
+  virtual ~LogSink() = default;
+  /// Takes one line; a newline that ends the text belongs to the text.
+  virtual void write(int priority, std::string_view text) = 0;
+};
+
+/// Sends lines of that priority number and lower to the sink; all others are not even formatted. A null sink
+/// takes nothing. The sink must outlive its use.
+void setLogSink(LogSink* sink, int highestPriority);
+/// The sink that is set, null when there is none.
+LogSink* logSink();
+
+namespace logging {
+
+inline std::atomic<int> highestPriorityTaken{-1};
+
+/// One argument of a log line, whatever its type.
+struct Argument {
+  enum class Kind { Signed, Unsigned, Real, Pointer, Text } kind;
+  union {
+    std::int64_t whole;
+    double real;
+    const void* pointer;
+  };
+  std::string_view text{};
+
+  template <std::integral T>
+  Argument(T number)
+      : kind(std::is_signed_v<T> ? Kind::Signed : Kind::Unsigned), whole(static_cast<std::int64_t>(number)) {}
+  Argument(double number) : kind(Kind::Real), real(number) {}
+  Argument(const void* address) : kind(Kind::Pointer), pointer(address) {}
+  template <std::convertible_to<std::string_view> T>
+  Argument(const T& string) : kind(Kind::Text), whole(0), text(string) {}
+};
+
+/// A format with one conversion an argument (%d %u %x %ld %lf %p %s), checked when it is compiled.
+template <class... Arguments>
+struct Format {
+  template <std::size_t N>
+  consteval Format(const char (&literal)[N]) : text(literal, N - 1) {
+    std::string_view rest = text;
+    (takeConversion<std::remove_cvref_t<Arguments>>(rest), ...);
+    if (rest.find('%') != std::string_view::npos) throw "the format has more conversions than arguments";
+  }
+
+  std::string_view text;
+
+ private:
+  template <class Argument>
+  static consteval void takeConversion(std::string_view& rest) {
+    const std::size_t percent = rest.find('%');
+    if (percent == std::string_view::npos) throw "the format has fewer conversions than arguments";
+    rest.remove_prefix(percent + 1);
+    std::size_t length = 1;
+    bool fits = false;
+    if (rest.starts_with("ld")) {
+      length = 2;
+      fits = std::is_integral_v<Argument>;
+    } else if (rest.starts_with("lf")) {
+      length = 2;
+      fits = std::is_same_v<Argument, double>;
+    } else if (rest.starts_with('d') || rest.starts_with('u') || rest.starts_with('x')) {
+      fits = std::is_integral_v<Argument> && sizeof(Argument) <= 4;
+    } else if (rest.starts_with('p')) {
+      fits = std::is_pointer_v<Argument>;
+    } else if (rest.starts_with('s')) {
+      fits = std::is_convertible_v<Argument, std::string_view>;
+    }
+    if (!fits) throw "the conversion does not fit its argument";
+    rest.remove_prefix(length);
+  }
+};
+
+void write(int priority, std::string_view format, std::initializer_list<Argument> arguments);
+
+}  // namespace logging
+
+/// True when somebody takes lines of that priority.
+inline bool logTakes(int priority) {
+  return priority <= logging::highestPriorityTaken.load(std::memory_order_relaxed);
+}
+
+/// Writes a line to the system log. A line that nobody takes costs one comparison. A null pointer prints as
+/// 0x0.
+template <class... Arguments>
+void logLine(int priority, logging::Format<std::type_identity_t<Arguments>...> format,
+             const Arguments&... arguments) {
+  if (logTakes(priority)) [[unlikely]]
+    logging::write(priority, format.text, {logging::Argument(arguments)...});
+}
+template <class... Arguments>
+void logError(logging::Format<std::type_identity_t<Arguments>...> format, const Arguments&... arguments) {
+  logLine<Arguments...>(logErrorPriority, format, arguments...);
+}
+template <class... Arguments>
+void logWarning(logging::Format<std::type_identity_t<Arguments>...> format, const Arguments&... arguments) {
+  logLine<Arguments...>(logWarningPriority, format, arguments...);
+}
+
+}  // namespace varnel

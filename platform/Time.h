@@ -1,0 +1,33 @@
+#pragma once
+
+#include <compare>
+#include <cstdint>
+#include <string>
+
+namespace varnel {
+
+/// A moment: seconds since 1970-01-01 00:00:00 UTC and the nanoseconds (0 to 999,999,999) past them.
+struct Time {
+  std::int64_t seconds = 0;
+  std::int32_t nanoseconds = 0;
+
+  friend auto operator<=>(const Time&, const Time&) = default;
+};
+
+/// How far a local clock stands from UTC.
+struct TimeZone {
+  std::int32_t offsetSeconds = 0;  ///< local time less UTC, daylight time included
+  bool daylight = false;           ///< daylight saving time is in force
+};
+
+/// A moment broken down on the calendar of a zone.
+struct CalendarTime {
+  std::int64_t year;
+  unsigned month, day, hour, minute, second;
+};
+CalendarTime calendarTime(Time time, TimeZone zone = {});
+
+/// The default textual form of a moment: YYYY-MM-DD hh:mm:ss +0000, always in UTC.
+std::string dateDescription(Time time);
+
+}  // namespace varnel
