@@ -1,0 +1,71 @@
+#pragma once
+
+#include <cstdint>
+#include <exception>
+#include <map>
+#include <string_view>
+#include <vector>
+
+#include "LogGenerator/Packet.h"
+#include "platform/Dictionary.h"
+#include "platform/Value.h"
+
+namespace varnel {
+
+class Base;
+class CodeDictionary;
+
+/// Section name → the decoder that owns that section.
+using ClassDictionary = std::map<std::string_view, Base*>;
+
+/// Raised for a record index at or past the record count. Nobody catches it: the program ends.
+class ArrayOutOfBoundsException : public std::exception {
+ public:
+  const char* what() const noexcept override { return "ArrayOutOfBoundsException"; }
+};
+
+/// The root of all section decoders: one decoder fills one named section of the display.
+class Base {
+ public:
+  Base() = default;
+  Base(const Base&) = delete;
+  Base& operator=(const Base&) = delete;
+  virtual ~Base() = default;
+
+  /// Registers the decoder under its section name and under its log codes.
+  void initWithDict_codeDict(ClassDictionary& classDict, CodeDictionary& codeDict);
+
+  /// The section's key in the display template.
+  virtual std::string_view getSectionName() const = 0;
+  /// The log codes that the decoder wants, in order.
+  virtual std::vector<std::uint32_t> getLogCodeArray() const = 0;
+  /// Decodes one whole packet, header included, into the section.
+  virtual void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) = 0;
+
+  /// Takes the section that the decoder fills from now on: a dictionary, or an array for a list section.
+  void updateSectionRef(const Value& section);
+
+  /// Linear energy → whole decibels, 0 down to −31.
+  static std::int16_t lookUpECNO(std::uint32_t energy);
+
+ protected:
+  /// The section; the absent value until a display is built around this decoder.
+  Value sectionRef;
+
+  /// The section as what the decoder takes it for. Without a section of that kind everything is decoded and
+  /// logged as ever, into a container that nobody sees.
+  Dictionary& rows() { return sectionRef.dictionary() ? *sectionRef.dictionary() : _unseenRows; }
+  Array& list() { return sectionRef.array() ? *sectionRef.array() : _unseenList; }
+
+  void updateLogCodeDict(CodeDictionary& codeDict);
+
+  /// Both hold the array lock.
+  static void clearElementsInArray(Array& array);
+  static void replaceArray_With(Array& array, Array elements);
+
+ private:
+  Dictionary _unseenRows;
+  Array _unseenList;
+};
+
+}  // namespace varnel

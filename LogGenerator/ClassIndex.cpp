@@ -1,0 +1,39 @@
+#include "LogGenerator/ClassIndex.h"
+
+#include <ostream>
+
+#include "platform/Log.h"
+
+namespace varnel {
+
+void CodeDictionary::subscribe(std::uint32_t code, Base& decoder) {
+  auto& decoders = _subscribers[code];
+  if (decoders.empty()) _codes.push_back(code);
+  decoders.push_back(&decoder);
+}
+
+std::span<Base* const> CodeDictionary::subscribers(std::uint32_t code) const {
+  const auto found = _subscribers.find(code);
+  return found == _subscribers.end() ? std::span<Base* const>() : found->second;
+}
+
+std::vector<std::string> CodeDictionary::keys() const {
+  std::vector<std::string> texts;
+  for (const std::uint32_t code : _codes) texts.push_back(std::to_string(code));
+  return texts;
+}
+
+ClassIndex::~ClassIndex() { _standardOutput << "Deallocing ClassIndex\n"; }
+
+Base* ClassIndex::getClass(std::string_view sectionName) const {
+  const auto found = classDict.find(sectionName);
+  return found == classDict.end() ? nullptr : found->second;
+}
+
+void ClassIndex::status() const {
+  // The class dictionary has been a dictionary, and no string, ever since the compiler knows its type.
+  logWarning("Dictionary = %d", 1);
+  logWarning("String = %d", 0);
+}
+
+}  // namespace varnel

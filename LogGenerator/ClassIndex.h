@@ -1,0 +1,66 @@
+#pragma once
+
+#include <cstdint>
+#include <iosfwd>
+#include <memory>
+#include <span>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+#include "LogGenerator/Base.h"
+
+namespace varnel {
+
+/// Log code → the decoders subscribed to it, in the order of their subscription. Codes keep the order in
+/// which they were first subscribed to.
+class CodeDictionary {
+ public:
+  /// A decoder that subscribes twice receives each packet twice.
+  void subscribe(std::uint32_t code, Base& decoder);
+  /// Empty for a code that nobody wants.
+  std::span<Base* const> subscribers(std::uint32_t code) const;
+  /// The codes as decimal texts.
+  std::vector<std::string> keys() const;
+
+ private:
+  std::vector<std::uint32_t> _codes;
+  std::unordered_map<std::uint32_t, std::vector<Base*>> _subscribers;
+};
+
+/// The root of the per-technology indexes, which create every decoder of their technology once.
+class ClassIndex {
+ public:
+  explicit ClassIndex(std::ostream& standardOutput) : _standardOutput(standardOutput) {}
+  ClassIndex(const ClassIndex&) = delete;
+  ClassIndex& operator=(const ClassIndex&) = delete;
+  /// Writes "Deallocing ClassIndex" to standard output.
+  virtual ~ClassIndex();
+
+  /// The decoder of that section; null when there is none.
+  Base* getClass(std::string_view sectionName) const;
+  /// Empty when nobody wants the code.
+  std::span<Base* const> getSubscribers(std::uint32_t code) const { return codeDictionary.subscribers(code); }
+  /// Every subscribed code as decimal text.
+  std::vector<std::string> getAllLogCodes() const { return codeDictionary.keys(); }
+  /// A debugging aid: logs what kind of object the class dictionary is.
+  void status() const;
+
+ protected:
+  /// Creates a decoder and registers it.
+  template <class Decoder>
+  std::unique_ptr<Decoder> create() {
+    auto decoder = std::make_unique<Decoder>();
+    decoder->initWithDict_codeDict(classDict, codeDictionary);
+    return decoder;
+  }
+  std::ostream& standardOutput() const { return _standardOutput; }
+
+ private:
+  ClassDictionary classDict;
+  CodeDictionary codeDictionary;
+  std::ostream& _standardOutput;
+};
+
+}  // namespace varnel

@@ -1,0 +1,140 @@
+#pragma once
+
+#include <algorithm>
+#include <cstddef>
+#include <cstdint>
+#include <span>
+#include <string_view>
+
+#include "LogGenerator/Packet.h"
+#include "platform/Dictionary.h"
+
+namespace varnel {
+
+/// Where a field's raw value lies: a little-endian run of bits, read as an unsigned or a signed number.
+struct Source {
+  std::uint16_t byte;
+  std::uint8_t firstBit;
+  std::uint8_t width;
+  bool isSigned = false;
+
+  constexpr std::size_t end() const { return byte + (firstBit + width + 7u) / 8; }
+};
+
+consteval Source bits(std::uint16_t byte, std::uint8_t firstBit, std::uint8_t width) {
+  if (firstBit > 7 || width < 1 || width > 32) throw "a field has 1 to 32 bits and starts in its byte";
+  return {byte, firstBit, width};
+}
+consteval Source u8(std::uint16_t byte) { return bits(byte, 0, 8); }
+consteval Source u16(std::uint16_t byte) { return bits(byte, 0, 16); }
+consteval Source u32(std::uint16_t byte) { return bits(byte, 0, 32); }
+consteval Source s16(std::uint16_t byte) { return {byte, 0, 16, true}; }
+
+/// A raw value and the text that it shows.
+struct Choice {
+  std::uint32_t raw;
+  std::string_view text;
+};
+
+/// How a raw value becomes a display text. Made by `integer`, `real` and `choice`, below.
+struct Format {
+  enum class Kind : std::uint8_t { Integer, Real, Choice };
+
+  Kind kind = Kind::Integer;
+  std::string_view before{}, after{};          // the texts around the number
+  bool isUnsigned = false;                     // %u instead of %d
+  std::uint8_t width = 0, precision = 0;       // of %w.pf
+  std::int32_t factor = 1, summand = 0;        // integers: raw × factor + summand
+  double realFactor = 1.0, realSummand = 0.0;  // reals likewise
+  std::span<const Choice> choices{};
+  std::string_view otherwise{};  // the text of a raw value that is no choice
+  Choice exception{};            // a raw value with a text of its own; none while the text is empty
+
+  /// The same format, but one raw value shows a text instead.
+  consteval Format unless(std::uint32_t raw, std::string_view text) const {
+    Format changed = *this;
+    changed.exception = {raw, text};
+    return changed;
+  }
+};
+
+namespace format {
+
+// Splits "before%4.2fafter" around its one conversion, which must end in one of the given letters.
+consteval Format split(std::string_view text, std::string_view conversions) {
+  Format result;
+  const std::size_t percent = text.find('%');
+  if (percent == std::string_view::npos) throw "the format has no conversion";
+  const auto isDigit = [](char c) { return c >= '0' && c <= '9'; };
+  std::size_t at = percent + 1;
+  for (; isDigit(text.at(at)); ++at)
+    result.width = static_cast<std::uint8_t>(result.width * 10 + (text[at] - '0'));
+  if (text[at] == '.') {
+    for (++at; isDigit(text.at(at)); ++at) {
+      result.precision = static_cast<std::uint8_t>(result.precision * 10 + (text[at] - '0'));
+    }
+  } else if (text[at] == 'f') {
+    result.precision = 6;
+  }
+  if (conversions.find(text[at]) == std::string_view::npos) throw "the conversion does not fit the field";
+  result.isUnsigned = text[at] == 'u';
+  result.before = text.substr(0, percent);
+  result.after = text.substr(at + 1);
+  if (result.after.find('%') != std::string_view::npos) throw "the format has two conversions";
+  if (result.before.size() + result.after.size() > 64 || result.width > 32 || result.precision > 16) {
+    throw "the text would not fit in its buffer";
+  }
+  return result;
+}
+
+}  // namespace format
+
+/// raw × factor + summand by %d (as a signed 32-bit number) or %u.
+consteval Format integer(std::string_view text = "%d", std::int32_t factor = 1, std::int32_t summand = 0) {
+  Format result = format::split(text, "du");
+  result.factor = factor;
+  result.summand = summand;
+  return result;
+}
+
+/// raw × factor + summand by %w.pf.
+consteval Format real(std::string_view text, double factor = 1.0, double summand = 0.0) {
+  Format result = format::split(text, "f");
+  result.kind = Format::Kind::Real;
+  result.realFactor = factor;
+  result.realSummand = summand;
+  return result;
+}
+
+/// The text of the choice with that raw value, or else the other one.
+consteval Format choice(std::span<const Choice> choices, std::string_view otherwise) {
+  Format result;
+  result.kind = Format::Kind::Choice;
+  result.choices = choices;
+  result.otherwise = otherwise;
+  return result;
+}
+
+/// One row of a packet's table: where the value lies, its display key and how it is shown.
+struct Field {
+  Source source;
+  std::string_view label;
+  Format format = integer();
+};
+
+/// True when no field reads past that many bytes.
+consteval bool within(std::span<const Field> fields, std::size_t size) {
+  return std::ranges::all_of(fields, [&](const Field& field) { return field.source.end() <= size; });
+}
+
+/// How many bytes the fields read, from offset 0 to the end of the last one.
+consteval std::size_t extent(std::span<const Field> fields) {
+  std::size_t end = 0;
+  for (const Field& field : fields) end = std::max(end, field.source.end());
+  return end;
+}
+
+/// Shows the fields in a section, in the order of the table.
+void setFields(Dictionary& section, const Packet& packet, std::span<const Field> fields);
+
+}  // namespace varnel

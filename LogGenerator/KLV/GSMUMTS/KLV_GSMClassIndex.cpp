@@ -1,0 +1,11 @@
+#include "LogGenerator/KLV/GSMUMTS/KLV_GSMClassIndex.h"
+
+#include <ostream>
+
+namespace varnel {
+
+KLV_GSMClassIndex::KLV_GSMClassIndex(std::ostream& standardOutput) : ClassIndex(standardOutput) {}
+
+KLV_GSMClassIndex::~KLV_GSMClassIndex() { standardOutput() << "Deallocing KLV_GSMClassIndex\n"; }
+
+}  // namespace varnel

@@ -1,0 +1,11 @@
+#include "LogGenerator/KLV/LTE/LTEClassIndex.h"
+
+#include <ostream>
+
+namespace varnel {
+
+LTEClassIndex::LTEClassIndex(std::ostream& standardOutput) : ClassIndex(standardOutput) {}
+
+LTEClassIndex::~LTEClassIndex() { standardOutput() << "Deallocing LTEClassIndex\n"; }
+
+}  // namespace varnel

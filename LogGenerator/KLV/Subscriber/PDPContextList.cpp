@@ -1,0 +1,22 @@
+#include "LogGenerator/KLV/Subscriber/PDPContextList.h"
+
+#include "platform/Log.h"
+#include "platform/PropertyList.h"
+
+namespace varnel {
+
+namespace {
+constexpr std::uint32_t pdpContextsLogCode = 0xFF0002;
+}
+
+std::vector<std::uint32_t> PDPContextList::getLogCodeArray() const { return {pdpContextsLogCode}; }
+
+// Kept: the code is not looked at. Whatever arrives here is taken for a list of contexts.
+void PDPContextList::updateWithData_logCode(const Packet& packet, std::uint32_t /*logCode*/) {
+  logWarning("PDPContextList");
+  const auto payload = readPropertyList(packet.payload());
+  if (!payload || !payload->array()) return;
+  replaceArray_With(list(), std::move(*payload->array()));
+}
+
+}  // namespace varnel

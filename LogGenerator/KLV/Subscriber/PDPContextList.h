@@ -1,0 +1,16 @@
+#pragma once
+
+#include "LogGenerator/Base.h"
+
+namespace varnel {
+
+/// The active packet-data contexts: always the last array that the telephony server sent. What is no array is
+/// ignored.
+class PDPContextList final : public Base {
+ public:
+  std::string_view getSectionName() const override { return "PDP Context Info"; }
+  std::vector<std::uint32_t> getLogCodeArray() const override;
+  void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) override;
+};
+
+}  // namespace varnel

@@ -1,0 +1,46 @@
+#include "LogGenerator/KLV/UTRAN/UTRANLogGenerator.h"
+
+#include <algorithm>
+
+#include "LogGenerator/KLV/UTRAN/UTRANClassIndex.h"
+#include "platform/Log.h"
+
+namespace varnel {
+
+namespace {
+
+bool containsUTRAN(std::string_view path) {
+  constexpr std::string_view name = "UTRAN";
+  const auto equalInAnyCase = [](char a, char b) { return (a >= 'a' && a <= 'z' ? a - 'a' + 'A' : a) == b; };
+  return std::search(path.begin(), path.end(), name.begin(), name.end(), equalInAnyCase) != path.end();
+}
+
+// The file name without folders and extension; empty when no resource has the name in its path.
+std::string templateName(const Resources& resources) {
+  const auto paths = resources.propertyListPaths();
+  const auto found = std::ranges::find_if(paths, containsUTRAN);
+  if (found == paths.end()) return {};
+  const std::string fileName = found->substr(found->rfind('/') + 1);
+  return fileName.substr(0, fileName.rfind('.'));
+}
+
+std::shared_ptr<ClassIndex> makeClassIndex(const Services& services, const std::string& templateName) {
+  if (templateName.empty()) return nullptr;
+  return std::make_shared<UTRANClassIndex>(services.standardOutput);
+}
+
+}  // namespace
+
+UTRANLogGenerator::UTRANLogGenerator(const Services& services)
+    : UTRANLogGenerator(services, templateName(services.resources)) {}
+
+UTRANLogGenerator::UTRANLogGenerator(const Services& services, const std::string& listName)
+    : KLVLogGenerator2(services, listName, makeClassIndex(services, listName)) {
+  logError("Created UTRANLogGenerator object");
+}
+
+std::unique_ptr<LogGenerator> UTRANLogGenerator::generator(const Services& services) {
+  return std::make_unique<UTRANLogGenerator>(services);
+}
+
+}  // namespace varnel

@@ -1,0 +1,18 @@
+#pragma once
+
+#include "LogGenerator/KLVLogGenerator2.h"
+
+namespace varnel {
+
+/// The generator of UTRAN modems: the first template resource with "UTRAN" in its path, in any letter case,
+/// and the decoders of `UTRANClassIndex`. Without such a resource it decodes nothing.
+class UTRANLogGenerator final : public KLVLogGenerator2 {
+ public:
+  explicit UTRANLogGenerator(const Services& services);
+  static std::unique_ptr<LogGenerator> generator(const Services& services);
+
+ private:
+  UTRANLogGenerator(const Services& services, const std::string& listName);
+};
+
+}  // namespace varnel

@@ -1,0 +1,53 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <span>
+#include <string_view>
+
+#include "LogGenerator/LogGenerator.h"
+
+namespace varnel {
+
+/// The time of a DLF version report.
+struct DLFTime {
+  std::uint32_t seconds = 0;     ///< since 1970-01-01 00:00:00 UTC
+  std::int16_t zoneMinutes = 0;  ///< local time less UTC
+  std::uint8_t daylight = 0;     ///< 1 while daylight saving time is in force
+};
+
+enum class DLFStatus : int { Success = 0, BufferTooSmall = 3 };
+
+/// The length of a version report record.
+inline constexpr std::uint32_t dlfVersionReportLength = 161;
+
+/// Writes the version report record (log code 0x1FFD) that starts every DLF file into a buffer of that
+/// capacity. `written` becomes the length of the record, 0 when the capacity does not suffice. Texts are cut
+/// to what their fields hold: 6, 15 and 17 characters.
+DLFStatus DLFAddVersionReport(std::uint8_t* buffer, std::uint32_t capacity, std::uint32_t& written,
+                              std::uint16_t firstWord, std::uint16_t secondWord, std::string_view version,
+                              std::string_view executableName, std::string_view buildDate,
+                              const DLFTime& time);
+
+/// The base of the generators that receive binary log packets: it collects the raw bytes of each interval
+/// between two displays and exports them as a DLF binary log.
+class KLVLogGenerator : public LogGenerator {
+ public:
+  using LogGenerator::LogGenerator;
+
+  /// The records of the history, then the DLF item when the export succeeded.
+  Value getSaveContentsFromState(const Dictionary& state) const override;
+
+ protected:
+  /// The version report and the raw bytes of every history record, oldest first; nothing when a record holds
+  /// something else.
+  std::optional<Bytes> generateDlfFromState(const Dictionary& state) const;
+
+  /// Moves the bytes collected so far into the state's "DisplayState".
+  void storeBinDataInState(Dictionary& state);
+
+  Bytes _binData;
+};
+
+}  // namespace varnel

@@ -1,0 +1,42 @@
+#pragma once
+
+#include <memory>
+#include <string>
+
+#include "LogGenerator/ClassIndex.h"
+#include "LogGenerator/KLVLogGenerator.h"
+
+namespace varnel {
+
+/// The template-driven generator. Its display is a copy of a template resource; each section of the copy
+/// belongs to the decoder that the class index has for the section's name, and each packet goes to the
+/// decoders that subscribed to its log code.
+///
+/// A packet is: log type (1 byte, 1 or 0xFF), record length (2), log code (2), timestamp (8), payload. A
+/// leading 0x81 and the byte behind it are no part of it.
+class KLVLogGenerator2 : public KLVLogGenerator {
+ public:
+  void updateState_withData(Dictionary& state, ByteView data) override;
+  Value generateLogUsingState(Dictionary& state) override;
+  Value getStartCommand() const override;
+
+ protected:
+  /// Takes ownership of both. A generator without a template resource has neither: it decodes nothing.
+  KLVLogGenerator2(const Services& services, std::string pListName, std::shared_ptr<ClassIndex> classIndex);
+  ~KLVLogGenerator2() override;
+
+ private:
+  /// Framing and dispatch of one message.
+  void updateWithData(ByteView data);
+  /// The display in the state. Kept: the call that builds it returns nothing; only later calls return it.
+  Value getDisplayFromState(Dictionary& state);
+  /// A live copy of a template, its sections handed to their decoders.
+  Value processTemplate(const Value& object);
+  /// Looks through a display and reports what is neither string nor container.
+  static void printDict(const Value& object);
+
+  std::string pListName;
+  std::shared_ptr<ClassIndex> cIndex;
+};
+
+}  // namespace varnel

@@ -1,0 +1,54 @@
+#pragma once
+
+#include <memory>
+#include <string_view>
+
+#include "LogGenerator/Services.h"
+#include "platform/Bytes.h"
+#include "platform/Dictionary.h"
+#include "platform/Value.h"
+
+namespace varnel {
+
+/// Keys of the state dictionary, which belongs to the model and outlives the generators that fill it.
+namespace stateKey {
+inline constexpr std::string_view displayTemplate = "Template";
+inline constexpr std::string_view display = "Display";
+inline constexpr std::string_view extraInfo = "ExtraInfo";
+inline constexpr std::string_view displayState = "DisplayState";
+inline constexpr std::string_view history = "History";
+}  // namespace stateKey
+
+/// Turns the messages of one modem technology into a display dictionary.
+class LogGenerator {
+ public:
+  /// Logs "Creating Log object: %p".
+  explicit LogGenerator(const Services& services);
+  LogGenerator(const LogGenerator&) = delete;
+  LogGenerator& operator=(const LogGenerator&) = delete;
+  virtual ~LogGenerator() = default;
+
+  /// A new generator for the technology that the telephony service names; null for a technology that has
+  /// none.
+  static std::unique_ptr<LogGenerator> generatorFromTechnology(const Value& technology,
+                                                               const Services& services);
+
+  /// Folds one incoming message into the state.
+  virtual void updateState_withData(Dictionary& state, ByteView data) = 0;
+  /// The display dictionary, or the absent value when there is none yet; records a snapshot in the history.
+  virtual Value generateLogUsingState(Dictionary& state) = 0;
+  /// The command that starts the stream.
+  virtual Value getStartCommand() const = 0;
+  /// The items to save: an array of dictionaries, each with a "Description".
+  virtual Value getSaveContentsFromState(const Dictionary& state) const = 0;
+
+ protected:
+  /// Appends a snapshot record to the state's "History", which keeps the newest five.
+  void updateHistoryInState(Dictionary& state) const;
+  const Services& services() const { return _services; }
+
+ private:
+  const Services _services;
+};
+
+}  // namespace varnel

@@ -1,0 +1,61 @@
+#pragma once
+
+#include <bit>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+
+#include "platform/Bytes.h"
+
+namespace varnel {
+
+static_assert(std::endian::native == std::endian::little,
+              "packets are little-endian and are loaded as they are");
+
+/// A view of one log packet, or of one record within it. Bytes past its end read as 0, so no read is ever out
+/// of bounds; whoever must know asks `holds` first. Offsets count from the first byte, header included.
+class Packet {
+ public:
+  /// Log type 1, record length 2, log code 2, timestamp 8.
+  static constexpr std::size_t headerSize = 13;
+
+  explicit Packet(ByteView bytes) : _bytes(bytes) {}
+
+  std::size_t size() const { return _bytes.size(); }
+  /// True when that many bytes from the offset on lie inside the packet.
+  bool holds(std::size_t offset, std::size_t length) const {
+    return offset <= size() && size() - offset >= length;
+  }
+
+  std::uint8_t u8(std::size_t offset) const { return offset < size() ? _bytes[offset] : 0; }
+  std::uint16_t u16(std::size_t offset) const { return load<std::uint16_t>(offset); }
+  std::uint32_t u32(std::size_t offset) const { return load<std::uint32_t>(offset); }
+  /// A little-endian run of up to 32 bits that starts at a bit (0 is the least significant) of a byte.
+  std::uint32_t bits(std::size_t offset, unsigned firstBit, unsigned width) const {
+    return static_cast<std::uint32_t>(load<std::uint64_t>(offset) >> firstBit &
+                                      ((std::uint64_t{1} << width) - 1));
+  }
+
+  /// The bytes from the offset on, as a view whose offsets count from there; empty past the end.
+  Packet from(std::size_t offset) const { return Packet(_bytes.subspan(offset < size() ? offset : size())); }
+  /// What follows the header; empty for a packet that is shorter than one.
+  ByteView payload() const { return from(headerSize)._bytes; }
+
+ private:
+  template <class Unsigned>
+  Unsigned load(std::size_t offset) const {
+    Unsigned value = 0;
+    if (holds(offset, sizeof value)) {
+      std::memcpy(&value, _bytes.data() + offset, sizeof value);
+    } else {
+      for (std::size_t i = 0; i < sizeof value && offset + i < size(); ++i) {
+        value = static_cast<Unsigned>(value | static_cast<Unsigned>(_bytes[offset + i]) << (8 * i));
+      }
+    }
+    return value;
+  }
+
+  ByteView _bytes;
+};
+
+}  // namespace varnel
