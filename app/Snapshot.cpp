@@ -1,0 +1,28 @@
+#include "app/Snapshot.h"
+
+#include "platform/Dictionary.h"
+#include "platform/Log.h"
+
+namespace varnel {
+
+namespace {
+constexpr std::string_view snapshotFolder = "/var/mobile/Library/Logs/CrashReporter";
+}
+
+Value snapshotContents(Time created, const Value& saveContents, std::string_view description) {
+  Value contents = Value::ofDictionary();
+  contents.dictionary()->set("Timestamp", dateDescription(created));
+  contents.dictionary()->set("Data", saveContents);
+  contents.dictionary()->set("Description", description);
+  return contents;
+}
+
+bool writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& contents) {
+  const std::string path =
+      std::string(snapshotFolder) + "/VarnelSnapshot-" + std::to_string(clock.now().seconds) + ".varnel";
+  if (files.writePropertyList(contents, path)) return true;
+  logError("Unable to write snapshot to %s", path);
+  return false;
+}
+
+}  // namespace varnel

@@ -1,0 +1,23 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "platform/Clock.h"
+#include "platform/DeviceFiles.h"
+#include "platform/Value.h"
+
+namespace varnel {
+
+/// Present on the devices on which snapshots may be saved.
+inline constexpr std::string_view internalDeviceMarker =
+    "/OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
+
+/// The contents of a snapshot file: a dictionary of "Timestamp", "Data" and "Description".
+Value snapshotContents(Time created, const Value& saveContents, std::string_view description);
+
+/// Writes the snapshot file of that moment into the device's folder of diagnostic logs. False, and a line in
+/// the log, when that fails.
+bool writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& contents);
+
+}  // namespace varnel

@@ -1,0 +1,206 @@
+#include "model/VarnelModel.h"
+
+#include "platform/Log.h"
+#include "platform/PropertyList.h"
+
+namespace varnel {
+
+namespace {
+
+using namespace std::chrono_literals;
+
+constexpr std::string_view logChannelName = "com.orvane.BasebandStateReport.LogChannel";
+constexpr std::string_view getTechnologyKey = "GetTechnology";
+constexpr std::int32_t logMessageIdentifier = 0;
+constexpr std::chrono::milliseconds sendTimeout = 1s;
+constexpr std::chrono::milliseconds replyTimeout = 1s;
+constexpr std::chrono::milliseconds refreshInterval = 2s;
+constexpr std::chrono::milliseconds retryDelay = 5s;
+
+}  // namespace
+
+VarnelModel::VarnelModel(const ModelServices& services, VarnelModelObserver& observer)
+    : _services(services), _observer(observer), _alive(std::make_shared<VarnelModel*>(this)) {}
+
+VarnelModel::~VarnelModel() { destroyPorts(); }
+
+MainQueue::Task VarnelModel::whileAlive(void (VarnelModel::*operation)()) {
+  return [weak = std::weak_ptr(_alive), operation] {
+    if (const auto alive = weak.lock()) ((*alive)->*operation)();
+  };
+}
+
+void VarnelModel::restartMonitor() {
+  destroyPorts();
+  startMonitor();
+}
+
+void VarnelModel::restartMonitorLater() { _services.queue.async(whileAlive(&VarnelModel::restartMonitor)); }
+
+void VarnelModel::startMonitor() {
+  if (_displayUpdateTimer) return;
+  if (!startStream()) retryLater();
+}
+
+bool VarnelModel::startStream() {
+  if (!createPorts()) {
+    logError("Could not create the ports necessary");
+    return false;
+  }
+  configureGenerator();
+  if (!_logGenerator) {
+    logError("No log generator technology works");
+    return false;
+  }
+  const auto command = _services.writePropertyList(_logGenerator->getStartCommand());
+  if (!command) {
+    logError(" Could not generate PLIST");
+    return false;
+  }
+  if (const auto sent = send(*command, std::nullopt); sent.status != 0) {
+    logError(" ***** Could not send the START command (got error=%d)", sent.status);
+    return false;
+  }
+  logError("Starting the display update timer");
+  _displayUpdateTimer = _services.queue.repeating(refreshInterval, whileAlive(&VarnelModel::refresh));
+  return true;
+}
+
+void VarnelModel::retryLater() {
+  destroyPorts();
+  _services.queue.after(retryDelay, whileAlive(&VarnelModel::startMonitor));
+}
+
+bool VarnelModel::createPorts() {
+  auto created = _services.ports.createLocalPort(
+      logChannelName, [this](std::int32_t identifier, ByteView data) noexcept -> std::optional<Bytes> {
+        if (identifier == logMessageIdentifier) updateWithData(data);
+        return std::nullopt;
+      });
+  _recvPort = std::move(created.port);
+  if (created.alreadyExists) {
+    logError("Local messsage port already exists");
+    return false;
+  }
+  if (!_recvPort) {
+    logError("Could not create local message port");
+    return false;
+  }
+  _recvPort->deliverOnMainQueue();
+  _recvPort->setInvalidationHandler([this, port = static_cast<const void*>(_recvPort.get())] {
+    logError(" ***** INVALIDATED %p *****", port);
+    restartMonitor();
+  });
+
+  auto connection = _services.telephony.connect(whileAlive(&VarnelModel::refresh));
+  if (!connection) {
+    logError("Could not create TKServerConnection");
+    return false;
+  }
+  const auto channel = connection->createLogChannel(logChannelName);
+  connection.reset();
+  if (channel.error != 0) {
+    logError("_TKServerConnectionNetworkMonitorCreateLogChannel returns error: %ld!", channel.error);
+    return false;
+  }
+  if (!channel.portName || channel.portName->empty()) {
+    logError("Could not create a log channel (TK returned null port)!");
+    return false;
+  }
+  _sendPort = _services.ports.createRemotePort(*channel.portName);
+  if (!_sendPort) {
+    logError("Could not create the remote port!");
+    return false;
+  }
+  logError(" ***** Created ports (send=%p, recv=%p)", static_cast<const void*>(_sendPort.get()),
+           static_cast<const void*>(_recvPort.get()));
+  return true;
+}
+
+void VarnelModel::destroyPorts() {
+  _displayUpdateTimer.reset();
+  // Tearing down must not look like the service's going away, or it would start the monitor again.
+  if (_recvPort) {
+    _recvPort->setInvalidationHandler({});
+    _recvPort->invalidate();
+    _recvPort.reset();
+  }
+  if (_sendPort) {
+    _sendPort->invalidate();
+    _sendPort.reset();
+  }
+}
+
+RemotePort::SendResult VarnelModel::send(ByteView command,
+                                         std::optional<std::chrono::milliseconds> replyWait) {
+  return _sendPort->sendRequest(logMessageIdentifier, command, sendTimeout, replyWait);
+}
+
+void VarnelModel::configureGenerator() {
+  Value request = Value::ofDictionary();
+  request.dictionary()->set(getTechnologyKey, getTechnologyKey);
+  const auto command = _services.writePropertyList(request);
+  if (!command) {
+    logError(" Could not generate GetTechnology command; cannot configure");
+    return;
+  }
+  const auto sent = send(*command, replyTimeout);
+  if (sent.status != 0) {
+    logError(" ***** Could not send the GetTechnology command (got error=%d)", sent.status);
+    return;
+  }
+  if (!sent.reply) {
+    logError(" ***** No response to GetTechnology; cannot configure");
+    return;
+  }
+  const auto reply = readPropertyList(*sent.reply);
+  const Dictionary* answers = reply ? reply->dictionary() : nullptr;
+  if (!answers) {
+    logError(" ***** Could not parse reply to GetTechnology; cannot configure");
+    return;
+  }
+  const Value& technology = answers->get(getTechnologyKey);
+  if (technology.isAbsent()) {
+    logError(" ***** Reply to GetTechnology had no answer; cannot configure");
+    return;
+  }
+  _logGenerator = LogGenerator::generatorFromTechnology(technology, _services.generator);
+  logError("Got log generated: %p", static_cast<const void*>(_logGenerator.get()));
+}
+
+void VarnelModel::refresh() {
+  if (isConnected() && !_sendPort->isValid()) _recvPort->invalidate();
+  if (!_updated) return;
+  _updated = false;
+  _nodes.reset();
+  _nodesByPath.reset();
+  _services.queue.async(whileAlive(&VarnelModel::updateObserver));
+}
+
+void VarnelModel::updateObserver() { _observer.updateViewControllerFromModel(); }
+
+void VarnelModel::updateWithData(ByteView data) {
+  if (_logGenerator) _logGenerator->updateState_withData(_state, data);
+  _updated = true;
+}
+
+std::shared_ptr<const VarnelModelNode> VarnelModel::topLevelNodes() {
+  if (_nodes || !_logGenerator) return _nodes;
+  const Value display = _logGenerator->generateLogUsingState(_state);
+  _nodesByPath.emplace();
+  _nodes = VarnelModelNode::makeTreeFromObject_withPathDictionary(display, *_nodesByPath);
+  return _nodes;
+}
+
+std::shared_ptr<const VarnelModelNode> VarnelModel::nodeAtPath(const std::string& path) {
+  if (!_nodesByPath) topLevelNodes();
+  if (!_nodesByPath) return nullptr;
+  const auto found = _nodesByPath->find(path);
+  return found == _nodesByPath->end() ? nullptr : found->second;
+}
+
+Value VarnelModel::getSaveContents() const {
+  return _logGenerator ? _logGenerator->getSaveContentsFromState(_state) : Value();
+}
+
+}  // namespace varnel

@@ -1,0 +1,93 @@
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string_view>
+
+#include "LogGenerator/LogGenerator.h"
+#include "model/VarnelModelNode.h"
+#include "platform/MainQueue.h"
+#include "platform/MessagePort.h"
+#include "platform/TelephonyService.h"
+
+namespace varnel {
+
+/// Who shows what the model holds.
+class VarnelModelObserver {
+ public:
+  virtual ~VarnelModelObserver() = default;
+  /// New data has arrived: the tree is to be asked for again. Called from the main queue.
+  virtual void updateViewControllerFromModel() = 0;
+};
+
+/// What the model may ask of its host. Everything outlives the model.
+struct ModelServices {
+  MessagePorts& ports;
+  TelephonyService& telephony;
+  MainQueue& queue;
+  Services generator;
+  /// Serialises a command; nothing when it cannot.
+  std::function<std::optional<Bytes>(const Value& command)> writePropertyList;
+};
+
+/// The link to the telephony service and the display tree made of what arrives on it.
+///
+/// It opens the log channel, asks which modem technology is present, has the matching generator, sends that
+/// one's start command and from then on feeds it every message. Each failure tears the link down; the next
+/// attempt follows five seconds later, without end. Everything happens on the main queue.
+class VarnelModel {
+ public:
+  VarnelModel(const ModelServices& services, VarnelModelObserver& observer);
+  VarnelModel(const VarnelModel&) = delete;
+  VarnelModel& operator=(const VarnelModel&) = delete;
+  ~VarnelModel();
+
+  /// True while both ports exist.
+  bool isConnected() const { return _recvPort && _sendPort; }
+  /// Tears the link down and starts it anew.
+  void restartMonitor();
+  /// Has the main queue call `restartMonitor` once.
+  void restartMonitorLater();
+  /// Opens the link unless the stream runs; retries in five seconds when that fails.
+  void startMonitor();
+  /// Notices a service that has gone away, and has the observer updated when new data has arrived.
+  void refresh();
+  /// Folds one message of the log channel into the state.
+  void updateWithData(ByteView data);
+
+  /// The root of the display tree; null while there is no generator. Builds the tree when none is cached,
+  /// which records a snapshot in the history.
+  std::shared_ptr<const VarnelModelNode> topLevelNodes();
+  /// The node of that path; null when there is none.
+  std::shared_ptr<const VarnelModelNode> nodeAtPath(const std::string& path);
+  /// What the save screen writes: an array of items; absent while there is no generator.
+  Value getSaveContents() const;
+
+ private:
+  bool createPorts();
+  void destroyPorts();
+  void configureGenerator();
+  bool startStream();
+  void retryLater();
+  void updateObserver();
+  RemotePort::SendResult send(ByteView command, std::optional<std::chrono::milliseconds> replyTimeout);
+  /// A task that does nothing once the model is gone.
+  MainQueue::Task whileAlive(void (VarnelModel::*operation)());
+
+  ModelServices _services;
+  VarnelModelObserver& _observer;
+
+  std::unique_ptr<LocalPort> _recvPort;
+  std::unique_ptr<RemotePort> _sendPort;
+  std::unique_ptr<RepeatingTimer> _displayUpdateTimer;
+  bool _updated = false;
+  std::unique_ptr<LogGenerator> _logGenerator;
+  Dictionary _state;
+  std::shared_ptr<const VarnelModelNode> _nodes;
+  std::optional<PathDictionary> _nodesByPath;
+
+  std::shared_ptr<VarnelModel*> _alive;
+};
+
+}  // namespace varnel

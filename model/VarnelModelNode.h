@@ -1,0 +1,72 @@
+#pragma once
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+#include "platform/Value.h"
+
+namespace varnel {
+
+class VarnelModelNode;
+
+/// Path → the node last built under it. It shares every node with the tree.
+using PathDictionary = std::unordered_map<std::string, std::shared_ptr<const VarnelModelNode>>;
+
+/// A node of the display tree. Nothing in a tree changes once it is built.
+class VarnelModelNode {
+ public:
+  using Children = std::vector<std::shared_ptr<const VarnelModelNode>>;
+
+  explicit VarnelModelNode(std::string_view name) : _name(name) {}
+  virtual ~VarnelModelNode() = default;
+
+  const std::string& displayName() const { return _name; }
+  /// Null for a leaf; empty for an inner node without children.
+  virtual const Children* childNodes() const { return nullptr; }
+  /// The text of a leaf; null for an inner node.
+  virtual const std::string* value() const { return nullptr; }
+
+  /// Builds the tree of a display object, which may be absent: its root is named "Varnel" and has the path
+  /// "/". Every node is recorded in the path dictionary; of two with the same path the later one.
+  static std::shared_ptr<const VarnelModelNode> makeTreeFromObject_withPathDictionary(const Value& object,
+                                                                                      PathDictionary& paths);
+
+ private:
+  std::string _name;
+};
+
+/// A leaf: a name and its value.
+class VarnelModelLeafNode final : public VarnelModelNode {
+ public:
+  VarnelModelLeafNode(std::string_view name, std::string_view value)
+      : VarnelModelNode(name), _string(value) {}
+  const std::string* value() const override { return &_string; }
+
+ private:
+  std::string _string;
+};
+
+/// An inner node and its children, in order.
+class VarnelModelTreeNode final : public VarnelModelNode {
+ public:
+  /// What the node was made from.
+  enum class Origin { Dictionary, Array };
+
+  VarnelModelTreeNode(std::string_view name, Children children, Origin origin)
+      : VarnelModelNode(name), _childNodes(std::move(children)), _origin(origin) {}
+  const Children* childNodes() const override { return &_childNodes; }
+  Origin origin() const { return _origin; }
+
+ private:
+  Children _childNodes;
+  Origin _origin;
+};
+
+/// The path of a child: the parent's, a "/" unless it ends in one, and the name as it is. Names may hold "/".
+std::string childPath(std::string_view parentPath, std::string_view name);
+
+}  // namespace varnel
