@@ -1,0 +1,21 @@
+#pragma once
+
+#include <QObject>
+
+#include "platform/MainQueue.h"
+
+namespace varnel {
+
+/// The main queue on the event loop of the program's QCoreApplication. An exception that leaves a task ends
+/// the program. Tasks that have not run when the queue is destroyed never do.
+class EventLoopQueue final : public MainQueue {
+ public:
+  void async(Task task) override;
+  void after(std::chrono::milliseconds delay, Task task) override;
+  std::unique_ptr<RepeatingTimer> repeating(std::chrono::milliseconds interval, Task task) override;
+
+ private:
+  QObject _context;  // to whom the waiting tasks belong
+};
+
+}  // namespace varnel

@@ -1,0 +1,24 @@
+#pragma once
+
+#include <filesystem>
+
+#include "platform/DeviceFiles.h"
+
+namespace varnel {
+
+/// The device's file system as a folder of this machine: the root is put before the device's absolute paths.
+class RootedFiles final : public DeviceFiles {
+ public:
+  explicit RootedFiles(std::filesystem::path root) : _root(std::move(root)) {}
+
+  bool exists(const std::string& path) const override;
+  /// A new file is for its owner alone (mode 0600).
+  bool writePropertyList(const Value& list, const std::string& path) override;
+
+ private:
+  std::filesystem::path below(const std::string& path) const;
+
+  std::filesystem::path _root;
+};
+
+}  // namespace varnel

@@ -1,0 +1,31 @@
+#pragma once
+
+#include <signal.h>
+
+#include <QSocketNotifier>
+#include <functional>
+#include <initializer_list>
+#include <memory>
+
+namespace varnel {
+
+/// Turns signals into calls from the event loop. As long as it lives they do nothing else.
+class SignalWatcher final {
+ public:
+  /// An exception that leaves the handler ends the program. Throws std::system_error when the system lacks
+  /// what it takes. Other threads must not take signals.
+  SignalWatcher(std::initializer_list<int> signals, std::function<void(int signal)> handler);
+  SignalWatcher(const SignalWatcher&) = delete;
+  SignalWatcher& operator=(const SignalWatcher&) = delete;
+  ~SignalWatcher();
+
+ private:
+  void takeSignals() noexcept;
+
+  sigset_t _formerMask;
+  int _descriptor;
+  std::function<void(int)> _handler;
+  std::unique_ptr<QSocketNotifier> _notifier;
+};
+
+}  // namespace varnel

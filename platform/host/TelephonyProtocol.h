@@ -1,0 +1,31 @@
+#pragma once
+
+#include <cstdint>
+#include <string_view>
+
+/// What goes over a connection to the telephony service. A request and its reply are dictionaries as property
+/// lists, one a frame:
+///   {"Command": "CreateLogChannel", "PortName": local port of the client, "Rights": ["spi", "internal"]}
+///   {"Error": integer, "PortName": port on which the service takes commands; absent when there is none}
+namespace varnel::telephonyProtocol {
+
+inline constexpr std::string_view socketName = "com.orvane.TelephonyServer";
+
+inline constexpr std::string_view commandKey = "Command";
+inline constexpr std::string_view portNameKey = "PortName";
+inline constexpr std::string_view rightsKey = "Rights";
+inline constexpr std::string_view errorKey = "Error";
+
+inline constexpr std::string_view createLogChannel = "CreateLogChannel";
+inline constexpr std::string_view spiRight = "spi";
+inline constexpr std::string_view internalRight = "internal";
+
+/// Errors of the service; 0 is none.
+inline constexpr std::int64_t malformedRequest = 1;
+inline constexpr std::int64_t unknownCommand = 2;
+inline constexpr std::int64_t missingRights = 3;
+/// Errors that the client's side finds: no reply in time, or one that cannot be understood.
+inline constexpr std::int64_t noReply = 4;
+inline constexpr std::int64_t malformedReply = 5;
+
+}  // namespace varnel::telephonyProtocol
