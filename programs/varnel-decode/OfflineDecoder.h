@@ -1,0 +1,42 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+
+#include "LogGenerator/LogGenerator.h"
+#include "platform/Bytes.h"
+#include "platform/Dictionary.h"
+#include "platform/Time.h"
+#include "platform/Value.h"
+#include "programs/varnel-decode/CaptureClock.h"
+
+namespace varnel {
+
+/// Runs a generator on a capture as the viewer would have run it live: each record is one message, and the
+/// display timer ticks every 2.0 s from the first record on, by the capture's own time.
+class OfflineDecoder {
+ public:
+  /// The generator must look at this clock. Both outlive the decoder.
+  OfflineDecoder(LogGenerator& generator, CaptureClock& clock) : _generator(generator), _clock(clock) {}
+
+  /// Fires every tick at or before the time, then hands the message to the generator at that time. Times need
+  /// not be in order. An exception that a decoder raises ends the program here.
+  void deliver(Time time, ByteView message) noexcept;
+
+  /// Generates the last display, at the time of the last record: the absent value when there is none.
+  Value finish();
+
+  /// What a snapshot of this moment holds.
+  Value saveContents() const { return _generator.getSaveContentsFromState(_state); }
+
+ private:
+  void fireTicks(Time now);
+
+  LogGenerator& _generator;
+  CaptureClock& _clock;
+  Dictionary _state;
+  std::optional<Time> _start;
+  std::uint64_t _ticksFired = 0;
+};
+
+}  // namespace varnel

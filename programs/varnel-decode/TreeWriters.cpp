@@ -1,0 +1,105 @@
+#include "programs/varnel-decode/TreeWriters.h"
+
+#include <memory>
+#include <nlohmann/json.hpp>
+#include <optional>
+#include <stdexcept>
+
+#include "app/TreeText.h"
+#include "model/VarnelModelNode.h"
+#include "platform/PropertyList.h"
+
+namespace varnel {
+
+namespace {
+
+std::shared_ptr<const VarnelModelNode> treeOf(const Value& display) {
+  PathDictionary paths;
+  return VarnelModelNode::makeTreeFromObject_withPathDictionary(display, paths);
+}
+
+void appendEscaped(std::string& lines, std::string_view text) {
+  for (const char character : text) {
+    switch (character) {
+      case '\\':
+        lines += "\\\\";
+        break;
+      case '\t':
+        lines += "\\t";
+        break;
+      case '\n':
+        lines += "\\n";
+        break;
+      case '\r':
+        lines += "\\r";
+        break;
+      default:
+        lines += character;
+    }
+  }
+}
+
+void appendPaths(std::string& lines, const VarnelModelNode& node, const std::string& path) {
+  appendEscaped(lines, path);
+  if (const std::string* value = node.value()) {
+    lines += '\t';
+    appendEscaped(lines, *value);
+  }
+  lines += '\n';
+  if (!node.childNodes()) return;
+  for (const auto& child : *node.childNodes())
+    appendPaths(lines, *child, childPath(path, child->displayName()));
+}
+
+void appendString(std::string& json, const std::string& text) {
+  using Json = nlohmann::json;
+  json += Json(text).dump(-1, ' ', false, Json::error_handler_t::replace);
+}
+
+// By hand, since no JSON library holds an object with the same name twice.
+void appendJson(std::string& json, const VarnelModelNode& node) {
+  const auto* tree = dynamic_cast<const VarnelModelTreeNode*>(&node);
+  if (!tree) {
+    appendString(json, *node.value());
+    return;
+  }
+  const bool isArray = tree->origin() == VarnelModelTreeNode::Origin::Array;
+  json += isArray ? '[' : '{';
+  std::string_view separator;
+  for (const auto& child : *tree->childNodes()) {
+    json += separator;
+    separator = ",";
+    if (!isArray) {
+      appendString(json, child->displayName());
+      json += ':';
+    }
+    appendJson(json, *child);
+  }
+  json += isArray ? ']' : '}';
+}
+
+}  // namespace
+
+std::string displayAsText(const Value& display) { return treeAsText(*treeOf(display)); }
+
+std::string displayAsPaths(const Value& display) {
+  std::string lines;
+  appendPaths(lines, *treeOf(display), "/");
+  return lines;
+}
+
+std::string displayAsJson(const Value& display) {
+  std::string json;
+  appendJson(json, *treeOf(display));
+  return json + '\n';
+}
+
+std::string displayAsPropertyList(const Value& display) {
+  if (display.isAbsent()) return {};
+  const auto list = writeXmlPropertyList(display);
+  if (!list)
+    throw std::runtime_error("the display holds what an XML property list cannot; try another --format");
+  return {list->begin(), list->end()};
+}
+
+}  // namespace varnel

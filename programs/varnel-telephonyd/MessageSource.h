@@ -1,0 +1,24 @@
+#pragma once
+
+#include <chrono>
+#include <optional>
+
+#include "platform/Bytes.h"
+
+namespace varnel {
+
+/// One message of a stream.
+struct StreamMessage {
+  std::chrono::milliseconds at;  ///< since the start of the stream
+  Bytes bytes;
+};
+
+/// The messages of a log channel, from the start of its stream on.
+class MessageSource {
+ public:
+  virtual ~MessageSource() = default;
+  /// The next message, no earlier than the one before; nothing when the stream has ended.
+  virtual std::optional<StreamMessage> next() = 0;
+};
+
+}  // namespace varnel

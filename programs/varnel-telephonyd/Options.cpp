@@ -1,0 +1,99 @@
+#include "programs/varnel-telephonyd/Options.h"
+
+#include <CLI/CLI.hpp>
+#include <filesystem>
+#include <iostream>
+#include <limits>
+#include <vector>
+
+#include "platform/TelephonyService.h"
+#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr const char* programName = "varnel-telephonyd";
+constexpr int usageError = 2;
+constexpr double slowest = 0.001, fastest = 1'000'000;
+
+void declare(CLI::App& app, Options& options, const std::string& version) {
+  std::vector<std::string> technologies;
+  for (const auto name : simulatedTechnologies()) technologies.emplace_back(name);
+
+  app.description(
+      "Serves the log channel to viewers, from a simulated modem or from a capture. One of --simulate and "
+      "--replay is needed. SIGINT and SIGTERM end it.");
+  app.set_version_flag("--version", programName + (" " + version));
+  auto* simulate = app.add_option("--simulate", options.simulatedTechnology, "simulate a modem")
+                       ->check(CLI::IsMember(technologies))
+                       ->type_name("TECHNOLOGY");
+  app.add_option("--seed", options.seed, "the same seed makes the modem send the same messages")
+      ->needs(simulate)
+      ->type_name("N")
+      ->capture_default_str();
+  auto* replay =
+      app.add_option("--replay", options.replayPath,
+                     "send the messages of a capture, pcap or pcapng of link type USER0, in their own "
+                     "time; every viewer gets them from the start")
+          ->excludes(simulate)
+          ->type_name("CAPTURE");
+  app.add_option("--technology", options.replayTechnology, "the modem that was captured")
+      ->needs(replay)
+      ->default_val(technology::kalviLTE)
+      ->type_name("TECHNOLOGY");
+  app.add_option("--speed", options.speed, "replay that many times as fast")
+      ->needs(replay)
+      ->type_name("X")
+      ->capture_default_str();
+  app.add_flag("--loop", options.loops, "start the capture over at its end")->needs(replay);
+  app.add_option("--record", options.recordPath,
+                 "write what is sent to viewers to a capture that can be replayed and decoded")
+      ->type_name("CAPTURE");
+  app.add_option("--runtime-dir", options.runtimeFolder,
+                 "where viewer and server meet; $XDG_RUNTIME_DIR/varnel unless given")
+      ->type_name("DIR");
+  app.add_option("--log-level", options.logLevel,
+                 "also write log lines of this priority number and lower to standard error; -1 for none")
+      ->check(CLI::Range(-1, std::numeric_limits<int>::max()))
+      ->type_name("N")
+      ->capture_default_str();
+}
+
+// What is wrong with options that are fine one by one; nothing when they go together.
+std::optional<std::string> conflict(const Options& options) {
+  if (!options.simulatedTechnology && !options.replayPath) return "one of --simulate and --replay is needed";
+  if (!options.replayPath) return std::nullopt;
+  if (*options.replayPath == "-") return "--replay needs a file, for it is read once for every viewer";
+  const bool isPlayable = options.speed >= slowest && options.speed <= fastest;  // which no NaN is
+  if (!isPlayable) return "--speed must lie between 0.001 and 1000000";
+  std::error_code ignored;
+  if (options.recordPath && std::filesystem::equivalent(*options.replayPath, *options.recordPath, ignored))
+    return "--record would overwrite the capture that is to be replayed";
+  return std::nullopt;
+}
+
+ExitStatus mistake(const std::string& text) {
+  std::cerr << programName << ": " << text << "; see " << programName << " --help\n";
+  return {usageError};
+}
+
+}  // namespace
+
+std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
+                                              const std::string& version) {
+  Options options;
+  CLI::App app("", programName);
+  declare(app, options, version);
+  try {
+    app.parse(argumentCount, arguments);
+  } catch (const CLI::Success& wish) {  // help or version
+    return ExitStatus{app.exit(wish)};
+  } catch (const CLI::ParseError& error) {
+    return mistake(error.what());
+  }
+  if (const auto found = conflict(options)) return mistake(*found);
+  return options;
+}
+
+}  // namespace varnel

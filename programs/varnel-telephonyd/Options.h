@@ -1,0 +1,36 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <variant>
+
+#include "platform/Log.h"
+
+namespace varnel {
+
+/// What the program is asked to do. Either `simulatedTechnology` or `replayPath` is there.
+struct Options {
+  std::optional<std::string> simulatedTechnology;
+  std::uint64_t seed = 1;
+
+  std::optional<std::string> replayPath;
+  std::string replayTechnology;  ///< what viewers are told
+  double speed = 1;
+  bool loops = false;
+
+  std::optional<std::string> recordPath;  ///< absent: nothing is recorded
+  std::optional<std::string> runtimeFolder;
+  int logLevel = logErrorPriority;  ///< the highest priority number that goes to standard error
+};
+
+/// The status to end with when the command line leaves nothing to do: 0 after help, 2 after a mistake.
+struct ExitStatus {
+  int code;
+};
+
+/// Reads the command line. Help and version go to standard output, a mistake is one line on standard error.
+std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
+                                              const std::string& version);
+
+}  // namespace varnel

@@ -1,0 +1,25 @@
+#pragma once
+
+#include <memory>
+#include <utility>
+
+#include "programs/varnel-telephonyd/MessageSource.h"
+#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+
+namespace varnel {
+
+/// What a simulated modem sends.
+class SimulationSource final : public MessageSource {
+ public:
+  explicit SimulationSource(std::unique_ptr<SimulatedModem> modem) : _modem(std::move(modem)) {}
+
+  std::optional<StreamMessage> next() override {
+    SimulatedMessage message = _modem->next();
+    return StreamMessage{message.at, std::move(message.bytes)};
+  }
+
+ private:
+  const std::unique_ptr<SimulatedModem> _modem;
+};
+
+}  // namespace varnel

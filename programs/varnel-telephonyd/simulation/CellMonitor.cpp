@@ -1,0 +1,107 @@
+#include "programs/varnel-telephonyd/simulation/CellMonitor.h"
+
+#include <algorithm>
+
+#include "platform/Dictionary.h"
+#include "platform/TelephonyService.h"
+
+namespace varnel::simulation {
+
+namespace {
+
+constexpr int neighboursOfServing = 4, neighboursOfOthers = 2;
+
+std::string_view name(Access access) {
+  switch (access) {
+    case Access::GSM:
+      return cellMonitor::gsm;
+    case Access::UMTS:
+      return cellMonitor::umts;
+    case Access::LTE:
+      return cellMonitor::lte;
+  }
+  return {};
+}
+
+class RecordList {
+ public:
+  explicit RecordList(const Walk& walk) : _walk(walk) {}
+
+  void addServing(const Cell& cell) {
+    Dictionary& record = add(cell, cellMonitor::serving);
+    set(record, cellMonitor::mcc, testNetworkMCC);
+    set(record, cellMonitor::mnc, testNetworkMNC);
+    set(record, areaKey(cell), cell.area);
+    set(record, cellMonitor::cellIdentity, cell.identity);
+    addRadio(record, cell);
+  }
+  void addNeighbours(const Cell& serving, Access access) {
+    auto left = access == serving.access ? neighboursOfServing : neighboursOfOthers;
+    for (const ReceivedCell& received : _walk.cells(access)) {
+      if (received.cell == &serving) continue;
+      if (left-- == 0) break;
+      addRadio(add(*received.cell, cellMonitor::neighbor), *received.cell);
+    }
+  }
+
+  Value records() const { return _records; }
+
+ private:
+  static void set(Dictionary& record, std::string_view key, std::int64_t number) {
+    record.set(key, Value::ofInteger(number));
+  }
+  static std::string_view areaKey(const Cell& cell) {
+    return cell.access == Access::LTE ? cellMonitor::trackingAreaCode : cellMonitor::lac;
+  }
+
+  Dictionary& add(const Cell& cell, std::string_view type) {
+    const Value record = Value::ofDictionary();
+    record.dictionary()->set(cellMonitor::radioAccessTechnology, name(cell.access));
+    record.dictionary()->set(cellMonitor::cellType, type);
+    _records.array()->push_back(record);
+    return *record.dictionary();
+  }
+
+  void addRadio(Dictionary& record, const Cell& cell) const {
+    const std::int64_t level_dbm = _walk.level_cdbm(cell) / 100;
+    set(record, cellMonitor::bandInfo, cell.band);
+    switch (cell.access) {
+      case Access::GSM:
+        set(record, cellMonitor::arfcn, cell.channel);
+        set(record, cellMonitor::rssi, level_dbm);
+        break;
+      case Access::UMTS:
+        set(record, cellMonitor::uarfcn, cell.channel);
+        set(record, cellMonitor::scramblingCode, cell.code);
+        set(record, cellMonitor::rscp, level_dbm);
+        set(record, cellMonitor::ecN0, ecN0_db(cell));
+        break;
+      case Access::LTE:
+        set(record, cellMonitor::uarfcn, cell.channel);
+        set(record, cellMonitor::physicalCellIdentity, cell.code);
+        set(record, cellMonitor::rssi, level_dbm);
+        break;
+    }
+  }
+
+  // All cells share one carrier: beside the strongest one, a weak cell drowns.
+  std::int64_t ecN0_db(const Cell& cell) const {
+    constexpr std::int64_t best_db = -4, worst_db = -24;
+    const std::int64_t behind_cdb = _walk.cells(cell.access).front().level_cdbm - _walk.level_cdbm(cell);
+    return std::max(best_db - behind_cdb / 100, worst_db);
+  }
+
+  const Walk& _walk;
+  const Value _records = Value::ofArray();
+};
+
+}  // namespace
+
+Value cellMonitorRecords(const Walk& walk, const Cell& serving) {
+  RecordList list(walk);
+  list.addServing(serving);
+  for (const Access access : {Access::LTE, Access::UMTS, Access::GSM}) list.addNeighbours(serving, access);
+  return list.records();
+}
+
+}  // namespace varnel::simulation

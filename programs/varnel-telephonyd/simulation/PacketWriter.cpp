@@ -1,0 +1,27 @@
+#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
+
+#include <algorithm>
+
+namespace varnel::simulation {
+
+PacketWriter::PacketWriter(LogType type, std::uint16_t code, std::chrono::milliseconds now, std::size_t size)
+    : _bytes(size) {
+  u8(0, static_cast<std::uint8_t>(type));
+  u16(1, static_cast<std::int64_t>(size) - 1);
+  u16(3, code);
+  u64(5, now.count());
+}
+
+PacketWriter& PacketWriter::put(std::size_t offset, std::size_t width, std::int64_t number) {
+  for (std::size_t i = 0; i < width; ++i) _bytes.at(offset + i) = static_cast<std::uint8_t>(number >> 8 * i);
+  return *this;
+}
+
+Bytes serverMessage(std::uint16_t code, std::chrono::milliseconds now, ByteView payload) {
+  const std::size_t size = PacketWriter::headerSize + payload.size();
+  Bytes message = PacketWriter(PacketWriter::LogType::Server, code, now, size).finish();
+  std::ranges::copy(payload, message.begin() + PacketWriter::headerSize);
+  return message;
+}
+
+}  // namespace varnel::simulation

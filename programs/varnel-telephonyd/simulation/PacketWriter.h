@@ -1,0 +1,39 @@
+#pragma once
+
+#include <chrono>
+#include <cstddef>
+#include <cstdint>
+#include <utility>
+
+#include "platform/Bytes.h"
+
+namespace varnel::simulation {
+
+/// Writes one log packet, little-endian. Its header of 13 bytes: log type (u8), record length (u16, the bytes
+/// behind the type), log code (u16), timestamp (u64, milliseconds since the modem was started). Offsets count
+/// from the start of the packet.
+class PacketWriter {
+ public:
+  enum class LogType : std::uint8_t { Modem = 1, Server = 0xFF };
+  static constexpr std::size_t headerSize = 13;
+
+  /// A packet of that many bytes, all 0 behind the header.
+  PacketWriter(LogType type, std::uint16_t code, std::chrono::milliseconds now, std::size_t size);
+
+  PacketWriter& u8(std::size_t offset, std::int64_t number) { return put(offset, 1, number); }
+  PacketWriter& u16(std::size_t offset, std::int64_t number) { return put(offset, 2, number); }
+  PacketWriter& u32(std::size_t offset, std::int64_t number) { return put(offset, 4, number); }
+  PacketWriter& u64(std::size_t offset, std::int64_t number) { return put(offset, 8, number); }
+
+  Bytes finish() { return std::move(_bytes); }
+
+ private:
+  PacketWriter& put(std::size_t offset, std::size_t width, std::int64_t number);
+
+  Bytes _bytes;
+};
+
+/// A message that the telephony server makes itself: the header, then the payload.
+Bytes serverMessage(std::uint16_t code, std::chrono::milliseconds now, ByteView payload);
+
+}  // namespace varnel::simulation

@@ -1,0 +1,37 @@
+#include "programs/varnel-telephonyd/simulation/ScheduledModem.h"
+
+#include <algorithm>
+
+namespace varnel::simulation {
+
+namespace {
+constexpr std::uint8_t linkPrefix[] = {0x81, 0x00};
+constexpr int messagesPerPrefix = 8;
+}  // namespace
+
+SimulatedMessage ScheduledModem::next() {
+  while (_sent.empty()) runNextTask();
+  SimulatedMessage message = std::move(_sent.front());
+  _sent.pop_front();
+  return message;
+}
+
+void ScheduledModem::repeat(Pace pace, std::function<void()> task) {
+  _tasks.push_back({pace.first, pace, std::move(task)});
+}
+
+void ScheduledModem::send(Bytes packet) {
+  if (_random.oneIn(messagesPerPrefix))
+    packet.insert(packet.begin(), std::begin(linkPrefix), std::end(linkPrefix));
+  _sent.push_back({_now, std::move(packet)});
+}
+
+void ScheduledModem::runNextTask() {
+  Task& task = *std::ranges::min_element(_tasks, {}, &Task::due);
+  _now = task.due;
+  const std::int64_t jitter = task.pace.jitter.count();
+  task.due += task.pace.interval + std::chrono::milliseconds(_random.between(-jitter, jitter));
+  task.run();
+}
+
+}  // namespace varnel::simulation

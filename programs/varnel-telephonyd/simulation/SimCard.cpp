@@ -1,0 +1,78 @@
+#include "programs/varnel-telephonyd/simulation/SimCard.h"
+
+#include <cstdio>
+
+#include "platform/Dictionary.h"
+
+namespace varnel::simulation {
+
+namespace {
+
+// The digit that makes the sum of all digits, every second one doubled, a multiple of ten.
+char checkDigit(const std::string& digits) {
+  int sum = 0;
+  bool isDoubled = true;
+  for (auto digit = digits.rbegin(); digit != digits.rend(); ++digit, isDoubled = !isDoubled) {
+    const int number = (*digit - '0') * (isDoubled ? 2 : 1);
+    sum += number / 10 + number % 10;
+  }
+  return static_cast<char>('0' + (10 - sum % 10) % 10);
+}
+
+// Telecom cards begin with 89; then the test network's country and issuer.
+std::string cardNumber(Random& random) {
+  std::string digits = "8900101";
+  while (digits.size() < 18) digits += static_cast<char>('0' + random.between(0, 9));
+  return digits + checkDigit(digits);
+}
+
+std::string locationText(const char* identityName, std::uint32_t identity, const char* areaName, int area) {
+  char text[80];
+  std::snprintf(text, sizeof text, "%s 0x%08X, %s 001-01-%04X, updated", identityName, identity, areaName,
+                static_cast<unsigned>(area));
+  return text;
+}
+
+std::string accessClassText(const std::string& cardNumber) {
+  // It is the last digit before the check digit.
+  const int accessClass = cardNumber[cardNumber.size() - 2] - '0';
+  char text[32];
+  std::snprintf(text, sizeof text, "0x%04X (class %d)", 1u << accessClass, accessClass);
+  return text;
+}
+
+}  // namespace
+
+SimCard::SimCard(Random random, int area) : _random(random), _number(cardNumber(_random)) {
+  // Numbers of this range are for fiction.
+  _subscriberNumber = "+1212555" + std::to_string(_random.between(1000100, 1000199)).substr(3);
+  registerIn(area);
+}
+
+void SimCard::registerIn(int area) {
+  _area = area;
+  _temporaryIdentity = static_cast<std::uint32_t>(_random.between(0x10000000, 0x3FFFFFFF));
+  _packetTemporaryIdentity = static_cast<std::uint32_t>(_random.between(0xC0000000, 0xFFFFFFFE));
+}
+
+Value SimCard::files() const {
+  const Value files = Value::ofDictionary();
+  Dictionary& texts = *files.dictionary();
+  texts.set("kSimFile_ICCID", _number);
+  texts.set("kSimFile_MSISDN", _subscriberNumber);
+  texts.set("kSimFile_MBDN", "+12125550100");
+  texts.set("kSimFile_HPPLMN", "5 (30 minutes)");
+  texts.set("kSimFile_LOCI", locationText("TMSI", _temporaryIdentity, "LAI", _area));
+  texts.set("kSimFile_PSLOCI", locationText("P-TMSI", _packetTemporaryIdentity, "RAI", _area));
+  texts.set("kSimFile_ACC", accessClassText(_number));
+  texts.set("kSimFile_AD", "Normal operation, MNC of 2 digits");
+  texts.set("kSimFile_FPLMN", "001-02, 001-03");
+  texts.set("kSimFile_AHPLMN", "001-01");
+  texts.set("kSimFile_RATMODE", "LTE, UMTS, GSM");
+  texts.set("kSimFile_PNN", "Test Network");
+  texts.set("kSimFile_OPL", "001-01, areas 0000 to FFFE, name 1");
+  texts.set("kSimFile_OPLMNAcT", "001-01 (LTE, UMTS, GSM)");
+  return files;
+}
+
+}  // namespace varnel::simulation

@@ -1,0 +1,31 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+#include "platform/Value.h"
+#include "programs/varnel-telephonyd/simulation/Random.h"
+
+namespace varnel::simulation {
+
+/// The SIM card in the phone. Its number tells it from the cards of other seeds.
+class SimCard {
+ public:
+  SimCard(Random random, int area);
+
+  /// The phone has registered in another area and got other temporary identities.
+  void registerIn(int area);
+
+  /// The elementary files as the telephony server tells them: a dictionary of texts.
+  Value files() const;
+
+ private:
+  Random _random;
+  std::string _number;  // of the card, with its check digit
+  std::string _subscriberNumber;
+  int _area;
+  std::uint32_t _temporaryIdentity;
+  std::uint32_t _packetTemporaryIdentity;
+};
+
+}  // namespace varnel::simulation

@@ -1,0 +1,39 @@
+#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+
+#include "platform/TelephonyService.h"
+#include "programs/varnel-telephonyd/simulation/LTEModem.h"
+
+namespace varnel {
+
+namespace {
+
+template <class Modem>
+std::unique_ptr<SimulatedModem> make(std::uint64_t seed) {
+  return std::make_unique<Modem>(seed);
+}
+
+struct Simulation {
+  std::string_view technology;
+  std::unique_ptr<SimulatedModem> (*make)(std::uint64_t seed);
+};
+
+constexpr Simulation simulations[] = {
+    {technology::kalviLTE, make<simulation::LTEModem>},
+};
+
+}  // namespace
+
+std::unique_ptr<SimulatedModem> simulatedModem(std::string_view technology, std::uint64_t seed) {
+  for (const Simulation& simulation : simulations) {
+    if (simulation.technology == technology) return simulation.make(seed);
+  }
+  return nullptr;
+}
+
+std::vector<std::string_view> simulatedTechnologies() {
+  std::vector<std::string_view> technologies;
+  for (const Simulation& simulation : simulations) technologies.push_back(simulation.technology);
+  return technologies;
+}
+
+}  // namespace varnel

@@ -1,0 +1,36 @@
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <memory>
+#include <string_view>
+#include <vector>
+
+#include "platform/Bytes.h"
+
+namespace varnel {
+
+/// One message of a simulated log channel.
+struct SimulatedMessage {
+  std::chrono::milliseconds at;  ///< since the start of the stream
+  Bytes bytes;
+};
+
+/// A modem that exists on paper only, carried through a town by somebody who walks. Its messages go on
+/// without end, at the pace of a real one; the same seed gives the same messages on every machine.
+class SimulatedModem {
+ public:
+  virtual ~SimulatedModem() = default;
+  /// The identifier under which the telephony service publishes it.
+  virtual std::string_view technology() const = 0;
+  /// The next message, no earlier than the one before.
+  virtual SimulatedMessage next() = 0;
+};
+
+/// A new modem of the technology, at the start of its stream; null for a technology that is not simulated.
+std::unique_ptr<SimulatedModem> simulatedModem(std::string_view technology, std::uint64_t seed);
+
+/// Every technology that is simulated.
+std::vector<std::string_view> simulatedTechnologies();
+
+}  // namespace varnel

@@ -1,0 +1,20 @@
+#pragma once
+
+#include <vector>
+
+#include "programs/varnel-telephonyd/simulation/Cell.h"
+#include "programs/varnel-telephonyd/simulation/Random.h"
+
+namespace varnel::simulation {
+
+/// A town: a street that ends where it began, and the cells along it.
+struct Town {
+  std::int64_t streetLength_cm;
+  std::vector<Cell> cells;
+
+  /// Builds a town, of another look for each source of randomness. There are several tracking areas, and LTE
+  /// sites with carriers of several bands.
+  static Town build(Random random);
+};
+
+}  // namespace varnel::simulation
