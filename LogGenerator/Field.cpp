@@ -63,4 +63,20 @@ void setFields(Dictionary& section, const Packet& packet, std::span<const Field>
   }
 }
 
+Value fieldRow(const Packet& record, std::span<const Field> fields) {
+  Value row = Value::ofDictionary();
+  setFields(*row.dictionary(), record, fields);
+  return row;
+}
+
+Array recordRows(const Packet& packet, const Records& records, std::span<const Field> fields) {
+  const std::size_t size = extent(fields);
+  Array rows;
+  for (std::size_t i = 0; i < records.count; ++i) {
+    const std::size_t offset = records.first + records.stride * i;
+    if (packet.holds(offset, size)) rows.push_back(fieldRow(packet.from(offset), fields));
+  }
+  return rows;
+}
+
 }  // namespace varnel

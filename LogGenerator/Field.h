@@ -128,7 +128,7 @@ consteval bool within(std::span<const Field> fields, std::size_t size) {
 }
 
 /// How many bytes the fields read, from offset 0 to the end of the last one.
-consteval std::size_t extent(std::span<const Field> fields) {
+constexpr std::size_t extent(std::span<const Field> fields) {
   std::size_t end = 0;
   for (const Field& field : fields) end = std::max(end, field.source.end());
   return end;
@@ -136,5 +136,18 @@ consteval std::size_t extent(std::span<const Field> fields) {
 
 /// Shows the fields in a section, in the order of the table.
 void setFields(Dictionary& section, const Packet& packet, std::span<const Field> fields);
+
+/// A row of its own that shows the fields of a record.
+Value fieldRow(const Packet& record, std::span<const Field> fields);
+
+/// Where the records of a counted list lie.
+struct Records {
+  std::size_t first;   ///< offset of the first one
+  std::size_t stride;  ///< from one to the next
+  std::size_t count;
+};
+
+/// A row a record, in their order. A record whose fields do not lie wholly inside the packet is left out.
+Array recordRows(const Packet& packet, const Records& records, std::span<const Field> fields);
 
 }  // namespace varnel

@@ -18,15 +18,22 @@ struct PacketHandler {
   void (Decoder::*decode)(const Packet& packet);
 };
 
+/// What becomes of a log code that a decoder does not list.
+enum class UnknownCodes { Logged, Ignored };
+
 inline void logUnknownCode(std::uint32_t logCode) {
   logError("Received an unknown log message: %d", logCode);
 }
 
 /// The common steps of a decoder: its trace line, the log-code test, the length test, the handler. `Decoder`
-/// supplies `sectionName`, `traceLine` and the static function `handlers()`, the table of its log codes.
+/// supplies `sectionName`, `traceLine` and the static function `handlers()`, the table of its log codes, and
+/// may replace the two constants below.
 template <class Decoder>
 class SectionDecoder : public Base {
  public:
+  static constexpr int tracePriority = logWarningPriority;
+  static constexpr UnknownCodes unknownCodes = UnknownCodes::Logged;
+
   std::string_view getSectionName() const final { return Decoder::sectionName; }
 
   std::vector<std::uint32_t> getLogCodeArray() const final {
@@ -36,13 +43,13 @@ class SectionDecoder : public Base {
   }
 
   void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) final {
-    logWarning("%s", Decoder::traceLine);
+    logLine(Decoder::tracePriority, "%s", Decoder::traceLine);
     for (const auto& handler : Decoder::handlers()) {
       if (handler.logCode != logCode) continue;
       if (packet.size() >= handler.minimumLength) (static_cast<Decoder*>(this)->*handler.decode)(packet);
       return;
     }
-    logUnknownCode(logCode);
+    if constexpr (Decoder::unknownCodes == UnknownCodes::Logged) logUnknownCode(logCode);
   }
 };
 

@@ -1,0 +1,20 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The detected cells of the connected-mode intra-frequency measurement, a row each.
+class DetectedCells final : public SectionDecoder<DetectedCells> {
+ public:
+  static constexpr std::string_view sectionName = "Detected Cells";
+  static constexpr std::string_view traceLine = "Detected Cells";
+  static std::span<const PacketHandler<DetectedCells>> handlers();
+
+ private:
+  void update(const Packet& packet);
+};
+
+}  // namespace varnel

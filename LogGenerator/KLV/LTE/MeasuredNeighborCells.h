@@ -1,0 +1,20 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The neighbour cells of the connected-mode intra-frequency measurement, a row each.
+class MeasuredNeighborCells final : public SectionDecoder<MeasuredNeighborCells> {
+ public:
+  static constexpr std::string_view sectionName = "Measured Neighbor Cells";
+  static constexpr std::string_view traceLine = "Measured Neighbor Cells";
+  static std::span<const PacketHandler<MeasuredNeighborCells>> handlers();
+
+ private:
+  void update(const Packet& packet);
+};
+
+}  // namespace varnel

@@ -1,0 +1,20 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The cells of the idle-mode neighbour measurement, a row each.
+class NeighborCellsList final : public SectionDecoder<NeighborCellsList> {
+ public:
+  static constexpr std::string_view sectionName = "Neighbor Cells List";
+  static constexpr std::string_view traceLine = "Neighbor Cells List";
+  static std::span<const PacketHandler<NeighborCellsList>> handlers();
+
+ private:
+  void update(const Packet& packet);
+};
+
+}  // namespace varnel

@@ -1,0 +1,28 @@
+#include "LogGenerator/KLV/LTE/NeighborMeasurementMisc.h"
+
+#include "LogGenerator/Field.h"
+#include "LogGenerator/KLV/LTE/NeighborMeasurement.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr Field frequency[] = {
+    {u8(13), "Version"},
+    {u16(17), "E-ARFCN"},
+    {bits(19, 0, 6), "Qrxlevmin", integer("%d dBm", 2, -140)},
+};
+static_assert(within(frequency, neighborMeasurement::minimumSize));
+
+}  // namespace
+
+std::span<const PacketHandler<NeighborMeasurementMisc>> NeighborMeasurementMisc::handlers() {
+  static constexpr PacketHandler<NeighborMeasurementMisc> table[] = {
+      {neighborMeasurement::logCode, neighborMeasurement::minimumSize, &NeighborMeasurementMisc::update},
+  };
+  return table;
+}
+
+void NeighborMeasurementMisc::update(const Packet& packet) { setFields(rows(), packet, frequency); }
+
+}  // namespace varnel

@@ -1,0 +1,80 @@
+#include "LogGenerator/KLV/LTE/ReselectionCandidatesList.h"
+
+#include <algorithm>
+
+#include "LogGenerator/Field.h"
+#include "LogGenerator/KLV/LTE/ReselectionCandidates.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr std::size_t countOffset = 19;
+constexpr std::size_t recordStride = 4;
+constexpr std::size_t typeOffset = 2;
+
+constexpr Choice types[] = {{0, "LTE"}, {1, "UTRAN"}, {2, "GERAN"}, {3, "CDMA1XRTT"}, {4, "CDMAHRPD"}};
+
+// What every candidate begins with.
+constexpr Field candidate[] = {
+    {u16(0), "Candidate Priority"},
+    {u16(typeOffset), "Candidate RAT Type", choice(types, "??")},
+};
+constexpr Field lteCell[] = {
+    {u16(4), "E ARFCN"},
+    {bits(6, 7, 9), "Cell ID"},
+};
+constexpr Field utranCell[] = {
+    {u16(4), "U ARFCN"},
+    {u16(6), "PSC"},
+};
+constexpr Field geranCell[] = {
+    {u16(4), "ARFCN"},
+    {u8(6), "Band"},
+    {u8(7), "BSIC ID"},
+};
+constexpr Field cdmaCell[] = {
+    {u8(4), "Band"},
+    {u16(8), "Channel"},
+    {u16(10), "Pilot"},
+};
+
+// The rest of a candidate, by its radio access technology.
+struct Cell {
+  std::span<const Field> fields;
+  std::size_t size;
+};
+constexpr Cell cells[] = {
+    {lteCell, extent(lteCell)},   {utranCell, extent(utranCell)}, {geranCell, extent(geranCell)},
+    {cdmaCell, extent(cdmaCell)}, {cdmaCell, extent(cdmaCell)},
+};
+
+}  // namespace
+
+std::span<const PacketHandler<ReselectionCandidatesList>> ReselectionCandidatesList::handlers() {
+  static constexpr PacketHandler<ReselectionCandidatesList> table[] = {
+      {reselectionCandidates::logCode, reselectionCandidates::minimumSize,
+       &ReselectionCandidatesList::update},
+  };
+  return table;
+}
+
+void ReselectionCandidatesList::update(const Packet& packet) {
+  clearElementsInArray(list());
+  // Kept: only the count's low byte counts.
+  const std::uint8_t count = packet.u8(countOffset);
+  Array rows;
+  for (std::size_t i = 0; i < count; ++i) {
+    // Kept: records start every 4 bytes and are read further than that, so they overlap.
+    const Packet record = packet.from(reselectionCandidates::minimumSize + recordStride * i);
+    const std::uint16_t type = record.u16(typeOffset);
+    const Cell cell = type < std::size(cells) ? cells[type] : Cell{};
+    if (!record.holds(0, std::max(extent(candidate), cell.size))) continue;
+    Value row = fieldRow(record, candidate);
+    setFields(*row.dictionary(), record, cell.fields);
+    rows.push_back(std::move(row));
+  }
+  replaceArray_With(list(), std::move(rows));
+}
+
+}  // namespace varnel

@@ -1,0 +1,47 @@
+#include "LogGenerator/KLV/UTRAN/RRC_State.h"
+
+#include "platform/Describe.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr std::uint32_t logCode = 0xD0E0;
+constexpr std::size_t expectedSize = 15;
+constexpr std::size_t versionOffset = 13;
+constexpr std::size_t modeOffset = 14;
+constexpr std::uint8_t knownVersion = 1;
+constexpr std::uint8_t unknownMode = 255;
+
+constexpr std::string_view modes[] = {
+    "Disconnected", "Connecting", "Cell Fach", "Cell DCH", "Cell PCH", "Cell URA PCH",
+};
+
+std::uint8_t rrcMode(const Packet& packet) {
+  const bool isKnown = packet.holds(modeOffset, 1) && packet.u8(versionOffset) == knownVersion;
+  return isKnown ? packet.u8(modeOffset) : unknownMode;
+}
+
+}  // namespace
+
+std::span<const PacketHandler<RRC_State>> RRC_State::handlers() {
+  static constexpr PacketHandler<RRC_State> table[] = {
+      {logCode, 0, &RRC_State::update},
+  };
+  return table;
+}
+
+void RRC_State::update(const Packet& packet) {
+  // Kept: a short packet is only warned of, and then decoded as far as it goes.
+  if (packet.size() < expectedSize) {
+    logWarning("LogCode_0xD0E0 is length is %ld expected size %ld", packet.size(), expectedSize);
+  }
+  const std::uint8_t mode = rrcMode(packet);
+  const std::string_view text = mode < std::size(modes) ? modes[mode] : "Unknown RRC Mode";
+  rows().setText("State", text);
+  if (logTakes(logWarningPriority)) {
+    logWarning("Display Dict = %s, rrc mode = %d %s", describe(sectionRef), mode, text);
+  }
+}
+
+}  // namespace varnel

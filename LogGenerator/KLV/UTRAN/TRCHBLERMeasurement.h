@@ -1,0 +1,22 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The block error rates of the transport channels, a row each.
+class TRCHBLERMeasurement final : public SectionDecoder<TRCHBLERMeasurement> {
+ public:
+  static constexpr std::string_view sectionName = "TRCH BLER";
+  static constexpr std::string_view traceLine = "TRCH BLER Measurement";
+  static constexpr int tracePriority = logNoticePriority;
+  static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
+  static std::span<const PacketHandler<TRCHBLERMeasurement>> handlers();
+
+ private:
+  void update(const Packet& packet);
+};
+
+}  // namespace varnel

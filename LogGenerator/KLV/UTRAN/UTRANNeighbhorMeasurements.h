@@ -1,0 +1,21 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The UTRAN neighbour cells, a row each.
+class UTRANNeighbhorMeasurements final : public SectionDecoder<UTRANNeighbhorMeasurements> {
+ public:
+  static constexpr std::string_view sectionName = "Neighbor Cell List";
+  static constexpr std::string_view traceLine = "NeighbhorMeasurements List";
+  static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
+  static std::span<const PacketHandler<UTRANNeighbhorMeasurements>> handlers();
+
+ private:
+  void update(const Packet& packet);
+};
+
+}  // namespace varnel

@@ -1,0 +1,63 @@
+#include "LogGenerator/KLV/UTRAN/UTRANServingCellInfo.h"
+
+#include "LogGenerator/Field.h"
+#include "LogGenerator/KLV/CellMonitor.h"
+#include "platform/TelephonyService.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr std::uint32_t logCode = 0xD0E2;
+constexpr std::size_t minimumSize = 26;
+
+constexpr Choice access[] = {{0, "All Calls"}};
+
+constexpr Field servingCell[] = {
+    {u8(14), "Cell Access Restrictions"},
+    {u32(21), "Cell ID"},
+    {u16(19), "Downlink UARFCN"},
+    {u16(17), "Uplink UARFCN"},
+    {u8(15), "URA ID"},
+    {bits(25, 0, 1), "Allowed Access", choice(access, "Emergency Calls Only")},
+};
+static_assert(within(servingCell, minimumSize));
+
+constexpr CellMonitorRow cellMonitorRows[] = {
+    {cellMonitor::lac, "Local Area Code", "Serving Cell Info: Failed to retrieve LAC\n"},
+    {cellMonitor::cellIdentity, "Cell ID", "Serving Cell Info: Failed to retrieve Cell ID\n"},
+    {cellMonitor::bandInfo, "Freq Band Indicator",
+     "Serving Cell Info: Failed to retrieve Freq Band Indicator\n"},
+    {cellMonitor::scramblingCode, "Cell Scrambling Code",
+     "Serving Cell Info: Failed to retrieve Cell Scrambling Code\n"},
+    {cellMonitor::uarfcn, "Uplink UARFCN", "Serving Cell Info: Failed to retrieve UARFCN\n"},
+};
+
+}  // namespace
+
+std::span<const PacketHandler<UTRANServingCellInfo>> UTRANServingCellInfo::handlers() {
+  static constexpr PacketHandler<UTRANServingCellInfo> table[] = {
+      {logCode, minimumSize, &UTRANServingCellInfo::updateFromModem},
+      {cellMonitorLogCode, 0, &UTRANServingCellInfo::updateFromCellMonitor},
+  };
+  return table;
+}
+
+void UTRANServingCellInfo::updateFromModem(const Packet& packet) { setFields(rows(), packet, servingCell); }
+
+void UTRANServingCellInfo::updateFromCellMonitor(const Packet& packet) {
+  const auto cells = readCellMonitorArray(packet);
+  if (!cells) return;
+  // Every serving cell is shown in turn, so the last one stays.
+  for (const Value& record : *cells->array()) {
+    const Dictionary* cell = cellOfKind(record, cellMonitor::utran, cellMonitor::serving);
+    if (!cell) continue;
+    showCellMonitorRows(rows(), *cell, cellMonitorRows);
+    // Kept: the one channel number goes into both rows.
+    if (const auto channel = cell->get(cellMonitor::uarfcn).int32()) {
+      rows().setText("Downlink UARFCN", std::to_string(*channel));
+    }
+  }
+}
+
+}  // namespace varnel
