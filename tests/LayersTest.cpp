@@ -1,0 +1,104 @@
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace varnel {
+namespace {
+
+namespace fs = std::filesystem;
+
+struct Layer {
+  std::string folder;
+  std::vector<std::string> mayInclude;  // folders of the project
+  bool isCore;                          // knows the standard library only
+};
+
+// Longer folders first: a file belongs to the first layer that its path begins with.
+const std::vector<Layer> layers = {
+    {"platform/host/", {"platform/"}, false},
+    {"platform/", {"platform/"}, true},
+    {"LogGenerator/", {"LogGenerator/", "platform/"}, true},
+    {"model/", {"model/", "LogGenerator/", "platform/"}, true},
+    {"app/", {"app/", "model/", "LogGenerator/", "platform/"}, true},
+    {"programs/", {"programs/", "app/", "model/", "LogGenerator/", "platform/"}, false},
+};
+
+const Layer* layerOf(const std::string& path) {
+  const auto found =
+      std::ranges::find_if(layers, [&](const Layer& layer) { return path.starts_with(layer.folder); });
+  return found == layers.end() ? nullptr : &*found;
+}
+
+bool isProjectPath(const std::string& path) { return layerOf(path) != nullptr; }
+
+bool mayInclude(const Layer& layer, const std::string& path) {
+  const bool isAllowedFolder = std::ranges::any_of(
+      layer.mayInclude, [&](const std::string& folder) { return path.starts_with(folder); });
+  return isAllowedFolder && !(layer.isCore && path.starts_with("platform/host/"));
+}
+
+bool isStandardHeader(const std::string& header) {
+  return std::ranges::all_of(header, [](char c) { return (c >= 'a' && c <= 'z') || c == '_'; });
+}
+
+// What stands between the quotes or brackets of an #include, with the opening one; empty for any other line.
+std::string includedFile(const std::string& line) {
+  constexpr std::string_view directive = "#include ";
+  if (!line.starts_with(directive)) return {};
+  const std::size_t end = line.find_first_of("\">", directive.size() + 1);
+  return line.substr(directive.size(), end - directive.size());
+}
+
+// What is wrong with one line of a file of the layer; nothing when it is fine.
+std::optional<std::string> fault(const Layer& layer, const std::string& line) {
+  const std::string included = includedFile(line);
+  if (included.empty()) return std::nullopt;
+  const std::string header = included.substr(1);
+  if (included.front() == '"') {
+    if (isProjectPath(header) && !mayInclude(layer, header)) return "points up or sideways: " + line;
+    if (layer.isCore && !isProjectPath(header)) return "is no path from the root: " + line;
+    return std::nullopt;
+  }
+  const bool isPropertyListLibrary = layer.folder == "platform/" && header == "plist/plist.h";
+  if (layer.isCore && !isStandardHeader(header) && !isPropertyListLibrary)
+    return "is no standard header: " + line;
+  return std::nullopt;
+}
+
+TEST(Layers, IncludesPointDownwardAndTheCoreKnowsNoToolkit) {
+  const fs::path root = VARNEL_SOURCE_DIR;
+  int filesSeen = 0;
+  for (const char* top : {"platform", "LogGenerator", "model", "app", "programs"}) {
+    for (const auto& entry : fs::recursive_directory_iterator(root / top)) {
+      const std::string extension = entry.path().extension();
+      if (extension != ".h" && extension != ".cpp") continue;
+      ++filesSeen;
+      const std::string path = fs::relative(entry.path(), root);
+      std::ifstream file(entry.path());
+      for (std::string line; std::getline(file, line);) {
+        const auto found = fault(*layerOf(path), line);
+        EXPECT_FALSE(found) << path << ": " << *found;
+      }
+    }
+  }
+  EXPECT_GT(filesSeen, 50);
+}
+
+TEST(Layers, TheRuleSeesWhatBreaksIt) {
+  const Layer& model = *layerOf("model/VarnelModel.h");
+  EXPECT_TRUE(fault(model, "#include \"app/TreeText.h\""));
+  EXPECT_TRUE(fault(model, "#include \"platform/host/HostLog.h\""));
+  EXPECT_TRUE(fault(model, "#include <QString>"));
+  EXPECT_TRUE(fault(model, "#include <plist/plist.h>"));
+  EXPECT_FALSE(fault(model, "#include \"LogGenerator/LogGenerator.h\""));
+  EXPECT_FALSE(fault(model, "#include <memory>"));
+  EXPECT_FALSE(fault(*layerOf("platform/PropertyList.cpp"), "#include <plist/plist.h>"));
+}
+
+}  // namespace
+}  // namespace varnel

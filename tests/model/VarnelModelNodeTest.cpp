@@ -1,0 +1,349 @@
+#include "model/VarnelModelNode.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <cstdlib>
+#include <future>
+
+#include "LogGenerator/ArrayLock.h"
+#include "tests/support/DictionaryOf.h"
+
+namespace varnel {
+namespace {
+
+using testing::ElementsAre;
+using testing::ExitedWithCode;
+using testing::IsEmpty;
+using testing::UnorderedElementsAre;
+
+// NAME=VALUE for a leaf, NAME{CHILD CHILD} for an inner node.
+std::string outline(const VarnelModelNode& node) {
+  if (const std::string* value = node.value()) return node.displayName() + "=" + *value;
+  if (!node.childNodes()) return node.displayName() + " is neither leaf nor inner node";
+  std::string children;
+  for (const auto& child : *node.childNodes()) {
+    if (!children.empty()) children += " ";
+    children += outline(*child);
+  }
+  return node.displayName() + "{" + children + "}";
+}
+
+struct Tree {
+  explicit Tree(const Value& object)
+      : root(VarnelModelNode::makeTreeFromObject_withPathDictionary(object, paths)) {}
+
+  std::string outline() const { return varnel::outline(*root); }
+  // The outline of the node under that path.
+  std::string at(const std::string& path) const {
+    const auto found = paths.find(path);
+    return found == paths.end() ? "nothing at " + path : varnel::outline(*found->second);
+  }
+  std::vector<std::string> allPaths() const {
+    std::vector<std::string> all;
+    for (const auto& [path, node] : paths) all.push_back(path);
+    return all;
+  }
+
+  PathDictionary paths;
+  std::shared_ptr<const VarnelModelNode> root;
+};
+
+TEST(VarnelModelNode, HasANameAndNeitherChildrenNorValue) {
+  const VarnelModelNode node("Name");
+  EXPECT_EQ(node.displayName(), "Name");
+  EXPECT_EQ(node.childNodes(), nullptr);
+  EXPECT_EQ(node.value(), nullptr);
+}
+
+TEST(VarnelModelNode, ALeafHasAValueAndNoChildren) {
+  const VarnelModelLeafNode leaf("RSSI", "-77 dBm");
+  EXPECT_EQ(leaf.displayName(), "RSSI");
+  EXPECT_EQ(*leaf.value(), "-77 dBm");
+  EXPECT_EQ(leaf.childNodes(), nullptr);
+}
+
+TEST(VarnelModelNode, AnInnerNodeHasItsChildrenInOrderAndNoValue) {
+  const auto first = std::make_shared<VarnelModelLeafNode>("A", "1");
+  const auto second = std::make_shared<VarnelModelLeafNode>("B", "2");
+  const VarnelModelTreeNode node("Section", {first, second}, VarnelModelTreeNode::Origin::Dictionary);
+  EXPECT_EQ(node.displayName(), "Section");
+  EXPECT_EQ(node.value(), nullptr);
+  EXPECT_THAT(*node.childNodes(), ElementsAre(first, second));
+}
+
+TEST(DisplayTree, AnAbsentObjectIsALeafNamedVarnelOfUnknownValueAtTheRootPath) {
+  const Tree tree{Value()};
+  EXPECT_EQ(tree.outline(), "Varnel=(unknown)");
+  EXPECT_EQ(tree.allPaths(), std::vector<std::string>{"/"});
+  EXPECT_EQ(tree.paths.at("/"), tree.root);
+}
+
+TEST(DisplayTree, AStringIsALeafNamedVarnel) {
+  const Tree tree{Value("text")};
+  EXPECT_EQ(tree.outline(), "Varnel=text");
+  EXPECT_EQ(tree.allPaths(), std::vector<std::string>{"/"});
+}
+
+TEST(DisplayTree, AnEmptyDictionaryIsAnInnerNodeWithoutChildren) {
+  const Tree tree{dictionaryOf({})};
+  EXPECT_EQ(tree.outline(), "Varnel{}");
+  EXPECT_THAT(*tree.root->childNodes(), IsEmpty());
+  EXPECT_EQ(tree.root->value(), nullptr);
+}
+
+TEST(DisplayTree, AnEmptyArrayIsAnInnerNodeWithoutChildren) {
+  EXPECT_EQ(Tree{Value::ofArray()}.outline(), "Varnel{}");
+}
+
+TEST(DisplayTree, AnEmptyTextIsALeafWithAnEmptyValue) {
+  EXPECT_EQ(Tree{dictionaryOf({{"Name", ""}})}.outline(), "Varnel{Name=}");
+}
+
+TEST(DisplayTree, EverythingButTextsAndContainersHasAnUnknownValue) {
+  const Tree tree{dictionaryOf({{"integer", Value::ofInteger(5)},
+                                {"real", Value::ofReal(0.5)},
+                                {"boolean", Value::ofBoolean(true)},
+                                {"date", Value::ofDate({1, 0})},
+                                {"data", Value::ofData({0x41})}})};
+  EXPECT_EQ(tree.outline(),
+            "Varnel{integer=(unknown) real=(unknown) boolean=(unknown) date=(unknown) data=(unknown)}");
+}
+
+TEST(DisplayTree, ADictionaryKeepsItsOwnOrderOfKeys) {
+  EXPECT_EQ(Tree{dictionaryOf({{"b", "1"}, {"a", "2"}, {"C", "3"}})}.outline(), "Varnel{b=1 a=2 C=3}");
+}
+
+TEST(DisplayTree, WithoutTheMarkerAKeyWithASemicolonIsShownWhole) {
+  const Tree tree{dictionaryOf({{"2;B", "b"}})};
+  EXPECT_EQ(tree.outline(), "Varnel{2;B=b}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/2;B"));
+}
+
+TEST(DisplayTree, TheMarkerSortsKeysByCharactersAndHidesWhatStandsBeforeTheSemicolon) {
+  const Tree tree{dictionaryOf({{"2;B", "b"}, {"10;A", "a"}, {"C", "c"}, {"_sorted", ""}})};
+  EXPECT_EQ(tree.outline(), "Varnel{A=a B=b C=c}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/A", "/B", "/C"));
+  EXPECT_EQ(tree.at("/A"), "A=a");
+  EXPECT_EQ(tree.at("/B"), "B=b");
+  EXPECT_EQ(tree.at("/C"), "C=c");
+}
+
+TEST(DisplayTree, SortingTellsUpperFromLowerCaseAndKnowsNoLanguage) {
+  const Tree tree{
+      dictionaryOf({{"_sorted", ""}, {"\u00e9", "1"}, {"a", "2"}, {"Z", "3"}, {"_", "4"}, {"9", "5"}})};
+  EXPECT_EQ(tree.outline(), "Varnel{9=5 Z=3 _=4 a=2 \u00e9=1}");
+}
+
+TEST(DisplayTree, TheMarkerCountsWhateverItsValue) {
+  EXPECT_EQ(Tree{dictionaryOf({{"_sorted", Value::ofBoolean(false)}, {"b", "1"}, {"a", "2"}})}.outline(),
+            "Varnel{a=2 b=1}");
+  EXPECT_EQ(Tree{dictionaryOf({{"b", "1"}, {"a", "2"}, {"_sorted", Value::ofArray()}})}.outline(),
+            "Varnel{a=2 b=1}");
+}
+
+TEST(DisplayTree, TheMarkerItselfIsNeverShown) {
+  const Tree tree{dictionaryOf({{"_sorted", "yes"}})};
+  EXPECT_EQ(tree.outline(), "Varnel{}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/"));
+}
+
+TEST(DisplayTree, TheMarkerSortsItsOwnDictionaryOnly) {
+  const Tree tree{dictionaryOf({{"_sorted", ""},
+                                {"2;outer", dictionaryOf({{"2;b", "1"}, {"1;a", "2"}})},
+                                {"1;other", dictionaryOf({{"_sorted", ""}, {"2;b", "3"}, {"1;a", "4"}})}})};
+  EXPECT_EQ(tree.outline(), "Varnel{other{a=4 b=3} outer{2;b=1 1;a=2}}");
+}
+
+TEST(DisplayTree, AKeyThatEndsInItsSemicolonShowsAnEmptyName) {
+  const Tree tree{dictionaryOf({{"Section", dictionaryOf({{"_sorted", ""}, {"x;", "1"}})}})};
+  EXPECT_EQ(tree.outline(), "Varnel{Section{=1}}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/Section", "/Section/"));
+  EXPECT_EQ(tree.at("/Section/"), "=1");
+}
+
+TEST(DisplayTree, AKeyThatBeginsWithItsSemicolonShowsWhatFollowsIt) {
+  EXPECT_EQ(Tree{dictionaryOf({{"_sorted", ""}, {";x", "1"}})}.outline(), "Varnel{x=1}");
+  EXPECT_EQ(Tree{dictionaryOf({{"_sorted", ""}, {";", "1"}})}.outline(), "Varnel{=1}");
+}
+
+TEST(DisplayTree, AKeyWithNoSemicolonOrWithTwoOrMoreIsShownWhole) {
+  const Tree tree{dictionaryOf(
+      {{"_sorted", ""}, {"plain", "1"}, {"1;a;b", "2"}, {"2;a;", "3"}, {";;", "4"}, {"3;a;b;c", "5"}})};
+  EXPECT_EQ(tree.outline(), "Varnel{1;a;b=2 2;a;=3 3;a;b;c=5 ;;=4 plain=1}");
+}
+
+TEST(DisplayTree, AnEmptyNameBelowTheRootHasTheRootsPathWhichTheRootTakes) {
+  const Tree tree{dictionaryOf({{"_sorted", ""}, {"1;", "lost"}})};
+  EXPECT_EQ(tree.outline(), "Varnel{=lost}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/"));
+  EXPECT_EQ(tree.paths.at("/"), tree.root);
+}
+
+TEST(DisplayTree, OfTwoNodesWithOnePathBothStayInTheTreeAndTheLaterIsFoundByItsPath) {
+  const Tree tree{dictionaryOf({{"_sorted", ""}, {"1;Same", "first"}, {"2;Same", "second"}})};
+  EXPECT_EQ(tree.outline(), "Varnel{Same=first Same=second}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/Same"));
+  EXPECT_EQ(tree.at("/Same"), "Same=second");
+}
+
+TEST(DisplayTree, BelowTwoNodesWithOnePathTheChildrenOfBothAreFound) {
+  const Tree tree{dictionaryOf({{"_sorted", ""},
+                                {"1;Same", dictionaryOf({{"a", "1"}, {"b", "2"}})},
+                                {"2;Same", dictionaryOf({{"b", "3"}})}})};
+  EXPECT_EQ(tree.at("/Same"), "Same{b=3}");
+  EXPECT_EQ(tree.at("/Same/a"), "a=1");
+  EXPECT_EQ(tree.at("/Same/b"), "b=3");
+}
+
+TEST(DisplayTree, APathJoinsTheParentsAndTheNameByOneSlash) {
+  const Tree tree{dictionaryOf({{"Serving Cell", dictionaryOf({{"RSSI", "-77"}})}})};
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/Serving Cell", "/Serving Cell/RSSI"));
+}
+
+TEST(DisplayTree, ANameMayHoldSlashes) {
+  const Tree tree{dictionaryOf({{"SIM Info", dictionaryOf({{"EF-GPRS/PS-LOCI", "1"}, {"/x/", "2"}})},
+                                {"/root", "3"},
+                                {"ends/", dictionaryOf({{"below", "4"}})}})};
+  EXPECT_EQ(tree.outline(), "Varnel{SIM Info{EF-GPRS/PS-LOCI=1 /x/=2} /root=3 ends/{below=4}}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/SIM Info", "/SIM Info/EF-GPRS/PS-LOCI",
+                                                    "/SIM Info//x/", "//root", "/ends/", "/ends/below"));
+}
+
+TEST(DisplayTree, TheElementsOfAnArrayAreNamedByTheirNumbersFromZero) {
+  const Tree tree{dictionaryOf({{"List", Value::ofArray({"a", "b", "c"})}})};
+  EXPECT_EQ(tree.outline(), "Varnel{List{0=a 1=b 2=c}}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/List", "/List/0", "/List/1", "/List/2"));
+}
+
+TEST(DisplayTree, AnArrayMayBeTheRoot) {
+  const Tree tree{Value::ofArray({"a", "b", "c"})};
+  EXPECT_EQ(tree.outline(), "Varnel{0=a 1=b 2=c}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/0", "/1", "/2"));
+}
+
+TEST(DisplayTree, AnArrayElementThatIsANumberHasAnUnknownValueAndANumberOfItsOwn) {
+  const Tree tree{Value::ofArray({"a", Value::ofInteger(7), "c"})};
+  EXPECT_EQ(tree.outline(), "Varnel{0=a 1=(unknown) 2=c}");
+}
+
+TEST(DisplayTree, AnAbsentArrayElementHasAnUnknownValueAndANumberOfItsOwn) {
+  const Tree tree{Value::ofArray({"a", Value(), "c"})};
+  EXPECT_EQ(tree.outline(), "Varnel{0=a 1=(unknown) 2=c}");
+}
+
+TEST(DisplayTree, ElementsAreNumberedInDecimal) {
+  const Tree tree{Value::ofArray(Array(11, Value("x")))};
+  EXPECT_EQ(tree.root->childNodes()->back()->displayName(), "10");
+  EXPECT_EQ(tree.at("/10"), "10=x");
+}
+
+TEST(DisplayTree, RowsOfAListAreInnerNodesUnderTheirNumbers) {
+  const Tree tree{
+      dictionaryOf({{"Cells", Value::ofArray({dictionaryOf({{"ID", "1"}}), dictionaryOf({{"ID", "2"}})})}})};
+  EXPECT_EQ(tree.outline(), "Varnel{Cells{0{ID=1} 1{ID=2}}}");
+  EXPECT_THAT(tree.allPaths(),
+              UnorderedElementsAre("/", "/Cells", "/Cells/0", "/Cells/0/ID", "/Cells/1", "/Cells/1/ID"));
+}
+
+TEST(DisplayTree, InnerNodesRememberWhatTheyWereMadeFrom) {
+  const Tree tree{dictionaryOf({{"List", Value::ofArray()}})};
+  const auto origin = [&](const std::string& path) {
+    return dynamic_cast<const VarnelModelTreeNode&>(*tree.paths.at(path)).origin();
+  };
+  EXPECT_EQ(origin("/"), VarnelModelTreeNode::Origin::Dictionary);
+  EXPECT_EQ(origin("/List"), VarnelModelTreeNode::Origin::Array);
+}
+
+TEST(DisplayTree, ThePathDictionarySharesEveryNodeWithTheTree) {
+  const Tree tree{dictionaryOf({{"Section", dictionaryOf({{"Row", "1"}})}, {"List", Value::ofArray({"a"})}})};
+  ASSERT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/Section", "/Section/Row", "/List", "/List/0"));
+  const auto& sections = *tree.root->childNodes();
+  EXPECT_EQ(tree.paths.at("/"), tree.root);
+  EXPECT_EQ(tree.paths.at("/Section"), sections[0]);
+  EXPECT_EQ(tree.paths.at("/Section/Row"), sections[0]->childNodes()->front());
+  EXPECT_EQ(tree.paths.at("/List"), sections[1]);
+  EXPECT_EQ(tree.paths.at("/List/0"), sections[1]->childNodes()->front());
+}
+
+TEST(DisplayTree, ATreeStaysAsItWasBuilt) {
+  const Value rows = dictionaryOf({{"Row", "before"}});
+  const Value list = Value::ofArray({"a"});
+  const Tree tree{dictionaryOf({{"Section", rows}, {"List", list}})};
+  rows.dictionary()->setText("Row", "after");
+  rows.dictionary()->set("Another", "row");
+  list.array()->clear();
+  EXPECT_EQ(tree.outline(), "Varnel{Section{Row=before} List{0=a}}");
+}
+
+TEST(DisplayTree, NodesLiveOnInThePathDictionary) {
+  Tree tree{dictionaryOf({{"Row", "1"}})};
+  tree.root.reset();
+  EXPECT_EQ(tree.at("/"), "Varnel{Row=1}");
+  EXPECT_EQ(tree.at("/Row"), "Row=1");
+}
+
+TEST(ChildPath, JoinsByASlashUnlessTheParentEndsInOne) {
+  EXPECT_EQ(childPath("/", "Serving Cell"), "/Serving Cell");
+  EXPECT_EQ(childPath("/Serving Cell", "RSSI"), "/Serving Cell/RSSI");
+  EXPECT_EQ(childPath("/ends/", "below"), "/ends/below");
+  EXPECT_EQ(childPath("/a", ""), "/a/");
+  EXPECT_EQ(childPath("/", "/"), "//");
+}
+
+// Whether the thread that runs the task still waits for something.
+template <class Task>
+bool isStuck(std::future<Task>& task) {
+  return task.wait_for(std::chrono::milliseconds(100)) == std::future_status::timeout;
+}
+
+// A process of its own for what it does to the process-wide lock.
+class DisplayTreeArrayLockDeathTest : public testing::Test {
+ protected:
+  DisplayTreeArrayLockDeathTest() { testing::FLAGS_gtest_death_test_style = "threadsafe"; }
+};
+
+[[noreturn]] void exitWith(bool success) { std::_Exit(success ? 0 : 1); }
+
+[[noreturn]] void buildWhileTheLockIsHeld(const Value& object, bool isHeldUp) {
+  ArrayLock::lockArray();
+  std::future<std::string> outline = std::async(std::launch::async, [&] { return Tree{object}.outline(); });
+  const bool wasHeldUp = isStuck(outline);
+  ArrayLock::unlockArray();
+  outline.wait();
+  exitWith(wasHeldUp == isHeldUp);
+}
+
+[[noreturn]] void lockAfterBuilding(const Value& object, bool isHeldUp) {
+  const Tree tree{object};
+  std::future<void> locking = std::async(std::launch::async, [] { ArrayLock::Scope lock; });
+  exitWith(isStuck(locking) == isHeldUp);
+}
+
+TEST_F(DisplayTreeArrayLockDeathTest, AWalkOverAnArrayWaitsForTheLock) {
+  EXPECT_EXIT(buildWhileTheLockIsHeld(Value::ofArray({"a"}), true), ExitedWithCode(0), "");
+}
+
+TEST_F(DisplayTreeArrayLockDeathTest, DictionariesNeedNoLock) {
+  EXPECT_EXIT(buildWhileTheLockIsHeld(dictionaryOf({{"Row", "1"}}), false), ExitedWithCode(0), "");
+}
+
+TEST_F(DisplayTreeArrayLockDeathTest, TheLockIsFreeAfterArraysSideBySide) {
+  EXPECT_EXIT(
+      lockAfterBuilding(dictionaryOf({{"A", Value::ofArray({"a"})}, {"B", Value::ofArray({"b"})}}), false),
+      ExitedWithCode(0), "");
+}
+
+TEST_F(DisplayTreeArrayLockDeathTest, ArraysWithinArraysNestTheLockWhichTheThreadThenKeeps) {
+  EXPECT_EXIT(lockAfterBuilding(Value::ofArray({Value::ofArray({"a"})}), true), ExitedWithCode(0), "");
+}
+
+TEST(DisplayTree, ArraysWithinArraysAreWalkedWhole) {
+  const Tree tree{Value::ofArray({Value::ofArray({"a", "b"}), "c", Value::ofArray({Value::ofArray({"d"})})})};
+  EXPECT_EQ(tree.outline(), "Varnel{0{0=a 1=b} 1=c 2{0{0=d}}}");
+  EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/0", "/0/0", "/0/1", "/1", "/2", "/2/0", "/2/0/0"));
+}
+
+}  // namespace
+}  // namespace varnel

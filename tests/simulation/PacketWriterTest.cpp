@@ -1,0 +1,38 @@
+#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
+
+#include <gtest/gtest.h>
+
+#include <stdexcept>
+
+namespace varnel::simulation {
+namespace {
+
+using namespace std::chrono_literals;
+
+TEST(PacketWriter, TheHeaderHasThirteenBytes) {
+  EXPECT_EQ(PacketWriter(PacketWriter::LogType::Modem, 0xB0C2, 1027ms, 15).finish(),
+            (Bytes{1, 14, 0, 0xC2, 0xB0, 3, 4, 0, 0, 0, 0, 0, 0, 0, 0}));
+}
+
+TEST(PacketWriter, NumbersAreLittleEndianAtOffsetsFromTheStart) {
+  const Bytes packet = PacketWriter(PacketWriter::LogType::Modem, 0, 0ms, 21)
+                           .u8(13, 0x11)
+                           .u16(14, 0x2233)
+                           .u32(16, 0x44556677)
+                           .u8(20, -1)
+                           .finish();
+  EXPECT_EQ(Bytes(packet.begin() + 13, packet.end()),
+            (Bytes{0x11, 0x33, 0x22, 0x77, 0x66, 0x55, 0x44, 0xFF}));
+}
+
+TEST(PacketWriter, NothingIsWrittenPastTheEnd) {
+  PacketWriter writer(PacketWriter::LogType::Modem, 0, 0ms, 14);
+  EXPECT_THROW(writer.u16(13, 1), std::out_of_range);
+}
+
+TEST(PacketWriter, AServerMessageIsAHeaderAndItsPayload) {
+  EXPECT_EQ(serverMessage(2, 0ms, Bytes{7, 8}), (Bytes{0xFF, 14, 0, 2, 0, 0, 0, 0, 0, 0, 0, 0, 0, 7, 8}));
+}
+
+}  // namespace
+}  // namespace varnel::simulation

@@ -1,0 +1,56 @@
+#pragma once
+
+#include <QCoreApplication>
+#include <QThread>
+#include <atomic>
+#include <chrono>
+#include <functional>
+#include <memory>
+
+namespace varnel {
+
+/// Runs the calling thread's event loop until the condition holds; false when it does not within the time.
+inline bool runUntil(const std::function<bool()>& condition,
+                     std::chrono::milliseconds within = std::chrono::seconds(10)) {
+  const auto deadline = std::chrono::steady_clock::now() + within;
+  while (!condition()) {
+    if (std::chrono::steady_clock::now() > deadline) return false;
+    QCoreApplication::processEvents(QEventLoop::AllEvents, 5);
+    QThread::usleep(200);
+  }
+  return true;
+}
+
+/// Runs the event loop for that long.
+inline void runFor(std::chrono::milliseconds duration) {
+  runUntil([] { return false; }, duration);
+}
+
+/// A peer with an event loop of its own, as another process has one.
+class PeerThread {
+ public:
+  /// Sets the peer up on its thread, runs the event loop there, and at the end destroys what the function
+  /// returned. The caller's event loop runs until the peer is set up.
+  explicit PeerThread(std::function<std::shared_ptr<void>()> setUp)
+      : _thread(QThread::create([this, setUp = std::move(setUp)] {
+          const auto peer = setUp();
+          _isReady = true;
+          runUntil([this] { return _isEnding.load(); }, std::chrono::minutes(1));
+        })) {
+    _thread->start();
+    runUntil([this] { return _isReady.load(); });
+  }
+  PeerThread(const PeerThread&) = delete;
+  PeerThread& operator=(const PeerThread&) = delete;
+  ~PeerThread() {
+    _isEnding = true;
+    _thread->wait();
+  }
+
+ private:
+  std::atomic<bool> _isReady = false;
+  std::atomic<bool> _isEnding = false;
+  std::unique_ptr<QThread> _thread;
+};
+
+}  // namespace varnel

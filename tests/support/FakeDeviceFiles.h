@@ -1,0 +1,32 @@
+#pragma once
+
+#include <set>
+#include <string>
+#include <vector>
+
+#include "platform/DeviceFiles.h"
+
+namespace varnel {
+
+/// A device whose files exist in memory only.
+class FakeDeviceFiles final : public DeviceFiles {
+ public:
+  struct Write {
+    std::string path;
+    Value list;
+  };
+
+  /// The paths at which something stands.
+  std::set<std::string> existing;
+  bool refusesWrites = false;
+  /// Every attempt to write, the oldest first, refused ones included.
+  std::vector<Write> writes;
+
+  bool exists(const std::string& path) const override { return existing.contains(path); }
+  bool writePropertyList(const Value& list, const std::string& path) override {
+    writes.push_back({path, list});
+    return !refusesWrites;
+  }
+};
+
+}  // namespace varnel

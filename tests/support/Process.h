@@ -1,0 +1,106 @@
+#pragma once
+
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <csignal>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <string>
+#include <thread>
+#include <vector>
+
+namespace varnel {
+
+/// A folder of its own that goes with the test.
+class TemporaryFolder {
+ public:
+  TemporaryFolder() {
+    std::string name = (std::filesystem::temp_directory_path() / "varnel-test-XXXXXX").string();
+    if (!::mkdtemp(name.data())) ADD_FAILURE() << "no temporary folder";
+    _path = name;
+  }
+  ~TemporaryFolder() {
+    std::error_code ignored;
+    std::filesystem::remove_all(_path, ignored);
+  }
+  TemporaryFolder(const TemporaryFolder&) = delete;
+  TemporaryFolder& operator=(const TemporaryFolder&) = delete;
+
+  const std::filesystem::path& path() const { return _path; }
+  std::string file(const std::string& name) const { return (_path / name).string(); }
+
+ private:
+  std::filesystem::path _path;
+};
+
+inline std::string contentsOf(const std::string& path) {
+  std::ifstream file(path, std::ios::binary);
+  return std::string(std::istreambuf_iterator<char>(file), {});
+}
+
+/// Waits until the condition holds; false when it does not within the time.
+template <class Condition>
+bool eventually(Condition condition, std::chrono::milliseconds within = std::chrono::seconds(20)) {
+  const auto deadline = std::chrono::steady_clock::now() + within;
+  while (!condition()) {
+    if (std::chrono::steady_clock::now() > deadline) return false;
+    std::this_thread::sleep_for(std::chrono::milliseconds(10));
+  }
+  return true;
+}
+
+/// A real program, its standard output and error in files. It is killed when the object goes.
+class Process {
+ public:
+  Process(const std::string& program, std::vector<std::string> arguments) {
+    arguments.insert(arguments.begin(), program);
+    std::vector<char*> pointers;
+    pointers.reserve(arguments.size() + 1);
+    for (std::string& argument : arguments) pointers.push_back(argument.data());
+    pointers.push_back(nullptr);
+    const std::string outputPath = _folder.file("output"), errorPath = _folder.file("error");
+    _id = ::fork();
+    if (_id != 0) return;
+    const int in = ::open("/dev/null", O_RDONLY);
+    const int out = ::open(outputPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
+    const int error = ::open(errorPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
+    ::dup2(in, STDIN_FILENO);
+    ::dup2(out, STDOUT_FILENO);
+    ::dup2(error, STDERR_FILENO);
+    ::execv(program.c_str(), pointers.data());
+    ::_exit(127);
+  }
+  ~Process() {
+    if (_hasEnded) return;
+    signal(SIGKILL);
+    ::waitpid(_id, &_status, 0);
+  }
+  Process(const Process&) = delete;
+  Process& operator=(const Process&) = delete;
+
+  void signal(int number) const { ::kill(_id, number); }
+
+  /// True when the program ends by itself within the time.
+  bool waitForEnd(std::chrono::milliseconds within = std::chrono::seconds(30)) {
+    return eventually([this] { return _hasEnded || (_hasEnded = ::waitpid(_id, &_status, WNOHANG) == _id); },
+                      within);
+  }
+  /// The exit status of a program that has ended by itself; minus the signal that ended it otherwise.
+  int exitStatus() const { return WIFEXITED(_status) ? WEXITSTATUS(_status) : -WTERMSIG(_status); }
+
+  std::string output() const { return contentsOf(_folder.file("output")); }
+  std::string error() const { return contentsOf(_folder.file("error")); }
+
+ private:
+  TemporaryFolder _folder;
+  pid_t _id = -1;
+  int _status = 0;
+  bool _hasEnded = false;
+};
+
+}  // namespace varnel

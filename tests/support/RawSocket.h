@@ -1,0 +1,85 @@
+#pragma once
+
+#include <gtest/gtest.h>
+#include <poll.h>
+#include <sys/socket.h>
+#include <sys/un.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <cstring>
+#include <string>
+
+#include "platform/Bytes.h"
+
+namespace varnel {
+
+/// A local socket without any manners: its bytes are the test's.
+class RawSocket {
+ public:
+  /// Connects to the socket at the path.
+  static RawSocket connectedTo(const std::string& path) {
+    RawSocket socket(::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0));
+    const sockaddr_un address = addressOf(path);
+    if (::connect(socket._descriptor, reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0)
+      ADD_FAILURE() << "cannot connect to " << path << ": " << std::strerror(errno);
+    return socket;
+  }
+  /// Listens at the path; connections are taken with `accept`.
+  static RawSocket listeningAt(const std::string& path) { return boundTo(path, SOCK_STREAM); }
+  /// Receives datagrams at the path, as many as the kernel keeps.
+  static RawSocket receivingAt(const std::string& path) { return boundTo(path, SOCK_DGRAM); }
+
+  RawSocket(RawSocket&& other) noexcept : _descriptor(std::exchange(other._descriptor, -1)) {}
+  RawSocket& operator=(RawSocket&&) = delete;
+  ~RawSocket() { close(); }
+
+  RawSocket accept() const { return RawSocket(::accept4(_descriptor, nullptr, nullptr, SOCK_CLOEXEC)); }
+  void close() {
+    if (_descriptor >= 0) ::close(std::exchange(_descriptor, -1));
+  }
+
+  bool send(ByteView bytes) const {
+    while (!bytes.empty()) {
+      const ssize_t sent = ::send(_descriptor, bytes.data(), bytes.size(), MSG_NOSIGNAL);
+      if (sent < 0) return false;
+      bytes = bytes.subspan(static_cast<std::size_t>(sent));
+    }
+    return true;
+  }
+  /// Whatever arrives next within the time; empty when nothing does or the peer has gone.
+  Bytes receive(std::chrono::milliseconds within = std::chrono::seconds(5)) const {
+    Bytes bytes(65536);
+    const ssize_t count = waits(within) ? ::recv(_descriptor, bytes.data(), bytes.size(), 0) : ssize_t{0};
+    bytes.resize(count > 0 ? static_cast<std::size_t>(count) : 0);
+    return bytes;
+  }
+  /// True when there is something to receive, the peer's end included, within the time.
+  bool waits(std::chrono::milliseconds within) const {
+    pollfd socket{_descriptor, POLLIN, 0};
+    return ::poll(&socket, 1, static_cast<int>(within.count())) > 0;
+  }
+
+ private:
+  explicit RawSocket(int descriptor) : _descriptor(descriptor) {}
+
+  static RawSocket boundTo(const std::string& path, int type) {
+    RawSocket socket(::socket(AF_UNIX, type | SOCK_CLOEXEC, 0));
+    const sockaddr_un address = addressOf(path);
+    if (::bind(socket._descriptor, reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0)
+      ADD_FAILURE() << "cannot bind to " << path << ": " << std::strerror(errno);
+    if (type == SOCK_STREAM) ::listen(socket._descriptor, 10);
+    return socket;
+  }
+
+  static sockaddr_un addressOf(const std::string& path) {
+    sockaddr_un address{};
+    address.sun_family = AF_UNIX;
+    path.copy(address.sun_path, sizeof address.sun_path - 1);
+    return address;
+  }
+
+  int _descriptor;
+};
+
+}  // namespace varnel

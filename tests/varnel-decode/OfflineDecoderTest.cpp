@@ -1,0 +1,211 @@
+#include "programs/varnel-decode/OfflineDecoder.h"
+
+#include <gmock/gmock.h>
+
+#include <csignal>
+#include <cstdint>
+#include <cstdlib>
+#include <limits>
+#include <ostream>
+#include <string>
+#include <vector>
+
+#include "platform/ApplicationInfo.h"
+
+namespace varnel {
+
+namespace {
+
+using ::testing::ElementsAre;
+
+struct NoResources final : Resources {
+  Value propertyList(std::string_view /*name*/) const override { return {}; }
+  std::vector<std::string> propertyListPaths() const override { return {}; }
+};
+
+std::string text(Time time) {
+  std::string nanoseconds = std::to_string(time.nanoseconds);
+  nanoseconds.insert(0, 9 - nanoseconds.size(), '0');
+  return std::to_string(time.seconds) + "." + nanoseconds;
+}
+
+// Notes every call with the time that the clock shows; keeps a history, so that its dates can be seen.
+class RecordingGenerator final : public LogGenerator {
+ public:
+  explicit RecordingGenerator(const Services& services) : LogGenerator(services) {}
+
+  void updateState_withData(Dictionary& state, ByteView data) override {
+    const std::string message(data.begin(), data.end());
+    if (message == "raise") throw ArrayOutOfBounds();
+    calls.push_back("message " + message + " at " + text(services().clock.now()));
+    state.set("DisplayState", message);
+    state.set("Display", Value::ofDictionary());
+    state.set("ExtraInfo", Value::ofDictionary());
+  }
+  Value generateLogUsingState(Dictionary& state) override {
+    calls.push_back("display at " + text(services().clock.now()));
+    updateHistoryInState(state);
+    return Value("display " + std::to_string(++displays));
+  }
+  Value getStartCommand() const override { return {}; }
+  Value getSaveContentsFromState(const Dictionary& state) const override { return state.get("History"); }
+
+  struct ArrayOutOfBounds {};
+  std::vector<std::string> calls;
+  int displays = 0;
+};
+
+class OfflineDecoderTest : public ::testing::Test {
+ protected:
+  void deliver(Time time, std::string_view message = "m") {
+    decoder.deliver(time, {reinterpret_cast<const std::uint8_t*>(message.data()), message.size()});
+  }
+
+  CaptureClock clock;
+  NoResources resources;
+  ApplicationInfo application;
+  std::ostream nowhere{nullptr};
+  RecordingGenerator generator{{resources, clock, application, nowhere}};
+  OfflineDecoder decoder{generator, clock};
+};
+
+constexpr std::int64_t earliest = std::numeric_limits<std::int64_t>::min();
+constexpr std::int64_t latest = std::numeric_limits<std::int64_t>::max();
+
+TEST_F(OfflineDecoderTest, WithoutARecordOneDisplayIsGeneratedIn1970) {
+  EXPECT_EQ(*decoder.finish().string(), "display 1");
+  EXPECT_THAT(generator.calls, ElementsAre("display at 0.000000000"));
+}
+
+TEST_F(OfflineDecoderTest, ARecordIsDeliveredAtItsOwnTimeAndTheLastDisplayGeneratedThen) {
+  deliver({100, 5}, "a");
+  decoder.finish();
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000005", "display at 100.000000005"));
+}
+
+TEST_F(OfflineDecoderTest, ATickFiresTwoSecondsAfterTheFirstRecord) {
+  deliver({100, 250}, "a");
+  deliver({103, 0}, "b");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000250", "display at 102.000000250",
+                                           "message b at 103.000000000"));
+}
+
+TEST_F(OfflineDecoderTest, ATickAtTheRecordsVeryTimeFiresBeforeIt) {
+  deliver({100, 250}, "a");
+  deliver({102, 250}, "b");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000250", "display at 102.000000250",
+                                           "message b at 102.000000250"));
+}
+
+TEST_F(OfflineDecoderTest, ATickOneNanosecondAfterTheRecordDoesNotFire) {
+  deliver({100, 250}, "a");
+  deliver({102, 249}, "b");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000250", "message b at 102.000000249"));
+}
+
+TEST_F(OfflineDecoderTest, TicksKeepTheGridOfTheFirstRecord) {
+  deliver({100, 0}, "a");
+  deliver({103, 900'000'000}, "b");
+  deliver({104, 0}, "c");
+  decoder.finish();
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000000", "display at 102.000000000",
+                                           "message b at 103.900000000", "display at 104.000000000",
+                                           "message c at 104.000000000", "display at 104.000000000"));
+}
+
+TEST_F(OfflineDecoderTest, OnlyTheFirstOfSeveralDueTicksFindsAMessage) {
+  deliver({100, 0}, "a");
+  deliver({111, 0}, "b");
+  deliver({112, 0}, "c");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000000", "display at 102.000000000",
+                                           "message b at 111.000000000", "display at 112.000000000",
+                                           "message c at 112.000000000"));
+}
+
+TEST_F(OfflineDecoderTest, RecordsOfOneTimeAreOneInterval) {
+  deliver({100, 0}, "a");
+  deliver({100, 0}, "b");
+  decoder.finish();
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000000", "message b at 100.000000000",
+                                           "display at 100.000000000"));
+}
+
+TEST_F(OfflineDecoderTest, ATickFiresOnceEvenWhenTimeGoesBack) {
+  deliver({100, 0}, "a");
+  deliver({105, 0}, "b");
+  deliver({99, 0}, "c");
+  deliver({105, 999'999'999}, "d");
+  deliver({106, 0}, "e");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000000", "display at 102.000000000",
+                                           "message b at 105.000000000", "message c at 99.000000000",
+                                           "message d at 105.999999999", "display at 106.000000000",
+                                           "message e at 106.000000000"));
+}
+
+TEST_F(OfflineDecoderTest, TimesFromEndToEndOfTheCalendarAreOneStep) {
+  deliver({earliest, 1}, "a");
+  deliver({latest, 0}, "b");
+  deliver({latest, 2}, "c");
+  decoder.finish();
+  EXPECT_THAT(
+      generator.calls,
+      ElementsAre("message a at -9223372036854775808.000000001", "display at -9223372036854775806.000000001",
+                  "message b at 9223372036854775807.000000000", "message c at 9223372036854775807.000000002",
+                  "display at 9223372036854775807.000000002"));
+}
+
+TEST_F(OfflineDecoderTest, NoTickFiresBeforeTheFirstRecord) {
+  deliver({latest, 0}, "a");
+  deliver({earliest, 0}, "b");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 9223372036854775807.000000000",
+                                           "message b at -9223372036854775808.000000000"));
+}
+
+TEST_F(OfflineDecoderTest, TheLastDisplayIsTheOneReturned) {
+  deliver({100, 0});
+  deliver({102, 0});
+  deliver({104, 0});
+  EXPECT_EQ(*decoder.finish().string(), "display 3");
+}
+
+TEST_F(OfflineDecoderTest, HistoryRecordsCarryTheTimesOfTheirTicksAndOfTheLastRecord) {
+  deliver({1709301909, 500'000'000});  // 2024-03-01 14:05:09.5
+  deliver({1709301914, 0});
+  decoder.finish();
+  const Value contents = decoder.saveContents();
+  ASSERT_TRUE(contents.array());
+  ASSERT_EQ(contents.array()->size(), 2u);
+  EXPECT_EQ(*(*contents.array())[0].dictionary()->get("Date").string(), "2024-03-01 14:05:11 +0000");
+  EXPECT_EQ(*(*contents.array())[1].dictionary()->get("Date").string(), "2024-03-01 14:05:14 +0000");
+}
+
+TEST_F(OfflineDecoderTest, TheCaptureClocksZoneIsUTCWithoutDaylightTime) {
+  deliver({1720000000, 0});  // in July
+  EXPECT_EQ(clock.zoneAt(clock.now()).offsetSeconds, 0);
+  EXPECT_FALSE(clock.zoneAt(clock.now()).daylight);
+}
+
+TEST_F(OfflineDecoderTest, AMessageIsHandedOverByteForByte) {
+  deliver({100, 0}, std::string_view("\0\xFF\n", 3));
+  deliver({100, 0}, "");
+  EXPECT_THAT(generator.calls,
+              ElementsAre(std::string("message \0\xFF\n at 100.000000000", 28), "message  at 100.000000000"));
+}
+
+using OfflineDecoderDeathTest = OfflineDecoderTest;
+
+TEST_F(OfflineDecoderDeathTest, AnExceptionOfADecoderEndsTheProgram) {
+  GTEST_FLAG_SET(death_test_style, "threadsafe");
+  const auto deliverAndCatch = [this] {
+    try {
+      deliver({100, 0}, "raise");
+    } catch (...) {
+      std::exit(0);
+    }
+  };
+  EXPECT_EXIT(deliverAndCatch(), ::testing::KilledBySignal(SIGABRT), "");
+}
+
+}  // namespace
+
+}  // namespace varnel

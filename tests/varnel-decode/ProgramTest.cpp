@@ -1,0 +1,406 @@
+#include <gmock/gmock.h>
+#include <sys/stat.h>
+
+#include <algorithm>
+#include <csignal>
+#include <cstdint>
+#include <filesystem>
+#include <fstream>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "platform/Dictionary.h"
+#include "platform/PropertyList.h"
+#include "tests/support/Process.h"
+
+// The whole program, run on captures that are written here byte by byte.
+
+namespace varnel {
+
+namespace {
+
+using ::testing::HasSubstr;
+using ::testing::Not;
+using ::testing::StartsWith;
+
+std::string littleEndian(std::uint64_t number, int bytes) {
+  std::string text;
+  for (int i = 0; i < bytes; ++i) text += static_cast<char>(number >> (8 * i) & 0xFF);
+  return text;
+}
+
+constexpr std::uint32_t user0 = 147;
+constexpr std::uint32_t ethernet = 1;
+
+// pcap with nanoseconds.
+std::string pcapHeader(std::uint32_t linkType = user0) {
+  return littleEndian(0xA1B23C4D, 4) + littleEndian(2, 2) + littleEndian(4, 2) + littleEndian(0, 8) +
+         littleEndian(262144, 4) + littleEndian(linkType, 4);
+}
+
+std::string pcapRecord(std::uint32_t seconds, std::uint32_t nanoseconds, const std::string& message) {
+  return littleEndian(seconds, 4) + littleEndian(nanoseconds, 4) + littleEndian(message.size(), 4) +
+         littleEndian(message.size(), 4) + message;
+}
+
+std::string pcapngBlock(std::uint32_t type, std::string body) {
+  body.resize((body.size() + 3) / 4 * 4);
+  const std::string length = littleEndian(12 + body.size(), 4);
+  return littleEndian(type, 4) + length + body + length;
+}
+
+std::string packet(std::uint8_t logType, std::uint16_t logCode, const std::string& payload) {
+  return littleEndian(logType, 1) + littleEndian(13 + payload.size(), 2) + littleEndian(logCode, 2) +
+         littleEndian(0, 8) + payload;
+}
+
+// 22 bytes, the number of antennas at offset 20.
+std::string antennas(char count) { return packet(1, 0xB0C1, std::string(7, '\0') + count + '\0'); }
+
+std::string list(const std::string& content) { return "<plist version=\"1.0\">" + content + "</plist>"; }
+std::string simFiles(const std::string& content) { return packet(0xFF, 0, list(content)); }
+std::string pdpContexts(const std::string& content) { return packet(0xFF, 2, list(content)); }
+
+constexpr std::uint32_t afternoon = 1709301909;  // 2024-03-01 14:05:09 UTC
+
+std::size_t linesOf(const std::string& text) {
+  return static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
+}
+
+Value readList(std::string_view text) {
+  const auto* bytes = reinterpret_cast<const std::uint8_t*>(text.data());
+  const auto list = readPropertyList({bytes, text.size()}, fileLimits);
+  return list ? *list : Value();
+}
+
+class DecodeProgram : public ::testing::Test {
+ protected:
+  struct Result {
+    int status;
+    std::string output;
+    std::string error;
+  };
+
+  static Result finish(Process& process) {
+    EXPECT_TRUE(process.waitForEnd());
+    return {process.exitStatus(), process.output(), process.error()};
+  }
+
+  static Result run(std::vector<std::string> arguments) {
+    Process process(VARNEL_DECODE_PROGRAM, std::move(arguments));
+    return finish(process);
+  }
+
+  // The program by a shell, which redirects what follows.
+  static Result runInShell(const std::string& rest) {
+    Process process("/bin/sh", {"-c", "exec " VARNEL_DECODE_PROGRAM " --technology kalvi-lte " + rest});
+    return finish(process);
+  }
+
+  std::string write(const std::string& name, const std::string& contents) const {
+    const std::string path = folder.file(name);
+    std::ofstream(path, std::ios::binary) << contents;
+    return path;
+  }
+
+  Result decode(const std::string& capture, std::vector<std::string> options = {}) const {
+    options.insert(options.begin(), {"--technology", "kalvi-lte"});
+    options.push_back(write("capture", capture));
+    return run(options);
+  }
+
+  TemporaryFolder folder;
+};
+
+TEST_F(DecodeProgram, PathsShowsEachNodeOnALine) {
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)), {"--format", "paths"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_THAT(result.output, StartsWith("/\n"));
+  EXPECT_THAT(result.output, HasSubstr("\n/Serving Cell Info\n"));
+  EXPECT_THAT(result.output, HasSubstr("\n/Serving Cell Info/Num Tx Antennas\t2\n"));
+  EXPECT_THAT(result.output, HasSubstr("\n/PDP Context Info\n"));
+}
+
+TEST_F(DecodeProgram, TextIsTheDefault) {
+  const std::string capture = pcapHeader() + pcapRecord(afternoon, 0, antennas(2));
+  const Result result = decode(capture);
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_THAT(result.output, HasSubstr("\n  Num Tx Antennas"));
+  EXPECT_EQ(result.output, decode(capture, {"--format", "text"}).output);
+}
+
+TEST_F(DecodeProgram, JsonIsOneLineWithArraysAndUnknownLeaves) {
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)) +
+                                   pcapRecord(afternoon, 0,
+                                              pdpContexts("<array><string>x</string><dict><key>A"
+                                                          "</key><integer>1</integer></dict></array>")),
+                               {"--format", "json"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_EQ(linesOf(result.output), 1u) << result.output;
+  EXPECT_THAT(result.output, HasSubstr(R"("Num Tx Antennas":"2")"));
+  EXPECT_THAT(result.output, HasSubstr(R"json("PDP Context Info":["x",{"A":"(unknown)"}])json"));
+}
+
+TEST_F(DecodeProgram, PropertyListKeepsEveryKindOfValue) {
+  const Result result = decode(
+      pcapHeader() + pcapRecord(afternoon, 0, pdpContexts("<array><integer>7</integer><true/></array>")) +
+          pcapRecord(afternoon, 0, simFiles("<dict><key>kSimFile_ICCID</key><data>AQI=</data></dict>")),
+      {"--format", "plist"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  const Value list = readList(result.output);
+  const Dictionary* display = list.dictionary();
+  ASSERT_TRUE(display) << result.output;
+  const Array* contexts = display->get("PDP Context Info").array();
+  ASSERT_TRUE(contexts) << result.output;
+  ASSERT_EQ(contexts->size(), 2u);
+  EXPECT_EQ((*contexts)[0].integer(), 7);
+  EXPECT_EQ((*contexts)[1].boolean(), true);
+  const Dictionary* sim = display->get("SIM Info").dictionary();
+  ASSERT_TRUE(sim) << result.output;
+  ASSERT_TRUE(sim->get("EF-ICCID").data()) << result.output;
+  EXPECT_EQ(*sim->get("EF-ICCID").data(), (Bytes{1, 2}));
+}
+
+TEST_F(DecodeProgram, ACaptureWithoutRecordsHasNoDisplay) {
+  EXPECT_EQ(decode(pcapHeader(), {"--format", "paths"}).output, "/\t(unknown)\n");
+  EXPECT_EQ(decode(pcapHeader(), {"--format", "json"}).output, "\"(unknown)\"\n");
+  EXPECT_EQ(decode(pcapHeader(), {"--format", "text"}).output, "(unknown)\n");
+  EXPECT_EQ(decode(pcapHeader(), {"--format", "plist"}).output, "");
+  EXPECT_EQ(decode(pcapHeader()).status, 0);
+}
+
+TEST_F(DecodeProgram, ADisplayThatNoPropertyListHoldsIsAnError) {
+  // The binary list {"kSimFile_ICCID": U+0001}.
+  const std::string sim = std::string("bplist00", 8) + "\xD1\x01\x02" + "\x5E" + "kSimFile_ICCID" +
+                          "\x51\x01" + std::string("\x08\x0B\x1A", 3) + std::string(6, '\0') + "\x01\x01" +
+                          std::string("\0\0\0\0\0\0\0\3\0\0\0\0\0\0\0\0\0\0\0\0\0\0\0\x1C", 24);
+  const std::string capture = pcapHeader() + pcapRecord(afternoon, 0, packet(0xFF, 0, sim));
+  EXPECT_THAT(decode(capture, {"--format", "json"}).output, HasSubstr(R"("EF-ICCID":"\u0001")"));
+  const Result result = decode(capture, {"--format", "plist", "--log-level", "-1"});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(result.output, "");
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+}
+
+TEST_F(DecodeProgram, EveryTechnologyKeepsItsLinesOutOfTheData) {
+  const std::string path = write("capture", pcapHeader());
+  for (const char* technology : {"kalvi-gsm-umts", "kalvi-lte", "kalvi-utran-2"}) {
+    const Result result = run({"--technology", technology, "--format", "paths", path});
+    EXPECT_EQ(result.status, 0) << technology << ": " << result.error;
+    EXPECT_EQ(result.output, "/\t(unknown)\n") << technology;
+  }
+}
+
+TEST_F(DecodeProgram, ErrorLinesAreLoggedByDefaultAndWarningsAreNot) {
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)));
+  EXPECT_THAT(result.error, StartsWith("<3>Creating LTELogGenerator object\n"));
+  EXPECT_THAT(result.error, HasSubstr("\n<3>Received an unknown log message: 45249\n"));
+  EXPECT_THAT(result.error, Not(HasSubstr("<4>")));
+}
+
+TEST_F(DecodeProgram, LogLevelFourAddsTraceAndLifeLines) {
+  const Result result =
+      decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)), {"--log-level", "4", "--format", "paths"});
+  EXPECT_THAT(result.error, HasSubstr("\n<4>Creating Log object: 0x"));
+  EXPECT_THAT(result.error,
+              HasSubstr("\n<4>LTE Serving Cell Info\n<3>Received an unknown log message: 45249\n"));
+  EXPECT_THAT(result.error, HasSubstr("\n<4>LTELogGenerator is destructed 0x"));
+  EXPECT_THAT(result.error, HasSubstr("\n<4>KLV_GSMLogGenerator is destructed 0x"));
+}
+
+TEST_F(DecodeProgram, LogLevelMinusOneSilencesTheLog) {
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)), {"--log-level", "-1"});
+  EXPECT_EQ(result.status, 0);
+  EXPECT_EQ(result.error, "");
+}
+
+TEST_F(DecodeProgram, ANewlineThatEndsALogTextIsNotDoubled) {
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, packet(0xFF, 1, "no list")));
+  EXPECT_THAT(result.error, HasSubstr("\n<3>Failed to get Cell Array\n"));
+  EXPECT_THAT(result.error, Not(HasSubstr("\n\n")));
+}
+
+TEST_F(DecodeProgram, AnUnreadableSIMPayloadAbortsAfterItsLogLineWithoutADisplay) {
+  const std::string snapshot = folder.file("snapshot");
+  const Result result = decode(
+      pcapHeader() + pcapRecord(afternoon, 0, antennas(2)) + pcapRecord(afternoon, 0, packet(0xFF, 0, "?")),
+      {"--snapshot", snapshot});
+  EXPECT_EQ(result.status, -SIGABRT);
+  EXPECT_EQ(result.output, "");
+  EXPECT_THAT(result.error, HasSubstr("\n<3>SIM File dictionary data could not be constructed\n"));
+  EXPECT_FALSE(std::filesystem::exists(snapshot));
+}
+
+TEST_F(DecodeProgram, StandardInputIsReadForADash) {
+  const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, antennas(4)));
+  const Result result = runInShell("--format paths - <" + path);
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_THAT(result.output, HasSubstr("\n/Serving Cell Info/Num Tx Antennas\t4\n"));
+}
+
+TEST_F(DecodeProgram, PcapngIsReadLikePcap) {
+  const std::string section =
+      pcapngBlock(0x0A0D0D0A, littleEndian(0x1A2B3C4D, 4) + littleEndian(1, 2) + littleEndian(0, 2) +
+                                  littleEndian(0xFFFFFFFFFFFFFFFF, 8));
+  const std::string interface =
+      pcapngBlock(1, littleEndian(user0, 2) + littleEndian(0, 2) + littleEndian(0, 4));
+  const std::string message = antennas(8);
+  const std::string record = pcapngBlock(
+      6, std::string(12, '\0') + littleEndian(message.size(), 4) + littleEndian(message.size(), 4) + message);
+  const Result result = decode(section + interface + record, {"--format", "paths"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_THAT(result.output, HasSubstr("\n/Serving Cell Info/Num Tx Antennas\t8\n"));
+}
+
+TEST_F(DecodeProgram, ATruncatedCaptureShowsWhatCameBeforeTheFault) {
+  const std::string snapshot = folder.file("snapshot");
+  const std::string second = pcapRecord(afternoon, 0, antennas(4));
+  const Result result =
+      decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)) + second.substr(0, second.size() - 1),
+             {"--format", "paths", "--log-level", "-1", "--snapshot", snapshot});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_THAT(result.output, HasSubstr("\n/Serving Cell Info/Num Tx Antennas\t2\n"));
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  EXPECT_THAT(result.error, HasSubstr(folder.file("capture")));
+  EXPECT_TRUE(std::filesystem::exists(snapshot));
+}
+
+TEST_F(DecodeProgram, AFileThatIsNoCaptureForThisProgramIsOneLineAndStatusOne) {
+  for (const std::string& contents :
+       {std::string(), std::string("This is no capture, whatever its name says."), pcapHeader(ethernet),
+        pcapHeader().substr(0, 20)}) {
+    const Result result = decode(contents);
+    EXPECT_EQ(result.status, 1) << result.error;
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+    EXPECT_THAT(result.error, StartsWith("varnel-decode: "));
+    EXPECT_THAT(result.error, HasSubstr(folder.file("capture")));
+  }
+}
+
+TEST_F(DecodeProgram, AMissingFileIsOneLineAndStatusOne) {
+  const Result result = run({"--technology", "kalvi-lte", folder.file("missing")});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  EXPECT_THAT(result.error, HasSubstr(folder.file("missing")));
+}
+
+TEST_F(DecodeProgram, AWrongCommandLineIsOneLineAndStatusTwo) {
+  const std::string path = write("capture", pcapHeader());
+  const std::vector<std::vector<std::string>> wrong = {
+      {},
+      {path},
+      {"--technology", "kalvi-lte"},
+      {"--technology", "kalvi-lte", "--format", "yaml", path},
+      {"--technology", "kalvi-lte", "--log-level", "many", path},
+      {"--technology", "kalvi-lte", "--log-level", "-2", path},
+      {"--technology", "kalvi-lte", "--bogus", path},
+      {"--technology", "kalvi-lte", "--snapshot"},
+      {"--technology", "kalvi-lte", path, path},
+  };
+  for (const auto& arguments : wrong) {
+    const Result result = run(arguments);
+    EXPECT_EQ(result.status, 2) << ::testing::PrintToString(arguments);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+    EXPECT_THAT(result.error, StartsWith("varnel-decode: "));
+  }
+}
+
+TEST_F(DecodeProgram, AnUnknownTechnologyNamesThoseThatExist) {
+  const Result result = run({"--technology", "kalvi-5g", write("capture", pcapHeader())});
+  EXPECT_EQ(result.status, 2);
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  for (const char* technology : {"kalvi-5g", "kalvi-gsm-umts", "kalvi-lte", "kalvi-utran-2"}) {
+    EXPECT_THAT(result.error, HasSubstr(technology));
+  }
+}
+
+TEST_F(DecodeProgram, HelpIsOnStandardOutput) {
+  const Result result = run({"--help"});
+  EXPECT_EQ(result.status, 0);
+  EXPECT_THAT(result.output, HasSubstr("--snapshot"));
+  EXPECT_EQ(result.error, "");
+}
+
+TEST_F(DecodeProgram, ASnapshotHoldsTheHistoryByTheCapturesClockAndTheBinaryLog) {
+  const std::string path = folder.file("snapshot");
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 500'000'000, antennas(2)) +
+                                   pcapRecord(afternoon + 5, 0, antennas(4)),
+                               {"--snapshot", path});
+  EXPECT_EQ(result.status, 0) << result.error;
+  struct stat file {};
+  ASSERT_EQ(::stat(path.c_str(), &file), 0);
+  EXPECT_EQ(file.st_mode & 0777, 0600u);
+
+  const std::string contents = contentsOf(path);
+  EXPECT_THAT(contents, StartsWith("<?xml"));
+  const Value list = readList(contents);
+  const Dictionary* snapshot = list.dictionary();
+  ASSERT_TRUE(snapshot) << contents;
+  ASSERT_TRUE(snapshot->get("Timestamp").string() && snapshot->get("Description").string()) << contents;
+  EXPECT_EQ(*snapshot->get("Timestamp").string(), "2024-03-01 14:05:14 +0000");
+  EXPECT_EQ(*snapshot->get("Description").string(), "");
+  const Array* items = snapshot->get("Data").array();
+  ASSERT_TRUE(items) << contents;
+  ASSERT_EQ(items->size(), 3u);
+
+  const auto textOf = [&](std::size_t item, std::string_view key) {
+    const Dictionary* entries = (*items)[item].dictionary();
+    const std::string* text = entries ? entries->get(key).string() : nullptr;
+    return text ? *text : "no text";
+  };
+  EXPECT_EQ(textOf(0, "Date"), "2024-03-01 14:05:11 +0000");
+  EXPECT_EQ(textOf(0, "Description"), "Snapshot (2024-03-01 14:05:11 +0000)");
+  EXPECT_EQ(textOf(1, "Date"), "2024-03-01 14:05:14 +0000");
+  // The version report's 161 bytes and each interval's 22 less the first.
+  EXPECT_EQ(textOf(2, "Description"), "DLF binary (203 bytes)");
+
+  const Bytes* dlf = (*items)[2].dictionary()->get("DLF").data();
+  ASSERT_TRUE(dlf);
+  ASSERT_EQ(dlf->size(), 203u);
+  // Seconds, zone and daylight flag.
+  EXPECT_EQ(Bytes(dlf->begin() + 81, dlf->begin() + 89), (Bytes{0x9A, 0xE0, 0xE1, 0x65, 0, 0, 0, 0}));
+}
+
+TEST_F(DecodeProgram, TheSnapshotOfAnEmptyCaptureIsOf1970) {
+  const std::string path = folder.file("snapshot");
+  EXPECT_EQ(decode(pcapHeader(), {"--snapshot", path}).status, 0);
+  EXPECT_THAT(contentsOf(path), HasSubstr("<string>1970-01-01 00:00:00 +0000</string>"));
+}
+
+TEST_F(DecodeProgram, ASnapshotThatCannotBeWrittenLeavesTheDisplayAndIsStatusOne) {
+  const std::string path = folder.file("missing/snapshot");
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)),
+                               {"--format", "paths", "--log-level", "-1", "--snapshot", path});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_THAT(result.output, HasSubstr("\n/Serving Cell Info/Num Tx Antennas\t2\n"));
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  EXPECT_THAT(result.error, HasSubstr(path));
+}
+
+TEST_F(DecodeProgram, AnOutputThatCannotBeWrittenIsStatusOne) {
+  const std::string path = write("capture", pcapHeader());
+  for (const char* output : {" >/dev/full", " >&-"}) {
+    const Result result = runInShell("--log-level -1 " + path + output);
+    EXPECT_EQ(result.status, 1) << output;
+    EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+    EXPECT_THAT(result.error, HasSubstr("standard output"));
+  }
+}
+
+TEST_F(DecodeProgram, AReaderThatHasLeftIsStatusOneAndNoSignal) {
+  int ends[2];
+  ASSERT_EQ(::pipe(ends), 0);
+  ::close(ends[0]);
+  ASSERT_LT(ends[1], 10) << "the shell takes one digit";
+  const Result result = runInShell(write("capture", pcapHeader()) + " >&" + std::to_string(ends[1]));
+  ::close(ends[1]);
+  EXPECT_EQ(result.status, 1);
+  EXPECT_THAT(result.error, HasSubstr("standard output"));
+}
+
+}  // namespace
+
+}  // namespace varnel

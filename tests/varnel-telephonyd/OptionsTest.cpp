@@ -1,0 +1,95 @@
+#include "programs/varnel-telephonyd/Options.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <vector>
+
+namespace varnel {
+namespace {
+
+using testing::HasSubstr;
+
+struct Reading {
+  std::variant<Options, ExitStatus> choice;
+  std::string output, error;
+
+  const Options& options() const { return std::get<Options>(choice); }
+};
+
+Reading read(std::vector<const char*> arguments) {
+  arguments.insert(arguments.begin(), "varnel-telephonyd");
+  testing::internal::CaptureStdout();
+  testing::internal::CaptureStderr();
+  auto choice = readOptions(static_cast<int>(arguments.size()), arguments.data(), "9.8.7");
+  return {choice, testing::internal::GetCapturedStdout(), testing::internal::GetCapturedStderr()};
+}
+
+TEST(TelephonydOptions, ASimulation) {
+  const Reading reading =
+      read({"--simulate", "kalvi-lte", "--seed", "7", "--runtime-dir", "run", "--log-level", "5"});
+  EXPECT_EQ(reading.error, "");
+  EXPECT_EQ(reading.options().simulatedTechnology, "kalvi-lte");
+  EXPECT_EQ(reading.options().seed, 7u);
+  EXPECT_EQ(reading.options().runtimeFolder, "run");
+  EXPECT_EQ(reading.options().logLevel, 5);
+  EXPECT_EQ(reading.options().recordPath, std::nullopt);
+}
+
+TEST(TelephonydOptions, AReplayAndItsDefaults) {
+  const Reading reading = read({"--replay", "walk.pcap"});
+  EXPECT_EQ(reading.error, "");
+  EXPECT_EQ(reading.options().replayPath, "walk.pcap");
+  EXPECT_EQ(reading.options().replayTechnology, "kalvi-lte");
+  EXPECT_EQ(reading.options().speed, 1);
+  EXPECT_FALSE(reading.options().loops);
+  EXPECT_EQ(reading.options().logLevel, 3);
+}
+
+TEST(TelephonydOptions, AReplayMayBeFasterAndStartOver) {
+  const Reading reading = read({"--replay", "walk.pcap", "--technology", "kalvi-utran-2", "--speed", "2.5",
+                                "--loop", "--record", "a"});
+  EXPECT_EQ(reading.options().replayTechnology, "kalvi-utran-2");
+  EXPECT_EQ(reading.options().speed, 2.5);
+  EXPECT_TRUE(reading.options().loops);
+  EXPECT_EQ(reading.options().recordPath, "a");
+}
+
+TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
+  const std::vector<std::vector<const char*>> mistakes = {
+      {},
+      {"--simulate", "kalvi-5g"},
+      {"--simulate", "kalvi-lte", "--replay", "walk.pcap"},
+      {"--simulate", "kalvi-lte", "--speed", "2"},
+      {"--replay", "walk.pcap", "--seed", "2"},
+      {"--replay", "walk.pcap", "--speed", "0"},
+      {"--replay", "walk.pcap", "--speed", "nan"},
+      {"--replay", "-"},
+      {"--replay", "/etc/passwd", "--record", "/etc/../etc/passwd"},
+      {"--simulate", "kalvi-lte", "--nonsense"},
+      {"--simulate", "kalvi-lte", "--seed", "x"},
+  };
+  for (const auto& arguments : mistakes) {
+    const Reading reading = read(arguments);
+    ASSERT_TRUE(std::holds_alternative<ExitStatus>(reading.choice)) << testing::PrintToString(arguments);
+    EXPECT_EQ(std::get<ExitStatus>(reading.choice).code, 2);
+    EXPECT_EQ(reading.output, "");
+    EXPECT_TRUE(reading.error.starts_with("varnel-telephonyd: ")) << reading.error;
+    EXPECT_EQ(std::ranges::count(reading.error, '\n'), 1) << reading.error;
+  }
+}
+
+TEST(TelephonydOptions, HelpAndVersionGoToStandardOutput) {
+  const Reading help = read({"--help"});
+  EXPECT_EQ(std::get<ExitStatus>(help.choice).code, 0);
+  for (const char* option : {"--simulate", "--seed", "--replay", "--technology", "--speed", "--loop",
+                             "--record", "--runtime-dir", "--log-level", "--version"})
+    EXPECT_THAT(help.output, HasSubstr(option));
+  const Reading version = read({"--version"});
+  EXPECT_EQ(std::get<ExitStatus>(version.choice).code, 0);
+  EXPECT_EQ(version.output, "varnel-telephonyd 9.8.7\n");
+}
+
+}  // namespace
+}  // namespace varnel

@@ -1,0 +1,299 @@
+#include "programs/varnel-telephonyd/TelephonyServer.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include "platform/host/Capture.h"
+#include "programs/varnel-telephonyd/ReplaySource.h"
+#include "programs/varnel-telephonyd/SimulationSource.h"
+#include "tests/support/FakeQueue.h"
+#include "tests/support/MemoryPorts.h"
+
+namespace varnel {
+namespace {
+
+using namespace std::chrono_literals;
+
+Bytes bytesOf(const std::string& text) { return Bytes(text.begin(), text.end()); }
+
+Bytes command(const std::string& dictionary) {
+  return bytesOf("<plist version=\"1.0\"><dict>" + dictionary + "</dict></plist>");
+}
+
+const Bytes technologyRequest = command("<key>GetTechnology</key><string>GetTechnology</string>");
+const Bytes startEverything = command("<key>SetState</key><string>Streaming</string>");
+
+Bytes startWith(const std::string& modemCodes, const std::string& serverCodes) {
+  return command("<key>SetState</key><string>Streaming</string><key>SetKalviLogCodes</key><array>" +
+                 modemCodes + "</array><key>SetTkExtraCodes</key><array>" + serverCodes + "</array>");
+}
+
+// Three bytes name the code of a modem packet, the rest of which is 0.
+Bytes modemPacket(std::uint8_t code) { return {1, 12, 0, code, 0, 0, 0, 0, 0, 0, 0, 0, 0}; }
+Bytes serverPacket(std::uint8_t code) { return {0xFF, 12, 0, code, 0, 0, 0, 0, 0, 0, 0, 0, 0}; }
+
+class ListSource final : public MessageSource {
+ public:
+  explicit ListSource(std::vector<StreamMessage> messages) : _messages(std::move(messages)) {}
+  std::optional<StreamMessage> next() override {
+    if (_next == _messages.size()) return std::nullopt;
+    return _messages[_next++];
+  }
+
+ private:
+  const std::vector<StreamMessage> _messages;
+  std::size_t _next = 0;
+};
+
+class TelephonyServerTest : public testing::Test {
+ protected:
+  using Sent = std::vector<Bytes>;
+
+  std::string channel() {
+    const auto made = _server.createLogChannel("viewer");
+    EXPECT_EQ(made.error, 0);
+    return made.portName.value_or("");
+  }
+
+  // What was sent since the last call.
+  Sent sent() {
+    Sent messages;
+    for (const auto& request : _ports.requests) {
+      EXPECT_EQ(request.identifier, 0);
+      EXPECT_EQ(request.timeout, 0ms);
+      EXPECT_EQ(request.replyTimeout, std::nullopt);
+      messages.push_back(request.data);
+    }
+    _ports.requests.clear();
+    return messages;
+  }
+
+  std::vector<StreamMessage> _stream{
+      {0ms, modemPacket(1)}, {100ms, serverPacket(2)}, {250ms, modemPacket(3)}};
+  std::vector<Bytes> _recorded;
+  MemoryPorts _ports;
+  FakeQueue _queue;
+  TelephonyServer _server{
+      {.ports = _ports,
+       .queue = _queue,
+       .uptime = [this] { return _queue.now(); },
+       .technology = "kalvi-lte",
+       .makeSource = [this] { return std::make_unique<ListSource>(_stream); },
+       .messageSent = [this](ByteView message) { _recorded.emplace_back(message.begin(), message.end()); }}};
+};
+
+TEST_F(TelephonyServerTest, TellsTheTechnology) {
+  const auto reply = _ports.deliver(channel(), 0, technologyRequest);
+  ASSERT_TRUE(reply);
+  const std::string text(reply->begin(), reply->end());
+  EXPECT_NE(text.find("<key>GetTechnology</key>\n\t<string>kalvi-lte</string>"), std::string::npos) << text;
+}
+
+TEST_F(TelephonyServerTest, StreamsNothingBeforeTheStart) {
+  const std::string port = channel();
+  _ports.deliver(port, 0, technologyRequest);
+  _queue.advance(10s);
+  EXPECT_EQ(sent(), Sent());
+}
+
+TEST_F(TelephonyServerTest, StreamsAtThePaceOfItsSource) {
+  const std::string port = channel();
+  _queue.advance(7s);
+  EXPECT_EQ(_ports.deliver(port, 0, startEverything), std::nullopt);
+  EXPECT_EQ(sent(), Sent());
+  _queue.run();
+  EXPECT_EQ(sent(), (Sent{modemPacket(1)}));
+  _queue.advance(99ms);
+  EXPECT_EQ(sent(), Sent());
+  _queue.advance(1ms);
+  EXPECT_EQ(sent(), (Sent{serverPacket(2)}));
+  _queue.advance(150ms);
+  EXPECT_EQ(sent(), (Sent{modemPacket(3)}));
+  _queue.advance(1min);
+  EXPECT_EQ(sent(), Sent());
+  EXPECT_EQ(_server.channels(), 1u);
+}
+
+TEST_F(TelephonyServerTest, StreamsOnlyTheCodesAskedFor) {
+  _ports.deliver(channel(), 0, startWith("<integer>3</integer>", "<integer>1</integer>"));
+  _queue.advance(1s);
+  EXPECT_EQ(sent(), (Sent{modemPacket(3)}));
+  EXPECT_EQ(_recorded, (Sent{modemPacket(3)}));
+}
+
+TEST_F(TelephonyServerTest, ASecondStartChangesTheCodesAndGoesOn) {
+  const std::string port = channel();
+  _ports.deliver(port, 0, startWith("<integer>1</integer>", ""));
+  _queue.advance(50ms);
+  EXPECT_EQ(sent(), (Sent{modemPacket(1)}));
+  _ports.deliver(port, 0, startWith("", "<integer>2</integer>"));
+  _queue.advance(1s);
+  EXPECT_EQ(sent(), (Sent{serverPacket(2)}));
+}
+
+TEST_F(TelephonyServerTest, ManyMessagesAtOnceComeInOrder) {
+  _stream.clear();
+  for (int i = 0; i < 1000; ++i) _stream.push_back({0ms, Bytes(1, static_cast<std::uint8_t>(i))});
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.run();
+  const Sent messages = sent();
+  ASSERT_EQ(messages.size(), 1000u);
+  EXPECT_EQ(messages[999], Bytes{999 % 256});
+}
+
+TEST_F(TelephonyServerTest, MalformedCommandsGetNoAnswerAndChangeNothing) {
+  const std::string port = channel();
+  EXPECT_EQ(_ports.deliver(port, 0, bytesOf("nonsense")), std::nullopt);
+  EXPECT_EQ(_ports.deliver(port, 0, {}), std::nullopt);
+  EXPECT_EQ(_ports.deliver(port, 0, command("<key>SetState</key><string>Idle</string>")), std::nullopt);
+  _queue.advance(1s);
+  EXPECT_EQ(sent(), Sent());
+  EXPECT_TRUE(_ports.deliver(port, 0, technologyRequest));
+}
+
+TEST_F(TelephonyServerTest, CommandsWithAnotherIdentifierAreIgnored) {
+  const std::string port = channel();
+  EXPECT_EQ(_ports.deliver(port, 1, technologyRequest), std::nullopt);
+  _ports.deliver(port, 1, startEverything);
+  _queue.advance(1s);
+  EXPECT_EQ(sent(), Sent());
+}
+
+TEST_F(TelephonyServerTest, AViewerWithoutAPortGetsAnError) {
+  _ports.refusesRemotePorts = true;
+  const auto made = _server.createLogChannel("viewer");
+  EXPECT_EQ(made.error, 6);
+  EXPECT_EQ(made.portName, std::nullopt);
+  EXPECT_EQ(_server.channels(), 0u);
+}
+
+TEST_F(TelephonyServerTest, ACommandPortThatCannotBeMadeIsAnError) {
+  _ports.refusesLocalPorts = true;
+  EXPECT_EQ(_server.createLogChannel("viewer").error, 7);
+  EXPECT_EQ(_server.channels(), 0u);
+  EXPECT_EQ(_ports.remotePort(), nullptr);
+}
+
+TEST_F(TelephonyServerTest, AChannelEndsWithItsCommandPort) {
+  const std::string port = channel();
+  _ports.deliver(port, 0, startEverything);
+  _queue.run();
+  _ports.invalidateLocalPort(port);
+  EXPECT_EQ(_server.channels(), 0u);
+  EXPECT_EQ(_ports.remotePort(), nullptr);
+  sent();
+  _queue.advance(1s);
+  EXPECT_EQ(sent(), Sent());
+}
+
+TEST_F(TelephonyServerTest, AChannelWithoutAStreamEndsSoonAfterItsViewer) {
+  const std::string port = channel();
+  _ports.endRemotePorts();
+  _queue.advance(1s);
+  EXPECT_EQ(_server.channels(), 0u);
+  EXPECT_FALSE(_ports.hasLocalPort(port));
+}
+
+TEST_F(TelephonyServerTest, AStreamEndsWhenTheViewerIsGone) {
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.run();
+  _ports.endRemotePorts();
+  _queue.advance(100ms);
+  EXPECT_EQ(_server.channels(), 0u);
+  EXPECT_EQ(_recorded, (Sent{modemPacket(1)}));
+}
+
+TEST_F(TelephonyServerTest, AViewerThatHasNoRoomIsGivenTime) {
+  bool hasRoom = false;
+  _ports.answer = [&](const MemoryPorts::Request&) {
+    return RemotePort::SendResult{hasRoom ? 0 : RemotePort::sendTimeout, std::nullopt};
+  };
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.advance(4s);
+  EXPECT_EQ(_server.channels(), 1u);
+  EXPECT_EQ(_recorded, Sent());
+  hasRoom = true;
+  _queue.advance(1s);
+  EXPECT_EQ(_recorded, (Sent{modemPacket(1), serverPacket(2), modemPacket(3)}));
+}
+
+TEST_F(TelephonyServerTest, AViewerThatDoesNotReadIsDropped) {
+  _ports.answer = [&](const MemoryPorts::Request&) {
+    return RemotePort::SendResult{RemotePort::sendTimeout, std::nullopt};
+  };
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.advance(6s);
+  EXPECT_EQ(_server.channels(), 0u);
+  EXPECT_EQ(_ports.remotePort(), nullptr);
+}
+
+TEST_F(TelephonyServerTest, EveryChannelHasItsOwnStream) {
+  const std::string first = channel();
+  _ports.deliver(first, 0, startWith("<integer>3</integer>", ""));
+  _queue.advance(200ms);
+  const std::string second = channel();
+  EXPECT_NE(first, second);
+  _ports.deliver(second, 0, startWith("<integer>1</integer>", ""));
+  _queue.run();
+  EXPECT_EQ(sent(), (Sent{modemPacket(1)}));
+  _queue.advance(50ms);
+  EXPECT_EQ(sent(), (Sent{modemPacket(3)}));
+}
+
+TEST_F(TelephonyServerTest, AViewerThatComesBackStartsAtTheBeginning) {
+  const std::string first = channel();
+  _ports.deliver(first, 0, startEverything);
+  _queue.advance(1s);
+  EXPECT_EQ(sent().size(), 3u);
+  _ports.invalidateLocalPort(first);
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.advance(1s);
+  EXPECT_EQ(sent().size(), 3u);
+  EXPECT_EQ(_server.channels(), 1u);
+}
+
+// A recording of a simulated modem, replayed, is the same stream.
+TEST(Recording, IsReplayedAsItWasSent) {
+  std::string folder = (std::filesystem::temp_directory_path() / "varnel-recording-XXXXXX").string();
+  ASSERT_NE(::mkdtemp(folder.data()), nullptr);
+  const std::string path = folder + "/walk.pcap";
+  MemoryPorts ports;
+  FakeQueue queue;
+  const auto serve = [&](auto makeSource, auto messageSent) {
+    ports.requests.clear();
+    TelephonyServer server{{.ports = ports,
+                            .queue = queue,
+                            .uptime = [&queue] { return queue.now(); },
+                            .technology = "kalvi-lte",
+                            .makeSource = makeSource,
+                            .messageSent = messageSent}};
+    ports.deliver(server.createLogChannel("viewer").portName.value(), 0, startEverything);
+    queue.advance(30s);
+    std::vector<Bytes> sent;
+    for (const auto& request : ports.requests) sent.push_back(request.data);
+    return sent;
+  };
+
+  std::vector<Bytes> sent;
+  {
+    CaptureWriter writer(path);
+    sent =
+        serve([] { return std::make_unique<SimulationSource>(simulatedModem("kalvi-lte", 1)); },
+              [&](ByteView message) {
+                const auto now_ms = queue.now().count();
+                writer.write({1700000000 + now_ms / 1000, static_cast<std::int32_t>(now_ms % 1000 * 1000000)},
+                             message);
+              });
+  }
+  EXPECT_GT(sent.size(), 30u);
+  EXPECT_EQ(serve([&] { return std::make_unique<ReplaySource>(path, 1, ReplaySource::AtEnd::Stop); },
+                  [](ByteView) {}),
+            sent);
+  std::filesystem::remove_all(folder);
+}
+
+}  // namespace
+}  // namespace varnel
