@@ -26,10 +26,10 @@ std::string updateMessage(const Clock& clock) {
 
 TextViewer::TextViewer(const ModelServices& services, DeviceFiles& files, TextOutput& output)
     : _services(services), _files(files), _output(output) {
-  connect();
+  startOver();
 }
 
-void TextViewer::connect() {
+void TextViewer::startOver() {
   _model = std::make_unique<VarnelModel>(_services, *this);
   show(notConnected, {});
   _model->restartMonitorLater();
@@ -38,12 +38,6 @@ void TextViewer::connect() {
 void TextViewer::afterUpdates(unsigned count, std::function<void()> task) {
   _awaitedUpdates = _updates + count;
   _whenUpdated = std::move(task);
-}
-
-void TextViewer::startOver() {
-  // The old link must be gone before the new one claims its name.
-  _model.reset();
-  connect();
 }
 
 void TextViewer::save() {

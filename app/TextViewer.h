@@ -34,7 +34,6 @@ class TextViewer final : public VarnelModelObserver {
   void updateViewControllerFromModel() override;
 
  private:
-  void connect();
   void show(const std::string& status, const std::string& tree);
 
   ModelServices _services;

@@ -11,12 +11,20 @@ const Value& Dictionary::get(std::string_view key) const {
 void Dictionary::set(std::string_view key, Value value) {
   if (value.isAbsent()) return;
   const std::size_t position = find(key);
-  (position == nowhere ? append(key) : _entries[position].value) = std::move(value);
+  if (position == nowhere) {
+    append(key, std::move(value));
+  } else {
+    _entries[position].value = std::move(value);
+  }
 }
 
 void Dictionary::setText(std::string_view key, std::string_view text) {
   const std::size_t position = find(key);
-  (position == nowhere ? append(key) : _entries[position].value).assignText(text);
+  if (position == nowhere) {
+    append(key, text);
+  } else {
+    _entries[position].value.assignText(text);
+  }
 }
 
 void Dictionary::remove(std::string_view key) {
@@ -31,8 +39,10 @@ std::size_t Dictionary::find(std::string_view key) const {
   if (_next >= _entries.size()) _next = 0;
   if (!_entries.empty() && _entries[_next].key == key) return _next++;
   if (!_positions.empty()) {
-    const auto found = _positions.find(std::string(key));
-    return found == _positions.end() ? nowhere : found->second;
+    const auto found = _positions.find(key);
+    if (found == _positions.end()) return nowhere;
+    _next = found->second + 1;
+    return found->second;
   }
   for (std::size_t position = 0; position < _entries.size(); ++position) {
     if (_entries[position].key == key) {
@@ -43,14 +53,14 @@ std::size_t Dictionary::find(std::string_view key) const {
   return nowhere;
 }
 
-Value& Dictionary::append(std::string_view key) {
-  _entries.push_back({std::string(key), Value()});
+// The key may be a view of what stands in the dictionary, which moves when it grows.
+void Dictionary::append(std::string_view key, Value value) {
+  _entries.push_back({std::string(key), std::move(value)});
   if (!_positions.empty()) {
-    _positions.emplace(key, _entries.size() - 1);
+    _positions.emplace(_entries.back().key, _entries.size() - 1);
   } else if (_entries.size() > largestUnindexed) {
     indexAll();
   }
-  return _entries.back().value;
 }
 
 void Dictionary::indexAll() {

@@ -1,9 +1,10 @@
 #pragma once
 
 #include <cstddef>
+#include <functional>
+#include <map>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
 
 #include "platform/Value.h"
@@ -37,16 +38,16 @@ class Dictionary {
 
  private:
   static constexpr std::size_t nowhere = static_cast<std::size_t>(-1);
-  // Up to here a walk over the entries beats hashing the key.
+  // Up to here a walk over the entries beats an index.
   static constexpr std::size_t largestUnindexed = 48;
 
   std::size_t find(std::string_view key) const;
-  Value& append(std::string_view key);
+  void append(std::string_view key, Value value);
   void indexAll();
 
   std::vector<Entry> _entries;
   // Where each key stands; empty as long as the dictionary is small.
-  std::unordered_map<std::string, std::size_t> _positions;
+  std::map<std::string, std::size_t, std::less<>> _positions;
   // A packet sets its rows in the same order each time, so the next key is looked for behind the last one.
   mutable std::size_t _next = 0;
 };

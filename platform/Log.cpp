@@ -21,8 +21,10 @@ void append(std::string& line, const char* format, auto number) {
 
 void setLogSink(LogSink* sink, int highestPriority) {
   currentSink = sink;
-  logging::highestPriorityTaken = sink ? highestPriority : -1;
+  setHighestLogPriority(sink ? highestPriority : -1);
 }
+
+void setHighestLogPriority(int highestPriority) { logging::highestPriorityTaken = highestPriority; }
 
 LogSink* logSink() { return currentSink; }
 

@@ -32,6 +32,8 @@ class LogSink {
 void setLogSink(LogSink* sink, int highestPriority);
 /// The sink that is set, null when there is none.
 LogSink* logSink();
+/// Changes how far the present sink's interest goes. May be called from any thread.
+void setHighestLogPriority(int highestPriority);
 
 namespace logging {
 
@@ -85,7 +87,7 @@ struct Format {
     } else if (rest.starts_with('d') || rest.starts_with('u') || rest.starts_with('x')) {
       fits = std::is_integral_v<Argument> && sizeof(Argument) <= 4;
     } else if (rest.starts_with('p')) {
-      fits = std::is_pointer_v<Argument>;
+      fits = std::is_pointer_v<Argument> && !std::is_convertible_v<Argument, std::string_view>;
     } else if (rest.starts_with('s')) {
       fits = std::is_convertible_v<Argument, std::string_view>;
     }

@@ -68,7 +68,8 @@ class XmlScan {
 
   static bool isNamed(std::string_view tag, std::string_view name) {
     constexpr std::string_view space = " \t\r\n";
-    return tag.starts_with(name) && (tag.size() == name.size() || space.find(tag[name.size()]) != space.npos);
+    return tag.starts_with(name) &&
+           (tag.size() == name.size() || space.find(tag[name.size()]) != std::string_view::npos);
   }
 
   bool enter(bool isEmpty) {

@@ -11,7 +11,8 @@ struct Time {
   std::int64_t seconds = 0;
   std::int32_t nanoseconds = 0;
 
-  friend auto operator<=>(const Time&, const Time&) = default;
+  friend auto operator<=>(const Time&,
+                          const Time&) = default;  // NOLINT(modernize-use-nullptr): no pointer here
 };
 
 /// How far a local clock stands from UTC.

@@ -115,7 +115,7 @@ std::FILE* streamOf(std::unique_ptr<ShownFile> file) {
   };
   std::FILE* stream = ::fopencookie(file.get(), "rb", operations);
   if (!stream) throw std::bad_alloc();
-  file.release();
+  static_cast<void>(file.release());  // the stream owns it now
   return stream;
 }
 

@@ -37,7 +37,7 @@ HostLog::HostLog(Options options) : _standardErrorLevel(options.standardErrorLev
       .probeInterval = options.probeInterval,
       .write = std::move(options.writeSystemLog),
       .onProbe = [level = _standardErrorLevel](
-                     bool isHeard) { logging::highestPriorityTaken = isHeard ? everyLevel : level; },
+                     bool isHeard) { setHighestLogPriority(isHeard ? everyLevel : level); },
   });
 }
 

@@ -1,8 +1,7 @@
 #pragma once
 
-#include <signal.h>
-
 #include <QSocketNotifier>
+#include <csignal>
 #include <functional>
 #include <initializer_list>
 #include <memory>

@@ -13,7 +13,8 @@ namespace varnel {
 
 namespace {
 
-constexpr std::size_t longestPath = sizeof(sockaddr_un::sun_path) - 1;
+// Room for the final zero, and for a byte that QLocalServer wants to spare.
+constexpr std::size_t longestPath = sizeof(sockaddr_un::sun_path) - 2;
 constexpr int connectTimeout_ms = 1000;
 // Bytes that have arrived and wait to be taken, and bytes that wait to be sent, at most.
 constexpr qint64 readBufferSize = 1 << 20;
@@ -95,7 +96,7 @@ std::optional<Frame> SocketConnection::nextFrame() {
     if (const auto frame = _reader.next()) return frame;
     if (_reader.isFaulty()) _socket->abort();
     if (!isOpen() && _socket->bytesAvailable() == 0) return std::nullopt;
-    const qint64 count = _socket->read(_chunk.data(), _chunk.size());
+    const qint64 count = _socket->read(_chunk.data(), static_cast<qint64>(_chunk.size()));
     if (count <= 0) return std::nullopt;
     _reader.feed({reinterpret_cast<const std::uint8_t*>(_chunk.data()), static_cast<std::size_t>(count)});
   }

@@ -57,21 +57,22 @@ class SocketLocalPort final : public LocalPort {
   void add(std::shared_ptr<SocketConnection> peer) {
     peer->setActivityHandler([this, weak = std::weak_ptr(peer)] {
       const auto active = weak.lock();
-      if (!deliver(_delivery, *active) || active->isOpen()) return;
+      const auto delivery = _delivery;
+      if (!deliver(*delivery, *active) || active->isOpen()) return;
       invalidate();
     });
     _peers.push_back(std::move(peer));
   }
 
   // Delivers what the peer has sent. False when the port does not deliver, or no longer exists.
-  static bool deliver(const std::shared_ptr<Delivery> delivery, SocketConnection& peer) {
-    if (!delivery->hasBegun) return false;
+  static bool deliver(const Delivery& delivery, SocketConnection& peer) {
+    if (!delivery.hasBegun) return false;
     while (const auto frame = peer.nextFrame()) {
       const bool isRequest = frame->mark == FrameMark::Request;
       if (!isRequest && frame->mark != FrameMark::Message) continue;
-      const auto reply = callHandler(delivery->handler, *frame);
+      const auto reply = callHandler(delivery.handler, *frame);
       if (isRequest) answer(peer, frame->identifier, reply);
-      if (delivery->hasEnded) return false;
+      if (delivery.hasEnded) return false;
     }
     return true;
   }

@@ -1,7 +1,6 @@
 #include "platform/host/SystemLogQueue.h"
 
 #include <pthread.h>
-#include <signal.h>
 #include <sys/socket.h>
 #include <sys/un.h>
 #include <syslog.h>
@@ -9,6 +8,7 @@
 
 #include <cerrno>
 #include <condition_variable>
+#include <csignal>
 #include <cstring>
 #include <mutex>
 #include <thread>
