@@ -21,23 +21,32 @@ TelephonyConnection::LogChannel TelephonyServer::createLogChannel(std::string_vi
     logWarning("A log channel was asked for port \"%s\", which does not answer", viewerPortName);
     return {viewerPortMissing, std::nullopt};
   }
-  const std::string portName = std::string(commandPortPrefix) + std::to_string(++_channelsMade);
+  const unsigned number = freeNumber();
+  const std::string portName = std::string(commandPortPrefix) + std::to_string(number);
   const auto channel = std::make_shared<ServedChannel>(_host, std::move(viewer));
-  if (!channel->open(portName, [this, raw = channel.get()] {
-        logLine(logNoticePriority, "A log channel is closed");
-        std::erase_if(_channels, [raw](const auto& one) { return one.get() == raw; });
-      })) {
+  if (!channel->open(portName, [this, number] { close(number); })) {
     logError("The port \"%s\" could not be made", portName);
     return {commandPortNotMade, std::nullopt};
   }
-  _channels.push_back(channel);
+  _channels.emplace(number, channel);
   logLine(logNoticePriority, "A log channel to port \"%s\" is open", viewerPortName);
   return {0, portName};
 }
 
+unsigned TelephonyServer::freeNumber() const {
+  unsigned number = 1;
+  while (_channels.contains(number)) ++number;
+  return number;
+}
+
+void TelephonyServer::close(unsigned number) {
+  _channels.erase(number);
+  logLine(logNoticePriority, "A log channel is closed");
+}
+
 void TelephonyServer::checkViewers() {
   const auto channels = _channels;  // for a check may end its channel
-  for (const auto& channel : channels) channel->checkViewer();
+  for (const auto& [number, channel] : channels) channel->checkViewer();
 }
 
 }  // namespace varnel

@@ -1,9 +1,9 @@
 #pragma once
 
 #include <cstdint>
+#include <map>
 #include <memory>
 #include <string_view>
-#include <vector>
 
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/ServedChannel.h"
@@ -27,11 +27,12 @@ class TelephonyServer {
   std::size_t channels() const { return _channels.size(); }
 
  private:
+  unsigned freeNumber() const;
+  void close(unsigned number);
   void checkViewers();
 
   const ChannelHost _host;
-  std::vector<std::shared_ptr<ServedChannel>> _channels;
-  std::uint64_t _channelsMade = 0;
+  std::map<unsigned, std::shared_ptr<ServedChannel>> _channels;  // by the number in their port's name
   // A viewer may go away without a word while nothing is sent to it.
   std::unique_ptr<RepeatingTimer> _viewerCheck;
 };
