@@ -65,6 +65,7 @@ void setFields(Dictionary& section, const Packet& packet, std::span<const Field>
 
 Value fieldRow(const Packet& record, std::span<const Field> fields) {
   Value row = Value::ofDictionary();
+  row.dictionary()->reserve(fields.size());
   setFields(*row.dictionary(), record, fields);
   return row;
 }
@@ -72,6 +73,8 @@ Value fieldRow(const Packet& record, std::span<const Field> fields) {
 Array recordRows(const Packet& packet, const Records& records, std::span<const Field> fields) {
   const std::size_t size = extent(fields);
   Array rows;
+  // A count may promise more records than the packet holds.
+  rows.reserve(std::min(records.count, packet.size() / size));
   for (std::size_t i = 0; i < records.count; ++i) {
     const std::size_t offset = records.first + records.stride * i;
     if (packet.holds(offset, size)) rows.push_back(fieldRow(packet.from(offset), fields));

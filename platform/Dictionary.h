@@ -30,6 +30,8 @@ class Dictionary {
   /// allocates nothing.
   void setText(std::string_view key, std::string_view text);
   void remove(std::string_view key);
+  /// Makes room for that many keys at once.
+  void reserve(std::size_t size) { _entries.reserve(size); }
 
   std::size_t size() const { return _entries.size(); }
   bool empty() const { return _entries.empty(); }

@@ -1,0 +1,36 @@
+#pragma once
+
+#include <memory>
+#include <ostream>
+
+#include "LogGenerator/LogGenerator.h"
+#include "PacketCases.h"
+#include "platform/host/FileResources.h"
+#include "platform/host/SystemClock.h"
+
+namespace varnel {
+
+/// A generator with its real template that takes the same message again and again.
+class DecodingLoop {
+ public:
+  explicit DecodingLoop(const PacketCase& packetCase)
+      : _message(packetCase.message()),
+        _generator(LogGenerator::generatorFromTechnology(
+            packetCase.technology, {_resources, _clock, _application, _standardOutput})) {}
+
+  const Bytes& message() const { return _message; }
+  void decode() { _generator->updateState_withData(_state, _message); }
+  /// Takes the raw bytes away that the generator keeps until the next display.
+  void display() { _generator->generateLogUsingState(_state); }
+
+ private:
+  const FileResources _resources{resourceFolder()};
+  const SystemClock _clock;
+  const ApplicationInfo _application;
+  std::ostream _standardOutput{nullptr};
+  Bytes _message;
+  Dictionary _state;
+  std::unique_ptr<LogGenerator> _generator;
+};
+
+}  // namespace varnel

@@ -1,0 +1,78 @@
+#include "PacketCases.h"
+
+#include "platform/Dictionary.h"
+#include "platform/PropertyList.h"
+#include "platform/TelephonyService.h"
+
+namespace varnel {
+
+namespace {
+
+// A modem packet with bytes of every size in its payload.
+Bytes packet(std::uint16_t logCode, std::size_t size) {
+  Bytes bytes(size);
+  for (std::size_t i = 0; i < size; ++i) bytes[i] = static_cast<std::uint8_t>(i * 37 + 11);
+  bytes[0] = 1;
+  bytes[3] = static_cast<std::uint8_t>(logCode);
+  bytes[4] = static_cast<std::uint8_t>(logCode >> 8);
+  return bytes;
+}
+
+Bytes lteServingCell() { return packet(0xB0C2, 38); }
+
+Bytes lteServingCellMeasurement() { return packet(0xB17F, 33); }
+
+Bytes lteNeighborsOf8Cells() {
+  Bytes bytes = packet(0xB180, 21 + 8 * 20);
+  bytes[19] = 0xC0;  // the number of cells less one is 7: two bits here,
+  bytes[20] = 0x01;  // three there
+  return bytes;
+}
+
+Bytes lteConnectedModeOf8Neighbors() {
+  Bytes bytes = packet(0xB179, 29 + 8 * 6);
+  bytes[27] = 8;
+  bytes[28] = 0;
+  return bytes;
+}
+
+Bytes utranNeighborsOf16Cells() {
+  Bytes bytes = packet(0xD00A, 168 + 16 * 16);
+  bytes[16] = 16 << 1;
+  return bytes;
+}
+
+Bytes cellMonitorOf16Records() {
+  Value cells = Value::ofArray();
+  for (int i = 0; i < 16; ++i) {
+    Value cell = Value::ofDictionary();
+    cell.dictionary()->set(cellMonitor::radioAccessTechnology, cellMonitor::lte);
+    cell.dictionary()->set(cellMonitor::cellType, i < 15 ? cellMonitor::neighbor : cellMonitor::serving);
+    cell.dictionary()->set(cellMonitor::trackingAreaCode, Value::ofInteger(4711));
+    cell.dictionary()->set(cellMonitor::cellIdentity, Value::ofInteger(0x1234500 + i));
+    cell.dictionary()->set(cellMonitor::physicalCellIdentity, Value::ofInteger(100 + i));
+    cell.dictionary()->set(cellMonitor::bandInfo, Value::ofInteger(3));
+    cell.dictionary()->set(cellMonitor::uarfcn, Value::ofInteger(1300));
+    cells.array()->push_back(cell);
+  }
+  Bytes bytes{0xFF, 0, 0, 1, 0, 0, 0, 0, 0, 0, 0, 0, 0};
+  const Bytes list = *writeXmlPropertyList(cells);
+  bytes.insert(bytes.end(), list.begin(), list.end());
+  return bytes;
+}
+
+}  // namespace
+
+std::span<const PacketCase> packetCases() {
+  static constexpr PacketCase cases[] = {
+      {"LTE 0xB0C2", technology::kalviLTE, lteServingCell},
+      {"LTE 0xB17F", technology::kalviLTE, lteServingCellMeasurement},
+      {"LTE 0xB180, 8 cells", technology::kalviLTE, lteNeighborsOf8Cells},
+      {"LTE 0xB179, 8 neighbours", technology::kalviLTE, lteConnectedModeOf8Neighbors},
+      {"UTRAN 0xD00A, 16 cells", technology::kalviUTRAN2, utranNeighborsOf16Cells},
+      {"LTE cell monitor, 16 records", technology::kalviLTE, cellMonitorOf16Records},
+  };
+  return cases;
+}
+
+}  // namespace varnel

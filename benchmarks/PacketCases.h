@@ -1,0 +1,19 @@
+#pragma once
+
+#include <span>
+#include <string_view>
+
+#include "platform/Bytes.h"
+
+namespace varnel {
+
+/// A message whose decoding is measured, and the technology that decodes it.
+struct PacketCase {
+  std::string_view name;
+  std::string_view technology;
+  Bytes (*message)();
+};
+
+std::span<const PacketCase> packetCases();
+
+}  // namespace varnel

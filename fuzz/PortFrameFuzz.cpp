@@ -1,0 +1,32 @@
+#include <algorithm>
+#include <cstddef>
+#include <cstdint>
+#include <cstdlib>
+
+#include "platform/host/PortFrame.h"
+
+using namespace varnel;
+
+// The bytes arrive in pieces whose lengths come from the first byte; the frames in them must be the same as
+// when they arrive at once.
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  if (size == 0) return 0;
+  const ByteView stream(data + 1, size - 1);
+  const std::size_t pieceSize = data[0] + std::size_t{1};
+
+  FrameReader whole;
+  whole.feed(stream);
+  Bytes expected;
+  while (const auto frame = whole.next()) appendFrame(expected, *frame);
+
+  FrameReader pieces;
+  Bytes found;
+  for (ByteView rest = stream; !rest.empty();) {
+    const ByteView piece = rest.first(std::min(pieceSize, rest.size()));
+    rest = rest.subspan(piece.size());
+    pieces.feed(piece);
+    while (const auto frame = pieces.next()) appendFrame(found, *frame);
+  }
+  if (found != expected || pieces.isFaulty() != whole.isFaulty()) std::abort();
+  return 0;
+}
