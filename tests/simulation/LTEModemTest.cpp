@@ -4,14 +4,13 @@
 #include <algorithm>
 #include <cstdio>
 #include <map>
+#include <optional>
 #include <set>
 #include <string>
 #include <vector>
 
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
 #include "platform/TelephonyService.h"
-#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+#include "tests/support/SimulatedMessages.h"
 
 namespace varnel {
 namespace {
@@ -26,28 +25,10 @@ using testing::Le;
 using testing::MatchesRegex;
 using testing::UnorderedElementsAre;
 
-// One message without the prefix that some have.
-struct Message {
-  std::chrono::milliseconds at;
-  bool hasPrefix;
-  Bytes packet;
-
-  unsigned u8(std::size_t offset) const { return packet.at(offset); }
-  unsigned u16(std::size_t offset) const { return u8(offset) | u8(offset + 1) << 8; }
-  unsigned u32(std::size_t offset) const { return u16(offset) | u16(offset + 2) << 16; }
-  unsigned code() const { return (u8(0) == 0xFF ? 0xFF0000 : 0) | u16(3); }
-  Value payload() const { return readPropertyList(ByteView(packet).subspan(13)).value_or(Value()); }
-};
+using Message = SimulatedPacket;
 
 std::vector<Message> messages(std::uint64_t seed, std::chrono::milliseconds duration) {
-  const auto modem = simulatedModem("kalvi-lte", seed);
-  std::vector<Message> messages;
-  for (SimulatedMessage next = modem->next(); next.at <= duration; next = modem->next()) {
-    const bool hasPrefix = next.bytes.at(0) == 0x81;
-    if (hasPrefix) next.bytes.erase(next.bytes.begin(), next.bytes.begin() + 2);
-    messages.push_back({next.at, hasPrefix, next.bytes});
-  }
-  return messages;
+  return simulatedMessages("kalvi-lte", seed, duration);
 }
 
 std::vector<Message> messagesOf(unsigned code, std::chrono::milliseconds duration, std::uint64_t seed = 1) {
@@ -56,18 +37,10 @@ std::vector<Message> messagesOf(unsigned code, std::chrono::milliseconds duratio
   return all;
 }
 
-std::string text(const Value& dictionary, std::string_view key) {
-  const std::string* found = dictionary.dictionary()->get(key).string();
-  return found ? *found : "(none)";
-}
-
-std::int64_t number(const Value& dictionary, std::string_view key) {
-  return dictionary.dictionary()->get(key).integer().value_or(-999);
-}
-
 TEST(SimulatedModems, OnlyWhatIsSimulatedIsMade) {
-  EXPECT_THAT(simulatedTechnologies(), testing::ElementsAre("kalvi-lte"));
+  EXPECT_THAT(simulatedTechnologies(), testing::ElementsAre("kalvi-lte", "kalvi-utran-2"));
   EXPECT_EQ(simulatedModem("kalvi-lte", 1)->technology(), "kalvi-lte");
+  EXPECT_EQ(simulatedModem("kalvi-utran-2", 1)->technology(), "kalvi-utran-2");
   EXPECT_EQ(simulatedModem("kalvi-5g", 1), nullptr);
 }
 
@@ -102,10 +75,14 @@ TEST(LTEModem, AFewMessagesASecond) {
   EXPECT_THAT(count, AllOf(Ge(300u), Le(1500u)));
 }
 
-TEST(LTEModem, EveryKindOfMessageComesWithinTwoSeconds) {
-  std::set<unsigned> codes;
-  for (const Message& message : messages(5, 2s)) codes.insert(message.code());
-  EXPECT_THAT(codes, UnorderedElementsAre(0xB0C1u, 0xB0C2u, 0xFF0000u, 0xFF0001u, 0xFF0002u));
+TEST(LTEModem, EveryKindOfMessageComesWithinAMinute) {
+  for (const std::uint64_t seed : {1, 2, 3, 4, 5, 6, 7, 8}) {
+    std::set<unsigned> codes;
+    for (const Message& message : messages(seed, 1min)) codes.insert(message.code());
+    EXPECT_THAT(codes, UnorderedElementsAre(0xB0C1u, 0xB0C2u, 0xB179u, 0xB17Fu, 0xB180u, 0xB186u, 0xFF0000u,
+                                            0xFF0001u, 0xFF0002u))
+        << seed;
+  }
 }
 
 TEST(LTEModem, SomeMessagesHaveThePrefixAndMostHaveNone) {
@@ -169,6 +146,250 @@ TEST(LTEModem, ACellKeepsItsArea) {
   }
 }
 
+// What a measurement says of a carrier's cell, in its own units.
+struct Cell {
+  unsigned channel, code;
+  auto operator<=>(const Cell&) const = default;
+};
+
+// The fields of 0xB17F that levels are in.
+struct ServingMeasurement {
+  explicit ServingMeasurement(const Message& message)
+      : cell{message.u16(17), message.u16(19) & 0x1FF},
+        measuredRSRP(message.u16(21) & 0x1FF),
+        averageRSRP(message.u16(22) >> 1 & 0x1FF),
+        measuredRSRQ(message.u16(23) >> 2 & 0x7F),
+        averageRSRQ(message.u8(24) >> 1),
+        rssi(message.u16(25) & 0x1FF),
+        left(message.u8(29) & 0x7F) {}
+
+  Cell cell;
+  unsigned measuredRSRP, averageRSRP, measuredRSRQ, averageRSRQ, rssi, left;
+};
+
+TEST(LTEModem, IdleAndConnectedPhasesFollowEachOther) {
+  struct Phase {
+    bool isConnected;
+    std::chrono::milliseconds start;
+  };
+  std::vector<Phase> phases;
+  for (const Message& message : messages(1, 10min)) {
+    const bool isConnected = message.code() == 0xB179;
+    if (!isConnected && message.code() != 0xB17F && message.code() != 0xB180) continue;
+    if (phases.empty() || phases.back().isConnected != isConnected)
+      phases.push_back({isConnected, message.at});
+  }
+  EXPECT_GE(phases.size(), 20u);
+  EXPECT_FALSE(phases.at(0).isConnected);
+  for (std::size_t i = 1; i < phases.size(); ++i) EXPECT_GE(phases[i].start - phases[i - 1].start, 6s) << i;
+}
+
+TEST(LTEModem, ServingCellMeasurementsComeEveryOneOrTwoSecondsOfIdling) {
+  const auto all = messagesOf(0xB17F, 12s);
+  EXPECT_THAT(all.size(), AllOf(Ge(8u), Le(12u)));
+}
+
+TEST(LTEModem, ServingCellMeasurementsAreBelievable) {
+  Cell serving{};
+  std::set<unsigned> levels, qualities, rules;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0xB0C2) serving = {message.u16(16), message.u16(14)};
+    if (message.code() != 0xB17F) continue;
+    ASSERT_EQ(message.packet.size(), 33u);
+    const ServingMeasurement measurement(message);
+    EXPECT_EQ(measurement.cell, serving);
+    EXPECT_THAT(message.u8(20) >> 1 & 0xF, AnyOf(5u, 6u));  // priority
+    // From -120 to -40 dBm, in quarters above -140, and -19.5 to -2 dB above -30.
+    EXPECT_THAT(measurement.averageRSRP, AllOf(Ge(80u), Le(400u)));
+    EXPECT_THAT(measurement.averageRSRQ, AllOf(Ge(42u), Le(112u)));
+    EXPECT_NEAR(measurement.measuredRSRP, measurement.averageRSRP, 9);
+    EXPECT_NEAR(measurement.measuredRSRQ, measurement.averageRSRQ, 9);
+    // The six resource blocks measured have 7.78 dB more than one.
+    const double rsrp_dbm = measurement.averageRSRP * 0.25 - 140,
+                 rsrq_db = measurement.averageRSRQ * 0.25 - 30;
+    EXPECT_NEAR(measurement.rssi * 0.5 - 140, rsrp_dbm + 7.78 - rsrq_db, 0.8);
+    EXPECT_EQ(message.u8(26) >> 1 & 0x3F, 8u);                // -124 dBm
+    EXPECT_NEAR(measurement.left - 30.0, rsrp_dbm + 124, 1);  // above them
+    EXPECT_EQ(message.u16(26) >> 7 & 0x7F, 53u);              // 23 dBm
+    EXPECT_EQ(message.u16(27) >> 6 & 0x3F, 53u);              // 23 dBm
+    EXPECT_EQ((message.u16(29) >> 7) & 0x3F, 0u);             // no cycle without coverage
+    EXPECT_EQ(message.u16(30) >> 5 & 0x3F, 29u);              // 58 dB
+    EXPECT_EQ(message.u16(31) >> 3 & 0x3F, 22u);              // 44 dB
+    EXPECT_EQ(message.u8(32) >> 2 & 0xF, measurement.left > 74 ? 1u : 5u);
+    levels.insert(measurement.averageRSRP);
+    qualities.insert(measurement.averageRSRQ);
+    rules.insert(message.u8(32));
+  }
+  EXPECT_GE(levels.size(), 50u);
+  EXPECT_GE(qualities.size(), 10u);
+  EXPECT_GE(rules.size(), 3u);
+}
+
+TEST(LTEModem, TheCellMonitorHasTheLevelOfTheMeasurements) {
+  struct Monitored {
+    std::int64_t code, rssi_dbm;
+    std::chrono::milliseconds at;
+  };
+  std::optional<Monitored> monitored;
+  int compared = 0;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0xFF0001) {
+      const Value serving = message.payload().array()->at(0);
+      monitored = {numberOf(serving, cellMonitor::physicalCellIdentity), numberOf(serving, cellMonitor::rssi),
+                   message.at};
+    }
+    if (message.code() != 0xB17F || !monitored || message.at - monitored->at > 200ms) continue;
+    const ServingMeasurement measurement(message);
+    if (measurement.cell.code != monitored->code) continue;
+    EXPECT_NEAR(measurement.rssi * 0.5 - 140, static_cast<double>(monitored->rssi_dbm), 4);
+    ++compared;
+  }
+  EXPECT_GE(compared, 50);
+}
+
+TEST(LTEModem, IdleNeighboursEnterAndLeave) {
+  Cell serving{};
+  std::map<unsigned, std::set<unsigned>> heard;  // by carrier
+  int entered = 0, left = 0;
+  for (const Message& message : messages(1, 10min)) {
+    if (message.code() == 0xB0C2) serving = {message.u16(16), message.u16(14)};
+    if (message.code() != 0xB180) continue;
+    EXPECT_EQ(message.u8(19) & 0x3F, 8u);  // -124 dBm
+    const unsigned count = (message.u16(19) >> 6 & 0x1F) + 1;
+    ASSERT_EQ(message.packet.size(), 21 + 20 * count);
+    const unsigned channel = message.u16(17);
+    std::set<unsigned> codes;
+    for (std::size_t record = 21; record < message.packet.size(); record += 20) {
+      const Cell cell{channel, message.u16(record) & 0x1FF};
+      EXPECT_NE(cell, serving);
+      EXPECT_LE(cell.code, 503u);
+      codes.insert(cell.code);
+      const unsigned rssi = message.u16(record + 1) >> 1 & 0xFF, average = message.u16(record + 4) & 0x1FF;
+      const unsigned measured = message.u16(record + 2) >> 1 & 0x1FF;
+      // From -124 to -40 dBm, in halves above -140, and -19.5 to -2 dB, in quarters above -30.
+      EXPECT_THAT(average, AllOf(Ge(32u), Le(200u)));
+      EXPECT_NEAR(measured, average, 5);
+      EXPECT_LT(average, rssi);
+      EXPECT_EQ(rssi, message.u16(22) >> 1 & 0xFF);  // one for the carrier
+      EXPECT_THAT(message.u8(record + 6) & 0x7F, AllOf(Ge(42u), Le(112u)));
+      EXPECT_NEAR(message.u8(record + 5) >> 1, message.u8(record + 6) & 0x7F, 9);
+      EXPECT_NEAR((message.u16(record + 6) >> 7 & 0x7F) - 30.0, average * 0.5 - 140 + 124, 1);
+      EXPECT_LE(message.u16(record + 8), 300u);
+      EXPECT_LE(message.u16(record + 12) & 0x7FF, 1023u);
+      // Ten milliseconds of samples, 19 bits from bit 3 on.
+      const unsigned sample = (message.u16(record + 13) | message.u8(record + 15) << 16) >> 3;
+      EXPECT_LT(sample, 307'204u);
+    }
+    EXPECT_EQ(codes.size(), count);
+    if (const auto before = heard.find(channel); before != heard.end()) {
+      for (const unsigned code : codes) entered += !before->second.contains(code);
+      for (const unsigned code : before->second) left += !codes.contains(code);
+    }
+    heard[channel] = codes;
+  }
+  EXPECT_GE(heard.size(), 2u);
+  EXPECT_GE(entered, 10);
+  EXPECT_GE(left, 10);
+}
+
+TEST(LTEModem, ConnectedMeasurementsTellTheCellsOfTheServingCarrier) {
+  Cell serving{};
+  std::set<unsigned> neighbours, detected, levels;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0xB0C2) serving = {message.u16(16), message.u16(14)};
+    if (message.code() != 0xB179) continue;
+    EXPECT_EQ((Cell{message.u16(17), message.u16(19)}), serving);
+    EXPECT_LT(message.u16(21), 10'240u);
+    // From -120 to -40 dBm, in quarters above -140, and -19.5 to -2 dB, in eighths above -20.
+    EXPECT_THAT(message.u16(23), AllOf(Ge(80u), Le(400u)));
+    EXPECT_THAT(message.u16(25), AllOf(Ge(4u), Le(144u)));
+    levels.insert(message.u16(23));
+    const unsigned neighbourCount = message.u8(27), detectedCount = message.u8(28);
+    ASSERT_EQ(message.packet.size(), 29 + 6 * neighbourCount + 2 * detectedCount);
+    std::set<unsigned> codes{serving.code};
+    for (std::size_t i = 0; i < neighbourCount; ++i) {
+      const std::size_t record = 29 + 6 * i;
+      codes.insert(message.u16(record));
+      neighbours.insert(message.u16(record));
+      EXPECT_THAT(message.u16(record + 2), AllOf(Ge(64u), Le(400u)));
+      EXPECT_THAT(message.u16(record + 4), AllOf(Ge(4u), Le(144u)));
+    }
+    for (std::size_t i = 0; i < detectedCount; ++i) {
+      codes.insert(message.u16(29 + 6 * neighbourCount + 2 * i));
+      detected.insert(message.u16(29 + 6 * neighbourCount + 2 * i));
+    }
+    EXPECT_EQ(codes.size(), 1 + neighbourCount + detectedCount);
+    EXPECT_LE(*codes.rbegin(), 503u);
+  }
+  EXPECT_GE(neighbours.size(), 10u);
+  EXPECT_GE(detected.size(), 10u);
+  EXPECT_GE(levels.size(), 50u);
+}
+
+TEST(LTEModem, ReselectionCandidatesComeOneAtATimeAndAreOfEveryTechnology) {
+  std::map<unsigned, std::set<unsigned>> priorities;  // by technology
+  for (const Message& message : messagesOf(0xB186, 10min)) {
+    EXPECT_TRUE(carriers.at(3).firstDownlink <= message.u16(15) && message.u16(15) <= 38249)
+        << message.u16(15);
+    EXPECT_LE(message.u16(17), 503u);
+    ASSERT_EQ(message.u16(19), 1u);
+    const unsigned technology = message.u16(23);
+    priorities[technology].insert(message.u16(21));
+    ASSERT_EQ(message.packet.size(), technology < 3 ? 29u : 33u);
+    switch (technology) {
+      case 0:
+        EXPECT_THAT(message.u16(25), AllOf(Ge(1200u), Le(38249u)));
+        EXPECT_LE(message.u16(27) >> 7, 503u);
+        EXPECT_EQ(message.u16(27) & 0x7F, 0u);
+        break;
+      case 1:
+        EXPECT_EQ(message.u16(25), 10588u);
+        EXPECT_LE(message.u16(27), 511u);
+        break;
+      case 2:
+        EXPECT_THAT(message.u16(25), AllOf(Ge(10u), Le(50u)));
+        EXPECT_EQ(message.u8(27), 8u);
+        EXPECT_LE(message.u8(28), 63u);
+        break;
+      case 3:
+      case 4:
+        EXPECT_EQ(message.u8(25), 0u);
+        EXPECT_EQ(message.u16(29), technology == 3 ? 283u : 78u);
+        EXPECT_LE(message.u16(31), 511u);
+        EXPECT_EQ(message.u16(31) % 4, 0u);
+        break;
+      default:
+        ADD_FAILURE() << technology;
+    }
+  }
+  EXPECT_EQ(priorities,
+            (std::map<unsigned, std::set<unsigned>>{{0, {5, 6}}, {1, {4}}, {2, {2}}, {3, {1}}, {4, {3}}}));
+}
+
+TEST(LTEModem, AnIdlePhoneTellsACandidateBeforeItReselectsIt) {
+  std::optional<Cell> serving;
+  bool isConnected = false;
+  int reselections = 0;
+  Message previous;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0xB179) isConnected = true;
+    if (message.code() == 0xB17F) isConnected = false;
+    if (message.code() == 0xB0C2) {
+      const Cell cell{message.u16(16), message.u16(14)};
+      if (serving && cell != *serving && !isConnected) {
+        ++reselections;
+        ASSERT_EQ(previous.code(), 0xB186u) << message.at.count();
+        EXPECT_EQ((Cell{previous.u16(15), previous.u16(17)}), *serving);
+        EXPECT_EQ(previous.u16(23), 0u);
+        EXPECT_EQ((Cell{previous.u16(25), previous.u16(27) >> 7}), cell);
+      }
+      serving = cell;
+    }
+    previous = message;
+  }
+  EXPECT_GE(reselections, 5);
+}
+
 TEST(LTEModem, AntennasAreOneTwoOrFour) {
   const auto all = messagesOf(0xB0C1, 10min);
   EXPECT_GE(all.size(), 60u);
@@ -189,7 +410,7 @@ TEST(LTEModem, SimFilesAreTexts) {
     ASSERT_NE(file.value.string(), nullptr) << file.key;
     EXPECT_FALSE(file.value.string()->empty()) << file.key;
   }
-  EXPECT_THAT(text(files, "kSimFile_ICCID"), MatchesRegex("8900101[0-9]{12}"));
+  EXPECT_THAT(textOf(files, "kSimFile_ICCID"), MatchesRegex("8900101[0-9]{12}"));
 }
 
 TEST(LTEModem, TheSimCardRegistersInTheServingCellsArea) {
@@ -198,7 +419,7 @@ TEST(LTEModem, TheSimCardRegistersInTheServingCellsArea) {
   for (const Message& message : messages(1, 30min)) {
     if (message.code() == 0xB0C2) area = message.u16(26);
     if (message.code() != 0xFF0000 || area == 0) continue;
-    const std::string location = text(message.payload(), "kSimFile_LOCI");
+    const std::string location = textOf(message.payload(), "kSimFile_LOCI");
     char areaText[24];
     std::snprintf(areaText, sizeof areaText, "LAI 001-01-%04X", area);
     EXPECT_NE(location.find(areaText), std::string::npos) << location << ", not " << areaText;
@@ -215,22 +436,22 @@ TEST(LTEModem, TheCellMonitorTellsTheServingCellAndNeighboursOfEveryTechnology) 
     ASSERT_NE(records.array(), nullptr);
     int serving = 0;
     for (const Value& record : *records.array()) {
-      technologies.insert(text(record, cellMonitor::radioAccessTechnology));
-      if (text(record, cellMonitor::cellType) != cellMonitor::serving) continue;
+      technologies.insert(textOf(record, cellMonitor::radioAccessTechnology));
+      if (textOf(record, cellMonitor::cellType) != cellMonitor::serving) continue;
       ++serving;
-      EXPECT_EQ(text(record, cellMonitor::radioAccessTechnology), "LTE");
-      EXPECT_EQ(number(record, cellMonitor::mcc), 1);
-      EXPECT_EQ(number(record, cellMonitor::mnc), 1);
-      EXPECT_THAT(number(record, cellMonitor::physicalCellIdentity), AllOf(Ge(0), Le(503)));
-      const Carrier& carrier = carriers.at(static_cast<unsigned>(number(record, cellMonitor::bandInfo)));
-      EXPECT_THAT(number(record, cellMonitor::uarfcn),
+      EXPECT_EQ(textOf(record, cellMonitor::radioAccessTechnology), "LTE");
+      EXPECT_EQ(numberOf(record, cellMonitor::mcc), 1);
+      EXPECT_EQ(numberOf(record, cellMonitor::mnc), 1);
+      EXPECT_THAT(numberOf(record, cellMonitor::physicalCellIdentity), AllOf(Ge(0), Le(503)));
+      const Carrier& carrier = carriers.at(static_cast<unsigned>(numberOf(record, cellMonitor::bandInfo)));
+      EXPECT_THAT(numberOf(record, cellMonitor::uarfcn),
                   AllOf(Ge(carrier.firstDownlink), Le(carrier.lastDownlink)));
-      EXPECT_THAT(number(record, cellMonitor::rssi), AllOf(Ge(-130), Le(-40)));
-      levels.insert(number(record, cellMonitor::rssi));
+      EXPECT_THAT(numberOf(record, cellMonitor::rssi), AllOf(Ge(-130), Le(-40)));
+      levels.insert(numberOf(record, cellMonitor::rssi));
     }
     EXPECT_EQ(serving, 1);
   }
-  EXPECT_THAT(technologies, UnorderedElementsAre("GSM", "LTE", "UMTS"));
+  EXPECT_THAT(technologies, UnorderedElementsAre("GSM", "LTE", "UMTS", "UTRAN"));
   EXPECT_GE(levels.size(), 5u);
 }
 
@@ -240,9 +461,9 @@ TEST(LTEModem, TheCellMonitorAgreesWithTheModem) {
     if (message.code() == 0xB0C2) areas[message.u32(22)] = message.u16(26);
     if (message.code() != 0xFF0001) continue;
     const Value serving = message.payload().array()->at(0);
-    ASSERT_TRUE(areas.contains(number(serving, cellMonitor::cellIdentity)));
-    EXPECT_EQ(number(serving, cellMonitor::trackingAreaCode),
-              areas[number(serving, cellMonitor::cellIdentity)]);
+    ASSERT_TRUE(areas.contains(numberOf(serving, cellMonitor::cellIdentity)));
+    EXPECT_EQ(numberOf(serving, cellMonitor::trackingAreaCode),
+              areas[numberOf(serving, cellMonitor::cellIdentity)]);
   }
 }
 
@@ -255,9 +476,9 @@ TEST(LTEModem, PacketDataContextsComeAndGo) {
     counts.insert(contexts.array()->size());
     for (const Value& context : *contexts.array()) {
       for (const auto& row : *context.dictionary()) EXPECT_NE(row.value.string(), nullptr) << row.key;
-      accessPoints.insert(text(context, "APN"));
-      states.insert(text(context, "State"));
-      if (text(context, "APN") == "internet") received.insert(text(context, "Bytes Received"));
+      accessPoints.insert(textOf(context, "APN"));
+      states.insert(textOf(context, "State"));
+      if (textOf(context, "APN") == "internet") received.insert(textOf(context, "Bytes Received"));
     }
   }
   EXPECT_GE(counts.size(), 2u);

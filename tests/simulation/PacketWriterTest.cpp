@@ -25,9 +25,26 @@ TEST(PacketWriter, NumbersAreLittleEndianAtOffsetsFromTheStart) {
             (Bytes{0x11, 0x33, 0x22, 0x77, 0x66, 0x55, 0x44, 0xFF}));
 }
 
+TEST(PacketWriter, AFieldOfBitsGoesOnIntoTheNextBytes) {
+  const Bytes packet = PacketWriter(PacketWriter::LogType::Modem, 0, 0ms, 17)
+                           .bits(13, 1, 3, 5)
+                           .bits(13, 4, 9, 0x1A5)
+                           .bits(14, 7, 10, 0x201)
+                           .finish();
+  // From the lowest bit: 0 101 | 0xA5 and 1 | 00 | 0x201
+  EXPECT_EQ(Bytes(packet.begin() + 13, packet.end()), (Bytes{0x5A, 0x9A, 0x00, 0x01}));
+}
+
+TEST(PacketWriter, AFieldOfBitsHoldsTheNearestNumberThatItCan) {
+  const Bytes packet =
+      PacketWriter(PacketWriter::LogType::Modem, 0, 0ms, 15).bits(13, 0, 7, 128).bits(14, 0, 8, -1).finish();
+  EXPECT_EQ(Bytes(packet.begin() + 13, packet.end()), (Bytes{0x7F, 0x00}));
+}
+
 TEST(PacketWriter, NothingIsWrittenPastTheEnd) {
   PacketWriter writer(PacketWriter::LogType::Modem, 0, 0ms, 14);
   EXPECT_THROW(writer.u16(13, 1), std::out_of_range);
+  EXPECT_THROW(writer.bits(13, 7, 2, 0), std::out_of_range);
 }
 
 TEST(PacketWriter, AServerMessageIsAHeaderAndItsPayload) {

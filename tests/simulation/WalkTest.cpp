@@ -59,6 +59,13 @@ TEST(Walk, CellsComeStrongestFirstAndByTechnology) {
   EXPECT_TRUE(walk.cells(Access::UMTS).empty());
 }
 
+TEST(Walk, DistancesGoTheShorterWayRound) {
+  const Walk walk({streetLength_cm, {cellAt(100'00)}}, Random(1));
+  EXPECT_EQ(walk.distance_cm(cellAt(100'00), cellAt(400'00)), 300'00);
+  EXPECT_EQ(walk.distance_cm(cellAt(400'00), cellAt(100'00)), 300'00);
+  EXPECT_EQ(walk.distance_cm(cellAt(1900'00), cellAt(100'00)), 200'00);
+}
+
 TEST(Walk, AnAerialIsWeakBehindItself) {
   Cell up = cellAt(1000'00), down = cellAt(1000'00);
   up.direction = 1;

@@ -4,6 +4,7 @@
 
 #include "platform/Dictionary.h"
 #include "platform/TelephonyService.h"
+#include "programs/varnel-telephonyd/simulation/LTEMeasurement.h"
 
 namespace varnel::simulation {
 
@@ -19,6 +20,11 @@ std::string_view name(Access access) {
       return cellMonitor::umts;
     case Access::LTE:
       return cellMonitor::lte;
+    case Access::UTRAN:
+      return cellMonitor::utran;
+    case Access::CDMA1xRTT:
+    case Access::HRPD:
+      break;
   }
   return {};
 }
@@ -79,7 +85,15 @@ class RecordList {
       case Access::LTE:
         set(record, cellMonitor::uarfcn, cell.channel);
         set(record, cellMonitor::physicalCellIdentity, cell.code);
-        set(record, cellMonitor::rssi, level_dbm);
+        set(record, cellMonitor::rssi, lteRSSI_cdbm(_walk, cell.channel) / 100);
+        break;
+      case Access::UTRAN:
+        set(record, cellMonitor::uarfcn, cell.channel);
+        set(record, cellMonitor::scramblingCode, cell.code);
+        set(record, cellMonitor::rscp, level_dbm);
+        break;
+      case Access::CDMA1xRTT:
+      case Access::HRPD:
         break;
     }
   }
@@ -100,7 +114,8 @@ class RecordList {
 Value cellMonitorRecords(const Walk& walk, const Cell& serving) {
   RecordList list(walk);
   list.addServing(serving);
-  for (const Access access : {Access::LTE, Access::UMTS, Access::GSM}) list.addNeighbours(serving, access);
+  for (const Access access : {Access::LTE, Access::UTRAN, Access::UMTS, Access::GSM})
+    list.addNeighbours(serving, access);
   return list.records();
 }
 

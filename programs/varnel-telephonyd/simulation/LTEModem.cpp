@@ -1,47 +1,107 @@
 #include "programs/varnel-telephonyd/simulation/LTEModem.h"
 
-#include "platform/PropertyList.h"
+#include <algorithm>
+
 #include "platform/TelephonyService.h"
-#include "programs/varnel-telephonyd/simulation/CellMonitor.h"
 #include "programs/varnel-telephonyd/simulation/PacketWriter.h"
 
 namespace varnel::simulation {
 
 namespace {
 
-constexpr std::uint16_t servingCellCode = 0xB0C2, antennasCode = 0xB0C1;
-constexpr std::uint16_t simFilesCode = 0, cellMonitorCode = 1, packetDataCode = 2;
+using namespace std::chrono_literals;
+
+constexpr std::uint16_t antennasCode = 0xB0C1, servingCellCode = 0xB0C2, connectedMeasurementCode = 0xB179,
+                        servingMeasurementCode = 0xB17F, neighboursCode = 0xB180, candidatesCode = 0xB186;
+
+// What the network broadcasts.
+constexpr std::int64_t minimumLevel_dbm = -124, maximumPower_dbm = 23;
+constexpr std::int64_t intraFrequencySearch_db = 58, otherSearch_db = 44;
+
+// Levels are sent in steps above a lowest one.
+struct Scale {
+  std::int64_t lowest_cdb, stepsPerDecibel;
+
+  constexpr std::int64_t steps(std::int64_t level_cdb) const {
+    return (level_cdb - lowest_cdb) * stepsPerDecibel / 100;
+  }
+};
+constexpr Scale rsrp{-140'00, 4}, rsrq{-30'00, 4}, rssi{-140'00, 2};
+constexpr Scale neighbourRSRP{-140'00, 2}, connectedRSRQ{-20'00, 8};
+
+// Powers and what is left above the minimum are sent in decibels above -30, minimum levels in steps of 2 dB
+// above -140 dBm, search thresholds in steps of 2 dB.
+constexpr std::int64_t power(std::int64_t power_dbm) { return power_dbm + 30; }
+constexpr std::int64_t minimumLevel(std::int64_t level_dbm) { return (level_dbm + 140) / 2; }
+constexpr std::int64_t threshold(std::int64_t threshold_db) { return threshold_db / 2; }
+
+std::int64_t aboveMinimum_db(std::int64_t level_cdbm) { return level_cdbm / 100 - minimumLevel_dbm; }
+
+// How much the network would like the phone to use a technology and its bands, 7 the most.
+int priority(const Cell& cell) {
+  switch (cell.access) {
+    case Access::LTE:
+      return cell.band == 3 ? 6 : 5;
+    case Access::UMTS:
+    case Access::UTRAN:
+      return 4;
+    case Access::HRPD:
+      return 3;
+    case Access::GSM:
+      return 2;
+    case Access::CDMA1xRTT:
+      return 1;
+  }
+  return 0;
+}
+
+const LTEMeasurement& measurementOf(const Cell& cell, const std::vector<LTEMeasurement>& carrier) {
+  return *std::ranges::find(carrier, &cell, &LTEMeasurement::cell);
+}
+
+// Every cell keeps a time of its own, and so is off from the others by a part of a frame.
+struct CellTiming {
+  explicit CellTiming(const Cell& cell) : scattered(cell.identity * 2654435761u) {}
+
+  std::uint32_t scattered;
+  std::int64_t frame() const { return scattered >> 22; }
+  std::int64_t sample() const { return scattered % 307'200; }
+  std::int64_t frequency() const { return scattered >> 12 & 0xFF; }
+};
 
 }  // namespace
 
-// The braces keep the order in which the parts of the world draw their randomness.
-LTEModem::LTEModem(Random random)
-    : ScheduledModem(random.fork()),
-      _walk{Town::build(random.fork()), random.fork()},
-      _selection(_walk, Access::LTE),
-      _card(random.fork(), servingCell().area),
-      _packetData(random.fork()) {
-  using namespace std::chrono_literals;
-  repeat({.first = 0ms, .interval = Walk::stepTime}, [this] { walk(); });
-  repeat({.first = 0ms, .interval = 1s}, [this] { _packetData.step(); });
-  repeat({.first = 10ms, .interval = 60s, .jitter = 2s}, [this] { sendSimFiles(); });
+LTEModem::LTEModem(Random random) : WalkingModem(random, Access::LTE), _random(random.fork()) {
+  _phaseEnd = std::chrono::seconds(_random.between(15, 30));
   repeat({.first = 20ms, .interval = 4s, .jitter = 300ms}, [this] { sendServingCell(); });
   repeat({.first = 30ms, .interval = 5s, .jitter = 300ms}, [this] { sendAntennas(); });
-  repeat({.first = 150ms, .interval = 1s, .jitter = 40ms}, [this] { sendCellMonitor(); });
-  repeat({.first = 1200ms, .interval = 2s, .jitter = 90ms}, [this] { sendPacketDataContexts(); });
+  repeatIn(Phase::Idle, {.first = 40ms, .interval = 1280ms, .jitter = 20ms},
+           &LTEModem::sendServingMeasurement);
+  repeatIn(Phase::Idle, {.first = 60ms, .interval = 2560ms, .jitter = 40ms}, &LTEModem::sendNeighbours);
+  repeatIn(Phase::Idle, {.first = 900ms, .interval = 3s, .jitter = 100ms}, &LTEModem::considerReselection);
+  repeatIn(Phase::Connected, {.first = 80ms, .interval = 480ms, .jitter = 10ms},
+           &LTEModem::sendConnectedMeasurement);
 }
 
 std::string_view LTEModem::technology() const { return varnel::technology::kalviLTE; }
 
-void LTEModem::walk() {
-  const int area = servingCell().area;
-  _walk.step();
-  if (!_selection.update()) return;
+void LTEModem::repeatIn(Phase phase, Pace pace, void (LTEModem::*task)()) {
+  repeat(pace, [=, this] {
+    if (_phase == phase) (this->*task)();
+  });
+}
+
+void LTEModem::stepWalked() {
+  if (now() < _phaseEnd) return;
+  _phase = _phase == Phase::Idle ? Phase::Connected : Phase::Idle;
+  _phaseEnd =
+      now() + std::chrono::seconds(_phase == Phase::Idle ? _random.between(15, 30) : _random.between(8, 20));
+}
+
+void LTEModem::servingCellChanged(const Cell& previous) {
+  if (_phase == Phase::Idle) sendReselectionCandidate(previous, servingCell());
   sendServingCell();
   sendAntennas();
-  if (servingCell().area == area) return;
-  _card.registerIn(servingCell().area);
-  sendSimFiles();
 }
 
 void LTEModem::sendServingCell() {
@@ -77,17 +137,169 @@ void LTEModem::sendAntennas() {
            .finish());
 }
 
-void LTEModem::sendSimFiles() {
-  send(serverMessage(simFilesCode, now(), writeXmlPropertyList(_card.files()).value()));
+void LTEModem::sendServingMeasurement() {
+  constexpr std::size_t size = 33;
+  constexpr std::int64_t lteRules = 0b001, otherTechnologiesRule = 0b100;
+  const Cell& cell = servingCell();
+  const auto carrier = measureLTECarrier(walk(), cell.channel, _random);
+  const LTEMeasurement& serving = measurementOf(cell, carrier);
+  const std::int64_t left_db = aboveMinimum_db(serving.averageRSRP_cdbm);
+  const std::int64_t rules = left_db > otherSearch_db ? lteRules : lteRules | otherTechnologiesRule;
+  send(PacketWriter(PacketWriter::LogType::Modem, servingMeasurementCode, now(), size)
+           .u8(13, 4)  // version
+           .u16(17, cell.channel)
+           .bits(19, 0, 9, cell.code)
+           .bits(20, 1, 4, priority(cell))
+           .bits(21, 0, 9, rsrp.steps(serving.measuredRSRP_cdbm))
+           .bits(22, 1, 9, rsrp.steps(serving.averageRSRP_cdbm))
+           .bits(23, 2, 7, rsrq.steps(serving.measuredRSRQ_cdb))
+           .bits(24, 1, 7, rsrq.steps(serving.averageRSRQ_cdb))
+           .bits(25, 0, 9, rssi.steps(serving.rssi_cdbm))
+           .bits(26, 1, 6, minimumLevel(minimumLevel_dbm))
+           .bits(26, 7, 7, power(maximumPower_dbm))
+           .bits(27, 6, 6, power(maximumPower_dbm))  // of the phone's own
+           .bits(29, 0, 7, power(left_db))
+           .bits(29, 7, 6, 0)  // no cycle without coverage
+           .bits(30, 5, 6, threshold(intraFrequencySearch_db))
+           .bits(31, 3, 6, threshold(otherSearch_db))
+           .bits(32, 1, 1, rules != _measurementRules)
+           .bits(32, 2, 4, rules)
+           .finish());
+  _measurementRules = rules;
 }
 
-void LTEModem::sendCellMonitor() {
-  const Value records = cellMonitorRecords(_walk, servingCell());
-  send(serverMessage(cellMonitorCode, now(), writeBinaryPropertyList(records).value()));
+// One carrier a report, the next in turn on which the phone hears a neighbour.
+void LTEModem::sendNeighbours() {
+  std::vector<int> channels;
+  for (const ReceivedCell& received : walk().cells(Access::LTE)) {
+    if (std::ranges::count(channels, received.cell->channel) == 0) channels.push_back(received.cell->channel);
+  }
+  std::ranges::sort(channels);
+  for (std::size_t tries = 0; tries < channels.size(); ++tries) {
+    if (sendNeighboursOn(channels[_nextCarrier++ % channels.size()])) return;
+  }
 }
 
-void LTEModem::sendPacketDataContexts() {
-  send(serverMessage(packetDataCode, now(), writeXmlPropertyList(_packetData.contexts()).value()));
+bool LTEModem::sendNeighboursOn(int channel) {
+  constexpr std::size_t headSize = 21, recordSize = 20, mostCells = 32;
+  auto cells = measureLTECarrier(walk(), channel, _random);
+  std::erase_if(cells, [this](const LTEMeasurement& measurement) {
+    return measurement.cell == &servingCell() || !measurement.isMeasurable();
+  });
+  if (cells.empty()) return false;
+  cells.resize(std::min(cells.size(), mostCells));
+
+  PacketWriter packet(PacketWriter::LogType::Modem, neighboursCode, now(),
+                      headSize + recordSize * cells.size());
+  packet
+      .u8(13, 3)  // version
+      .u16(17, channel)
+      .bits(19, 0, 6, minimumLevel(minimumLevel_dbm))
+      .bits(19, 6, 5, std::ssize(cells) - 1);
+  std::size_t record = headSize;
+  for (const LTEMeasurement& measurement : cells) {
+    const CellTiming timing(*measurement.cell);
+    packet.bits(record, 0, 9, measurement.cell->code)
+        .bits(record + 1, 1, 8, rssi.steps(measurement.rssi_cdbm))
+        .bits(record + 2, 1, 9, neighbourRSRP.steps(measurement.measuredRSRP_cdbm))
+        .bits(record + 4, 0, 9, neighbourRSRP.steps(measurement.averageRSRP_cdbm))
+        .bits(record + 5, 1, 7, rsrq.steps(measurement.measuredRSRQ_cdb))
+        .bits(record + 6, 0, 7, rsrq.steps(measurement.averageRSRQ_cdb))
+        .bits(record + 6, 7, 7, power(aboveMinimum_db(measurement.averageRSRP_cdbm)))
+        .u16(record + 8, timing.frequency() + _random.between(0, 20))
+        .bits(record + 12, 0, 11, timing.frame())
+        .bits(record + 13, 3, 19, timing.sample() + _random.between(0, 3));
+    record += recordSize;
+  }
+  send(packet.finish());
+  return true;
+}
+
+void LTEModem::sendConnectedMeasurement() {
+  constexpr std::size_t headSize = 29, neighbourSize = 6, detectedSize = 2;
+  const Cell& cell = servingCell();
+  const auto carrier = measureLTECarrier(walk(), cell.channel, _random);
+  const LTEMeasurement& serving = measurementOf(cell, carrier);
+  std::vector<LTEMeasurement> neighbours, detected;
+  for (const LTEMeasurement& measurement : carrier) {
+    if (measurement.cell == &cell) continue;
+    if (measurement.isMeasurable())
+      neighbours.push_back(measurement);
+    else if (measurement.isDetectable())
+      detected.push_back(measurement);
+  }
+
+  const std::size_t size = headSize + neighbourSize * neighbours.size() + detectedSize * detected.size();
+  PacketWriter packet(PacketWriter::LogType::Modem, connectedMeasurementCode, now(), size);
+  packet
+      .u8(13, 3)  // version
+      .u16(17, cell.channel)
+      .u16(19, cell.code)
+      .u16(21, now().count() % 10'240)  // subframe, counted through all frames
+      .bits(23, 0, 16, rsrp.steps(serving.averageRSRP_cdbm))
+      .bits(25, 0, 16, connectedRSRQ.steps(serving.averageRSRQ_cdb))
+      .u8(27, std::ssize(neighbours))
+      .u8(28, std::ssize(detected));
+  std::size_t record = headSize;
+  for (const LTEMeasurement& neighbour : neighbours) {
+    packet.u16(record, neighbour.cell->code)
+        .bits(record + 2, 0, 16, rsrp.steps(neighbour.averageRSRP_cdbm))
+        .bits(record + 4, 0, 16, connectedRSRQ.steps(neighbour.averageRSRQ_cdb));
+    record += neighbourSize;
+  }
+  for (const LTEMeasurement& found : detected) {
+    packet.u16(record, found.cell->code);
+    record += detectedSize;
+  }
+  send(packet.finish());
+}
+
+// The strongest cell of each technology in turn: a phone keeps an eye on all of them.
+void LTEModem::considerReselection() {
+  constexpr Access technologies[] = {Access::LTE, Access::UMTS, Access::GSM, Access::CDMA1xRTT, Access::HRPD};
+  for (const ReceivedCell& received :
+       walk().cells(technologies[_nextCandidate++ % std::size(technologies)])) {
+    if (received.cell == &servingCell()) continue;
+    sendReselectionCandidate(servingCell(), *received.cell);
+    return;
+  }
+}
+
+// One candidate a report: records begin every 4 bytes, so the channel and the cell of one would have to be
+// the priority and the technology of the next.
+void LTEModem::sendReselectionCandidate(const Cell& serving, const Cell& candidate) {
+  constexpr std::size_t record = 21, part = record + 4;
+  constexpr std::size_t size = part + 4, sizeOfCDMA = part + 8;
+  enum Technology { LTE, UTRAN, GERAN, CDMA1xRTT, CDMAHRPD };
+  const bool isCDMA = candidate.access == Access::CDMA1xRTT || candidate.access == Access::HRPD;
+  PacketWriter packet(PacketWriter::LogType::Modem, candidatesCode, now(), isCDMA ? sizeOfCDMA : size);
+  packet
+      .u8(13, 1)  // version
+      .u16(15, serving.channel)
+      .u16(17, serving.code)
+      .u16(19, 1)  // candidate
+      .u16(record, priority(candidate));
+  switch (candidate.access) {
+    case Access::LTE:
+      packet.u16(record + 2, LTE).u16(part, candidate.channel).bits(part + 2, 7, 9, candidate.code);
+      break;
+    case Access::UMTS:
+    case Access::UTRAN:
+      packet.u16(record + 2, UTRAN).u16(part, candidate.channel).u16(part + 2, candidate.code);
+      break;
+    case Access::GSM:
+      // LTE has the number 8 for the band of 900 MHz.
+      packet.u16(record + 2, GERAN).u16(part, candidate.channel).u8(part + 2, 8).u8(part + 3, candidate.code);
+      break;
+    case Access::CDMA1xRTT:
+    case Access::HRPD:
+      packet.u16(record + 2, candidate.access == Access::HRPD ? CDMAHRPD : CDMA1xRTT)
+          .u8(part, candidate.band)
+          .u16(part + 4, candidate.channel)
+          .u16(part + 6, candidate.code);
+      break;
+  }
+  send(packet.finish());
 }
 
 }  // namespace varnel::simulation

@@ -17,6 +17,13 @@ PacketWriter& PacketWriter::put(std::size_t offset, std::size_t width, std::int6
   return *this;
 }
 
+PacketWriter& PacketWriter::bits(std::size_t offset, unsigned firstBit, unsigned width, std::int64_t number) {
+  const std::int64_t field = std::clamp<std::int64_t>(number, 0, (std::int64_t{1} << width) - 1) << firstBit;
+  for (std::size_t i = 0; 8 * i < firstBit + width; ++i)
+    _bytes.at(offset + i) |= static_cast<std::uint8_t>(field >> 8 * i);
+  return *this;
+}
+
 Bytes serverMessage(std::uint16_t code, std::chrono::milliseconds now, ByteView payload) {
   const std::size_t size = PacketWriter::headerSize + payload.size();
   Bytes message = PacketWriter(PacketWriter::LogType::Server, code, now, size).finish();

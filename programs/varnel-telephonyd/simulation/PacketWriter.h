@@ -25,6 +25,11 @@ class PacketWriter {
   PacketWriter& u32(std::size_t offset, std::int64_t number) { return put(offset, 4, number); }
   PacketWriter& u64(std::size_t offset, std::int64_t number) { return put(offset, 8, number); }
 
+  /// A field that begins at that bit of the byte (0: the least significant) and goes on into the bytes
+  /// behind. A number that it cannot hold becomes the nearest that it can, as modems do with what they
+  /// measure.
+  PacketWriter& bits(std::size_t offset, unsigned firstBit, unsigned width, std::int64_t number);
+
   Bytes finish() { return std::move(_bytes); }
 
  private:

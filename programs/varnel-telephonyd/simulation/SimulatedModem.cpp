@@ -2,6 +2,7 @@
 
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/LTEModem.h"
+#include "programs/varnel-telephonyd/simulation/UTRANModem.h"
 
 namespace varnel {
 
@@ -19,6 +20,7 @@ struct Simulation {
 
 constexpr Simulation simulations[] = {
     {technology::kalviLTE, make<simulation::LTEModem>},
+    {technology::kalviUTRAN2, make<simulation::UTRANModem>},
 };
 
 }  // namespace

@@ -1,5 +1,7 @@
 #include "programs/varnel-telephonyd/simulation/Town.h"
 
+#include <utility>
+
 namespace varnel::simulation {
 
 namespace {
@@ -20,7 +22,13 @@ constexpr Carrier furtherCarriers[] = {
     {38, 37900, 100, 2},
 };
 constexpr int umtsBand = 1, umtsChannel = 10588;
+// The carriers of the time-division mode, one a site in turn.
+constexpr int utranBand = 34, utranChannels[] = {10054, 10062, 10070};
+constexpr int cdmaBandClass = 0, cdma1xRTTChannel = 283, hrpdChannel = 78, pilotIncrement = 4;
 constexpr int gsmBand = 900, firstGSMChannel = 10, lastGSMChannel = 50;
+
+// Of the sectors of a site that has two.
+constexpr int directions[] = {1, -1};
 
 // What the cells of one site have in common.
 struct Site {
@@ -38,6 +46,7 @@ class Builder {
   }
 
   Town build() {
+    std::vector<Site> sites;
     for (int number = 0; number < siteCount; ++number) {
       const Site site{number, _firstArea + number / sitesPerArea,
                       number * siteSpacing_cm + _random.between(-20'00, 20'00),
@@ -46,57 +55,84 @@ class Builder {
       addLTE(site, furtherCarriers[_random.between(0, std::ssize(furtherCarriers) - 1)], 11);
       addUMTS(site);
       if (number % 2 == 0) addGSM(site);
+      sites.push_back(site);
+    }
+    // The networks that were built last leave the older ones as they were.
+    for (const Site& site : sites) {
+      addUTRAN(site);
+      if (site.number % 2 == 1) addCDMA(site);
     }
     return {siteCount * siteSpacing_cm, std::move(_cells)};
   }
 
  private:
+  void add(const Site& site, Cell cell) {
+    cell.area = site.area;
+    cell.position_cm = site.position_cm;
+    cell.setback_cm = site.setback_cm;
+    _cells.push_back(cell);
+  }
+
   // Two sectors, one up the street and one down.
   void addLTE(const Site& site, const Carrier& carrier, std::uint32_t firstSector) {
     const auto group = static_cast<int>(_random.between(0, 167));
     for (int sector = 0; sector < 2; ++sector) {
-      _cells.push_back({.access = Access::LTE,
-                        .band = carrier.band,
-                        .channel = carrier.channel,
-                        .resourceBlocks = carrier.resourceBlocks,
-                        .antennas = carrier.antennas,
-                        .code = 3 * group + sector,
-                        .area = site.area,
-                        .identity = (_firstSite + static_cast<std::uint32_t>(site.number)) << 8 |
-                                    (firstSector + static_cast<std::uint32_t>(sector)),
-                        .position_cm = site.position_cm,
-                        .setback_cm = site.setback_cm,
-                        .direction = sector == 0 ? 1 : -1,
-                        .power_cdbm = power(-15'00)});
+      add(site, {.access = Access::LTE,
+                 .band = carrier.band,
+                 .channel = carrier.channel,
+                 .resourceBlocks = carrier.resourceBlocks,
+                 .antennas = carrier.antennas,
+                 .code = 3 * group + sector,
+                 .identity = (_firstSite + static_cast<std::uint32_t>(site.number)) << 8 |
+                             (firstSector + static_cast<std::uint32_t>(sector)),
+                 .direction = directions[sector],
+                 .power_cdbm = power(-15'00)});
     }
   }
   void addUMTS(const Site& site) {
-    _cells.push_back({.access = Access::UMTS,
-                      .band = umtsBand,
-                      .channel = umtsChannel,
-                      .resourceBlocks = 0,
-                      .antennas = 1,
-                      .code = static_cast<int>(_random.between(0, 511)),
-                      .area = site.area,
-                      .identity = 0x10000u + _firstSite + static_cast<std::uint32_t>(site.number),
-                      .position_cm = site.position_cm,
-                      .setback_cm = site.setback_cm,
-                      .direction = 0,
-                      .power_cdbm = power(-12'00)});
+    add(site, {.access = Access::UMTS,
+               .band = umtsBand,
+               .channel = umtsChannel,
+               .code = static_cast<int>(_random.between(0, 511)),
+               .identity = 0x10000u + _firstSite + static_cast<std::uint32_t>(site.number),
+               .power_cdbm = power(-12'00)});
   }
   void addGSM(const Site& site) {
-    _cells.push_back({.access = Access::GSM,
-                      .band = gsmBand,
-                      .channel = static_cast<int>(_random.between(firstGSMChannel, lastGSMChannel)),
-                      .resourceBlocks = 0,
-                      .antennas = 1,
-                      .code = static_cast<int>(_random.between(0, 63)),
-                      .area = site.area,
-                      .identity = 20000u + static_cast<std::uint32_t>(site.number),
-                      .position_cm = site.position_cm,
-                      .setback_cm = site.setback_cm,
-                      .direction = 0,
-                      .power_cdbm = power(-4'00)});
+    add(site, {.access = Access::GSM,
+               .band = gsmBand,
+               .channel = static_cast<int>(_random.between(firstGSMChannel, lastGSMChannel)),
+               .code = static_cast<int>(_random.between(0, 63)),
+               .identity = 12000u + static_cast<std::uint32_t>(site.number),
+               .power_cdbm = power(-4'00)});
+  }
+  // Two sectors on one carrier.
+  void addUTRAN(const Site& site) {
+    const auto firstSector = static_cast<std::uint32_t>(site.number) * 2;
+    // In steps that keep the codes of the town apart.
+    const auto code = static_cast<int>(_random.between(0, 3)) + 10 * site.number;
+    for (int sector = 0; sector < 2; ++sector) {
+      add(site, {.access = Access::UTRAN,
+                 .band = utranBand,
+                 .channel = utranChannels[site.number % std::ssize(utranChannels)],
+                 .code = code + 4 * sector,
+                 .identity = 0x20000u + _firstSite + firstSector + static_cast<std::uint32_t>(sector),
+                 .direction = directions[sector],
+                 .power_cdbm = power(-12'00)});
+    }
+  }
+  // The voice and the data network share the masts and the pilots.
+  void addCDMA(const Site& site) {
+    const int pilot = pilotIncrement * static_cast<int>(_random.between(1, 511 / pilotIncrement));
+    const std::uint32_t identity = 100 + static_cast<std::uint32_t>(site.number);
+    for (const auto& [access, channel] :
+         {std::pair(Access::CDMA1xRTT, cdma1xRTTChannel), std::pair(Access::HRPD, hrpdChannel)}) {
+      add(site, {.access = access,
+                 .band = cdmaBandClass,
+                 .channel = channel,
+                 .code = pilot,
+                 .identity = identity,
+                 .power_cdbm = power(-6'00)});
+    }
   }
 
   std::int64_t power(std::int64_t usual_cdbm) { return usual_cdbm + _random.between(-1'50, 1'50); }

@@ -63,15 +63,19 @@ std::vector<ReceivedCell> Walk::cells(Access access) const {
   return cells;
 }
 
-// From the cell to the phone, by the shorter way round.
-std::int64_t Walk::distanceUpTheStreet_cm(const Cell& cell) const {
+std::int64_t Walk::distance_cm(const Cell& one, const Cell& other) const {
+  return std::abs(distanceUpTheStreet_cm(one.position_cm, other.position_cm));
+}
+
+// By the shorter way round; negative where that is down the street.
+std::int64_t Walk::distanceUpTheStreet_cm(std::int64_t from_cm, std::int64_t to_cm) const {
   const std::int64_t length = _town.streetLength_cm;
-  const std::int64_t ahead = ((_position_cm - cell.position_cm) % length + length) % length;
+  const std::int64_t ahead = ((to_cm - from_cm) % length + length) % length;
   return ahead <= length / 2 ? ahead : ahead - length;
 }
 
 std::int64_t Walk::meanLevel_cdbm(const Cell& cell) const {
-  const std::int64_t along = distanceUpTheStreet_cm(cell), away = cell.setback_cm;
+  const std::int64_t along = distanceUpTheStreet_cm(cell.position_cm, _position_cm), away = cell.setback_cm;
   const auto squaredDistance_m = static_cast<std::uint64_t>((along * along + away * away) / 10'000);
   // 35 lg of the distance
   const std::int64_t pathLoss = decibels_cdb(squaredDistance_m) * 7 / 4;

@@ -32,6 +32,8 @@ class Walk {
   /// The cells of a technology, the strongest first. Every technology has some.
   std::vector<ReceivedCell> cells(Access access) const;
   std::int64_t level_cdbm(const Cell& cell) const { return stateOf(cell).level_cdbm; }
+  /// How far apart two cells are along the street.
+  std::int64_t distance_cm(const Cell& one, const Cell& other) const;
 
  private:
   struct CellState {
@@ -41,7 +43,7 @@ class Walk {
 
   void walk();
   void measure(const Cell& cell, CellState& state);
-  std::int64_t distanceUpTheStreet_cm(const Cell& cell) const;
+  std::int64_t distanceUpTheStreet_cm(std::int64_t from_cm, std::int64_t to_cm) const;
   std::int64_t meanLevel_cdbm(const Cell& cell) const;
   const CellState& stateOf(const Cell& cell) const {
     return _states[static_cast<std::size_t>(&cell - _town.cells.data())];

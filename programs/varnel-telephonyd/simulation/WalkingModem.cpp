@@ -1,0 +1,54 @@
+#include "programs/varnel-telephonyd/simulation/WalkingModem.h"
+
+#include "platform/PropertyList.h"
+#include "programs/varnel-telephonyd/simulation/CellMonitor.h"
+#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
+
+namespace varnel::simulation {
+
+namespace {
+constexpr std::uint16_t simFilesCode = 0, cellMonitorCode = 1, packetDataCode = 2;
+}  // namespace
+
+// The braces keep the order in which the parts of the world draw their randomness.
+WalkingModem::WalkingModem(Random& random, Access access)
+    : ScheduledModem(random.fork()),
+      _walk{Town::build(random.fork()), random.fork()},
+      _selection(_walk, access),
+      _card(random.fork(), servingCell().area),
+      _packetData(random.fork()) {
+  using namespace std::chrono_literals;
+  repeat({.first = 0ms, .interval = Walk::stepTime}, [this] { step(); });
+  repeat({.first = 0ms, .interval = 1s}, [this] { _packetData.step(); });
+  repeat({.first = 10ms, .interval = 60s, .jitter = 2s}, [this] { sendSimFiles(); });
+  repeat({.first = 150ms, .interval = 1s, .jitter = 40ms}, [this] { sendCellMonitor(); });
+  repeat({.first = 1200ms, .interval = 2s, .jitter = 90ms}, [this] { sendPacketDataContexts(); });
+}
+
+void WalkingModem::step() {
+  const Cell& previous = servingCell();
+  _walk.step();
+  if (_selection.update()) {
+    servingCellChanged(previous);
+    if (servingCell().area != previous.area) {
+      _card.registerIn(servingCell().area);
+      sendSimFiles();
+    }
+  }
+  stepWalked();
+}
+
+void WalkingModem::sendSimFiles() {
+  send(serverMessage(simFilesCode, now(), writeXmlPropertyList(_card.files()).value()));
+}
+
+void WalkingModem::sendCellMonitor() {
+  const Value records = cellMonitorRecords(_walk, servingCell());
+  send(serverMessage(cellMonitorCode, now(), writeBinaryPropertyList(records).value()));
+}
+
+void WalkingModem::sendPacketDataContexts() {
+  send(serverMessage(packetDataCode, now(), writeXmlPropertyList(_packetData.contexts()).value()));
+}
+
+}  // namespace varnel::simulation

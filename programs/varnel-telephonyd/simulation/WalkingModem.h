@@ -1,0 +1,38 @@
+#pragma once
+
+#include "programs/varnel-telephonyd/simulation/CellSelection.h"
+#include "programs/varnel-telephonyd/simulation/PacketData.h"
+#include "programs/varnel-telephonyd/simulation/ScheduledModem.h"
+#include "programs/varnel-telephonyd/simulation/SimCard.h"
+#include "programs/varnel-telephonyd/simulation/Walk.h"
+
+namespace varnel::simulation {
+
+/// A modem that is carried through the town and stays with one technology. It sends what the telephony server
+/// adds to every modem's packets: the SIM card, the cells around and the packet-data contexts.
+class WalkingModem : public ScheduledModem {
+ protected:
+  /// Draws from the source what the world needs.
+  WalkingModem(Random& random, Access access);
+
+  const Walk& walk() const { return _walk; }
+  const Cell& servingCell() const { return _selection.servingCell(); }
+
+  /// A step has been walked; the serving cell may have changed.
+  virtual void stepWalked() = 0;
+  /// Another cell serves from now on.
+  virtual void servingCellChanged(const Cell& previous) = 0;
+
+ private:
+  void step();
+  void sendSimFiles();
+  void sendCellMonitor();
+  void sendPacketDataContexts();
+
+  Walk _walk;
+  CellSelection _selection;
+  SimCard _card;
+  PacketData _packetData;
+};
+
+}  // namespace varnel::simulation
