@@ -73,8 +73,7 @@ Value fieldRow(const Packet& record, std::span<const Field> fields) {
 Array recordRows(const Packet& packet, const Records& records, std::span<const Field> fields) {
   const std::size_t size = extent(fields);
   Array rows;
-  // A count may promise more records than the packet holds.
-  rows.reserve(std::min(records.count, packet.size() / size));
+  rows.reserve(records.count);
   for (std::size_t i = 0; i < records.count; ++i) {
     const std::size_t offset = records.first + records.stride * i;
     if (packet.holds(offset, size)) rows.push_back(fieldRow(packet.from(offset), fields));

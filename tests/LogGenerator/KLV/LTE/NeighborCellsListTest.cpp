@@ -23,7 +23,7 @@ PacketBuilder counted(std::uint8_t byte19, std::uint8_t byte20, std::size_t size
 // A cell whose fields all differ; the bits that no row shows are set.
 void putFirstCell(PacketBuilder& packet, std::size_t at) {
   packet.u8(at, 0x2D)
-      .u8(at + 1, 0x35)
+      .u8(at + 1, 0x37)
       .u8(at + 2, 0xA7)
       .u8(at + 3, 0xFC)
       .u8(at + 4, 0x4F)
@@ -47,7 +47,7 @@ Bytes twoCells() {
 }
 
 constexpr const char* first =
-    R"({Physical Cell ID: "301", Measured RSSI: "-63.00 dBm", Measured RSRP: "-98.50 dBm", )"
+    R"({Physical Cell ID: "301", Measured RSSI: "-62.50 dBm", Measured RSRP: "-98.50 dBm", )"
     R"(Average RSRP: "27.50 dBm", Measured RSRQ: "-12.25 dB", Average RSRQ: "-13.50 dB", Srxlev: "55 dBm", )"
     R"(Frequency Offset: "61453", Ant 0 Frame Offset: "1443", Ant 0 Sample Offset: "312759", )"
     R"(Ant 1 Frame Offset: "1443", Ant 1 Sample Offset: "312759"})";
@@ -61,7 +61,7 @@ constexpr const char* second =
 std::vector<std::string> linesOf(const char* countLine, std::size_t cells) {
   std::vector<std::string> lines = {trace, countLine};
   if (cells > 0) {
-    lines.insert(lines.end(), {"<4>Physical Cell ID: 301\n", "<4>Measured RSSI: -63.000000\n",
+    lines.insert(lines.end(), {"<4>Physical Cell ID: 301\n", "<4>Measured RSSI: -62.500000\n",
                                "<4>Measured RSSI: -98.500000\n", "<4>Measured RSSI: 27.500000\n",
                                "<4>Measured RSSI: -12.250000\n", "<4>Measured RSSI: -13.500000\n"});
   }

@@ -75,9 +75,9 @@ TEST_F(CCTRCHSIRMeasurementTest, AllOnesAreShownUnsigned) {
             R"([{CCTRCH ID: "255", TSNUM: "255", SIR: ["255", "255", "255", "255", "255", "255"]}])");
 }
 
-TEST_F(CCTRCHSIRMeasurementTest, EachBitOfTheCompositeChannelCountCounts) {
+TEST_F(CCTRCHSIRMeasurementTest, EachBitOfTheCompositeChannelCountCountsAndNoOther) {
   const auto count = [&](std::uint8_t byte15) {
-    decode(counted(0x3F, byte15, 2551).bytes());
+    decode(counted(0xFF, byte15, 2551).u8(16, 0xFF).bytes());
     return rowCount();
   };
   EXPECT_EQ(count(0x10), 1u);

@@ -114,6 +114,11 @@ TEST_F(GSMNeighbhorMeasurementsTest, ACountOf0EmptiesTheListSilently) {
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
+TEST_F(GSMNeighbhorMeasurementsTest, RecordsBehindTheLastOneThatIsCountedAreNotShown) {
+  decode(counted(1, 2057).u8(15, 0xFF).u8(17, 0xFF).bytes());
+  EXPECT_EQ(rowCount(), 1u);
+}
+
 TEST_F(GSMNeighbhorMeasurementsTest, TwoHundredFiftyFiveCellsAreAllShown) {
   decode(counted(255, 2057).u16(17, 1).u16(2049, 255).bytes());
   ASSERT_EQ(rowCount(), 255u);

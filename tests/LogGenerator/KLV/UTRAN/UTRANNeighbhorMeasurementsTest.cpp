@@ -115,9 +115,9 @@ TEST_F(UTRANNeighbhorMeasurementsTest, ACountOf0EmptiesTheListWhateverTheLowestB
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(UTRANNeighbhorMeasurementsTest, EachUpperBitOfTheCountByteCounts) {
+TEST_F(UTRANNeighbhorMeasurementsTest, EachUpperBitOfTheCountByteCountsAndNoOther) {
   const auto count = [&](std::uint8_t byte16) {
-    decode(counted(byte16, 2200).bytes());
+    decode(counted(byte16, 2200).u8(15, 0xFF).u8(17, 0xFF).bytes());
     return rowCount();
   };
   EXPECT_EQ(count(0x02), 1u);
@@ -127,6 +127,7 @@ TEST_F(UTRANNeighbhorMeasurementsTest, EachUpperBitOfTheCountByteCounts) {
   EXPECT_EQ(count(0x20), 16u);
   EXPECT_EQ(count(0x40), 32u);
   EXPECT_EQ(count(0x80), 64u);
+  EXPECT_EQ(count(0x01), 0u);
 }
 
 TEST_F(UTRANNeighbhorMeasurementsTest, OneHundredTwentySevenCellsAreAllShown) {
