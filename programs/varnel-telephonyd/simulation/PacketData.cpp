@@ -70,7 +70,7 @@ const char* PacketData::name(State state) {
 }
 
 Value PacketData::contexts() const {
-  const Value list = Value::ofArray();
+  Value list = Value::ofArray();
   int contextID = firstContextID;
   for (const Context& context : _contexts) {
     if (context.state != State::Inactive) list.array()->push_back(rows(context, contextID));
@@ -82,7 +82,7 @@ Value PacketData::contexts() const {
 Value PacketData::rows(const Context& context, int contextID) {
   const Purpose& purpose = *context.purpose;
   const std::string address = purpose.addressPrefix + std::to_string(context.addressNumber);
-  const Value entry = Value::ofDictionary();
+  Value entry = Value::ofDictionary();
   Dictionary& rows = *entry.dictionary();
   rows.set("Context ID", std::to_string(contextID));
   rows.set("APN", purpose.accessPoint);

@@ -56,7 +56,7 @@ void SimCard::registerIn(int area) {
 }
 
 Value SimCard::files() const {
-  const Value files = Value::ofDictionary();
+  Value files = Value::ofDictionary();
   Dictionary& texts = *files.dictionary();
   texts.set("kSimFile_ICCID", _number);
   texts.set("kSimFile_MSISDN", _subscriberNumber);

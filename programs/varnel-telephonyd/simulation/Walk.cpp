@@ -22,7 +22,7 @@ constexpr std::int64_t smoothing_steps = 4;
 
 // 10 lg of a number of at least 1, in hundredths, correct to 0.3; in whole numbers throughout.
 std::int64_t decibels_cdb(std::uint64_t number) {
-  const int exponent = std::bit_width(number) - 1;
+  const auto exponent = static_cast<std::int64_t>(63 - std::countl_zero(number | 1));
   const std::uint64_t mantissa = ((number << 10) >> exponent) - 1024;
   const std::int64_t logarithm_1024ths = exponent * 1024 + static_cast<std::int64_t>(mantissa);
   return logarithm_1024ths * 301 / 1024;
