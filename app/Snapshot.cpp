@@ -12,7 +12,7 @@ constexpr std::string_view snapshotFolder = "/var/mobile/Library/Logs/CrashRepor
 Value snapshotContents(Time created, const Value& saveContents, std::string_view description) {
   Value contents = Value::ofDictionary();
   contents.dictionary()->set("Timestamp", dateDescription(created));
-  contents.dictionary()->set("Data", saveContents);
+  contents.dictionary()->set("Data", saveContents.isAbsent() ? Value::ofArray() : saveContents);
   contents.dictionary()->set("Description", description);
   return contents;
 }

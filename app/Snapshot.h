@@ -13,7 +13,8 @@ namespace varnel {
 inline constexpr std::string_view internalDeviceMarker =
     "/OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 
-/// The contents of a snapshot file: a dictionary of "Timestamp", "Data" and "Description".
+/// The contents of a snapshot file: a dictionary of "Timestamp", "Data" and "Description". Without save
+/// contents "Data" is an empty array.
 Value snapshotContents(Time created, const Value& saveContents, std::string_view description);
 
 /// Writes the snapshot file of that moment into the device's folder of diagnostic logs. False, and a line in

@@ -46,6 +46,13 @@ TEST(Snapshot, TheDataAreTheSaveContents) {
   EXPECT_EQ(*data->front().dictionary()->get("Description").string(), "Snapshot (2024-03-01 14:05:08 +0000)");
 }
 
+TEST(Snapshot, WithoutSaveContentsTheDataAreEmpty) {
+  const Value contents = snapshotContents(friday, Value(), "");
+  const Array* data = contents.dictionary()->get("Data").array();
+  ASSERT_TRUE(data);
+  EXPECT_TRUE(data->empty());
+}
+
 TEST(Snapshot, TheDescriptionIsTheGivenText) {
   EXPECT_EQ(
       *snapshotContents(friday, saveContents(), "in the lift").dictionary()->get("Description").string(),
