@@ -48,10 +48,10 @@ class ClassIndex {
   void status() const;
 
  protected:
-  /// Creates a decoder and registers it.
-  template <class Decoder>
-  std::unique_ptr<Decoder> create() {
-    auto decoder = std::make_unique<Decoder>();
+  /// Creates a decoder and registers it. What the decoders of an index share is handed to each.
+  template <class Decoder, class... Shared>
+  std::unique_ptr<Decoder> create(Shared&... shared) {
+    auto decoder = std::make_unique<Decoder>(shared...);
     decoder->initWithDict_codeDict(classDict, codeDictionary);
     return decoder;
   }

@@ -28,6 +28,7 @@ consteval Source bits(std::uint16_t byte, std::uint8_t firstBit, std::uint8_t wi
 consteval Source u8(std::uint16_t byte) { return bits(byte, 0, 8); }
 consteval Source u16(std::uint16_t byte) { return bits(byte, 0, 16); }
 consteval Source u32(std::uint16_t byte) { return bits(byte, 0, 32); }
+consteval Source s8(std::uint16_t byte) { return {byte, 0, 8, true}; }
 consteval Source s16(std::uint16_t byte) { return {byte, 0, 16, true}; }
 
 /// A raw value and the text that it shows.
@@ -36,9 +37,9 @@ struct Choice {
   std::string_view text;
 };
 
-/// How a raw value becomes a display text. Made by `integer`, `real` and `choice`, below.
+/// How a raw value becomes a display text. Made by `integer`, `real`, `choice` and `entry`, below.
 struct Format {
-  enum class Kind : std::uint8_t { Integer, Real, Choice };
+  enum class Kind : std::uint8_t { Integer, Real, Choice, Entry };
 
   Kind kind = Kind::Integer;
   std::string_view before{}, after{};          // the texts around the number
@@ -47,7 +48,8 @@ struct Format {
   std::int32_t factor = 1, summand = 0;        // integers: raw × factor + summand
   double realFactor = 1.0, realSummand = 0.0;  // reals likewise
   std::span<const Choice> choices{};
-  std::string_view otherwise{};  // the text of a raw value that is no choice
+  std::span<const std::string_view> entries{};
+  std::string_view otherwise{};  // the text of a raw value that is no choice or entry
   Choice exception{};            // a raw value with a text of its own; none while the text is empty
 
   /// The same format, but one raw value shows a text instead.
@@ -115,6 +117,15 @@ consteval Format choice(std::span<const Choice> choices, std::string_view otherw
   return result;
 }
 
+/// The entry that the raw value counts from 0, or past the last one the other text.
+consteval Format entry(std::span<const std::string_view> entries, std::string_view otherwise = "Unknown") {
+  Format result;
+  result.kind = Format::Kind::Entry;
+  result.entries = entries;
+  result.otherwise = otherwise;
+  return result;
+}
+
 /// One row of a packet's table: where the value lies, its display key and how it is shown.
 struct Field {
   Source source;
@@ -137,6 +148,13 @@ constexpr std::size_t extent(std::span<const Field> fields) {
 /// Shows the fields in a section, in the order of the table.
 void setFields(Dictionary& section, const Packet& packet, std::span<const Field> fields);
 
+/// The raw value of a field: a signed one as a 32-bit two's complement.
+std::uint32_t rawValue(const Packet& packet, const Source& source);
+
+/// Shows a number that a decoder has worked out, by an integer format or by a real one.
+void setInteger(Dictionary& section, std::string_view label, const Format& format, std::int32_t number);
+void setReal(Dictionary& section, std::string_view label, const Format& format, double number);
+
 /// A row of its own that shows the fields of a record.
 Value fieldRow(const Packet& record, std::span<const Field> fields);
 
@@ -149,5 +167,7 @@ struct Records {
 
 /// A row a record, in their order. A record whose fields do not lie wholly inside the packet is left out.
 Array recordRows(const Packet& packet, const Records& records, std::span<const Field> fields);
+/// A row for every counted record. Bytes past the packet's end read as 0.
+Array countedRows(const Packet& packet, const Records& records, std::span<const Field> fields);
 
 }  // namespace varnel

@@ -1,5 +1,7 @@
 #include "LogGenerator/KLV/CellMonitor.h"
 
+#include <algorithm>
+#include <limits>
 #include <string>
 
 #include "platform/Log.h"
@@ -10,18 +12,52 @@ namespace varnel {
 
 namespace {
 
+constexpr const char notConstructed[] = "Cell Info Array data could not be constructed";
+
+std::optional<Value> parsedArray(ByteView payload) {
+  auto list = readPropertyList(payload);
+  return list && list->array() ? list : std::nullopt;
+}
+
 bool holdsText(const Dictionary& record, std::string_view key, std::string_view text) {
   const std::string* found = record.get(key).string();
   return found && *found == text;
 }
 
+void showCell(Dictionary& row, const Dictionary& record, std::span<const CellMonitorColumn> columns) {
+  using Width = CellMonitorColumn::Width;
+  for (const CellMonitorColumn& column : columns) {
+    const auto number = record.get(column.key).int32();
+    if (!number) {
+      logError("%s", column.failureMessage);
+    } else if (column.width == Width::Unsigned16) {
+      setInteger(row, column.label, column.format, static_cast<std::uint16_t>(*number));
+    } else if (static_cast<std::int16_t>(*number) == std::numeric_limits<std::int16_t>::max()) {
+      row.setText(column.label, "");
+    } else {
+      setInteger(row, column.label, column.format, static_cast<std::int16_t>(*number));
+    }
+  }
+}
+
 }  // namespace
 
 std::optional<Value> readCellMonitorArray(const Packet& packet) {
-  auto list = readPropertyList(packet.payload());
-  if (list && list->array()) return list;
-  logError("Cell Info Array data could not be constructed");
-  return std::nullopt;
+  auto records = parsedArray(packet.payload());
+  if (!records) logError(notConstructed);
+  return records;
+}
+
+const Array* CellMonitorReader::read(const Packet& packet) {
+  const ByteView payload = packet.payload();
+  if (!_payload || !std::ranges::equal(payload, *_payload)) {
+    _payload.emplace(payload.begin(), payload.end());
+    _records = parsedArray(payload);
+  }
+  if (_records) return _records->array();
+  logError(notConstructed);
+  logError("Failed to get Cell Array\n");
+  return nullptr;
 }
 
 const Dictionary* cellOfKind(const Value& record, std::string_view radioAccessTechnology,
@@ -33,6 +69,14 @@ const Dictionary* cellOfKind(const Value& record, std::string_view radioAccessTe
   return matches ? entries : nullptr;
 }
 
+const Dictionary* firstCellOfKind(const Array& records, std::string_view radioAccessTechnology,
+                                  std::string_view cellType) {
+  for (const Value& record : records) {
+    if (const Dictionary* cell = cellOfKind(record, radioAccessTechnology, cellType)) return cell;
+  }
+  return nullptr;
+}
+
 void showCellMonitorRows(Dictionary& section, const Dictionary& record,
                          std::span<const CellMonitorRow> rows) {
   for (const CellMonitorRow& row : rows) {
@@ -42,6 +86,19 @@ void showCellMonitorRows(Dictionary& section, const Dictionary& record,
       logError("%s", row.failureMessage);
     }
   }
+}
+
+Array cellMonitorList(const Array& records, std::string_view radioAccessTechnology, std::string_view cellType,
+                      std::span<const CellMonitorColumn> columns) {
+  Array rows;
+  for (const Value& record : records) {
+    const Dictionary* cell = cellOfKind(record, radioAccessTechnology, cellType);
+    if (!cell) continue;
+    Value row = Value::ofDictionary();
+    showCell(*row.dictionary(), *cell, columns);
+    rows.push_back(std::move(row));
+  }
+  return rows;
 }
 
 }  // namespace varnel

@@ -4,6 +4,7 @@
 #include <span>
 #include <string_view>
 
+#include "LogGenerator/Field.h"
 #include "LogGenerator/Packet.h"
 #include "platform/Dictionary.h"
 #include "platform/Value.h"
@@ -18,10 +19,27 @@ inline constexpr std::uint32_t cellMonitorLogCode = 0xFF0001;
 /// gives nothing and logs "Cell Info Array data could not be constructed".
 std::optional<Value> readCellMonitorArray(const Packet& packet);
 
+/// Reads cell-monitor packets for several decoders of one index: the packet that all of them get in turn is
+/// parsed but once.
+class CellMonitorReader {
+ public:
+  /// Like `readCellMonitorArray`, message included. The array stays until another packet is read; null when
+  /// there is none, after the further message "Failed to get Cell Array\n".
+  const Array* read(const Packet& packet);
+
+ private:
+  std::optional<Bytes> _payload;  // absent until a packet is read
+  std::optional<Value> _records;
+};
+
 /// The record as a dictionary when it has a radio access technology and a cell type and they are the given
 /// ones; else null.
 const Dictionary* cellOfKind(const Value& record, std::string_view radioAccessTechnology,
                              std::string_view cellType);
+
+/// The first record of that kind; null when there is none.
+const Dictionary* firstCellOfKind(const Array& records, std::string_view radioAccessTechnology,
+                                  std::string_view cellType);
 
 /// One entry of a cell-monitor record and how a section shows it.
 struct CellMonitorRow {
@@ -32,5 +50,23 @@ struct CellMonitorRow {
 
 /// Shows each entry as a signed 32-bit decimal; an entry that is missing leaves its row as it is.
 void showCellMonitorRows(Dictionary& section, const Dictionary& record, std::span<const CellMonitorRow> rows);
+
+/// One number that a list section shows of a cell-monitor record, which keeps only 16 bits of it.
+struct CellMonitorColumn {
+  enum class Width : std::uint8_t {
+    Unsigned16,
+    Signed16,  ///< 32767 stands for a level that is not known and shows an empty text
+  };
+
+  std::string_view key;             ///< the record's key
+  std::string_view label;           ///< the row's
+  std::string_view failureMessage;  ///< logged as an error when the record has no such number
+  Width width;
+  Format format = integer();
+};
+
+/// A row a record of that kind, in the order of the records. A number that a record lacks is left out.
+Array cellMonitorList(const Array& records, std::string_view radioAccessTechnology, std::string_view cellType,
+                      std::span<const CellMonitorColumn> columns);
 
 }  // namespace varnel

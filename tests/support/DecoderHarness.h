@@ -8,9 +8,11 @@
 #include <initializer_list>
 #include <string>
 #include <string_view>
+#include <type_traits>
 #include <utility>
 #include <vector>
 
+#include "LogGenerator/KLV/CellMonitor.h"
 #include "LogGenerator/Packet.h"
 #include "tests/support/Describe.h"
 #include "tests/support/RecordingLog.h"
@@ -34,6 +36,16 @@ inline std::string listOf(std::initializer_list<const char*> rows) {
   return "[" + text + "]";
 }
 
+/// A decoder with what it would share with others in its index.
+template <class Decoder>
+Decoder madeAlone([[maybe_unused]] CellMonitorReader& cellMonitor) {
+  if constexpr (std::is_constructible_v<Decoder, CellMonitorReader&>) {
+    return Decoder(cellMonitor);
+  } else {
+    return Decoder();
+  }
+}
+
 /// A section decoder with a section, and the log of what it does. Its packets have the log code unless
 /// another one is said.
 template <class Decoder, std::uint32_t itsLogCode>
@@ -51,7 +63,7 @@ class DecoderHarness : public testing::Test {
   /// The lines that a decoder without a section logs for the packet.
   std::vector<std::string> linesWithoutSection(const Bytes& packet, std::uint32_t logCode = itsLogCode) {
     log.take();
-    Decoder sectionless;
+    auto sectionless = madeAlone<Decoder>(cellMonitor);
     sectionless.updateWithData_logCode(Packet(packet), logCode);
     return log.takeTexts();
   }
@@ -118,7 +130,8 @@ class DecoderHarness : public testing::Test {
   }
 
   RecordingLog log;
-  Decoder decoder;
+  CellMonitorReader cellMonitor;
+  Decoder decoder = madeAlone<Decoder>(cellMonitor);
   Value section;
 };
 

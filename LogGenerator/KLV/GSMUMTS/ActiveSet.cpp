@@ -1,0 +1,54 @@
+#include "LogGenerator/KLV/GSMUMTS/ActiveSet.h"
+
+#include "LogGenerator/Field.h"
+#include "LogGenerator/KLV/GSMUMTS/CellSet.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr Field identity[] = {
+    {cellSet::scramblingCode, "Scrambling Code"},
+};
+// Kept: no dBm, though it is a power.
+constexpr Format level = integer("%d dB");
+
+std::uint32_t energyPerChip(const Packet& record) {
+  for (const Source& source : cellSet::energies) {
+    if (const std::uint32_t energy = rawValue(record, source)) return energy;
+  }
+  return 0;
+}
+
+// Of all cells together, in dBm.
+std::int32_t receivedSignalStrength(const Packet& packet) {
+  const auto reading = static_cast<std::int32_t>(rawValue(packet, cellSet::receivedSignal));
+  return (reading + 512) / 10 - 106;
+}
+
+}  // namespace
+
+std::span<const PacketHandler<ActiveSet>> ActiveSet::handlers() {
+  static constexpr PacketHandler<ActiveSet> table[] = {
+      {cellSet::logCode, cellSet::minimumSize, &ActiveSet::update},
+  };
+  return table;
+}
+
+void ActiveSet::update(const Packet& packet) {
+  clearElementsInArray(list());
+  const std::int32_t strength = receivedSignalStrength(packet);
+  Array cells;
+  for (std::size_t i = 0; i < packet.u8(cellSet::countOffset); ++i) {
+    const Packet cell = cellSet::cell(packet, i);
+    if (rawValue(cell, cellSet::membership) != cellSet::activeSet) continue;
+    const std::int16_t ecNo = lookUpECNO(energyPerChip(cellSet::energy(packet, i)));
+    Value row = fieldRow(cell, identity);
+    setInteger(*row.dictionary(), "RSCP", level, strength + ecNo);
+    setInteger(*row.dictionary(), "Energy Per Chip", level, ecNo);
+    cells.push_back(std::move(row));
+  }
+  replaceArray_With(list(), std::move(cells));
+}
+
+}  // namespace varnel

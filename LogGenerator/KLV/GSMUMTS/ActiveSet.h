@@ -1,0 +1,20 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The UMTS cells of the active set, a row each.
+class ActiveSet final : public SectionDecoder<ActiveSet> {
+ public:
+  static constexpr std::string_view sectionName = "Active Set";
+  static constexpr std::string_view traceLine = "ActiveSet";
+  static std::span<const PacketHandler<ActiveSet>> handlers();
+
+ private:
+  void update(const Packet& packet);
+};
+
+}  // namespace varnel

@@ -1,0 +1,20 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The block errors of the UMTS transport channels.
+class BLER final : public SectionDecoder<BLER> {
+ public:
+  static constexpr std::string_view sectionName = "BLER";
+  static constexpr std::string_view traceLine = "BLER";
+  static std::span<const PacketHandler<BLER>> handlers();
+
+ private:
+  void update(const Packet& packet);
+};
+
+}  // namespace varnel

@@ -1,0 +1,22 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "LogGenerator/Field.h"
+
+namespace varnel {
+
+/// The cells by their rank for reselection, log code 0x4005.
+namespace cellRanking {
+
+inline constexpr std::uint32_t logCode = 0x4005;
+inline constexpr std::size_t minimumSize = 15;
+inline constexpr std::size_t umtsCountOffset = 13;
+inline constexpr std::size_t gsmCountOffset = 14;
+/// Kept: the GSM records start where the UMTS records do, not behind them.
+inline constexpr std::size_t firstRecord = minimumSize;
+
+}  // namespace cellRanking
+
+}  // namespace varnel

@@ -1,0 +1,57 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <span>
+
+#include "LogGenerator/Field.h"
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The UMTS cells that the phone measures and their sets, log code 0x417A: records of the cells, then records
+/// of their energies.
+namespace cellSet {
+
+inline constexpr std::uint32_t logCode = 0x417A;
+inline constexpr std::size_t minimumSize = 16;
+inline constexpr Source receivedSignal = s16(13);
+inline constexpr std::size_t countOffset = 15;
+inline constexpr std::size_t firstCell = minimumSize;
+inline constexpr std::size_t cellSize = 15;
+inline constexpr std::size_t energySize = 44;
+
+// Of a cell record.
+inline constexpr Source scramblingCode = bits(7, 0, 13);
+inline constexpr Source membership = bits(8, 5, 3);
+inline constexpr std::uint32_t activeSet = 0;
+
+// Of an energy record: linear Ec/N0, the first one that is not 0 counts.
+inline constexpr Source energies[] = {u32(32), u32(36), u32(40)};
+
+inline Packet cell(const Packet& packet, std::size_t index) {
+  return packet.from(firstCell + cellSize * index);
+}
+inline Packet energy(const Packet& packet, std::size_t index) {
+  return packet.from(firstCell + cellSize * packet.u8(countOffset) + energySize * index);
+}
+
+}  // namespace cellSet
+
+/// A set of cells that has its section but no rows.
+/// Kept: whatever the packet holds, the list becomes empty.
+template <class Decoder>
+class EmptyCellSet : public SectionDecoder<Decoder> {
+ public:
+  static std::span<const PacketHandler<Decoder>> handlers() {
+    static constexpr PacketHandler<Decoder> table[] = {
+        {cellSet::logCode, cellSet::minimumSize, &EmptyCellSet::update},
+    };
+    return table;
+  }
+
+ private:
+  void update(const Packet&) { this->clearElementsInArray(this->list()); }
+};
+
+}  // namespace varnel

@@ -1,0 +1,14 @@
+#pragma once
+
+#include "LogGenerator/KLV/GSMUMTS/CellSet.h"
+
+namespace varnel {
+
+/// The cells that were found without being on the network's list.
+class DetectedSet final : public EmptyCellSet<DetectedSet> {
+ public:
+  static constexpr std::string_view sectionName = "Detected Set";
+  static constexpr std::string_view traceLine = "DetectedSet";
+};
+
+}  // namespace varnel

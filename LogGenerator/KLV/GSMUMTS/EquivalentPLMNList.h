@@ -1,0 +1,20 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The networks that count as the registered one, a row each.
+class EquivalentPLMNList final : public SectionDecoder<EquivalentPLMNList> {
+ public:
+  static constexpr std::string_view sectionName = "Equivalent PLMN List";
+  static constexpr std::string_view traceLine = "Equivalent PLMN List";
+  static std::span<const PacketHandler<EquivalentPLMNList>> handlers();
+
+ private:
+  void update(const Packet& packet);
+};
+
+}  // namespace varnel

@@ -1,0 +1,131 @@
+#include "LogGenerator/KLV/GSMUMTS/GPRSInformation.h"
+
+#include "LogGenerator/Field.h"
+#include "LogGenerator/KLV/GSMUMTS/GPRSCellOptions.h"
+#include "LogGenerator/KLV/GSMUMTS/GSMMeasurement.h"
+#include "LogGenerator/KLV/GSMUMTS/MobilityManagement.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr std::uint32_t packetControlLogCode = 0x51F5;
+constexpr std::size_t packetControlSize = 18;
+constexpr std::uint32_t controlChannelLogCode = 0x51FB;
+constexpr std::size_t controlChannelSize = 34;
+constexpr std::uint32_t packetSystemInformationLogCode = 0x51FD;
+constexpr std::size_t packetSystemInformationSize = 35;
+constexpr std::uint32_t systemInformation13LogCode = 0x51F4;
+constexpr std::size_t systemInformation13Size = 15;
+
+constexpr Choice controlOrders[] = {
+    {0xFF, "Not Available"},
+    {0, "NC0"},
+    {1, "NC1"},
+    {2, "NC2"},
+};
+// Kept: "Available" where its siblings have "Not Available".
+constexpr Choice flowContextSupport[] = {
+    {0xFF, "Available"},
+    {0, "Not Supported"},
+    {1, "Supported"},
+};
+constexpr Choice accessThresholds[] = {
+    {0xFF, "Not Available"}, {0, "Barred (PKT access not allowed in the Cell)"},
+    {1, "Barred"},           {2, "Barred"},
+    {3, "1 Only"},           {4, "1 to 2"},
+    {5, "1 to 3"},           {6, "1 to 4"},
+    {7, "Allowed"},
+};
+constexpr Field packetControl[] = {
+    {u8(15), "Network Control Order", choice(controlOrders, "Unknown")},
+    {u8(13), "PFC Supported", choice(flowContextSupport, "Unknown")},
+    {u8(14), "Priority Access Threshold", choice(accessThresholds, "Unknown")},
+};
+static_assert(within(packetControl, packetControlSize));
+
+constexpr std::string_view operatingModes[] = {"Class 1", "Class 2", "Class 3"};
+constexpr Field operatingMode[] = {
+    {networkIdentity::operatingMode, "Network Operating Mode", entry(operatingModes)},
+};
+static_assert(within(operatingMode, networkIdentity::minimumSize));
+
+constexpr std::string_view t3192Times[] = {
+    "500 ms", "1000 ms", "1500 ms", "0 ms", "80 ms", "120 ms", "160 ms", "200 ms",
+};
+constexpr Choice burstTypes[] = {{0, "8-bit format"}};
+constexpr Field cellOptions[] = {
+    {gprsCellOptions::t3192, "T3192", entry(t3192Times, "?? ms")},
+    {gprsCellOptions::accessBurstType, "Access Burst Type", choice(burstTypes, "11-bit format")},
+    {gprsCellOptions::drxTimerMaximum, "DRX Timer Max"},
+};
+static_assert(within(cellOptions, gprsCellOptions::minimumSize));
+
+constexpr Field controlChannel[] = {
+    {u8(13), "PBCCH Present"},
+};
+static_assert(within(controlChannel, controlChannelSize));
+
+constexpr Choice support[] = {{0, "Not Supported"}};
+constexpr Field packetSystemInformation[] = {
+    {u8(16), "Ext Measurement Order"},
+    {u8(13), "Packet PSI Status"},
+    {u8(33), "Packet SI Status", choice(support, "Supported")},
+    {u8(14), "Count LR"},
+    {u8(15), "Count HR"},
+};
+static_assert(within(packetSystemInformation, packetSystemInformationSize));
+
+constexpr Choice positions[] = {
+    {0xFF, "Not Available"},
+    {0, "Located on BCCH"},
+    {1, "Located on Extended BCCH"},
+};
+constexpr Field systemInformation13[] = {
+    {u8(14), "SI13 Position", choice(positions, "Unknown")},
+};
+static_assert(within(systemInformation13, systemInformation13Size));
+
+constexpr Choice hysteresis[] = {{0, "Not Applied"}};
+constexpr Field reselection[] = {
+    {gsmMeasurement::reselectHysteresis, "Cell Reselect Hysteresis", choice(hysteresis, "Applied")},
+};
+static_assert(within(reselection, gsmMeasurement::minimumSize));
+
+}  // namespace
+
+std::span<const PacketHandler<GPRSInformation>> GPRSInformation::handlers() {
+  static constexpr PacketHandler<GPRSInformation> table[] = {
+      {packetControlLogCode, packetControlSize, &GPRSInformation::updatePacketControl},
+      {networkIdentity::logCode, networkIdentity::minimumSize, &GPRSInformation::updateOperatingMode},
+      {gprsCellOptions::logCode, gprsCellOptions::minimumSize, &GPRSInformation::updateCellOptions},
+      {controlChannelLogCode, controlChannelSize, &GPRSInformation::updateControlChannel},
+      {packetSystemInformationLogCode, packetSystemInformationSize,
+       &GPRSInformation::updatePacketSystemInformation},
+      {systemInformation13LogCode, systemInformation13Size, &GPRSInformation::updateSystemInformation13},
+      {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &GPRSInformation::updateReselection},
+  };
+  return table;
+}
+
+void GPRSInformation::updatePacketControl(const Packet& packet) { setFields(rows(), packet, packetControl); }
+
+void GPRSInformation::updateOperatingMode(const Packet& packet) { setFields(rows(), packet, operatingMode); }
+
+void GPRSInformation::updateCellOptions(const Packet& packet) { setFields(rows(), packet, cellOptions); }
+
+void GPRSInformation::updateControlChannel(const Packet& packet) {
+  setFields(rows(), packet, controlChannel);
+}
+
+void GPRSInformation::updatePacketSystemInformation(const Packet& packet) {
+  setFields(rows(), packet, packetSystemInformation);
+}
+
+void GPRSInformation::updateSystemInformation13(const Packet& packet) {
+  setFields(rows(), packet, systemInformation13);
+}
+
+void GPRSInformation::updateReselection(const Packet& packet) { setFields(rows(), packet, reselection); }
+
+}  // namespace varnel

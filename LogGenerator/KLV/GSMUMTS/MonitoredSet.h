@@ -1,0 +1,14 @@
+#pragma once
+
+#include "LogGenerator/KLV/GSMUMTS/CellSet.h"
+
+namespace varnel {
+
+/// The cells of the network's list that are not in the active set.
+class MonitoredSet final : public EmptyCellSet<MonitoredSet> {
+ public:
+  static constexpr std::string_view sectionName = "Monitored Set";
+  static constexpr std::string_view traceLine = "MonitoredSet";
+};
+
+}  // namespace varnel

@@ -1,0 +1,21 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The circuit-switched mobility management (MM).
+class ProcessCS final : public SectionDecoder<ProcessCS> {
+ public:
+  static constexpr std::string_view sectionName = "Process CS";
+  static constexpr std::string_view traceLine = "ProcessCS";
+  static std::span<const PacketHandler<ProcessCS>> handlers();
+
+ private:
+  void updateState(const Packet& packet);
+  void updateRegistration(const Packet& packet);
+};
+
+}  // namespace varnel

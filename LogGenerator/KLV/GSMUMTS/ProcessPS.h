@@ -1,0 +1,21 @@
+#pragma once
+
+#include <span>
+
+#include "LogGenerator/SectionDecoder.h"
+
+namespace varnel {
+
+/// The packet-switched mobility management (GMM).
+class ProcessPS final : public SectionDecoder<ProcessPS> {
+ public:
+  static constexpr std::string_view sectionName = "Process PS";
+  static constexpr std::string_view traceLine = "ProcessPS";
+  static std::span<const PacketHandler<ProcessPS>> handlers();
+
+ private:
+  void updateState(const Packet& packet);
+  void updateRegistration(const Packet& packet);
+};
+
+}  // namespace varnel
