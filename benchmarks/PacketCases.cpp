@@ -42,11 +42,32 @@ Bytes utranNeighborsOf16Cells() {
   return bytes;
 }
 
-Bytes cellMonitorOf16Records() {
+Bytes gsmUMTSCellSetOf8Cells() {
+  constexpr std::size_t count = 8;
+  Bytes bytes = packet(0x417A, 16 + count * (15 + 44));
+  bytes[15] = count;
+  for (std::size_t i = 0; i < count; ++i) bytes[16 + 15 * i + 8] &= 0x1F;  // all in the active set
+  return bytes;
+}
+
+Bytes gsmUMTSMeasurementOf6Neighbors() {
+  Bytes bytes = packet(0x5137, 29 + 6 * 14);
+  bytes[28] = 6;
+  return bytes;
+}
+
+Bytes gsmUMTSRegistration() {
+  Bytes bytes = packet(0x7132, 16);
+  bytes[13] = 1;
+  bytes[14] = 0;
+  return bytes;
+}
+
+Bytes cellMonitorOf16Records(std::string_view access) {
   Value cells = Value::ofArray();
   for (int i = 0; i < 16; ++i) {
     Value cell = Value::ofDictionary();
-    cell.dictionary()->set(cellMonitor::radioAccessTechnology, cellMonitor::lte);
+    cell.dictionary()->set(cellMonitor::radioAccessTechnology, access);
     cell.dictionary()->set(cellMonitor::cellType, i < 15 ? cellMonitor::neighbor : cellMonitor::serving);
     cell.dictionary()->set(cellMonitor::trackingAreaCode, Value::ofInteger(4711));
     cell.dictionary()->set(cellMonitor::cellIdentity, Value::ofInteger(0x1234500 + i));
@@ -61,6 +82,10 @@ Bytes cellMonitorOf16Records() {
   return bytes;
 }
 
+Bytes lteCellMonitor() { return cellMonitorOf16Records(cellMonitor::lte); }
+
+Bytes gsmUMTSCellMonitor() { return cellMonitorOf16Records(cellMonitor::umts); }
+
 }  // namespace
 
 std::span<const PacketCase> packetCases() {
@@ -70,7 +95,11 @@ std::span<const PacketCase> packetCases() {
       {"LTE 0xB180, 8 cells", technology::kalviLTE, lteNeighborsOf8Cells},
       {"LTE 0xB179, 8 neighbours", technology::kalviLTE, lteConnectedModeOf8Neighbors},
       {"UTRAN 0xD00A, 16 cells", technology::kalviUTRAN2, utranNeighborsOf16Cells},
-      {"LTE cell monitor, 16 records", technology::kalviLTE, cellMonitorOf16Records},
+      {"LTE cell monitor, 16 records", technology::kalviLTE, lteCellMonitor},
+      {"GSM/UMTS 0x417A, 8 cells, 4 sections", technology::kalviGSMUMTS, gsmUMTSCellSetOf8Cells},
+      {"GSM/UMTS 0x5137, 6 neighbours, 4 sections", technology::kalviGSMUMTS, gsmUMTSMeasurementOf6Neighbors},
+      {"GSM/UMTS 0x7132, 4 sections", technology::kalviGSMUMTS, gsmUMTSRegistration},
+      {"GSM/UMTS cell monitor, 16 records, 5 sections", technology::kalviGSMUMTS, gsmUMTSCellMonitor},
   };
   return cases;
 }

@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <limits>
+
 #include "tests/support/Describe.h"
 
 namespace varnel {
@@ -80,6 +82,41 @@ TEST(Field, ShowsTheTextOfAChoiceOrElseTheOtherOne) {
   EXPECT_EQ(shown({0x07}, fields), R"({Mode: "On"})");
   EXPECT_EQ(shown({0x01}, fields), R"({Mode: "Unknown"})");
   EXPECT_EQ(shown({0xFF}, fields), R"({Mode: "Unknown"})");
+}
+
+TEST(Field, ShowsTheEntryThatTheRawValueCountsFrom0OrElseTheOtherText) {
+  static constexpr std::string_view states[] = {"First", "Second"};
+  static constexpr Field fields[] = {{u8(0), "State", entry(states)},
+                                     {u8(0), "Time", entry(states, "?? ms")}};
+  EXPECT_EQ(shown({0}, fields), R"({State: "First", Time: "First"})");
+  EXPECT_EQ(shown({1}, fields), R"({State: "Second", Time: "Second"})");
+  EXPECT_EQ(shown({2}, fields), R"({State: "Unknown", Time: "?? ms"})");
+  EXPECT_EQ(shown({255}, fields), R"({State: "Unknown", Time: "?? ms"})");
+}
+
+TEST(Field, ShowsSignedBytes) {
+  static constexpr Field fields[] = {{s8(0), "Level", integer("%d dB", 1, -21)},
+                                     {s8(0), "Half", real("%f", 0.5)}};
+  EXPECT_EQ(shown({0x80}, fields), R"({Level: "-149 dB", Half: "-64.000000"})");
+  EXPECT_EQ(shown({0x7F}, fields), R"({Level: "106 dB", Half: "63.500000"})");
+}
+
+TEST(Field, ShowsNumbersThatWereWorkedOut) {
+  Dictionary section;
+  setInteger(section, "Level", integer("%d dBm", 2), -7);
+  setReal(section, "Mean", real("%4.2f dBm"), -15.0);
+  setReal(section, "None", real("%4.2f dBm"), std::numeric_limits<double>::quiet_NaN());
+  setReal(section, "Zero", real("%f"), -std::numeric_limits<double>::infinity());
+  EXPECT_EQ(described(section), R"({Level: "-14 dBm", Mean: "-15.00 dBm", None: " nan dBm", Zero: "-inf"})");
+}
+
+TEST(Field, ARecordThatDoesNotFitIsLeftOutOrReadAsZeros) {
+  static constexpr Field fields[] = {{u16(0), "A"}};
+  const Bytes bytes = {9, 1, 0, 2, 0, 3};
+  EXPECT_EQ(described(Value::ofArray(recordRows(Packet(bytes), {1, 2, 4}, fields))),
+            R"([{A: "1"}, {A: "2"}])");
+  EXPECT_EQ(described(Value::ofArray(countedRows(Packet(bytes), {1, 2, 4}, fields))),
+            R"([{A: "1"}, {A: "2"}, {A: "3"}, {A: "0"}])");
 }
 
 TEST(Field, OneRawValueMayHaveATextOfItsOwn) {

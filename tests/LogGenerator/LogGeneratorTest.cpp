@@ -105,7 +105,10 @@ TEST_F(LogGeneratorTest, TheStartCommandAsksForTheCodesOfTheTechnologysDecoders)
             R"({SetState: "Streaming", )"
             R"(SetKalviLogCodes: [45250, 45249, 45433, 45439, 45440, 45446], SetTkExtraCodes: [1, 0, 2]})");
   EXPECT_EQ(described(generatorFor("kalvi-gsm-umts")->getStartCommand()),
-            R"({SetState: "Streaming", SetKalviLogCodes: [], SetTkExtraCodes: [2, 0]})");
+            R"({SetState: "Streaming", )"
+            R"(SetKalviLogCodes: [16762, 20981, 28981, 20982, 20987, 20989, 20980, 20791, 20788, 20598, )"
+            R"(20984, 20991, 28976, 28978, 16389, 28977, 29008, 20780, 20594, 16677, 16433, 16679, 16727, )"
+            R"(16662, 16929], SetTkExtraCodes: [1, 2, 0]})");
   host.resources.add("UTRAN", Value::ofDictionary());
   EXPECT_EQ(described(generatorFor("kalvi-utran-2")->getStartCommand()),
             R"({SetState: "Streaming", )"

@@ -3,6 +3,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <limits>
 
 #include "tests/support/Describe.h"
@@ -170,6 +171,46 @@ TEST(CellMonitor, EachEntryOfTheTableIsTriedInOrder) {
   showCellMonitorRows(section, *record.dictionary(), rows);
   EXPECT_EQ(described(section), R"({First: "1", Second: "2"})");
   EXPECT_THAT(log.takeTexts(), ElementsAre("<3>no C", "<3>no X\n"));
+}
+
+TEST(CellMonitorReader, EveryReadOfAPacketGivesItsRecords) {
+  RecordingLog log;
+  CellMonitorReader reader;
+  const Bytes first = serverMessage(0xFF0001, Value::ofArray({"first"}));
+  const Bytes second = serverMessage(0xFF0001, Value::ofArray({"second"}));
+  for (int i = 0; i < 2; ++i) {
+    EXPECT_EQ(described(Value::ofArray(*reader.read(Packet(first)))), R"(["first"])");
+    EXPECT_EQ(described(Value::ofArray(*reader.read(Packet(first)))), R"(["first"])");
+    EXPECT_EQ(described(Value::ofArray(*reader.read(Packet(second)))), R"(["second"])");
+  }
+  EXPECT_THAT(log.takeTexts(), IsEmpty());
+}
+
+TEST(CellMonitorReader, APacketIsKnownByItsBytesNotByItsPlace) {
+  CellMonitorReader reader;
+  Bytes message = serverMessage(0xFF0001, Value::ofArray({"here"}));
+  reader.read(Packet(message));
+  const Bytes other = serverMessage(0xFF0001, Value::ofArray({"gone"}));
+  ASSERT_EQ(other.size(), message.size());
+  std::ranges::copy(other, message.begin());
+  EXPECT_EQ(described(Value::ofArray(*reader.read(Packet(message)))), R"(["gone"])");
+}
+
+TEST(CellMonitorReader, EachReadOfAFailedParseLogsBothLines) {
+  RecordingLog log;
+  CellMonitorReader reader;
+  const Bytes broken = serverMessageOfText(0xFF0001, "no property list");
+  for (int i = 0; i < 2; ++i) {
+    EXPECT_EQ(reader.read(Packet(broken)), nullptr);
+    EXPECT_THAT(log.takeTexts(), ElementsAre(failedParse, "<3>Failed to get Cell Array\n"));
+  }
+}
+
+TEST(CellMonitorReader, AMessageWithoutAPayloadIsAFailedParseAtOnce) {
+  RecordingLog log;
+  CellMonitorReader reader;
+  EXPECT_EQ(reader.read(Packet(Bytes(13))), nullptr);
+  EXPECT_THAT(log.takeTexts(), ElementsAre(failedParse, "<3>Failed to get Cell Array\n"));
 }
 
 }  // namespace
