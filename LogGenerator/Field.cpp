@@ -1,58 +1,32 @@
 #include "LogGenerator/Field.h"
 
-#include <array>
 #include <charconv>
+#include <cmath>
+#include <limits>
 
 namespace varnel {
 
 namespace {
 
-// Room for a double of any size with 16 decimals, 336 characters, and for the texts around it.
-using TextBuffer = std::array<char, 448>;
+// A double of any size with 16 decimals and its sign.
+using Digits = std::array<char, 352>;
 
-std::string_view text(const Format& format, std::string_view digits, TextBuffer& buffer) {
-  const std::size_t padding = format.width > digits.size() ? format.width - digits.size() : 0;
-  char* out = std::ranges::copy(format.before, buffer.begin()).out;
-  out = std::fill_n(out, padding, ' ');
-  out = std::ranges::copy(digits, out).out;
-  out = std::ranges::copy(format.after, out).out;
-  return {buffer.begin(), out};
+std::string_view realDigits(Digits& room, const Format& format, double number) {
+  if (std::isnan(number)) number = std::numeric_limits<double>::quiet_NaN();
+  char* out = room.begin();
+  if (format.hasPlus && !std::signbit(number)) *out++ = '+';
+  out = std::to_chars(out, room.end(), number, std::chars_format::fixed, format.precision).ptr;
+  return {room.begin(), static_cast<std::size_t>(out - room.begin())};
 }
 
-std::string_view integerText(const Format& format, std::uint32_t raw, TextBuffer& buffer) {
-  const std::uint32_t number =
-      raw * static_cast<std::uint32_t>(format.factor) + static_cast<std::uint32_t>(format.summand);
-  std::array<char, 16> digits;
-  const auto end = format.isUnsigned
-                       ? std::to_chars(digits.begin(), digits.end(), number)
-                       : std::to_chars(digits.begin(), digits.end(), static_cast<std::int32_t>(number));
-  return text(format, {digits.begin(), end.ptr}, buffer);
-}
-
-std::string_view realText(const Format& format, double number, TextBuffer& buffer) {
-  std::array<char, 336> digits;
-  const auto end =
-      std::to_chars(digits.begin(), digits.end(), number * format.realFactor + format.realSummand,
-                    std::chars_format::fixed, format.precision);
-  return text(format, {digits.begin(), end.ptr}, buffer);
-}
-
-std::string_view text(const Format& format, std::uint32_t raw, bool isSigned, TextBuffer& buffer) {
-  if (!format.exception.text.empty() && raw == format.exception.raw) return format.exception.text;
-  switch (format.kind) {
-    case Format::Kind::Choice:
-      for (const Choice& choice : format.choices) {
-        if (choice.raw == raw) return choice.text;
-      }
-      return format.otherwise;
-    case Format::Kind::Entry:
-      return raw < format.entries.size() ? format.entries[raw] : format.otherwise;
-    case Format::Kind::Integer:
-      return integerText(format, raw, buffer);
-    case Format::Kind::Real:
-      break;
-  }
-  return realText(format, isSigned ? static_cast<std::int32_t>(raw) : static_cast<double>(raw), buffer);
+std::string_view integerDigits(Digits& room, const Format& format, std::uint32_t number) {
+  const auto signedNumber = static_cast<std::int32_t>(number);
+  char* out = room.begin();
+  if (format.hasPlus && signedNumber >= 0) *out++ = '+';
+  out = format.isHexadecimal ? std::to_chars(out, room.end(), number, 16).ptr
+        : format.isUnsigned  ? std::to_chars(out, room.end(), number).ptr
+                             : std::to_chars(out, room.end(), signedNumber).ptr;
+  return {room.begin(), static_cast<std::size_t>(out - room.begin())};
 }
 
 }  // namespace
@@ -64,22 +38,62 @@ std::uint32_t rawValue(const Packet& packet, const Source& source) {
   return (raw ^ sign) - sign;
 }
 
-void setFields(Dictionary& section, const Packet& packet, std::span<const Field> fields) {
-  TextBuffer buffer;
-  for (const Field& field : fields) {
-    const std::uint32_t raw = rawValue(packet, field.source);
-    section.setText(field.label, text(field.format, raw, field.source.isSigned, buffer));
+std::string_view Formatter::text(const Packet& packet, const Field& field) {
+  const Format& format = field.format;
+  const std::uint32_t raw = rawValue(packet, field.source);
+  if (!format.exception.text.empty() && raw == format.exception.raw) return format.exception.text;
+  if (raw < format.entries.size()) return format.entries[raw];
+  for (const Choice& choice : format.choices) {
+    if (choice.raw == raw) return choice.text;
   }
+  switch (format.kind) {
+    case Format::Kind::Choice:
+      return format.otherwise;
+    case Format::Kind::Real: {
+      const double number = field.source.isSigned ? static_cast<std::int32_t>(raw) : static_cast<double>(raw);
+      return text(format, number * format.realFactor + format.realSummand);
+    }
+    case Format::Kind::Integer:
+      break;
+  }
+  return text(format, static_cast<std::int32_t>(raw));
+}
+
+std::string_view Formatter::text(const Format& format, double number) {
+  Digits room;
+  return assemble(format, realDigits(room, format, number));
+}
+
+std::string_view Formatter::text(const Format& format, std::int32_t number) {
+  Digits room;
+  const auto factor = static_cast<std::uint32_t>(format.factor);
+  const auto summand = static_cast<std::uint32_t>(format.summand);
+  return assemble(format, integerDigits(room, format, static_cast<std::uint32_t>(number) * factor + summand));
+}
+
+// The number is padded on its left to the width, as printf does.
+std::string_view Formatter::assemble(const Format& format, std::string_view digits) {
+  const std::size_t padding = format.width > digits.size() ? format.width - digits.size() : 0;
+  char* out = std::ranges::copy(format.before, _room.begin()).out;
+  out = std::fill_n(out, padding, format.hasLeadingZeros ? '0' : ' ');
+  out = std::ranges::copy(digits, out).out;
+  out = std::ranges::copy(format.after, out).out;
+  return {_room.begin(), static_cast<std::size_t>(out - _room.begin())};
+}
+
+void setFields(Dictionary& section, const Packet& packet, std::span<const Field> fields) {
+  Formatter formatter;
+  for (const Field& field : fields) section.setText(field.label, formatter.text(packet, field));
 }
 
 void setInteger(Dictionary& section, std::string_view label, const Format& format, std::int32_t number) {
-  TextBuffer buffer;
-  section.setText(label, integerText(format, static_cast<std::uint32_t>(number), buffer));
+  Formatter formatter;
+  section.setText(label, formatter.text(format, number));
 }
 
 void setReal(Dictionary& section, std::string_view label, const Format& format, double number) {
-  TextBuffer buffer;
-  section.setText(label, realText(format, number, buffer));
+  Formatter formatter;
+  section.setText(label, formatter.text(format, number));
 }
 
 Value fieldRow(const Packet& record, std::span<const Field> fields) {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <algorithm>
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <span>
@@ -37,20 +38,24 @@ struct Choice {
   std::string_view text;
 };
 
-/// How a raw value becomes a display text. Made by `integer`, `real`, `choice` and `entry`, below.
+/// How a raw value becomes a display text. Made by `integer`, `hexadecimal`, `real`, `choice` and `entry`,
+/// below.
 struct Format {
-  enum class Kind : std::uint8_t { Integer, Real, Choice, Entry };
+  enum class Kind : std::uint8_t { Integer, Real, Choice };
 
   Kind kind = Kind::Integer;
-  std::string_view before{}, after{};          // the texts around the number
-  bool isUnsigned = false;                     // %u instead of %d
-  std::uint8_t width = 0, precision = 0;       // of %w.pf
-  std::int32_t factor = 1, summand = 0;        // integers: raw × factor + summand
-  double realFactor = 1.0, realSummand = 0.0;  // reals likewise
-  std::span<const Choice> choices{};
-  std::span<const std::string_view> entries{};
-  std::string_view otherwise{};  // the text of a raw value that is no choice or entry
-  Choice exception{};            // a raw value with a text of its own; none while the text is empty
+  std::string_view before{}, after{};           // the texts around the number
+  bool isUnsigned = false;                      // %u instead of %d
+  bool isHexadecimal = false;                   // %x instead of %d
+  bool hasPlus = false;                         // the flag +: numbers that are not negative begin with it
+  bool hasLeadingZeros = false;                 // the flag 0, of %0wx
+  std::uint8_t width = 0, precision = 0;        // of %w.pf
+  std::int32_t factor = 1, summand = 0;         // integers: raw × factor + summand
+  double realFactor = 1.0, realSummand = 0.0;   // reals likewise
+  std::span<const Choice> choices{};            // raw values with texts, of each kind
+  std::span<const std::string_view> entries{};  // texts of the first raw values, of each kind
+  std::string_view otherwise{};                 // of the kind Choice: the text of a raw value that is none
+  Choice exception{};  // a raw value with a text of its own; none while the text is empty
 
   /// The same format, but one raw value shows a text instead.
   consteval Format unless(std::uint32_t raw, std::string_view text) const {
@@ -69,6 +74,8 @@ consteval Format split(std::string_view text, std::string_view conversions) {
   if (percent == std::string_view::npos) throw "the format has no conversion";
   const auto isDigit = [](char c) { return c >= '0' && c <= '9'; };
   std::size_t at = percent + 1;
+  for (; text.at(at) == '+' || text[at] == '0'; ++at)
+    (text[at] == '+' ? result.hasPlus : result.hasLeadingZeros) = true;
   for (; isDigit(text.at(at)); ++at)
     result.width = static_cast<std::uint8_t>(result.width * 10 + (text[at] - '0'));
   if (text[at] == '.') {
@@ -80,9 +87,14 @@ consteval Format split(std::string_view text, std::string_view conversions) {
   }
   if (conversions.find(text[at]) == std::string_view::npos) throw "the conversion does not fit the field";
   result.isUnsigned = text[at] == 'u';
+  result.isHexadecimal = text[at] == 'x';
+  if (result.hasLeadingZeros && !result.isHexadecimal) throw "zeros lead hexadecimal numbers only";
+  if (result.hasPlus && (result.isUnsigned || result.isHexadecimal)) throw "the number has no sign";
   result.before = text.substr(0, percent);
   result.after = text.substr(at + 1);
-  if (result.after.find('%') != std::string_view::npos) throw "the format has two conversions";
+  const bool isPercentage = result.after.starts_with("%%");  // shown as one
+  if (isPercentage) result.after.remove_prefix(1);
+  if (result.after.find('%', isPercentage) != std::string_view::npos) throw "the format has two conversions";
   if (result.before.size() + result.after.size() > 64 || result.width > 32 || result.precision > 16) {
     throw "the text would not fit in its buffer";
   }
@@ -98,6 +110,9 @@ consteval Format integer(std::string_view text = "%d", std::int32_t factor = 1, 
   result.summand = summand;
   return result;
 }
+
+/// raw by %0wx.
+consteval Format hexadecimal(std::string_view text) { return format::split(text, "x"); }
 
 /// raw × factor + summand by %w.pf.
 consteval Format real(std::string_view text, double factor = 1.0, double summand = 0.0) {
@@ -120,10 +135,16 @@ consteval Format choice(std::span<const Choice> choices, std::string_view otherw
 /// The entry that the raw value counts from 0, or past the last one the other text.
 consteval Format entry(std::span<const std::string_view> entries, std::string_view otherwise = "Unknown") {
   Format result;
-  result.kind = Format::Kind::Entry;
+  result.kind = Format::Kind::Choice;
   result.entries = entries;
   result.otherwise = otherwise;
   return result;
+}
+
+/// The text of the choice with that raw value, or else the number by its format.
+consteval Format choice(std::span<const Choice> choices, Format otherwise) {
+  otherwise.choices = choices;
+  return otherwise;
 }
 
 /// One row of a packet's table: where the value lies, its display key and how it is shown.
@@ -144,6 +165,24 @@ constexpr std::size_t extent(std::span<const Field> fields) {
   for (const Field& field : fields) end = std::max(end, field.source.end());
   return end;
 }
+
+/// Makes display texts. Each stands in the formatter's own room until the next one is made.
+class Formatter {
+ public:
+  /// The text of a field of a packet.
+  std::string_view text(const Packet& packet, const Field& field);
+  /// The text of a computed number by a format made by `real`, whose factor and summand play no part. What is
+  /// not a number shows no minus.
+  std::string_view text(const Format& format, double number);
+  /// The text of a computed number by a format made by `integer`.
+  std::string_view text(const Format& format, std::int32_t number);
+
+ private:
+  std::string_view assemble(const Format& format, std::string_view digits);
+
+  // Room for a double of any size with 16 decimals and the texts around it.
+  std::array<char, 448> _room;
+};
 
 /// Shows the fields in a section, in the order of the table.
 void setFields(Dictionary& section, const Packet& packet, std::span<const Field> fields);

@@ -129,6 +129,63 @@ TEST(Field, OneRawValueMayHaveATextOfItsOwn) {
   EXPECT_EQ(shown({65}, fields), R"({Power: "35 dBm", Level: "None"})");
 }
 
+TEST(Field, ShowsSignedBytes) {
+  static constexpr Field fields[] = {{s8(0), "Low"}, {s8(1), "High"}};
+  EXPECT_EQ(shown({0x80, 0x7F}, fields), R"({Low: "-128", High: "127"})");
+}
+
+TEST(Field, ThePlusFlagShowsTheSignOfEveryNumber) {
+  static constexpr Field fields[] = {{s8(0), "Integer", integer("%+d dBm")},
+                                     {s8(0), "Real", real("%+.2f dB", 0.25)},
+                                     {s8(0), "Wide", real("%+7.2f", 0.25)}};
+  EXPECT_EQ(shown({5}, fields), R"({Integer: "+5 dBm", Real: "+1.25 dB", Wide: "  +1.25"})");
+  EXPECT_EQ(shown({0}, fields), R"({Integer: "+0 dBm", Real: "+0.00 dB", Wide: "  +0.00"})");
+  EXPECT_EQ(shown({0xFB}, fields), R"({Integer: "-5 dBm", Real: "-1.25 dB", Wide: "  -1.25"})");
+}
+
+TEST(Field, ShowsHexadecimals) {
+  static constexpr Field fields[] = {{u32(0), "Plain", hexadecimal("%x")},
+                                     {u32(0), "Wide", hexadecimal("0x%06x.")},
+                                     {u32(0), "Blanks", hexadecimal("%6x")}};
+  EXPECT_EQ(shown({0xBC, 0x0A, 0, 0}, fields), R"({Plain: "abc", Wide: "0x000abc.", Blanks: "   abc"})");
+  EXPECT_EQ(shown({0x78, 0x56, 0x34, 0xF2}, fields),
+            R"({Plain: "f2345678", Wide: "0xf2345678.", Blanks: "f2345678"})");
+}
+
+TEST(Field, APercentSignBehindTheNumberIsWrittenTwice) {
+  static constexpr Field fields[] = {{u8(0), "Share", real("%.02f%% (old)")},
+                                     {u8(0), "Whole", integer("%d%%")}};
+  EXPECT_EQ(shown({3}, fields), R"~({Share: "3.00% (old)", Whole: "3%"})~");
+}
+
+TEST(Field, ARawValueThatIsNoChoiceMayShowAsANumber) {
+  static constexpr Choice modes[] = {{0, "Off"}, {7, "On"}};
+  static constexpr Field fields[] = {{u32(0), "Mode", choice(modes, integer("[Bad Value %d]"))}};
+  EXPECT_EQ(shown({7, 0, 0, 0}, fields), R"({Mode: "On"})");
+  EXPECT_EQ(shown({8, 0, 0, 0}, fields), R"({Mode: "[Bad Value 8]"})");
+  EXPECT_EQ(shown({0xFF, 0xFF, 0xFF, 0xFF}, fields), R"({Mode: "[Bad Value -1]"})");
+}
+
+TEST(Formatter, ShowsComputedNumbersAsTheyAre) {
+  Formatter formatter;
+  EXPECT_EQ(formatter.text(real("%+.2f dB", 7.0, 9.0), -2.5), "-2.50 dB");
+  EXPECT_EQ(formatter.text(real("%.2f kbps"), 1234.567), "1234.57 kbps");
+}
+
+TEST(Formatter, ShowsNumbersWithoutEnd) {
+  constexpr double infinity = std::numeric_limits<double>::infinity();
+  Formatter formatter;
+  EXPECT_EQ(formatter.text(real("%+.2f dB"), -infinity), "-inf dB");
+  EXPECT_EQ(formatter.text(real("%+.2f dB"), infinity), "+inf dB");
+}
+
+TEST(Formatter, WhatIsNotANumberShowsNoMinus) {
+  constexpr double notANumber = std::numeric_limits<double>::quiet_NaN();
+  Formatter formatter;
+  EXPECT_EQ(formatter.text(real("%.2f"), notANumber), "nan");
+  EXPECT_EQ(formatter.text(real("%.2f"), -notANumber), "nan");
+}
+
 TEST(Field, ReadsRunsOfBits) {
   static constexpr Field fields[] = {
       {bits(0, 0, 1), "Flag"}, {bits(0, 1, 9), "Run"}, {bits(1, 2, 6), "Rest"}, {bits(0, 4, 32), "Long"}};
