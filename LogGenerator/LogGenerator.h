@@ -13,6 +13,7 @@ namespace varnel {
 /// Keys of the state dictionary, which belongs to the model and outlives the generators that fill it.
 namespace stateKey {
 inline constexpr std::string_view displayTemplate = "Template";
+inline constexpr std::string_view lookup = "Lookup";
 inline constexpr std::string_view display = "Display";
 inline constexpr std::string_view extraInfo = "ExtraInfo";
 inline constexpr std::string_view displayState = "DisplayState";

@@ -6,6 +6,7 @@
 #include <cinttypes>
 #include <cstdio>
 
+#include "LogGenerator/C2K/C2KLogGenerator.h"
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMLogGenerator.h"
 #include "LogGenerator/KLV/LTE/LTELogGenerator.h"
 #include "LogGenerator/KLV/UTRAN/UTRANLogGenerator.h"
@@ -53,6 +54,7 @@ TEST_F(LogGeneratorTest, ConstructionLogsItsAddress) {
 
 TEST_F(LogGeneratorTest, EachTechnologyHasItsGenerator) {
   EXPECT_NE(dynamic_cast<KLV_GSMLogGenerator*>(generatorFor("kalvi-gsm-umts").get()), nullptr);
+  EXPECT_NE(dynamic_cast<C2KLogGenerator*>(generatorFor("kalvi-cdma").get()), nullptr);
   EXPECT_NE(dynamic_cast<LTELogGenerator*>(generatorFor("kalvi-lte").get()), nullptr);
   EXPECT_NE(dynamic_cast<UTRANLogGenerator*>(generatorFor("kalvi-utran-2").get()), nullptr);
 }
@@ -65,7 +67,7 @@ TEST_F(LogGeneratorTest, EachCallMakesAnotherGenerator) {
 
 TEST_F(LogGeneratorTest, ATechnologyWithoutGeneratorYieldsNothingSilently) {
   const Value technologies[] = {"ifx-gsm",
-                                "kalvi-cdma",
+                                "kalvi-cdma-2",
                                 "kalvi-utran",
                                 "kalvi-utran-22",
                                 "Kalvi-LTE",
@@ -87,11 +89,14 @@ struct TemplateOfTechnology {
 };
 
 TEST_F(LogGeneratorTest, EachTechnologyHasItsTemplate) {
-  constexpr TemplateOfTechnology templates[] = {
-      {"kalvi-gsm-umts", "KLV_GSM"}, {"kalvi-lte", "LTE"}, {"kalvi-utran-2", "UTRAN"}};
+  constexpr TemplateOfTechnology templates[] = {{"kalvi-gsm-umts", "KLV_GSM"},
+                                                {"kalvi-cdma", "C2KTemplate"},
+                                                {"kalvi-lte", "LTE"},
+                                                {"kalvi-utran-2", "UTRAN"}};
   for (const auto& [technology, resource] : templates) {
     TestServices own;
     own.resources.add("KLV_GSM", Value::ofDictionary());
+    own.resources.add("C2KTemplate", Value::ofDictionary());
     own.resources.add("LTE", Value::ofDictionary());
     own.resources.add("UTRAN", Value::ofDictionary());
     Dictionary state;
@@ -119,13 +124,15 @@ TEST_F(LogGeneratorTest, EveryTruncatedMessageOfEachTechnologyIsSurvived) {
   const Bytes messages[] = {
       PacketBuilder(0xB0C2, 38).bytes(),
       PacketBuilder(0xB0C1, 22).bytes(),
+      PacketBuilder(0x1183, 50).bytes(),
       serverMessage(0xFF0001, Value::ofArray({dictionaryOf({{"CellType", "Serving"}})})),
       serverMessage(0xFF0002, Value::ofArray({"context"})),
   };
   host.resources.add("KLV_GSM", Value::ofDictionary());
+  host.resources.add("C2KTemplate", Value::ofDictionary());
   host.resources.add("LTE", Value::ofDictionary());
   host.resources.add("UTRAN", Value::ofDictionary());
-  for (const char* technology : {"kalvi-gsm-umts", "kalvi-lte", "kalvi-utran-2"}) {
+  for (const char* technology : {"kalvi-gsm-umts", "kalvi-cdma", "kalvi-lte", "kalvi-utran-2"}) {
     const auto generator = generatorFor(technology);
     Dictionary state;
     for (Bytes message : messages) {

@@ -312,7 +312,7 @@ TEST_F(DecodeProgram, AnUnknownTechnologyNamesThoseThatExist) {
   const Result result = run({"--technology", "kalvi-5g", write("capture", pcapHeader())});
   EXPECT_EQ(result.status, 2);
   EXPECT_EQ(linesOf(result.error), 1u) << result.error;
-  for (const char* technology : {"kalvi-5g", "kalvi-gsm-umts", "kalvi-lte", "kalvi-utran-2"}) {
+  for (const char* technology : {"kalvi-5g", "kalvi-gsm-umts", "kalvi-cdma", "kalvi-lte", "kalvi-utran-2"}) {
     EXPECT_THAT(result.error, HasSubstr(technology));
   }
 }

@@ -1,0 +1,140 @@
+#include "LogGenerator/C2K/C2KLogGenerator.h"
+
+#include <algorithm>
+
+#include "LogGenerator/C2K/DisplayVariables.h"
+#include "LogGenerator/C2K/PacketDecoders.h"
+#include "platform/Log.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr std::string_view templateName = "C2KTemplate";
+
+constexpr std::uint8_t modemLogType = 1;
+constexpr std::uint8_t extraLogType = 0xFF;
+constexpr std::uint8_t prefixMark = 0x81;
+constexpr std::size_t prefixSize = 2;
+constexpr std::size_t logCodeOffset = 3;
+constexpr std::uint32_t extraCodeBase = 0xFF0000;
+
+enum class Length { Exact, Minimum };
+
+struct PacketKind {
+  std::uint32_t logCode;
+  Length rule;
+  std::uint32_t length;  // of the whole packet
+  void (*decode)(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+};
+
+// In the order in which the start command asks for them.
+constexpr PacketKind packetKinds[] = {
+    {0x108A, Length::Minimum, c2k::fingerC2ISize, c2k::decodeFingerC2I},
+    {0x1183, Length::Exact, c2k::evdoStatusSize, c2k::decodeEVDOStatus},
+    {0x1192, Length::Minimum, c2k::flDataRateSize, c2k::decodeFLDataRate},
+    {0x12B6, Length::Minimum, c2k::evdoActiveSetSize, c2k::decodeEVDOActiveSet},
+    {0x119C, Length::Minimum, c2k::subpacketsSize, c2k::decode1xStatus},
+    {0x119D, Length::Minimum, c2k::subpacketsSize, c2k::decode1xTrafficFER},
+    {0x127E, Length::Minimum, c2k::rlDataRateSize, c2k::decodeRLDataRate},
+    {0x134F, Length::Minimum, c2k::systemInfoSize, c2k::decodeSystemInfo},
+};
+
+bool hasRightLength(const PacketKind& kind, const Packet& packet) {
+  const auto length = static_cast<std::uint32_t>(packet.size());
+  switch (kind.rule) {
+    case Length::Exact:
+      if (length == kind.length) return true;
+      logError("Log code 0x%x is %u bytes long but should be %u bytes.", kind.logCode, length, kind.length);
+      return false;
+    case Length::Minimum:
+      if (length >= kind.length) return true;
+      logError("Log code 0x%x is %u bytes long but must be at least %u bytes.", kind.logCode, length,
+               kind.length);
+      return false;
+  }
+  return false;
+}
+
+}  // namespace
+
+std::unique_ptr<LogGenerator> C2KLogGenerator::generator(const Services& services) {
+  return std::make_unique<C2KLogGenerator>(services);
+}
+
+void C2KLogGenerator::updateState_withData(Dictionary& state, ByteView data) {
+  getDisplayFromState(state);
+  static const Dictionary noPlaces;
+  const Dictionary* lookup = state.get(stateKey::lookup).dictionary();
+  updateFromLog_usingLookup_usingState(data, lookup ? *lookup : noPlaces, state);
+}
+
+Value C2KLogGenerator::generateLogUsingState(Dictionary& state) {
+  Value display = getDisplayFromState(state);
+  storeBinDataInState(state);
+  updateHistoryInState(state);
+  return display;
+}
+
+Value C2KLogGenerator::getStartCommand() const {
+  Value logCodes = Value::ofArray();
+  for (const PacketKind& kind : packetKinds) logCodes.array()->push_back(Value::ofInteger(kind.logCode));
+  Value command = Value::ofDictionary();
+  command.dictionary()->set("SetState", "Streaming");
+  command.dictionary()->set("SetKalviLogCodes", logCodes);
+  return command;
+}
+
+void C2KLogGenerator::processTemplate_storeDisplayIntoDict_storeLookupIntoDict(
+    const Dictionary& displayTemplate, const Value& display, Dictionary& lookup) {
+  for (const auto& [key, value] : displayTemplate) {
+    if (const Dictionary* section = value.dictionary()) {
+      const Value rows = Value::ofDictionary();
+      processTemplate_storeDisplayIntoDict_storeLookupIntoDict(*section, rows, lookup);
+      display.dictionary()->set(key, rows);
+    } else if (const std::string* text = value.string(); text && *text == c2k::sortedMark) {
+      display.dictionary()->set(key, c2k::sortedMark);
+    } else if (text) {
+      display.dictionary()->set(key, "");
+      c2k::addPlacement(lookup, *text, key, display);
+    }
+  }
+  logWarning("Processing the template");
+}
+
+Value C2KLogGenerator::getDisplayFromState(Dictionary& state) const {
+  if (const Value& display = state.get(stateKey::display); !display.isAbsent()) return display;
+  Value displayTemplate = state.get(stateKey::displayTemplate);
+  if (displayTemplate.isAbsent()) displayTemplate = services().resources.propertyList(templateName);
+  if (!displayTemplate.dictionary()) {
+    logError("Cannot load C2K template for display");
+    return {};
+  }
+  state.set(stateKey::displayTemplate, displayTemplate);
+  const Value display = Value::ofDictionary();
+  const Value lookup = Value::ofDictionary();
+  processTemplate_storeDisplayIntoDict_storeLookupIntoDict(*displayTemplate.dictionary(), display,
+                                                           *lookup.dictionary());
+  state.set(stateKey::display, display);
+  state.set(stateKey::lookup, lookup);
+  state.set(stateKey::extraInfo, Value::ofDictionary());
+  return display;
+}
+
+void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView message, const Dictionary& lookup,
+                                                           Dictionary& state) {
+  if (message.size() < Packet::headerSize) return;
+  // Kept: the length was tested with the prefix, so a packet behind one may lack two bytes of its header.
+  if (message[0] == prefixMark) message = message.subspan(prefixSize);
+  const Packet packet(message);
+  const std::uint8_t logType = packet.u8(0);
+  // Kept: whatever the line says, the packet is not dropped.
+  if (logType != modemLogType) logError("Invalid log type: %x. Dropping.", logType);
+  const std::uint32_t logCode = packet.u16(logCodeOffset) | (logType == extraLogType ? extraCodeBase : 0);
+  const auto kind = std::ranges::find(packetKinds, logCode, &PacketKind::logCode);
+  if (kind == std::end(packetKinds)) return;
+  if (hasRightLength(*kind, packet)) kind->decode(packet, state, lookup);
+  _binData.insert(_binData.end(), message.begin(), message.end());
+}
+
+}  // namespace varnel

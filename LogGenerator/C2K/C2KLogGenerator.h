@@ -1,0 +1,33 @@
+#pragma once
+
+#include "LogGenerator/KLVLogGenerator.h"
+
+namespace varnel {
+
+/// The generator of CDMA2000 1x and EV-DO modems. The template "C2KTemplate" fixes the shape of the display;
+/// each of its texts names the display variable that is shown in its place. The packet decoders publish
+/// variables, and the lookup made from the template tells where they are shown.
+class C2KLogGenerator final : public KLVLogGenerator {
+ public:
+  using KLVLogGenerator::KLVLogGenerator;
+  static std::unique_ptr<LogGenerator> generator(const Services& services);
+
+  void updateState_withData(Dictionary& state, ByteView data) override;
+  Value generateLogUsingState(Dictionary& state) override;
+  Value getStartCommand() const override;
+
+  /// Fills the display, a dictionary, with the shape of the template, and the lookup with an array for each
+  /// variable: a placement {"key": the row, "dict": the dictionary of the display that holds the row} for
+  /// each place that names it.
+  static void processTemplate_storeDisplayIntoDict_storeLookupIntoDict(const Dictionary& displayTemplate,
+                                                                       const Value& display,
+                                                                       Dictionary& lookup);
+
+ private:
+  /// The display in the state, which is made with its lookup on first use; absent without a template.
+  Value getDisplayFromState(Dictionary& state) const;
+  /// Decodes one message. Packets of the known log codes are kept for the binary log, decodable or not.
+  void updateFromLog_usingLookup_usingState(ByteView message, const Dictionary& lookup, Dictionary& state);
+};
+
+}  // namespace varnel

@@ -1,0 +1,116 @@
+#include <optional>
+
+#include "LogGenerator/C2K/DisplayVariables.h"
+#include "LogGenerator/C2K/PacketDecoders.h"
+#include "LogGenerator/LogGenerator.h"
+
+namespace varnel::c2k {
+
+namespace {
+
+// The bits that each packet of a counter stands for; packets of a counter with 0 do not count.
+constexpr std::uint64_t flWeights[] = {
+    128,  256,  512, 1024, 0,    128,  256,  512,  1024, 0,    128,  256,  512,  1024,
+    0,    128,  256, 512,  1024, 0,    128,  256,  512,  1024, 0,    512,  1024, 2048,
+    0,    128,  256, 512,  1024, 0,    512,  1024, 2048, 0,    1024, 3072, 0,    512,
+    1024, 2048, 0,   4096, 0,    1024, 3072, 0,    4096, 0,    5120, 0,    5120, 0,
+};
+constexpr std::uint64_t rlWeights[] = {128, 256, 512, 768, 1024, 1536, 2048, 3072, 4096, 6144, 8192, 12288};
+constexpr std::size_t flCounterCount = std::size(flWeights);
+constexpr std::size_t rlRateCount = std::size(rlWeights);
+static_assert(flCounterCount == 56 && rlRateCount == 12);
+
+constexpr std::size_t counterSize = 4;
+
+constexpr std::size_t flSequenceOffset = 13;
+constexpr std::size_t flCounters = 17;
+static_assert(flCounters + counterSize * flCounterCount == flDataRateSize);
+
+// The reverse link counts in three blocks of two halves. In each half every rate has a row, of which the
+// first counters count.
+constexpr std::size_t rlSequenceOffset = 14;
+constexpr std::size_t rlCounters = 18;
+constexpr std::size_t rlRowSize = 24;
+constexpr std::size_t rlRowCounters = 4;
+constexpr std::size_t rlHalfSize = rlRowSize * rlRateCount;
+constexpr std::size_t rlHalfCount = 6;
+static_assert(rlHalfSize == 288 && rlCounters + rlHalfSize * rlHalfCount <= rlDataRateSize);
+
+// The names of one link's variable and of its entries in the state and in the extra information.
+struct Link {
+  std::string_view variable;
+  std::string_view sequence, sent;
+  std::string_view newSequence, newSent;
+  std::string_view oldSequence, oldSent;
+};
+constexpr Link forwardLink = {"kFLDataRate", "FLDataSeqNum",  "FLDataSent", "FLDataSeqNum1",
+                              "FLDataSent1", "FLDataSeqNum2", "FLDataSent2"};
+constexpr Link reverseLink = {"kRLDataRate", "RLDataSeqNum",  "RLDataSent", "RLDataSeqNum1",
+                              "RLDataSent1", "RLDataSeqNum2", "RLDataSent2"};
+
+// What a link had sent when it wrote a packet.
+struct Progress {
+  std::uint32_t sequence;
+  std::uint64_t bits;
+};
+
+void store(Dictionary& entries, std::string_view sequence, std::string_view sent, const Progress& progress) {
+  entries.set(sequence, Value::ofInteger(progress.sequence));
+  entries.set(sent, Value::ofInteger(static_cast<std::int64_t>(progress.bits)));
+}
+
+std::optional<Progress> previousProgress(const Link& link, const Dictionary& state) {
+  const auto sequence = state.get(link.sequence).integer();
+  const auto bits = state.get(link.sent).integer();
+  if (!sequence || !bits) return std::nullopt;
+  return Progress{static_cast<std::uint32_t>(*sequence), static_cast<std::uint64_t>(*bits)};
+}
+
+void showRate(const Link& link, const Progress& previous, const Progress& now, const Dictionary& lookup) {
+  // The sequence wraps. One that does not rise leaves the rate as it is.
+  const auto steps = static_cast<std::int32_t>(now.sequence - previous.sequence);
+  if (steps < 1) return;
+  const auto bits = static_cast<double>(static_cast<std::int64_t>(now.bits - previous.bits));
+  storeDisplayNumber(link.variable, real("%.2f kbps"), bits / (steps * 1024.0), lookup);
+}
+
+void updateRate(const Link& link, const Progress& now, Dictionary& state, const Dictionary& lookup) {
+  Dictionary* extraInfo = state.get(stateKey::extraInfo).dictionary();
+  if (const auto previous = previousProgress(link, state)) {
+    showRate(link, *previous, now, lookup);
+    if (extraInfo) store(*extraInfo, link.oldSequence, link.oldSent, *previous);
+  } else {
+    storeDisplayText(link.variable, "", lookup);
+  }
+  store(state, link.sequence, link.sent, now);
+  if (extraInfo) store(*extraInfo, link.newSequence, link.newSent, now);
+}
+
+std::uint64_t rlPacketsAtRate(const Packet& packet, std::size_t rate) {
+  std::uint64_t sum = 0;
+  for (std::size_t half = 0; half < rlHalfCount; ++half) {
+    const std::size_t row = rlCounters + rlHalfSize * half + rlRowSize * rate;
+    for (std::size_t i = 0; i < rlRowCounters; ++i) sum += packet.u32(row + counterSize * i);
+  }
+  return sum;
+}
+
+}  // namespace
+
+void decodeFLDataRate(const Packet& packet, Dictionary& state, const Dictionary& lookup) {
+  std::uint64_t bits = 0;
+  for (std::size_t i = 0; i < flCounterCount; ++i) {
+    bits += packet.u32(flCounters + counterSize * i) * flWeights[i];
+  }
+  updateRate(forwardLink, {packet.u32(flSequenceOffset), bits}, state, lookup);
+}
+
+void decodeRLDataRate(const Packet& packet, Dictionary& state, const Dictionary& lookup) {
+  std::uint64_t bits = 0;
+  for (std::size_t rate = 0; rate < rlRateCount; ++rate) {
+    bits += rlPacketsAtRate(packet, rate) * rlWeights[rate];
+  }
+  updateRate(reverseLink, {packet.u32(rlSequenceOffset), bits}, state, lookup);
+}
+
+}  // namespace varnel::c2k

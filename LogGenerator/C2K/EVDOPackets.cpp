@@ -1,0 +1,97 @@
+#include "LogGenerator/C2K/BandClass.h"
+#include "LogGenerator/C2K/DisplayVariables.h"
+#include "LogGenerator/C2K/PacketDecoders.h"
+#include "LogGenerator/C2K/PilotStrengths.h"
+#include "platform/Log.h"
+
+namespace varnel::c2k {
+
+namespace {
+
+constexpr Choice accessTerminalStates[] = {
+    {0, "Inactive [0]"}, {1, "Acquisition [1]"}, {2, "Sync [2]"},
+    {3, "Idle [3]"},     {4, "Access [4]"},      {5, "Connected [5]"},
+};
+constexpr std::uint8_t accessState = 4;
+
+constexpr Choice sessionStates[] = {
+    {0, "Closed [0]"},        {1, "AMP setup [1]"}, {2, "AT-initiated neg [2]"},
+    {3, "Initiated neg [3]"}, {4, "Open [4]"},
+};
+
+constexpr Format reserved = integer("[Reserved %d]");
+constexpr Format dBm = integer("%+d dBm");
+
+constexpr Source accessTerminalState = u8(36);
+constexpr Field channel[] = {
+    {bits(13, 0, 11), "kChannel"},
+    {accessTerminalState, "k1xEVDODeviceState", choice(accessTerminalStates, reserved)},
+    {bits(14, 3, 5), "kBandClass", bandClass},
+    {s8(15), "kRxAGC0", dBm},
+};
+// Shown while the access terminal is in the access state or beyond.
+constexpr Field levelsInUse[] = {
+    {s8(16), "kRxAGC1", dBm},
+    {s8(17), "kTxAGC", dBm},
+};
+constexpr Field session[] = {
+    {u16(18), "kServingPNOffset", integer("%d × 64chips").unless(0xFFFF, "Invalid Value")},
+    {u8(37), "kSessionState", choice(sessionStates, reserved)},
+    {bits(38, 0, 24), "kUATI24", hexadecimal("0x%06x")},
+    {u8(41), "kColorCode"},
+};
+static_assert(within(channel, evdoStatusSize) && within(levelsInUse, evdoStatusSize) &&
+              within(session, evdoStatusSize));
+
+constexpr std::uint16_t unassignedPN = 0xFFFF;
+
+}  // namespace
+
+void decodeEVDOStatus(const Packet& packet, Dictionary& /*state*/, const Dictionary& lookup) {
+  storeDisplayFields(packet, channel, lookup);
+  if (packet.u8(accessTerminalState.byte) >= accessState) {
+    storeDisplayFields(packet, levelsInUse, lookup);
+  } else {
+    for (const Field& field : levelsInUse) storeDisplayText(field.label, "N/A", lookup);
+  }
+  storeDisplayFields(packet, session, lookup);
+}
+
+void decodeEVDOActiveSet(const Packet& packet, Dictionary& /*state*/, const Dictionary& lookup) {
+  constexpr std::size_t countOffset = 15;
+  constexpr std::size_t pilotSize = 12;
+  const std::uint8_t count = packet.u8(countOffset);
+  if (!packet.holds(evdoActiveSetSize, pilotSize * count)) {
+    logError("Log code 0x12b6 is %u bytes long, but has %d substructs.",
+             static_cast<std::uint32_t>(packet.size()), count);
+    return;
+  }
+  PilotStrengths pilots(count);
+  for (std::size_t i = 0; i < count; ++i) {
+    const Packet pilot = packet.from(evdoActiveSetSize + pilotSize * i);
+    pilots.add(i, pilot.u16(0), decibelFormat, decibelsOfRatio512(pilot.u16(2)));
+  }
+  storeDisplayValue("kActiveSetPilots", pilots.asDictionaryOrNone(), lookup);
+}
+
+void decodeFingerC2I(const Packet& packet, Dictionary& /*state*/, const Dictionary& lookup) {
+  constexpr std::size_t countOffset = 22;
+  constexpr std::size_t fingerSize = 14;
+  const std::uint8_t count = packet.u8(countOffset);
+  if (packet.size() != fingerC2ISize + fingerSize * count) {
+    // Kept: the size in the line is that of a packet without fingers.
+    logError("Log code 0x108a has bad length of %u bytes, but has %d substructs (size=%u).",
+             static_cast<std::uint32_t>(packet.size()), count, fingerC2ISize);
+    return;
+  }
+  PilotStrengths fingers(count);
+  for (std::size_t i = 0; i < count; ++i) {
+    const Packet finger = packet.from(fingerC2ISize + fingerSize * i);
+    if (const std::uint16_t pn = finger.u16(0); pn != unassignedPN) {
+      fingers.add(i, pn, decibelFormat, decibelsOfRatio512(finger.u16(6)));
+    }
+  }
+  storeDisplayValue("kFingerC2I", fingers.asDictionaryOrNone(), lookup);
+}
+
+}  // namespace varnel::c2k

@@ -1,0 +1,39 @@
+#pragma once
+
+#include <cstdint>
+
+#include "LogGenerator/Packet.h"
+#include "platform/Dictionary.h"
+
+/// The decoders of CDMA2000 packets. Each takes a packet of the right length, publishes its display variables
+/// through the lookup, and keeps what it must remember until the next packet in the state.
+namespace varnel::c2k {
+
+/// Lengths of packets in bytes, header included: of the EV-DO status exactly, of all others at least.
+inline constexpr std::uint32_t evdoStatusSize = 50;
+inline constexpr std::uint32_t evdoActiveSetSize = 25;
+inline constexpr std::uint32_t fingerC2ISize = 23;
+inline constexpr std::uint32_t subpacketsSize = 17;
+/// Kept: the base station id lies behind it, at 184.
+inline constexpr std::uint32_t systemInfoSize = 171;
+inline constexpr std::uint32_t flDataRateSize = 241;
+inline constexpr std::uint32_t rlDataRateSize = 1750;
+
+/// 0x1183: state of the EV-DO session, its channel and its signal levels.
+void decodeEVDOStatus(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+/// 0x12b6: strengths of the pilots in the EV-DO active set.
+void decodeEVDOActiveSet(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+/// 0x108a: carrier to interference of each EV-DO finger.
+void decodeFingerC2I(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+/// 0x119c: state of the 1x device, its channels, signal levels and active set.
+void decode1xStatus(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+/// 0x119d: one more frame for the average of the frame-error rate on the 1x traffic channel.
+void decode1xTrafficFER(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+/// 0x134f: the system that serves the phone.
+void decodeSystemInfo(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+/// 0x1192: the data rate of the EV-DO forward link since the packet before.
+void decodeFLDataRate(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+/// 0x127e: the data rate of the EV-DO reverse link since the packet before.
+void decodeRLDataRate(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+
+}  // namespace varnel::c2k

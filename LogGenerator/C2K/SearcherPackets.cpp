@@ -1,0 +1,154 @@
+#include <cmath>
+#include <optional>
+
+#include "LogGenerator/C2K/BandClass.h"
+#include "LogGenerator/C2K/DisplayVariables.h"
+#include "LogGenerator/C2K/PacketDecoders.h"
+#include "LogGenerator/C2K/PilotStrengths.h"
+#include "LogGenerator/C2K/Subpackets.h"
+#include "platform/Log.h"
+
+namespace varnel::c2k {
+
+namespace {
+
+constexpr Choice deviceStates[] = {
+    {0, "Inactive [0]"},
+    {1, "Deep sleep in start state [1]"},
+    {2, "Initial state for CDMA operation [2]"},
+    {3, "Acquisition [3]"},
+    {4, "Sync [4]"},
+    {5, "Slew [5]"},
+    {6, "Paging [6]"},
+    {7, "Slotted mode sleep state [7]"},
+    {8, "Traffic [8]"},
+    {9, "UnSlew [9]"},
+    {10, "Operation in PCG state [10]"},
+    {11, "Powerup state [11]"},
+};
+constexpr std::uint8_t trafficState = 8;
+
+constexpr Source deviceState = u8(4);
+constexpr Field systemState[] = {
+    {deviceState, "k1xDeviceState", choice(deviceStates, integer("[Bad Value %d]"))},
+};
+constexpr Field firstChain[] = {
+    {u8(4), "k1xRx0BandClass", bandClass},
+    {u16(6), "k1xRx0ChanNum"},
+};
+constexpr Field secondChain[] = {
+    {u8(5), "k1xRx1BandClass", bandClass},
+    {u16(8), "k1xRx1ChanNum"},
+};
+constexpr Format dBm = real("%+.2f dBm");
+
+constexpr std::string_view trafficFERKey = "TrafficFER";
+constexpr std::string_view trafficFERVariable = "k1xTrafficFER";
+
+double receiveAGC(std::uint8_t byte) {
+  const int raw = static_cast<std::int8_t>(byte);
+  return raw * 334 / 1000.0 - 63.248;
+}
+
+double transmitPower(std::uint16_t tenths) { return static_cast<std::int16_t>(tenths) / 10.0; }
+
+void showRF(const Packet& rf, bool isInTraffic, const Dictionary& lookup) {
+  storeDisplayFields(rf, firstChain, lookup);
+  storeDisplayNumber("k1xRxAGC0", dBm, receiveAGC(rf.u8(10)), lookup);
+  if (isInTraffic) {
+    storeDisplayFields(rf, secondChain, lookup);
+    storeDisplayNumber("k1xRxAGC1", dBm, receiveAGC(rf.u8(11)), lookup);
+    storeDisplayNumber("k1xTxAGC", dBm, transmitPower(rf.u16(12)), lookup);
+  } else {
+    for (const auto variable : {"k1xRx1BandClass", "k1xRx1ChanNum", "k1xRxAGC1", "k1xTxAGC"}) {
+      storeDisplayText(variable, "N/A", lookup);
+    }
+  }
+}
+
+// How the searcher scales the energies that it measures.
+struct Integration {
+  double length;
+  double gain;
+  int exponent;
+};
+
+// The strength of a pilot, Ec/Io. What is no number or too small shows as the floor, -50 dB.
+double pilotStrength(const Integration& integration, std::uint16_t energy) {
+  constexpr double floor = 0.00001;
+  const double n = integration.length;
+  const double ratio =
+      std::ldexp(1.0, 2 * integration.exponent - 3) * energy / (9.0 * n * n * integration.gain) - 1.0 / n;
+  return decibels(ratio > floor ? ratio : floor);
+}
+
+void showActiveSet(const Packet& activeSet, const Dictionary& lookup) {
+  constexpr Format referencePilot = real("(ref pilot) %+.2f dB");
+  const Integration integration{.length = static_cast<double>(activeSet.u16(4)),
+                                .gain = static_cast<double>(activeSet.u8(6)),
+                                .exponent = activeSet.u8(7)};
+  const std::size_t count = activeSet.u8(8);
+  const std::size_t extensions = activeSet.u8(9);
+  const std::uint16_t referencePN = activeSet.u16(10);
+  const std::size_t stride = (6 * extensions + 15) & 0xFFC;
+  PilotStrengths pilots(count);
+  for (std::size_t i = 0; i < count; ++i) {
+    const std::uint16_t pn = activeSet.u16(12 + i * stride);
+    const std::uint16_t energy = activeSet.u16(24 + 4 * extensions + i * stride);
+    pilots.add(i, pn, pn == referencePN ? referencePilot : decibelFormat, pilotStrength(integration, energy));
+  }
+  // Kept: unlike those of EV-DO, an active set without pilots shows no text.
+  storeDisplayValue("k1xActiveSetInfo", pilots.asDictionary(), lookup);
+}
+
+// The frame-error rate between 0 and 1. It is computed in single precision at every step.
+std::optional<float> trafficFER(const Dictionary& state) {
+  const Value& rate = state.get(trafficFERKey);
+  if (const auto real = rate.real()) return static_cast<float>(*real);
+  if (const auto integer = rate.integer()) return static_cast<float>(*integer);
+  return std::nullopt;
+}
+
+// The rate of a call that is over is shown once more; the next call starts its average afresh.
+void endTrafficFER(Dictionary& state, const Dictionary& lookup) {
+  const auto rate = trafficFER(state);
+  if (!rate) return;
+  storeDisplayNumber(trafficFERVariable, real("%.02f%% (old)"), *rate * 100.0F, lookup);
+  state.remove(trafficFERKey);
+}
+
+}  // namespace
+
+void decode1xStatus(const Packet& packet, Dictionary& state, const Dictionary& lookup) {
+  const auto system = findSubpacket(packet, SubpacketId::SystemState);
+  const auto rf = findSubpacket(packet, SubpacketId::RF);
+  const auto activeSet = findSubpacket(packet, SubpacketId::ActiveSetInfo);
+  const auto fingers = findSubpacket(packet, SubpacketId::FingerInfo);
+  // Kept: the fingers must be there though nobody reads them.
+  if (!system || !rf || !activeSet || !fingers) {
+    logWarning("Log code 0x119c: missing subpacket (ss=%d,rf=%d,ai=%d,fi=%d).", system.has_value(),
+               rf.has_value(), activeSet.has_value(), fingers.has_value());
+    return;
+  }
+  const bool isInTraffic = system->u8(deviceState.byte) == trafficState;
+  storeDisplayFields(*system, systemState, lookup);
+  showRF(*rf, isInTraffic, lookup);
+  showActiveSet(*activeSet, lookup);
+  if (!isInTraffic) endTrafficFER(state, lookup);
+}
+
+void decode1xTrafficFER(const Packet& packet, Dictionary& state, const Dictionary& lookup) {
+  constexpr std::size_t erasureOffset = 24;
+  const auto demodulation = findSubpacket(packet, SubpacketId::TrafficDemodulation);
+  if (!demodulation) {
+    logWarning("Log code 0x119d: missing traffic demod subpacket.");
+    return;
+  }
+  const float sample = demodulation->u8(erasureOffset) ? 1.0F / 64 : 0.0F;
+  const auto previous = trafficFER(state);
+  const float rate = previous ? sample + *previous * (63.0F / 64) : sample;
+  state.set(trafficFERKey, Value::ofReal(rate));
+  storeDisplayNumber(trafficFERVariable, real("%.02f%%"), rate * 100.0F, lookup);
+}
+
+}  // namespace varnel::c2k

@@ -1,0 +1,71 @@
+#include "LogGenerator/C2K/DisplayVariables.h"
+#include "LogGenerator/C2K/PacketDecoders.h"
+#include "platform/Log.h"
+
+namespace varnel::c2k {
+
+namespace {
+
+constexpr std::size_t versionOffset = 13;
+constexpr std::uint8_t oldestVersion = 2;
+
+// Enhanced roaming indicators.
+constexpr Choice roamingIndicators[] = {
+    {0, "OFF [0]"},
+    {1, "ON [1]"},
+    {2, "Flashing [2]"},
+    {3, "Out of Neighborhood [3]"},
+    {4, "Out of Building [4]"},
+    {5, "Preferred system [5]"},
+    {6, "Available system [6]"},
+    {7, "Alliance partner [7]"},
+    {8, "Premium partner [8]"},
+    {9, "Full service functionality [9]"},
+    {10, "Partial service functionality [10]"},
+    {11, "Banner ON [11]"},
+    {12, "Banner OFF [12]"},
+};
+
+constexpr Field roaming[] = {
+    {u32(42), "k1xRoamingHome", choice(roamingIndicators, integer("ERI - %d"))},
+};
+
+constexpr Source systemType = u32(46);
+constexpr std::uint32_t knownSystemType = 2;
+constexpr Field knownSystem[] = {
+    {u16(50), "kSystemId"},
+    {u16(52), "kNetworkId"},
+};
+constexpr Format unknownType = integer("(unknown system type %d)");
+constexpr Field unknownSystem[] = {
+    {systemType, "kSystemId", unknownType},
+    {systemType, "kNetworkId", unknownType},
+};
+
+constexpr Field packetZone[] = {{u8(131), "kPacketZoneId"}};
+constexpr Field baseStation[] = {{u16(184), "kBaseId"}};
+constexpr Field protocol[] = {{u8(133), "kProtocolRevision"}};
+
+static_assert(within(roaming, systemInfoSize) && within(knownSystem, systemInfoSize) &&
+              within(unknownSystem, systemInfoSize) && within(packetZone, systemInfoSize) &&
+              within(protocol, systemInfoSize));
+
+}  // namespace
+
+void decodeSystemInfo(const Packet& packet, Dictionary& /*state*/, const Dictionary& lookup) {
+  if (const std::uint8_t version = packet.u8(versionOffset); version < oldestVersion) {
+    logError("Log code 0x134f has version=%d; only version 2 or higher expected; dropping.", version);
+    return;
+  }
+  storeDisplayFields(packet, roaming, lookup);
+  if (packet.u32(systemType.byte) == knownSystemType) {
+    storeDisplayFields(packet, knownSystem, lookup);
+  } else {
+    storeDisplayFields(packet, unknownSystem, lookup);
+  }
+  storeDisplayFields(packet, packetZone, lookup);
+  if (packet.holds(0, extent(baseStation))) storeDisplayFields(packet, baseStation, lookup);
+  storeDisplayFields(packet, protocol, lookup);
+}
+
+}  // namespace varnel::c2k
