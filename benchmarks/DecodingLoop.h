@@ -10,16 +10,20 @@
 
 namespace varnel {
 
-/// A generator with its real template that takes the same message again and again.
+/// A generator with its real template that takes the message of a case again and again.
 class DecodingLoop {
  public:
   explicit DecodingLoop(const PacketCase& packetCase)
       : _message(packetCase.message()),
+        _advance(packetCase.advance),
         _generator(LogGenerator::generatorFromTechnology(
             packetCase.technology, {_resources, _clock, _application, _standardOutput})) {}
 
   const Bytes& message() const { return _message; }
-  void decode() { _generator->updateState_withData(_state, _message); }
+  void decode() {
+    if (_advance) _advance(_message);
+    _generator->updateState_withData(_state, _message);
+  }
   /// Takes the raw bytes away that the generator keeps until the next display.
   void display() { _generator->generateLogUsingState(_state); }
 
@@ -29,6 +33,7 @@ class DecodingLoop {
   const ApplicationInfo _application;
   std::ostream _standardOutput{nullptr};
   Bytes _message;
+  void (*_advance)(Bytes& message);
   Dictionary _state;
   std::unique_ptr<LogGenerator> _generator;
 };

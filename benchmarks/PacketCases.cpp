@@ -1,5 +1,7 @@
 #include "PacketCases.h"
 
+#include <cstring>
+
 #include "platform/Dictionary.h"
 #include "platform/PropertyList.h"
 #include "platform/TelephonyService.h"
@@ -63,6 +65,46 @@ Bytes gsmUMTSRegistration() {
   return bytes;
 }
 
+Bytes c2k1xStatusOf6Pilots() {
+  constexpr std::size_t subpacketSizes[] = {8, 16, 24 + 6 * 12 + 2, 8};
+  Bytes bytes = packet(0x119C, 17 + 8 + 16 + 98 + 8);
+  bytes[14] = 4;
+  std::size_t start = 17;
+  std::uint8_t id = 1;
+  for (const std::size_t size : subpacketSizes) {
+    bytes[start] = id++;
+    bytes[start + 2] = static_cast<std::uint8_t>(size);
+    bytes[start + 3] = 0;
+    start += size;
+  }
+  bytes[17 + 4] = 8;  // traffic
+  const std::size_t activeSet = 17 + 8 + 16;
+  bytes[activeSet + 7] = 10;  // exponent
+  bytes[activeSet + 8] = 6;
+  bytes[activeSet + 9] = 0;  // no extensions: a pilot takes 12 bytes
+  return bytes;
+}
+
+void raise(Bytes& bytes, std::size_t offset, std::uint32_t difference) {
+  std::uint32_t number = 0;
+  std::memcpy(&number, bytes.data() + offset, sizeof number);
+  number += difference;
+  std::memcpy(bytes.data() + offset, &number, sizeof number);
+}
+
+// Each packet has the next sequence value and some more packets on its first counter.
+Bytes c2kForwardLink() { return packet(0x1192, 241); }
+void advanceForwardLink(Bytes& bytes) {
+  raise(bytes, 13, 1);
+  raise(bytes, 17, 1200);
+}
+
+Bytes c2kReverseLink() { return packet(0x127E, 1750); }
+void advanceReverseLink(Bytes& bytes) {
+  raise(bytes, 14, 1);
+  raise(bytes, 18, 1200);
+}
+
 Bytes cellMonitorOf16Records(std::string_view access) {
   Value cells = Value::ofArray();
   for (int i = 0; i < 16; ++i) {
@@ -100,6 +142,9 @@ std::span<const PacketCase> packetCases() {
       {"GSM/UMTS 0x5137, 6 neighbours, 4 sections", technology::kalviGSMUMTS, gsmUMTSMeasurementOf6Neighbors},
       {"GSM/UMTS 0x7132, 4 sections", technology::kalviGSMUMTS, gsmUMTSRegistration},
       {"GSM/UMTS cell monitor, 16 records, 5 sections", technology::kalviGSMUMTS, gsmUMTSCellMonitor},
+      {"C2K 0x119c, 6 pilots", technology::kalviCDMA, c2k1xStatusOf6Pilots},
+      {"C2K 0x1192", technology::kalviCDMA, c2kForwardLink, advanceForwardLink},
+      {"C2K 0x127e", technology::kalviCDMA, c2kReverseLink, advanceReverseLink},
   };
   return cases;
 }
