@@ -1,9 +1,7 @@
 #include "LogGenerator/C2K/PilotStrengths.h"
 
-#include <algorithm>
-#include <array>
-#include <charconv>
 #include <cmath>
+#include <string>
 
 #include "LogGenerator/C2K/DisplayVariables.h"
 #include "platform/Dictionary.h"
@@ -16,12 +14,9 @@ PilotStrengths::PilotStrengths(std::size_t count) {
 }
 
 void PilotStrengths::add(std::size_t index, std::uint16_t pn, const Format& format, double decibels) {
-  std::array<char, 32> key;
-  char* end = std::to_chars(key.begin(), key.end(), index).ptr;
-  *end++ = ';';
-  end = std::to_chars(end, key.end(), pn).ptr;
   Formatter formatter;
-  _rows.dictionary()->setText({key.begin(), end}, formatter.text(format, decibels));
+  _rows.dictionary()->setText(std::to_string(index) + ';' + std::to_string(pn),
+                              formatter.text(format, decibels));
 }
 
 Value PilotStrengths::asDictionaryOrNone() const { return _rows.dictionary()->size() > 1 ? _rows : "(none)"; }
