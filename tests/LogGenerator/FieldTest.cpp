@@ -94,7 +94,7 @@ TEST(Field, ShowsTheEntryThatTheRawValueCountsFrom0OrElseTheOtherText) {
   EXPECT_EQ(shown({255}, fields), R"({State: "Unknown", Time: "?? ms"})");
 }
 
-TEST(Field, ShowsSignedBytes) {
+TEST(Field, ScalesSignedBytes) {
   static constexpr Field fields[] = {{s8(0), "Level", integer("%d dB", 1, -21)},
                                      {s8(0), "Half", real("%f", 0.5)}};
   EXPECT_EQ(shown({0x80}, fields), R"({Level: "-149 dB", Half: "-64.000000"})");
