@@ -1,6 +1,7 @@
 #include "LogGenerator/LogGenerator.h"
 
 #include "LogGenerator/C2K/C2KLogGenerator.h"
+#include "LogGenerator/GSM/GSMLogGenerator.h"
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMLogGenerator.h"
 #include "LogGenerator/KLV/LTE/LTELogGenerator.h"
 #include "LogGenerator/KLV/UTRAN/UTRANLogGenerator.h"
@@ -17,6 +18,7 @@ struct Registration {
 };
 
 constexpr Registration registry[] = {
+    {technology::ifxGSM, GSMLogGenerator::generator},
     {technology::kalviGSMUMTS, KLV_GSMLogGenerator::generator},
     {technology::kalviCDMA, C2KLogGenerator::generator},
     {technology::kalviLTE, LTELogGenerator::generator},

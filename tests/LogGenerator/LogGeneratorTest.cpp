@@ -7,6 +7,7 @@
 #include <cstdio>
 
 #include "LogGenerator/C2K/C2KLogGenerator.h"
+#include "LogGenerator/GSM/GSMLogGenerator.h"
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMLogGenerator.h"
 #include "LogGenerator/KLV/LTE/LTELogGenerator.h"
 #include "LogGenerator/KLV/UTRAN/UTRANLogGenerator.h"
@@ -53,6 +54,7 @@ TEST_F(LogGeneratorTest, ConstructionLogsItsAddress) {
 }
 
 TEST_F(LogGeneratorTest, EachTechnologyHasItsGenerator) {
+  EXPECT_NE(dynamic_cast<GSMLogGenerator*>(generatorFor("ifx-gsm").get()), nullptr);
   EXPECT_NE(dynamic_cast<KLV_GSMLogGenerator*>(generatorFor("kalvi-gsm-umts").get()), nullptr);
   EXPECT_NE(dynamic_cast<C2KLogGenerator*>(generatorFor("kalvi-cdma").get()), nullptr);
   EXPECT_NE(dynamic_cast<LTELogGenerator*>(generatorFor("kalvi-lte").get()), nullptr);
@@ -66,8 +68,8 @@ TEST_F(LogGeneratorTest, EachCallMakesAnotherGenerator) {
 }
 
 TEST_F(LogGeneratorTest, ATechnologyWithoutGeneratorYieldsNothingSilently) {
-  const Value technologies[] = {"ifx-gsm",
-                                "kalvi-cdma-2",
+  const Value technologies[] = {"kalvi-cdma-2",
+                                "ifx",
                                 "kalvi-utran",
                                 "kalvi-utran-22",
                                 "Kalvi-LTE",

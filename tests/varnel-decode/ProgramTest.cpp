@@ -185,7 +185,7 @@ TEST_F(DecodeProgram, ADisplayThatNoPropertyListHoldsIsAnError) {
 
 TEST_F(DecodeProgram, EveryTechnologyKeepsItsLinesOutOfTheData) {
   const std::string path = write("capture", pcapHeader());
-  for (const char* technology : {"kalvi-gsm-umts", "kalvi-lte", "kalvi-utran-2"}) {
+  for (const char* technology : {"ifx-gsm", "kalvi-gsm-umts", "kalvi-lte", "kalvi-utran-2"}) {
     const Result result = run({"--technology", technology, "--format", "paths", path});
     EXPECT_EQ(result.status, 0) << technology << ": " << result.error;
     EXPECT_EQ(result.output, "/\t(unknown)\n") << technology;
@@ -312,7 +312,8 @@ TEST_F(DecodeProgram, AnUnknownTechnologyNamesThoseThatExist) {
   const Result result = run({"--technology", "kalvi-5g", write("capture", pcapHeader())});
   EXPECT_EQ(result.status, 2);
   EXPECT_EQ(linesOf(result.error), 1u) << result.error;
-  for (const char* technology : {"kalvi-5g", "kalvi-gsm-umts", "kalvi-cdma", "kalvi-lte", "kalvi-utran-2"}) {
+  for (const char* technology :
+       {"kalvi-5g", "ifx-gsm", "kalvi-gsm-umts", "kalvi-cdma", "kalvi-lte", "kalvi-utran-2"}) {
     EXPECT_THAT(result.error, HasSubstr(technology));
   }
 }
