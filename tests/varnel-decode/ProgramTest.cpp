@@ -232,6 +232,27 @@ TEST_F(DecodeProgram, AnUnreadableSIMPayloadAbortsAfterItsLogLineWithoutADisplay
   EXPECT_FALSE(std::filesystem::exists(snapshot));
 }
 
+TEST_F(DecodeProgram, AnObjectOfAnUnknownKindAbortsWithFileLineAndDescription) {
+  const std::string path =
+      write("capture", pcapHeader() + pcapRecord(afternoon, 0, list("<integer>1</integer>")));
+  const Result result = run({"--technology", "ifx-gsm", path});
+  EXPECT_EQ(result.status, -SIGABRT);
+  EXPECT_EQ(result.output, "");
+  EXPECT_THAT(result.error, HasSubstr("Unknown object of type integer encountered"));
+  EXPECT_THAT(result.error, HasSubstr("LogGenerator/GSM/GSMLogGenerator"));
+  EXPECT_THAT(result.error, HasSubstr("78"));
+}
+
+TEST_F(DecodeProgram, AnObjectThatIsNoPropertyListAbortsWithFileLineAndDescription) {
+  const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, "?"));
+  const Result result = run({"--technology", "ifx-gsm", path});
+  EXPECT_EQ(result.status, -SIGABRT);
+  EXPECT_EQ(result.output, "");
+  EXPECT_THAT(result.error, HasSubstr("Could not deserialize the object"));
+  EXPECT_THAT(result.error, HasSubstr("LogGenerator/GSM/GSMLogGenerator"));
+  EXPECT_THAT(result.error, HasSubstr("90"));
+}
+
 TEST_F(DecodeProgram, StandardInputIsReadForADash) {
   const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, antennas(4)));
   const Result result = runInShell("--format paths - <" + path);
