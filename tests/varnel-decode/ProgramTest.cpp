@@ -142,6 +142,17 @@ TEST_F(DecodeProgram, JsonIsOneLineWithArraysAndUnknownLeaves) {
   EXPECT_THAT(result.output, HasSubstr(R"json("PDP Context Info":["x",{"A":"(unknown)"}])json"));
 }
 
+TEST_F(DecodeProgram, OfObjectMessagesTheLastOneIsTheDisplay) {
+  const std::string path = write(
+      "capture", pcapHeader() + pcapRecord(afternoon, 0, list("<string>earlier</string>")) +
+                     pcapRecord(afternoon, 0,
+                                list("<dict><key>Cell</key><dict><key>RSSI</key><string>-71</string></dict>"
+                                     "<key>List</key><array><true/><string>A</string></array></dict>")));
+  const Result result = run({"--technology", "ifx-gsm", "--format", "json", path});
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_EQ(result.output, "{\"Cell\":\"-71\",\"List\":[\"A\"]}\n");
+}
+
 TEST_F(DecodeProgram, PropertyListKeepsEveryKindOfValue) {
   const Result result = decode(
       pcapHeader() + pcapRecord(afternoon, 0, pdpContexts("<array><integer>7</integer><true/></array>")) +
