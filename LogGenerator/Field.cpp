@@ -8,24 +8,46 @@ namespace varnel {
 
 namespace {
 
-// A double of any size with 16 decimals and its sign.
-using Digits = std::array<char, 352>;
-
-std::string_view realDigits(Digits& room, const Format& format, double number) {
+char* putReal(char* out, char* end, const Format& format, double number) {
   if (std::isnan(number)) number = std::numeric_limits<double>::quiet_NaN();
-  char* out = room.begin();
   if (format.hasPlus && !std::signbit(number)) *out++ = '+';
-  out = std::to_chars(out, room.end(), number, std::chars_format::fixed, format.precision).ptr;
-  return {room.begin(), static_cast<std::size_t>(out - room.begin())};
+  return std::to_chars(out, end, number, std::chars_format::fixed, format.precision).ptr;
 }
 
-std::string_view integerDigits(Digits& room, const Format& format, std::uint32_t number) {
+char* putInteger(char* out, char* end, const Format& format, std::uint32_t raw) {
+  const std::uint32_t number =
+      raw * static_cast<std::uint32_t>(format.factor) + static_cast<std::uint32_t>(format.summand);
+  if (format.isHexadecimal) return std::to_chars(out, end, number, 16).ptr;
+  if (format.isUnsigned) return std::to_chars(out, end, number).ptr;
   const auto signedNumber = static_cast<std::int32_t>(number);
-  char* out = room.begin();
   if (format.hasPlus && signedNumber >= 0) *out++ = '+';
-  out = format.isHexadecimal ? std::to_chars(out, room.end(), number, 16).ptr
-        : format.isUnsigned  ? std::to_chars(out, room.end(), number).ptr
-                             : std::to_chars(out, room.end(), signedNumber).ptr;
+  return std::to_chars(out, end, signedNumber).ptr;
+}
+
+char* putRaw(char* out, char* end, const Field& field, std::uint32_t raw) {
+  const Format& format = field.format;
+  if (format.kind == Format::Kind::Real) {
+    const double number = field.source.isSigned ? static_cast<std::int32_t>(raw) : static_cast<double>(raw);
+    return putReal(out, end, format, number * format.realFactor + format.realSummand);
+  }
+  return putInteger(out, end, format, raw);
+}
+
+// Pads what stands between the two on its left to the width, as printf does.
+char* pad(char* begin, char* end, const Format& format) {
+  const auto length = static_cast<std::size_t>(end - begin);
+  if (length >= format.width) return end;
+  char* const paddedEnd = begin + format.width;
+  std::fill(begin, std::copy_backward(begin, end, paddedEnd), format.hasLeadingZeros ? '0' : ' ');
+  return paddedEnd;
+}
+
+// The texts around a number, which put(out, end) writes.
+template <std::size_t size, class Put>
+std::string_view numberText(std::array<char, size>& room, const Format& format, Put put) {
+  char* const begin = std::ranges::copy(format.before, room.begin()).out;
+  char* out = pad(begin, put(begin, room.end() - format.after.size()), format);
+  out = std::ranges::copy(format.after, out).out;
   return {room.begin(), static_cast<std::size_t>(out - room.begin())};
 }
 
@@ -46,39 +68,18 @@ std::string_view Formatter::text(const Packet& packet, const Field& field) {
   for (const Choice& choice : format.choices) {
     if (choice.raw == raw) return choice.text;
   }
-  switch (format.kind) {
-    case Format::Kind::Choice:
-      return format.otherwise;
-    case Format::Kind::Real: {
-      const double number = field.source.isSigned ? static_cast<std::int32_t>(raw) : static_cast<double>(raw);
-      return text(format, number * format.realFactor + format.realSummand);
-    }
-    case Format::Kind::Integer:
-      break;
-  }
-  return text(format, static_cast<std::int32_t>(raw));
+  if (format.kind == Format::Kind::Choice) return format.otherwise;
+  return numberText(_room, format, [&](char* out, char* end) { return putRaw(out, end, field, raw); });
 }
 
 std::string_view Formatter::text(const Format& format, double number) {
-  Digits room;
-  return assemble(format, realDigits(room, format, number));
+  return numberText(_room, format, [&](char* out, char* end) { return putReal(out, end, format, number); });
 }
 
 std::string_view Formatter::text(const Format& format, std::int32_t number) {
-  Digits room;
-  const auto factor = static_cast<std::uint32_t>(format.factor);
-  const auto summand = static_cast<std::uint32_t>(format.summand);
-  return assemble(format, integerDigits(room, format, static_cast<std::uint32_t>(number) * factor + summand));
-}
-
-// The number is padded on its left to the width, as printf does.
-std::string_view Formatter::assemble(const Format& format, std::string_view digits) {
-  const std::size_t padding = format.width > digits.size() ? format.width - digits.size() : 0;
-  char* out = std::ranges::copy(format.before, _room.begin()).out;
-  out = std::fill_n(out, padding, format.hasLeadingZeros ? '0' : ' ');
-  out = std::ranges::copy(digits, out).out;
-  out = std::ranges::copy(format.after, out).out;
-  return {_room.begin(), static_cast<std::size_t>(out - _room.begin())};
+  return numberText(_room, format, [&](char* out, char* end) {
+    return putInteger(out, end, format, static_cast<std::uint32_t>(number));
+  });
 }
 
 void setFields(Dictionary& section, const Packet& packet, std::span<const Field> fields) {

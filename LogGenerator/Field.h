@@ -178,8 +178,6 @@ class Formatter {
   std::string_view text(const Format& format, std::int32_t number);
 
  private:
-  std::string_view assemble(const Format& format, std::string_view digits);
-
   // Room for a double of any size with 16 decimals and the texts around it.
   std::array<char, 448> _room;
 };
