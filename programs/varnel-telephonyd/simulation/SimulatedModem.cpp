@@ -1,6 +1,7 @@
 #include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
 
 #include "platform/TelephonyService.h"
+#include "programs/varnel-telephonyd/simulation/CDMAModem.h"
 #include "programs/varnel-telephonyd/simulation/LTEModem.h"
 #include "programs/varnel-telephonyd/simulation/UTRANModem.h"
 
@@ -19,6 +20,7 @@ struct Simulation {
 };
 
 constexpr Simulation simulations[] = {
+    {technology::kalviCDMA, make<simulation::CDMAModem>},
     {technology::kalviLTE, make<simulation::LTEModem>},
     {technology::kalviUTRAN2, make<simulation::UTRANModem>},
 };
