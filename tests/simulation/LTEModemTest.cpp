@@ -38,7 +38,9 @@ std::vector<Message> messagesOf(unsigned code, std::chrono::milliseconds duratio
 }
 
 TEST(SimulatedModems, OnlyWhatIsSimulatedIsMade) {
-  EXPECT_THAT(simulatedTechnologies(), testing::ElementsAre("kalvi-cdma", "kalvi-lte", "kalvi-utran-2"));
+  EXPECT_THAT(simulatedTechnologies(),
+              testing::ElementsAre("ifx-gsm", "kalvi-cdma", "kalvi-lte", "kalvi-utran-2"));
+  EXPECT_EQ(simulatedModem("ifx-gsm", 1)->technology(), "ifx-gsm");
   EXPECT_EQ(simulatedModem("kalvi-cdma", 1)->technology(), "kalvi-cdma");
   EXPECT_EQ(simulatedModem("kalvi-lte", 1)->technology(), "kalvi-lte");
   EXPECT_EQ(simulatedModem("kalvi-utran-2", 1)->technology(), "kalvi-utran-2");

@@ -23,8 +23,10 @@ void ScheduledModem::repeat(Pace pace, std::function<void()> task) {
 void ScheduledModem::send(Bytes packet) {
   if (_random.oneIn(messagesPerPrefix))
     packet.insert(packet.begin(), std::begin(linkPrefix), std::end(linkPrefix));
-  _sent.push_back({_now, std::move(packet)});
+  sendBare(std::move(packet));
 }
+
+void ScheduledModem::sendBare(Bytes message) { _sent.push_back({_now, std::move(message)}); }
 
 void ScheduledModem::runNextTask() {
   Task& task = *std::ranges::min_element(_tasks, {}, &Task::due);

@@ -28,6 +28,8 @@ class ScheduledModem : public SimulatedModem {
   void repeat(Pace pace, std::function<void()> task);
   /// Sends a packet now. As on a real link, some come behind a prefix of two bytes.
   void send(Bytes packet);
+  /// Sends a message that is no packet now, as it is.
+  void sendBare(Bytes message);
   /// The time since the start of the stream.
   std::chrono::milliseconds now() const { return _now; }
 

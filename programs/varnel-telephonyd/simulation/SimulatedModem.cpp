@@ -3,6 +3,7 @@
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/CDMAModem.h"
 #include "programs/varnel-telephonyd/simulation/LTEModem.h"
+#include "programs/varnel-telephonyd/simulation/ObjectStreamModem.h"
 #include "programs/varnel-telephonyd/simulation/UTRANModem.h"
 
 namespace varnel {
@@ -20,6 +21,7 @@ struct Simulation {
 };
 
 constexpr Simulation simulations[] = {
+    {technology::ifxGSM, make<simulation::ObjectStreamModem>},
     {technology::kalviCDMA, make<simulation::CDMAModem>},
     {technology::kalviLTE, make<simulation::LTEModem>},
     {technology::kalviUTRAN2, make<simulation::UTRANModem>},
