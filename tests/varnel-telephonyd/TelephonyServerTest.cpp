@@ -255,45 +255,84 @@ TEST_F(TelephonyServerTest, AViewerThatComesBackStartsAtTheBeginning) {
   EXPECT_EQ(_server.channels(), 1u);
 }
 
+struct SimulatedStream {
+  const char* technology;
+  Bytes start;                 // the viewer's command
+  std::size_t fewestMessages;  // in half a minute
+};
+
+// The packets of CDMA2000 are asked for by their codes alone; an object stream has none to ask for.
+const SimulatedStream simulatedStreams[] = {
+    {"kalvi-lte", startEverything, 30},
+    {"kalvi-cdma",
+     command("<key>SetState</key><string>Streaming</string><key>SetKalviLogCodes</key><array>"
+             "<integer>4234</integer><integer>4483</integer><integer>4498</integer><integer>4790</integer>"
+             "<integer>4508</integer><integer>4509</integer><integer>4734</integer><integer>4943</integer>"
+             "</array>"),
+     200},
+    {"ifx-gsm", startEverything, 30},
+};
+
+class SimulatedStreamTest : public testing::TestWithParam<SimulatedStream> {
+ protected:
+  template <class MakeSource, class MessageSent>
+  std::vector<Bytes> serve(MakeSource makeSource, MessageSent messageSent) {
+    _ports.requests.clear();
+    TelephonyServer server{{.ports = _ports,
+                            .queue = _queue,
+                            .uptime = [this] { return _queue.now(); },
+                            .technology = GetParam().technology,
+                            .makeSource = makeSource,
+                            .messageSent = messageSent}};
+    _ports.deliver(server.createLogChannel("viewer").portName.value(), 0, GetParam().start);
+    _queue.advance(30s);
+    std::vector<Bytes> sent;
+    for (const auto& request : _ports.requests) sent.push_back(request.data);
+    return sent;
+  }
+  static std::unique_ptr<MessageSource> simulation() {
+    return std::make_unique<SimulationSource>(simulatedModem(GetParam().technology, 1));
+  }
+
+  MemoryPorts _ports;
+  FakeQueue _queue;
+};
+
+TEST_P(SimulatedStreamTest, TheViewersCommandStartsAllOfIt) {
+  std::vector<Bytes> expected;
+  const auto modem = simulatedModem(GetParam().technology, 1);
+  for (SimulatedMessage next = modem->next(); next.at <= 30s; next = modem->next())
+    expected.push_back(next.bytes);
+  EXPECT_GT(expected.size(), GetParam().fewestMessages);
+  EXPECT_EQ(serve(simulation, [](ByteView) {}), expected);
+}
+
 // A recording of a simulated modem, replayed, is the same stream.
-TEST(Recording, IsReplayedAsItWasSent) {
+TEST_P(SimulatedStreamTest, ARecordingIsReplayedAsItWasSent) {
   std::string folder = (std::filesystem::temp_directory_path() / "varnel-recording-XXXXXX").string();
   ASSERT_NE(::mkdtemp(folder.data()), nullptr);
   const std::string path = folder + "/walk.pcap";
-  MemoryPorts ports;
-  FakeQueue queue;
-  const auto serve = [&](auto makeSource, auto messageSent) {
-    ports.requests.clear();
-    TelephonyServer server{{.ports = ports,
-                            .queue = queue,
-                            .uptime = [&queue] { return queue.now(); },
-                            .technology = "kalvi-lte",
-                            .makeSource = makeSource,
-                            .messageSent = messageSent}};
-    ports.deliver(server.createLogChannel("viewer").portName.value(), 0, startEverything);
-    queue.advance(30s);
-    std::vector<Bytes> sent;
-    for (const auto& request : ports.requests) sent.push_back(request.data);
-    return sent;
-  };
-
   std::vector<Bytes> sent;
   {
     CaptureWriter writer(path);
-    sent =
-        serve([] { return std::make_unique<SimulationSource>(simulatedModem("kalvi-lte", 1)); },
-              [&](ByteView message) {
-                const auto now_ms = queue.now().count();
-                writer.write({1700000000 + now_ms / 1000, static_cast<std::int32_t>(now_ms % 1000 * 1000000)},
-                             message);
-              });
+    sent = serve(simulation, [&](ByteView message) {
+      const auto now_ms = _queue.now().count();
+      writer.write({1700000000 + now_ms / 1000, static_cast<std::int32_t>(now_ms % 1000 * 1000000)}, message);
+    });
   }
-  EXPECT_GT(sent.size(), 30u);
+  EXPECT_GT(sent.size(), GetParam().fewestMessages);
   EXPECT_EQ(serve([&] { return std::make_unique<ReplaySource>(path, 1, ReplaySource::AtEnd::Stop); },
                   [](ByteView) {}),
             sent);
   std::filesystem::remove_all(folder);
 }
+
+INSTANTIATE_TEST_SUITE_P(Technologies, SimulatedStreamTest, testing::ValuesIn(simulatedStreams),
+                         [](const auto& info) {
+                           std::string name = info.param.technology;
+                           std::erase(name, '-');
+                           return name;
+                         });
 
 }  // namespace
 }  // namespace varnel
