@@ -5,15 +5,15 @@
 namespace varnel::simulation {
 namespace {
 
-Cell cellOf(Access access, std::int64_t power_cdbm = -6'00) {
-  return {.access = access, .code = 4, .identity = 1, .setback_cm = 20'00, .power_cdbm = power_cdbm};
+Cell mast(std::int64_t power_cdbm = -6'00) {
+  return {.access = Access::HRPD, .code = 4, .identity = 1, .setback_cm = 20'00, .power_cdbm = power_cdbm};
 }
 
 // A street so short that everything is received far above the noise.
 Town townOf(std::vector<Cell> cells) { return {50'00, std::move(cells)}; }
 
 TEST(CDMACarrier, AMastThatIsAloneIsNearlyEverything) {
-  const Walk walk(townOf({cellOf(Access::HRPD)}), Random(1));
+  const Walk walk(townOf({mast()}), Random(1));
   const CDMACarrier carrier = receiveCDMACarrier(walk, Access::HRPD);
   ASSERT_EQ(carrier.pilots.size(), 1u);
   // Of 65536 parts, 20 of 21.
@@ -23,14 +23,14 @@ TEST(CDMACarrier, AMastThatIsAloneIsNearlyEverything) {
 }
 
 TEST(CDMACarrier, ThePilotOf1xIsAFifthOfThePower) {
-  const Walk walk(townOf({cellOf(Access::CDMA1xRTT)}), Random(1));
+  const Walk walk(townOf({mast()}), Random(1));
   const CDMACarrier carrier = receiveCDMACarrier(walk, Access::CDMA1xRTT);
   EXPECT_NEAR(static_cast<double>(carrier.pilots[0].strength), 12483, 10);
 }
 
 TEST(CDMACarrier, MastsDisturbOneAnother) {
   // Ten times as strong as the other.
-  const Walk walk(townOf({cellOf(Access::HRPD, -16'00), cellOf(Access::HRPD)}), Random(1));
+  const Walk walk(townOf({mast(-16'00), mast()}), Random(1));
   const CDMACarrier carrier = receiveCDMACarrier(walk, Access::HRPD);
   ASSERT_EQ(carrier.pilots.size(), 2u);
   // 20 and 2 of 23 parts.
@@ -40,15 +40,20 @@ TEST(CDMACarrier, MastsDisturbOneAnother) {
 }
 
 TEST(CDMACarrier, NoiseDrownsWhatIsFarAway) {
-  const Walk walk(townOf({cellOf(Access::HRPD, -100'00)}), Random(1));
+  const Walk walk(townOf({mast(-100'00)}), Random(1));
   const CDMACarrier carrier = receiveCDMACarrier(walk, Access::HRPD);
   EXPECT_LT(carrier.pilots[0].strength, 10);
   EXPECT_NEAR(static_cast<double>(carrier.level_cdbm), -106'00, 2);
 }
 
-TEST(CDMACarrier, OtherTechnologiesAreOnOtherChannels) {
-  const Walk walk(townOf({cellOf(Access::HRPD), cellOf(Access::CDMA1xRTT)}), Random(1));
-  EXPECT_EQ(receiveCDMACarrier(walk, Access::HRPD).pilots.size(), 1u);
+TEST(CDMACarrier, BothTechnologiesAreReceivedFromTheSameMasts) {
+  const Walk walk(townOf({mast(-16'00), mast()}), Random(1));
+  const CDMACarrier voice = receiveCDMACarrier(walk, Access::CDMA1xRTT),
+                    data = receiveCDMACarrier(walk, Access::HRPD);
+  EXPECT_EQ(voice.level_cdbm, data.level_cdbm);
+  ASSERT_EQ(voice.pilots.size(), 2u);
+  EXPECT_EQ(voice.pilots[0].cell, data.pilots[0].cell);
+  EXPECT_EQ(voice.pilots[1].cell, data.pilots[1].cell);
 }
 
 TEST(CDMACarrier, StrengthsHaveDecibels) {

@@ -86,7 +86,7 @@ TEST(CDMAModem, TheMessagesAreTheSameOnEveryMachine) {
   const Message first = messagesOf(0x119C, 1s).at(0);
   EXPECT_EQ(first.packet, (Bytes{0x01, 0x3C, 0x00, 0x9C, 0x11, 0x14, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00,
                                  0x01, 0x04, 0x00, 0x00, 0x01, 0x00, 0x08, 0x00, 0x0B, 0x00, 0x00, 0x00, 0x02,
-                                 0x00, 0x10, 0x00, 0x00, 0x00, 0x1B, 0x01, 0x1B, 0x01, 0xEB, 0xE9, 0xEF, 0xFF,
+                                 0x00, 0x10, 0x00, 0x00, 0x00, 0x1B, 0x01, 0x1B, 0x01, 0xF2, 0xF0, 0xD8, 0xFF,
                                  0x00, 0x00, 0x03, 0x00, 0x0C, 0x00, 0x00, 0x02, 0x04, 0x05, 0x00, 0x02, 0xD8,
                                  0x00, 0x04, 0x00, 0x08, 0x00, 0x00, 0x00, 0x00, 0x00}));
 }
@@ -291,6 +291,20 @@ TEST(CDMAModem, DataStatusesAreBelievable) {
   EXPECT_GE(addresses.size(), 3u);
   EXPECT_EQ(colors.size(), 3u);
   EXPECT_EQ(channels.size(), 2u);
+}
+
+TEST(CDMAModem, BothHalvesHearTheSameMasts) {
+  int voice_dbm = 0;
+  unsigned reference = noPilot;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0x119C) {
+      const VoiceStatus status(message);
+      voice_dbm = i8(message, status.subpackets.at(2) + 10) * 334 / 1000 - 63;
+      reference = status.strengths_db.empty() || status.state == sleeping ? noPilot : status.reference;
+    }
+    if (message.code() != 0x1183 || message.u16(18) == noPilot || reference == noPilot) continue;
+    EXPECT_NEAR(i8(message, 15), voice_dbm, 10);
+  }
 }
 
 // The linear strengths of the pilots of 0x12B6, by their offsets.

@@ -38,10 +38,11 @@ constexpr int packetZones = 250;
 CDMA1xPhone::CDMA1xPhone(const Walk& walk, Random random)
     : _walk(walk),
       _random(random),
-      _selection(walk, access),
+      _selection(walk, cdmaMasts),
       _connection(_random.fork()),
       _activeSet(thresholds),
-      _channel(_selection.servingCell().channel) {}
+      _commonChannel(walk.cells(access).front().cell->channel),
+      _channel(_commonChannel) {}
 
 CDMA1xPhone::Changes CDMA1xPhone::step(std::chrono::milliseconds now) {
   Changes changes{.cell = _selection.update()};
@@ -53,9 +54,8 @@ CDMA1xPhone::Changes CDMA1xPhone::step(std::chrono::milliseconds now) {
 
 // Calls are spread over the carriers.
 void CDMA1xPhone::chooseChannel() {
-  const int channel = _selection.servingCell().channel;
   const bool isMoved = _connection.state() == State::Traffic && _random.oneIn(2);
-  _channel = isMoved ? nextCarrierBelow(channel) : channel;
+  _channel = isMoved ? nextCarrierBelow(_commonChannel) : _commonChannel;
 }
 
 void CDMA1xPhone::updateActiveSet() {

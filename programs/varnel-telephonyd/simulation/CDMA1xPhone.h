@@ -35,6 +35,7 @@ class CDMA1xPhone {
   CellSelection _selection;
   CDMA1xConnection _connection;
   PilotSet _activeSet;
+  const int _commonChannel;  // where all phones idle
   int _channel;
 };
 

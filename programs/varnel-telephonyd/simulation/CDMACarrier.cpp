@@ -23,7 +23,7 @@ std::int64_t CDMACarrier::strength(const Cell& cell) const {
 
 CDMACarrier receiveCDMACarrier(const Walk& walk, Access access) {
   const std::int64_t pilotPart = access == Access::CDMA1xRTT ? pilotPartOf1x : 1;
-  const auto cells = walk.cells(access);
+  const auto cells = walk.cells(cdmaMasts);
   std::int64_t total_aw = power_aw(noise_cdbm) + power_aw(cells.front().level_cdbm) / imperfection;
   for (const ReceivedCell& received : cells) total_aw += power_aw(received.level_cdbm);
   CDMACarrier carrier{{}, level_cdbm(total_aw)};

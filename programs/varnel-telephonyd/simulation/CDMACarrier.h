@@ -23,7 +23,12 @@ struct CDMACarrier {
   std::int64_t strength(const Cell& cell) const;
 };
 
-/// Of one of the two CDMA technologies: 1x sends its pilot beside the traffic, HRPD for itself.
+/// The two CDMA technologies share masts and band, so both are received alike: what the walk says of this one
+/// goes for the other.
+inline constexpr Access cdmaMasts = Access::HRPD;
+
+/// Of one of the two: 1x sends its pilot beside the traffic, HRPD for itself. The cells are those of
+/// `cdmaMasts`.
 CDMACarrier receiveCDMACarrier(const Walk& walk, Access access);
 
 /// The power that a phone sends with on its own judgement, at a level that it receives.

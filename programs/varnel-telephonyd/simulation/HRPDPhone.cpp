@@ -36,7 +36,7 @@ std::int64_t carrierToInterference(std::int64_t strength) {
 HRPDPhone::HRPDPhone(const Walk& walk, Random random)
     : _walk(walk),
       _random(random),
-      _selection(walk, access),
+      _selection(walk, cdmaMasts),
       _connection(_random.fork()),
       _activeSet(thresholds),
       _channel(_selection.servingCell().channel) {}
