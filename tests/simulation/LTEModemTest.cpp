@@ -20,7 +20,6 @@ using testing::AllOf;
 using testing::AnyOf;
 using testing::Contains;
 using testing::Ge;
-using testing::Gt;
 using testing::Le;
 using testing::MatchesRegex;
 using testing::UnorderedElementsAre;
@@ -37,70 +36,11 @@ std::vector<Message> messagesOf(unsigned code, std::chrono::milliseconds duratio
   return all;
 }
 
-TEST(SimulatedModems, OnlyWhatIsSimulatedIsMade) {
-  EXPECT_THAT(simulatedTechnologies(),
-              testing::ElementsAre("ifx-gsm", "kalvi-cdma", "kalvi-lte", "kalvi-utran-2"));
-  EXPECT_EQ(simulatedModem("ifx-gsm", 1)->technology(), "ifx-gsm");
-  EXPECT_EQ(simulatedModem("kalvi-cdma", 1)->technology(), "kalvi-cdma");
-  EXPECT_EQ(simulatedModem("kalvi-lte", 1)->technology(), "kalvi-lte");
-  EXPECT_EQ(simulatedModem("kalvi-utran-2", 1)->technology(), "kalvi-utran-2");
-  EXPECT_EQ(simulatedModem("kalvi-5g", 1), nullptr);
-}
-
-TEST(LTEModem, TheSameSeedGivesTheSameMessages) {
-  const auto one = simulatedModem("kalvi-lte", 42), other = simulatedModem("kalvi-lte", 42);
-  for (int i = 0; i < 2000; ++i) {
-    const SimulatedMessage first = one->next(), second = other->next();
-    ASSERT_EQ(first.at, second.at) << i;
-    ASSERT_EQ(first.bytes, second.bytes) << i;
-  }
-}
-
-TEST(LTEModem, AnotherSeedGivesOtherMessages) {
-  const auto one = messagesOf(0xB0C2, 1s, 1), other = messagesOf(0xB0C2, 1s, 2);
-  EXPECT_NE(one.at(0).u32(22), other.at(0).u32(22));
-}
-
 TEST(LTEModem, TheMessagesAreTheSameOnEveryMachine) {
   const Message first = messagesOf(0xB0C2, 1s, 1).at(0);
   EXPECT_EQ(first.packet, (Bytes{0x01, 0x25, 0x00, 0xC2, 0xB0, 0x14, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00,
                                  0x03, 0x6C, 0x01, 0x0C, 0x94, 0x0C, 0x94, 0x64, 0x64, 0x0C, 0x5C, 0x1F, 0x00,
                                  0x2D, 0x32, 0x26, 0x00, 0x00, 0x00, 0x01, 0x00, 0x02, 0x01, 0x00, 0x00}));
-}
-
-TEST(LTEModem, TimeNeverGoesBack) {
-  const auto all = messages(3, 10min);
-  EXPECT_TRUE(std::ranges::is_sorted(all, {}, &Message::at));
-}
-
-TEST(LTEModem, AFewMessagesASecond) {
-  const auto count = messages(4, 5min).size();
-  EXPECT_THAT(count, AllOf(Ge(300u), Le(1500u)));
-}
-
-TEST(LTEModem, EveryKindOfMessageComesWithinAMinute) {
-  for (const std::uint64_t seed : {1, 2, 3, 4, 5, 6, 7, 8}) {
-    std::set<unsigned> codes;
-    for (const Message& message : messages(seed, 1min)) codes.insert(message.code());
-    EXPECT_THAT(codes, UnorderedElementsAre(0xB0C1u, 0xB0C2u, 0xB179u, 0xB17Fu, 0xB180u, 0xB186u, 0xFF0000u,
-                                            0xFF0001u, 0xFF0002u))
-        << seed;
-  }
-}
-
-TEST(LTEModem, SomeMessagesHaveThePrefixAndMostHaveNone) {
-  const auto all = messages(6, 5min);
-  const auto count = std::ranges::count(all, true, &Message::hasPrefix);
-  EXPECT_THAT(count, AllOf(Gt(0), Le(std::ssize(all) / 4)));
-}
-
-TEST(LTEModem, HeadersSayTypeLengthAndTime) {
-  for (const Message& message : messages(7, 1min)) {
-    EXPECT_EQ(message.u8(0), message.u16(3) >= 0xB000 ? 1u : 0xFFu);
-    EXPECT_EQ(message.u16(1), message.packet.size() - 1);
-    EXPECT_EQ(message.u32(5), message.at.count());
-    EXPECT_EQ(message.u32(9), 0u);
-  }
 }
 
 struct Carrier {

@@ -1,10 +1,9 @@
 #include "programs/varnel-telephonyd/simulation/CellMonitor.h"
 
-#include <algorithm>
-
 #include "platform/Dictionary.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/LTEMeasurement.h"
+#include "programs/varnel-telephonyd/simulation/UMTSCarrier.h"
 
 namespace varnel::simulation {
 
@@ -35,8 +34,8 @@ class RecordList {
 
   void addServing(const Cell& cell) {
     Dictionary& record = add(cell, cellMonitor::serving);
-    set(record, cellMonitor::mcc, testNetworkMCC);
-    set(record, cellMonitor::mnc, testNetworkMNC);
+    set(record, cellMonitor::mcc, cell.network.countryCode);
+    set(record, cellMonitor::mnc, cell.network.networkCode);
     set(record, areaKey(cell), cell.area);
     set(record, cellMonitor::cellIdentity, cell.identity);
     addRadio(record, cell);
@@ -74,13 +73,14 @@ class RecordList {
     switch (cell.access) {
       case Access::GSM:
         set(record, cellMonitor::arfcn, cell.channel);
-        set(record, cellMonitor::rssi, level_dbm);
+        // The server tells the levels of GSM in steps of 2 dB.
+        set(record, cellMonitor::rssi, level_dbm / 2);
         break;
       case Access::UMTS:
         set(record, cellMonitor::uarfcn, cell.channel);
         set(record, cellMonitor::scramblingCode, cell.code);
         set(record, cellMonitor::rscp, level_dbm);
-        set(record, cellMonitor::ecN0, ecN0_db(cell));
+        set(record, cellMonitor::ecN0, umtsEcN0_cdb(_walk, cell) / 100);
         break;
       case Access::LTE:
         set(record, cellMonitor::uarfcn, cell.channel);
@@ -96,13 +96,6 @@ class RecordList {
       case Access::HRPD:
         break;
     }
-  }
-
-  // All cells share one carrier: beside the strongest one, a weak cell drowns.
-  std::int64_t ecN0_db(const Cell& cell) const {
-    constexpr std::int64_t best_db = -4, worst_db = -24;
-    const std::int64_t behind_cdb = _walk.cells(cell.access).front().level_cdbm - _walk.level_cdbm(cell);
-    return std::max(best_db - behind_cdb / 100, worst_db);
   }
 
   const Walk& _walk;

@@ -24,4 +24,10 @@ bool CellSelection::update() {
   return true;
 }
 
+void CellSelection::changeAccess(Access access) {
+  _access = access;
+  _serving = _walk.cells(access).front().cell;
+  _candidate = nullptr;
+}
+
 }  // namespace varnel::simulation

@@ -13,11 +13,14 @@ class CellSelection {
   /// Looks at the levels, once a step of the walk; true when another cell serves from now on.
   bool update();
 
+  /// Goes over to the strongest cell of a technology.
+  void changeAccess(Access access);
+
   const Cell& servingCell() const { return *_serving; }
 
  private:
   const Walk& _walk;
-  const Access _access;
+  Access _access;
   const Cell* _serving;
   const Cell* _candidate = nullptr;
   int _stepsAhead = 0;  // for how long the candidate has been stronger

@@ -117,9 +117,9 @@ void LTEModem::sendServingCell() {
            .u32(22, cell.identity)
            .u16(26, cell.area)
            .u32(28, cell.band)
-           .u16(32, testNetworkMCC)
-           .u8(34, testNetworkMNCDigits)
-           .u16(35, testNetworkMNC)
+           .u16(32, homeNetwork.countryCode)
+           .u8(34, homeNetwork.networkCodeDigits)
+           .u16(35, homeNetwork.networkCode)
            .u8(37, 0)  // access is not barred
            .finish());
 }

@@ -26,9 +26,11 @@ std::string cardNumber(Random& random) {
   return digits + checkDigit(digits);
 }
 
-std::string locationText(const char* identityName, std::uint32_t identity, const char* areaName, int area) {
-  char text[80];
-  std::snprintf(text, sizeof text, "%s 0x%08X, %s 001-01-%04X, updated", identityName, identity, areaName,
+std::string locationText(const char* identityName, std::uint32_t identity, const char* areaName,
+                         const Network& network, int area) {
+  char text[100];
+  std::snprintf(text, sizeof text, "%s 0x%08X, %s %03d-%0*d-%04X, updated", identityName, identity, areaName,
+                network.countryCode, network.networkCodeDigits, network.networkCode,
                 static_cast<unsigned>(area));
   return text;
 }
@@ -43,14 +45,15 @@ std::string accessClassText(const std::string& cardNumber) {
 
 }  // namespace
 
-SimCard::SimCard(Random random, int area) : _random(random), _number(cardNumber(_random)) {
+SimCard::SimCard(Random random, const Cell& cell) : _random(random), _number(cardNumber(_random)) {
   // Numbers of this range are for fiction.
   _subscriberNumber = "+1212555" + std::to_string(_random.between(1000100, 1000199)).substr(3);
-  registerIn(area);
+  registerIn(cell);
 }
 
-void SimCard::registerIn(int area) {
-  _area = area;
+void SimCard::registerIn(const Cell& cell) {
+  _area = cell.area;
+  _network = cell.network;
   _temporaryIdentity = static_cast<std::uint32_t>(_random.between(0x10000000, 0x3FFFFFFF));
   _packetTemporaryIdentity = static_cast<std::uint32_t>(_random.between(0xC0000000, 0xFFFFFFFE));
 }
@@ -62,8 +65,8 @@ Value SimCard::files() const {
   texts.set("kSimFile_MSISDN", _subscriberNumber);
   texts.set("kSimFile_MBDN", "+12125550100");
   texts.set("kSimFile_HPPLMN", "5 (30 minutes)");
-  texts.set("kSimFile_LOCI", locationText("TMSI", _temporaryIdentity, "LAI", _area));
-  texts.set("kSimFile_PSLOCI", locationText("P-TMSI", _packetTemporaryIdentity, "RAI", _area));
+  texts.set("kSimFile_LOCI", locationText("TMSI", _temporaryIdentity, "LAI", _network, _area));
+  texts.set("kSimFile_PSLOCI", locationText("P-TMSI", _packetTemporaryIdentity, "RAI", _network, _area));
   texts.set("kSimFile_ACC", accessClassText(_number));
   texts.set("kSimFile_AD", "Normal operation, MNC of 2 digits");
   texts.set("kSimFile_FPLMN", "001-02, 001-03");

@@ -4,6 +4,7 @@
 #include <string>
 
 #include "platform/Value.h"
+#include "programs/varnel-telephonyd/simulation/Cell.h"
 #include "programs/varnel-telephonyd/simulation/Random.h"
 
 namespace varnel::simulation {
@@ -11,10 +12,10 @@ namespace varnel::simulation {
 /// The SIM card in the phone. Its number tells it from the cards of other seeds.
 class SimCard {
  public:
-  SimCard(Random random, int area);
+  SimCard(Random random, const Cell& cell);
 
-  /// The phone has registered in another area and got other temporary identities.
-  void registerIn(int area);
+  /// The phone has registered in the area of that cell and got other temporary identities.
+  void registerIn(const Cell& cell);
 
   /// The elementary files as the telephony server tells them: a dictionary of texts.
   Value files() const;
@@ -24,6 +25,7 @@ class SimCard {
   std::string _number;  // of the card, with its check digit
   std::string _subscriberNumber;
   int _area;
+  Network _network;
   std::uint32_t _temporaryIdentity;
   std::uint32_t _packetTemporaryIdentity;
 };

@@ -2,6 +2,7 @@
 
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/CDMAModem.h"
+#include "programs/varnel-telephonyd/simulation/GSMUMTSModem.h"
 #include "programs/varnel-telephonyd/simulation/LTEModem.h"
 #include "programs/varnel-telephonyd/simulation/ObjectStreamModem.h"
 #include "programs/varnel-telephonyd/simulation/UTRANModem.h"
@@ -22,6 +23,7 @@ struct Simulation {
 
 constexpr Simulation simulations[] = {
     {technology::ifxGSM, make<simulation::ObjectStreamModem>},
+    {technology::kalviGSMUMTS, make<simulation::GSMUMTSModem>},
     {technology::kalviCDMA, make<simulation::CDMAModem>},
     {technology::kalviLTE, make<simulation::LTEModem>},
     {technology::kalviUTRAN2, make<simulation::UTRANModem>},

@@ -102,6 +102,7 @@ class Builder {
                .band = gsmBand,
                .channel = static_cast<int>(_random.between(firstGSMChannel, lastGSMChannel)),
                .code = static_cast<int>(_random.between(0, 63)),
+               .network = partnerNetwork,
                .identity = 12000u + static_cast<std::uint32_t>(site.number),
                .power_cdbm = power(-4'00)});
   }

@@ -23,6 +23,11 @@ UTRANConnection::UTRANConnection(Random random) : _random(random) {
   enter(State::Disconnected, std::chrono::milliseconds(0));
 }
 
+void UTRANConnection::end(std::chrono::milliseconds now) {
+  _rest = State::CellPCH;
+  enter(State::Disconnected, now);
+}
+
 bool UTRANConnection::update(std::chrono::milliseconds now) {
   if (now < _end) return false;
   enter(nextState(), now);

@@ -6,8 +6,8 @@
 
 namespace varnel::simulation {
 
-/// How a UTRAN phone is connected with the network. Data flows on a dedicated channel; as it becomes silent
-/// the phone goes by way of the common channels into deeper and deeper rest.
+/// How a phone is connected with a network of UMTS, of either mode. Data flows on a dedicated channel; as it
+/// becomes silent the phone goes by way of the common channels into deeper and deeper rest.
 class UTRANConnection {
  public:
   /// Numbered as in the modem's packets.
@@ -18,6 +18,9 @@ class UTRANConnection {
   State state() const { return _state; }
   /// Whether transport channels are set up.
   bool hasChannels() const { return _state == State::CellDCH || _state == State::CellFach; }
+
+  /// The phone is disconnected from now on.
+  void end(std::chrono::milliseconds now);
 
   /// Time passes; true when the state is another one from now on.
   bool update(std::chrono::milliseconds now);

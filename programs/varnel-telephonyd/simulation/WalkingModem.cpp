@@ -15,7 +15,7 @@ WalkingModem::WalkingModem(Random& random, Access access)
     : ScheduledModem(random.fork()),
       _walk{Town::build(random.fork()), random.fork()},
       _selection(_walk, access),
-      _card(random.fork(), servingCell().area),
+      _card(random.fork(), servingCell()),
       _packetData(random.fork()) {
   using namespace std::chrono_literals;
   repeat({.first = 0ms, .interval = Walk::stepTime}, [this] { step(); });
@@ -28,14 +28,21 @@ WalkingModem::WalkingModem(Random& random, Access access)
 void WalkingModem::step() {
   const Cell& previous = servingCell();
   _walk.step();
-  if (_selection.update()) {
-    servingCellChanged(previous);
-    if (servingCell().area != previous.area) {
-      _card.registerIn(servingCell().area);
-      sendSimFiles();
-    }
-  }
+  if (_selection.update()) cellChanged(previous);
   stepWalked();
+}
+
+void WalkingModem::changeAccess(Access access) {
+  const Cell& previous = servingCell();
+  _selection.changeAccess(access);
+  cellChanged(previous);
+}
+
+void WalkingModem::cellChanged(const Cell& previous) {
+  servingCellChanged(previous);
+  if (servingCell().area == previous.area && servingCell().network == previous.network) return;
+  _card.registerIn(servingCell());
+  sendSimFiles();
 }
 
 void WalkingModem::sendSimFiles() {

@@ -8,15 +8,18 @@
 
 namespace varnel::simulation {
 
-/// A modem that is carried through the town and stays with one technology. It sends what the telephony server
+/// A modem that is carried through the town. It sends what the telephony server
 /// adds to every modem's packets: the SIM card, the cells around and the packet-data contexts.
 class WalkingModem : public ScheduledModem {
  protected:
-  /// Draws from the source what the world needs.
+  /// Draws from the source what the world needs. The modem begins with that technology.
   WalkingModem(Random& random, Access access);
 
   const Walk& walk() const { return _walk; }
   const Cell& servingCell() const { return _selection.servingCell(); }
+
+  /// The strongest cell of that technology serves from now on.
+  void changeAccess(Access access);
 
   /// A step has been walked; the serving cell may have changed.
   virtual void stepWalked() = 0;
@@ -25,6 +28,7 @@ class WalkingModem : public ScheduledModem {
 
  private:
   void step();
+  void cellChanged(const Cell& previous);
   void sendSimFiles();
   void sendCellMonitor();
   void sendPacketDataContexts();

@@ -1,0 +1,45 @@
+#pragma once
+
+#include <vector>
+
+#include "programs/varnel-telephonyd/simulation/Random.h"
+#include "programs/varnel-telephonyd/simulation/Situation.h"
+#include "programs/varnel-telephonyd/simulation/UTRANConnection.h"
+
+namespace varnel::simulation {
+
+/// The channels of a UMTS connection: how strongly the phone sends and how well it receives.
+class UMTSChannels {
+ public:
+  explicit UMTSChannels(Random random) : _random(random) {}
+
+  /// The connection has entered that state. Its transport channels begin to count anew.
+  void configure(UTRANConnection::State state, std::chrono::milliseconds now);
+
+  /// Samples of the transmit power, which follows the path loss. Where the phone sends in bursts only, the
+  /// samples between them are 0.
+  Bytes transmitPower(const Situation& situation);
+  /// The blocks of each transport channel since it was set up, and how many of them were wrong.
+  Bytes blockErrors(const Situation& situation);
+  /// What the high-speed channels, of one carrier or of two, brought since the last report.
+  Bytes highSpeed(const Situation& situation);
+
+ private:
+  struct TransportChannel {
+    int identity;
+    int blocks;  // a second
+    std::int64_t received = 0, wrong = 0;
+  };
+
+  std::int64_t power_cdbm(const Situation& situation);
+  void receive(TransportChannel& channel, std::int64_t elapsed_ms, std::int64_t wrong_permille);
+  void putProcesses(PacketWriter& packet, std::size_t record, std::int64_t subframes);
+
+  Random _random;
+  bool _sendsInBursts = false;
+  int _carriers = 1;
+  std::vector<TransportChannel> _channels;
+  std::chrono::milliseconds _counted{0}, _highSpeedTold{0};
+};
+
+}  // namespace varnel::simulation
