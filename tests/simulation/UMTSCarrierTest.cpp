@@ -35,13 +35,13 @@ TEST(UMTSCarrier, TwoCellsAlikeHaveTheSamePart) {
   EXPECT_EQ(umtsEcN0_cdb(walk, *walk.cells(Access::UMTS).at(1).cell), -4'00);
 }
 
-// 524,288 times 10 to the power of -0.05, -0.45, -1.05 and -2.35.
-TEST(UMTSCarrier, EnergiesAreInTheMiddleOfTheirDecibel) {
-  EXPECT_EQ(umtsEnergy(0), 467'272);
-  EXPECT_EQ(umtsEnergy(-4'00), 186'024);
-  EXPECT_EQ(umtsEnergy(-4'99), 186'024);
-  EXPECT_EQ(umtsEnergy(-10'50), 46'727);
-  EXPECT_EQ(umtsEnergy(-23'00), 2'342);
+// 524,288 times 10 to the power of -0.05, -0.35, -0.95, -2.25 and -2.35.
+TEST(UMTSCarrier, EnergiesAreHalfADecibelAboveTheWholeOne) {
+  EXPECT_EQ(umtsEnergy(-1'00), 467'272);
+  EXPECT_EQ(umtsEnergy(-4'00), 234'191);
+  EXPECT_EQ(umtsEnergy(-4'99), 234'191);
+  EXPECT_EQ(umtsEnergy(-10'50), 58'826);
+  EXPECT_EQ(umtsEnergy(-23'00), 2'948);
   EXPECT_EQ(umtsEnergy(-24'00), 2'342);
 }
 

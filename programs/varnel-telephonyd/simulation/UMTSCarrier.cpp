@@ -9,7 +9,8 @@ namespace {
 // What the strongest cell has of the power, and the least that is told.
 constexpr std::int64_t bestEcN0_cdb = -4'00, worstEcN0_cdb = -24'00;
 
-// For 0.5 dB less than the carrier, 1.5 dB less and so on.
+// Of parts of -1 dB, -2 dB and so on, whole decibels as they are told: each half a decibel above, so that it
+// is surely told as that.
 constexpr std::int64_t energies[] = {467'272, 371'167, 294'829, 234'191, 186'024, 147'764, 117'373, 93'233,
                                      74'058,  58'826,  46'727,  37'117,  29'483,  23'419,  18'602,  14'776,
                                      11'737,  9'323,   7'406,   5'883,   4'673,   3'712,   2'948,   2'342};
@@ -25,7 +26,8 @@ std::int64_t umtsEcN0_cdb(const Walk& walk, const Cell& cell) {
 }
 
 std::int64_t umtsEnergy(std::int64_t ecN0_cdb) {
-  return energies[std::clamp<std::int64_t>(-ecN0_cdb / 100, 0, std::ssize(energies) - 1)];
+  const std::int64_t whole_db = -ecN0_cdb / 100;
+  return energies[std::clamp<std::int64_t>(whole_db - 1, 0, std::ssize(energies) - 1)];
 }
 
 }  // namespace varnel::simulation
