@@ -29,6 +29,17 @@ struct BitTexts {
   std::vector<std::string_view> ofBits;
 };
 
+/// `BitTexts::ofBits` of plain decimal numbers.
+inline const std::vector<std::string_view> unsignedByteBits = {"1", "2", "4", "8", "16", "32", "64", "128"};
+inline const std::vector<std::string_view> unsignedWordBits = {
+    "1",   "2",   "4",    "8",    "16",   "32",   "64",    "128",
+    "256", "512", "1024", "2048", "4096", "8192", "16384", "32768"};
+inline const std::vector<std::string_view> signedLongBits = {
+    "1",        "2",        "4",        "8",         "16",        "32",        "64",         "128",
+    "256",      "512",      "1024",     "2048",      "4096",      "8192",      "16384",      "32768",
+    "65536",    "131072",   "262144",   "524288",    "1048576",   "2097152",   "4194304",    "8388608",
+    "16777216", "33554432", "67108864", "134217728", "268435456", "536870912", "1073741824", "-2147483648"};
+
 /// What `described` makes of an array of such elements.
 inline std::string listOf(std::initializer_list<const char*> rows) {
   std::string text;
@@ -99,15 +110,24 @@ class DecoderHarness : public testing::Test {
     EXPECT_EQ(log.takeTexts(), lines) << packet.size() << " bytes, log code " << logCode;
   }
 
+  /// Expects what is left of the packet at every length below the minimum to change nothing in a filled
+  /// section and to log these lines only.
+  void expectIgnoredBelow(std::size_t minimum, const Bytes& packet, std::uint32_t logCode,
+                          const std::vector<std::string>& lines) {
+    for (std::size_t size = 0; size < minimum; ++size) {
+      expectIgnored(Bytes(packet.data(), packet.data() + size), logCode, lines);
+    }
+  }
+
   /// Decodes what is left of the packet at every shorter length, each time into a section of old content.
   /// The check gets the length and the lines that were logged.
   template <class Check>
-  void forEachTruncation(const Bytes& packet, Check check) {
+  void forEachTruncation(const Bytes& packet, Check check, std::uint32_t logCode = itsLogCode) {
     for (std::size_t size = packet.size(); size-- > 0;) {
       SCOPED_TRACE(std::to_string(size) + " bytes");
       putOldContent();
       log.take();
-      decode(Bytes(packet.data(), packet.data() + size));
+      decode(Bytes(packet.data(), packet.data() + size), logCode);
       check(size, log.takeTexts());
     }
   }
@@ -115,11 +135,11 @@ class DecoderHarness : public testing::Test {
   /// Sets each bit of the packet's bytes from the first up to, but not with, the end, one at a time. Each row
   /// must show the text of the bit if that is its own, else the text of 0.
   void expectTextsOfSingleBits(const Bytes& packet, std::size_t first, std::size_t end,
-                               const std::vector<BitTexts>& rows) {
+                               const std::vector<BitTexts>& rows, std::uint32_t logCode = itsLogCode) {
     for (std::size_t bit = 8 * first; bit < 8 * end; ++bit) {
       Bytes changed = packet;
       changed[bit / 8] = static_cast<std::uint8_t>(changed[bit / 8] ^ 1u << bit % 8);
-      decode(changed);
+      decode(changed, logCode);
       for (const BitTexts& row : rows) {
         const std::size_t runStart = 8 * row.byte + row.firstBit;
         const bool isItsOwn = bit >= runStart && bit - runStart < row.ofBits.size();
@@ -127,6 +147,24 @@ class DecoderHarness : public testing::Test {
             << row.label << " when bit " << bit % 8 << " of byte " << bit / 8 << " is set";
       }
     }
+  }
+
+  /// Puts each value into a byte of the packet. The row must show the text that `textOf` gives for it.
+  template <class TextOf>
+  void expectTextOfEachByte(Bytes packet, std::size_t byte, std::string_view label, TextOf textOf,
+                            std::uint32_t logCode = itsLogCode) {
+    for (unsigned value = 0; value < 256; ++value) {
+      packet.at(byte) = static_cast<std::uint8_t>(value);
+      decode(packet, logCode);
+      EXPECT_EQ(shown(label), quoted(textOf(value))) << label << " of " << value;
+    }
+  }
+  /// The texts of the values from 0 on; all greater values show `beyond`.
+  void expectTableOfByte(const Bytes& packet, std::size_t byte, std::string_view label,
+                         const std::vector<std::string_view>& texts, std::string_view beyond,
+                         std::uint32_t logCode = itsLogCode) {
+    const auto textOf = [&](unsigned value) { return value < texts.size() ? texts[value] : beyond; };
+    expectTextOfEachByte(packet, byte, label, textOf, logCode);
   }
 
   RecordingLog log;
