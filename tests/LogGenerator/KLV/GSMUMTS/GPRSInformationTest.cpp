@@ -121,7 +121,7 @@ TEST_F(GPRSInformationTest, EachBitOfAnAccessPacketCountsInItsOwnRowAlone) {
 TEST_F(GPRSInformationTest, AnAccessPacketNeeds18Bytes) {
   expectMinimumLength(18, accessCode,
                       R"({Network Control Order: "NC0", PFC Supported: "Not Supported", )"
-                      R"(Priority Access Threshold: "Barred (PKT access not allowed in the Cell)"})");
+                      R"rows(Priority Access Threshold: "Barred (PKT access not allowed in the Cell)"})rows");
 }
 
 TEST_F(GPRSInformationTest, ATimersPacketShowsThreeRowsInThisOrder) {
