@@ -142,7 +142,7 @@ TEST(ObjectStreamModem, ServingCellsAreBelievableAndChange) {
       path.insert(path.begin(), "Serving Cell");
       return textAt(picture, path);
     };
-    EXPECT_EQ(row({"PLMN", "Network"}), "001-01");
+    EXPECT_EQ(row({"PLMN", "Network"}), "001-100");
     EXPECT_THAT(row({"LAC", "Area"}), MatchesRegex("0x[0-9A-F]{4}"));
     EXPECT_THAT(row({"Cell ID"}), MatchesRegex("120(00|02|04|06|08|10)"));
     EXPECT_EQ(row({"Band"}), "GSM 900");

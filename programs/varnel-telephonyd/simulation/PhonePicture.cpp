@@ -87,7 +87,8 @@ class Picture {
     const Cell& cell = _view.serving;
     Value section = Value::ofDictionary();
     Dictionary& rows = *section.dictionary();
-    rows.set("PLMN", typed("Network", text("%03d-%02d", testNetworkMCC, testNetworkMNC)));
+    rows.set("PLMN", typed("Network", text("%03d-%0*d", cell.network.countryCode,
+                                           cell.network.networkCodeDigits, cell.network.networkCode)));
     rows.set("LAC", typed("Area", text("0x%04X", static_cast<unsigned>(cell.area))));
     rows.set("Cell ID", number(cell.identity));
     rows.set("Band", text("GSM %d", cell.band));
