@@ -3,6 +3,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <map>
 #include <sstream>
 
@@ -303,6 +304,34 @@ TEST_F(KLV_GSMSharedCodesTest, CellMonitorRecordsFillFiveSections) {
   EXPECT_EQ(shown("UMTS RR Info"), R"({Cell ID: "6", UARFCN: "10565", Scrambling Code: "78"})");
   EXPECT_THAT(log.takeTexts(), ElementsAre("<4>GSMServingCell", "<4>NeighboringCells", "<4>Serving PLMN",
                                            "<4>UMTSSet", "<4>UMTSRRInfo"));
+}
+
+TEST_F(KLV_GSMSharedCodesTest, TheNextMessageInTheSamePlaceAndOfTheSameSizeIsShownByAllFive) {
+  const auto message = [](std::int64_t value) {
+    return cellMonitorMessage({cellRecord("GSM", "Serving",
+                                          {number("MCC", value), number("MNC", value), number("LAC", value),
+                                           number("CellIdentity", value), number("ARFCN", value)}),
+                               cellRecord("GSM", "Neighbor", {number("ARFCN", value), number("RSSI", value)}),
+                               cellRecord("UMTS", "Neighbor",
+                                          {number("UARFCN", value), number("ScramblingCode", value),
+                                           number("RSCP", value), number("EcN0", value)}),
+                               cellRecord("UMTS", "Serving",
+                                          {number("CellIdentity", value), number("UARFCN", value),
+                                           number("ScramblingCode", value)})});
+  };
+  Bytes packet = message(1);
+  dispatch(0xFF0001, packet);
+  const Bytes next = message(2);
+  ASSERT_EQ(next.size(), packet.size());
+  std::copy(next.begin(), next.end(), packet.begin());
+  dispatch(0xFF0001, packet);
+  EXPECT_EQ(shown("GSM Serving Cell"), R"({Cell ID: "2", ARFCN: "2"})");
+  EXPECT_EQ(shown("Neighboring Cells"), R"([{ARFCN: "2", RSSI: "4 dBm"}])");
+  EXPECT_EQ(shown("Serving PLMN"),
+            R"({Mobile Country Code: "2", Mobile Network Code: "2", Location Area Code: "2"})");
+  EXPECT_EQ(shown("UMTS Set"),
+            R"([{UARFCN: "2", Scrambling Code: "2", RSCP: "2 dBm", Energy Per Chip: "2 dB"}])");
+  EXPECT_EQ(shown("UMTS RR Info"), R"({Cell ID: "2", UARFCN: "2", Scrambling Code: "2"})");
 }
 
 TEST_F(KLV_GSMSharedCodesTest, AFailedParseIsReportedByAllFiveAndEmptiesTwoLists) {

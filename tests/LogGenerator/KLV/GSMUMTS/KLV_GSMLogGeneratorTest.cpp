@@ -19,7 +19,6 @@ namespace varnel {
 namespace {
 
 using testing::ElementsAre;
-using testing::IsEmpty;
 
 // The list sections: each is an array without an element.
 const std::vector<std::string> listSections = {
@@ -145,7 +144,7 @@ TEST(KLV_GSMTemplate, SectionKeysHaveNoOrderingPrefix) {
 TEST(KLV_GSMTemplate, ListSectionsAreEmptyArrays) {
   const Value root = realTemplate();
   for (const std::string& name : listSections) {
-    EXPECT_THAT(allUnder(root, name).size(), 1u) << name;
+    EXPECT_EQ(allUnder(root, name).size(), 1u) << name;
     for (const Value& section : allUnder(root, name)) EXPECT_EQ(described(section), "[]") << name;
   }
 }
