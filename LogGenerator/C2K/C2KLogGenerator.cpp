@@ -111,7 +111,7 @@ Value C2KLogGenerator::getDisplayFromState(Dictionary& state) const {
     return {};
   }
   state.set(stateKey::displayTemplate, displayTemplate);
-  const Value display = Value::ofDictionary();
+  Value display = Value::ofDictionary();
   const Value lookup = Value::ofDictionary();
   processTemplate_storeDisplayIntoDict_storeLookupIntoDict(*displayTemplate.dictionary(), display,
                                                            *lookup.dictionary());

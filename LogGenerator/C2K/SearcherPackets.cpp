@@ -45,19 +45,16 @@ constexpr Format dBm = real("%+.2f dBm");
 constexpr std::string_view trafficFERKey = "TrafficFER";
 constexpr std::string_view trafficFERVariable = "k1xTrafficFER";
 
-double receiveAGC(std::uint8_t byte) {
-  const int raw = static_cast<std::int8_t>(byte);
-  return raw * 334 / 1000.0 - 63.248;
-}
+double receiveAGC(std::int8_t raw) { return raw * 334 / 1000.0 - 63.248; }
 
 double transmitPower(std::uint16_t tenths) { return static_cast<std::int16_t>(tenths) / 10.0; }
 
 void showRF(const Packet& rf, bool isInTraffic, const Dictionary& lookup) {
   storeDisplayFields(rf, firstChain, lookup);
-  storeDisplayNumber("k1xRxAGC0", dBm, receiveAGC(rf.u8(10)), lookup);
+  storeDisplayNumber("k1xRxAGC0", dBm, receiveAGC(static_cast<std::int8_t>(rf.u8(10))), lookup);
   if (isInTraffic) {
     storeDisplayFields(rf, secondChain, lookup);
-    storeDisplayNumber("k1xRxAGC1", dBm, receiveAGC(rf.u8(11)), lookup);
+    storeDisplayNumber("k1xRxAGC1", dBm, receiveAGC(static_cast<std::int8_t>(rf.u8(11))), lookup);
     storeDisplayNumber("k1xTxAGC", dBm, transmitPower(rf.u16(12)), lookup);
   } else {
     for (const auto variable : {"k1xRx1BandClass", "k1xRx1ChanNum", "k1xRxAGC1", "k1xTxAGC"}) {
