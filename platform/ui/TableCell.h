@@ -1,0 +1,67 @@
+#pragma once
+
+#include <memory>
+#include <string>
+#include <string_view>
+
+#include "platform/ui/Font.h"
+#include "platform/ui/Geometry.h"
+#include "platform/ui/Label.h"
+#include "platform/ui/ScrollContainer.h"
+
+namespace varnel {
+
+/// What the host builds into a cell by itself.
+enum class CellStyle {
+  Default,        ///< one text
+  NameAndDetail,  ///< a name on the left, a detail on the right
+};
+
+/// The mark at a row's right edge.
+enum class CellAccessory {
+  None,
+  DisclosureIndicator,  ///< the row leads on
+  Checkmark,
+};
+
+/// The part of a cell that is on the screen. A table makes it.
+class CellView {
+ public:
+  virtual ~CellView() = default;
+  /// The host's own layout: afterwards the content area has the size that it has in a row of the table as
+  /// wide as the table is now.
+  virtual void layOut() = 0;
+  /// The content area in its own coordinates: the row, less the room of the accessory.
+  virtual Rect contentBounds() const = 0;
+
+  /// New parts of the content area, which live as long as the view.
+  virtual Label& addLabel() = 0;
+  virtual ScrollContainer& addScrollContainer() = 0;
+
+  virtual void setAccessory(CellAccessory accessory) = 0;
+  /// The built-in text of the style, and its font. Long texts are cut.
+  virtual void setText(std::string_view text) = 0;
+  virtual void setTextFont(const Font& font) = 0;
+};
+
+/// A cell: its view, and what its maker keeps beside it.
+class TableCell {
+ public:
+  TableCell(std::unique_ptr<CellView> view, std::string_view reuseIdentifier)
+      : _view(std::move(view)), _reuseIdentifier(reuseIdentifier) {}
+  TableCell(const TableCell&) = delete;
+  TableCell& operator=(const TableCell&) = delete;
+  virtual ~TableCell() = default;
+
+  CellView& view() const { return *_view; }
+  /// Under which name the table hands it out again.
+  const std::string& reuseIdentifier() const { return _reuseIdentifier; }
+  /// The table calls it when the width of a cell in use has changed.
+  virtual void layOutAgain() {}
+
+ private:
+  std::unique_ptr<CellView> _view;
+  std::string _reuseIdentifier;
+};
+
+}  // namespace varnel
