@@ -47,20 +47,20 @@ class CellView {
 /// A cell: its view, and what its maker keeps beside it.
 class TableCell {
  public:
-  TableCell(std::unique_ptr<CellView> view, std::string_view reuseIdentifier)
-      : _view(std::move(view)), _reuseIdentifier(reuseIdentifier) {}
+  TableCell(std::unique_ptr<CellView> cellView, std::string_view reuseIdentifier)
+      : _cellView(std::move(cellView)), _reuseIdentifier(reuseIdentifier) {}
   TableCell(const TableCell&) = delete;
   TableCell& operator=(const TableCell&) = delete;
   virtual ~TableCell() = default;
 
-  CellView& view() const { return *_view; }
+  CellView& cellView() const { return *_cellView; }
   /// Under which name the table hands it out again.
   const std::string& reuseIdentifier() const { return _reuseIdentifier; }
   /// The table calls it when the width of a cell in use has changed.
   virtual void layOutAgain() {}
 
  private:
-  std::unique_ptr<CellView> _view;
+  std::unique_ptr<CellView> _cellView;
   std::string _reuseIdentifier;
 };
 
