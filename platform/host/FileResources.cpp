@@ -2,9 +2,9 @@
 
 #include <algorithm>
 #include <cstdlib>
-#include <fstream>
 
 #include "platform/PropertyList.h"
+#include "platform/host/WholeFile.h"
 
 namespace varnel {
 
@@ -14,18 +14,6 @@ namespace fs = std::filesystem;
 
 constexpr std::string_view extension = ".plist";
 
-// The file's bytes; nothing when it cannot be read or is larger than any list may be.
-std::optional<Bytes> bytesOf(const fs::path& path) {
-  std::error_code failure;
-  const std::uintmax_t size = fs::file_size(path, failure);
-  if (failure || size > fileLimits.size) return std::nullopt;
-  Bytes bytes(size);
-  std::ifstream file(path, std::ios::binary);
-  if (!file.read(reinterpret_cast<char*>(bytes.data()), static_cast<std::streamsize>(size)))
-    return std::nullopt;
-  return bytes;
-}
-
 bool isWithin(const fs::path& path, const fs::path& folder) {
   return std::ranges::mismatch(folder, path).in1 == folder.end();
 }
@@ -33,7 +21,7 @@ bool isWithin(const fs::path& path, const fs::path& folder) {
 }  // namespace
 
 Value FileResources::propertyList(std::string_view name) const {
-  const auto bytes = bytesOf(_folder / (std::string(name) + std::string(extension)));
+  const auto bytes = readWholeFile(_folder / (std::string(name) + std::string(extension)));
   if (!bytes) return {};
   return readPropertyList(*bytes, fileLimits).value_or(Value());
 }

@@ -1,0 +1,25 @@
+#pragma once
+
+#include <QVariantList>
+#include <optional>
+#include <string>
+
+namespace varnel {
+
+/// The address of the user's D-Bus session bus: what $DBUS_SESSION_BUS_ADDRESS says, else the socket "bus" in
+/// $XDG_RUNTIME_DIR; nothing when there is none.
+std::optional<std::string> sessionBusAddress();
+
+/// A signal as D-Bus has them.
+struct BusSignal {
+  std::string objectPath;
+  std::string interface;
+  std::string name;
+  QVariantList arguments;
+};
+
+/// Sends a signal to everybody on the bus of that address. It has got there when the call returns nothing;
+/// else the call returns what went wrong. A bus that does not answer costs half a second.
+std::optional<std::string> sendBusSignal(const std::string& address, const BusSignal& signal);
+
+}  // namespace varnel
