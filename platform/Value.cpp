@@ -54,4 +54,20 @@ Value Value::shallowCopy() const {
   return *this;
 }
 
+Value Value::deepCopy() const {
+  if (const Array* elements = array()) {
+    Array copies;
+    copies.reserve(elements->size());
+    for (const Value& element : *elements) copies.push_back(element.deepCopy());
+    return ofArray(std::move(copies));
+  }
+  if (const Dictionary* entries = dictionary()) {
+    Value copy = ofDictionary();
+    copy.dictionary()->reserve(entries->size());
+    for (const Dictionary::Entry& entry : *entries) copy.dictionary()->set(entry.key, entry.value.deepCopy());
+    return copy;
+  }
+  return *this;
+}
+
 }  // namespace varnel

@@ -73,6 +73,8 @@ class Value {
 
   /// An array or dictionary of its own with the same elements, shared with this one; any other value itself.
   Value shallowCopy() const;
+  /// The same value without a container that anybody shares; the containers form no circle.
+  Value deepCopy() const;
 
  private:
   using Content = std::variant<std::monostate, std::string, std::int64_t, double, bool, Date, DataRef,
