@@ -9,11 +9,12 @@ namespace {
 constexpr std::string_view snapshotFolder = "/var/mobile/Library/Logs/CrashReporter";
 }
 
-Value snapshotContents(Time created, const Value& saveContents, std::string_view description) {
+Value snapshotContents(Time created, const Value& saveContents,
+                       const std::optional<std::string>& description) {
   Value contents = Value::ofDictionary();
   contents.dictionary()->set("Timestamp", dateDescription(created));
   contents.dictionary()->set("Data", saveContents.isAbsent() ? Value::ofArray() : saveContents);
-  contents.dictionary()->set("Description", description);
+  if (description) contents.dictionary()->set("Description", *description);
   return contents;
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -14,8 +15,9 @@ inline constexpr std::string_view internalDeviceMarker =
     "/OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 
 /// The contents of a snapshot file: a dictionary of "Timestamp", "Data" and "Description". Without save
-/// contents "Data" is an empty array.
-Value snapshotContents(Time created, const Value& saveContents, std::string_view description);
+/// contents "Data" is an empty array; without a description there is no "Description".
+Value snapshotContents(Time created, const Value& saveContents,
+                       const std::optional<std::string>& description);
 
 /// Writes the snapshot file of that moment into the device's folder of diagnostic logs. False, and a line in
 /// the log, when that fails.

@@ -1,8 +1,8 @@
 #include "app/TextViewer.h"
 
-#include <cstdio>
-
+#include "app/DateFormatter.h"
 #include "app/Snapshot.h"
+#include "app/Status.h"
 #include "app/TreeText.h"
 #include "platform/Log.h"
 
@@ -10,16 +10,9 @@ namespace varnel {
 
 namespace {
 
-constexpr const char* notConnected = "Connecting...";
-
 std::string updateMessage(const Clock& clock) {
   const Time now = clock.now();
-  const CalendarTime local = calendarTime(now, clock.zoneAt(now));
-  char text[64];
-  std::snprintf(text, sizeof text, "Updated %04lld-%02u-%02u at %02u:%02u:%02u",
-                static_cast<long long>(local.year), local.month, local.day, local.hour, local.minute,
-                local.second);
-  return text;
+  return DateFormatter(updateStatusPattern).string(now, clock.zoneAt(now));
 }
 
 }  // namespace
@@ -31,13 +24,12 @@ TextViewer::TextViewer(const ModelServices& services, DeviceFiles& files, TextOu
 
 void TextViewer::startOver() {
   _model = std::make_unique<VarnelModel>(_services, *this);
-  show(notConnected, {});
+  show(std::string(notConnectedStatus), {});
   _model->restartMonitorLater();
 }
 
 void TextViewer::afterUpdates(unsigned count, std::function<void()> task) {
-  _awaitedUpdates = _updates + count;
-  _whenUpdated = std::move(task);
+  _awaitedUpdates.await(count, std::move(task));
 }
 
 void TextViewer::save() {
@@ -51,9 +43,10 @@ void TextViewer::save() {
 
 void TextViewer::updateViewControllerFromModel() {
   const auto root = _model->topLevelNodes();
-  const std::string status = _model->isConnected() ? updateMessage(_services.generator.clock) : notConnected;
+  const std::string status =
+      _model->isConnected() ? updateMessage(_services.generator.clock) : std::string(notConnectedStatus);
   show(status, root ? treeAsText(*root) : std::string());
-  if (++_updates == _awaitedUpdates && _whenUpdated) _whenUpdated();
+  _awaitedUpdates.countOne();
 }
 
 void TextViewer::show(const std::string& status, const std::string& tree) {

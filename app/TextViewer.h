@@ -5,6 +5,7 @@
 #include <optional>
 #include <string>
 
+#include "app/AwaitedUpdates.h"
 #include "model/VarnelModel.h"
 #include "platform/DeviceFiles.h"
 
@@ -40,9 +41,7 @@ class TextViewer final : public VarnelModelObserver {
   DeviceFiles& _files;
   TextOutput& _output;
   std::unique_ptr<VarnelModel> _model;
-  unsigned _updates = 0;
-  unsigned _awaitedUpdates = 0;
-  std::function<void()> _whenUpdated;
+  AwaitedUpdates _awaitedUpdates;
 };
 
 }  // namespace varnel

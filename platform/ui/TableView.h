@@ -22,7 +22,8 @@ struct IndexPath {
   friend bool operator==(const IndexPath&, const IndexPath&) = default;
 };
 
-/// Who knows what a table shows.
+/// Who knows what a table shows. Paths that the table passes are those of rows that it was told of since it
+/// was last reloaded.
 class TableViewDelegate {
  public:
   virtual ~TableViewDelegate() = default;

@@ -1,0 +1,134 @@
+#include "app/VarnelApp.h"
+
+#include <utility>
+
+#include "app/Snapshot.h"
+#include "app/Status.h"
+
+namespace varnel {
+
+namespace {
+
+// Kept: without the dots that every later status of that kind has.
+constexpr std::string_view firstStatus = "Connecting";
+
+constexpr std::string_view homeScreenDomain = "com.orvane.dockhall";
+constexpr std::string_view signalStrengthKey = "DHShowGSMRSSI";
+
+// Every pane on the stack is one of these: nobody else pushes any.
+VarnelPaneController& varnelPane(PaneController& controller) {
+  return static_cast<VarnelPaneController&>(controller);
+}
+
+}  // namespace
+
+VarnelApp::VarnelApp(const Host& host) : _host(host), _alive(std::make_shared<VarnelApp*>(this)) {}
+
+VarnelApp::~VarnelApp() = default;
+
+void VarnelApp::applicationDidFinishLaunching() {
+  getSaveButtonPref();
+  setWindow(_host.userInterface.makeWindow(_host.userInterface.screenBounds()));
+  _model = std::make_unique<VarnelModel>(_host.model, *this);
+  setUpdateMessage(std::string(notConnectedStatus));
+  _dateFormatter.emplace(updateStatusPattern);
+
+  const auto root = std::make_shared<VarnelPaneController>(_host.userInterface, *this, nullptr, "/");
+  root->setStatus_isLoading(firstStatus, true);
+  _navController = _host.userInterface.makeNavigationStack(root);
+  _navController->setDelegate(this);
+  _window->setRoot(*_navController);
+  _window->makeKeyAndVisible();
+
+  _model->restartMonitorLater();
+}
+
+void VarnelApp::getSaveButtonPref() {
+  setAllowSaveButton(_host.files.exists(std::string(internalDeviceMarker)));
+}
+
+void VarnelApp::afterUpdates(unsigned count, std::function<void()> task) {
+  _awaitedUpdates.await(count, std::move(task));
+}
+
+void VarnelApp::updateViewControllerFromModel() {
+  reloadPanes();
+  if (isConnected()) setUpdateMessage(updateMessageForNow());
+  updateStatusForViewController(varnelPane(*_navController->topController()));
+  _awaitedUpdates.countOne();
+}
+
+void VarnelApp::reloadPanes() {
+  const auto panes = _navController->controllers();
+  for (std::size_t i = 0; i < panes.size(); ++i) {
+    VarnelPaneController& pane = varnelPane(*panes[i]);
+    const auto node = i == 0 ? _model->topLevelNodes() : _model->nodeAtPath(pane.path());
+    if (i > 0 && !node) {
+      // Kept: this pane and those above it go as they are; only the panes below show the new tree.
+      _navController->popTo(*panes[i - 1], Animation::Animated);
+      return;
+    }
+    pane.reloadWithNode(node);
+  }
+}
+
+std::string VarnelApp::updateMessageForNow() const {
+  const Clock& clock = _host.model.generator.clock;
+  const Time now = clock.now();
+  return _dateFormatter->string(now, clock.zoneAt(now));
+}
+
+void VarnelApp::updateStatusForViewController(VarnelPaneController& pane) {
+  if (isConnected()) {
+    pane.setStatus_isLoading(_updateMessage, false);
+  } else {
+    pane.setStatus_isLoading(notConnectedStatus, true);
+  }
+}
+
+void VarnelApp::navigationController_willShowViewController_animated(NavigationStack&,
+                                                                     PaneController& controller, Animation) {
+  updateStatusForViewController(varnelPane(controller));
+}
+
+void VarnelApp::showSaveView() {
+  if (_saveViewController || !_model) return;
+  const VarnelSaveViewController::Host host{_host.userInterface, _host.model.generator.resources, _host.files,
+                                            _host.model.generator.clock, *this};
+  setSaveViewController(VarnelSaveViewController::initWithSaveHistory(host, _model->getSaveContents()));
+  if (_saveViewController) _navController->present(_saveViewController, Animation::Animated);
+}
+
+void VarnelApp::closeSaveView() {
+  if (!_saveViewController) return;
+  _navController->dismiss(Animation::Animated);
+  setSaveViewController(nullptr);
+}
+
+void VarnelApp::closeSaveViewLater() {
+  _host.model.queue.async([weak = std::weak_ptr(_alive)] {
+    if (const auto alive = weak.lock()) (*alive)->closeSaveView();
+  });
+}
+
+void VarnelApp::setSaveViewController(std::shared_ptr<VarnelSaveViewController> controller) {
+  _saveViewController = std::move(controller);
+}
+
+void VarnelApp::applicationWillTerminate() {
+  _setGSMRSSI(false);
+  setUpdateMessage(std::nullopt);
+  _dateFormatter.reset();
+  setSaveViewController(nullptr);
+  if (_window) _window->hide();
+  setWindow(nullptr);
+  _model.reset();
+}
+
+void VarnelApp::_setGSMRSSI(bool value) {
+  _host.preferences.set(homeScreenDomain, signalStrengthKey, Value::ofBoolean(value));
+  _host.preferences.synchronise(homeScreenDomain);
+  _host.preferences.notifyChanged(homeScreenDomain, signalStrengthKey);
+}
+
+}  // namespace varnel

@@ -1,0 +1,123 @@
+#include "app/VarnelPaneController.h"
+
+#include <utility>
+
+namespace varnel {
+
+namespace {
+
+// Kept: one identifier for both kinds of cell, so a cell that is used again may be of the other kind and show
+// what its labels can.
+constexpr std::string_view cellIdentifier = "VarnelPaneControllerCell";
+constexpr std::string_view titleWithoutNode = "Varnel";
+constexpr double statusFontSize = 14;
+
+}  // namespace
+
+VarnelPaneController::VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node,
+                                           std::string path)
+    : _userInterface(userInterface),
+      _saveControl(saveControl),
+      _pane(userInterface.makeTablePane()),
+      _nodes(std::move(node)),
+      _keyPath(std::move(path)) {
+  _pane->table().setDelegate(this);
+}
+
+void VarnelPaneController::viewWillAppear(Animation animation) {
+  PaneController::viewWillAppear(animation);
+  showTitle();
+  if (navigationController()) navigationController()->showToolbar();
+  createToolbarItems();
+}
+
+// Kept: what a pane does by itself when it disappears is left out.
+void VarnelPaneController::viewWillDisappear(Animation) { _pane->resignFirstResponder(); }
+
+void VarnelPaneController::setStatus_isLoading(std::optional<std::string_view> status, bool isLoading) {
+  _status = status.value_or("");
+  _isLoading = isLoading;
+  createToolbarItems();
+}
+
+void VarnelPaneController::reloadWithNode(Node node) {
+  _nodes = std::move(node);
+  showTitle();
+  _pane->table().reloadData();
+  createToolbarItems();
+}
+
+void VarnelPaneController::createToolbarItems() {
+  std::vector<ToolbarItem> items{ActivityIndicator{_isLoading},
+                                 ToolbarLabel{_status, Font::system(statusFontSize)}, FlexibleSpace{}};
+  if (_saveControl.allowSaveButton()) {
+    items.emplace_back(
+        BarButton{BarButton::SystemItem::Save, [&control = _saveControl] { control.showSaveView(); }});
+  }
+  _pane->setToolbarItems(std::move(items), Animation::Animated);
+}
+
+std::size_t VarnelPaneController::tableView_numberOfRowsInSection(TableView&, std::size_t) {
+  const auto* children = _nodes ? _nodes->childNodes() : nullptr;
+  return children ? children->size() : 0;
+}
+
+std::unique_ptr<TableCell> VarnelPaneController::tableView_cellForRowAtIndexPath(TableView& table,
+                                                                                 const IndexPath& path) {
+  const Node child = childAt(path);
+  // Every cell of this table was made below.
+  std::unique_ptr<VarnelCell> reused(
+      static_cast<VarnelCell*>(table.dequeueReusableCell(cellIdentifier).release()));
+  return child->childNodes() ? innerNodeCell(table, std::move(reused), *child)
+                             : leafCell(table, std::move(reused), *child);
+}
+
+std::unique_ptr<VarnelCell> VarnelPaneController::innerNodeCell(TableView& table,
+                                                                std::unique_ptr<VarnelCell> reused,
+                                                                const VarnelModelNode& child) const {
+  auto cell = reused ? std::move(reused)
+                     : VarnelCell::initWithStyleKey_reuseIdentifier(table, _userInterface.textMetrics(),
+                                                                    CellStyle::NameAndDetail, cellIdentifier);
+  cell->key().setText(child.displayName());
+  cell->cellView().setAccessory(CellAccessory::DisclosureIndicator);
+  if (cell->value()) cell->value()->setText("");
+  cell->setLayoutKey();
+  return cell;
+}
+
+std::unique_ptr<VarnelCell> VarnelPaneController::leafCell(TableView& table,
+                                                           std::unique_ptr<VarnelCell> reused,
+                                                           const VarnelModelNode& child) const {
+  auto cell = reused ? std::move(reused)
+                     : VarnelCell::initWithStyle_reuseIdentifier(table, _userInterface.textMetrics(),
+                                                                 CellStyle::NameAndDetail, cellIdentifier);
+  cell->key().setText(child.displayName());
+  cell->cellView().setAccessory(CellAccessory::None);
+  if (cell->value()) cell->value()->setText(*child.value());
+  cell->setLayout();
+  return cell;
+}
+
+void VarnelPaneController::tableView_didSelectRowAtIndexPath(TableView& table,
+                                                             const std::optional<IndexPath>& path) {
+  if (!path) return;
+  const Node child = childAt(*path);
+  if (!child->childNodes()) {
+    table.deselectRow(*path, Animation::None);
+    return;
+  }
+  const auto next = std::make_shared<VarnelPaneController>(_userInterface, _saveControl, child,
+                                                           childPath(_keyPath, child->displayName()));
+  next->setStatus_isLoading(_status, _isLoading);
+  if (navigationController()) navigationController()->push(next, Animation::Animated);
+}
+
+VarnelPaneController::Node VarnelPaneController::childAt(const IndexPath& path) const {
+  return _nodes->childNodes()->at(path.row);
+}
+
+void VarnelPaneController::showTitle() {
+  _pane->setTitle(_nodes ? std::string_view(_nodes->displayName()) : titleWithoutNode);
+}
+
+}  // namespace varnel

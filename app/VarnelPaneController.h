@@ -1,0 +1,60 @@
+#pragma once
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+
+#include "app/SaveControl.h"
+#include "app/VarnelCell.h"
+#include "model/VarnelModelNode.h"
+#include "platform/ui/UserInterface.h"
+
+namespace varnel {
+
+/// A pane that lists the children of one node of the display tree. An inner node's row leads to a pane of its
+/// own; a leaf's row shows its value.
+class VarnelPaneController final : public PaneController, public TableViewDelegate {
+ public:
+  using Node = std::shared_ptr<const VarnelModelNode>;
+
+  /// A pane on the node of that path; the node is null while there is no tree. User interface and save
+  /// control outlive the pane.
+  VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node, std::string path);
+
+  /// The node's path in the tree, "/" for the root.
+  const std::string& path() const { return _keyPath; }
+  /// Shows the status, none as an empty text, and whether something is awaited.
+  void setStatus_isLoading(std::optional<std::string_view> status, bool isLoading);
+  /// Shows another node, or none.
+  void reloadWithNode(Node node);
+  /// Builds the toolbar anew. Its label is sized once, so every change of the status takes a new toolbar.
+  void createToolbarItems();
+
+  TablePane& pane() override { return *_pane; }
+  void viewWillAppear(Animation animation) override;
+  void viewWillDisappear(Animation animation) override;
+
+  std::size_t tableView_numberOfRowsInSection(TableView& table, std::size_t section) override;
+  std::unique_ptr<TableCell> tableView_cellForRowAtIndexPath(TableView& table,
+                                                             const IndexPath& path) override;
+  void tableView_didSelectRowAtIndexPath(TableView& table, const std::optional<IndexPath>& path) override;
+
+ private:
+  std::unique_ptr<VarnelCell> innerNodeCell(TableView& table, std::unique_ptr<VarnelCell> reused,
+                                            const VarnelModelNode& child) const;
+  std::unique_ptr<VarnelCell> leafCell(TableView& table, std::unique_ptr<VarnelCell> reused,
+                                       const VarnelModelNode& child) const;
+  Node childAt(const IndexPath& path) const;
+  void showTitle();
+
+  UserInterface& _userInterface;
+  SaveControl& _saveControl;
+  std::unique_ptr<TablePane> _pane;
+  Node _nodes;
+  std::string _keyPath;
+  std::string _status;
+  bool _isLoading = true;
+};
+
+}  // namespace varnel
