@@ -65,6 +65,10 @@ TEST(Snapshot, AnEmptyDescriptionIsAnEmptyText) {
   EXPECT_EQ(*contents.dictionary()->get("Description").string(), "");
 }
 
+TEST(Snapshot, WithoutADescriptionThereIsNone) {
+  EXPECT_FALSE(snapshotContents(friday, saveContents(), std::nullopt).dictionary()->has("Description"));
+}
+
 class SnapshotFile : public testing::Test {
  protected:
   SnapshotFile() { clock.set(friday); }

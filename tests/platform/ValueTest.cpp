@@ -175,6 +175,30 @@ TEST(Value, ShallowCopyIsANewContainerOfTheSameElements) {
   EXPECT_EQ(dictionaryCopy.dictionary()->get("inner").array(), inner.array());
 }
 
+TEST(Value, DeepCopySharesNoContainer) {
+  const Value inner = Value::ofArray({"a"});
+  const Value section = Value::ofDictionary();
+  section.dictionary()->set("second", "2");
+  section.dictionary()->set("first", inner);
+  const Value array = Value::ofArray({section});
+  const Value copy = array.deepCopy();
+  inner.array()->clear();
+  section.dictionary()->set("second", "3");
+  array.array()->clear();
+  ASSERT_EQ(copy.array()->size(), 1U);
+  const Dictionary& entries = *copy.array()->front().dictionary();
+  EXPECT_EQ(entries.begin()->key, "second");
+  EXPECT_EQ(*entries.get("second").string(), "2");
+  EXPECT_EQ(entries.get("first").array()->size(), 1U);
+}
+
+TEST(Value, DeepCopyOfAnyOtherKindIsTheValue) {
+  EXPECT_TRUE(Value().deepCopy().isAbsent());
+  EXPECT_EQ(*Value("text").deepCopy().string(), "text");
+  const Value data = Value::ofData({1, 2});
+  EXPECT_EQ(data.deepCopy().data(), data.data()) << "data never changes, so it is shared";
+}
+
 TEST(Value, ShallowCopyOfAnyOtherKindIsTheValue) {
   EXPECT_TRUE(Value().shallowCopy().isAbsent());
   EXPECT_EQ(*Value("text").shallowCopy().string(), "text");
