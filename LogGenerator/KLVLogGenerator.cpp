@@ -110,7 +110,9 @@ Value KLVLogGenerator::getSaveContentsFromState(const Dictionary& state) const {
 }
 
 void KLVLogGenerator::storeBinDataInState(Dictionary& state) {
-  state.set(stateKey::displayState, Value::ofData(std::exchange(_binData, Bytes())));
+  Bytes next;
+  next.reserve(_binData.size());  // the next display brings about as much
+  state.set(stateKey::displayState, Value::ofData(std::exchange(_binData, std::move(next))));
 }
 
 }  // namespace varnel

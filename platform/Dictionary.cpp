@@ -36,8 +36,10 @@ void Dictionary::remove(std::string_view key) {
 }
 
 std::size_t Dictionary::find(std::string_view key) const {
+  if (_entries.empty()) return nowhere;
+  if (_next > 0 && _next <= _entries.size() && _entries[_next - 1].key == key) return _next - 1;
   if (_next >= _entries.size()) _next = 0;
-  if (!_entries.empty() && _entries[_next].key == key) return _next++;
+  if (_entries[_next].key == key) return _next++;
   if (!_positions.empty()) {
     const auto found = _positions.find(key);
     if (found == _positions.end()) return nowhere;
@@ -45,7 +47,10 @@ std::size_t Dictionary::find(std::string_view key) const {
     return found->second;
   }
   for (std::size_t position = 0; position < _entries.size(); ++position) {
-    if (_entries[position].key == key) {
+    const std::string& candidate = _entries[position].key;
+    // Lengths and ends tell most keys apart, which begin alike.
+    if (candidate.size() != key.size() || (!key.empty() && candidate.back() != key.back())) continue;
+    if (candidate == key) {
       _next = position + 1;
       return position;
     }

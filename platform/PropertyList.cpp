@@ -47,6 +47,11 @@ char32_t takeCharacter(std::string_view& text) {
 
 bool canHold(Encoding encoding, std::string_view text) {
   while (!text.empty()) {
+    // Nearly every character is plain ASCII.
+    if (const auto first = static_cast<unsigned char>(text[0]); first >= 0x20 && first < 0x80) {
+      text.remove_prefix(1);
+      continue;
+    }
     const char32_t character = takeCharacter(text);
     if (character == 0) return false;
     if (encoding == Encoding::Binary) continue;
@@ -99,6 +104,7 @@ Value readArray(plist_t node, Encoding encoding) {
 
 Value readDictionary(plist_t node, Encoding encoding) {
   const auto dictionary = std::make_shared<Dictionary>();
+  dictionary->reserve(plist_dict_get_size(node));
   plist_dict_iter position = nullptr;
   plist_dict_new_iter(node, &position);
   const std::unique_ptr<void, Free> positionOwner(position);
