@@ -26,4 +26,12 @@ bool writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& contents
   return false;
 }
 
+void saveSnapshotWithoutDescription(DeviceFiles& files, const Clock& clock, const Value& saveContents) {
+  if (!files.exists(std::string(internalDeviceMarker))) {
+    logError("This device has no marker that allows snapshots: nothing is saved");
+    return;
+  }
+  writeSnapshot(files, clock, snapshotContents(clock.now(), saveContents, ""));
+}
+
 }  // namespace varnel

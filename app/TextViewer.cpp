@@ -33,12 +33,7 @@ void TextViewer::afterUpdates(unsigned count, std::function<void()> task) {
 }
 
 void TextViewer::save() {
-  if (!_files.exists(std::string(internalDeviceMarker))) {
-    logError("This device has no marker that allows snapshots: nothing is saved");
-    return;
-  }
-  const Time now = _services.generator.clock.now();
-  writeSnapshot(_files, _services.generator.clock, snapshotContents(now, _model->getSaveContents(), ""));
+  saveSnapshotWithoutDescription(_files, _services.generator.clock, _model->getSaveContents());
 }
 
 void TextViewer::updateViewControllerFromModel() {

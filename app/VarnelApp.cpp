@@ -34,13 +34,33 @@ void VarnelApp::applicationDidFinishLaunching() {
   _dateFormatter.emplace(updateStatusPattern);
 
   const auto root = std::make_shared<VarnelPaneController>(_host.userInterface, *this, nullptr, "/");
-  root->setStatus_isLoading(firstStatus, true);
+  showFirstStatus(*root);
   _navController = _host.userInterface.makeNavigationStack(root);
   _navController->setDelegate(this);
   _window->setRoot(*_navController);
   _window->makeKeyAndVisible();
 
   _model->restartMonitorLater();
+}
+
+void VarnelApp::showFirstStatus(VarnelPaneController& root) { root.setStatus_isLoading(firstStatus, true); }
+
+void VarnelApp::startOver() {
+  if (!_model) return;
+  closeSaveView();
+  setUpdateMessage(std::string(notConnectedStatus));
+  _model.reset();  // one model at a time has the channel
+  _model = std::make_unique<VarnelModel>(_host.model, *this);
+  const auto root = _navController->controllers().front();
+  _navController->popTo(*root, Animation::None);
+  varnelPane(*root).reloadWithNode(nullptr);
+  showFirstStatus(varnelPane(*root));
+  _model->restartMonitorLater();
+}
+
+void VarnelApp::save() {
+  if (!_model) return;
+  saveSnapshotWithoutDescription(_host.files, _host.model.generator.clock, _model->getSaveContents());
 }
 
 void VarnelApp::getSaveButtonPref() {

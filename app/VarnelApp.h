@@ -38,6 +38,11 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void applicationDidFinishLaunching();
   /// Puts the shared preference back, takes the window off the screen and closes the link.
   void applicationWillTerminate();
+  /// Replaces the model by a new one with an empty state, and goes back to the root pane. Nothing happens
+  /// before launch and after the end.
+  void startOver();
+  /// Saves a snapshot with an empty description at once, where the device allows it.
+  void save();
   /// Calls the task, once, when that many refreshes have been shown.
   void afterUpdates(unsigned count, std::function<void()> task);
 
@@ -67,6 +72,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void setAllowSaveButton(bool allow) { _allowSaveButton = allow; }
 
  private:
+  void showFirstStatus(VarnelPaneController& root);
   bool isConnected() const { return _model && _model->isConnected(); }
   void reloadPanes();
   std::string updateMessageForNow() const;

@@ -459,6 +459,50 @@ TEST_F(VarnelAppTest, LaunchedAgainAfterItsEndItBeginsAnew) {
   EXPECT_EQ(telephony.attempts, 2u);
 }
 
+TEST_F(VarnelAppTest, StartingOverGoesBackToAnEmptyRootInTheSameWindow) {
+  launchWith(2);
+  openContext(1);
+  app.startOver();
+  ASSERT_THAT(stack().controllers(), SizeIs(1));
+  EXPECT_EQ(pane().table().rows(), 0u);
+  EXPECT_EQ(pane().title, "Varnel");
+  EXPECT_EQ(pane().toolbarText(), "[wheel] [Connecting] [space]");
+  EXPECT_EQ(app.updateMessage(), "Connecting...");
+  EXPECT_THAT(userInterface.events, testing::Not(testing::Contains("window made")));
+  EXPECT_THAT(preferences.events, IsEmpty());
+  queue.run();
+  receive(1);
+  EXPECT_EQ(pane().table().rows(), 2u);
+  EXPECT_EQ(telephony.attempts, 2u);
+}
+
+TEST_F(VarnelAppTest, StartingOverClosesTheSaveScreen) {
+  files.existing = {marker};
+  launchWith(1);
+  pane().pressSave();
+  ASSERT_TRUE(app.saveViewController());
+  app.startOver();
+  EXPECT_FALSE(app.saveViewController());
+}
+
+TEST_F(VarnelAppTest, StartingOverAndSavingDoNothingWhileNotLaunched) {
+  app.startOver();
+  app.save();
+  EXPECT_EQ(queue.waitingTasks(), 0u);
+  EXPECT_THAT(files.writes, IsEmpty());
+}
+
+TEST_F(VarnelAppTest, SavesASnapshotWithAnEmptyDescriptionWhereTheDeviceAllowsIt) {
+  launchWith(1);
+  app.save();
+  EXPECT_THAT(files.writes, IsEmpty());
+  files.existing = {marker};
+  app.save();
+  ASSERT_THAT(files.writes, SizeIs(1));
+  EXPECT_EQ(*files.writes[0].list.dictionary()->get("Description").string(), "");
+  EXPECT_FALSE(app.saveViewController()) << "without the save screen";
+}
+
 TEST_F(VarnelAppTest, CallsTheTaskOnceWhenThatManyRefreshesHaveBeenShown) {
   std::vector<std::string> statuses;
   app.afterUpdates(2, [&] { statuses.push_back(pane().toolbarText()); });
