@@ -1,0 +1,25 @@
+#pragma once
+
+#include <QFont>
+#include <QRect>
+#include <QRectF>
+#include <QString>
+#include <string_view>
+
+#include "platform/ui/Font.h"
+#include "platform/ui/Geometry.h"
+
+namespace varnel {
+
+/// The text as it is shown on one line: what would break or bend the line (line ends, tabs, other control
+/// characters) is a blank. Bytes that are no UTF-8 become replacement characters.
+QString singleLine(std::string_view text);
+std::string utf8(const QString& text);
+
+QFont qtFont(const Font& font);
+
+QRectF qtRect(const Rect& rect);
+/// The nearest rectangle of whole pixels.
+QRect qtPixels(const Rect& rect);
+
+}  // namespace varnel

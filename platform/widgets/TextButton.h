@@ -1,0 +1,32 @@
+#pragma once
+
+#include <QAbstractButton>
+
+namespace varnel {
+
+/// A button that is a text in the accent colour, large enough for a finger.
+class TextButton final : public QAbstractButton {
+ public:
+  enum class Mark {
+    None,
+    Back,  ///< an arrowhead before the text
+  };
+
+  explicit TextButton(Mark mark = Mark::None, QWidget* parent = nullptr);
+  QSize sizeHint() const override;
+  /// Only wide enough for its mark; the text is cut where there is no more room.
+  QSize minimumSizeHint() const override;
+
+ protected:
+  void paintEvent(QPaintEvent* event) override;
+  void keyPressEvent(QKeyEvent* event) override;
+
+ private:
+  int markWidth() const;
+  QFont textFont() const;
+  void paintMark(QPainter& painter) const;
+
+  Mark _mark;
+};
+
+}  // namespace varnel
