@@ -1,0 +1,13 @@
+#include <gtest/gtest.h>
+
+#include <QApplication>
+#include <cstdlib>
+
+// The main of tests that need windows, on a screen that nobody sees.
+int main(int argumentCount, char** arguments) {
+  ::setenv("QT_QPA_PLATFORM", "offscreen", 1);
+  ::setenv("LC_ALL", "C.UTF-8", 1);
+  testing::InitGoogleTest(&argumentCount, arguments);
+  const QApplication application(argumentCount, arguments);
+  return RUN_ALL_TESTS();
+}
