@@ -37,6 +37,20 @@ class EndToEnd : public testing::Test {
     return std::make_unique<Process>(VARNEL_PROGRAM, arguments);
   }
 
+  // A viewer that is asked for a window, where the environment names no display but that one.
+  std::unique_ptr<Process> window(std::vector<std::string> more, const std::string& display,
+                                  const std::string& userInterface = "window") {
+    std::vector<std::string> arguments{"--ui",          userInterface,  "--runtime-dir", _runtime.path(),
+                                       "--device-root", _device.path(), "--log-level",   "3"};
+    arguments.insert(arguments.end(), more.begin(), more.end());
+    return std::make_unique<Process>(VARNEL_PROGRAM, arguments,
+                                     std::vector<std::string>{"QT_QPA_PLATFORM", "WAYLAND_DISPLAY", "DISPLAY",
+                                                              "DBUS_SESSION_BUS_ADDRESS", display});
+  }
+  std::string preference() const {
+    return contentsOf(_device.path() / "var/mobile/Library/Preferences/com.orvane.dockhall.plist");
+  }
+
   TemporaryFolder _runtime;
   TemporaryFolder _device;
 };
@@ -121,6 +135,55 @@ TEST_F(EndToEnd, ASnapshotIsSavedOnlyWithTheMarker) {
   EXPECT_THAT(snapshot.filename().string(), testing::MatchesRegex("VarnelSnapshot-[0-9]+\\.varnel"));
   EXPECT_EQ(fs::status(snapshot).permissions(), fs::perms::owner_read | fs::perms::owner_write);
   EXPECT_TRUE(eventually([&] { return contentsOf(snapshot).find("DLF binary (") != std::string::npos; }));
+}
+
+TEST_F(EndToEnd, TheWindowEndsAfterItsUpdatesAndPutsThePreferenceBack) {
+  const auto telephony = server();
+  const auto varnel = window({"--updates", "2"}, "QT_QPA_PLATFORM=offscreen");
+  ASSERT_TRUE(varnel->waitForEnd());
+  EXPECT_EQ(varnel->exitStatus(), 0) << varnel->error();
+  EXPECT_THAT(varnel->error(), HasSubstr(streaming));
+  EXPECT_THAT(preference(), HasSubstr("DHShowGSMRSSI"));
+}
+
+TEST_F(EndToEnd, SignalsEndTheWindowInOrder) {
+  for (const int signal : {SIGTERM, SIGINT}) {
+    const auto telephony = server();
+    const auto varnel = window({}, "QT_QPA_PLATFORM=offscreen");
+    ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), streaming) == 1; })) << varnel->error();
+    varnel->signal(SIGUSR1);
+    ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), streaming) == 2; })) << varnel->error();
+    varnel->signal(SIGUSR2);
+    ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), "nothing is saved") == 1; }));
+    EXPECT_EQ(preference(), "");
+    varnel->signal(signal);
+    ASSERT_TRUE(varnel->waitForEnd());
+    EXPECT_EQ(varnel->exitStatus(), 0) << varnel->error();
+    EXPECT_THAT(preference(), HasSubstr("DHShowGSMRSSI"));
+    std::filesystem::remove_all(_device.path() / "var");
+  }
+}
+
+TEST_F(EndToEnd, AWindowWithoutADisplayIsOneLineAndStatusOne) {
+  for (const char* display : {"DISPLAY", "DISPLAY=:7655", "QT_QPA_PLATFORM=hologram"}) {
+    const auto varnel = window({}, display);
+    ASSERT_TRUE(varnel->waitForEnd());
+    EXPECT_EQ(varnel->exitStatus(), 1) << varnel->error();
+    EXPECT_EQ(occurrences(varnel->error(), "\n"), 1u) << varnel->error();
+    EXPECT_THAT(varnel->error(), HasSubstr("display"));
+    EXPECT_THAT(varnel->error(), HasSubstr("--ui text"));
+  }
+}
+
+TEST_F(EndToEnd, AutoIsTextWithoutADisplayAndTheWindowWithOne) {
+  const auto telephony = server();
+  const auto text = window({"--updates", "1"}, "DISPLAY=:7655", "auto");
+  ASSERT_TRUE(text->waitForEnd());
+  EXPECT_THAT(text->output(), StartsWith("Connecting...\n"));
+  const auto shown = window({"--updates", "1"}, "QT_QPA_PLATFORM=offscreen", "auto");
+  ASSERT_TRUE(shown->waitForEnd());
+  EXPECT_THAT(shown->output(), Not(HasSubstr("Connecting")));
+  EXPECT_EQ(shown->exitStatus(), 0) << shown->error();
 }
 
 TEST_F(EndToEnd, AWrongOptionIsOneLineAndStatusTwo) {

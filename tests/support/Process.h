@@ -57,7 +57,9 @@ bool eventually(Condition condition, std::chrono::milliseconds within = std::chr
 /// A real program, its standard output and error in files. It is killed when the object goes.
 class Process {
  public:
-  Process(const std::string& program, std::vector<std::string> arguments) {
+  /// Environment: assignments ("NAME=value") and names to take out ("NAME"), on top of the test's own.
+  Process(const std::string& program, std::vector<std::string> arguments,
+          std::vector<std::string> environment = {}) {
     arguments.insert(arguments.begin(), program);
     std::vector<char*> pointers;
     pointers.reserve(arguments.size() + 1);
@@ -72,6 +74,7 @@ class Process {
     ::dup2(in, STDIN_FILENO);
     ::dup2(out, STDOUT_FILENO);
     ::dup2(error, STDERR_FILENO);
+    for (std::string& entry : environment) ::putenv(entry.data());
     ::execv(program.c_str(), pointers.data());
     ::_exit(127);
   }

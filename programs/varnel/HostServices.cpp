@@ -1,0 +1,24 @@
+#include "programs/varnel/HostServices.h"
+
+#include <iostream>
+
+#include "platform/PropertyList.h"
+#include "platform/host/RuntimeFolder.h"
+
+namespace varnel {
+
+HostServices::HostServices(const Options& options, const ApplicationInfo& application)
+    : _log({.programName = programName, .standardErrorLevel = options.logLevel}),
+      _folder(runtimeFolder(options.runtimeFolder)),
+      _ports(_folder),
+      _telephony(_folder),
+      _resources(resourceFolder()),
+      _files(options.deviceRoot),
+      _preferences(options.deviceRoot),
+      _application(application) {}
+
+ModelServices HostServices::model() {
+  return {_ports, _telephony, _queue, {_resources, _clock, _application, std::cout}, writeXmlPropertyList};
+}
+
+}  // namespace varnel

@@ -1,0 +1,40 @@
+#pragma once
+
+#include "model/VarnelModel.h"
+#include "platform/host/EventLoopQueue.h"
+#include "platform/host/FilePreferences.h"
+#include "platform/host/FileResources.h"
+#include "platform/host/HostLog.h"
+#include "platform/host/RootedFiles.h"
+#include "platform/host/SocketPorts.h"
+#include "platform/host/SocketTelephonyService.h"
+#include "platform/host/SystemClock.h"
+#include "programs/varnel/Options.h"
+
+namespace varnel {
+
+/// What either way of showing the display needs of the host. It needs an event loop.
+class HostServices final {
+ public:
+  /// The application information outlives it. Throws std::runtime_error when the runtime folder cannot be
+  /// used.
+  HostServices(const Options& options, const ApplicationInfo& application);
+
+  ModelServices model();
+  DeviceFiles& files() { return _files; }
+  Preferences& preferences() { return _preferences; }
+
+ private:
+  HostLog _log;
+  std::filesystem::path _folder;
+  SocketPorts _ports;
+  SocketTelephonyService _telephony;
+  EventLoopQueue _queue;
+  FileResources _resources;
+  SystemClock _clock;
+  RootedFiles _files;
+  FilePreferences _preferences;
+  const ApplicationInfo& _application;
+};
+
+}  // namespace varnel

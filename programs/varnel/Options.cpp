@@ -1,0 +1,36 @@
+#include "programs/varnel/Options.h"
+
+namespace varnel {
+
+void declare(CLI::App& parser, Options& options, const ApplicationInfo& application) {
+  parser.description("Shows what the cellular modem behind the telephony server sees.");
+  parser.footer(
+      "SIGUSR1 starts over with an empty display. SIGUSR2 saves a snapshot into\n"
+      "var/mobile/Library/Logs/CrashReporter under the device root, on devices that allow it.\n"
+      "\n"
+      "In the window: arrow keys, Return to open, Escape to go back, Shift and Left or Right\n"
+      "for long values, Ctrl+S to save a snapshot, Ctrl+R to start over, Ctrl+Q to end.");
+  parser.set_version_flag("--version",
+                          programName + std::string(" ") + application.version.value_or("(none)"));
+  parser
+      .add_option("--ui", options.userInterface,
+                  "how the display is shown: window, text, or auto (window where there is a display)")
+      ->check(CLI::IsMember({"auto", "window", "text"}))
+      ->capture_default_str();
+  parser.add_option("--device-root", options.deviceRoot, "put before the device's absolute paths")
+      ->type_name("DIR")
+      ->capture_default_str();
+  parser
+      .add_option("--runtime-dir", options.runtimeFolder,
+                  "where viewer and server meet; $XDG_RUNTIME_DIR/varnel unless given")
+      ->type_name("DIR");
+  parser
+      .add_option("--log-level", options.logLevel,
+                  "also write log lines of this priority number and lower to standard error")
+      ->type_name("N");
+  parser.add_option("--updates", options.updates, "end after that many refreshes")
+      ->check(CLI::PositiveNumber)
+      ->type_name("N");
+}
+
+}  // namespace varnel

@@ -1,0 +1,25 @@
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <optional>
+#include <string>
+
+#include "platform/ApplicationInfo.h"
+
+namespace varnel {
+
+inline constexpr const char* programName = "varnel";
+
+/// What the command line asks for.
+struct Options {
+  std::string userInterface = "auto";
+  std::string deviceRoot = "/";
+  std::optional<std::string> runtimeFolder;
+  std::optional<int> logLevel;
+  std::optional<unsigned> updates;
+};
+
+/// Has the parser of the command line fill the options, which outlive it.
+void declare(CLI::App& parser, Options& options, const ApplicationInfo& application);
+
+}  // namespace varnel

@@ -1,0 +1,36 @@
+#include "programs/varnel/TextView.h"
+
+#include <csignal>
+
+#include "app/TextViewer.h"
+#include "platform/host/HostApplication.h"
+#include "platform/host/SignalWatcher.h"
+#include "programs/varnel/HostServices.h"
+#include "programs/varnel/StandardOutput.h"
+
+namespace varnel {
+
+int viewAsText(int& argumentCount, char** arguments, const Options& options,
+               const ApplicationInfo& application) {
+  HostApplication host(argumentCount, arguments);
+  HostServices services(options, application);
+  StandardOutput output;
+
+  TextViewer viewer(services.model(), services.files(), output);
+  if (options.updates) viewer.afterUpdates(*options.updates, [&host] { host.end(0); });
+  const SignalWatcher watcher({SIGINT, SIGTERM, SIGUSR1, SIGUSR2}, [&](int signal) {
+    switch (signal) {
+      case SIGUSR1:
+        viewer.startOver();
+        break;
+      case SIGUSR2:
+        viewer.save();
+        break;
+      default:
+        host.end(0);
+    }
+  });
+  return host.run();
+}
+
+}  // namespace varnel

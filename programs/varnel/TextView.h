@@ -1,0 +1,11 @@
+#pragma once
+
+#include "programs/varnel/Options.h"
+
+namespace varnel {
+
+/// Shows the display as text on standard output until the program is told to end; returns its exit status.
+int viewAsText(int& argumentCount, char** arguments, const Options& options,
+               const ApplicationInfo& application);
+
+}  // namespace varnel

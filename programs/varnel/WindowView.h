@@ -1,0 +1,12 @@
+#pragma once
+
+#include "programs/varnel/Options.h"
+
+namespace varnel {
+
+/// Shows the display in a window until the user closes it or the program is told to end; returns its exit
+/// status. Throws std::runtime_error when there is no display.
+int viewInWindow(int& argumentCount, char** arguments, const Options& options,
+                 const ApplicationInfo& application);
+
+}  // namespace varnel
