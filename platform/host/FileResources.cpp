@@ -42,7 +42,7 @@ fs::path resourceFolder() {
   if (const char* const folder = std::getenv("VARNEL_RESOURCES")) return folder;
   const fs::path program = fs::read_symlink("/proc/self/exe");
   if (isWithin(program, fs::weakly_canonical(VARNEL_BUILD_FOLDER))) return VARNEL_SOURCE_RESOURCES;
-  return program.parent_path().parent_path() / "share/varnel/resources";
+  return (program.parent_path() / VARNEL_INSTALLED_RESOURCES).lexically_normal();
 }
 
 }  // namespace varnel

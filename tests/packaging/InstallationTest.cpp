@@ -1,0 +1,121 @@
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <regex>
+#include <set>
+#include <string>
+#include <vector>
+
+#include "platform/host/Capture.h"
+#include "tests/support/Process.h"
+
+// What `cmake --install` makes of this build, in a folder that was not known when it was built.
+
+namespace varnel {
+namespace {
+
+namespace fs = std::filesystem;
+using testing::HasSubstr;
+
+const std::string applicationID = "org.varnel.Varnel";
+const std::vector<std::string> programs = {"varnel", "varnel-decode", "varnel-telephonyd"};
+
+// A program that must be on this machine, by the folders where Debian keeps them.
+std::string tool(const std::string& name) {
+  for (const char* folder : {"/usr/bin/", "/usr/local/bin/"}) {
+    if (fs::exists(folder + name)) return folder + name;
+  }
+  ADD_FAILURE() << name << " is missing; ./dev setup installs it";
+  return "/bin/false";
+}
+
+void expectSuccess(const std::string& program, const std::vector<std::string>& arguments) {
+  Process process(program, arguments);
+  ASSERT_TRUE(process.waitForEnd()) << program;
+  EXPECT_EQ(process.exitStatus(), 0) << program << '\n' << process.output() << process.error();
+}
+
+std::string outputOf(const std::string& program, const std::vector<std::string>& arguments) {
+  Process process(program, arguments);
+  EXPECT_TRUE(process.waitForEnd()) << program;
+  EXPECT_EQ(process.exitStatus(), 0) << process.error();
+  return process.output();
+}
+
+std::set<std::string> matches(const std::string& text, const std::regex& pattern) {
+  std::set<std::string> found;
+  for (std::sregex_iterator match(text.begin(), text.end(), pattern), end; match != end; ++match)
+    found.insert((*match)[1]);
+  return found;
+}
+
+class Installation : public testing::Test {
+ protected:
+  static void SetUpTestSuite() {
+    _prefix = new TemporaryFolder;
+    expectSuccess(VARNEL_CMAKE, {"--install", VARNEL_BUILD_DIR, "--prefix", _prefix->path()});
+  }
+  static void TearDownTestSuite() {
+    delete _prefix;
+    _prefix = nullptr;
+  }
+
+  static std::string installed(const std::string& path) { return _prefix->file(path); }
+
+ private:
+  static inline TemporaryFolder* _prefix = nullptr;
+};
+
+TEST_F(Installation, ProgramsFindTheirResourcesWhereverTheyAre) {
+  const TemporaryFolder elsewhere;
+  fs::copy(installed("."), elsewhere.file("moved"), fs::copy_options::recursive);
+  // A packet that no decoder knows: the display is the template.
+  const std::string capture = elsewhere.file("one.pcap");
+  CaptureWriter(capture).write(Time{}, Bytes{1, 12, 0, 0xFF, 0xEE, 0, 0, 0, 0, 0, 0, 0, 0});
+  const std::string display = outputOf(elsewhere.file("moved/bin/varnel-decode"),
+                                       {"--technology", "kalvi-lte", "--format", "paths", capture});
+  EXPECT_THAT(display, HasSubstr("Serving Cell Info\n"));
+}
+
+TEST_F(Installation, EveryProgramExplainsItself) {
+  for (const std::string& program : programs)
+    EXPECT_THAT(outputOf(installed("bin/" + program), {"--help"}), HasSubstr("--help")) << program;
+}
+
+TEST_F(Installation, TheDesktopFileIsValid) {
+  expectSuccess(tool("desktop-file-validate"),
+                {installed("share/applications/" + applicationID + ".desktop")});
+}
+
+TEST_F(Installation, TheMetadataIsValid) {
+  expectSuccess(tool("appstreamcli"),
+                {"validate", "--no-net", installed("share/metainfo/" + applicationID + ".metainfo.xml")});
+}
+
+TEST_F(Installation, TheDesktopFileNamesAProgramAndAnIconThatAreThere) {
+  const std::string entry = contentsOf(installed("share/applications/" + applicationID + ".desktop"));
+  EXPECT_THAT(entry, HasSubstr("\nExec=varnel "));
+  EXPECT_TRUE(fs::exists(installed("bin/varnel")));
+  EXPECT_THAT(entry, HasSubstr("\nIcon=" + applicationID + "\n"));
+  EXPECT_TRUE(fs::exists(installed("share/icons/hicolor/scalable/apps/" + applicationID + ".svg")));
+}
+
+TEST_F(Installation, ManualPagesHaveNoWarnings) {
+  for (const std::string& program : programs)
+    expectSuccess(tool("mandoc"),
+                  {"-T", "lint", "-W", "warning", installed("share/man/man1/" + program + ".1")});
+}
+
+TEST_F(Installation, EachManualPageHasTheOptionsOfItsProgram) {
+  for (const std::string& program : programs) {
+    const std::string help = outputOf(installed("bin/" + program), {"--help"});
+    const std::string page = contentsOf(installed("share/man/man1/" + program + ".1"));
+    EXPECT_EQ(matches(page, std::regex(R"(\n\.It Fl (?:h , )?-([a-z-]+))")),
+              matches(help, std::regex(R"(\n  (?:-h,)?--([a-z-]+))")))
+        << program;
+  }
+}
+
+}  // namespace
+}  // namespace varnel
