@@ -6,6 +6,8 @@ target_compile_options(varnel_options INTERFACE -Wall -Wextra -Wpedantic -Wnon-v
 target_include_directories(varnel_options INTERFACE ${PROJECT_SOURCE_DIR})
 # A program carries only the libraries that it really calls: the offline decoder needs no Qt.
 target_link_options(varnel_options INTERFACE -Wl,--as-needed)
+# The tables that calls into libraries go through cannot be written to once the program runs.
+target_link_options(varnel_options INTERFACE -Wl,-z,relro,-z,now)
 if(VARNEL_SANITIZE)
   target_compile_options(varnel_options INTERFACE -fsanitize=${VARNEL_SANITIZE} -fno-sanitize-recover=all
                                                   -fno-omit-frame-pointer)
