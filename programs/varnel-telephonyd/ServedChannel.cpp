@@ -60,7 +60,7 @@ void ServedChannel::sendWhatIsDue() {
   for (int count = 0; count < messagesAtATime; ++count) {
     if (!_next) return;
     const auto wait = _startedAt + _next->at - _host.uptime();
-    if (wait > 0ms) return sendLater(wait);
+    if (wait.count() > 0) return sendLater(wait);
     if (_filter.takes(_next->bytes)) {
       const Delivery delivery = deliver(_next->bytes);
       if (delivery == Delivery::NoRoom) return sendLater(retryInterval);
