@@ -6,4 +6,4 @@ file(COPY ${CMAKE_CURRENT_LIST_DIR}/copyright ${CMAKE_CURRENT_LIST_DIR}/changelo
      FILE_PERMISSIONS OWNER_READ OWNER_WRITE GROUP_READ WORLD_READ)
 file(GLOB pages ${CPACK_TEMPORARY_DIRECTORY}/usr/share/man/man1/*.1)
 # -n: without the time of packaging, so that the same sources make the same file.
-execute_process(COMMAND gzip -9 -n -f ${documents}/changelog ${documents}/CHANGELOG.md ${pages} COMMAND_ERROR_IS_FATAL ANY)
+execute_process(COMMAND gzip -9 -n -f ${documents}/changelog ${pages} COMMAND_ERROR_IS_FATAL ANY)
