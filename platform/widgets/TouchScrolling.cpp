@@ -15,6 +15,14 @@ namespace {
 // A finger that moves mostly along one axis moves along that one only.
 constexpr double axisLock = 0.75;
 
+// The scroller hears of the finger from here: the gesture recogniser that the toolkit would set up for each
+// table is never freed.
+void tell(QWidget& viewport, QScroller::Input input, const QTouchEvent& event) {
+  if (event.points().isEmpty()) return;
+  const auto time_ms = static_cast<qint64>(event.timestamp());
+  QScroller::scroller(&viewport)->handleInput(input, event.points().front().position(), time_ms);
+}
+
 void setUp(QScroller& scroller) {
   QScrollerProperties properties = scroller.scrollerProperties();
   properties.setScrollMetric(QScrollerProperties::AxisLockThreshold, axisLock);
@@ -28,7 +36,7 @@ void setUp(QScroller& scroller) {
 
 TouchScrolling::TouchScrolling(QAbstractScrollArea& area, RowAt rowAt, Tapped tapped)
     : _area(area), _rowAt(std::move(rowAt)), _tapped(std::move(tapped)) {
-  QScroller::grabGesture(_area.viewport(), QScroller::TouchGesture);
+  _area.viewport()->setAttribute(Qt::WA_AcceptTouchEvents);
   setUp(*QScroller::scroller(_area.viewport()));
 }
 
@@ -47,8 +55,13 @@ bool TouchScrolling::take(QEvent& event) {
       end(static_cast<QTouchEvent&>(event));
       return true;
     case QEvent::TouchUpdate:
+      event.accept();
+      tell(*_area.viewport(), QScroller::InputMove, static_cast<QTouchEvent&>(event));
+      return true;
     case QEvent::TouchCancel:
       event.accept();
+      _tapBegan.reset();
+      QScroller::scroller(_area.viewport())->stop();
       return true;
     default:
       return false;
@@ -76,10 +89,12 @@ void TouchScrolling::begin(QTouchEvent& event) {
   const bool stopsMovement = QScroller::scroller(_area.viewport())->state() == QScroller::Scrolling;
   _tapBegan.reset();
   if (!stopsMovement && event.points().size() == 1) _tapBegan = event.points().front().position();
+  tell(*_area.viewport(), QScroller::InputPress, event);
 }
 
 void TouchScrolling::end(QTouchEvent& event) {
   event.accept();
+  tell(*_area.viewport(), QScroller::InputRelease, event);
   const auto began = std::exchange(_tapBegan, std::nullopt);
   if (!began || event.points().isEmpty()) return;
   const QPointF movement = event.points().front().position() - *began;
