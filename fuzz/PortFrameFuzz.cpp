@@ -1,8 +1,8 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
-#include <cstdlib>
 
+#include "fuzz/Require.h"
 #include "platform/host/PortFrame.h"
 
 using namespace varnel;
@@ -27,6 +27,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     pieces.feed(piece);
     while (const auto frame = pieces.next()) appendFrame(found, *frame);
   }
-  if (found != expected || pieces.isFaulty() != whole.isFaulty()) std::abort();
+  require(found == expected, "frames are the same in pieces");
+  require(pieces.isFaulty() == whole.isFaulty(), "a fault is the same in pieces");
   return 0;
 }

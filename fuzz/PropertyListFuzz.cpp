@@ -1,18 +1,11 @@
 #include <cstddef>
 #include <cstdint>
-#include <cstdlib>
 
+#include "fuzz/MessageRules.h"
+#include "fuzz/Require.h"
 #include "platform/PropertyList.h"
 
 using namespace varnel;
-
-namespace {
-
-void require(bool truth) {
-  if (!truth) std::abort();
-}
-
-}  // namespace
 
 // The input is one property list as it arrives. What could be read can be written in its own encoding and in
 // every other one that holds its texts, and what was written can be read again.
@@ -20,8 +13,11 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   const auto list = readPropertyList({data, size});
   if (!list) return 0;
   const auto binary = writeBinaryPropertyList(*list);
-  require(binary && readPropertyList(*binary, fileLimits));
+  require(binary.has_value(), "what could be read has a binary form");
+  const auto again = readPropertyList(*binary, fileLimits);
+  require(again && writeBinaryPropertyList(*again) == binary, "the binary form reads as the same list");
   const auto xml = writeXmlPropertyList(*list);
-  require(!xml || readPropertyList(*xml, fileLimits));
+  require(xml || holdsTextStrangeToXml(*list), "XML refuses only texts that it cannot hold");
+  require(!xml || readPropertyList(*xml, fileLimits), "the XML form can be read");
   return 0;
 }

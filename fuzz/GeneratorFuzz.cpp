@@ -1,0 +1,165 @@
+#include "fuzz/GeneratorFuzz.h"
+
+#include <algorithm>
+#include <deque>
+#include <memory>
+#include <string>
+
+#include "LogGenerator/KLV/Subscriber/SimInfo.h"
+#include "LogGenerator/KLVLogGenerator.h"
+#include "LogGenerator/LogGenerator.h"
+#include "app/Snapshot.h"
+#include "fuzz/DisplayChecks.h"
+#include "fuzz/FuzzHost.h"
+#include "fuzz/InputSteps.h"
+#include "fuzz/MessageRules.h"
+#include "fuzz/Require.h"
+#include "platform/Assertion.h"
+#include "platform/PropertyList.h"
+#include "platform/TelephonyService.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr std::size_t largestHistory = 5;
+// More tell nothing new and take long.
+constexpr int mostChecks = 12;
+
+bool hasOneEntry(const Value& value) { return value.dictionary() && value.dictionary()->size() == 1; }
+
+// Whether what an object message shows is made of texts and containers, no dictionary of one entry among
+// those that stand within another container.
+bool isCollapsed(const Value& object) {
+  const auto isFine = [](const Value& child) { return !hasOneEntry(child) && isCollapsed(child); };
+  if (object.string()) return true;
+  if (const Array* elements = object.array()) return std::ranges::all_of(*elements, isFine);
+  const Dictionary* entries = object.dictionary();
+  return entries && std::ranges::all_of(*entries, [&](const auto& entry) { return isFine(entry.value); });
+}
+
+/// A generator with its state, and beside it what must come out of the two.
+class GeneratorRun {
+ public:
+  GeneratorRun(std::string_view technology, const Services& services)
+      : _technology(technology), _services(services) {
+    reconnect();
+  }
+
+  /// False when the message has ended the program, as it must.
+  bool take(ByteView message) {
+    const Outcome required = requiredOutcome(_technology, message);
+    const Outcome outcome = outcomeOf(message);
+    require(outcome == required, "exactly the messages that must end the program end it");
+    if (outcome != Outcome::Accepted) return false;
+    const ByteView logged = loggedBytes(_technology, message);
+    _interval.insert(_interval.end(), logged.begin(), logged.end());
+    _hasDisplay = true;
+    return true;
+  }
+
+  /// The display.
+  Value generate() {
+    Value display = _generator->generateLogUsingState(_state);
+    require(_hasDisplay == !display.isAbsent() || isCDMA(), "there is a display once it has been built");
+    require(!isCDMA() || display.dictionary(), "the CDMA2000 display is there from the first");
+    if (isObjectStream())
+      require(display.isAbsent() || isCollapsed(display),
+              "an object is shown without dictionaries of one entry");
+    else
+      _hasDisplay = true;
+    _intervals.push_back(std::move(_interval));
+    _interval.clear();
+    if (_intervals.size() > largestHistory) _intervals.pop_front();
+    checkTree(display);
+    checkHistory();
+    return display;
+  }
+
+  void save() {
+    const Value contents = _generator->getSaveContentsFromState(_state);
+    const Array* items = contents.array();
+    require(items && items->size() == _intervals.size() + (isObjectStream() ? 0 : 1),
+            "the records and the binary log are saved");
+    if (!isObjectStream()) checkBinaryLog(items->back());
+    checkSnapshot(snapshotContents(_services.clock.now(), contents, "from outside"));
+  }
+
+  /// A new generator takes over the state; messages that no display has shown yet are lost.
+  void reconnect() {
+    _generator = LogGenerator::generatorFromTechnology(_technology, _services);
+    _interval.clear();
+  }
+
+ private:
+  bool isObjectStream() const { return _technology == technology::ifxGSM; }
+  bool isCDMA() const { return _technology == technology::kalviCDMA; }
+
+  Outcome outcomeOf(ByteView message) {
+    try {
+      _generator->updateState_withData(_state, message);
+    } catch (const LogCode_0xFF0000::UnknownDataException&) {
+      return Outcome::UnreadableSimFiles;
+    } catch (const AssertionFailure& failure) {
+      return failure.line() == 90 ? Outcome::NoPropertyList : Outcome::UnknownObject;
+    }
+    return Outcome::Accepted;
+  }
+
+  void checkHistory() const {
+    const Array* history = _state.get(stateKey::history).array();
+    require(history && history->size() == _intervals.size(), "the history holds the last five displays");
+    if (isObjectStream()) return;
+    for (std::size_t i = 0; i < _intervals.size(); ++i) {
+      const Bytes* raw = (*history)[i].dictionary()->get(stateKey::displayState).data();
+      require(raw && *raw == _intervals[i], "a record holds the accepted messages of its interval");
+    }
+  }
+
+  void checkBinaryLog(const Value& item) const {
+    const Bytes* log = item.dictionary()->get("DLF").data();
+    require(log && log->size() >= dlfVersionReportLength, "the binary log begins with its version report");
+    Bytes expected(log->begin(), log->begin() + dlfVersionReportLength);
+    for (const Bytes& interval : _intervals) {
+      if (interval.size() > 1) expected.insert(expected.end(), interval.begin() + 1, interval.end());
+    }
+    require(*log == expected, "the binary log is the intervals, each without its first byte");
+    const std::string* text = item.dictionary()->get("Description").string();
+    require(text && *text == "DLF binary (" + std::to_string(expected.size()) + " bytes)",
+            "the binary log is described by its length");
+  }
+
+  static void checkSnapshot(const Value& snapshot) {
+    require(writeBinaryPropertyList(snapshot).has_value(), "every snapshot has a binary form");
+    const auto xml = writeXmlPropertyList(snapshot);
+    require(xml || holdsTextStrangeToXml(snapshot), "XML refuses only texts that it cannot hold");
+    require(!xml || readPropertyList(*xml, fileLimits), "a written snapshot can be read");
+  }
+
+  const std::string _technology;
+  const Services _services;
+  std::unique_ptr<LogGenerator> _generator;
+  Dictionary _state;
+  bool _hasDisplay = false;
+  Bytes _interval;               // of the binary log, since the last display
+  std::deque<Bytes> _intervals;  // of the displays in the history
+};
+
+}  // namespace
+
+int fuzzGenerator(std::string_view technology, ByteView input) {
+  static FuzzHost host;
+  GeneratorRun run(technology, host.services(host.shipped));
+  int checksLeft = mostChecks;
+  while (const auto step = takeStep(input)) {
+    if (!run.take(step->message)) return 0;
+    if (step->after & Reconnect) run.reconnect();
+    if (step->after & Generate && checksLeft-- > 0) run.generate();
+    if (step->after & Save && checksLeft-- > 0) run.save();
+  }
+  checkFormats(run.generate());
+  run.save();
+  return 0;
+}
+
+}  // namespace varnel

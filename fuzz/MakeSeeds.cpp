@@ -1,0 +1,254 @@
+#include <cstdio>
+#include <exception>
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "LogGenerator/LogGenerator.h"
+#include "fuzz/FuzzHost.h"
+#include "fuzz/InputSteps.h"
+#include "platform/Dictionary.h"
+#include "platform/PropertyList.h"
+#include "platform/TelephonyService.h"
+#include "platform/host/Capture.h"
+#include "platform/host/PortFrame.h"
+#include "platform/host/WholeFile.h"
+#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+
+namespace varnel {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr std::size_t largestInput = 4096;
+constexpr std::uint64_t walks = 6;
+constexpr int messagesOfAWalk = 1500;
+constexpr std::size_t examplesOfACode = 2;
+
+struct Technology {
+  std::string_view identifier;
+  const char* target;
+};
+constexpr Technology technologies[] = {
+    {technology::ifxGSM, "GSMFuzz"},        {technology::kalviGSMUMTS, "GSMUMTSFuzz"},
+    {technology::kalviCDMA, "C2KFuzz"},     {technology::kalviLTE, "LTEFuzz"},
+    {technology::kalviUTRAN2, "UTRANFuzz"},
+};
+
+// The seeds of one target, numbered by kind.
+class SeedFolder {
+ public:
+  SeedFolder(const fs::path& root, const char* target) : _folder(root / target) {
+    fs::create_directories(_folder);
+  }
+
+  void add(const std::string& kind, ByteView seed) {
+    if (seed.empty() || seed.size() > largestInput) return;
+    const fs::path path = _folder / (kind + "-" + std::to_string(++_counts[kind]));
+    std::ofstream file(path, std::ios::binary);
+    file.write(reinterpret_cast<const char*>(seed.data()), static_cast<std::streamsize>(seed.size()));
+    if (!file.flush()) throw std::runtime_error("cannot write " + path.string());
+  }
+
+ private:
+  fs::path _folder;
+  std::map<std::string, int> _counts;
+};
+
+std::vector<SimulatedMessage> walk(std::string_view technology, std::uint64_t seed) {
+  const auto modem = simulatedModem(technology, seed);
+  std::vector<SimulatedMessage> messages;
+  while (messages.size() < messagesOfAWalk) messages.push_back(modem->next());
+  return messages;
+}
+
+// What a message is filed under: its log type and code, and whether it has a prefix.
+unsigned kindOf(ByteView message) {
+  const bool hasPrefix = message[0] == 0x81;
+  if (hasPrefix) message = message.subspan(2);
+  return unsigned{hasPrefix} << 24U | unsigned{message[0]} << 16U | message[3] | unsigned{message[4]} << 8U;
+}
+
+// A property list in the shorter one of its encodings; anything else as it is.
+Bytes compact(const Bytes& message) {
+  const auto list = readPropertyList(message);
+  const auto binary = list ? writeBinaryPropertyList(*list) : std::nullopt;
+  return binary ? *binary : message;
+}
+
+// As many of the messages as an input holds, the picture looked at and saved now and then.
+Bytes inputOf(const std::vector<SimulatedMessage>& messages, std::size_t first, bool reconnects) {
+  Bytes input;
+  int steps = 0;
+  for (std::size_t i = first; i < messages.size(); ++i) {
+    const Bytes message = compact(messages[i].bytes);
+    if (input.size() + stepHeaderSize + message.size() > largestInput) break;
+    ++steps;
+    std::uint8_t after = steps % 4 == 0 ? Generate : 0;
+    if (steps % 8 == 0) after |= Save;
+    if (steps % 16 == 0 && reconnects) after |= Reconnect;
+    appendStep(input, {after, message});
+  }
+  return input;
+}
+
+void makeGeneratorSeeds(SeedFolder& folder, std::string_view technology) {
+  std::map<unsigned, std::size_t> examples;
+  for (std::uint64_t seed = 1; seed <= walks; ++seed) {
+    const auto messages = walk(technology, seed);
+    for (const SimulatedMessage& message : messages) {
+      if (examples[kindOf(message.bytes)]++ >= examplesOfACode) continue;
+      Bytes input;
+      appendStep(input, {Generate | Save, message.bytes});
+      folder.add("message", input);
+    }
+    for (std::size_t first = 0; first < messages.size(); first += messages.size() / 3)
+      folder.add("walk", inputOf(messages, first, seed % 2 == 0));
+  }
+}
+
+void makeCaptureSeeds(SeedFolder& folder) {
+  const fs::path path = fs::temp_directory_path() / "varnel-seed.pcap";
+  for (const Technology& technology : technologies) {
+    const auto messages = walk(technology.identifier, 1);
+    {
+      CaptureWriter writer(path);
+      std::int64_t second = 0;
+      for (const SimulatedMessage& message : messages) {
+        if (message.bytes.size() > 400) continue;
+        writer.write({++second, 500}, message.bytes);
+        if (second == 12) break;
+      }
+    }
+    folder.add("pcap", readWholeFile(path).value());
+  }
+  fs::remove(path);
+  // pcapng: section header, interface of link type 147 with nanoseconds, one packet of four bytes.
+  constexpr std::uint8_t pcapng[] = {
+      0x0A, 0x0D, 0x0D, 0x0A, 28, 0, 0, 0, 0x4D, 0x3C, 0x2B, 0x1A, 1,  0, 0, 0, 0xFF, 0xFF, 0xFF, 0xFF,
+      0xFF, 0xFF, 0xFF, 0xFF, 28, 0, 0, 0, 1,    0,    0,    0,    32, 0, 0, 0, 147,  0,    0,    0,
+      0,    0,    0,    0,    9,  0, 1, 0, 9,    0,    0,    0,    0,  0, 0, 0, 32,   0,    0,    0,
+      6,    0,    0,    0,    36, 0, 0, 0, 0,    0,    0,    0,    1,  0, 0, 0, 2,    0,    0,    0,
+      4,    0,    0,    0,    4,  0, 0, 0, 1,    2,    3,    4,    36, 0, 0, 0};
+  folder.add("pcapng", ByteView(pcapng));
+}
+
+void makeFrameSeeds(SeedFolder& folder) {
+  for (const Technology& technology : technologies) {
+    Bytes stream{16};
+    std::int32_t identifier = 0;
+    for (const SimulatedMessage& message : walk(technology.identifier, 1)) {
+      if (message.bytes.size() > 300) continue;
+      appendFrame(stream, {identifier, static_cast<FrameMark>(identifier % 5), message.bytes});
+      if (++identifier == 6) break;
+    }
+    folder.add("frames", stream);
+  }
+}
+
+void addInBothEncodings(SeedFolder& folder, const std::string& kind, const Value& list) {
+  folder.add(kind, writeXmlPropertyList(list).value());
+  folder.add(kind, writeBinaryPropertyList(list).value());
+}
+
+void makeCommandSeeds(SeedFolder& folder, FuzzHost& host) {
+  const Value request = Value::ofDictionary();
+  request.dictionary()->set("GetTechnology", "GetTechnology");
+  addInBothEncodings(folder, "technology", request);
+  for (const Technology& technology : technologies) {
+    const auto services = host.services(host.shipped);
+    const auto generator = LogGenerator::generatorFromTechnology(technology.identifier, services);
+    addInBothEncodings(folder, "start", generator->getStartCommand());
+  }
+}
+
+// One value of each kind, and what is hard to write.
+Value oneOfEachKind() {
+  Value list = Value::ofDictionary();
+  Dictionary& entries = *list.dictionary();
+  entries.set("text", "a <b> & \"c\" \xC3\xA9 \xE2\x82\xAC \xF0\x9F\x93\xB6\r\n\t");
+  entries.set("whole", Value::ofInteger(-9000000000));
+  entries.set("real", Value::ofReal(-103.25));
+  entries.set("truth", Value::ofBoolean(true));
+  entries.set("date", Value::ofDate({-86400, 250000}));
+  entries.set("data", Value::ofData({0, 1, 254, 255}));
+  entries.set("list", Value::ofArray({"one", Value::ofArray(), Value::ofDictionary(), ""}));
+  return list;
+}
+
+void makePropertyListSeeds(SeedFolder& folder) {
+  addInBothEncodings(folder, "kinds", oneOfEachKind());
+  for (const Technology& technology : technologies) {
+    int payloads = 0;
+    for (const SimulatedMessage& message : walk(technology.identifier, 1)) {
+      if (technology.identifier == technology::ifxGSM) {
+        folder.add("object", compact(message.bytes));
+        break;
+      }
+      if (message.bytes[0] != 0xFF) continue;
+      folder.add("payload", ByteView(message.bytes).subspan(13));
+      if (++payloads == 6) break;
+    }
+  }
+}
+
+void makeResourceSeeds(SeedFolder& folder, const ShippedResources& shipped) {
+  for (const std::string& path : shipped.propertyListPaths()) {
+    const Value list = shipped.propertyList(path.substr(0, path.rfind('.')));
+    addInBothEncodings(folder, "shipped", list);
+    // Those that are larger than an input: their sections one by one.
+    for (const auto& [key, value] : *list.dictionary()) {
+      Value part = Value::ofDictionary();
+      part.dictionary()->set(key, value);
+      folder.add("section", writeBinaryPropertyList(part).value());
+    }
+  }
+}
+
+void makePreferencesSeeds(SeedFolder& folder) {
+  Value list = oneOfEachKind();
+  addInBothEncodings(folder, "preferences", list);
+  list.dictionary()->set("DHShowGSMRSSI", Value::ofBoolean(true));
+  addInBothEncodings(folder, "preferences", list);
+}
+
+void makeSeeds(const fs::path& root) {
+  FuzzHost host;
+  for (const Technology& technology : technologies) {
+    SeedFolder folder(root, technology.target);
+    makeGeneratorSeeds(folder, technology.identifier);
+  }
+  SeedFolder captures(root, "CaptureFuzz"), frames(root, "PortFrameFuzz");
+  SeedFolder commands(root, "ChannelCommandFuzz"), lists(root, "PropertyListFuzz");
+  SeedFolder resources(root, "ResourceFuzz"), preferences(root, "PreferencesFuzz");
+  makeCaptureSeeds(captures);
+  makeFrameSeeds(frames);
+  makeCommandSeeds(commands, host);
+  makePropertyListSeeds(lists);
+  makeResourceSeeds(resources, host.shipped);
+  makePreferencesSeeds(preferences);
+}
+
+}  // namespace
+
+}  // namespace varnel
+
+// Fills a folder with seeds, one folder a target below it. The simulated modems send what is in them; it is
+// the same each time.
+int main(int argumentCount, char** arguments) {
+  if (argumentCount != 2) {
+    std::fprintf(stderr, "usage: %s FOLDER\n", arguments[0]);
+    return 2;
+  }
+  try {
+    varnel::makeSeeds(arguments[1]);
+  } catch (const std::exception& error) {
+    std::fprintf(stderr, "%s\n", error.what());
+    return 1;
+  }
+  return 0;
+}

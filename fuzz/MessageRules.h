@@ -1,0 +1,25 @@
+#pragma once
+
+#include <string_view>
+
+#include "platform/Bytes.h"
+#include "platform/Value.h"
+
+namespace varnel {
+
+/// What a message must bring about, found out without the generators.
+enum class Outcome {
+  Accepted,
+  UnreadableSimFiles,  ///< LogCode_0xFF0000::UnknownDataException
+  NoPropertyList,      ///< AssertionFailure of line 90
+  UnknownObject,       ///< AssertionFailure of line 78
+};
+Outcome requiredOutcome(std::string_view technology, ByteView message);
+
+/// The bytes of an accepted message that belong into the binary log.
+ByteView loggedBytes(std::string_view technology, ByteView message);
+
+/// Whether a value holds a text that XML cannot.
+bool holdsTextStrangeToXml(const Value& value);
+
+}  // namespace varnel
