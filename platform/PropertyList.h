@@ -17,6 +17,7 @@ struct PropertyListLimits {
   std::size_t expandedBytes;  ///< bytes of a binary list's texts and data, counted likewise
   std::size_t keyPairs;  ///< squared number of keys, summed over the dictionaries: each may meet each other
   std::size_t entityMoves;  ///< entities of an XML text times its bytes, summed over the texts
+  std::size_t pathBytes;    ///< bytes of the keys that lead to a value, one more each, summed over the values
 };
 
 /// For messages of the log channel and whatever else arrives by itself. Whatever the message, reading it
@@ -28,6 +29,7 @@ inline constexpr PropertyListLimits messageLimits{
     .expandedBytes = std::size_t{4} << 20,
     .keyPairs = std::size_t{1} << 23,
     .entityMoves = std::size_t{1} << 30,
+    .pathBytes = std::size_t{8} << 20,
 };
 /// For files that the user names: snapshots, templates.
 inline constexpr PropertyListLimits fileLimits{
@@ -37,6 +39,7 @@ inline constexpr PropertyListLimits fileLimits{
     .expandedBytes = std::size_t{256} << 20,
     .keyPairs = std::size_t{1} << 30,
     .entityMoves = std::size_t{1} << 36,
+    .pathBytes = std::size_t{1} << 30,
 };
 
 /// Reads an XML or binary property list, the order of keys kept; of a key that occurs twice the first place

@@ -21,13 +21,14 @@ class XmlScan {
         _depth(limits.depth),
         _nodes(limits.expandedNodes),
         _keyPairs(limits.keyPairs),
-        _entityMoves(limits.entityMoves) {}
+        _entityMoves(limits.entityMoves),
+        _pathBytes(limits.pathBytes) {}
 
   bool passes() {
     // The parser takes U+0000 for the end of a name or a text.
     if (_rest.find('\0') != std::string_view::npos) return false;
     while (passText()) {
-      if (_rest.empty()) return _keyCounts.empty();
+      if (_rest.empty()) return _containers.empty();
       if (!passMarkup()) return false;
     }
     return false;
@@ -50,6 +51,7 @@ class XmlScan {
       const auto declaration = takeUntil(">");
       return passUnquoted(declaration) && declaration->find('[') == std::string_view::npos;
     }
+    if (_keyText) endKey();
     _rest.remove_prefix(1);
     const auto tag = takeUntil(">");
     return passUnquoted(tag) && passTag(*tag);
@@ -61,7 +63,7 @@ class XmlScan {
     if (tag.starts_with('/')) return !isContainer(tag.substr(1)) || leave();
     if (!_nodes.take(1)) return false;
     if (isNamed(tag, "key")) return passKey();
-    return !isContainer(tag) || enter(isEmpty);
+    return _pathBytes.take(pathHere()) && (!isContainer(tag) || enter(isEmpty));
   }
 
   static bool isContainer(std::string_view tag) { return isNamed(tag, "dict") || isNamed(tag, "array"); }
@@ -73,19 +75,34 @@ class XmlScan {
   }
 
   bool enter(bool isEmpty) {
-    if (_keyCounts.size() == _depth) return false;
-    if (!isEmpty) _keyCounts.push_back(0);
+    if (_containers.size() == _depth) return false;
+    if (!isEmpty) _containers.push_back({.path = pathHere()});
     return true;
   }
 
   bool leave() {
-    if (_keyCounts.empty()) return false;
-    _keyCounts.pop_back();
+    if (_containers.empty()) return false;
+    _containers.pop_back();
     return true;
   }
 
   // Adds the difference of two squares.
-  bool passKey() { return _keyCounts.empty() || _keyPairs.take(2 * _keyCounts.back()++ + 1); }
+  bool passKey() {
+    _keyText = _rest.data();
+    return _containers.empty() || _keyPairs.take(2 * _containers.back().keyCount++ + 1);
+  }
+
+  // A key ends with the next tag. Its entities and sections count as they are written, which is longer.
+  void endKey() {
+    const auto length = static_cast<std::size_t>(_rest.data() - *_keyText);
+    if (!_containers.empty()) _containers.back().key = length;
+    _keyText.reset();
+  }
+
+  // Of the path of a value that stands here.
+  std::size_t pathHere() const {
+    return _containers.empty() ? 0 : _containers.back().path + _containers.back().key + 1;
+  }
 
   bool takePrefix(std::string_view prefix) {
     if (!_rest.starts_with(prefix)) return false;
@@ -108,11 +125,17 @@ class XmlScan {
            token->find('<') == std::string_view::npos;
   }
 
+  struct Container {
+    std::size_t path;          // the length of its own
+    std::size_t keyCount = 0;  // so far
+    std::size_t key = 0;       // the length of the last one, at least
+  };
+
   std::string_view _rest;
   std::size_t _depth;
-  Allowance _nodes, _keyPairs, _entityMoves;
-  // For each open container the keys it has so far.
-  std::vector<std::size_t> _keyCounts;
+  Allowance _nodes, _keyPairs, _entityMoves, _pathBytes;
+  std::vector<Container> _containers;   // those that are open
+  std::optional<const char*> _keyText;  // where it begins, within a key
 };
 
 /// Walks over the objects of a binary list as the parser will: from the root along every reference, as often
@@ -124,7 +147,8 @@ class BinaryWalk {
         _depth(limits.depth),
         _nodes(limits.expandedNodes),
         _textBytes(limits.expandedBytes),
-        _keyPairs(limits.keyPairs) {}
+        _keyPairs(limits.keyPairs),
+        _pathBytes(limits.pathBytes) {}
 
   bool passes() {
     constexpr std::size_t trailerSize = 32;
@@ -138,7 +162,7 @@ class BinaryWalk {
     if (_offsetSize < 1 || _offsetSize > 8 || _referenceSize < 1 || _referenceSize > 8) return false;
     if (table < binaryMagic.size() || table > trailer) return false;
     _table = table;
-    return _objectCount <= (trailer - _table) / _offsetSize && passObject(root, 0);
+    return _objectCount <= (trailer - _table) / _offsetSize && passValue(root, {});
   }
 
  private:
@@ -149,7 +173,19 @@ class BinaryWalk {
     std::size_t content;
   };
 
-  bool passObject(std::uint64_t index, std::size_t depth) {
+  // Where a value stands.
+  struct Place {
+    std::size_t depth = 0;  // the containers around it
+    std::size_t path = 0;   // the length of its path, at least
+
+    Place below(std::size_t key) const { return {depth + 1, path + key + 1}; }
+  };
+
+  bool passValue(std::uint64_t index, Place place) {
+    return _pathBytes.take(place.path) && passObject(index, place);
+  }
+
+  bool passObject(std::uint64_t index, Place place) {
     const auto object = objectAt(index);
     if (!object || !_nodes.take(1)) return false;
     const auto [kind, size, content] = *object;
@@ -169,30 +205,32 @@ class BinaryWalk {
       case 0x6:
         return size <= contentLeft(content) / 2 && _textBytes.take(2 * size) && isUtf16(content, size);
       case 0xA:
-        return depth < _depth && passArray(content, size, depth + 1);
+        return place.depth < _depth && passArray(content, size, place);
       case 0xD:
-        return depth < _depth && passDictionary(content, size, depth + 1);
+        return place.depth < _depth && passDictionary(content, size, place);
       default:
         return false;
     }
   }
 
-  bool passArray(std::size_t content, std::uint64_t size, std::size_t depth) {
+  bool passArray(std::size_t content, std::uint64_t size, Place place) {
     if (size > contentLeft(content) / _referenceSize) return false;
     for (std::size_t i = 0; i < size; ++i) {
-      if (!passObject(reference(content, i), depth)) return false;
+      if (!passValue(reference(content, i), place.below(0))) return false;
     }
     return true;
   }
 
   // All keys stand before all values.
-  bool passDictionary(std::size_t content, std::uint64_t size, std::size_t depth) {
+  bool passDictionary(std::size_t content, std::uint64_t size, Place place) {
     if (size > contentLeft(content) / _referenceSize / 2 || !_keyPairs.take(size * size)) return false;
     for (std::size_t i = 0; i < size; ++i) {
       const auto key = objectAt(reference(content, i));
       if (!key || (key->kind != 0x5 && key->kind != 0x6)) return false;
-      if (!passObject(reference(content, i), depth)) return false;
-      if (!passObject(reference(content, size + i), depth)) return false;
+      if (!passObject(reference(content, i), place)) return false;
+      // A unit of UTF-16 is three bytes of UTF-8 at most.
+      const std::size_t length = key->kind == 0x6 ? 3 * key->size : key->size;
+      if (!passValue(reference(content, size + i), place.below(length))) return false;
     }
     return true;
   }
@@ -249,7 +287,7 @@ class BinaryWalk {
 
   ByteView _bytes;
   std::size_t _depth;
-  Allowance _nodes, _textBytes, _keyPairs;
+  Allowance _nodes, _textBytes, _keyPairs, _pathBytes;
   std::size_t _table = 0;
   std::size_t _offsetSize = 0, _referenceSize = 0;
   std::uint64_t _objectCount = 0;

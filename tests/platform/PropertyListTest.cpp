@@ -522,6 +522,32 @@ TEST(PropertyListLimit, EntitiesCountWithTheLengthOfTheirText) {
   EXPECT_TRUE(read(xml("<string><![CDATA[&&&&&&&&&&&&&&&&&&&&&&&&&&&&&&&&]]></string>"), limits));
 }
 
+TEST(PropertyListLimit, PathsAreTheKeysThatLeadToEachValue) {
+  PropertyListLimits limits = wide;
+  limits.pathBytes = 4 + 5 + 5;  // the list below "abc" and its two elements
+  const std::string opened = "<dict><key>abc</key><array>";
+  EXPECT_TRUE(read(xml(opened + "<true/><true/></array></dict>"), limits));
+  EXPECT_FALSE(read(xml(opened + "<true/><true/><true/></array></dict>"), limits));
+  EXPECT_FALSE(read(xml("<dict><key>abcd</key><array><true/><true/></array></dict>"), limits));
+  EXPECT_FALSE(read(xml("<dict><key>a<![CDATA[bcd]]></key><array><true/><true/></array></dict>"), limits));
+  EXPECT_TRUE(read(xml("<array>" + repeated("<true/>", 14) + "</array>"), limits));
+  EXPECT_FALSE(read(xml("<array>" + repeated("<true/>", 15) + "</array>"), limits));
+  EXPECT_TRUE(read(binary({"\xD1\x01\x02", "\x53\x61\x62\x63", "\xA2\x03\x03", "\x09"}), limits));
+  EXPECT_FALSE(read(binary({"\xD1\x01\x02", "\x53\x61\x62\x63", "\xA3\x03\x03\x03", "\x09"}), limits));
+  EXPECT_FALSE(read(binary({"\xD1\x01\x02", "\x54\x61\x62\x63\x64", "\xA2\x03\x03", "\x09"}), limits));
+  EXPECT_FALSE(read(binary({"\xD1\x01\x02", "\x62\x00\x61\x00\x62"s, "\xA2\x03\x03", "\x09"}), limits));
+}
+
+TEST(PropertyListLimit, LongKeysAboveManyValuesAreRefusedInMessages) {
+  const std::string key(3000, 'k');
+  const std::string opened = repeated("<dict><key>" + key + "</key>", 40), closed = repeated("</dict>", 40);
+  const auto list = [&](std::size_t values) {
+    return xml(opened + "<array>" + repeated("<string/>", values) + "</array>" + closed);
+  };
+  EXPECT_TRUE(read(list(20)));
+  EXPECT_FALSE(read(list(20000)));
+}
+
 TEST(PropertyListLimit, SharedReferencesCannotBlowUp) {
   std::vector<std::string> objects;
   for (int level = 1; level <= 30; ++level)
