@@ -8,6 +8,8 @@ namespace {
 
 constexpr std::size_t indentWidth = 2;
 constexpr std::size_t columnGap = 2;
+// A longer name does not push the values of its siblings aside.
+constexpr std::size_t widestColumn = 80;
 
 // Control characters of ASCII and of the C1 block, which UTF-8 writes as C2 80 to C2 9F.
 std::string printable(std::string_view text) {
@@ -37,13 +39,15 @@ std::size_t lengthOf(std::string_view text) {
 void appendChildren(std::string& text, const VarnelModelNode::Children& children, std::size_t indent) {
   std::size_t column = 0;
   for (const auto& child : children) {
-    if (child->value()) column = std::max(column, lengthOf(printable(child->displayName())));
+    const std::size_t length = child->value() ? lengthOf(printable(child->displayName())) : 0;
+    if (length <= widestColumn) column = std::max(column, length);
   }
   for (const auto& child : children) {
     const std::string name = printable(child->displayName());
     text.append(indent, ' ').append(name);
     if (const std::string* value = child->value(); value && !value->empty()) {
-      text.append(column - lengthOf(name) + columnGap, ' ').append(printable(*value));
+      const std::size_t length = lengthOf(name);
+      text.append(std::max(column, length) - length + columnGap, ' ').append(printable(*value));
     }
     text.push_back('\n');
     if (child->childNodes()) appendChildren(text, *child->childNodes(), indent + indentWidth);

@@ -55,6 +55,13 @@ TEST(TreeText, TheNamesOfInnerNodesDoNotPushValuesAside) {
             "  B  2\n");
 }
 
+TEST(TreeText, ANameOfMoreThan80CharactersDoesNotPushTheValuesOfOthersAside) {
+  const std::string widest(80, 'w'), wider(81, 'x');
+  EXPECT_EQ(text(dictionaryOf({{"A", "1"}, {wider, "2"}})), "A  1\n" + wider + "  2\n");
+  EXPECT_EQ(text(dictionaryOf({{"A", "1"}, {widest, "2"}})),
+            "A" + std::string(81, ' ') + "1\n" + widest + "  2\n");
+}
+
 TEST(TreeText, AnEmptySectionIsItsNameAlone) {
   EXPECT_EQ(text(dictionaryOf({{"PDP Context Info", Value::ofArray()}, {"SIM Info", dictionaryOf({})}})),
             "PDP Context Info\n"
