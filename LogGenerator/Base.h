@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <exception>
 #include <map>
@@ -39,6 +40,8 @@ class Base {
   virtual std::string_view getSectionName() const = 0;
   /// The log codes that the decoder wants, in order.
   virtual std::vector<std::uint32_t> getLogCodeArray() const = 0;
+  /// The shortest packet of that log code, header included, that the decoder does not drop unread.
+  virtual std::size_t minimumLength(std::uint32_t /*logCode*/) const { return 0; }
   /// Decodes one whole packet, header included, into the section.
   virtual void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) = 0;
 

@@ -1,5 +1,6 @@
 #include "LogGenerator/KLVLogGenerator2.h"
 
+#include <algorithm>
 #include <charconv>
 
 #include "platform/Log.h"
@@ -56,6 +57,21 @@ void KLVLogGenerator2::updateWithData(ByteView data) {
   const std::uint32_t logCode = packet.u16(logCodeOffset) | (logType == extraLogType ? extraCodeBase : 0);
   if (!cIndex) return;
   for (Base* decoder : cIndex->getSubscribers(logCode)) decoder->updateWithData_logCode(packet, logCode);
+}
+
+MessageFate KLVLogGenerator2::fateOf(ByteView message) const {
+  using enum MessageFate::Outcome;
+  if (message.size() < Packet::headerSize) return {TooShort};
+  if (message[0] == prefixMark) message = message.subspan(prefixSize);
+  const Packet packet(message);
+  const std::uint8_t logType = packet.u8(0);
+  if (logType != modemLogType && logType != extraLogType) return {Unknown};
+  const std::uint32_t logCode = packet.u16(logCodeOffset) | (logType == extraLogType ? extraCodeBase : 0);
+  const auto subscribers = cIndex ? cIndex->getSubscribers(logCode) : std::span<Base* const>();
+  if (subscribers.empty()) return {Unknown, logCode};
+  const bool isTaken = std::ranges::any_of(
+      subscribers, [&](const Base* decoder) { return packet.size() >= decoder->minimumLength(logCode); });
+  return {isTaken ? Decoded : TooShort, logCode};
 }
 
 Value KLVLogGenerator2::getDisplayFromState(Dictionary& state) {

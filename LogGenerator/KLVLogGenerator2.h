@@ -19,6 +19,7 @@ class KLVLogGenerator2 : public KLVLogGenerator {
   void updateState_withData(Dictionary& state, ByteView data) override;
   Value generateLogUsingState(Dictionary& state) override;
   Value getStartCommand() const override;
+  MessageFate fateOf(ByteView message) const override;
 
  protected:
   /// Takes ownership of both. A generator without a template resource has neither: it decodes nothing.

@@ -3,6 +3,7 @@
 #include <memory>
 #include <string_view>
 
+#include "LogGenerator/MessageFate.h"
 #include "LogGenerator/Services.h"
 #include "platform/Bytes.h"
 #include "platform/Dictionary.h"
@@ -42,6 +43,9 @@ class LogGenerator {
   virtual Value getStartCommand() const = 0;
   /// The items to save: an array of dictionaries, each with a "Description".
   virtual Value getSaveContentsFromState(const Dictionary& state) const = 0;
+  /// What becomes of a message, which is not decoded for that; for those who count messages. Without packets,
+  /// as here, all are decoded and none has a log code.
+  virtual MessageFate fateOf(ByteView /*message*/) const { return {MessageFate::Outcome::Decoded}; }
 
  protected:
   /// Appends a snapshot record to the state's "History", which keeps the newest five.

@@ -42,6 +42,13 @@ class SectionDecoder : public Base {
     return codes;
   }
 
+  std::size_t minimumLength(std::uint32_t logCode) const final {
+    for (const auto& handler : Decoder::handlers()) {
+      if (handler.logCode == logCode) return handler.minimumLength;
+    }
+    return 0;
+  }
+
   void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) final {
     logLine(Decoder::tracePriority, "%s", Decoder::traceLine);
     for (const auto& handler : Decoder::handlers()) {

@@ -137,4 +137,19 @@ void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView message, con
   _binData.insert(_binData.end(), message.begin(), message.end());
 }
 
+// Any log type will do, as in decoding.
+MessageFate C2KLogGenerator::fateOf(ByteView message) const {
+  using enum MessageFate::Outcome;
+  if (message.size() < Packet::headerSize) return {TooShort};
+  if (message[0] == prefixMark) message = message.subspan(prefixSize);
+  const Packet packet(message);
+  const std::uint32_t logCode =
+      packet.u16(logCodeOffset) | (packet.u8(0) == extraLogType ? extraCodeBase : 0);
+  const auto kind = std::ranges::find(packetKinds, logCode, &PacketKind::logCode);
+  if (kind == std::end(packetKinds)) return {Unknown, logCode};
+  if (packet.size() < kind->length) return {TooShort, logCode};
+  const bool isTooLong = kind->rule == Length::Exact && packet.size() > kind->length;
+  return {isTooLong ? TooLong : Decoded, logCode};
+}
+
 }  // namespace varnel
