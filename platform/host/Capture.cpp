@@ -1,6 +1,7 @@
 #include "platform/host/Capture.h"
 
 #include <pcap/pcap.h>
+#include <sys/stat.h>
 
 #include <algorithm>
 #include <array>
@@ -133,6 +134,7 @@ void CaptureReader::Closer::operator()(pcap* capture) const { pcap_close(capture
 CaptureReader::CaptureReader(const std::string& path) : _name(path == "-" ? "standard input" : path) {
   std::FILE* file = path == "-" ? stdin : std::fopen(path.c_str(), "rb");
   if (!file) throw CaptureError("cannot open " + _name + ": " + lastSystemError());
+  _file = file;
   auto shown = std::make_unique<ShownFile>(file);
   if (std::ferror(file)) throw CaptureError("cannot read " + _name + ": " + lastSystemError());
   const bool isOfLogChannel = shown->header.isOfLogChannel();
@@ -166,6 +168,17 @@ bool CaptureReader::next(CaptureRecord& record) {
   // Where the sub-second part may be out of order, seconds have 32 bits: the sum does not overflow.
   record = {normalised(header->ts.tv_sec, header->ts.tv_usec), ByteView(bytes, header->caplen)};
   return true;
+}
+
+std::uint64_t CaptureReader::bytesRead() const {
+  const off_t position = ::ftello(_file);
+  return position < 0 ? 0 : static_cast<std::uint64_t>(position);
+}
+
+std::optional<std::uint64_t> CaptureReader::fileSize() const {
+  struct stat status {};
+  if (::fstat(::fileno(_file), &status) != 0 || !S_ISREG(status.st_mode)) return std::nullopt;
+  return static_cast<std::uint64_t>(status.st_size);
 }
 
 void CaptureWriter::Closer::operator()(pcap* format) const { pcap_close(format); }

@@ -1,7 +1,10 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
+#include <cstdio>
 #include <memory>
+#include <optional>
 #include <stdexcept>
 #include <string>
 
@@ -36,12 +39,18 @@ class CaptureReader {
   /// short when it was captured; the records before it have been returned.
   bool next(CaptureRecord& record);
 
+  /// How many bytes of the file have been taken in so far, which runs ahead of the records a little.
+  std::uint64_t bytesRead() const;
+  /// How long the file is; absent for pipes and the like.
+  std::optional<std::uint64_t> fileSize() const;
+
  private:
   struct Closer {
     void operator()(pcap* capture) const;
   };
 
-  std::string _name;  // of the file, as errors tell it
+  std::string _name;           // of the file, as errors tell it
+  std::FILE* _file = nullptr;  // belongs to the capture, unless it is standard input
   std::unique_ptr<pcap, Closer> _capture;
   std::size_t _recordsRead = 0;
 };
