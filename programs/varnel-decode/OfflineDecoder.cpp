@@ -30,14 +30,14 @@ void OfflineDecoder::deliver(Time time, ByteView message) noexcept {
 // There is always something to show: the last tick fired before the last message arrived.
 Value OfflineDecoder::finish() { return _generator.generateLogUsingState(_state); }
 
-void OfflineDecoder::fireTicks(Time now) {
+std::optional<Generation> OfflineDecoder::fireTicks(Time now) {
   if (!_start) _start = now;
   const std::uint64_t due = ticksBetween(*_start, now);
-  if (due <= _ticksFired) return;
-  // The first of the due ticks finds the messages since the tick before; the others find nothing new.
-  _clock.set(tickTime(*_start, _ticksFired + 1));
-  _generator.generateLogUsingState(_state);
+  if (due <= _ticksFired) return std::nullopt;
+  const Time time = tickTime(*_start, _ticksFired + 1);
+  _clock.set(time);
   _ticksFired = due;
+  return Generation{time, _generator.generateLogUsingState(_state)};
 }
 
 }  // namespace varnel

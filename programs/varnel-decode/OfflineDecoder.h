@@ -9,6 +9,7 @@
 #include "platform/Time.h"
 #include "platform/Value.h"
 #include "programs/varnel-decode/CaptureClock.h"
+#include "programs/varnel-decode/Generation.h"
 
 namespace varnel {
 
@@ -19,19 +20,24 @@ class OfflineDecoder {
   /// The generator must look at this clock. Both outlive the decoder.
   OfflineDecoder(LogGenerator& generator, CaptureClock& clock) : _generator(generator), _clock(clock) {}
 
-  /// Fires every tick at or before the time, then hands the message to the generator at that time. Times need
-  /// not be in order. An exception that a decoder raises ends the program here.
+  /// Fires every tick at or before the time. Returned is what the first of them generates: it finds the
+  /// messages since the tick before, the others find nothing new.
+  std::optional<Generation> fireTicks(Time now);
+
+  /// Fires every tick at or before the time that has not been fired, then hands the message to the generator
+  /// at that time. Times need not be in order. An exception that a decoder raises ends the program here.
   void deliver(Time time, ByteView message) noexcept;
 
   /// Generates the last display, at the time of the last record: the absent value when there is none.
   Value finish();
 
+  /// True once a message has been delivered.
+  bool hasStarted() const { return _start.has_value(); }
+
   /// What a snapshot of this moment holds.
   Value saveContents() const { return _generator.getSaveContentsFromState(_state); }
 
  private:
-  void fireTicks(Time now);
-
   LogGenerator& _generator;
   CaptureClock& _clock;
   Dictionary _state;

@@ -10,6 +10,27 @@ namespace varnel {
 namespace {
 
 constexpr int usageError = 2;
+constexpr unsigned mostJobs = 256;
+
+constexpr const char* examples =
+    "PATH names a value as --format paths shows it: 'Serving Cell Measurements/Average RSRP'. --csv and "
+    "--plot take all that\n"
+    "follows them but the last; put several captures before them, or after a --.\n"
+    "\n"
+    "  varnel-decode --technology kalvi-lte walk.pcap\n"
+    "  varnel-decode --technology kalvi-lte --every walk.pcap\n"
+    "  varnel-decode --technology kalvi-lte walk.pcap --csv 'Serving Cell Measurements/Average RSRP'\n"
+    "  varnel-decode --technology kalvi-lte --stats --format json walk.pcap\n"
+    "  varnel-decode --technology kalvi-lte --jobs 4 --format json monday.pcap tuesday.pcap\n"
+    "  varnel-decode --dlf walk.dlf --format none VarnelSnapshot-1709301914.varnel\n";
+
+// The command line as it was typed, before it is known whether it makes sense.
+struct Wishes {
+  std::string format;
+  bool isEvery = false;
+  bool isStatistics = false;
+  std::vector<std::string> plot;
+};
 
 std::vector<std::string> formatNames() {
   std::vector<std::string> names;
@@ -21,39 +42,106 @@ DisplayWriter writerNamed(std::string_view name) {
   return std::ranges::find(displayFormats, name, &DisplayFormat::name)->write;
 }
 
-}  // namespace
-
-std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
-                                              const std::vector<std::string>& technologies) {
-  Options options;
-  std::string format = "text";
-  CLI::App app("Decodes a capture of the log channel and writes the last display to standard output.",
-               "varnel-decode");
-  app.add_option("--technology", options.technology, "the modem that was captured")
-      ->required()
+void declareInput(CLI::App& app, Options& options, const std::vector<std::string>& technologies) {
+  app.add_option("--technology", options.technology, "the modem that was captured; snapshots need none")
       ->check(CLI::IsMember(technologies));
-  app.add_option("--format", format, "how the display is written")
-      ->check(CLI::IsMember(formatNames()))
+  app.add_option("--jobs", options.jobs, "decode up to that many captures at the same time")
+      ->check(CLI::Range(1U, mostJobs).description(""))
+      ->type_name("N")
       ->capture_default_str();
   app.add_option("--log-level", options.logLevel,
                  "write log lines of this priority number and lower; -1 for none")
       ->check(CLI::Range(-1, std::numeric_limits<int>::max()).description(""))
       ->type_name("N")
       ->capture_default_str();
-  app.add_option("--snapshot", options.snapshotPath, "also write a snapshot file")->type_name("FILE");
-  app.add_option("CAPTURE", options.capturePath, "pcap or pcapng of link type USER0; - is standard input")
+  app.add_option("CAPTURE", options.captures,
+                 "pcap or pcapng of link type USER0, or a snapshot (.varnel); - is standard input")
       ->required()
       ->type_name("");
+}
+
+void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
+  app.add_option("--format", wishes.format, "how the display is written; text unless given")
+      ->check(CLI::IsMember(formatNames()));
+  auto* every = app.add_flag("--every", wishes.isEvery,
+                             "write each display, one every 2 s of the capture, as a line of JSON");
+  auto* table = app.add_option("--csv", options.tablePaths,
+                               "write the values under these paths as CSV, a row for each display")
+                    ->type_name("PATH")
+                    ->excludes(every);
+  app.add_flag("--stats", wishes.isStatistics,
+               "count the messages of each log code: received, decoded, too short, too long, unknown")
+      ->excludes(every)
+      ->excludes(table);
+  app.add_option("--plot", wishes.plot, "also draw the numbers under these paths over time, as SVG")
+      ->type_name("FILE PATH")
+      ->expected(2, CLI::detail::expected_max_vector_size);
+  app.add_option("--snapshot", options.snapshotPath, "also write a snapshot file")->type_name("FILE");
+  app.add_option("--dlf", options.binaryLogPath, "also write the binary log of the last displays")
+      ->type_name("FILE");
+}
+
+// What is wrong with options that are fine one by one; nothing when they go together.
+std::optional<std::string> conflict(const Options& options, const Wishes& wishes) {
+  const std::string& format = wishes.format;
+  if (wishes.isEvery && !format.empty() && format != "json") return "--every writes --format json only";
+  if (!options.tablePaths.empty() && !format.empty())
+    return "--csv is a format of its own; leave out --format";
+  if (wishes.isStatistics && !format.empty() && format != "text" && format != "json")
+    return "--stats writes --format text or json only";
+  if (std::ranges::any_of(options.captures, &std::string::empty)) return "the name of a capture is empty";
+  if (options.captures.size() < 2) return std::nullopt;
+  if (format == "plist") return "--format plist takes one capture at a time";
+  if (options.snapshotPath || options.binaryLogPath || !wishes.plot.empty())
+    return "--snapshot, --dlf and --plot take one capture at a time, for each would overwrite the one before";
+  if (std::ranges::count(options.captures, "-") > 1) return "standard input can be read only once";
+  return std::nullopt;
+}
+
+Output outputFor(const Options& options, const Wishes& wishes) {
+  if (wishes.isEvery) return Output::EveryDisplay;
+  if (!options.tablePaths.empty()) return Output::ValueTable;
+  if (!wishes.isStatistics) return Output::Display;
+  return wishes.format == "json" ? Output::StatisticsJson : Output::StatisticsTable;
+}
+
+void fulfil(Options& options, const Wishes& wishes) {
+  const std::string format = wishes.format.empty() ? "text" : wishes.format;
+  options.output = outputFor(options, wishes);
+  options.writeDisplay = writerNamed(format);
+  const bool isForReading = (options.output == Output::Display && (format == "text" || format == "paths")) ||
+                            options.output == Output::StatisticsTable;
+  options.namesEachCapture = options.captures.size() > 1 && isForReading;
+  if (!wishes.plot.empty())
+    options.plot = PlotWish{wishes.plot.front(), {wishes.plot.begin() + 1, wishes.plot.end()}};
+}
+
+}  // namespace
+
+ExitStatus mistake(const std::string& text) {
+  std::cerr << "varnel-decode: " << text << "; see varnel-decode --help\n";
+  return {usageError};
+}
+
+std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
+                                              const std::vector<std::string>& technologies) {
+  Options options;
+  Wishes wishes;
+  CLI::App app("Decodes captures of the log channel and writes the last display to standard output.",
+               "varnel-decode");
+  app.footer(examples);
+  declareInput(app, options, technologies);
+  declareOutput(app, options, wishes);
   try {
     app.parse(argumentCount, arguments);
   } catch (const CLI::CallForHelp&) {
     std::cout << app.help();
     return ExitStatus{0};
   } catch (const CLI::ParseError& error) {
-    std::cerr << "varnel-decode: " << error.what() << "; see varnel-decode --help\n";
-    return ExitStatus{usageError};
+    return mistake(error.what());
   }
-  options.writeDisplay = writerNamed(format);
+  if (const auto found = conflict(options, wishes)) return mistake(*found);
+  fulfil(options, wishes);
   return options;
 }
 

@@ -11,19 +11,43 @@
 
 namespace varnel {
 
+/// What goes to standard output.
+enum class Output {
+  Display,          ///< the last display; of a snapshot all that are stored
+  EveryDisplay,     ///< a line of JSON for each display
+  ValueTable,       ///< comma-separated values, a line for each display
+  StatisticsTable,  ///< what became of the messages
+  StatisticsJson,
+};
+
+/// A picture to draw.
+struct PlotWish {
+  std::string file;
+  std::vector<std::string> paths;
+};
+
 /// What the program is asked to do.
 struct Options {
-  std::string technology;
+  std::optional<std::string> technology;
+  Output output = Output::Display;
   DisplayWriter writeDisplay = displayAsText;
+  std::vector<std::string> tablePaths;  ///< the columns of a value table
   int logLevel = logErrorPriority;  ///< the highest priority number that goes to standard error; -1 for none
-  std::optional<std::string> snapshotPath;  ///< where to write a snapshot file
-  std::string capturePath;                  ///< "-" is standard input
+  std::optional<std::string> snapshotPath;   ///< where to write a snapshot file
+  std::optional<std::string> binaryLogPath;  ///< where to write the binary log
+  std::optional<PlotWish> plot;
+  unsigned jobs = 1;                  ///< how many captures are decoded at the same time
+  bool namesEachCapture = false;      ///< text of several captures: a line before each says which it is
+  std::vector<std::string> captures;  ///< captures and snapshots, at least one; "-" is standard input
 };
 
 /// The status to end with when the command line leaves nothing to do: 0 after help, 2 after a mistake.
 struct ExitStatus {
   int code;
 };
+
+/// Tells a mistake of the user as one line on standard error.
+ExitStatus mistake(const std::string& text);
 
 /// Reads the command line, which may name one of those technologies. Help goes to standard output, a mistake
 /// is one line on standard error.

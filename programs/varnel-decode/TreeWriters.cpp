@@ -51,16 +51,11 @@ void appendPaths(std::string& lines, const VarnelModelNode& node, const std::str
     appendPaths(lines, *child, childPath(path, child->displayName()));
 }
 
-void appendString(std::string& json, const std::string& text) {
-  using Json = nlohmann::json;
-  json += Json(text).dump(-1, ' ', false, Json::error_handler_t::replace);
-}
-
 // By hand, since no JSON library holds an object with the same name twice.
 void appendJson(std::string& json, const VarnelModelNode& node) {
   const auto* tree = dynamic_cast<const VarnelModelTreeNode*>(&node);
   if (!tree) {
-    appendString(json, *node.value());
+    json += jsonString(*node.value());
     return;
   }
   const bool isArray = tree->origin() == VarnelModelTreeNode::Origin::Array;
@@ -70,7 +65,7 @@ void appendJson(std::string& json, const VarnelModelNode& node) {
     json += separator;
     separator = ",";
     if (!isArray) {
-      appendString(json, child->displayName());
+      json += jsonString(child->displayName());
       json += ':';
     }
     appendJson(json, *child);
@@ -88,11 +83,18 @@ std::string displayAsPaths(const Value& display) {
   return lines;
 }
 
-std::string displayAsJson(const Value& display) {
-  std::string json;
-  appendJson(json, *treeOf(display));
-  return json + '\n';
+std::string jsonString(const std::string& text) {
+  using Json = nlohmann::json;
+  return Json(text).dump(-1, ' ', false, Json::error_handler_t::replace);
 }
+
+std::string treeAsJson(const VarnelModelNode& root) {
+  std::string json;
+  appendJson(json, root);
+  return json;
+}
+
+std::string displayAsJson(const Value& display) { return treeAsJson(*treeOf(display)) + '\n'; }
 
 std::string displayAsPropertyList(const Value& display) {
   if (display.isAbsent()) return {};
@@ -101,5 +103,7 @@ std::string displayAsPropertyList(const Value& display) {
     throw std::runtime_error("the display holds what an XML property list cannot; try another --format");
   return {list->begin(), list->end()};
 }
+
+std::string displayAsNothing(const Value& /*display*/) { return {}; }
 
 }  // namespace varnel

@@ -3,6 +3,7 @@
 #include <string>
 #include <string_view>
 
+#include "model/VarnelModelNode.h"
 #include "platform/Value.h"
 
 namespace varnel {
@@ -25,6 +26,14 @@ std::string displayAsJson(const Value& display);
 /// Throws std::runtime_error when it holds what XML cannot.
 std::string displayAsPropertyList(const Value& display);
 
+/// Nothing at all, for those who only want what else is written.
+std::string displayAsNothing(const Value& display);
+
+/// A tree as JSON, as in `displayAsJson`, without the newline.
+std::string treeAsJson(const VarnelModelNode& root);
+/// A text as a string of JSON.
+std::string jsonString(const std::string& text);
+
 struct DisplayFormat {
   std::string_view name;
   DisplayWriter write;
@@ -32,10 +41,8 @@ struct DisplayFormat {
 
 /// Every format by the name that the command line gives it.
 inline constexpr DisplayFormat displayFormats[] = {
-    {"text", displayAsText},
-    {"paths", displayAsPaths},
-    {"json", displayAsJson},
-    {"plist", displayAsPropertyList},
+    {"text", displayAsText},          {"paths", displayAsPaths},  {"json", displayAsJson},
+    {"plist", displayAsPropertyList}, {"none", displayAsNothing},
 };
 
 }  // namespace varnel

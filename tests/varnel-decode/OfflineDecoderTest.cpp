@@ -122,6 +122,22 @@ TEST_F(OfflineDecoderTest, OnlyTheFirstOfSeveralDueTicksFindsAMessage) {
                                            "message c at 112.000000000"));
 }
 
+TEST_F(OfflineDecoderTest, TicksFiredAheadOfAMessageYieldWhatTheFirstGeneratesAndAreNotFiredAgain) {
+  EXPECT_FALSE(decoder.hasStarted());
+  EXPECT_FALSE(decoder.fireTicks({100, 5}));
+  deliver({100, 5}, "a");
+  EXPECT_TRUE(decoder.hasStarted());
+  EXPECT_FALSE(decoder.fireTicks({102, 4}));
+  const auto generation = decoder.fireTicks({111, 0});
+  ASSERT_TRUE(generation);
+  EXPECT_EQ(text(generation->time), "102.000000005");
+  EXPECT_EQ(*generation->display.string(), "display 1");
+  deliver({111, 0}, "b");
+  EXPECT_TRUE(decoder.fireTicks({112, 5}));
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000005", "display at 102.000000005",
+                                           "message b at 111.000000000", "display at 112.000000005"));
+}
+
 TEST_F(OfflineDecoderTest, RecordsOfOneTimeAreOneInterval) {
   deliver({100, 0}, "a");
   deliver({100, 0}, "b");

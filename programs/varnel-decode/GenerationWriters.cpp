@@ -1,0 +1,71 @@
+#include "programs/varnel-decode/GenerationWriters.h"
+
+#include <algorithm>
+
+#include "programs/varnel-decode/StandardOutput.h"
+#include "programs/varnel-decode/Timestamps.h"
+#include "programs/varnel-decode/TreeWriters.h"
+
+namespace varnel {
+
+namespace {
+
+std::string csvField(std::string_view text) {
+  if (text.find_first_of(",\"\r\n") == std::string_view::npos) return std::string(text);
+  std::string quoted = "\"";
+  for (const char character : text) {
+    if (character == '"') quoted += '"';
+    quoted += character;
+  }
+  return quoted + '"';
+}
+
+}  // namespace
+
+GenerationTree::GenerationTree(const Generation& generation)
+    : time(generation.time),
+      root(VarnelModelNode::makeTreeFromObject_withPathDictionary(generation.display, paths)) {}
+
+const std::string* GenerationTree::value(const std::string& path) const {
+  const auto found = paths.find(path);
+  return found == paths.end() ? nullptr : found->second->value();
+}
+
+std::string treePath(std::string_view path) {
+  return path.starts_with('/') ? std::string(path) : '/' + std::string(path);
+}
+
+void EveryDisplay::take(const GenerationTree& generation) {
+  std::string line = "{";
+  if (_captureName) line += "\"Capture\":" + jsonString(*_captureName) + ',';
+  line += "\"Time\":" + jsonString(timestamp(generation.time)) + ",\"Display\":";
+  writeOutput(_output, line + treeAsJson(*generation.root) + "}\n");
+}
+
+std::string csvHeader(const std::vector<std::string>& paths, TableColumns columns) {
+  std::string line = columns == TableColumns::CaptureTimeAndValues ? "Capture,Time" : "Time";
+  for (const std::string& path : paths) line += ',' + csvField(treePath(path).substr(1));
+  return line + '\n';
+}
+
+ValueTable::ValueTable(std::FILE* output, const std::vector<std::string>& paths,
+                       std::optional<std::string> captureName)
+    : _output(output), _captureName(std::move(captureName)) {
+  std::ranges::transform(paths, std::back_inserter(_paths), treePath);
+}
+
+void ValueTable::take(const GenerationTree& generation) {
+  std::string line = _captureName ? csvField(*_captureName) + ',' : std::string();
+  line += timestamp(generation.time);
+  for (const std::string& path : _paths) {
+    line += ',';
+    if (const std::string* value = generation.value(path)) line += csvField(*value);
+  }
+  writeOutput(_output, line + '\n');
+}
+
+void SeenPaths::take(const GenerationTree& generation) {
+  std::erase_if(_unseen, [&](const std::string& path) { return generation.value(treePath(path)); });
+}
+
+}  // namespace varnel

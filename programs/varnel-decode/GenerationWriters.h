@@ -1,0 +1,83 @@
+#pragma once
+
+#include <cstdio>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "model/VarnelModelNode.h"
+#include "programs/varnel-decode/Generation.h"
+
+namespace varnel {
+
+/// The display tree of one generation.
+struct GenerationTree {
+  explicit GenerationTree(const Generation& generation);
+
+  /// The text of the leaf that the tree has under the path; null when there is no such leaf.
+  const std::string* value(const std::string& path) const;
+
+  Time time;
+  PathDictionary paths;
+  std::shared_ptr<const VarnelModelNode> root;
+};
+
+/// What becomes of the generations of a capture or snapshot, one after the other.
+class GenerationSink {
+ public:
+  virtual ~GenerationSink() = default;
+  /// Throws std::runtime_error, after which there is no use in going on.
+  virtual void take(const GenerationTree& generation) = 0;
+};
+
+/// The path of a node as users write it ("Section/Label") as the tree keeps it ("/Section/Label").
+std::string treePath(std::string_view path);
+
+/// One line of JSON a generation: {"Time": …, "Display": …}. With a capture's name it comes first, as
+/// "Capture".
+class EveryDisplay final : public GenerationSink {
+ public:
+  EveryDisplay(std::FILE* output, std::optional<std::string> captureName)
+      : _output(output), _captureName(std::move(captureName)) {}
+  void take(const GenerationTree& generation) override;
+
+ private:
+  std::FILE* _output;
+  std::optional<std::string> _captureName;
+};
+
+/// The columns of a table of values; the name of the capture is the first when there are several.
+enum class TableColumns { TimeAndValues, CaptureTimeAndValues };
+
+/// The header line of the table.
+std::string csvHeader(const std::vector<std::string>& paths, TableColumns columns);
+
+/// One line of comma-separated values (quoted as RFC 4180 has it, ended by a newline) a generation: its time,
+/// then the value under each path. A value that is absent is an empty field.
+class ValueTable final : public GenerationSink {
+ public:
+  ValueTable(std::FILE* output, const std::vector<std::string>& paths,
+             std::optional<std::string> captureName);
+  void take(const GenerationTree& generation) override;
+
+ private:
+  std::FILE* _output;
+  std::vector<std::string> _paths;
+  std::optional<std::string> _captureName;
+};
+
+/// Notes which of the paths have had a value.
+class SeenPaths final : public GenerationSink {
+ public:
+  explicit SeenPaths(std::vector<std::string> paths) : _unseen(std::move(paths)) {}
+  void take(const GenerationTree& generation) override;
+
+  /// Those that no display has had, as they were given.
+  const std::vector<std::string>& unseen() const { return _unseen; }
+
+ private:
+  std::vector<std::string> _unseen;
+};
+
+}  // namespace varnel

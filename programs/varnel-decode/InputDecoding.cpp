@@ -1,0 +1,220 @@
+#include "programs/varnel-decode/InputDecoding.h"
+
+#include <cerrno>
+#include <cstdio>
+#include <memory>
+#include <optional>
+#include <stdexcept>
+#include <system_error>
+#include <vector>
+
+#include "LogGenerator/LogGenerator.h"
+#include "app/Snapshot.h"
+#include "platform/PropertyList.h"
+#include "platform/host/Capture.h"
+#include "platform/host/HostLog.h"
+#include "platform/host/PrivateFile.h"
+#include "programs/varnel-decode/GenerationWriters.h"
+#include "programs/varnel-decode/MessageStatistics.h"
+#include "programs/varnel-decode/OfflineDecoder.h"
+#include "programs/varnel-decode/PlotRecorder.h"
+#include "programs/varnel-decode/ProgramError.h"
+#include "programs/varnel-decode/ProgressBar.h"
+#include "programs/varnel-decode/SnapshotFile.h"
+#include "programs/varnel-decode/StandardOutput.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr int generalError = 1;
+
+void writeFile(const std::string& path, ByteView bytes) {
+  if (!writePrivateFile(path, bytes))
+    throw std::system_error(errno, std::generic_category(), "cannot write " + path);
+}
+
+ByteView bytesOf(const std::string& text) {
+  return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
+}
+
+// What the options ask for, of one capture or snapshot.
+class InputDecoding {
+ public:
+  InputDecoding(const Options& options, std::size_t index)
+      : _options(options),
+        _path(options.captures[index]),
+        _name(_path == "-" ? "standard input" : _path),
+        _isFirst(index == 0),
+        _seen(watchedPaths(options)) {
+    if (options.captures.size() > 1) _captureName = _path;
+    if (options.output == Output::EveryDisplay)
+      _sinks.push_back(std::make_unique<EveryDisplay>(stdout, _captureName));
+    if (options.output == Output::ValueTable)
+      _sinks.push_back(std::make_unique<ValueTable>(stdout, options.tablePaths, _captureName));
+    if (options.plot) {
+      auto recorder = std::make_unique<PlotRecorder>(options.plot->paths);
+      _recorder = recorder.get();
+      _sinks.push_back(std::move(recorder));
+    }
+  }
+
+  int run(const DecodingServices& services) {
+    if (SnapshotFile::isPropertyList(_path)) return showSnapshot();
+    if (!_options.technology)
+      return mistake("--technology is needed to decode " + _name + ", a capture").code;
+    return decodeCapture(services);
+  }
+
+ private:
+  static std::vector<std::string> watchedPaths(const Options& options) {
+    std::vector<std::string> paths = options.tablePaths;
+    if (options.plot) paths.insert(paths.end(), options.plot->paths.begin(), options.plot->paths.end());
+    return paths;
+  }
+
+  int decodeCapture(const DecodingServices& services) {
+    std::optional<CaptureReader> capture;
+    if (!succeeds([&] { capture.emplace(_path); })) return generalError;
+    HostLog log({.standardErrorLevel = _options.logLevel, .systemLog = HostLog::SystemLog::Unused});
+    const auto generator = LogGenerator::generatorFromTechnology(*_options.technology, services.services);
+    OfflineDecoder decoder(*generator, services.clock);
+
+    bool isDone = succeeds([&] { read(*capture, *generator, decoder, log); });
+    const Value display = decoder.finish();
+    const Time end = services.clock.now();
+    if (decoder.hasStarted()) isDone &= succeeds([&] { report({end, display}); });
+    if (_options.snapshotPath || _options.binaryLogPath) {
+      const Value items = decoder.saveContents();
+      if (_options.snapshotPath) isDone &= succeeds([&] { writeSnapshotFile(end, items); });
+      isDone &= writeBinaryLog(items);
+    }
+    isDone &= drawPicture();
+    isDone &= succeeds([&] { writeSummary(display); });
+    return isDone ? 0 : generalError;
+  }
+
+  void read(CaptureReader& capture, const LogGenerator& generator, OfflineDecoder& decoder, HostLog& log) {
+    const bool isStreaming = _options.output == Output::EveryDisplay || _options.output == Output::ValueTable;
+    ProgressBar progress(
+        capture,
+        isStreaming ? ProgressBar::Output::GoesToTerminalAlongside : ProgressBar::Output::LeavesTerminalAlone,
+        log, _options.logLevel);
+    const bool isCounting = countsMessages();
+    CaptureRecord record;
+    while (capture.next(record)) {
+      progress.recordRead();
+      if (isCounting) _statistics.add(generator.fateOf(record.message));
+      if (const auto generation = decoder.fireTicks(record.time)) report(*generation);
+      decoder.deliver(record.time, record.message);
+    }
+  }
+
+  int showSnapshot() {
+    if (countsMessages())
+      return mistake("--stats counts the messages of captures, but " + _name + " is a snapshot").code;
+    if (_options.snapshotPath)
+      return mistake("--snapshot saves what was decoded of a capture, but " + _name + " is a snapshot").code;
+    std::optional<SnapshotFile> snapshot;
+    if (!succeeds([&] { snapshot.emplace(_path); })) return generalError;
+    bool isDone = _sinks.empty() || succeeds([&] {
+                    for (const Generation& generation : snapshot->generations()) report(generation);
+                  });
+    isDone &= writeBinaryLog(snapshot->items());
+    isDone &= drawPicture();
+    isDone &= succeeds([&] { writeSummary(snapshot->shown()); });
+    return isDone ? 0 : generalError;
+  }
+
+  // After a failure there is no use in trying again.
+  void report(const Generation& generation) {
+    if (_sinks.empty() || _isReportBroken) return;
+    const GenerationTree tree(generation);
+    _isReportBroken = true;
+    _seen.take(tree);
+    for (const auto& sink : _sinks) sink->take(tree);
+    _isReportBroken = false;
+  }
+
+  void writeSnapshotFile(Time time, const Value& items) const {
+    const auto list = writeXmlPropertyList(snapshotContents(time, items, ""));
+    if (!list)
+      throw std::runtime_error("the snapshot holds what an XML property list cannot, so it was not written");
+    writeFile(*_options.snapshotPath, *list);
+  }
+
+  bool writeBinaryLog(const Value& items) const {
+    return !_options.binaryLogPath || succeeds([&] {
+      const Bytes* log = binaryLogOf(items);
+      if (!log)
+        throw std::runtime_error(_name + " has no binary log, as modems without packets have none; " +
+                                 *_options.binaryLogPath + " was not written");
+      writeFile(*_options.binaryLogPath, *log);
+    });
+  }
+
+  bool drawPicture() const {
+    tellUnseenPaths();
+    return !_recorder || succeeds([&] {
+      if (_recorder->isEmpty())
+        throw std::runtime_error(_name + " has no number under the paths to plot, so " + _options.plot->file +
+                                 " was not written; --format paths shows what there is");
+      writeFile(_options.plot->file, bytesOf(drawPlot(_recorder->plot(_name))));
+    });
+  }
+
+  // A cell may never have been met; more likely its name was mistyped.
+  void tellUnseenPaths() const {
+    for (const std::string& path : _seen.unseen()) {
+      std::fprintf(stderr,
+                   "%s: no display of %s has a value under '%s'; --format paths shows what there is\n",
+                   programName, _name.c_str(), path.c_str());
+    }
+  }
+
+  // What is written once all is read.
+  void writeSummary(const Value& display) const {
+    switch (_options.output) {
+      case Output::Display:
+        writeOutput(stdout, heading() + _options.writeDisplay(display));
+        break;
+      case Output::StatisticsTable:
+        writeOutput(stdout, heading() + _statistics.asTable());
+        break;
+      case Output::StatisticsJson:
+        writeOutput(stdout, _statistics.asJson(_captureName));
+        break;
+      case Output::EveryDisplay:
+      case Output::ValueTable:
+        break;
+    }
+  }
+
+  std::string heading() const {
+    if (!_options.namesEachCapture) return {};
+    return (_isFirst ? "==> " : "\n==> ") + _name + " <==\n";
+  }
+
+  bool countsMessages() const {
+    return _options.output == Output::StatisticsTable || _options.output == Output::StatisticsJson;
+  }
+
+  const Options& _options;
+  const std::string _path;
+  const std::string _name;  // as errors and headings tell it
+  const bool _isFirst;
+  std::optional<std::string> _captureName;  // in the output; absent when there is but one
+  std::vector<std::unique_ptr<GenerationSink>> _sinks;
+  PlotRecorder* _recorder = nullptr;  // one of the sinks
+  SeenPaths _seen;
+  MessageStatistics _statistics;
+  bool _isReportBroken = false;
+};
+
+}  // namespace
+
+int decodeInput(const Options& options, std::size_t index, const DecodingServices& services) {
+  return InputDecoding(options, index).run(services);
+}
+
+}  // namespace varnel

@@ -1,0 +1,21 @@
+#pragma once
+
+#include <cstddef>
+
+#include "LogGenerator/Services.h"
+#include "programs/varnel-decode/CaptureClock.h"
+#include "programs/varnel-decode/Options.h"
+
+namespace varnel {
+
+/// What the decoders get; the clock is the one that the services show.
+struct DecodingServices {
+  const Services& services;
+  CaptureClock& clock;
+};
+
+/// Does for one of the captures or snapshots all that the options ask for. The process's exit status: 0, 1
+/// after a failure and 2 after a mistake of the user, each of which has been told on standard error.
+int decodeInput(const Options& options, std::size_t index, const DecodingServices& services);
+
+}  // namespace varnel

@@ -1,0 +1,46 @@
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <optional>
+#include <string>
+
+#include "LogGenerator/MessageFate.h"
+
+namespace varnel {
+
+/// Counts messages by their log code and by what becomes of them. Each message is counted once.
+class MessageStatistics {
+ public:
+  void add(const MessageFate& fate);
+
+  /// A line for each log code, in their order, then those of messages without one, then the sums.
+  std::string asTable() const;
+  /// The same as one line of JSON: {"Messages": […], "Total": {…}}. With a capture's name it comes first, as
+  /// "Capture".
+  std::string asJson(const std::optional<std::string>& captureName) const;
+
+ private:
+  struct Counts {
+    std::uint64_t received = 0, decoded = 0, tooShort = 0, tooLong = 0, unknown = 0;
+
+    void add(MessageFate::Outcome outcome);
+  };
+
+  // A log code; for messages without one, which follow, what becomes of them.
+  struct Kind {
+    bool hasNoLogCode;
+    std::uint32_t number;
+
+    friend auto operator<=>(const Kind&, const Kind&) = default;
+    std::string name() const;
+  };
+
+  static std::string tableLine(const std::string& name, const Counts& counts);
+  static std::string jsonMembers(const Counts& counts);
+
+  std::map<Kind, Counts> _counts;
+  Counts _total;
+};
+
+}  // namespace varnel

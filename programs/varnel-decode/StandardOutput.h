@@ -1,0 +1,12 @@
+#pragma once
+
+#include <cstdio>
+#include <string_view>
+
+namespace varnel {
+
+/// Writes to an output and flushes it, so that whoever reads along sees it at once and nothing is lost when
+/// the program ends. Throws std::system_error.
+void writeOutput(std::FILE* output, std::string_view text);
+
+}  // namespace varnel

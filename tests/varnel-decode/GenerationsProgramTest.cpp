@@ -1,0 +1,178 @@
+#include <gmock/gmock.h>
+#include <sys/stat.h>
+
+#include <csignal>
+
+#include "tests/varnel-decode/DecodeProgram.h"
+
+// The whole program: displays over time, and what becomes of messages.
+
+namespace varnel {
+namespace {
+
+using ::testing::HasSubstr;
+using ::testing::IsEmpty;
+using ::testing::StartsWith;
+
+using DecodeGenerations = DecodeProgram;
+
+// Antennas at 14:05:09.5, 14:05:10 and 14:05:14, so ticks at :11.5 and :13.5.
+std::string threeRecords() {
+  return pcapHeader() + pcapRecord(afternoon, 500'000'000, antennas(2)) +
+         pcapRecord(afternoon + 1, 0, antennas(4)) + pcapRecord(afternoon + 5, 0, antennas(8));
+}
+
+TEST_F(DecodeGenerations, EveryWritesALineForEachTickThatFindsMessagesAndOneForTheEnd) {
+  const Result result = decode(threeRecords(), {"--every"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  ASSERT_EQ(linesOf(result.output), 2u) << result.output;
+  const std::string second = result.output.substr(result.output.find('\n') + 1);
+  EXPECT_THAT(result.output, StartsWith("{\"Time\":\"2024-03-01T14:05:11.500Z\",\"Display\":{"));
+  EXPECT_THAT(result.output.substr(0, result.output.find('\n')), HasSubstr(R"("Num Tx Antennas":"4")"));
+  EXPECT_THAT(second, StartsWith("{\"Time\":\"2024-03-01T14:05:14.000Z\",\"Display\":{"));
+  EXPECT_THAT(second, HasSubstr(R"("Num Tx Antennas":"8")"));
+  EXPECT_EQ(decode(threeRecords(), {"--every", "--format", "json"}).output, result.output);
+}
+
+TEST_F(DecodeGenerations, ACaptureWithoutRecordsHasNone) {
+  EXPECT_EQ(decode(pcapHeader(), {"--every"}).output, "");
+  EXPECT_EQ(decode(pcapHeader(), {"--csv", "Serving Cell Info/Num Tx Antennas"}).output,
+            "Time,Serving Cell Info/Num Tx Antennas\n");
+}
+
+TEST_F(DecodeGenerations, CsvHasARowForEachDisplay) {
+  const Result result =
+      decode(threeRecords(), {"--log-level", "-1", "--csv", "Serving Cell Info/Num Tx Antennas",
+                              "/Serving Cell Info/Num Tx Antennas", "Serving Cell Info"});
+  EXPECT_EQ(result.status, 0);
+  EXPECT_EQ(result.output,
+            "Time,Serving Cell Info/Num Tx Antennas,Serving Cell Info/Num Tx Antennas,Serving Cell Info\n"
+            "2024-03-01T14:05:11.500Z,4,4,\n"
+            "2024-03-01T14:05:14.000Z,8,8,\n");
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  EXPECT_THAT(result.error, HasSubstr("'Serving Cell Info'")) << "a section has no value";
+}
+
+TEST_F(DecodeGenerations, CsvTakesCapturesBeforeItOrBehindADoubleDash) {
+  const std::string path = write("capture", threeRecords());
+  const std::string antennasPath = "Serving Cell Info/Num Tx Antennas";
+  const std::string expected = "Time," + antennasPath +
+                               "\n"
+                               "2024-03-01T14:05:11.500Z,4\n"
+                               "2024-03-01T14:05:14.000Z,8\n";
+  EXPECT_EQ(run({"--technology", "kalvi-lte", path, "--csv", antennasPath}).output, expected);
+  EXPECT_EQ(run({"--technology", "kalvi-lte", "--csv", antennasPath, "--", path}).output, expected);
+}
+
+TEST_F(DecodeGenerations, CsvQuotesWhatTheCaptureHolds) {
+  const Result result = decode(
+      pcapHeader() + pcapRecord(afternoon, 0, pdpContexts("<array><string>a,\"b\"\n</string></array>")),
+      {"--csv", "PDP Context Info/0"});
+  EXPECT_EQ(result.output, "Time,PDP Context Info/0\n2024-03-01T14:05:09.000Z,\"a,\"\"b\"\"\n\"\n");
+}
+
+TEST_F(DecodeGenerations, WhatWasWrittenBeforeTheProgramAbortsIsThere) {
+  const Result result =
+      decode(threeRecords() + pcapRecord(afternoon + 5, 0, packet(0xFF, 0, "?")), {"--csv", "SIM Info"});
+  EXPECT_EQ(result.status, -SIGABRT);
+  EXPECT_EQ(result.output, "Time,SIM Info\n2024-03-01T14:05:11.500Z,\n");
+}
+
+TEST_F(DecodeGenerations, AnOutputThatCannotBeWrittenIsOneLineAndStatusOne) {
+  const std::string path = write("capture", threeRecords());
+  for (const char* options : {"--every ", "--csv 'SIM Info' -- ", "--stats "}) {
+    const Result result = runInShell("--log-level -1 " + (options + path) + " >/dev/full");
+    EXPECT_EQ(result.status, 1) << options;
+    EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+    EXPECT_THAT(result.error, HasSubstr("standard output"));
+  }
+}
+
+TEST_F(DecodeGenerations, StatisticsCountEveryMessageOnce) {
+  std::string capture = pcapHeader();
+  for (const std::string& message :
+       {antennas(2), antennas(4), antennas(8).substr(0, 21), packet(1, 0xB0C0, ""), packet(2, 0xB0C1, "?"),
+        std::string(), std::string(12, '\x01'), pdpContexts("<array/>"),
+        packet(1, 0xB17F, std::string(19, '\0'))})
+    capture += pcapRecord(afternoon, 0, message);
+  const Result table = decode(capture, {"--stats"});
+  EXPECT_EQ(table.status, 0) << table.error;
+  EXPECT_EQ(table.output,
+            "Log code        Received      Decoded    Too short     Too long      Unknown\n"
+            "0xB0C0                 1            0            0            0            1\n"
+            "0xB0C1                 3            2            1            0            0\n"
+            "0xB17F                 1            0            1            0            0\n"
+            "0xFF0002               1            1            0            0            0\n"
+            "no header              2            0            2            0            0\n"
+            "no log type            1            0            0            0            1\n"
+            "Total                  9            3            4            0            2\n");
+  const Result json = decode(capture, {"--stats", "--format", "json"});
+  EXPECT_EQ(linesOf(json.output), 1u) << json.output;
+  EXPECT_THAT(json.output,
+              HasSubstr(R"("Total":{"Received":9,"Decoded":3,"Too Short":4,"Too Long":0,"Unknown":2}})"));
+}
+
+TEST_F(DecodeGenerations, StatisticsOfATruncatedCaptureCountWhatCameBefore) {
+  const std::string capture = threeRecords();
+  const Result result = decode(capture.substr(0, capture.size() - 1), {"--stats", "--log-level", "-1"});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_THAT(result.output, HasSubstr("\nTotal                  2            2 "));
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+}
+
+TEST_F(DecodeGenerations, APlotIsAPictureWithLegendUnitAndTime) {
+  const std::string plot = folder.file("plot.svg");
+  const std::string path = write("capture", threeRecords());
+  const Result result = run({"--technology", "kalvi-lte", "--log-level", "-1", "--format", "none", path,
+                             "--plot", plot, "Serving Cell Info/Num Tx Antennas"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_THAT(result.output, IsEmpty());
+  EXPECT_THAT(result.error, IsEmpty());
+  struct stat file {};
+  ASSERT_EQ(::stat(plot.c_str(), &file), 0);
+  EXPECT_EQ(file.st_mode & 0777, 0600u);
+  const std::string svg = contentsOf(plot);
+  EXPECT_THAT(svg, StartsWith("<?xml"));
+  EXPECT_THAT(svg, HasSubstr("viewBox=\"0 0 1200 600\""));
+  EXPECT_THAT(svg, HasSubstr("Serving Cell Info/Num Tx Antennas</text>"));
+  EXPECT_THAT(svg, HasSubstr("UTC, 2024-03-01</text>"));
+  EXPECT_THAT(svg, HasSubstr(">14:05:11</text>"));
+  EXPECT_THAT(svg, HasSubstr(">14:05:14</text>"));
+  EXPECT_THAT(svg, HasSubstr(">4.0</text>")) << "the lowest value";
+  EXPECT_THAT(svg, HasSubstr(">8.0</text>")) << "the highest value";
+  EXPECT_THAT(svg, HasSubstr("<polyline"));
+}
+
+TEST_F(DecodeGenerations, APlotIsMadeBesideWhateverGoesToStandardOutput) {
+  const std::string plot = folder.file("plot.svg");
+  const std::string path = write("capture", threeRecords());
+  const Result result = run({"--technology", "kalvi-lte", path, "--csv", "Serving Cell Info/Num Tx Antennas",
+                             "--plot", plot, "Serving Cell Info/Num Tx Antennas"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_EQ(linesOf(result.output), 3u) << result.output;
+  EXPECT_THAT(contentsOf(plot), HasSubstr("</svg>"));
+}
+
+TEST_F(DecodeGenerations, APlotWithoutAnyNumberIsAnErrorAndNoFile) {
+  const std::string plot = folder.file("plot.svg");
+  const std::string path = write("capture", threeRecords());
+  const Result result = run({"--technology", "kalvi-lte", "--log-level", "-1", "--format", "none", path,
+                             "--plot", plot, "Serving Cell/Mistyped"});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_THAT(result.error, HasSubstr("no number under the paths"));
+  EXPECT_THAT(result.error, HasSubstr(path));
+  EXPECT_FALSE(std::filesystem::exists(plot));
+}
+
+TEST_F(DecodeGenerations, APlotThatCannotBeWrittenIsOneLineAndStatusOne) {
+  const std::string plot = folder.file("missing/plot.svg");
+  const std::string path = write("capture", threeRecords());
+  const Result result = run({"--technology", "kalvi-lte", "--log-level", "-1", "--format", "none", path,
+                             "--plot", plot, "Serving Cell Info/Num Tx Antennas"});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  EXPECT_THAT(result.error, HasSubstr(plot));
+}
+
+}  // namespace
+}  // namespace varnel

@@ -1,0 +1,69 @@
+#include "programs/varnel-decode/MessageStatistics.h"
+
+#include <gtest/gtest.h>
+
+namespace varnel {
+namespace {
+
+using enum MessageFate::Outcome;
+
+MessageStatistics someOfEverything() {
+  MessageStatistics statistics;
+  statistics.add({Decoded, 0xB17F});
+  statistics.add({TooShort, 0xB17F});
+  statistics.add({Decoded, 0xB17F});
+  statistics.add({Decoded, 0xFF0001});
+  statistics.add({Unknown, 0x0020});
+  statistics.add({TooLong, 0x1183});
+  statistics.add({Unknown});
+  statistics.add({TooShort});
+  statistics.add({TooShort});
+  return statistics;
+}
+
+TEST(MessageStatistics, TheTableHasLogCodesInOrderThenMessagesWithoutOneThenTheSums) {
+  EXPECT_EQ(someOfEverything().asTable(),
+            "Log code        Received      Decoded    Too short     Too long      Unknown\n"
+            "0x0020                 1            0            0            0            1\n"
+            "0x1183                 1            0            0            1            0\n"
+            "0xB17F                 3            2            1            0            0\n"
+            "0xFF0001               1            1            0            0            0\n"
+            "no header              2            0            2            0            0\n"
+            "no log type            1            0            0            0            1\n"
+            "Total                  9            3            3            1            2\n");
+}
+
+TEST(MessageStatistics, WithoutMessagesThereAreOnlyTheSums) {
+  EXPECT_EQ(MessageStatistics().asTable(),
+            "Log code        Received      Decoded    Too short     Too long      Unknown\n"
+            "Total                  0            0            0            0            0\n");
+  EXPECT_EQ(MessageStatistics().asJson({}),
+            "{\"Messages\":[],\"Total\":"
+            "{\"Received\":0,\"Decoded\":0,\"Too Short\":0,\"Too Long\":0,\"Unknown\":0}}\n");
+}
+
+TEST(MessageStatistics, JsonHasTheSameNumbersAndTheCaptureWhenItIsNamed) {
+  MessageStatistics statistics;
+  statistics.add({Decoded, 0xB17F});
+  statistics.add({TooShort});
+  EXPECT_EQ(statistics.asJson("a \"b\".pcap"),
+            R"({"Capture":"a \"b\".pcap","Messages":[)"
+            R"({"Name":"0xB17F","Log Code":45439,)"
+            R"("Received":1,"Decoded":1,"Too Short":0,"Too Long":0,"Unknown":0},)"
+            R"({"Name":"no header","Log Code":null,)"
+            R"("Received":1,"Decoded":0,"Too Short":1,"Too Long":0,"Unknown":0}],)"
+            R"("Total":{"Received":2,"Decoded":1,"Too Short":1,"Too Long":0,"Unknown":0}})"
+            "\n");
+}
+
+TEST(MessageStatistics, ObjectsAreCountedAsSuch) {
+  MessageStatistics statistics;
+  statistics.add({Decoded});
+  EXPECT_EQ(statistics.asTable(),
+            "Log code        Received      Decoded    Too short     Too long      Unknown\n"
+            "objects                1            1            0            0            0\n"
+            "Total                  1            1            0            0            0\n");
+}
+
+}  // namespace
+}  // namespace varnel
