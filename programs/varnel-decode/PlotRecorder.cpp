@@ -8,6 +8,7 @@
 #include <cmath>
 #include <filesystem>
 #include <stdexcept>
+#include <utility>
 
 #include "programs/varnel-decode/plot/ChartModule.h"
 
@@ -83,24 +84,28 @@ void PlotLine::add(double seconds, double value) {
   if (!_columns.empty() && number <= _columns.back().number) {
     _columns.back().take(point);
   } else {
-    _columns.push_back({number, point, point, _columns.empty() || _isInterrupted});
+    const bool isGapSeen = _isInterrupted && !isNextTo(number);
+    _columns.push_back({number, point, point, _columns.empty() || isGapSeen});
   }
   _isInterrupted = false;
   while (_columns.size() > mostColumns) halve();
 }
 
+bool PlotLine::isNextTo(std::int64_t number) const {
+  return !_columns.empty() && number == _columns.back().number + 1;
+}
+
 void PlotLine::halve() {
-  std::vector<Column> wider;
-  for (Column column : _columns) {
+  for (Column column : std::exchange(_columns, {})) {
     column.number /= 2;
-    if (wider.empty() || wider.back().number != column.number) {
-      wider.push_back(column);
+    if (!_columns.empty() && _columns.back().number == column.number) {
+      _columns.back().take(column.lowest);
+      _columns.back().take(column.highest);
     } else {
-      wider.back().take(column.lowest);
-      wider.back().take(column.highest);
+      if (isNextTo(column.number)) column.startsNewLine = false;
+      _columns.push_back(column);
     }
   }
-  _columns = std::move(wider);
   _width *= 2;
 }
 

@@ -21,7 +21,8 @@ struct Measurement {
 std::optional<Measurement> measurementIn(std::string_view text);
 
 /// Values over time, thinned out as they come in: never more than two for each of a thousand columns of the
-/// picture, its lowest and its highest. Short sequences are kept whole.
+/// picture, its lowest and its highest; gaps that are narrower than a column close. Short sequences are kept
+/// whole.
 class PlotLine {
  public:
   static constexpr std::size_t mostColumns = 1000;
@@ -47,6 +48,7 @@ class PlotLine {
   };
 
   void halve();
+  bool isNextTo(std::int64_t number) const;
 
   std::vector<Column> _columns;
   double _start = 0;           // of the first column

@@ -136,8 +136,8 @@ TEST_F(DecodeGenerations, APlotIsAPictureWithLegendUnitAndTime) {
   EXPECT_THAT(svg, HasSubstr("viewBox=\"0 0 1200 600\""));
   EXPECT_THAT(svg, HasSubstr("Serving Cell Info/Num Tx Antennas</text>"));
   EXPECT_THAT(svg, HasSubstr("UTC, 2024-03-01</text>"));
-  EXPECT_THAT(svg, HasSubstr(">14:05:11</text>"));
-  EXPECT_THAT(svg, HasSubstr(">14:05:14</text>"));
+  EXPECT_THAT(svg, HasSubstr(">14:05:11.500</text>"));
+  EXPECT_THAT(svg, HasSubstr(">14:05:14.000</text>"));
   EXPECT_THAT(svg, HasSubstr(">4.0</text>")) << "the lowest value";
   EXPECT_THAT(svg, HasSubstr(">8.0</text>")) << "the highest value";
   EXPECT_THAT(svg, HasSubstr("<polyline"));

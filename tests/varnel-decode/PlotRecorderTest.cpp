@@ -92,6 +92,28 @@ TEST(PlotLine, ALongSequenceIsThinnedOutWithItsLowestAndHighest) {
   EXPECT_EQ(points.front().seconds, 1e9);
 }
 
+TEST(PlotLine, AGapClosesOnceItIsNarrowerThanAColumn) {
+  const auto linesOf = [](int values) {
+    PlotLine line;
+    for (int i = 0; i < values; ++i) {
+      line.add(4.0 * i, 1);
+      line.interrupt();
+    }
+    return std::ranges::count(line.points(), true, &PlotPoint::startsNewLine);
+  };
+  EXPECT_EQ(linesOf(1000), 1000);
+  EXPECT_EQ(linesOf(5000), 1);
+}
+
+TEST(PlotLine, AGapThatIsWiderThanAColumnStays) {
+  PlotLine line;
+  for (int i = 0; i < 5000; ++i) {
+    if (i < 2000 || i >= 2500) line.add(2.0 * i, 1);
+    if (i == 2000) line.interrupt();
+  }
+  EXPECT_EQ(std::ranges::count(line.points(), true, &PlotPoint::startsNewLine), 2);
+}
+
 TEST(PlotLine, ATimeThatGoesBackIsShownWhereTheLineIs) {
   PlotLine line;
   line.add(100, 1);

@@ -11,6 +11,7 @@
 #include <QLegendMarker>
 #include <QLineSeries>
 #include <QPainter>
+#include <QScatterSeries>
 #include <QSvgGenerator>
 #include <QTimeZone>
 #include <QValueAxis>
@@ -21,6 +22,7 @@
 #include <limits>
 #include <map>
 #include <span>
+#include <vector>
 
 namespace varnel {
 
@@ -40,6 +42,12 @@ constexpr std::array<QRgb, 8> colours = {0x0072B2, 0xD55E00, 0x009E73, 0xCC79A7,
 qint64 milliseconds(double seconds) { return static_cast<qint64>(seconds * 1000); }
 
 QString text(const std::string& bytes) { return QString::fromStdString(bytes); }
+
+// What tells one tick of the time axis from the next.
+QString timeFormat(double seconds, bool isOneDay) {
+  if (!isOneDay) return seconds < 600 ? QStringLiteral("MM-dd HH:mm:ss") : QStringLiteral("MM-dd HH:mm");
+  return seconds < 2 * timeTicks ? QStringLiteral("HH:mm:ss.zzz") : QStringLiteral("HH:mm:ss");
+}
 
 struct Range {
   double lowest = std::numeric_limits<double>::infinity();
@@ -80,7 +88,7 @@ class ChartMaker {
     const bool isOneDay = start.date() == end.date();
     const QString day = QStringLiteral("yyyy-MM-dd");
     auto* axis = new QDateTimeAxis(&_chart);
-    axis->setFormat(isOneDay ? QStringLiteral("HH:mm:ss") : QStringLiteral("MM-dd HH:mm"));
+    axis->setFormat(timeFormat(range.highest - range.lowest, isOneDay));
     axis->setTickCount(timeTicks);
     axis->setTitleText(
         isOneDay ? QStringLiteral("UTC, %1").arg(start.toString(day))
@@ -108,19 +116,30 @@ class ChartMaker {
     _valueAxes.emplace(series.unit, axis);
   }
 
-  // The chart knows no gaps: each unbroken line is a series of its own, and the first stands in the legend.
+  // The chart knows no gaps: each unbroken line is a series of its own, points without neighbours are
+  // another, and the first of them all stands in the legend.
   void addSeries(const PlotSeries& series, const QColor& colour) {
     const std::span points(series.points);
-    std::size_t start = 0;
-    do {
-      std::size_t end = start + 1;
-      while (end < points.size() && !points[end].startsNewLine) ++end;
-      const auto line = points.subspan(start, std::min(end, points.size()) - start);
-      QLineSeries* const drawn = addLine(line, colour, series);
-      drawn->setName(text(legendOf(series)).toHtmlEscaped());
-      if (start > 0) _chart.legend()->markers(drawn).constFirst()->setVisible(false);
-      start = end;
-    } while (start < points.size());
+    std::vector<QXYSeries*> parts;
+    QList<QPointF> lonePoints;
+    for (std::size_t start = 0, end = 0; start < points.size(); start = end) {
+      for (end = start + 1; end < points.size() && !points[end].startsNewLine;) ++end;
+      QList<QPointF> line;
+      for (const PlotPoint& point : points.subspan(start, end - start))
+        line.append({static_cast<double>(milliseconds(point.seconds)), point.value});
+      if (line.size() > 1) {
+        parts.push_back(addLine(line, colour));
+      } else {
+        lonePoints += line;
+      }
+    }
+    if (!lonePoints.isEmpty()) parts.push_back(addDots(lonePoints, colour));
+    for (QXYSeries* part : parts) {
+      part->attachAxis(_timeAxis);
+      part->attachAxis(_valueAxes.at(series.unit));
+      part->setName(text(legendOf(series)).toHtmlEscaped());
+      if (part != parts.front()) _chart.legend()->markers(part).constFirst()->setVisible(false);
+    }
   }
 
   // Where there are several axes, the unit tells which one is meant.
@@ -129,20 +148,22 @@ class ChartMaker {
     return isUnitNeeded ? series.label + " (" + series.unit + ")" : series.label;
   }
 
-  QLineSeries* addLine(std::span<const PlotPoint> points, const QColor& colour, const PlotSeries& series) {
+  QXYSeries* addLine(const QList<QPointF>& points, const QColor& colour) {
     auto* line = new QLineSeries(&_chart);
-    for (const PlotPoint& point : points)
-      line->append(static_cast<double>(milliseconds(point.seconds)), point.value);
+    line->append(points);
     line->setPen(QPen(colour, lineWidth));
-    // A single point would not be seen.
-    if (points.size() == 1) {
-      line->setMarkerSize(dotSize);
-      line->setPointsVisible(true);
-    }
     _chart.addSeries(line);
-    line->attachAxis(_timeAxis);
-    line->attachAxis(_valueAxes.at(series.unit));
     return line;
+  }
+
+  QXYSeries* addDots(const QList<QPointF>& points, const QColor& colour) {
+    auto* dots = new QScatterSeries(&_chart);
+    dots->append(points);
+    dots->setMarkerSize(dotSize);
+    dots->setColor(colour);
+    dots->setBorderColor(colour);
+    _chart.addSeries(dots);
+    return dots;
   }
 
   QChart& _chart;
