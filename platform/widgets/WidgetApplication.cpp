@@ -2,6 +2,7 @@
 
 #include <pthread.h>
 
+#include <QIcon>
 #include <cerrno>
 #include <clocale>
 #include <csignal>
@@ -50,6 +51,10 @@ WidgetApplication::WidgetApplication(int& argumentCount, char** arguments)
   QApplication::setQuitOnLastWindowClosed(false);
   if (const auto bus = sessionBusAddress()) _colours = std::make_unique<DesktopColours>(*bus);
   QApplication::setApplicationDisplayName(QStringLiteral("Varnel"));
+  // By its identity a desktop finds the menu entry and the icon that were installed.
+  const QString applicationID = QStringLiteral("org.varnel.Varnel");
+  QGuiApplication::setDesktopFileName(applicationID);
+  QApplication::setWindowIcon(QIcon::fromTheme(applicationID));
 }
 
 int WidgetApplication::run() { return QApplication::exec(); }
