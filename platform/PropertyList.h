@@ -52,8 +52,9 @@ std::optional<Value> readPropertyList(ByteView bytes, const PropertyListLimits& 
 
 /// Writes a property list, the order of keys kept. Nothing is returned for what has no property-list form:
 /// the absent value, a text that its encoding cannot hold (as in reading), nesting deeper than that of files
-/// or without end, more than files may hold. XML keeps whole seconds of dates and writes the real -0 as 0;
-/// else all values are kept. The process's LC_NUMERIC must be "C".
+/// or without end, more than files may hold. XML keeps whole seconds of dates and writes the real -0 as 0,
+/// binary dates may come back a microsecond off; else all values are kept. The process's LC_NUMERIC must be
+/// "C".
 std::optional<Bytes> writeXmlPropertyList(const Value& value);
 std::optional<Bytes> writeBinaryPropertyList(const Value& value);
 
