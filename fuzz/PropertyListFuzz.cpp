@@ -1,4 +1,5 @@
 #include <algorithm>
+#include <bit>
 #include <cstddef>
 #include <cstdint>
 
@@ -11,11 +12,34 @@ using namespace varnel;
 
 namespace {
 
-bool holdsDate(const Value& value) {
-  if (const Array* elements = value.array()) return std::ranges::any_of(*elements, holdsDate);
-  const Dictionary* entries = value.dictionary();
-  if (!entries) return value.date().has_value();
-  return std::ranges::any_of(*entries, [](const auto& entry) { return holdsDate(entry.value); });
+bool isSame(const Value& left, const Value& right);
+
+bool isSameEntry(const Dictionary::Entry& left, const Dictionary::Entry& right) {
+  return left.key == right.key && isSame(left.value, right.value);
+}
+
+// Dates may come back a microsecond off, so it is enough that they are dates.
+bool isSame(const Value& left, const Value& right) {
+  if (left.kind() != right.kind()) return false;
+  switch (left.kind()) {
+    case Value::Kind::String:
+      return *left.string() == *right.string();
+    case Value::Kind::Integer:
+      return left.integer() == right.integer();
+    case Value::Kind::Real:
+      // Bit for bit: what is no number is not equal to itself.
+      return std::bit_cast<std::uint64_t>(*left.real()) == std::bit_cast<std::uint64_t>(*right.real());
+    case Value::Kind::Boolean:
+      return left.boolean() == right.boolean();
+    case Value::Kind::Data:
+      return *left.data() == *right.data();
+    case Value::Kind::Array:
+      return std::ranges::equal(*left.array(), *right.array(), isSame);
+    case Value::Kind::Dictionary:
+      return std::ranges::equal(*left.dictionary(), *right.dictionary(), isSameEntry);
+    default:
+      return true;
+  }
 }
 
 }  // namespace
@@ -29,9 +53,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   require(binary.has_value(), "what could be read has a binary form");
   const auto again = readPropertyList(*binary, fileLimits);
   require(again.has_value(), "the binary form can be read");
-  // Dates may come back a microsecond off.
-  require(holdsDate(*list) || writeBinaryPropertyList(*again) == binary,
-          "the binary form reads as the same list");
+  require(isSame(*list, *again), "the binary form reads as the same list");
   const auto xml = writeXmlPropertyList(*list);
   require(xml || holdsTextStrangeToXml(*list), "XML refuses only texts that it cannot hold");
   require(!xml || readPropertyList(*xml, fileLimits), "the XML form can be read");
