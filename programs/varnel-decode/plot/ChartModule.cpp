@@ -171,7 +171,7 @@ class ChartMaker {
   std::map<std::string, QValueAxis*> _valueAxes;
 };
 
-// What the toolkit has to say of its surroundings (no session, no display) is of no use here.
+// What the toolkit has to say of its surroundings (no desktop, no display) is of no use here.
 void ignoreRemarks(QtMsgType type, const QMessageLogContext& /*context*/, const QString& remark) {
   if (type == QtFatalMsg) std::fprintf(stderr, "varnel-decode: %s\n", qPrintable(remark));
 }
