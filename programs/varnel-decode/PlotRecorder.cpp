@@ -53,7 +53,7 @@ double secondsOf(Time time) {
 fs::path modulePath() {
   const fs::path folder = fs::read_symlink("/proc/self/exe").parent_path();
   const fs::path beside = folder / "varnel-decode-plot.so";
-  return fs::exists(beside) ? beside : folder.parent_path() / "lib/varnel/varnel-decode-plot.so";
+  return fs::exists(beside) ? beside : folder.parent_path() / "lib/varnel/modules/varnel-decode-plot.so";
 }
 
 }  // namespace
