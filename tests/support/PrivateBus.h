@@ -24,6 +24,8 @@ class PrivateBus {
     return !_daemon->output().empty();
   }
   std::string address() const { return "unix:path=" + _folder.file("bus"); }
+  /// Where its socket lies, under the name that a session's bus has in its runtime folder.
+  std::string folder() const { return _folder.path().string(); }
 
  private:
   TemporaryFolder _folder;

@@ -13,6 +13,7 @@
 
 #include "platform/PropertyList.h"
 #include "tests/support/Describe.h"
+#include "tests/support/PrivateBus.h"
 #include "tests/support/Process.h"
 #include "tests/support/RecordingLog.h"
 
@@ -145,21 +146,11 @@ class PreferencesBus : public FilePreferencesTest {
   }
   void TearDown() override { SetUp(); }
 
-  std::string address() const { return "unix:path=" + root.file("bus"); }
+  std::string address() const { return bus.address(); }
 
-  // False where the machine has no bus to start.
-  bool startBus() {
-    std::ofstream(root.file("bus.conf"))
-        << "<busconfig><type>session</type><listen>" << address()
-        << "</listen><auth>EXTERNAL</auth><policy context=\"default\"><allow send_destination=\"*\" "
-           "eavesdrop=\"true\"/><allow eavesdrop=\"true\"/><allow own=\"*\"/></policy></busconfig>";
-    daemon = std::make_unique<Process>("/usr/bin/env",
-                                       std::vector<std::string>{"dbus-daemon", "--nofork", "--print-address",
-                                                                "--config-file=" + root.file("bus.conf")});
-    eventually([&] { return !daemon->output().empty() || daemon->waitForEnd(0s); });
-    return !daemon->output().empty();
-  }
+  // Somebody hears all that is said on the bus.
   bool startListening() {
+    if (!bus.start()) return false;
     listener = std::make_unique<Process>(
         "/usr/bin/env", std::vector<std::string>{"dbus-monitor", "--address", address(),
                                                  "type='signal',interface='com.orvane.Preferences'"});
@@ -175,12 +166,12 @@ class PreferencesBus : public FilePreferencesTest {
     return count;
   }
 
-  std::unique_ptr<Process> daemon;
+  PrivateBus bus;
   std::unique_ptr<Process> listener;
 };
 
 TEST_F(PreferencesBus, AChangeIsAnnouncedWithItsDomainAndKey) {
-  if (!startBus() || !startListening()) GTEST_SKIP() << "no dbus-daemon here";
+  ASSERT_TRUE(startListening()) << "dbus-daemon and dbus-monitor are needed";
   ::setenv("DBUS_SESSION_BUS_ADDRESS", address().c_str(), 1);
   preferences.notifyChanged(domain, key);
   ASSERT_TRUE(eventually([&] { return heard() == 1; })) << listener->output();
@@ -192,7 +183,7 @@ TEST_F(PreferencesBus, AChangeIsAnnouncedWithItsDomainAndKey) {
 }
 
 TEST_F(PreferencesBus, EachChangeIsAnnounced) {
-  if (!startBus() || !startListening()) GTEST_SKIP() << "no dbus-daemon here";
+  ASSERT_TRUE(startListening()) << "dbus-daemon and dbus-monitor are needed";
   ::setenv("DBUS_SESSION_BUS_ADDRESS", address().c_str(), 1);
   preferences.notifyChanged(domain, key);
   preferences.notifyChanged(domain, key);
@@ -201,8 +192,8 @@ TEST_F(PreferencesBus, EachChangeIsAnnounced) {
 }
 
 TEST_F(PreferencesBus, TheSocketOfTheRuntimeFolderIsTheBusToo) {
-  if (!startBus() || !startListening()) GTEST_SKIP() << "no dbus-daemon here";
-  ::setenv("XDG_RUNTIME_DIR", root.path().c_str(), 1);
+  ASSERT_TRUE(startListening()) << "dbus-daemon and dbus-monitor are needed";
+  ::setenv("XDG_RUNTIME_DIR", bus.folder().c_str(), 1);
   preferences.notifyChanged(domain, key);
   EXPECT_TRUE(eventually([&] { return heard() == 1; })) << listener->output();
   EXPECT_THAT(log.takeTexts(), IsEmpty());
@@ -234,7 +225,7 @@ TEST_F(PreferencesBus, ABusThatDoesNotAnswerHoldsNothingUp) {
   const int listening = ::socket(AF_UNIX, SOCK_STREAM, 0);
   sockaddr_un name{};
   name.sun_family = AF_UNIX;
-  const std::string path = root.file("bus");
+  const std::string path = bus.folder() + "/bus";
   ASSERT_LT(path.size(), sizeof name.sun_path);
   path.copy(name.sun_path, path.size());
   ASSERT_EQ(::bind(listening, reinterpret_cast<const sockaddr*>(&name), sizeof name), 0);
