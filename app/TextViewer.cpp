@@ -24,7 +24,8 @@ TextViewer::TextViewer(const ModelServices& services, DeviceFiles& files, TextOu
 
 void TextViewer::startOver() {
   _model = std::make_unique<VarnelModel>(_services, *this);
-  show(std::string(notConnectedStatus), {});
+  _tree.clear();
+  show(std::string(notConnectedStatus));
   _model->restartMonitorLater();
 }
 
@@ -40,12 +41,15 @@ void TextViewer::updateViewControllerFromModel() {
   const auto root = _model->topLevelNodes();
   const std::string status =
       _model->isConnected() ? updateMessage(_services.generator.clock) : std::string(notConnectedStatus);
-  show(status, root ? treeAsText(*root) : std::string());
+  _tree = root ? treeAsText(*root) : std::string();
+  show(status);
   _awaitedUpdates.countOne();
 }
 
-void TextViewer::show(const std::string& status, const std::string& tree) {
-  _output.show(status + "\n" + tree);
+void TextViewer::linkWasLost() {
+  if (!_model->isConnected()) show(std::string(notConnectedStatus));
 }
+
+void TextViewer::show(const std::string& status) { _output.show(status + "\n" + _tree); }
 
 }  // namespace varnel

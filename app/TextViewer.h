@@ -33,14 +33,16 @@ class TextViewer final : public VarnelModelObserver {
   void save();
 
   void updateViewControllerFromModel() override;
+  void linkWasLost() override;
 
  private:
-  void show(const std::string& status, const std::string& tree);
+  void show(const std::string& status);
 
   ModelServices _services;
   DeviceFiles& _files;
   TextOutput& _output;
   std::unique_ptr<VarnelModel> _model;
+  std::string _tree;  // as it is shown
   AwaitedUpdates _awaitedUpdates;
 };
 

@@ -78,6 +78,10 @@ void VarnelApp::updateViewControllerFromModel() {
   _awaitedUpdates.countOne();
 }
 
+void VarnelApp::linkWasLost() {
+  if (_navController) updateStatusForViewController(varnelPane(*_navController->topController()));
+}
+
 void VarnelApp::reloadPanes() {
   const auto panes = _navController->controllers();
   for (std::size_t i = 0; i < panes.size(); ++i) {

@@ -49,6 +49,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   /// Looks whether the device allows snapshots.
   void getSaveButtonPref();
   void updateViewControllerFromModel() override;
+  void linkWasLost() override;
   /// Shows the present status in that pane.
   void updateStatusForViewController(VarnelPaneController& pane);
   void navigationController_willShowViewController_animated(NavigationStack& stack,

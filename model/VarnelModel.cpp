@@ -87,10 +87,7 @@ bool VarnelModel::createPorts() {
     return false;
   }
   _recvPort->deliverOnMainQueue();
-  _recvPort->setInvalidationHandler([this, port = static_cast<const void*>(_recvPort.get())] {
-    logError(" ***** INVALIDATED %p *****", port);
-    restartMonitor();
-  });
+  _recvPort->setInvalidationHandler([this, port = _recvPort.get()] { localPortWasInvalidated(port); });
 
   auto connection = _services.telephony.connect(whileAlive(&VarnelModel::refresh));
   if (!connection) {
@@ -175,6 +172,13 @@ void VarnelModel::refresh() {
   _nodes.reset();
   _nodesByPath.reset();
   _services.queue.async(whileAlive(&VarnelModel::updateObserver));
+}
+
+// The port, and with it the handler that calls this, goes in between.
+void VarnelModel::localPortWasInvalidated(const LocalPort* port) {
+  logError(" ***** INVALIDATED %p *****", static_cast<const void*>(port));
+  restartMonitor();
+  _observer.linkWasLost();
 }
 
 void VarnelModel::updateObserver() { _observer.updateViewControllerFromModel(); }

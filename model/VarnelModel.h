@@ -19,6 +19,9 @@ class VarnelModelObserver {
   virtual ~VarnelModelObserver() = default;
   /// New data has arrived: the tree is to be asked for again. Called from the main queue.
   virtual void updateViewControllerFromModel() = 0;
+  /// The link to the telephony service was lost and has been started anew: `isConnected` may say otherwise
+  /// than before, while the tree stays what it is.
+  virtual void linkWasLost() {}
 };
 
 /// What the model may ask of its host. Everything outlives the model.
@@ -71,6 +74,7 @@ class VarnelModel {
   bool startStream();
   void retryLater();
   void updateObserver();
+  void localPortWasInvalidated(const LocalPort* port);
   RemotePort::SendResult send(ByteView command, std::optional<std::chrono::milliseconds> replyTimeout);
   /// A task that does nothing once the model is gone.
   MainQueue::Task whileAlive(void (VarnelModel::*operation)());

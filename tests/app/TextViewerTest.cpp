@@ -100,9 +100,19 @@ TEST_F(TextViewerTest, ARefreshWithoutAConnectionShowsThatItIsConnectingAndTheTr
   ports.endRemotePorts();
   telephony.refusesConnections = true;
   queue.advance(2s);
+  ASSERT_THAT(pages(), SizeIs(4));
+  EXPECT_THAT(pages()[3], StartsWith("Connecting...\n"));
+  EXPECT_THAT(pages()[3], EndsWith("Serving Cell Info\n  Num Tx Antennas  4\n"));
+}
+
+TEST_F(TextViewerTest, ALostLinkTurnsTheStatusAndLeavesTheTree) {
+  queue.run();
+  show(2);
+  telephony.refusesConnections = true;
+  ports.invalidateLocalPort(channel);
   ASSERT_THAT(pages(), SizeIs(3));
   EXPECT_THAT(pages()[2], StartsWith("Connecting...\n"));
-  EXPECT_THAT(pages()[2], EndsWith("Serving Cell Info\n  Num Tx Antennas  4\n"));
+  EXPECT_THAT(pages()[2], EndsWith("Serving Cell Info\n  Num Tx Antennas  2\n"));
 }
 
 TEST_F(TextViewerTest, ARefreshWithoutATreeShowsTheStatusAlone) {

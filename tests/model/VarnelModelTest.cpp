@@ -62,6 +62,7 @@ const Lines streaming = {"Starting the display update timer"};
 class ModelTest : public testing::Test, public VarnelModelObserver {
  public:
   void updateViewControllerFromModel() override { ++updates; }
+  void linkWasLost() override { connectionsAfterLosses.push_back(model->isConnected()); }
 
   void replyWith(Bytes reply) {
     ports.answer = [reply](const MemoryPorts::Request&) { return RemotePort::SendResult{0, reply}; };
@@ -95,6 +96,7 @@ class ModelTest : public testing::Test, public VarnelModelObserver {
   std::string refusedCommand;              // the key of commands that cannot be serialised
   std::unique_ptr<LocalPort> otherViewer;  // holds the channel's name
   unsigned updates = 0;
+  std::vector<bool> connectionsAfterLosses;
 
  protected:
   ModelTest() {
@@ -596,6 +598,7 @@ TEST_F(ModelTest, InvalidationOfTheLocalPortIsLoggedAndRestartsTheMonitor) {
                   "remote destroyed", "local com.orvane.BasebandStateReport.LogChannel created",
                   "local delivers", "local handler set", "remote service.commands created"));
   EXPECT_TRUE(model->isConnected());
+  EXPECT_THAT(connectionsAfterLosses, ElementsAre(true));
   EXPECT_EQ(queue.liveTimers(), 1u);
   EXPECT_EQ(queue.waitingTasks(), 0u);
 }

@@ -169,6 +169,7 @@ TEST_F(WindowEndToEnd, TheDisplayOutlivesTheServerUntilTheUserStartsOver) {
   // An update was just shown, so none is to be expected before the server is gone.
   const Texts last = rows();
   killServer();
+  ASSERT_TRUE(runUntil([this] { return status() == "Connecting..."; }, patience)) << status();
   EXPECT_EQ(rows(), last);
   press(Qt::Key_Escape);
   EXPECT_EQ(status(), "Connecting...");
