@@ -128,8 +128,8 @@ TEST_F(OneXStatusTest, EachDeviceStateHasItsText) {
 
 TEST_F(OneXStatusTest, BandClassesOfBothChainsComeFromTheTable) {
   for (const auto& [offset, variable] : {std::pair(4, "k1xRx0BandClass"), std::pair(5, "k1xRx1BandClass")}) {
-    const auto shown = [&](std::uint8_t value) {
-      return shownOfRF8(static_cast<std::size_t>(offset), value, variable);
+    const auto shown = [this, at = static_cast<std::size_t>(offset), name = variable](std::uint8_t value) {
+      return shownOfRF8(at, value, name);
     };
     EXPECT_EQ(shown(0), R"("800 MHz cellular band [0]")");
     EXPECT_EQ(shown(1), R"("1.8 to 2.0GHz PCS band [1]")");
@@ -160,8 +160,8 @@ TEST_F(OneXStatusTest, ChannelsHave16Bits) {
 
 TEST_F(OneXStatusTest, TheReceiveAGCIsComputedInRealNumbers) {
   for (const auto& [offset, variable] : {std::pair(10, "k1xRxAGC0"), std::pair(11, "k1xRxAGC1")}) {
-    const auto shown = [&](std::uint8_t value) {
-      return shownOfRF8(static_cast<std::size_t>(offset), value, variable);
+    const auto shown = [this, at = static_cast<std::size_t>(offset), name = variable](std::uint8_t value) {
+      return shownOfRF8(at, value, name);
     };
     EXPECT_EQ(shown(0), R"("-63.25 dBm")");
     EXPECT_EQ(shown(1), R"("-62.91 dBm")");
