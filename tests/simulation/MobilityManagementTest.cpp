@@ -32,7 +32,7 @@ class MobilityManagementTest : public testing::Test {
 
   std::chrono::milliseconds _now{0};
   MobilityManagement _mobility;
-  const Cell _cell;
+  const Cell _cell{};
   const Walk _walk{{2000'00, {}}, Random(1)};
   const Situation _situation{std::chrono::seconds(0), _walk, _cell};
 };
