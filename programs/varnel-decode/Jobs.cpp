@@ -89,7 +89,8 @@ class JobQueue {
 
  private:
   void start(std::size_t piece) {
-    Job& job = _jobs.emplace_back(Job{.piece = piece});
+    _jobs.push_back(Job{.piece = piece});
+    Job& job = _jobs.back();
     // What waits in the buffers would be written by both.
     std::fflush(nullptr);
     const pid_t parent = ::getpid();
