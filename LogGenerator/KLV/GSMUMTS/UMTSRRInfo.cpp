@@ -64,7 +64,8 @@ double meanTransmitPower(const Packet& packet) {
     const Packet sample = packet.from(firstSample + sampleSize * i);
     const auto power = static_cast<std::int32_t>(rawValue(sample, samplePower));
     if (power == 0) continue;
-    sum += (power + 512) / 10 - 70;
+    const std::int32_t wholeDBm = (power + 512) / 10 - 70;
+    sum += wholeDBm;
     ++used;
   }
   return used > 0 ? sum / used : std::numeric_limits<double>::quiet_NaN();
