@@ -46,7 +46,7 @@ void parse(ByteView list) {
 
 }  // namespace
 
-void Floor::learn(ByteView message, bool isObject, std::vector<std::string> texts) {
+void Floor::learn(ByteView message, bool isObject, const std::vector<std::string>& texts) {
   Message& learned = _messages.emplace_back();
   learned.bytes.assign(message.begin(), message.end());
   learned.listOffset = listOffset(message, isObject);

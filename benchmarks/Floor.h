@@ -16,7 +16,7 @@ namespace varnel {
 class Floor {
  public:
   /// Learns the message: which texts it makes are those that `takeTexts` finds after the generator had it.
-  void learn(ByteView message, bool isObject, std::vector<std::string> texts);
+  void learn(ByteView message, bool isObject, const std::vector<std::string>& texts);
   /// Does the least for the message of that number. The result depends on all that was read and written.
   std::uint64_t run(std::size_t message) const;
   std::size_t size() const { return _messages.size(); }
