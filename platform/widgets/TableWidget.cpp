@@ -68,9 +68,12 @@ void TableWidget::load() {
 }
 
 void TableWidget::measureRows() {
-  std::vector<std::size_t> rows(_delegate ? _delegate->numberOfSectionsInTableView(*this) : 0);
-  for (std::size_t section = 0; section < rows.size(); ++section)
-    rows[section] = _delegate->tableView_numberOfRowsInSection(*this, section);
+  std::vector<std::size_t> rows;
+  if (_delegate) {
+    rows.resize(_delegate->numberOfSectionsInTableView(*this));
+    for (std::size_t section = 0; section < rows.size(); ++section)
+      rows[section] = _delegate->tableView_numberOfRowsInSection(*this, section);
+  }
   _rows = RowIndex(std::move(rows));
   if (_current && *_current >= _rows.rows()) {
     _current.reset();

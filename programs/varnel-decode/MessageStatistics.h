@@ -32,6 +32,7 @@ class MessageStatistics {
     bool hasNoLogCode;
     std::uint32_t number;
 
+    // NOLINTNEXTLINE(modernize-use-nullptr): the 0 that it sees is the compiler's own
     friend auto operator<=>(const Kind&, const Kind&) = default;
     std::string name() const;
   };
