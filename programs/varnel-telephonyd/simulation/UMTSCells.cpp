@@ -59,9 +59,8 @@ Bytes umtsCellSets(const Situation& situation, UTRANConnection::State state, Ran
   int othersLeft = state == UTRANConnection::State::CellDCH ? mostActive - 1 : 0;
   for (const auto& [cell, level_cdbm] : cells) {
     CellSet set = CellSet::Detected;
-    if (cell == &situation.serving)
-      set = CellSet::Active;
-    else if (cells.front().level_cdbm - level_cdbm <= activeRange_cdb && othersLeft-- > 0)
+    if (cell == &situation.serving ||
+        (cells.front().level_cdbm - level_cdbm <= activeRange_cdb && othersLeft-- > 0))
       set = CellSet::Active;
     else if (situation.walk.distance_cm(*cell, situation.serving) <= listedDistance_cm)
       set = CellSet::Monitored;
