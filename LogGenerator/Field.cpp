@@ -4,6 +4,8 @@
 #include <cmath>
 #include <limits>
 
+#include "LogGenerator/Decimal.h"
+
 namespace varnel {
 
 namespace {
@@ -11,7 +13,7 @@ namespace {
 char* putReal(char* out, char* end, const Format& format, double number) {
   if (std::isnan(number)) number = std::numeric_limits<double>::quiet_NaN();
   if (format.hasPlus && !std::signbit(number)) *out++ = '+';
-  return std::to_chars(out, end, number, std::chars_format::fixed, format.precision).ptr;
+  return putDecimal(out, end, number, format.precision);
 }
 
 char* putInteger(char* out, char* end, const Format& format, std::uint32_t raw) {
@@ -24,10 +26,9 @@ char* putInteger(char* out, char* end, const Format& format, std::uint32_t raw) 
   return std::to_chars(out, end, signedNumber).ptr;
 }
 
-char* putRaw(char* out, char* end, const Field& field, std::uint32_t raw) {
-  const Format& format = field.format;
+char* putRaw(char* out, char* end, const Source& source, const Format& format, std::uint32_t raw) {
   if (format.kind == Format::Kind::Real) {
-    const double number = field.source.isSigned ? static_cast<std::int32_t>(raw) : static_cast<double>(raw);
+    const double number = source.isSigned ? static_cast<std::int32_t>(raw) : static_cast<double>(raw);
     return putReal(out, end, format, number * format.realFactor + format.realSummand);
   }
   return putInteger(out, end, format, raw);
@@ -46,7 +47,8 @@ char* pad(char* begin, char* end, const Format& format) {
 template <std::size_t size, class Put>
 std::string_view numberText(std::array<char, size>& room, const Format& format, Put put) {
   char* const begin = std::ranges::copy(format.before, room.begin()).out;
-  char* out = pad(begin, put(begin, room.end() - format.after.size()), format);
+  char* out = put(begin, room.end() - format.after.size());
+  if (format.width > 0) out = pad(begin, out, format);
   out = std::ranges::copy(format.after, out).out;
   return {room.begin(), static_cast<std::size_t>(out - room.begin())};
 }
@@ -60,16 +62,16 @@ std::uint32_t rawValue(const Packet& packet, const Source& source) {
   return (raw ^ sign) - sign;
 }
 
-std::string_view Formatter::text(const Packet& packet, const Field& field) {
-  const Format& format = field.format;
-  const std::uint32_t raw = rawValue(packet, field.source);
+std::string_view Formatter::text(const Packet& packet, const Source& source, const Format& format) {
+  const std::uint32_t raw = rawValue(packet, source);
   if (!format.exception.text.empty() && raw == format.exception.raw) return format.exception.text;
   if (raw < format.entries.size()) return format.entries[raw];
   for (const Choice& choice : format.choices) {
     if (choice.raw == raw) return choice.text;
   }
   if (format.kind == Format::Kind::Choice) return format.otherwise;
-  return numberText(_room, format, [&](char* out, char* end) { return putRaw(out, end, field, raw); });
+  return numberText(_room, format,
+                    [&](char* out, char* end) { return putRaw(out, end, source, format, raw); });
 }
 
 std::string_view Formatter::text(const Format& format, double number) {

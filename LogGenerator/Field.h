@@ -141,6 +141,12 @@ consteval Format entry(std::span<const std::string_view> entries, std::string_vi
   return result;
 }
 
+/// The same, but past the last one the number by its format.
+consteval Format entry(std::span<const std::string_view> entries, Format otherwise) {
+  otherwise.entries = entries;
+  return otherwise;
+}
+
 /// The text of the choice with that raw value, or else the number by its format.
 consteval Format choice(std::span<const Choice> choices, Format otherwise) {
   otherwise.choices = choices;
@@ -154,11 +160,6 @@ struct Field {
   Format format = integer();
 };
 
-/// True when no field reads past that many bytes.
-consteval bool within(std::span<const Field> fields, std::size_t size) {
-  return std::ranges::all_of(fields, [&](const Field& field) { return field.source.end() <= size; });
-}
-
 /// How many bytes the fields read, from offset 0 to the end of the last one.
 constexpr std::size_t extent(std::span<const Field> fields) {
   std::size_t end = 0;
@@ -166,11 +167,20 @@ constexpr std::size_t extent(std::span<const Field> fields) {
   return end;
 }
 
+/// For static_assert: does not compile when a field reads past that many bytes.
+consteval bool within(std::span<const Field> fields, std::size_t size) {
+  if (extent(fields) > size) throw "a field lies past the minimum length";
+  return true;
+}
+
 /// Makes display texts. Each stands in the formatter's own room until the next one is made.
 class Formatter {
  public:
   /// The text of a field of a packet.
-  std::string_view text(const Packet& packet, const Field& field);
+  std::string_view text(const Packet& packet, const Source& source, const Format& format);
+  std::string_view text(const Packet& packet, const Field& field) {
+    return text(packet, field.source, field.format);
+  }
   /// The text of a computed number by a format made by `real`, whose factor and summand play no part. What is
   /// not a number shows no minus.
   std::string_view text(const Format& format, double number);
