@@ -1,5 +1,6 @@
 #pragma once
 
+#include <array>
 #include <bit>
 #include <cstddef>
 #include <cstdint>
@@ -30,6 +31,11 @@ class Packet {
   std::uint8_t u8(std::size_t offset) const { return offset < size() ? _bytes[offset] : 0; }
   std::uint16_t u16(std::size_t offset) const { return load<std::uint16_t>(offset); }
   std::uint32_t u32(std::size_t offset) const { return load<std::uint32_t>(offset); }
+  /// So many numbers of 32 bits, one after another.
+  template <std::size_t count>
+  std::array<std::uint32_t, count> numbers(std::size_t offset) const {
+    return load<std::array<std::uint32_t, count>>(offset);
+  }
   /// A little-endian run of up to 32 bits that starts at a bit (0 is the least significant) of a byte.
   std::uint32_t bits(std::size_t offset, unsigned firstBit, unsigned width) const {
     return static_cast<std::uint32_t>(load<std::uint64_t>(offset) >> firstBit &
@@ -42,15 +48,14 @@ class Packet {
   ByteView payload() const { return from(headerSize)._bytes; }
 
  private:
-  template <class Unsigned>
-  Unsigned load(std::size_t offset) const {
-    Unsigned value = 0;
+  // Little-endian, as the machine is.
+  template <class Number>
+  Number load(std::size_t offset) const {
+    Number value{};
     if (holds(offset, sizeof value)) {
       std::memcpy(&value, _bytes.data() + offset, sizeof value);
-    } else {
-      for (std::size_t i = 0; i < sizeof value && offset + i < size(); ++i) {
-        value = static_cast<Unsigned>(value | static_cast<Unsigned>(_bytes[offset + i]) << (8 * i));
-      }
+    } else if (offset < size()) {
+      std::memcpy(&value, _bytes.data() + offset, size() - offset);
     }
     return value;
   }

@@ -2,28 +2,20 @@
 
 namespace varnel {
 
-const Value& Dictionary::get(std::string_view key) const {
-  static const Value absent;
-  const std::size_t position = find(key);
-  return position == nowhere ? absent : _entries[position].value;
-}
+constinit const Value Dictionary::absentValue;
 
-void Dictionary::set(std::string_view key, Value value) {
+const Value& Dictionary::get(std::string_view key) const { return at(find(key)); }
+
+void Dictionary::set(std::string_view key, Value value) { setAt(find(key), key, std::move(value)); }
+
+void Dictionary::setText(std::string_view key, std::string_view text) { setTextAt(find(key), key, text); }
+
+void Dictionary::setAt(std::size_t position, std::string_view key, Value&& value) {
   if (value.isAbsent()) return;
-  const std::size_t position = find(key);
   if (position == nowhere) {
     append(key, std::move(value));
   } else {
     _entries[position].value = std::move(value);
-  }
-}
-
-void Dictionary::setText(std::string_view key, std::string_view text) {
-  const std::size_t position = find(key);
-  if (position == nowhere) {
-    append(key, text);
-  } else {
-    _entries[position].value.assignText(text);
   }
 }
 
@@ -59,8 +51,8 @@ std::size_t Dictionary::find(std::string_view key) const {
 }
 
 // The key may be a view of what stands in the dictionary, which moves when it grows.
-void Dictionary::append(std::string_view key, Value value) {
-  _entries.push_back({std::string(key), std::move(value)});
+void Dictionary::append(std::string_view key, Value&& value) {
+  _entries.emplace_back(key, std::move(value));
   if (!_positions.empty()) {
     _positions.emplace(_entries.back().key, _entries.size() - 1);
   } else if (_entries.size() > largestUnindexed) {

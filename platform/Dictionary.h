@@ -16,8 +16,21 @@ namespace varnel {
 class Dictionary {
  public:
   struct Entry {
+    Entry(std::string_view itsKey, Value itsValue) : key(itsKey), value(std::move(itsValue)) {}
+
     std::string key;
     Value value;
+  };
+
+  /// A key that remembers where it was found last. It fits every dictionary.
+  class Slot {
+   public:
+    explicit Slot(std::string_view key) : _key(key) {}
+
+   private:
+    friend class Dictionary;
+    std::string _key;
+    std::size_t _position = 0;
   };
 
   /// The key's value; the absent value when there is no such key.
@@ -29,6 +42,11 @@ class Dictionary {
   /// Sets a text. Where a text stands already its room is used again, so rewriting rows of a like length
   /// allocates nothing.
   void setText(std::string_view key, std::string_view text);
+  /// The same for whoever comes with the same key over and over.
+  const Value& get(Slot& slot) const { return at(find(slot)); }
+  void set(Slot& slot, Value value) { setAt(find(slot), slot._key, std::move(value)); }
+  void remove(const Slot& slot) { remove(slot._key); }
+  void setText(Slot& slot, std::string_view text) { setTextAt(find(slot), slot._key, text); }
   void remove(std::string_view key);
   /// Makes room for that many keys at once.
   void reserve(std::size_t size) { _entries.reserve(size); }
@@ -39,12 +57,29 @@ class Dictionary {
   std::vector<Entry>::const_iterator end() const { return _entries.end(); }
 
  private:
+  static const Value absentValue;
   static constexpr std::size_t nowhere = static_cast<std::size_t>(-1);
   // Up to here a walk over the entries beats an index.
   static constexpr std::size_t largestUnindexed = 48;
 
   std::size_t find(std::string_view key) const;
-  void append(std::string_view key, Value value);
+  std::size_t find(Slot& slot) const {
+    const std::size_t position = slot._position;
+    if (position < _entries.size() && _entries[position].key == slot._key) return position;
+    return slot._position = find(slot._key);
+  }
+  const Value& at(std::size_t position) const {
+    return position == nowhere ? absentValue : _entries[position].value;
+  }
+  void setAt(std::size_t position, std::string_view key, Value&& value);
+  void setTextAt(std::size_t position, std::string_view key, std::string_view text) {
+    if (position == nowhere) {
+      append(key, text);
+    } else {
+      _entries[position].value.assignText(text);
+    }
+  }
+  void append(std::string_view key, Value&& value);
   void indexAll();
 
   std::vector<Entry> _entries;

@@ -25,7 +25,7 @@ struct PacketKind {
   std::uint32_t logCode;
   Length rule;
   std::uint32_t length;  // of the whole packet
-  void (*decode)(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+  void (*decode)(const Packet& packet, c2k::State& state, c2k::Lookup& lookup);
 };
 
 // In the order in which the start command asks for them.
@@ -63,10 +63,11 @@ std::unique_ptr<LogGenerator> C2KLogGenerator::generator(const Services& service
 }
 
 void C2KLogGenerator::updateState_withData(Dictionary& state, ByteView data) {
-  getDisplayFromState(state);
-  static const Dictionary noPlaces;
-  const Dictionary* lookup = state.get(stateKey::lookup).dictionary();
-  updateFromLog_usingLookup_usingState(data, lookup ? *lookup : noPlaces, state);
+  if (state.get(_slots.display).isAbsent()) getDisplayFromState(state);
+  const Value& placements = state.get(_slots.lookup);
+  if (!_lookup.isMadeFrom(placements)) _lookup = c2k::Lookup(placements);
+  c2k::State decoderState{state, _slots};
+  updateFromLog_usingLookup_usingState(data, _lookup, decoderState);
 }
 
 Value C2KLogGenerator::generateLogUsingState(Dictionary& state) {
@@ -121,8 +122,8 @@ Value C2KLogGenerator::getDisplayFromState(Dictionary& state) const {
   return display;
 }
 
-void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView message, const Dictionary& lookup,
-                                                           Dictionary& state) {
+void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView message, c2k::Lookup& lookup,
+                                                           c2k::State& state) {
   if (message.size() < Packet::headerSize) return;
   // Kept: the length was tested with the prefix, so a packet behind one may lack two bytes of its header.
   if (message[0] == prefixMark) message = message.subspan(prefixSize);

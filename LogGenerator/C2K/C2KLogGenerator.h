@@ -1,5 +1,7 @@
 #pragma once
 
+#include "LogGenerator/C2K/DisplayVariables.h"
+#include "LogGenerator/C2K/State.h"
 #include "LogGenerator/KLVLogGenerator.h"
 
 namespace varnel {
@@ -28,7 +30,10 @@ class C2KLogGenerator final : public KLVLogGenerator {
   /// The display in the state, which is made with its lookup on first use; absent without a template.
   Value getDisplayFromState(Dictionary& state) const;
   /// Decodes one message. Packets of the known log codes are kept for the binary log, decodable or not.
-  void updateFromLog_usingLookup_usingState(ByteView message, const Dictionary& lookup, Dictionary& state);
+  void updateFromLog_usingLookup_usingState(ByteView message, c2k::Lookup& lookup, c2k::State& state);
+
+  c2k::StateSlots _slots;
+  c2k::Lookup _lookup;  // made from the one in the state
 };
 
 }  // namespace varnel

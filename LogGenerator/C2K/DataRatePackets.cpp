@@ -1,3 +1,5 @@
+#include <iterator>
+#include <numeric>
 #include <optional>
 
 #include "LogGenerator/C2K/DisplayVariables.h"
@@ -36,53 +38,42 @@ constexpr std::size_t rlHalfSize = rlRowSize * rlRateCount;
 constexpr std::size_t rlHalfCount = 6;
 static_assert(rlHalfSize == 288 && rlCounters + rlHalfSize * rlHalfCount <= rlDataRateSize);
 
-// The names of one link's variable and of its entries in the state and in the extra information.
-struct Link {
-  std::string_view variable;
-  std::string_view sequence, sent;
-  std::string_view newSequence, newSent;
-  std::string_view oldSequence, oldSent;
-};
-constexpr Link forwardLink = {"kFLDataRate", "FLDataSeqNum",  "FLDataSent", "FLDataSeqNum1",
-                              "FLDataSent1", "FLDataSeqNum2", "FLDataSent2"};
-constexpr Link reverseLink = {"kRLDataRate", "RLDataSeqNum",  "RLDataSent", "RLDataSeqNum1",
-                              "RLDataSent1", "RLDataSeqNum2", "RLDataSent2"};
-
 // What a link had sent when it wrote a packet.
 struct Progress {
   std::uint32_t sequence;
   std::uint64_t bits;
 };
 
-void store(Dictionary& entries, std::string_view sequence, std::string_view sent, const Progress& progress) {
+void store(Dictionary& entries, Dictionary::Slot& sequence, Dictionary::Slot& sent,
+           const Progress& progress) {
   entries.set(sequence, Value::ofInteger(progress.sequence));
   entries.set(sent, Value::ofInteger(static_cast<std::int64_t>(progress.bits)));
 }
 
-std::optional<Progress> previousProgress(const Link& link, const Dictionary& state) {
-  const auto sequence = state.get(link.sequence).integer();
-  const auto bits = state.get(link.sent).integer();
+std::optional<Progress> previousProgress(const Dictionary& entries, LinkSlots& link) {
+  const auto sequence = entries.get(link.sequence).integer();
+  const auto bits = entries.get(link.sent).integer();
   if (!sequence || !bits) return std::nullopt;
   return Progress{static_cast<std::uint32_t>(*sequence), static_cast<std::uint64_t>(*bits)};
 }
 
-void showRate(const Link& link, const Progress& previous, const Progress& now, const Dictionary& lookup) {
+void showRate(Variable variable, const Progress& previous, const Progress& now, Lookup& lookup) {
   // The sequence wraps. One that does not rise leaves the rate as it is.
   const auto steps = static_cast<std::int32_t>(now.sequence - previous.sequence);
   if (steps < 1) return;
   const auto bits = static_cast<double>(static_cast<std::int64_t>(now.bits - previous.bits));
-  storeDisplayNumber(link.variable, real("%.2f kbps"), bits / (steps * 1024.0), lookup);
+  storeDisplayNumber(variable, real("%.2f kbps"), bits / (steps * 1024.0), lookup);
 }
 
-void updateRate(const Link& link, const Progress& now, Dictionary& state, const Dictionary& lookup) {
-  Dictionary* extraInfo = state.get(stateKey::extraInfo).dictionary();
-  if (const auto previous = previousProgress(link, state)) {
-    showRate(link, *previous, now, lookup);
+void updateRate(Variable variable, const Progress& now, State& state, LinkSlots& link, Lookup& lookup) {
+  Dictionary* extraInfo = state.entries.get(state.slots.extraInfo).dictionary();
+  if (const auto previous = previousProgress(state.entries, link)) {
+    showRate(variable, *previous, now, lookup);
     if (extraInfo) store(*extraInfo, link.oldSequence, link.oldSent, *previous);
   } else {
-    storeDisplayText(link.variable, "", lookup);
+    storeDisplayText(variable, "", lookup);
   }
-  store(state, link.sequence, link.sent, now);
+  store(state.entries, link.sequence, link.sent, now);
   if (extraInfo) store(*extraInfo, link.newSequence, link.newSent, now);
 }
 
@@ -90,27 +81,26 @@ std::uint64_t rlPacketsAtRate(const Packet& packet, std::size_t rate) {
   std::uint64_t sum = 0;
   for (std::size_t half = 0; half < rlHalfCount; ++half) {
     const std::size_t row = rlCounters + rlHalfSize * half + rlRowSize * rate;
-    for (std::size_t i = 0; i < rlRowCounters; ++i) sum += packet.u32(row + counterSize * i);
+    for (const std::uint32_t counter : packet.numbers<rlRowCounters>(row)) sum += counter;
   }
   return sum;
 }
 
 }  // namespace
 
-void decodeFLDataRate(const Packet& packet, Dictionary& state, const Dictionary& lookup) {
-  std::uint64_t bits = 0;
-  for (std::size_t i = 0; i < flCounterCount; ++i) {
-    bits += packet.u32(flCounters + counterSize * i) * flWeights[i];
-  }
-  updateRate(forwardLink, {packet.u32(flSequenceOffset), bits}, state, lookup);
+void decodeFLDataRate(const Packet& packet, State& state, Lookup& lookup) {
+  const auto counters = packet.numbers<flCounterCount>(flCounters);
+  const std::uint64_t bits =
+      std::inner_product(counters.begin(), counters.end(), std::begin(flWeights), std::uint64_t{0});
+  updateRate("kFLDataRate", {packet.u32(flSequenceOffset), bits}, state, state.slots.forwardLink, lookup);
 }
 
-void decodeRLDataRate(const Packet& packet, Dictionary& state, const Dictionary& lookup) {
+void decodeRLDataRate(const Packet& packet, State& state, Lookup& lookup) {
   std::uint64_t bits = 0;
   for (std::size_t rate = 0; rate < rlRateCount; ++rate) {
     bits += rlPacketsAtRate(packet, rate) * rlWeights[rate];
   }
-  updateRate(reverseLink, {packet.u32(rlSequenceOffset), bits}, state, lookup);
+  updateRate("kRLDataRate", {packet.u32(rlSequenceOffset), bits}, state, state.slots.reverseLink, lookup);
 }
 
 }  // namespace varnel::c2k

@@ -7,50 +7,55 @@ namespace {
 constexpr std::string_view keyEntry = "key";
 constexpr std::string_view sectionEntry = "dict";
 
-// Calls store(section, key) for each place of the variable.
-template <class Store>
-void forEachPlace(std::string_view variable, const Dictionary& lookup, Store store) {
-  const Array* placements = lookup.get(variable).array();
-  if (!placements) return;
-  for (const Value& placement : *placements) {
+std::vector<Lookup::Place> placesIn(const Array& placements) {
+  std::vector<Lookup::Place> places;
+  for (const Value& placement : placements) {
     const Dictionary* entries = placement.dictionary();
-    if (!entries) return;
+    if (!entries) break;
     const std::string* key = entries->get(keyEntry).string();
     Dictionary* section = entries->get(sectionEntry).dictionary();
-    if (!key || !section) return;
-    store(*section, *key);
+    if (!key || !section) break;
+    places.push_back({section, Dictionary::Slot(*key)});
   }
+  return places;
 }
 
 }  // namespace
 
-void addPlacement(Dictionary& lookup, std::string_view variable, std::string_view key, const Value& section) {
-  if (!lookup.has(variable)) lookup.set(variable, Value::ofArray());
+Lookup::Lookup(const Value& placements) : _placements(placements) {
+  const Dictionary* variables = placements.dictionary();
+  if (!variables) return;
+  for (std::size_t i = 0; i < _places.size(); ++i) {
+    if (const Array* array = variables->get(variableNames[i]).array()) _places[i] = placesIn(*array);
+  }
+}
+
+void addPlacement(Dictionary& placements, std::string_view variable, std::string_view key,
+                  const Value& section) {
+  if (!placements.has(variable)) placements.set(variable, Value::ofArray());
   const Value placement = Value::ofDictionary();
   placement.dictionary()->set(keyEntry, key);
   placement.dictionary()->set(sectionEntry, section);
-  lookup.get(variable).array()->push_back(placement);
+  placements.get(variable).array()->push_back(placement);
 }
 
-void storeDisplayValue(std::string_view variable, const Value& value, const Dictionary& lookup) {
-  forEachPlace(variable, lookup,
-               [&](Dictionary& section, const std::string& key) { section.set(key, value); });
+void storeDisplayValue(Variable variable, const Value& value, Lookup& lookup) {
+  for (Lookup::Place& place : lookup.places(variable)) place.section->set(place.key, value);
 }
 
-void storeDisplayText(std::string_view variable, std::string_view text, const Dictionary& lookup) {
-  forEachPlace(variable, lookup,
-               [&](Dictionary& section, const std::string& key) { section.setText(key, text); });
+void storeDisplayText(Variable variable, std::string_view text, Lookup& lookup) {
+  for (Lookup::Place& place : lookup.places(variable)) place.section->setText(place.key, text);
 }
 
-void storeDisplayNumber(std::string_view variable, const Format& format, double number,
-                        const Dictionary& lookup) {
+void storeDisplayNumber(Variable variable, const Format& format, double number, Lookup& lookup) {
   Formatter formatter;
   storeDisplayText(variable, formatter.text(format, number), lookup);
 }
 
-void storeDisplayFields(const Packet& packet, std::span<const Field> fields, const Dictionary& lookup) {
+void storeDisplayFields(const Packet& packet, std::span<const VariableField> fields, Lookup& lookup) {
   Formatter formatter;
-  for (const Field& field : fields) storeDisplayText(field.label, formatter.text(packet, field), lookup);
+  for (const VariableField& field : fields)
+    storeDisplayText(field.variable, formatter.text(packet, field.source, field.format), lookup);
 }
 
 }  // namespace varnel::c2k

@@ -1,7 +1,14 @@
 #pragma once
 
+#include <algorithm>
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <iterator>
 #include <span>
+#include <string>
 #include <string_view>
+#include <vector>
 
 #include "LogGenerator/Field.h"
 #include "platform/Dictionary.h"
@@ -15,18 +22,91 @@ namespace varnel::c2k {
 /// The mark, as key and as text, of a dictionary whose rows are ordered by key.
 inline constexpr std::string_view sortedMark = "_sorted";
 
-/// Adds a placement of the variable: a row of a section, which is a dictionary.
-void addPlacement(Dictionary& lookup, std::string_view variable, std::string_view key, const Value& section);
+inline constexpr std::string_view variableNames[] = {
+    "kChannel",         "k1xEVDODeviceState",
+    "kBandClass",       "kRxAGC0",
+    "kRxAGC1",          "kTxAGC",
+    "kServingPNOffset", "kSessionState",
+    "kUATI24",          "kColorCode",
+    "kActiveSetPilots", "kFingerC2I",
+    "k1xDeviceState",   "k1xRx0BandClass",
+    "k1xRx0ChanNum",    "k1xRxAGC0",
+    "k1xRx1BandClass",  "k1xRx1ChanNum",
+    "k1xRxAGC1",        "k1xTxAGC",
+    "k1xActiveSetInfo", "k1xTrafficFER",
+    "k1xRoamingHome",   "kSystemId",
+    "kNetworkId",       "kPacketZoneId",
+    "kBaseId",          "kProtocolRevision",
+    "kFLDataRate",      "kRLDataRate",
+};
 
-/// Shows a value in every place of its variable, in their order, up to the first that is none; nowhere when
-/// the lookup does not know the variable.
-void storeDisplayValue(std::string_view variable, const Value& value, const Dictionary& lookup);
+/// A display variable, written as its name: one that there is not does not compile.
+class Variable {
+ public:
+  consteval Variable(const char* name) : _index(indexOf(name)) {}
+  /// Its place among the names.
+  constexpr std::size_t index() const { return _index; }
+
+ private:
+  static consteval std::uint8_t indexOf(std::string_view name) {
+    const auto* const found = std::ranges::find(variableNames, name);
+    if (found == std::end(variableNames)) throw "there is no such display variable";
+    return static_cast<std::uint8_t>(found - variableNames);
+  }
+
+  std::uint8_t _index;
+};
+
+/// A field of a packet that is published under a variable.
+struct VariableField {
+  Source source;
+  Variable variable;
+  Format format = integer();
+};
+
+/// For static_assert: does not compile when a field reads past that many bytes.
+consteval bool within(std::span<const VariableField> fields, std::size_t size) {
+  for (const VariableField& field : fields)
+    if (field.source.end() > size) throw "a field lies past the minimum length";
+  return true;
+}
+
+/// The places of each variable, as a lookup has them. They are looked up once, since a lookup that a template
+/// has filled does not change any more.
+class Lookup {
+ public:
+  struct Place {
+    Dictionary* section;
+    Dictionary::Slot key;
+  };
+
+  /// Without an argument, or with what is no dictionary, there are no places.
+  Lookup() = default;
+  explicit Lookup(const Value& placements);
+
+  /// Whether it was made from this very dictionary.
+  bool isMadeFrom(const Value& placements) const {
+    return _placements.dictionary() == placements.dictionary();
+  }
+  /// In their order, up to the first placement that is none.
+  std::span<Place> places(Variable variable) { return _places[variable.index()]; }
+
+ private:
+  Value _placements;  // keeps the sections
+  std::array<std::vector<Place>, std::size(variableNames)> _places;
+};
+
+/// Adds a placement of the variable: a row of a section, which is a dictionary.
+void addPlacement(Dictionary& placements, std::string_view variable, std::string_view key,
+                  const Value& section);
+
+/// Shows a value in every place of its variable; nowhere when the lookup does not know the variable.
+void storeDisplayValue(Variable variable, const Value& value, Lookup& lookup);
 /// The same with a text, which takes the room of the text that stands there.
-void storeDisplayText(std::string_view variable, std::string_view text, const Dictionary& lookup);
+void storeDisplayText(Variable variable, std::string_view text, Lookup& lookup);
 /// The same with a computed number, by a format made by `real`.
-void storeDisplayNumber(std::string_view variable, const Format& format, double number,
-                        const Dictionary& lookup);
-/// Shows the fields of a packet, whose labels are variables, in the order of the table.
-void storeDisplayFields(const Packet& packet, std::span<const Field> fields, const Dictionary& lookup);
+void storeDisplayNumber(Variable variable, const Format& format, double number, Lookup& lookup);
+/// Publishes the fields of a packet in the order of the table.
+void storeDisplayFields(const Packet& packet, std::span<const VariableField> fields, Lookup& lookup);
 
 }  // namespace varnel::c2k

@@ -8,35 +8,33 @@ namespace varnel::c2k {
 
 namespace {
 
-constexpr Choice accessTerminalStates[] = {
-    {0, "Inactive [0]"}, {1, "Acquisition [1]"}, {2, "Sync [2]"},
-    {3, "Idle [3]"},     {4, "Access [4]"},      {5, "Connected [5]"},
+constexpr std::string_view accessTerminalStates[] = {
+    "Inactive [0]", "Acquisition [1]", "Sync [2]", "Idle [3]", "Access [4]", "Connected [5]",
 };
 constexpr std::uint8_t accessState = 4;
 
-constexpr Choice sessionStates[] = {
-    {0, "Closed [0]"},        {1, "AMP setup [1]"}, {2, "AT-initiated neg [2]"},
-    {3, "Initiated neg [3]"}, {4, "Open [4]"},
+constexpr std::string_view sessionStates[] = {
+    "Closed [0]", "AMP setup [1]", "AT-initiated neg [2]", "Initiated neg [3]", "Open [4]",
 };
 
 constexpr Format reserved = integer("[Reserved %d]");
 constexpr Format dBm = integer("%+d dBm");
 
 constexpr Source accessTerminalState = u8(36);
-constexpr Field channel[] = {
+constexpr VariableField channel[] = {
     {bits(13, 0, 11), "kChannel"},
-    {accessTerminalState, "k1xEVDODeviceState", choice(accessTerminalStates, reserved)},
+    {accessTerminalState, "k1xEVDODeviceState", entry(accessTerminalStates, reserved)},
     {bits(14, 3, 5), "kBandClass", bandClass},
     {s8(15), "kRxAGC0", dBm},
 };
 // Shown while the access terminal is in the access state or beyond.
-constexpr Field levelsInUse[] = {
+constexpr VariableField levelsInUse[] = {
     {s8(16), "kRxAGC1", dBm},
     {s8(17), "kTxAGC", dBm},
 };
-constexpr Field session[] = {
+constexpr VariableField session[] = {
     {u16(18), "kServingPNOffset", integer("%d × 64chips").unless(0xFFFF, "Invalid Value")},
-    {u8(37), "kSessionState", choice(sessionStates, reserved)},
+    {u8(37), "kSessionState", entry(sessionStates, reserved)},
     {bits(38, 0, 24), "kUATI24", hexadecimal("0x%06x")},
     {u8(41), "kColorCode"},
 };
@@ -47,17 +45,17 @@ constexpr std::uint16_t unassignedPN = 0xFFFF;
 
 }  // namespace
 
-void decodeEVDOStatus(const Packet& packet, Dictionary& /*state*/, const Dictionary& lookup) {
+void decodeEVDOStatus(const Packet& packet, State& /*state*/, Lookup& lookup) {
   storeDisplayFields(packet, channel, lookup);
   if (packet.u8(accessTerminalState.byte) >= accessState) {
     storeDisplayFields(packet, levelsInUse, lookup);
   } else {
-    for (const Field& field : levelsInUse) storeDisplayText(field.label, "N/A", lookup);
+    for (const VariableField& field : levelsInUse) storeDisplayText(field.variable, "N/A", lookup);
   }
   storeDisplayFields(packet, session, lookup);
 }
 
-void decodeEVDOActiveSet(const Packet& packet, Dictionary& /*state*/, const Dictionary& lookup) {
+void decodeEVDOActiveSet(const Packet& packet, State& /*state*/, Lookup& lookup) {
   constexpr std::size_t countOffset = 15;
   constexpr std::size_t pilotSize = 12;
   const std::uint8_t count = packet.u8(countOffset);
@@ -74,7 +72,7 @@ void decodeEVDOActiveSet(const Packet& packet, Dictionary& /*state*/, const Dict
   storeDisplayValue("kActiveSetPilots", pilots.asDictionaryOrNone(), lookup);
 }
 
-void decodeFingerC2I(const Packet& packet, Dictionary& /*state*/, const Dictionary& lookup) {
+void decodeFingerC2I(const Packet& packet, State& /*state*/, Lookup& lookup) {
   constexpr std::size_t countOffset = 22;
   constexpr std::size_t fingerSize = 14;
   const std::uint8_t count = packet.u8(countOffset);

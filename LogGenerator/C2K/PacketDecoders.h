@@ -2,8 +2,9 @@
 
 #include <cstdint>
 
+#include "LogGenerator/C2K/DisplayVariables.h"
+#include "LogGenerator/C2K/State.h"
 #include "LogGenerator/Packet.h"
-#include "platform/Dictionary.h"
 
 /// The decoders of CDMA2000 packets. Each takes a packet of the right length, publishes its display variables
 /// through the lookup, and keeps what it must remember until the next packet in the state.
@@ -20,20 +21,20 @@ inline constexpr std::uint32_t flDataRateSize = 241;
 inline constexpr std::uint32_t rlDataRateSize = 1750;
 
 /// 0x1183: state of the EV-DO session, its channel and its signal levels.
-void decodeEVDOStatus(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+void decodeEVDOStatus(const Packet& packet, State& state, Lookup& lookup);
 /// 0x12b6: strengths of the pilots in the EV-DO active set.
-void decodeEVDOActiveSet(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+void decodeEVDOActiveSet(const Packet& packet, State& state, Lookup& lookup);
 /// 0x108a: carrier to interference of each EV-DO finger.
-void decodeFingerC2I(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+void decodeFingerC2I(const Packet& packet, State& state, Lookup& lookup);
 /// 0x119c: state of the 1x device, its channels, signal levels and active set.
-void decode1xStatus(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+void decode1xStatus(const Packet& packet, State& state, Lookup& lookup);
 /// 0x119d: one more frame for the average of the frame-error rate on the 1x traffic channel.
-void decode1xTrafficFER(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+void decode1xTrafficFER(const Packet& packet, State& state, Lookup& lookup);
 /// 0x134f: the system that serves the phone.
-void decodeSystemInfo(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+void decodeSystemInfo(const Packet& packet, State& state, Lookup& lookup);
 /// 0x1192: the data rate of the EV-DO forward link since the packet before.
-void decodeFLDataRate(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+void decodeFLDataRate(const Packet& packet, State& state, Lookup& lookup);
 /// 0x127e: the data rate of the EV-DO reverse link since the packet before.
-void decodeRLDataRate(const Packet& packet, Dictionary& state, const Dictionary& lookup);
+void decodeRLDataRate(const Packet& packet, State& state, Lookup& lookup);
 
 }  // namespace varnel::c2k

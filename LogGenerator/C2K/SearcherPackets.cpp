@@ -12,44 +12,44 @@ namespace varnel::c2k {
 
 namespace {
 
-constexpr Choice deviceStates[] = {
-    {0, "Inactive [0]"},
-    {1, "Deep sleep in start state [1]"},
-    {2, "Initial state for CDMA operation [2]"},
-    {3, "Acquisition [3]"},
-    {4, "Sync [4]"},
-    {5, "Slew [5]"},
-    {6, "Paging [6]"},
-    {7, "Slotted mode sleep state [7]"},
-    {8, "Traffic [8]"},
-    {9, "UnSlew [9]"},
-    {10, "Operation in PCG state [10]"},
-    {11, "Powerup state [11]"},
+constexpr std::string_view deviceStates[] = {
+    "Inactive [0]",
+    "Deep sleep in start state [1]",
+    "Initial state for CDMA operation [2]",
+    "Acquisition [3]",
+    "Sync [4]",
+    "Slew [5]",
+    "Paging [6]",
+    "Slotted mode sleep state [7]",
+    "Traffic [8]",
+    "UnSlew [9]",
+    "Operation in PCG state [10]",
+    "Powerup state [11]",
 };
 constexpr std::uint8_t trafficState = 8;
 
 constexpr Source deviceState = u8(4);
-constexpr Field systemState[] = {
-    {deviceState, "k1xDeviceState", choice(deviceStates, integer("[Bad Value %d]"))},
+constexpr VariableField systemState[] = {
+    {deviceState, "k1xDeviceState", entry(deviceStates, integer("[Bad Value %d]"))},
 };
-constexpr Field firstChain[] = {
+constexpr VariableField firstChain[] = {
     {u8(4), "k1xRx0BandClass", bandClass},
     {u16(6), "k1xRx0ChanNum"},
 };
-constexpr Field secondChain[] = {
+constexpr VariableField secondChain[] = {
     {u8(5), "k1xRx1BandClass", bandClass},
     {u16(8), "k1xRx1ChanNum"},
 };
+constexpr Variable inTrafficOnly[] = {"k1xRx1BandClass", "k1xRx1ChanNum", "k1xRxAGC1", "k1xTxAGC"};
 constexpr Format dBm = real("%+.2f dBm");
 
-constexpr std::string_view trafficFERKey = "TrafficFER";
-constexpr std::string_view trafficFERVariable = "k1xTrafficFER";
+constexpr Variable trafficFERVariable = "k1xTrafficFER";
 
 double receiveAGC(std::int8_t raw) { return raw * 334 / 1000.0 - 63.248; }
 
 double transmitPower(std::uint16_t tenths) { return static_cast<std::int16_t>(tenths) / 10.0; }
 
-void showRF(const Packet& rf, bool isInTraffic, const Dictionary& lookup) {
+void showRF(const Packet& rf, bool isInTraffic, Lookup& lookup) {
   storeDisplayFields(rf, firstChain, lookup);
   storeDisplayNumber("k1xRxAGC0", dBm, receiveAGC(static_cast<std::int8_t>(rf.u8(10))), lookup);
   if (isInTraffic) {
@@ -57,9 +57,7 @@ void showRF(const Packet& rf, bool isInTraffic, const Dictionary& lookup) {
     storeDisplayNumber("k1xRxAGC1", dBm, receiveAGC(static_cast<std::int8_t>(rf.u8(11))), lookup);
     storeDisplayNumber("k1xTxAGC", dBm, transmitPower(rf.u16(12)), lookup);
   } else {
-    for (const auto variable : {"k1xRx1BandClass", "k1xRx1ChanNum", "k1xRxAGC1", "k1xTxAGC"}) {
-      storeDisplayText(variable, "N/A", lookup);
-    }
+    for (const Variable variable : inTrafficOnly) storeDisplayText(variable, "N/A", lookup);
   }
 }
 
@@ -79,7 +77,7 @@ double pilotStrength(const Integration& integration, std::uint16_t energy) {
   return decibels(ratio > floor ? ratio : floor);
 }
 
-void showActiveSet(const Packet& activeSet, const Dictionary& lookup) {
+void showActiveSet(const Packet& activeSet, Lookup& lookup) {
   constexpr Format referencePilot = real("(ref pilot) %+.2f dB");
   const Integration integration{.length = static_cast<double>(activeSet.u16(4)),
                                 .gain = static_cast<double>(activeSet.u8(6)),
@@ -99,24 +97,24 @@ void showActiveSet(const Packet& activeSet, const Dictionary& lookup) {
 }
 
 // The frame-error rate between 0 and 1. It is computed in single precision at every step.
-std::optional<float> trafficFER(const Dictionary& state) {
-  const Value& rate = state.get(trafficFERKey);
+std::optional<float> trafficFER(const State& state) {
+  const Value& rate = state.entries.get(state.slots.trafficFER);
   if (const auto real = rate.real()) return static_cast<float>(*real);
   if (const auto integer = rate.integer()) return static_cast<float>(*integer);
   return std::nullopt;
 }
 
 // The rate of a call that is over is shown once more; the next call starts its average afresh.
-void endTrafficFER(Dictionary& state, const Dictionary& lookup) {
+void endTrafficFER(State& state, Lookup& lookup) {
   const auto rate = trafficFER(state);
   if (!rate) return;
   storeDisplayNumber(trafficFERVariable, real("%.02f%% (old)"), *rate * 100.0F, lookup);
-  state.remove(trafficFERKey);
+  state.entries.remove(state.slots.trafficFER);
 }
 
 }  // namespace
 
-void decode1xStatus(const Packet& packet, Dictionary& state, const Dictionary& lookup) {
+void decode1xStatus(const Packet& packet, State& state, Lookup& lookup) {
   const auto system = findSubpacket(packet, SubpacketId::SystemState);
   const auto rf = findSubpacket(packet, SubpacketId::RF);
   const auto activeSet = findSubpacket(packet, SubpacketId::ActiveSetInfo);
@@ -134,7 +132,7 @@ void decode1xStatus(const Packet& packet, Dictionary& state, const Dictionary& l
   if (!isInTraffic) endTrafficFER(state, lookup);
 }
 
-void decode1xTrafficFER(const Packet& packet, Dictionary& state, const Dictionary& lookup) {
+void decode1xTrafficFER(const Packet& packet, State& state, Lookup& lookup) {
   constexpr std::size_t erasureOffset = 24;
   const auto demodulation = findSubpacket(packet, SubpacketId::TrafficDemodulation);
   if (!demodulation) {
@@ -144,7 +142,7 @@ void decode1xTrafficFER(const Packet& packet, Dictionary& state, const Dictionar
   const float sample = demodulation->u8(erasureOffset) ? 1.0F / 64 : 0.0F;
   const auto previous = trafficFER(state);
   const float rate = previous ? sample + *previous * (63.0F / 64) : sample;
-  state.set(trafficFERKey, Value::ofReal(rate));
+  state.entries.set(state.slots.trafficFER, Value::ofReal(rate));
   storeDisplayNumber(trafficFERVariable, real("%.02f%%"), rate * 100.0F, lookup);
 }
 

@@ -10,41 +10,42 @@ constexpr std::size_t versionOffset = 13;
 constexpr std::uint8_t oldestVersion = 2;
 
 // Enhanced roaming indicators.
-constexpr Choice roamingIndicators[] = {
-    {0, "OFF [0]"},
-    {1, "ON [1]"},
-    {2, "Flashing [2]"},
-    {3, "Out of Neighborhood [3]"},
-    {4, "Out of Building [4]"},
-    {5, "Preferred system [5]"},
-    {6, "Available system [6]"},
-    {7, "Alliance partner [7]"},
-    {8, "Premium partner [8]"},
-    {9, "Full service functionality [9]"},
-    {10, "Partial service functionality [10]"},
-    {11, "Banner ON [11]"},
-    {12, "Banner OFF [12]"},
+constexpr std::string_view roamingIndicators[] = {
+    "OFF [0]",
+    "ON [1]",
+    "Flashing [2]",
+    "Out of Neighborhood [3]",
+    "Out of Building [4]",
+    "Preferred system [5]",
+    "Available system [6]",
+    "Alliance partner [7]",
+    "Premium partner [8]",
+    "Full service functionality [9]",
+    "Partial service functionality [10]",
+    "Banner ON [11]",
+    "Banner OFF [12]",
 };
 
-constexpr Field roaming[] = {
-    {u32(42), "k1xRoamingHome", choice(roamingIndicators, integer("ERI - %d"))},
+constexpr VariableField roaming[] = {
+    {u32(42), "k1xRoamingHome", entry(roamingIndicators, integer("ERI - %d"))},
 };
 
 constexpr Source systemType = u32(46);
 constexpr std::uint32_t knownSystemType = 2;
-constexpr Field knownSystem[] = {
+constexpr VariableField knownSystem[] = {
     {u16(50), "kSystemId"},
     {u16(52), "kNetworkId"},
 };
 constexpr Format unknownType = integer("(unknown system type %d)");
-constexpr Field unknownSystem[] = {
+constexpr VariableField unknownSystem[] = {
     {systemType, "kSystemId", unknownType},
     {systemType, "kNetworkId", unknownType},
 };
 
-constexpr Field packetZone[] = {{u8(131), "kPacketZoneId"}};
-constexpr Field baseStation[] = {{u16(184), "kBaseId"}};
-constexpr Field protocol[] = {{u8(133), "kProtocolRevision"}};
+constexpr VariableField packetZone[] = {{u8(131), "kPacketZoneId"}};
+constexpr Source baseStationId = u16(184);
+constexpr VariableField baseStation[] = {{baseStationId, "kBaseId"}};
+constexpr VariableField protocol[] = {{u8(133), "kProtocolRevision"}};
 
 static_assert(within(roaming, systemInfoSize) && within(knownSystem, systemInfoSize) &&
               within(unknownSystem, systemInfoSize) && within(packetZone, systemInfoSize) &&
@@ -52,7 +53,7 @@ static_assert(within(roaming, systemInfoSize) && within(knownSystem, systemInfoS
 
 }  // namespace
 
-void decodeSystemInfo(const Packet& packet, Dictionary& /*state*/, const Dictionary& lookup) {
+void decodeSystemInfo(const Packet& packet, State& /*state*/, Lookup& lookup) {
   if (const std::uint8_t version = packet.u8(versionOffset); version < oldestVersion) {
     logError("Log code 0x134f has version=%d; only version 2 or higher expected; dropping.", version);
     return;
@@ -64,7 +65,7 @@ void decodeSystemInfo(const Packet& packet, Dictionary& /*state*/, const Diction
     storeDisplayFields(packet, unknownSystem, lookup);
   }
   storeDisplayFields(packet, packetZone, lookup);
-  if (packet.holds(0, extent(baseStation))) storeDisplayFields(packet, baseStation, lookup);
+  if (packet.holds(0, baseStationId.end())) storeDisplayFields(packet, baseStation, lookup);
   storeDisplayFields(packet, protocol, lookup);
 }
 

@@ -173,6 +173,39 @@ TEST(Dictionary, SetTextLeavesCopiesOfTheValueAlone) {
 }
 
 // As the walk over a history record does: values go from one key to another of the same dictionary.
+TEST(Dictionary, ASlotFindsItsKeyWhereverItStands) {
+  Dictionary dictionary;
+  Dictionary::Slot slot("b");
+  EXPECT_TRUE(dictionary.get(slot).isAbsent());
+  dictionary.set("a", "1");
+  dictionary.set(slot, "2");
+  EXPECT_EQ(*dictionary.get("b").string(), "2");
+  EXPECT_EQ(*dictionary.get(slot).string(), "2");
+  dictionary.remove("a");
+  dictionary.set("c", "3");
+  dictionary.setText(slot, "4");
+  EXPECT_EQ(dictionary.size(), 2u);
+  EXPECT_EQ(*dictionary.get("b").string(), "4");
+  EXPECT_EQ(*dictionary.get("c").string(), "3");
+  dictionary.remove(slot);
+  EXPECT_TRUE(dictionary.get(slot).isAbsent());
+  dictionary.setText(slot, "5");
+  EXPECT_EQ(*dictionary.get(slot).string(), "5");
+  dictionary.set(slot, Value());
+  EXPECT_EQ(*dictionary.get(slot).string(), "5");
+}
+
+TEST(Dictionary, ASlotServesSeveralDictionaries) {
+  Dictionary first, second;
+  first.set("a", "1");
+  first.set("b", "2");
+  second.set("b", "3");
+  Dictionary::Slot slot("b");
+  EXPECT_EQ(*first.get(slot).string(), "2");
+  EXPECT_EQ(*second.get(slot).string(), "3");
+  EXPECT_EQ(*first.get(slot).string(), "2");
+}
+
 TEST(Dictionary, TakesItsOwnValuesAndKeys) {
   Dictionary dictionary;
   dictionary.set("key", "text");
