@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <cstdlib>
+#include <cstring>
 #include <limits>
 #include <memory>
 #include <string_view>
@@ -45,10 +46,29 @@ char32_t takeCharacter(std::string_view& text) {
   return character;
 }
 
+bool isPlain(char character) {
+  const auto code = static_cast<unsigned char>(character);
+  return code >= 0x20 && code < 0x80;
+}
+
+// Whether the text begins with eight characters that are plain.
+bool beginsPlain(std::string_view text) {
+  constexpr std::uint64_t highBits = 0x8080808080808080;
+  constexpr std::uint64_t blanks = 0x2020202020202020;
+  std::uint64_t word = 0;
+  if (text.size() < sizeof word) return false;
+  std::memcpy(&word, text.data(), sizeof word);
+  return ((word | (word - blanks)) & highBits) == 0;
+}
+
 bool canHold(Encoding encoding, std::string_view text) {
   while (!text.empty()) {
     // Nearly every character is plain ASCII.
-    if (const auto first = static_cast<unsigned char>(text[0]); first >= 0x20 && first < 0x80) {
+    if (beginsPlain(text)) {
+      text.remove_prefix(sizeof(std::uint64_t));
+      continue;
+    }
+    if (isPlain(text[0])) {
       text.remove_prefix(1);
       continue;
     }
@@ -114,10 +134,11 @@ Value readDictionary(plist_t node, Encoding encoding) {
     if (!item) return Value(dictionary);
     char* text = nullptr;
     plist_get_key_val(plist_dict_item_get_key(item), &text);
-    const std::unique_ptr<char, Free> key(text);
+    const std::unique_ptr<char, Free> textOwner(text);
+    const std::string_view key = text;
     Value value = readNode(item, encoding);
-    if (value.isAbsent() || !canHold(encoding, key.get())) return {};
-    dictionary->set(key.get(), std::move(value));
+    if (value.isAbsent() || !canHold(encoding, key)) return {};
+    dictionary->set(key, std::move(value));
   }
 }
 

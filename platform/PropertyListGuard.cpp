@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <numeric>
 #include <optional>
 #include <string_view>
 #include <vector>
@@ -274,11 +275,13 @@ class BinaryWalk {
     return number(content + position * _referenceSize, _referenceSize);
   }
 
-  // An unsigned big-endian number.
+  // An unsigned big-endian number. Nearly all have a byte or two.
   std::uint64_t number(std::size_t offset, std::size_t width) const {
-    std::uint64_t result = 0;
-    for (const std::uint8_t byte : _bytes.subspan(offset, width)) result = result << 8U | byte;
-    return result;
+    const std::uint8_t* bytes = _bytes.data() + offset;
+    if (width == 1) return bytes[0];
+    if (width == 2) return std::uint64_t{bytes[0]} << 8U | bytes[1];
+    return std::accumulate(bytes, bytes + width, std::uint64_t{0},
+                           [](std::uint64_t high, std::uint8_t byte) { return high << 8U | byte; });
   }
 
   // Objects end where the table of their offsets begins.
