@@ -33,10 +33,10 @@ constexpr const char* kindName(Value::Kind kind) {
   }
 }
 
+// A dictionary has as many entries when it is processed, so it can collapse before.
 Value processChild(const Value& child) {
-  Value processed = GSMLogGenerator::processObject(child);
-  Value onlyEntry = GSMLogGenerator::canCollapse(processed);
-  return onlyEntry.isAbsent() ? processed : onlyEntry;
+  const Value onlyEntry = GSMLogGenerator::canCollapse(child);
+  return onlyEntry.isAbsent() ? GSMLogGenerator::processObject(child) : processChild(onlyEntry);
 }
 
 Value processEntries(const Dictionary& entries) {
@@ -48,6 +48,7 @@ Value processEntries(const Dictionary& entries) {
 
 Value processElements(const Array& elements) {
   Array processed;
+  processed.reserve(elements.size());
   // Kept: the first element of every array is left out unseen.
   for (std::size_t i = 1; i < elements.size(); ++i) processed.push_back(processChild(elements[i]));
   return Value::ofArray(std::move(processed));
