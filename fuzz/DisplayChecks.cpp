@@ -1,5 +1,6 @@
 #include "fuzz/DisplayChecks.h"
 
+#include <cstddef>
 #include <nlohmann/json.hpp>
 #include <stdexcept>
 #include <string>
@@ -26,6 +27,18 @@ void checkNode(const VarnelModelNode& node, const std::string& path, const PathD
     checkNode(*child, childPath(path, child->displayName()), paths);
 }
 
+// As far as it is worth the time.
+void checkLeaves(const Value& display, const PathDictionary& paths) {
+  constexpr std::size_t mostPaths = 64;
+  std::size_t count = 0;
+  for (const auto& [path, node] : paths) {
+    if (++count > mostPaths) return;
+    const auto found = leafValueUnderPath(display, path);
+    require(found.has_value() == (node->value() != nullptr) && (!found || *found == *node->value()),
+            "a leaf is found as in the tree");
+  }
+}
+
 void checkPropertyList(const Value& display) {
   require(writeBinaryPropertyList(display).has_value(), "every display has a binary form");
   std::string xml;
@@ -46,6 +59,7 @@ void checkTree(const Value& display) {
   const auto root = VarnelModelNode::makeTreeFromObject_withPathDictionary(display, paths);
   require(root->displayName() == "Varnel", "the root has its name");
   checkNode(*root, "/", paths);
+  checkLeaves(display, paths);
 }
 
 void checkFormats(const Value& display) {

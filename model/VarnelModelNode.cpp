@@ -1,6 +1,7 @@
 #include "model/VarnelModelNode.h"
 
 #include <algorithm>
+#include <cstddef>
 
 #include "LogGenerator/ArrayLock.h"
 #include "platform/Dictionary.h"
@@ -20,6 +21,31 @@ std::string_view displayNameOfSortedKey(std::string_view key) {
   const std::size_t semicolon = key.find(';');
   const bool hasTwoParts = semicolon != std::string_view::npos && semicolon == key.rfind(';');
   return hasTwoParts ? key.substr(semicolon + 1) : key;
+}
+
+// A row of a dictionary as the tree shows it.
+struct Row {
+  std::string_view name;
+  const Value* value;
+};
+
+// The rows of a dictionary in the tree's order.
+std::vector<Row> rowsOf(const Dictionary& entries) {
+  std::vector<const Dictionary::Entry*> inOrder;
+  inOrder.reserve(entries.size());
+  for (const Dictionary::Entry& entry : entries) inOrder.push_back(&entry);
+  const bool isSorted = entries.has(sortMark);
+  if (isSorted)
+    std::ranges::sort(inOrder, {},
+                      [](const Dictionary::Entry* entry) { return std::string_view(entry->key); });
+
+  std::vector<Row> rows;
+  rows.reserve(inOrder.size());
+  for (const Dictionary::Entry* entry : inOrder) {
+    if (entry->key == sortMark) continue;
+    rows.push_back({isSorted ? displayNameOfSortedKey(entry->key) : entry->key, &entry->value});
+  }
+  return rows;
 }
 
 class TreeBuilder {
@@ -47,21 +73,10 @@ class TreeBuilder {
   }
 
   Children childrenOf(const Dictionary& entries, const std::string& path) {
-    std::vector<const Dictionary::Entry*> rows;
-    rows.reserve(entries.size());
-    for (const Dictionary::Entry& entry : entries) rows.push_back(&entry);
-    const bool isSorted = entries.has(sortMark);
-    if (isSorted)
-      std::ranges::sort(rows, {},
-                        [](const Dictionary::Entry* entry) { return std::string_view(entry->key); });
-
+    const std::vector<Row> rows = rowsOf(entries);
     Children children;
     children.reserve(rows.size());
-    for (const Dictionary::Entry* row : rows) {
-      if (row->key == sortMark) continue;
-      const std::string_view name = isSorted ? displayNameOfSortedKey(row->key) : row->key;
-      children.push_back(build(name, row->value, childPath(path, name)));
-    }
+    for (const auto& [name, value] : rows) children.push_back(build(name, *value, childPath(path, name)));
     return children;
   }
 
@@ -79,11 +94,60 @@ class TreeBuilder {
   PathDictionary& _paths;
 };
 
+// Finds what the tree would have under a path. A node is recorded after all below it, and of two with the
+// same path the later one counts: so the walk begins with the node itself and goes on with its last child. It
+// enters nothing but what may lead to the path.
+class ObjectFinder {
+ public:
+  explicit ObjectFinder(std::string_view path) : _path(path) {}
+
+  // The first so many characters of the path are the object's own. Null when nothing has the path.
+  const Value* findFrom(const Value& object, std::size_t length) const {
+    if (length == _path.size()) return &object;
+    if (_path[length - 1] != '/') {
+      if (_path[length] != '/') return nullptr;
+      ++length;
+    }
+    if (const Dictionary* entries = object.dictionary()) return findAmong(*entries, length);
+    if (const Array* elements = object.array()) return findAmong(*elements, length);
+    return nullptr;
+  }
+
+ private:
+  const Value* findAmong(const Dictionary& entries, std::size_t length) const {
+    const std::vector<Row> rows = rowsOf(entries);
+    for (auto row = rows.rbegin(); row != rows.rend(); ++row)
+      if (const Value* found = findNamed(row->name, *row->value, length)) return found;
+    return nullptr;
+  }
+
+  const Value* findAmong(const Array& elements, std::size_t length) const {
+    const ArrayLock::Scope lock;
+    for (std::size_t i = elements.size(); i-- > 0;)
+      if (const Value* found = findNamed(std::to_string(i), elements[i], length)) return found;
+    return nullptr;
+  }
+
+  const Value* findNamed(std::string_view name, const Value& object, std::size_t length) const {
+    return _path.substr(length).starts_with(name) ? findFrom(object, length + name.size()) : nullptr;
+  }
+
+  const std::string_view _path;
+};
+
 }  // namespace
 
 std::shared_ptr<const VarnelModelNode> VarnelModelNode::makeTreeFromObject_withPathDictionary(
     const Value& object, PathDictionary& paths) {
   return TreeBuilder(paths).build("Varnel", object, "/");
+}
+
+std::optional<std::string_view> leafValueUnderPath(const Value& object, std::string_view path) {
+  if (!path.starts_with('/')) return std::nullopt;
+  const Value* found = ObjectFinder(path).findFrom(object, 1);
+  if (!found || found->dictionary() || found->array()) return std::nullopt;
+  const std::string* text = found->string();
+  return text ? std::string_view(*text) : unknownValue;
 }
 
 std::string childPath(std::string_view parentPath, std::string_view name) {

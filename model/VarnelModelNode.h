@@ -66,6 +66,10 @@ class VarnelModelTreeNode final : public VarnelModelNode {
   Origin _origin;
 };
 
+/// The value of the leaf that the display object's tree would have under the path, found without building the
+/// tree; nothing when that is an inner node or nothing has the path. Valid until the object changes.
+std::optional<std::string_view> leafValueUnderPath(const Value& object, std::string_view path);
+
 /// The path of a child: the parent's, a "/" unless it ends in one, and the name as it is. Names may hold "/".
 std::string childPath(std::string_view parentPath, std::string_view name);
 

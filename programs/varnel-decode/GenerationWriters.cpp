@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "model/VarnelModelNode.h"
 #include "programs/varnel-decode/StandardOutput.h"
 #include "programs/varnel-decode/Timestamps.h"
 #include "programs/varnel-decode/TreeWriters.h"
@@ -22,24 +23,15 @@ std::string csvField(std::string_view text) {
 
 }  // namespace
 
-GenerationTree::GenerationTree(const Generation& generation)
-    : time(generation.time),
-      root(VarnelModelNode::makeTreeFromObject_withPathDictionary(generation.display, paths)) {}
-
-const std::string* GenerationTree::value(const std::string& path) const {
-  const auto found = paths.find(path);
-  return found == paths.end() ? nullptr : found->second->value();
-}
-
 std::string treePath(std::string_view path) {
   return path.starts_with('/') ? std::string(path) : '/' + std::string(path);
 }
 
-void EveryDisplay::take(const GenerationTree& generation) {
+void EveryDisplay::take(const Generation& generation) {
   std::string line = "{";
   if (_captureName) line += "\"Capture\":" + jsonString(*_captureName) + ',';
   line += "\"Time\":" + jsonString(timestamp(generation.time)) + ",\"Display\":";
-  writeOutput(_output, line + treeAsJson(*generation.root) + "}\n");
+  writeOutput(_output, line + treeAsJson(generation.display) + "}\n");
 }
 
 std::string csvHeader(const std::vector<std::string>& paths, TableColumns columns) {
@@ -54,18 +46,20 @@ ValueTable::ValueTable(std::FILE* output, const std::vector<std::string>& paths,
   std::ranges::transform(paths, std::back_inserter(_paths), treePath);
 }
 
-void ValueTable::take(const GenerationTree& generation) {
+void ValueTable::take(const Generation& generation) {
   std::string line = _captureName ? csvField(*_captureName) + ',' : std::string();
   line += timestamp(generation.time);
   for (const std::string& path : _paths) {
     line += ',';
-    if (const std::string* value = generation.value(path)) line += csvField(*value);
+    if (const auto value = leafValueUnderPath(generation.display, path)) line += csvField(*value);
   }
   writeOutput(_output, line + '\n');
 }
 
-void SeenPaths::take(const GenerationTree& generation) {
-  std::erase_if(_unseen, [&](const std::string& path) { return generation.value(treePath(path)); });
+void SeenPaths::take(const Generation& generation) {
+  std::erase_if(_unseen, [&](const std::string& path) {
+    return leafValueUnderPath(generation.display, treePath(path)).has_value();
+  });
 }
 
 }  // namespace varnel

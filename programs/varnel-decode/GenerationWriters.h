@@ -6,29 +6,16 @@
 #include <string_view>
 #include <vector>
 
-#include "model/VarnelModelNode.h"
 #include "programs/varnel-decode/Generation.h"
 
 namespace varnel {
-
-/// The display tree of one generation.
-struct GenerationTree {
-  explicit GenerationTree(const Generation& generation);
-
-  /// The text of the leaf that the tree has under the path; null when there is no such leaf.
-  const std::string* value(const std::string& path) const;
-
-  Time time;
-  PathDictionary paths;
-  std::shared_ptr<const VarnelModelNode> root;
-};
 
 /// What becomes of the generations of a capture or snapshot, one after the other.
 class GenerationSink {
  public:
   virtual ~GenerationSink() = default;
   /// Throws std::runtime_error, after which there is no use in going on.
-  virtual void take(const GenerationTree& generation) = 0;
+  virtual void take(const Generation& generation) = 0;
 };
 
 /// The path of a node as users write it ("Section/Label") as the tree keeps it ("/Section/Label").
@@ -40,7 +27,7 @@ class EveryDisplay final : public GenerationSink {
  public:
   EveryDisplay(std::FILE* output, std::optional<std::string> captureName)
       : _output(output), _captureName(std::move(captureName)) {}
-  void take(const GenerationTree& generation) override;
+  void take(const Generation& generation) override;
 
  private:
   std::FILE* _output;
@@ -59,7 +46,7 @@ class ValueTable final : public GenerationSink {
  public:
   ValueTable(std::FILE* output, const std::vector<std::string>& paths,
              std::optional<std::string> captureName);
-  void take(const GenerationTree& generation) override;
+  void take(const Generation& generation) override;
 
  private:
   std::FILE* _output;
@@ -71,7 +58,7 @@ class ValueTable final : public GenerationSink {
 class SeenPaths final : public GenerationSink {
  public:
   explicit SeenPaths(std::vector<std::string> paths) : _unseen(std::move(paths)) {}
-  void take(const GenerationTree& generation) override;
+  void take(const Generation& generation) override;
 
   /// Those that no display has had, as they were given.
   const std::vector<std::string>& unseen() const { return _unseen; }

@@ -129,10 +129,9 @@ class InputDecoding {
   // After a failure there is no use in trying again.
   void report(const Generation& generation) {
     if (_sinks.empty() || _isReportBroken) return;
-    const GenerationTree tree(generation);
     _isReportBroken = true;
-    _seen.take(tree);
-    for (const auto& sink : _sinks) sink->take(tree);
+    _seen.take(generation);
+    for (const auto& sink : _sinks) sink->take(generation);
     _isReportBroken = false;
   }
 

@@ -10,6 +10,7 @@
 #include <stdexcept>
 #include <utility>
 
+#include "model/VarnelModelNode.h"
 #include "programs/varnel-decode/plot/ChartModule.h"
 
 namespace varnel {
@@ -127,9 +128,9 @@ PlotRecorder::PlotRecorder(const std::vector<std::string>& paths) {
     _series.push_back({.path = treePath(path), .label = treePath(path).substr(1), .unit = {}, .line = {}});
 }
 
-void PlotRecorder::take(const GenerationTree& generation) {
+void PlotRecorder::take(const Generation& generation) {
   for (Series& series : _series) {
-    const std::string* text = generation.value(series.path);
+    const auto text = leafValueUnderPath(generation.display, series.path);
     const auto measurement = text ? measurementIn(*text) : std::nullopt;
     if (!measurement) {
       series.line.interrupt();

@@ -60,7 +60,7 @@ class PlotLine {
 class PlotRecorder final : public GenerationSink {
  public:
   explicit PlotRecorder(const std::vector<std::string>& paths);
-  void take(const GenerationTree& generation) override;
+  void take(const Generation& generation) override;
 
   bool isEmpty() const;
   Plot plot(const std::string& title) const;

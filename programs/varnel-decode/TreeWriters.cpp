@@ -88,13 +88,13 @@ std::string jsonString(const std::string& text) {
   return Json(text).dump(-1, ' ', false, Json::error_handler_t::replace);
 }
 
-std::string treeAsJson(const VarnelModelNode& root) {
+std::string treeAsJson(const Value& display) {
   std::string json;
-  appendJson(json, root);
+  appendJson(json, *treeOf(display));
   return json;
 }
 
-std::string displayAsJson(const Value& display) { return treeAsJson(*treeOf(display)) + '\n'; }
+std::string displayAsJson(const Value& display) { return treeAsJson(display) + '\n'; }
 
 std::string displayAsPropertyList(const Value& display) {
   if (display.isAbsent()) return {};

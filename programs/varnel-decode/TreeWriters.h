@@ -3,7 +3,6 @@
 #include <string>
 #include <string_view>
 
-#include "model/VarnelModelNode.h"
 #include "platform/Value.h"
 
 namespace varnel {
@@ -29,8 +28,8 @@ std::string displayAsPropertyList(const Value& display);
 /// Nothing at all, for those who only want what else is written.
 std::string displayAsNothing(const Value& display);
 
-/// A tree as JSON, as in `displayAsJson`, without the newline.
-std::string treeAsJson(const VarnelModelNode& root);
+/// The display tree as in `displayAsJson`, without the newline.
+std::string treeAsJson(const Value& display);
 /// A text as a string of JSON.
 std::string jsonString(const std::string& text);
 

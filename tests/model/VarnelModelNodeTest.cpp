@@ -5,7 +5,10 @@
 
 #include <chrono>
 #include <cstdlib>
+#include <functional>
 #include <future>
+#include <iterator>
+#include <random>
 
 #include "LogGenerator/ArrayLock.h"
 #include "tests/support/DictionaryOf.h"
@@ -290,6 +293,116 @@ TEST(ChildPath, JoinsByASlashUnlessTheParentEndsInOne) {
   EXPECT_EQ(childPath("/ends/", "below"), "/ends/below");
   EXPECT_EQ(childPath("/a", ""), "/a/");
   EXPECT_EQ(childPath("/", "/"), "//");
+}
+
+// What stands for the absence of a leaf.
+constexpr std::string_view none = "(none)";
+std::string leafAt(const Value& object, std::string_view path) {
+  return std::string(leafValueUnderPath(object, path).value_or(none));
+}
+
+TEST(LeafValueUnderPath, IsTheTextThatTheTreeWouldShow) {
+  const Value object = dictionaryOf(
+      {{"Serving Cell", dictionaryOf({{"RSSI", "-77 dBm"}, {"Empty", ""}, {"Number", Value::ofInteger(7)}})},
+       {"Cells", Value::ofArray({dictionaryOf({{"ID", "1"}}), "two", Value()})}});
+  EXPECT_EQ(leafAt(object, "/Serving Cell/RSSI"), "-77 dBm");
+  EXPECT_EQ(leafAt(object, "/Serving Cell/Empty"), "");
+  EXPECT_EQ(leafAt(object, "/Serving Cell/Number"), "(unknown)");
+  EXPECT_EQ(leafAt(object, "/Cells/0/ID"), "1");
+  EXPECT_EQ(leafAt(object, "/Cells/1"), "two");
+  EXPECT_EQ(leafAt(object, "/Cells/2"), "(unknown)");
+}
+
+TEST(LeafValueUnderPath, InnerNodesAndWhatIsNotThereHaveNone) {
+  const Value object =
+      dictionaryOf({{"Cell", dictionaryOf({{"ID", "1"}})}, {"Cells", Value::ofArray({"a"})}});
+  for (const std::string_view path :
+       {"/", "/Cell", "/Cells", "/Cell/", "/Cell/I", "/Cell/IDs", "/Cell/ID/", "/Cell//ID", "/CellID",
+        "/Cells/1", "/Cells/00", "/Cells/-1", "//Cell", "Cell/ID", ""})
+    EXPECT_EQ(leafAt(object, path), none) << path;
+}
+
+TEST(LeafValueUnderPath, ALeafMayBeTheRoot) {
+  EXPECT_EQ(leafAt("text", "/"), "text");
+  EXPECT_EQ(leafAt(Value(), "/"), "(unknown)");
+  EXPECT_EQ(leafAt("text", "/text"), none);
+  EXPECT_EQ(leafAt(Value::ofArray({"a", "b"}), "/1"), "b");
+}
+
+TEST(LeafValueUnderPath, TheMarkerSortsItsRowsAndIsNoneItself) {
+  const Value object = dictionaryOf({{"_sorted", "mark"}, {"10;Name", "n"}, {"1;a;b", "whole"}});
+  EXPECT_EQ(leafAt(object, "/Name"), "n");
+  EXPECT_EQ(leafAt(object, "/10;Name"), none);
+  EXPECT_EQ(leafAt(object, "/1;a;b"), "whole");
+  EXPECT_EQ(leafAt(object, "/_sorted"), none);
+}
+
+TEST(LeafValueUnderPath, OfTwoRowsOfOneNameTheLaterCountsInTheOrderOfTheTree) {
+  EXPECT_EQ(leafAt(dictionaryOf({{"2;Same", "second"}, {"1;Same", "first"}, {"_sorted", ""}}), "/Same"),
+            "second");
+  const Value sections = dictionaryOf({{"_sorted", ""},
+                                       {"2;Same", dictionaryOf({{"b", "3"}})},
+                                       {"1;Same", dictionaryOf({{"a", "1"}, {"b", "2"}})}});
+  EXPECT_EQ(leafAt(sections, "/Same/b"), "3");
+  EXPECT_EQ(leafAt(sections, "/Same/a"), "1") << "the later one has no such row";
+  EXPECT_EQ(
+      leafAt(dictionaryOf({{"_sorted", ""}, {"1;Same", "leaf"}, {"2;Same", dictionaryOf({})}}), "/Same"),
+      none)
+      << "the later one is no leaf";
+}
+
+TEST(LeafValueUnderPath, NamesWithSlashesMayShareAPathWithRowsOfASection) {
+  EXPECT_EQ(leafAt(dictionaryOf({{"a", dictionaryOf({{"b", "row"}})}, {"a/b", "name"}}), "/a/b"), "name");
+  EXPECT_EQ(leafAt(dictionaryOf({{"a/b", "name"}, {"a", dictionaryOf({{"b", "row"}})}}), "/a/b"), "row");
+  const Value slashes =
+      dictionaryOf({{"/root", "1"}, {"ends/", dictionaryOf({{"below", "2"}, {"/x/", "3"}})}});
+  EXPECT_EQ(leafAt(slashes, "//root"), "1");
+  EXPECT_EQ(leafAt(slashes, "/ends/below"), "2");
+  EXPECT_EQ(leafAt(slashes, "/ends//x/"), "3");
+  EXPECT_EQ(leafAt(slashes, "/ends//below"), none);
+}
+
+TEST(LeafValueUnderPath, ANodeTakesThePathOfARowWithoutAName) {
+  const Value below = dictionaryOf({{"Section", dictionaryOf({{"_sorted", ""}, {"x;", "1"}})}});
+  EXPECT_EQ(leafAt(below, "/Section/"), "1");
+  EXPECT_EQ(leafAt(below, "/Section"), none);
+  EXPECT_EQ(leafAt(dictionaryOf({{"_sorted", ""}, {"1;", "lost"}}), "/"), none) << "the root's own path";
+  const Value nested = dictionaryOf({{"a", dictionaryOf({{"", dictionaryOf({{"b", "1"}, {"", "lost"}})}})}});
+  EXPECT_EQ(leafAt(nested, "/a/b"), "1");
+  EXPECT_EQ(leafAt(nested, "/a/"), none);
+}
+
+// Every path of the tree, and every path that is a character longer or shorter.
+void expectLikeTheTree(const Value& object) {
+  const Tree tree{object};
+  const auto expectLike = [&](const std::string& path) {
+    const auto found = tree.paths.find(path);
+    const std::string* value = found == tree.paths.end() ? nullptr : found->second->value();
+    EXPECT_EQ(leafAt(object, path), value ? *value : none) << path << " of " << tree.outline();
+  };
+  for (const std::string& path : tree.allPaths()) {
+    expectLike(path);
+    expectLike(path + "/");
+    expectLike(path + "a");
+    expectLike(path.substr(0, path.size() - 1));
+  }
+}
+
+TEST(LeafValueUnderPath, FindsWhatThePathDictionaryHoldsWhateverTheNames) {
+  const std::string names[] = {"", "/", "a", "a/", "/a", "a/a", "1;a", "2;a/a", "3;a/", "4;", "5;a;", "0"};
+  std::mt19937 random(1);
+  const auto below = [&](unsigned bound) { return static_cast<unsigned>(random() % bound); };
+  int leaves = 0;
+  const std::function<Value(int)> objectOf = [&](int depth) -> Value {
+    const unsigned kind = depth == 0 ? 0 : below(4);
+    if (kind == 0) return std::to_string(++leaves);
+    if (kind == 1) return Value::ofArray({objectOf(depth - 1), objectOf(depth - 1)});
+    Value rows = Value::ofDictionary();
+    if (below(2) == 0) rows.dictionary()->set("_sorted", "");
+    for (int i = 0; i < 4; ++i) rows.dictionary()->set(names[below(std::size(names))], objectOf(depth - 1));
+    return rows;
+  };
+  for (int round = 0; round < 2000; ++round) expectLikeTheTree(objectOf(4));
 }
 
 // Whether the thread that runs the task still waits for something.

@@ -26,9 +26,7 @@ class GenerationWritersTest : public ::testing::Test {
     return text;
   }
 
-  static GenerationTree generation(Value display) {
-    return GenerationTree({{1709301909, 250'000'000}, std::move(display)});
-  }
+  static Generation generation(Value display) { return {{1709301909, 250'000'000}, std::move(display)}; }
   static Value cell(const std::string& level) {
     Value section = Value::ofDictionary();
     section.dictionary()->set("Level", level);
@@ -103,11 +101,11 @@ TEST(SeenPaths, APathIsSeenOnceADisplayHasAValueThere) {
   display.dictionary()->set("B", Value::ofArray());
   SeenPaths seen({"/A", "B", "C", "A"});
   EXPECT_THAT(seen.unseen(), ElementsAre("/A", "B", "C", "A"));
-  seen.take(GenerationTree({{}, display}));
+  seen.take({{}, display});
   EXPECT_THAT(seen.unseen(), ElementsAre("B", "C"));
   display.dictionary()->set("B", "2");
   display.dictionary()->set("C", "3");
-  seen.take(GenerationTree({{}, display}));
+  seen.take({{}, display});
   EXPECT_THAT(seen.unseen(), IsEmpty());
 }
 

@@ -138,7 +138,7 @@ TEST(PlotRecorder, EachPathIsASeriesWithTheUnitOfItsFirstNumber) {
     Value display = Value::ofDictionary();
     display.dictionary()->set("Level", level);
     display.dictionary()->set("Band", band);
-    recorder.take(GenerationTree({time, display}));
+    recorder.take({time, display});
   };
   show({100, 500'000'000}, "unknown", "3");
   show({102, 500'000'000}, "-85 dBm", "7");
