@@ -137,6 +137,7 @@ CaptureReader::CaptureReader(const std::string& path) : _name(path == "-" ? "sta
   _file = file;
   auto shown = std::make_unique<ShownFile>(file);
   if (std::ferror(file)) throw CaptureError("cannot read " + _name + ": " + lastSystemError());
+  if (shown->header.bytes().empty()) throw CaptureError(_name + " is empty, and so no capture");
   const bool isOfLogChannel = shown->header.isOfLogChannel();
   if (isOfLogChannel) shown->header.announceLongRecords();
 

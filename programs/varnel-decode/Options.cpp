@@ -5,6 +5,8 @@
 #include <iostream>
 #include <limits>
 
+#include "programs/varnel-decode/ProgramError.h"
+
 namespace varnel {
 
 namespace {
@@ -90,6 +92,9 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
   if (wishes.isStatistics && !format.empty() && format != "text" && format != "json")
     return "--stats writes --format text or json only";
   if (std::ranges::any_of(options.captures, &std::string::empty)) return "the name of a capture is empty";
+  if (options.snapshotPath == "") return "--snapshot: the name of the file is empty";
+  if (options.binaryLogPath == "") return "--dlf: the name of the file is empty";
+  if (!wishes.plot.empty() && wishes.plot.front().empty()) return "--plot: the name of the file is empty";
   if (options.captures.size() < 2) return std::nullopt;
   if (format == "plist") return "--format plist takes one capture at a time";
   if (options.snapshotPath || options.binaryLogPath || !wishes.plot.empty())
@@ -119,24 +124,25 @@ void fulfil(Options& options, const Wishes& wishes) {
 }  // namespace
 
 ExitStatus mistake(const std::string& text) {
-  std::cerr << "varnel-decode: " << text << "; see varnel-decode --help\n";
+  std::cerr << programName << ": " << text << "; see varnel-decode --help\n";
   return {usageError};
 }
 
 std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
-                                              const std::vector<std::string>& technologies) {
+                                              const std::vector<std::string>& technologies,
+                                              const std::string& version) {
   Options options;
   Wishes wishes;
   CLI::App app("Decodes captures of the log channel and writes the last display to standard output.",
-               "varnel-decode");
+               programName);
   app.footer(examples);
+  app.set_version_flag("--version", programName + (" " + version));
   declareInput(app, options, technologies);
   declareOutput(app, options, wishes);
   try {
     app.parse(argumentCount, arguments);
-  } catch (const CLI::CallForHelp&) {
-    std::cout << app.help();
-    return ExitStatus{0};
+  } catch (const CLI::Success& wish) {  // help or version
+    return ExitStatus{app.exit(wish)};
   } catch (const CLI::ParseError& error) {
     return mistake(error.what());
   }

@@ -49,9 +49,10 @@ struct ExitStatus {
 /// Tells a mistake of the user as one line on standard error.
 ExitStatus mistake(const std::string& text);
 
-/// Reads the command line, which may name one of those technologies. Help goes to standard output, a mistake
-/// is one line on standard error.
+/// Reads the command line, which may name one of those technologies. Help and the version go to standard
+/// output, a mistake is one line on standard error.
 std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
-                                              const std::vector<std::string>& technologies);
+                                              const std::vector<std::string>& technologies,
+                                              const std::string& version);
 
 }  // namespace varnel

@@ -54,7 +54,8 @@ int run(int argumentCount, char** arguments) {
   std::ostream nowhere(nullptr);
   const Services services{resources, clock, application, nowhere};
 
-  const auto choice = readOptions(argumentCount, arguments, technologiesWithGenerator(services));
+  const auto choice = readOptions(argumentCount, arguments, technologiesWithGenerator(services),
+                                  application.version.value_or("(none)"));
   if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
   return decodeAll(std::get<Options>(choice), {services, clock});
 }

@@ -15,6 +15,7 @@ namespace varnel {
 namespace {
 
 using ::testing::HasSubstr;
+using ::testing::MatchesRegex;
 using ::testing::Not;
 using ::testing::StartsWith;
 
@@ -247,6 +248,10 @@ TEST_F(DecodeProgram, AWrongCommandLineIsOneLineAndStatusTwo) {
       {"--technology", "kalvi-lte", path, path, "--plot", folder.file("plot.svg"), "A/B"},
       {"--technology", "kalvi-lte", "--format", "plist", path, path},
       {"--technology", "kalvi-lte", "-", "-"},
+      {"--technology", "kalvi-lte", ""},
+      {"--technology", "kalvi-lte", "--snapshot", "", path},
+      {"--technology", "kalvi-lte", "--dlf", "", path},
+      {"--technology", "kalvi-lte", path, "--plot", "", "A/B"},
   };
   for (const auto& arguments : wrong) {
     const Result result = run(arguments);
@@ -272,6 +277,21 @@ TEST_F(DecodeProgram, HelpIsOnStandardOutput) {
   EXPECT_EQ(result.status, 0);
   EXPECT_THAT(result.output, HasSubstr("--snapshot"));
   EXPECT_EQ(result.error, "");
+}
+
+TEST_F(DecodeProgram, TheVersionIsOnStandardOutput) {
+  const Result result = run({"--version"});
+  EXPECT_EQ(result.status, 0);
+  EXPECT_THAT(result.output, MatchesRegex("varnel-decode [0-9]+\\.[0-9]+\\.[0-9]+\n"));
+  EXPECT_EQ(result.error, "");
+}
+
+TEST_F(DecodeProgram, AnEmptyFileIsNamedAsSuch) {
+  const std::string path = write("capture", "");
+  const Result result = run({"--technology", "kalvi-lte", path});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(result.error, "varnel-decode: " + path + " is empty, and so no capture\n");
+  EXPECT_EQ(result.output, "");
 }
 
 TEST_F(DecodeProgram, ASnapshotHoldsTheHistoryByTheCapturesClockAndTheBinaryLog) {
@@ -340,15 +360,21 @@ TEST_F(DecodeProgram, AnOutputThatCannotBeWrittenIsStatusOne) {
   }
 }
 
-TEST_F(DecodeProgram, AReaderThatHasLeftIsStatusOneAndNoSignal) {
+TEST_F(DecodeProgram, AReaderThatHasLeftIsStatusOneWithoutAWordAndNoSignal) {
   int ends[2];
   ASSERT_EQ(::pipe(ends), 0);
   ::close(ends[0]);
   ASSERT_LT(ends[1], 10) << "the shell takes one digit";
-  const Result result = runInShell(write("capture", pcapHeader()) + " >&" + std::to_string(ends[1]));
+  const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)));
+  const std::string dlf = folder.file("walk.dlf");
+  for (const std::string& options : {path, "--every " + path, "--csv A/B -- " + path,
+                                     "--jobs 2 " + path + " " + path, "--dlf " + dlf + " " + path}) {
+    const Result result = runInShell("--log-level -1 " + options + " >&" + std::to_string(ends[1]));
+    EXPECT_EQ(result.status, 1) << options;
+    EXPECT_EQ(result.error, "") << options;
+  }
   ::close(ends[1]);
-  EXPECT_EQ(result.status, 1);
-  EXPECT_THAT(result.error, HasSubstr("standard output"));
+  EXPECT_TRUE(std::filesystem::exists(dlf)) << "other outputs are written all the same";
 }
 
 }  // namespace
