@@ -2,6 +2,7 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -90,11 +91,23 @@ class Process {
 
   /// True when the program ends by itself within the time.
   bool waitForEnd(std::chrono::milliseconds within = std::chrono::seconds(30)) {
-    return eventually([this] { return _hasEnded || (_hasEnded = ::waitpid(_id, &_status, WNOHANG) == _id); },
-                      within);
+    return eventually(
+        [this] { return _hasEnded || (_hasEnded = ::wait4(_id, &_status, WNOHANG, &_usage) == _id); },
+        within);
   }
   /// The exit status of a program that has ended by itself; minus the signal that ended it otherwise.
   int exitStatus() const { return WIFEXITED(_status) ? WEXITSTATUS(_status) : -WTERMSIG(_status); }
+
+  /// The most memory that a program that has ended had at one time, in bytes; no less than what the test
+  /// itself had when it started the program.
+  std::size_t peakMemory() const { return static_cast<std::size_t>(_usage.ru_maxrss) * 1024; }
+  /// How long the processor worked for a program that has ended.
+  std::chrono::microseconds processorTime() const {
+    const auto sum = [](const timeval& time) {
+      return std::chrono::seconds(time.tv_sec) + std::chrono::microseconds(time.tv_usec);
+    };
+    return sum(_usage.ru_utime) + sum(_usage.ru_stime);
+  }
 
   std::string output() const { return contentsOf(_folder.file("output")); }
   std::string error() const { return contentsOf(_folder.file("error")); }
@@ -103,6 +116,7 @@ class Process {
   TemporaryFolder _folder;
   pid_t _id = -1;
   int _status = 0;
+  rusage _usage{};
   bool _hasEnded = false;
 };
 
