@@ -162,8 +162,10 @@ class InputDecoding {
     });
   }
 
-  // A cell may never have been met; more likely its name was mistyped.
+  // A cell may never have been met; more likely its name was mistyped. Nothing is known when not all was
+  // looked at.
   void tellUnseenPaths() const {
+    if (_isReportBroken) return;
     for (const std::string& path : _seen.unseen()) {
       std::fprintf(stderr,
                    "%s: no display of %s has a value under '%s'; --format paths shows what there is\n",

@@ -88,6 +88,16 @@ TEST_F(DecodeGenerations, AnOutputThatCannotBeWrittenIsOneLineAndStatusOne) {
   }
 }
 
+TEST_F(DecodeGenerations, WhenTheReaderLeavesTheRestIsNotReadAndNothingIsSaidOfIt) {
+  constexpr std::uint32_t displays = 10'000;  // whose lines are more than a pipe holds
+  std::string capture = pcapHeader();
+  for (std::uint32_t i = 0; i < displays; ++i) capture += pcapRecord(afternoon + 2 * i, 0, antennas(2));
+  const std::string path = write("capture", capture + "damaged");
+  const Result result = runInShell("--log-level -1 --csv A/B -- " + path + " | head -n 1");
+  EXPECT_EQ(result.output, "Time,A/B\n");
+  EXPECT_EQ(result.error, "");
+}
+
 TEST_F(DecodeGenerations, StatisticsCountEveryMessageOnce) {
   std::string capture = pcapHeader();
   for (const std::string& message :
