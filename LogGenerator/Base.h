@@ -62,7 +62,7 @@ class Base {
 
   void updateLogCodeDict(CodeDictionary& codeDict);
 
-  /// Both hold the array lock.
+  /// How a list section changes, under the array lock. The second one empties the array as well.
   static void clearElementsInArray(Array& array);
   static void replaceArray_With(Array& array, Array elements);
 

@@ -27,7 +27,7 @@ inline void logUnknownCode(std::uint32_t logCode) {
 
 /// The common steps of a decoder: its trace line, the log-code test, the length test, the handler. `Decoder`
 /// supplies `sectionName`, `traceLine` and the static function `handlers()`, the table of its log codes, and
-/// may replace the two constants below.
+/// may replace the two constants below. The table outlives the call: it is `static constexpr`.
 template <class Decoder>
 class SectionDecoder : public Base {
  public:

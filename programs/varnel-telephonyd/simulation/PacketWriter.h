@@ -20,6 +20,7 @@ class PacketWriter {
   /// A packet of that many bytes, all 0 behind the header.
   PacketWriter(LogType type, std::uint16_t code, std::chrono::milliseconds now, std::size_t size);
 
+  /// The low bytes of the number, of a negative one those of its two's complement.
   PacketWriter& u8(std::size_t offset, std::int64_t number) { return put(offset, 1, number); }
   PacketWriter& u16(std::size_t offset, std::int64_t number) { return put(offset, 2, number); }
   PacketWriter& u32(std::size_t offset, std::int64_t number) { return put(offset, 4, number); }
