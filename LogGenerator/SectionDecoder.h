@@ -2,6 +2,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <initializer_list>
 #include <string_view>
 #include <vector>
 
@@ -18,6 +19,11 @@ struct PacketHandler {
   void (Decoder::*decode)(const Packet& packet);
 };
 
+/// All log codes of a decoder, in the order in which it subscribes to them. As a static member it keeps its
+/// elements for the whole life of the program.
+template <class Decoder>
+using PacketHandlers = std::initializer_list<PacketHandler<Decoder>>;
+
 /// What becomes of a log code that a decoder does not list.
 enum class UnknownCodes { Logged, Ignored };
 
@@ -26,8 +32,8 @@ inline void logUnknownCode(std::uint32_t logCode) {
 }
 
 /// The common steps of a decoder: its trace line, the log-code test, the length test, the handler. `Decoder`
-/// supplies `sectionName`, `traceLine` and the static function `handlers()`, the table of its log codes, and
-/// may replace the two constants below. The table outlives the call: it is `static constexpr`.
+/// supplies the static members `sectionName`, `traceLine` and `handlers`, the table of its log codes, and may
+/// replace the two constants below.
 template <class Decoder>
 class SectionDecoder : public Base {
  public:
@@ -38,12 +44,12 @@ class SectionDecoder : public Base {
 
   std::vector<std::uint32_t> getLogCodeArray() const final {
     std::vector<std::uint32_t> codes;
-    for (const auto& handler : Decoder::handlers()) codes.push_back(handler.logCode);
+    for (const auto& handler : Decoder::handlers) codes.push_back(handler.logCode);
     return codes;
   }
 
   std::size_t minimumLength(std::uint32_t logCode) const final {
-    for (const auto& handler : Decoder::handlers()) {
+    for (const auto& handler : Decoder::handlers) {
       if (handler.logCode == logCode) return handler.minimumLength;
     }
     return 0;
@@ -51,7 +57,7 @@ class SectionDecoder : public Base {
 
   void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) final {
     logLine(Decoder::tracePriority, "%s", Decoder::traceLine);
-    for (const auto& handler : Decoder::handlers()) {
+    for (const auto& handler : Decoder::handlers) {
       if (handler.logCode != logCode) continue;
       if (packet.size() >= handler.minimumLength) (static_cast<Decoder*>(this)->*handler.decode)(packet);
       return;

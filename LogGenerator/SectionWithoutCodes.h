@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -12,7 +10,7 @@ template <class Decoder>
 class SectionWithoutCodes : public SectionDecoder<Decoder> {
  public:
   static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static std::span<const PacketHandler<Decoder>> handlers() { return {}; }
+  static constexpr PacketHandlers<Decoder> handlers = {};
 };
 
 }  // namespace varnel

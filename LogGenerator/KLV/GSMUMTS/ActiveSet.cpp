@@ -28,12 +28,9 @@ std::int32_t receivedSignalStrength(const Packet& packet) {
 
 }  // namespace
 
-std::span<const PacketHandler<ActiveSet>> ActiveSet::handlers() {
-  static constexpr PacketHandler<ActiveSet> table[] = {
-      {cellSet::logCode, cellSet::minimumSize, &ActiveSet::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<ActiveSet> ActiveSet::handlers = {
+    {cellSet::logCode, cellSet::minimumSize, &ActiveSet::update},
+};
 
 void ActiveSet::update(const Packet& packet) {
   clearElementsInArray(list());

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class ActiveSet final : public SectionDecoder<ActiveSet> {
  public:
   static constexpr std::string_view sectionName = "Active Set";
   static constexpr std::string_view traceLine = "ActiveSet";
-  static std::span<const PacketHandler<ActiveSet>> handlers();
+  static const PacketHandlers<ActiveSet> handlers;
 
  private:
   void update(const Packet& packet);

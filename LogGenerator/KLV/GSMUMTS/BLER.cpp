@@ -25,12 +25,9 @@ static_assert(within(channel, recordSize));
 
 }  // namespace
 
-std::span<const PacketHandler<BLER>> BLER::handlers() {
-  static constexpr PacketHandler<BLER> table[] = {
-      {logCode, minimumSize, &BLER::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<BLER> BLER::handlers = {
+    {logCode, minimumSize, &BLER::update},
+};
 
 void BLER::update(const Packet& packet) {
   setFields(rows(), packet, window);

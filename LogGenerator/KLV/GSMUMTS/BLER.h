@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class BLER final : public SectionDecoder<BLER> {
  public:
   static constexpr std::string_view sectionName = "BLER";
   static constexpr std::string_view traceLine = "BLER";
-  static std::span<const PacketHandler<BLER>> handlers();
+  static const PacketHandlers<BLER> handlers;
 
  private:
   void update(const Packet& packet);

@@ -2,7 +2,6 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <span>
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/SectionDecoder.h"
@@ -42,16 +41,13 @@ inline Packet energy(const Packet& packet, std::size_t index) {
 /// Kept: whatever the packet holds, the list becomes empty.
 template <class Decoder>
 class EmptyCellSet : public SectionDecoder<Decoder> {
- public:
-  static std::span<const PacketHandler<Decoder>> handlers() {
-    static constexpr PacketHandler<Decoder> table[] = {
-        {cellSet::logCode, cellSet::minimumSize, &EmptyCellSet::update},
-    };
-    return table;
-  }
-
  private:
   void update(const Packet&) { this->clearElementsInArray(this->list()); }
+
+ public:
+  static constexpr PacketHandlers<Decoder> handlers = {
+      {cellSet::logCode, cellSet::minimumSize, &EmptyCellSet::update},
+  };
 };
 
 }  // namespace varnel

@@ -18,12 +18,9 @@ std::int32_t everyOtherDigit(const Packet& entry, std::size_t first) {
 
 }  // namespace
 
-std::span<const PacketHandler<EquivalentPLMNList>> EquivalentPLMNList::handlers() {
-  static constexpr PacketHandler<EquivalentPLMNList> table[] = {
-      {logCode, minimumSize, &EquivalentPLMNList::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<EquivalentPLMNList> EquivalentPLMNList::handlers = {
+    {logCode, minimumSize, &EquivalentPLMNList::update},
+};
 
 void EquivalentPLMNList::update(const Packet& packet) {
   clearElementsInArray(list());

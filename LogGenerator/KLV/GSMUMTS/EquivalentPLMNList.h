@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class EquivalentPLMNList final : public SectionDecoder<EquivalentPLMNList> {
  public:
   static constexpr std::string_view sectionName = "Equivalent PLMN List";
   static constexpr std::string_view traceLine = "Equivalent PLMN List";
-  static std::span<const PacketHandler<EquivalentPLMNList>> handlers();
+  static const PacketHandlers<EquivalentPLMNList> handlers;
 
  private:
   void update(const Packet& packet);

@@ -94,19 +94,16 @@ static_assert(within(reselection, gsmMeasurement::minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<GPRSInformation>> GPRSInformation::handlers() {
-  static constexpr PacketHandler<GPRSInformation> table[] = {
-      {packetControlLogCode, packetControlSize, &GPRSInformation::updatePacketControl},
-      {networkIdentity::logCode, networkIdentity::minimumSize, &GPRSInformation::updateOperatingMode},
-      {gprsCellOptions::logCode, gprsCellOptions::minimumSize, &GPRSInformation::updateCellOptions},
-      {controlChannelLogCode, controlChannelSize, &GPRSInformation::updateControlChannel},
-      {packetSystemInformationLogCode, packetSystemInformationSize,
-       &GPRSInformation::updatePacketSystemInformation},
-      {systemInformation13LogCode, systemInformation13Size, &GPRSInformation::updateSystemInformation13},
-      {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &GPRSInformation::updateReselection},
-  };
-  return table;
-}
+constinit const PacketHandlers<GPRSInformation> GPRSInformation::handlers = {
+    {packetControlLogCode, packetControlSize, &GPRSInformation::updatePacketControl},
+    {networkIdentity::logCode, networkIdentity::minimumSize, &GPRSInformation::updateOperatingMode},
+    {gprsCellOptions::logCode, gprsCellOptions::minimumSize, &GPRSInformation::updateCellOptions},
+    {controlChannelLogCode, controlChannelSize, &GPRSInformation::updateControlChannel},
+    {packetSystemInformationLogCode, packetSystemInformationSize,
+     &GPRSInformation::updatePacketSystemInformation},
+    {systemInformation13LogCode, systemInformation13Size, &GPRSInformation::updateSystemInformation13},
+    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &GPRSInformation::updateReselection},
+};
 
 void GPRSInformation::updatePacketControl(const Packet& packet) { setFields(rows(), packet, packetControl); }
 

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class GPRSInformation final : public SectionDecoder<GPRSInformation> {
  public:
   static constexpr std::string_view sectionName = "GPRS Information";
   static constexpr std::string_view traceLine = "GPRSInformation";
-  static std::span<const PacketHandler<GPRSInformation>> handlers();
+  static const PacketHandlers<GPRSInformation> handlers;
 
  private:
   void updatePacketControl(const Packet& packet);

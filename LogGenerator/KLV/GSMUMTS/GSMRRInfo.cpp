@@ -69,15 +69,12 @@ static_assert(within(reception, gprsCellOptions::minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<GSMRRInfo>> GSMRRInfo::handlers() {
-  static constexpr PacketHandler<GSMRRInfo> table[] = {
-      {stateLogCode, stateSize, &GSMRRInfo::updateState},
-      {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &GSMRRInfo::updateMeasurement},
-      {transmissionLogCode, transmissionSize, &GSMRRInfo::updateTransmission},
-      {gprsCellOptions::logCode, gprsCellOptions::minimumSize, &GSMRRInfo::updateReception},
-  };
-  return table;
-}
+constinit const PacketHandlers<GSMRRInfo> GSMRRInfo::handlers = {
+    {stateLogCode, stateSize, &GSMRRInfo::updateState},
+    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &GSMRRInfo::updateMeasurement},
+    {transmissionLogCode, transmissionSize, &GSMRRInfo::updateTransmission},
+    {gprsCellOptions::logCode, gprsCellOptions::minimumSize, &GSMRRInfo::updateReception},
+};
 
 void GSMRRInfo::updateState(const Packet& packet) { setFields(rows(), packet, state); }
 

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class GSMRRInfo final : public SectionDecoder<GSMRRInfo> {
  public:
   static constexpr std::string_view sectionName = "GSM RR Info";
   static constexpr std::string_view traceLine = "GSMRRInfo";
-  static std::span<const PacketHandler<GSMRRInfo>> handlers();
+  static const PacketHandlers<GSMRRInfo> handlers;
 
  private:
   void updateState(const Packet& packet);

@@ -44,15 +44,12 @@ constexpr CellMonitorRow cellMonitorRows[] = {
 
 }  // namespace
 
-std::span<const PacketHandler<GSMServingCell>> GSMServingCell::handlers() {
-  static constexpr PacketHandler<GSMServingCell> table[] = {
-      {identityLogCode, identitySize, &GSMServingCell::updateIdentity},
-      {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &GSMServingCell::updateMeasurement},
-      {dedicatedChannelLogCode, dedicatedChannelSize, &GSMServingCell::updateDedicatedChannel},
-      {cellMonitorLogCode, 0, &GSMServingCell::updateFromCellMonitor},
-  };
-  return table;
-}
+constinit const PacketHandlers<GSMServingCell> GSMServingCell::handlers = {
+    {identityLogCode, identitySize, &GSMServingCell::updateIdentity},
+    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &GSMServingCell::updateMeasurement},
+    {dedicatedChannelLogCode, dedicatedChannelSize, &GSMServingCell::updateDedicatedChannel},
+    {cellMonitorLogCode, 0, &GSMServingCell::updateFromCellMonitor},
+};
 
 void GSMServingCell::updateIdentity(const Packet& packet) { setFields(rows(), packet, identity); }
 

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/KLV/CellMonitor.h"
 #include "LogGenerator/SectionDecoder.h"
 
@@ -12,7 +10,7 @@ class GSMServingCell final : public SectionDecoder<GSMServingCell> {
  public:
   static constexpr std::string_view sectionName = "GSM Serving Cell";
   static constexpr std::string_view traceLine = "GSMServingCell";
-  static std::span<const PacketHandler<GSMServingCell>> handlers();
+  static const PacketHandlers<GSMServingCell> handlers;
 
   explicit GSMServingCell(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
 

@@ -19,12 +19,9 @@ static_assert(within(cell, recordSize));
 
 }  // namespace
 
-std::span<const PacketHandler<GSMSet>> GSMSet::handlers() {
-  static constexpr PacketHandler<GSMSet> table[] = {
-      {cellRanking::logCode, cellRanking::minimumSize, &GSMSet::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<GSMSet> GSMSet::handlers = {
+    {cellRanking::logCode, cellRanking::minimumSize, &GSMSet::update},
+};
 
 void GSMSet::update(const Packet& packet) {
   using namespace cellRanking;

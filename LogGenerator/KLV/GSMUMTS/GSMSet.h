@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class GSMSet final : public SectionDecoder<GSMSet> {
  public:
   static constexpr std::string_view sectionName = "GSM Set";
   static constexpr std::string_view traceLine = "GSMSet";
-  static std::span<const PacketHandler<GSMSet>> handlers();
+  static const PacketHandlers<GSMSet> handlers;
 
  private:
   void update(const Packet& packet);

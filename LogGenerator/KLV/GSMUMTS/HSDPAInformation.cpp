@@ -41,12 +41,9 @@ void showProcesses(Dictionary& section, std::string_view label, const Packet& pa
 
 }  // namespace
 
-std::span<const PacketHandler<HSDPAInformation>> HSDPAInformation::handlers() {
-  static constexpr PacketHandler<HSDPAInformation> table[] = {
-      {logCode, minimumSize, &HSDPAInformation::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<HSDPAInformation> HSDPAInformation::handlers = {
+    {logCode, minimumSize, &HSDPAInformation::update},
+};
 
 void HSDPAInformation::update(const Packet& packet) {
   setFields(rows(), packet, configuration);

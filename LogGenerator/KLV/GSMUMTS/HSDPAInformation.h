@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -12,7 +10,7 @@ class HSDPAInformation final : public SectionDecoder<HSDPAInformation> {
   static constexpr std::string_view sectionName = "HSDPA Info";
   static constexpr std::string_view traceLine = "HSDPA Info";
   static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static std::span<const PacketHandler<HSDPAInformation>> handlers();
+  static const PacketHandlers<HSDPAInformation> handlers;
 
  private:
   void update(const Packet& packet);

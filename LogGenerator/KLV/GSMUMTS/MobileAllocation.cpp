@@ -20,12 +20,9 @@ static_assert(within(hopping, minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<MobileAllocation>> MobileAllocation::handlers() {
-  static constexpr PacketHandler<MobileAllocation> table[] = {
-      {logCode, minimumSize, &MobileAllocation::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<MobileAllocation> MobileAllocation::handlers = {
+    {logCode, minimumSize, &MobileAllocation::update},
+};
 
 void MobileAllocation::update(const Packet& packet) {
   setFields(rows(), packet, hopping);

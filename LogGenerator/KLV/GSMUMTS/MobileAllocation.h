@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class MobileAllocation final : public SectionDecoder<MobileAllocation> {
  public:
   static constexpr std::string_view sectionName = "Mobile Allocation";
   static constexpr std::string_view traceLine = "MobileAllocation";
-  static std::span<const PacketHandler<MobileAllocation>> handlers();
+  static const PacketHandlers<MobileAllocation> handlers;
 
  private:
   void update(const Packet& packet);

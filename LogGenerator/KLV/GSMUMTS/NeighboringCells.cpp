@@ -32,14 +32,11 @@ constexpr CellMonitorColumn cellMonitorColumns[] = {
 
 }  // namespace
 
-std::span<const PacketHandler<NeighboringCells>> NeighboringCells::handlers() {
-  static constexpr PacketHandler<NeighboringCells> table[] = {
-      {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &NeighboringCells::updateMeasurements},
-      {identityCodesLogCode, identityCodesSize, &NeighboringCells::updateIdentityCodes},
-      {cellMonitorLogCode, 0, &NeighboringCells::updateFromCellMonitor},
-  };
-  return table;
-}
+constinit const PacketHandlers<NeighboringCells> NeighboringCells::handlers = {
+    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &NeighboringCells::updateMeasurements},
+    {identityCodesLogCode, identityCodesSize, &NeighboringCells::updateIdentityCodes},
+    {cellMonitorLogCode, 0, &NeighboringCells::updateFromCellMonitor},
+};
 
 void NeighboringCells::updateMeasurements(const Packet& packet) {
   using namespace gsmMeasurement;

@@ -1,7 +1,6 @@
 #pragma once
 
 #include <cstdint>
-#include <span>
 #include <unordered_map>
 
 #include "LogGenerator/KLV/CellMonitor.h"
@@ -14,7 +13,7 @@ class NeighboringCells final : public SectionDecoder<NeighboringCells> {
  public:
   static constexpr std::string_view sectionName = "Neighboring Cells";
   static constexpr std::string_view traceLine = "NeighboringCells";
-  static std::span<const PacketHandler<NeighboringCells>> handlers();
+  static const PacketHandlers<NeighboringCells> handlers;
 
   explicit NeighboringCells(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
 

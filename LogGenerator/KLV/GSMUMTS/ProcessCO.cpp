@@ -14,13 +14,10 @@ static_assert(within(state, mmState::minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<ProcessCO>> ProcessCO::handlers() {
-  static constexpr PacketHandler<ProcessCO> table[] = {
-      {mmState::logCode, mmState::minimumSize, &ProcessCO::updateState},
-      {registration::logCode, registration::minimumSize, &ProcessCO::updateRegistration},
-  };
-  return table;
-}
+constinit const PacketHandlers<ProcessCO> ProcessCO::handlers = {
+    {mmState::logCode, mmState::minimumSize, &ProcessCO::updateState},
+    {registration::logCode, registration::minimumSize, &ProcessCO::updateRegistration},
+};
 
 void ProcessCO::updateState(const Packet& packet) { setFields(rows(), packet, state); }
 

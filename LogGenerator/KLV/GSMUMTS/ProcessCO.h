@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -12,7 +10,7 @@ class ProcessCO final : public SectionDecoder<ProcessCO> {
   static constexpr std::string_view sectionName = "Process CO";
   // Kept: the text of `ProcessCS`.
   static constexpr std::string_view traceLine = "ProcessCS";
-  static std::span<const PacketHandler<ProcessCO>> handlers();
+  static const PacketHandlers<ProcessCO> handlers;
 
  private:
   void updateState(const Packet& packet);

@@ -31,13 +31,10 @@ static_assert(within(state, mmState::minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<ProcessCS>> ProcessCS::handlers() {
-  static constexpr PacketHandler<ProcessCS> table[] = {
-      {mmState::logCode, mmState::minimumSize, &ProcessCS::updateState},
-      {registration::logCode, registration::minimumSize, &ProcessCS::updateRegistration},
-  };
-  return table;
-}
+constinit const PacketHandlers<ProcessCS> ProcessCS::handlers = {
+    {mmState::logCode, mmState::minimumSize, &ProcessCS::updateState},
+    {registration::logCode, registration::minimumSize, &ProcessCS::updateRegistration},
+};
 
 void ProcessCS::updateState(const Packet& packet) { setFields(rows(), packet, state); }
 

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class ProcessCS final : public SectionDecoder<ProcessCS> {
  public:
   static constexpr std::string_view sectionName = "Process CS";
   static constexpr std::string_view traceLine = "ProcessCS";
-  static std::span<const PacketHandler<ProcessCS>> handlers();
+  static const PacketHandlers<ProcessCS> handlers;
 
  private:
   void updateState(const Packet& packet);

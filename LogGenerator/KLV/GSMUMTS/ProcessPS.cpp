@@ -54,13 +54,10 @@ static_assert(within(state, minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<ProcessPS>> ProcessPS::handlers() {
-  static constexpr PacketHandler<ProcessPS> table[] = {
-      {logCode, minimumSize, &ProcessPS::updateState},
-      {registration::logCode, registration::minimumSize, &ProcessPS::updateRegistration},
-  };
-  return table;
-}
+constinit const PacketHandlers<ProcessPS> ProcessPS::handlers = {
+    {logCode, minimumSize, &ProcessPS::updateState},
+    {registration::logCode, registration::minimumSize, &ProcessPS::updateRegistration},
+};
 
 void ProcessPS::updateState(const Packet& packet) { setFields(rows(), packet, state); }
 

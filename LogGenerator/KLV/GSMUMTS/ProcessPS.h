@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class ProcessPS final : public SectionDecoder<ProcessPS> {
  public:
   static constexpr std::string_view sectionName = "Process PS";
   static constexpr std::string_view traceLine = "ProcessPS";
-  static std::span<const PacketHandler<ProcessPS>> handlers();
+  static const PacketHandlers<ProcessPS> handlers;
 
  private:
   void updateState(const Packet& packet);

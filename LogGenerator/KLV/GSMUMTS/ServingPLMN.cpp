@@ -57,14 +57,11 @@ const Dictionary* servingCell(const Array& records) {
 
 }  // namespace
 
-std::span<const PacketHandler<ServingPLMN>> ServingPLMN::handlers() {
-  static constexpr PacketHandler<ServingPLMN> table[] = {
-      {networkIdentity::logCode, networkIdentity::minimumSize, &ServingPLMN::updateIdentity},
-      {registration::logCode, registration::minimumSize, &ServingPLMN::updateSelectionMode},
-      {cellMonitorLogCode, 0, &ServingPLMN::updateFromCellMonitor},
-  };
-  return table;
-}
+constinit const PacketHandlers<ServingPLMN> ServingPLMN::handlers = {
+    {networkIdentity::logCode, networkIdentity::minimumSize, &ServingPLMN::updateIdentity},
+    {registration::logCode, registration::minimumSize, &ServingPLMN::updateSelectionMode},
+    {cellMonitorLogCode, 0, &ServingPLMN::updateFromCellMonitor},
+};
 
 void ServingPLMN::updateIdentity(const Packet& packet) {
   const auto nibble = [&](std::size_t byte, unsigned firstBit) {

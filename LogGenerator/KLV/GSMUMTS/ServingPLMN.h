@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/KLV/CellMonitor.h"
 #include "LogGenerator/SectionDecoder.h"
 
@@ -12,7 +10,7 @@ class ServingPLMN final : public SectionDecoder<ServingPLMN> {
  public:
   static constexpr std::string_view sectionName = "Serving PLMN";
   static constexpr std::string_view traceLine = "Serving PLMN";
-  static std::span<const PacketHandler<ServingPLMN>> handlers();
+  static const PacketHandlers<ServingPLMN> handlers;
 
   explicit ServingPLMN(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
 

@@ -73,16 +73,13 @@ double meanTransmitPower(const Packet& packet) {
 
 }  // namespace
 
-std::span<const PacketHandler<UMTSRRInfo>> UMTSRRInfo::handlers() {
-  static constexpr PacketHandler<UMTSRRInfo> table[] = {
-      {stateLogCode, stateSize, &UMTSRRInfo::updateState},
-      {transmitPowerLogCode, transmitPowerSize, &UMTSRRInfo::updateTransmitPower},
-      {servingCellLogCode, servingCellSize, &UMTSRRInfo::updateServingCell},
-      {cipheringLogCode, cipheringSize, &UMTSRRInfo::updateCiphering},
-      {cellMonitorLogCode, 0, &UMTSRRInfo::updateFromCellMonitor},
-  };
-  return table;
-}
+constinit const PacketHandlers<UMTSRRInfo> UMTSRRInfo::handlers = {
+    {stateLogCode, stateSize, &UMTSRRInfo::updateState},
+    {transmitPowerLogCode, transmitPowerSize, &UMTSRRInfo::updateTransmitPower},
+    {servingCellLogCode, servingCellSize, &UMTSRRInfo::updateServingCell},
+    {cipheringLogCode, cipheringSize, &UMTSRRInfo::updateCiphering},
+    {cellMonitorLogCode, 0, &UMTSRRInfo::updateFromCellMonitor},
+};
 
 void UMTSRRInfo::updateState(const Packet& packet) { setFields(rows(), packet, state); }
 

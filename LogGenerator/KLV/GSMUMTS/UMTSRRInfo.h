@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/KLV/CellMonitor.h"
 #include "LogGenerator/SectionDecoder.h"
 
@@ -12,7 +10,7 @@ class UMTSRRInfo final : public SectionDecoder<UMTSRRInfo> {
  public:
   static constexpr std::string_view sectionName = "UMTS RR Info";
   static constexpr std::string_view traceLine = "UMTSRRInfo";
-  static std::span<const PacketHandler<UMTSRRInfo>> handlers();
+  static const PacketHandlers<UMTSRRInfo> handlers;
 
   explicit UMTSRRInfo(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
 

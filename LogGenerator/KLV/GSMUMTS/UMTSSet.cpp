@@ -33,13 +33,10 @@ constexpr CellMonitorColumn cellMonitorColumns[] = {
 
 }  // namespace
 
-std::span<const PacketHandler<UMTSSet>> UMTSSet::handlers() {
-  static constexpr PacketHandler<UMTSSet> table[] = {
-      {cellRanking::logCode, cellRanking::minimumSize, &UMTSSet::updateFromRanking},
-      {cellMonitorLogCode, 0, &UMTSSet::updateFromCellMonitor},
-  };
-  return table;
-}
+constinit const PacketHandlers<UMTSSet> UMTSSet::handlers = {
+    {cellRanking::logCode, cellRanking::minimumSize, &UMTSSet::updateFromRanking},
+    {cellMonitorLogCode, 0, &UMTSSet::updateFromCellMonitor},
+};
 
 void UMTSSet::updateFromRanking(const Packet& packet) {
   using namespace cellRanking;

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/KLV/CellMonitor.h"
 #include "LogGenerator/SectionDecoder.h"
 
@@ -12,7 +10,7 @@ class UMTSSet final : public SectionDecoder<UMTSSet> {
  public:
   static constexpr std::string_view sectionName = "UMTS Set";
   static constexpr std::string_view traceLine = "UMTSSet";
-  static std::span<const PacketHandler<UMTSSet>> handlers();
+  static const PacketHandlers<UMTSSet> handlers;
 
   explicit UMTSSet(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
 

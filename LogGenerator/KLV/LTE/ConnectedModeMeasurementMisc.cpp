@@ -21,13 +21,10 @@ static_assert(within(servingCell, connectedModeMeasurement::minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<ConnectedModeMeasurementMisc>> ConnectedModeMeasurementMisc::handlers() {
-  static constexpr PacketHandler<ConnectedModeMeasurementMisc> table[] = {
-      {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize,
-       &ConnectedModeMeasurementMisc::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<ConnectedModeMeasurementMisc> ConnectedModeMeasurementMisc::handlers = {
+    {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize,
+     &ConnectedModeMeasurementMisc::update},
+};
 
 void ConnectedModeMeasurementMisc::update(const Packet& packet) { setFields(rows(), packet, servingCell); }
 

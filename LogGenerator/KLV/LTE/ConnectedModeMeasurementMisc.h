@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class ConnectedModeMeasurementMisc final : public SectionDecoder<ConnectedModeMe
  public:
   static constexpr std::string_view sectionName = "Connected mode LTE Intra-frequency Measurement";
   static constexpr std::string_view traceLine = "Connected mode LTE Intra-frequency Measurement";
-  static std::span<const PacketHandler<ConnectedModeMeasurementMisc>> handlers();
+  static const PacketHandlers<ConnectedModeMeasurementMisc> handlers;
 
  private:
   void update(const Packet& packet);

@@ -14,12 +14,9 @@ static_assert(within(detectedCell, connectedModeMeasurement::detectedCellSize));
 
 }  // namespace
 
-std::span<const PacketHandler<DetectedCells>> DetectedCells::handlers() {
-  static constexpr PacketHandler<DetectedCells> table[] = {
-      {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize, &DetectedCells::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<DetectedCells> DetectedCells::handlers = {
+    {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize, &DetectedCells::update},
+};
 
 void DetectedCells::update(const Packet& packet) {
   using namespace connectedModeMeasurement;

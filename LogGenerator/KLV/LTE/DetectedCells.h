@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class DetectedCells final : public SectionDecoder<DetectedCells> {
  public:
   static constexpr std::string_view sectionName = "Detected Cells";
   static constexpr std::string_view traceLine = "Detected Cells";
-  static std::span<const PacketHandler<DetectedCells>> handlers();
+  static const PacketHandlers<DetectedCells> handlers;
 
  private:
   void update(const Packet& packet);

@@ -53,14 +53,11 @@ constexpr CellMonitorRow cellMonitorRows[] = {
 
 }  // namespace
 
-std::span<const PacketHandler<LTEServingCellInfo>> LTEServingCellInfo::handlers() {
-  static constexpr PacketHandler<LTEServingCellInfo> table[] = {
-      {identityLogCode, identitySize, &LTEServingCellInfo::updateIdentity},
-      {transmitAntennasLogCode, transmitAntennasSize, &LTEServingCellInfo::updateTransmitAntennas},
-      {cellMonitorLogCode, 0, &LTEServingCellInfo::updateFromCellMonitor},
-  };
-  return table;
-}
+constinit const PacketHandlers<LTEServingCellInfo> LTEServingCellInfo::handlers = {
+    {identityLogCode, identitySize, &LTEServingCellInfo::updateIdentity},
+    {transmitAntennasLogCode, transmitAntennasSize, &LTEServingCellInfo::updateTransmitAntennas},
+    {cellMonitorLogCode, 0, &LTEServingCellInfo::updateFromCellMonitor},
+};
 
 void LTEServingCellInfo::updateIdentity(const Packet& packet) {
   setFields(rows(), packet, cellAndChannels);

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -12,7 +10,7 @@ class LTEServingCellInfo final : public SectionDecoder<LTEServingCellInfo> {
  public:
   static constexpr std::string_view sectionName = "Serving Cell Info";
   static constexpr std::string_view traceLine = "LTE Serving Cell Info";
-  static std::span<const PacketHandler<LTEServingCellInfo>> handlers();
+  static const PacketHandlers<LTEServingCellInfo> handlers;
 
  private:
   void updateIdentity(const Packet& packet);

@@ -16,13 +16,10 @@ static_assert(within(neighbor, connectedModeMeasurement::neighborSize));
 
 }  // namespace
 
-std::span<const PacketHandler<MeasuredNeighborCells>> MeasuredNeighborCells::handlers() {
-  static constexpr PacketHandler<MeasuredNeighborCells> table[] = {
-      {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize,
-       &MeasuredNeighborCells::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<MeasuredNeighborCells> MeasuredNeighborCells::handlers = {
+    {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize,
+     &MeasuredNeighborCells::update},
+};
 
 void MeasuredNeighborCells::update(const Packet& packet) {
   using namespace connectedModeMeasurement;

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class MeasuredNeighborCells final : public SectionDecoder<MeasuredNeighborCells>
  public:
   static constexpr std::string_view sectionName = "Measured Neighbor Cells";
   static constexpr std::string_view traceLine = "Measured Neighbor Cells";
-  static std::span<const PacketHandler<MeasuredNeighborCells>> handlers();
+  static const PacketHandlers<MeasuredNeighborCells> handlers;
 
  private:
   void update(const Packet& packet);

@@ -45,12 +45,9 @@ void trace(const Packet& record) {
 
 }  // namespace
 
-std::span<const PacketHandler<NeighborCellsList>> NeighborCellsList::handlers() {
-  static constexpr PacketHandler<NeighborCellsList> table[] = {
-      {neighborMeasurement::logCode, neighborMeasurement::minimumSize, &NeighborCellsList::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<NeighborCellsList> NeighborCellsList::handlers = {
+    {neighborMeasurement::logCode, neighborMeasurement::minimumSize, &NeighborCellsList::update},
+};
 
 void NeighborCellsList::update(const Packet& packet) {
   clearElementsInArray(list());

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class NeighborCellsList final : public SectionDecoder<NeighborCellsList> {
  public:
   static constexpr std::string_view sectionName = "Neighbor Cells List";
   static constexpr std::string_view traceLine = "Neighbor Cells List";
-  static std::span<const PacketHandler<NeighborCellsList>> handlers();
+  static const PacketHandlers<NeighborCellsList> handlers;
 
  private:
   void update(const Packet& packet);

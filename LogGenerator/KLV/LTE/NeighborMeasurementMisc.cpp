@@ -16,12 +16,9 @@ static_assert(within(frequency, neighborMeasurement::minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<NeighborMeasurementMisc>> NeighborMeasurementMisc::handlers() {
-  static constexpr PacketHandler<NeighborMeasurementMisc> table[] = {
-      {neighborMeasurement::logCode, neighborMeasurement::minimumSize, &NeighborMeasurementMisc::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<NeighborMeasurementMisc> NeighborMeasurementMisc::handlers = {
+    {neighborMeasurement::logCode, neighborMeasurement::minimumSize, &NeighborMeasurementMisc::update},
+};
 
 void NeighborMeasurementMisc::update(const Packet& packet) { setFields(rows(), packet, frequency); }
 

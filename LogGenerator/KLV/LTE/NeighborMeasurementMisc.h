@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class NeighborMeasurementMisc final : public SectionDecoder<NeighborMeasurementM
  public:
   static constexpr std::string_view sectionName = "Neighbor Measurements";
   static constexpr std::string_view traceLine = "Neighbor Measurements";
-  static std::span<const PacketHandler<NeighborMeasurementMisc>> handlers();
+  static const PacketHandlers<NeighborMeasurementMisc> handlers;
 
  private:
   void update(const Packet& packet);

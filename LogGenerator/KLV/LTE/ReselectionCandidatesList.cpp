@@ -51,13 +51,9 @@ constexpr Cell cells[] = {
 
 }  // namespace
 
-std::span<const PacketHandler<ReselectionCandidatesList>> ReselectionCandidatesList::handlers() {
-  static constexpr PacketHandler<ReselectionCandidatesList> table[] = {
-      {reselectionCandidates::logCode, reselectionCandidates::minimumSize,
-       &ReselectionCandidatesList::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<ReselectionCandidatesList> ReselectionCandidatesList::handlers = {
+    {reselectionCandidates::logCode, reselectionCandidates::minimumSize, &ReselectionCandidatesList::update},
+};
 
 void ReselectionCandidatesList::update(const Packet& packet) {
   clearElementsInArray(list());

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class ReselectionCandidatesList final : public SectionDecoder<ReselectionCandida
  public:
   static constexpr std::string_view sectionName = "Reselection Candidates List";
   static constexpr std::string_view traceLine = "Reselection Candidates List";
-  static std::span<const PacketHandler<ReselectionCandidatesList>> handlers();
+  static const PacketHandlers<ReselectionCandidatesList> handlers;
 
  private:
   void update(const Packet& packet);

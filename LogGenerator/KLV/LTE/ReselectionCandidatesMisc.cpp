@@ -16,13 +16,9 @@ static_assert(within(servingCell, reselectionCandidates::minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<ReselectionCandidatesMisc>> ReselectionCandidatesMisc::handlers() {
-  static constexpr PacketHandler<ReselectionCandidatesMisc> table[] = {
-      {reselectionCandidates::logCode, reselectionCandidates::minimumSize,
-       &ReselectionCandidatesMisc::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<ReselectionCandidatesMisc> ReselectionCandidatesMisc::handlers = {
+    {reselectionCandidates::logCode, reselectionCandidates::minimumSize, &ReselectionCandidatesMisc::update},
+};
 
 void ReselectionCandidatesMisc::update(const Packet& packet) { setFields(rows(), packet, servingCell); }
 

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class ReselectionCandidatesMisc final : public SectionDecoder<ReselectionCandida
  public:
   static constexpr std::string_view sectionName = "Reselection Candidates";
   static constexpr std::string_view traceLine = "Reselection Candidates";
-  static std::span<const PacketHandler<ReselectionCandidatesMisc>> handlers();
+  static const PacketHandlers<ReselectionCandidatesMisc> handlers;
 
  private:
   void update(const Packet& packet);

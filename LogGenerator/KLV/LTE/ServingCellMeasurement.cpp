@@ -42,12 +42,9 @@ static_assert(within(measurement, minimumSize));
 
 }  // namespace
 
-std::span<const PacketHandler<ServingCellMeasurement>> ServingCellMeasurement::handlers() {
-  static constexpr PacketHandler<ServingCellMeasurement> table[] = {
-      {logCode, minimumSize, &ServingCellMeasurement::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<ServingCellMeasurement> ServingCellMeasurement::handlers = {
+    {logCode, minimumSize, &ServingCellMeasurement::update},
+};
 
 void ServingCellMeasurement::update(const Packet& packet) { setFields(rows(), packet, measurement); }
 

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -11,7 +9,7 @@ class ServingCellMeasurement final : public SectionDecoder<ServingCellMeasuremen
  public:
   static constexpr std::string_view sectionName = "Serving Cell Measurements";
   static constexpr std::string_view traceLine = "Serving Cell Measurements";
-  static std::span<const PacketHandler<ServingCellMeasurement>> handlers();
+  static const PacketHandlers<ServingCellMeasurement> handlers;
 
  private:
   void update(const Packet& packet);

@@ -27,12 +27,9 @@ Value ratios(const Packet& record) {
 
 }  // namespace
 
-std::span<const PacketHandler<CCTRCHSIRMeasurement>> CCTRCHSIRMeasurement::handlers() {
-  static constexpr PacketHandler<CCTRCHSIRMeasurement> table[] = {
-      {transportChannels::logCode, transportChannels::minimumSize, &CCTRCHSIRMeasurement::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<CCTRCHSIRMeasurement> CCTRCHSIRMeasurement::handlers = {
+    {transportChannels::logCode, transportChannels::minimumSize, &CCTRCHSIRMeasurement::update},
+};
 
 void CCTRCHSIRMeasurement::update(const Packet& packet) {
   using namespace transportChannels;

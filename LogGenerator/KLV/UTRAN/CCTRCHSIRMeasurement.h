@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -12,7 +10,7 @@ class CCTRCHSIRMeasurement final : public SectionDecoder<CCTRCHSIRMeasurement> {
   static constexpr std::string_view sectionName = "CCTRCH SIR";
   static constexpr std::string_view traceLine = "CCTRCH SIR Measurement";
   static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static std::span<const PacketHandler<CCTRCHSIRMeasurement>> handlers();
+  static const PacketHandlers<CCTRCHSIRMeasurement> handlers;
 
  private:
   void update(const Packet& packet);

@@ -24,12 +24,9 @@ static_assert(within(cell, recordSize));
 
 }  // namespace
 
-std::span<const PacketHandler<GSMNeighbhorMeasurements>> GSMNeighbhorMeasurements::handlers() {
-  static constexpr PacketHandler<GSMNeighbhorMeasurements> table[] = {
-      {logCode, minimumSize, &GSMNeighbhorMeasurements::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<GSMNeighbhorMeasurements> GSMNeighbhorMeasurements::handlers = {
+    {logCode, minimumSize, &GSMNeighbhorMeasurements::update},
+};
 
 void GSMNeighbhorMeasurements::update(const Packet& packet) {
   clearElementsInArray(list());

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -12,7 +10,7 @@ class GSMNeighbhorMeasurements final : public SectionDecoder<GSMNeighbhorMeasure
   static constexpr std::string_view sectionName = "GSM Neighbor Cell List";
   static constexpr std::string_view traceLine = "GSM Neighbor Cell List";
   static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static std::span<const PacketHandler<GSMNeighbhorMeasurements>> handlers();
+  static const PacketHandlers<GSMNeighbhorMeasurements> handlers;
 
  private:
   void update(const Packet& packet);

@@ -24,12 +24,9 @@ std::uint8_t rrcMode(const Packet& packet) {
 
 }  // namespace
 
-std::span<const PacketHandler<RRC_State>> RRC_State::handlers() {
-  static constexpr PacketHandler<RRC_State> table[] = {
-      {logCode, 0, &RRC_State::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<RRC_State> RRC_State::handlers = {
+    {logCode, 0, &RRC_State::update},
+};
 
 void RRC_State::update(const Packet& packet) {
   // Kept: a short packet is only warned of, and then decoded as far as it goes.

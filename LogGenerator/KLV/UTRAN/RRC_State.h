@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -12,7 +10,7 @@ class RRC_State final : public SectionDecoder<RRC_State> {
   static constexpr std::string_view sectionName = "RRC Info";
   static constexpr std::string_view traceLine = "RRC Info";
   static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static std::span<const PacketHandler<RRC_State>> handlers();
+  static const PacketHandlers<RRC_State> handlers;
 
  private:
   void update(const Packet& packet);

@@ -15,12 +15,9 @@ static_assert(within(channel, transportChannels::transportChannelSize));
 
 }  // namespace
 
-std::span<const PacketHandler<TRCHBLERMeasurement>> TRCHBLERMeasurement::handlers() {
-  static constexpr PacketHandler<TRCHBLERMeasurement> table[] = {
-      {transportChannels::logCode, transportChannels::minimumSize, &TRCHBLERMeasurement::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<TRCHBLERMeasurement> TRCHBLERMeasurement::handlers = {
+    {transportChannels::logCode, transportChannels::minimumSize, &TRCHBLERMeasurement::update},
+};
 
 void TRCHBLERMeasurement::update(const Packet& packet) {
   using namespace transportChannels;

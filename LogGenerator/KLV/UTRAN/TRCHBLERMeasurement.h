@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -13,7 +11,7 @@ class TRCHBLERMeasurement final : public SectionDecoder<TRCHBLERMeasurement> {
   static constexpr std::string_view traceLine = "TRCH BLER Measurement";
   static constexpr int tracePriority = logNoticePriority;
   static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static std::span<const PacketHandler<TRCHBLERMeasurement>> handlers();
+  static const PacketHandlers<TRCHBLERMeasurement> handlers;
 
  private:
   void update(const Packet& packet);

@@ -27,12 +27,9 @@ static_assert(within(cell, recordSize));
 
 }  // namespace
 
-std::span<const PacketHandler<UTRANNeighbhorMeasurements>> UTRANNeighbhorMeasurements::handlers() {
-  static constexpr PacketHandler<UTRANNeighbhorMeasurements> table[] = {
-      {logCode, minimumSize, &UTRANNeighbhorMeasurements::update},
-  };
-  return table;
-}
+constinit const PacketHandlers<UTRANNeighbhorMeasurements> UTRANNeighbhorMeasurements::handlers = {
+    {logCode, minimumSize, &UTRANNeighbhorMeasurements::update},
+};
 
 void UTRANNeighbhorMeasurements::update(const Packet& packet) {
   clearElementsInArray(list());

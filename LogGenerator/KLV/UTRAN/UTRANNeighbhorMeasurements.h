@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -12,7 +10,7 @@ class UTRANNeighbhorMeasurements final : public SectionDecoder<UTRANNeighbhorMea
   static constexpr std::string_view sectionName = "Neighbor Cell List";
   static constexpr std::string_view traceLine = "NeighbhorMeasurements List";
   static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static std::span<const PacketHandler<UTRANNeighbhorMeasurements>> handlers();
+  static const PacketHandlers<UTRANNeighbhorMeasurements> handlers;
 
  private:
   void update(const Packet& packet);

@@ -35,13 +35,10 @@ constexpr CellMonitorRow cellMonitorRows[] = {
 
 }  // namespace
 
-std::span<const PacketHandler<UTRANServingCellInfo>> UTRANServingCellInfo::handlers() {
-  static constexpr PacketHandler<UTRANServingCellInfo> table[] = {
-      {logCode, minimumSize, &UTRANServingCellInfo::updateFromModem},
-      {cellMonitorLogCode, 0, &UTRANServingCellInfo::updateFromCellMonitor},
-  };
-  return table;
-}
+constinit const PacketHandlers<UTRANServingCellInfo> UTRANServingCellInfo::handlers = {
+    {logCode, minimumSize, &UTRANServingCellInfo::updateFromModem},
+    {cellMonitorLogCode, 0, &UTRANServingCellInfo::updateFromCellMonitor},
+};
 
 void UTRANServingCellInfo::updateFromModem(const Packet& packet) { setFields(rows(), packet, servingCell); }
 

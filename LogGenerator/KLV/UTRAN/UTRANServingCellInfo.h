@@ -1,7 +1,5 @@
 #pragma once
 
-#include <span>
-
 #include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
@@ -13,7 +11,7 @@ class UTRANServingCellInfo final : public SectionDecoder<UTRANServingCellInfo> {
   static constexpr std::string_view sectionName = "Serving Cell Info";
   static constexpr std::string_view traceLine = "Serving Cell Info";
   static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static std::span<const PacketHandler<UTRANServingCellInfo>> handlers();
+  static const PacketHandlers<UTRANServingCellInfo> handlers;
 
  private:
   void updateFromModem(const Packet& packet);
