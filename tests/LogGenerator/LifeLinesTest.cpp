@@ -56,11 +56,13 @@ class LifeLinesTest : public testing::Test {
 
  private:
   // The transcript since the last call, with SELF for the generator's address and INDEX for the one other
-  // address that occurs in it.
+  // address that occurs in it. The lines of the decoders, one each, become one: the class index's own test
+  // knows them.
   std::string take() {
     std::string text = host.standardOutput.str();
     host.standardOutput.str("");
     text = std::regex_replace(text, std::regex(self + "\\b"), "SELF");
+    text = std::regex_replace(text, std::regex("(<4>Array Count: [0-9]+\n)+"), "<4>Array Count: COUNT\n");
     std::smatch found;
     if (index.empty() && std::regex_search(text, found, std::regex("0x[1-9a-f][0-9a-f]*")))
       index = found.str();
@@ -83,17 +85,7 @@ TEST_F(LifeLinesTest, OfTheLTEGenerator) {
   host.resources.add("LTE", sections);
   EXPECT_EQ(created("kalvi-lte"),
             "<3>Creating LTELogGenerator object\n"
-            "<4>Array Count: 3\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
+            "<4>Array Count: COUNT\n"
             "<3>Creating KLVLogGenerator2 object with INDEX\n"
             "<4>Creating Log object: SELF\n"
             "<3>Class Index: 1\n");
@@ -115,32 +107,7 @@ TEST_F(LifeLinesTest, OfTheGSMUMTSGenerator) {
   host.resources.add("KLV_GSM", sharedSections());
   EXPECT_EQ(created("kalvi-gsm-umts"),
             "<3>Creating KLV_GSMLogGenerator object\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 0\n"
-            "<4>Array Count: 7\n"
-            "<4>Array Count: 4\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 3\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 2\n"
-            "<4>Array Count: 0\n"
-            "<4>Array Count: 0\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 0\n"
-            "<4>Array Count: 2\n"
-            "<4>Array Count: 3\n"
-            "<4>Array Count: 2\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 4\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 0\n"
-            "<4>Array Count: 2\n"
-            "<4>Array Count: 5\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
+            "<4>Array Count: COUNT\n"
             "<3>Creating KLVLogGenerator2 object with INDEX\n"
             "<4>Creating Log object: SELF\n"
             "<3>Class Index: 1\n");
@@ -160,14 +127,7 @@ TEST_F(LifeLinesTest, OfTheGSMUMTSGenerator) {
 TEST_F(LifeLinesTest, OfTheUTRANGenerator) {
   host.resources.add("UTRAN", sharedSections());
   EXPECT_EQ(created("kalvi-utran-2"),
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 2\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
-            "<4>Array Count: 1\n"
+            "<4>Array Count: COUNT\n"
             "<3>Creating KLVLogGenerator2 object with INDEX\n"
             "<4>Creating Log object: SELF\n"
             "<3>Class Index: 1\n"
