@@ -62,7 +62,8 @@ class Base {
 
   void updateLogCodeDict(CodeDictionary& codeDict);
 
-  /// How a list section changes, under the array lock. The second one empties the array as well.
+  /// How a list section changes, under the array lock. The second one empties the array as well; who
+  /// empties it before making the new rows lets these take the memory of the old ones.
   static void clearElementsInArray(Array& array);
   static void replaceArray_With(Array& array, Array elements);
 
