@@ -90,13 +90,24 @@ Value readText(plist_t node, Encoding encoding) {
   return canHold(encoding, view) ? Value(view) : Value();
 }
 
+// Of a date in the second before 2001 or in that after it, which the library tells alike. What it writes of a
+// date has the sign: a header, a marker, and the seconds as a real number, high byte first.
+bool isBefore2001(plist_t date) {
+  constexpr std::uint32_t signOffset = std::string_view("bplist00\x33").size();
+  char* bytes = nullptr;
+  std::uint32_t length = 0;
+  plist_to_bin(date, &bytes, &length);
+  const std::unique_ptr<char, Free> bytesOwner(bytes);
+  return length > signOffset && (static_cast<unsigned char>(bytes[signOffset]) & 0x80U) != 0;
+}
+
 Value readDate(plist_t node) {
   Date date;
   plist_get_date_val(node, &date.seconds, &date.microseconds);
   // What is out of range comes as the least number and microseconds without a meaning.
   if (date.seconds == std::numeric_limits<std::int32_t>::min()) return Value::ofDate({date.seconds, 0});
   // The library cuts towards 2001 and gives microseconds without their sign.
-  if (date.seconds < 0 && date.microseconds > 0)
+  if (date.microseconds > 0 && (date.seconds < 0 || (date.seconds == 0 && isBefore2001(node))))
     return Value::ofDate({date.seconds - 1, 1000000 - date.microseconds});
   return Value::ofDate(date);
 }

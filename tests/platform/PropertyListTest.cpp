@@ -282,6 +282,7 @@ TEST(PropertyListReading, DatesCountFrom2001) {
       "[date(0,0),date(-5,0)]");
   EXPECT_EQ(outlineOf(binary({"\x33" + bigEndian(0x3FF8000000000000, 8)})), "date(1,500000)");   // 1.5
   EXPECT_EQ(outlineOf(binary({"\x33" + bigEndian(0xC015000000000000, 8)})), "date(-6,750000)");  // -5.25
+  EXPECT_EQ(outlineOf(binary({"\x33" + bigEndian(0xBFD0000000000000, 8)})), "date(-1,750000)");  // -0.25
 }
 
 TEST(PropertyListReading, DatesOutOfRangeComeOutAsTheEarliest) {
@@ -706,6 +707,21 @@ TEST(PropertyListWriting, DatesKeepTheirSeconds) {
   }
   EXPECT_EQ(throughBinary(Value::ofDate({-5, 750000})), "date(-5,750000)");
   EXPECT_EQ(throughBinary(Value::ofDate({5, 250000})), "date(5,250000)");
+}
+
+// Seconds as a real number do not hold every microsecond, and what is left over is cut off towards 2001.
+TEST(PropertyListWriting, BinaryDatesComeBackWithinAMicrosecond) {
+  EXPECT_EQ(throughBinary(Value::ofDate({5, 3})), "date(5,3)");
+  EXPECT_EQ(throughBinary(Value::ofDate({5, 4})), "date(5,3)");
+  EXPECT_EQ(throughBinary(Value::ofDate({730994709, 1})), "date(730994709,0)");
+  EXPECT_EQ(throughBinary(Value::ofDate({-5, 1})), "date(-5,2)");
+  EXPECT_EQ(throughBinary(Value::ofDate({-5, 999997})), "date(-5,999998)");
+}
+
+TEST(PropertyListWriting, BinaryDatesAroundTheStartOf2001KeepTheirSide) {
+  EXPECT_EQ(throughBinary(Value::ofDate({-1, 500000})), "date(-1,500000)");
+  EXPECT_EQ(throughBinary(Value::ofDate({-1, 0})), "date(-1,0)");
+  EXPECT_EQ(throughBinary(Value::ofDate({0, 500000})), "date(0,500000)");
 }
 
 TEST(PropertyListWriting, TextsComeBackAsTheyWere) {
