@@ -99,6 +99,7 @@ Value KLVLogGenerator2::processTemplate(const Value& object) {
   if (object.string()) return object;
   if (const Dictionary* entries = object.dictionary()) {
     Value copy = Value::ofDictionary();
+    copy.dictionary()->reserve(entries->size());
     for (const auto& [key, value] : *entries) {
       const Value processed = processTemplate(value);
       if (Base* decoder = cIndex ? cIndex->getClass(key) : nullptr) decoder->updateSectionRef(processed);
