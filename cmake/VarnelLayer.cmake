@@ -18,7 +18,8 @@ if(VARNEL_SANITIZE)
   endif()
 endif()
 if(VARNEL_FUZZ)
-  target_compile_options(varnel_options INTERFACE -fsanitize=fuzzer-no-link)
+  # Telling the fuzzer of every comparison took a fifth of the time, and it has a dictionary.
+  target_compile_options(varnel_options INTERFACE -fsanitize=fuzzer-no-link -fno-sanitize-coverage=trace-cmp)
 endif()
 
 # varnel_layer(NAME SOURCES a.cpp ... USES lower_layer ...): a static library and what it may use.

@@ -1,38 +1,15 @@
-#include <sys/mman.h>
-#include <unistd.h>
-
 #include <cstddef>
 #include <cstdint>
 #include <string>
 #include <vector>
 
+#include "fuzz/MemoryFile.h"
 #include "fuzz/Require.h"
 #include "platform/host/Capture.h"
 
 using namespace varnel;
 
 namespace {
-
-// A file that stands in memory alone.
-class MemoryFile {
- public:
-  MemoryFile() : _descriptor(memfd_create("capture", MFD_CLOEXEC)) {
-    require(_descriptor >= 0, "memory file");
-  }
-  MemoryFile(const MemoryFile&) = delete;
-  MemoryFile& operator=(const MemoryFile&) = delete;
-  ~MemoryFile() { close(_descriptor); }
-
-  std::string path() const { return "/proc/self/fd/" + std::to_string(_descriptor); }
-  void set(ByteView bytes) {
-    require(ftruncate(_descriptor, 0) == 0, "memory file can be emptied");
-    const ssize_t written = pwrite(_descriptor, bytes.data(), bytes.size(), 0);
-    require(written == static_cast<ssize_t>(bytes.size()), "memory file can be written");
-  }
-
- private:
-  int _descriptor;
-};
 
 struct Record {
   Time time;

@@ -1,4 +1,4 @@
-#include "fuzz/GeneratorFuzz.h"
+#include "fuzz/GeneratorRun.h"
 #include "platform/TelephonyService.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {

@@ -6,6 +6,7 @@
 
 #include "platform/Dictionary.h"
 #include "platform/PropertyList.h"
+#include "platform/PropertyListGuard.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
@@ -62,6 +63,15 @@ ByteView loggedBytes(std::string_view technology, ByteView message) {
   const ByteView packet = packetOf(message);
   const bool isKnown = packet[0] != 0xFF && std::ranges::count(cdmaLogCodes, logCodeOf(packet)) > 0;
   return isKnown ? packet : ByteView();
+}
+
+bool isLaborious(ByteView bytes, const PropertyListLimits& limits) {
+  constexpr std::size_t manyNodes = 1000, manyBytes = 1 << 16;
+  PropertyListLimits easy = limits;
+  easy.expandedNodes = std::min(easy.expandedNodes, manyNodes);
+  easy.expandedBytes = std::min(easy.expandedBytes, manyBytes);
+  easy.pathBytes = std::min(easy.pathBytes, manyBytes);
+  return isSafeToParse(bytes, limits) && !isSafeToParse(bytes, easy);
 }
 
 bool holdsTextStrangeToXml(const Value& value) {

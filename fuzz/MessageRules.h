@@ -3,6 +3,7 @@
 #include <string_view>
 
 #include "platform/Bytes.h"
+#include "platform/PropertyList.h"
 #include "platform/Value.h"
 
 namespace varnel {
@@ -18,6 +19,10 @@ Outcome requiredOutcome(std::string_view technology, ByteView message);
 
 /// The bytes of an accepted message that belong into the binary log.
 ByteView loggedBytes(std::string_view technology, ByteView message);
+
+/// Whether bytes are a property list within the limits that stands for so much that working on it takes long.
+/// Such inputs would keep a fuzzer from all others; what they cost is tested where the limits are.
+bool isLaborious(ByteView bytes, const PropertyListLimits& limits);
 
 /// Whether a value holds a text that XML cannot.
 bool holdsTextStrangeToXml(const Value& value);

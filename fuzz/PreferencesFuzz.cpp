@@ -20,11 +20,14 @@ namespace fs = std::filesystem;
 constexpr const char* domain = "com.orvane.dockhall";
 constexpr const char* key = "DHShowGSMRSSI";
 
-// A device's files, for as long as the process runs.
+// A device's files, for as long as the process runs. They stand in memory where that is a folder: a disk
+// would take most of the time.
 class Device {
  public:
   Device() {
-    std::string name = (fs::temp_directory_path() / "varnel-preferences-XXXXXX").string();
+    const fs::path memory = "/dev/shm";
+    const fs::path parent = fs::is_directory(memory) ? memory : fs::temp_directory_path();
+    std::string name = (parent / "varnel-preferences-XXXXXX").string();
     require(mkdtemp(name.data()) != nullptr, "there is a folder for temporary files");
     _root = name;
     fs::create_directories(list().parent_path());
