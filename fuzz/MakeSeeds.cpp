@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "LogGenerator/LogGenerator.h"
+#include "app/Snapshot.h"
 #include "fuzz/FuzzHost.h"
 #include "fuzz/InputSteps.h"
 #include "platform/Dictionary.h"
@@ -24,7 +25,8 @@ namespace {
 
 namespace fs = std::filesystem;
 
-constexpr std::size_t largestInput = 4096;
+// As ./dev lets the fuzzer make them: of few messages, of whole files.
+constexpr std::size_t largestPlay = 1024, largestFile = 4096;
 constexpr std::uint64_t walks = 6;
 constexpr int messagesOfAWalk = 1500;
 constexpr std::size_t examplesOfACode = 2;
@@ -42,12 +44,15 @@ constexpr Technology technologies[] = {
 // The seeds of one target, numbered by kind.
 class SeedFolder {
  public:
-  SeedFolder(const fs::path& root, const char* target) : _folder(root / target) {
+  SeedFolder(const fs::path& root, const char* target, std::size_t largest = largestFile)
+      : _folder(root / target), _largest(largest) {
     fs::create_directories(_folder);
   }
 
+  std::size_t largest() const { return _largest; }
+
   void add(const std::string& kind, ByteView seed) {
-    if (seed.empty() || seed.size() > largestInput) return;
+    if (seed.empty() || seed.size() > _largest) return;
     const fs::path path = _folder / (kind + "-" + std::to_string(++_counts[kind]));
     std::ofstream file(path, std::ios::binary);
     file.write(reinterpret_cast<const char*>(seed.data()), static_cast<std::streamsize>(seed.size()));
@@ -56,6 +61,7 @@ class SeedFolder {
 
  private:
   fs::path _folder;
+  std::size_t _largest;
   std::map<std::string, int> _counts;
 };
 
@@ -73,24 +79,30 @@ unsigned kindOf(ByteView message) {
   return unsigned{hasPrefix} << 24U | unsigned{message[0]} << 16U | message[3] | unsigned{message[4]} << 8U;
 }
 
-// A property list in the shorter one of its encodings; anything else as it is.
+// A property list, alone or behind the header of a packet, in the shorter one of its encodings; anything else
+// as it is.
 Bytes compact(const Bytes& message) {
-  const auto list = readPropertyList(message);
+  constexpr std::size_t headerSize = 13;
+  const std::size_t start = message[0] == 0xFF ? headerSize : 0;
+  const auto list = readPropertyList(ByteView(message).subspan(start));
   const auto binary = list ? writeBinaryPropertyList(*list) : std::nullopt;
-  return binary ? *binary : message;
+  if (!binary || binary->size() > message.size() - start) return message;
+  Bytes shorter(message.begin(), message.begin() + static_cast<std::ptrdiff_t>(start));
+  shorter.insert(shorter.end(), binary->begin(), binary->end());
+  return shorter;
 }
 
 // As many of the messages as an input holds, the picture looked at and saved now and then.
-Bytes inputOf(const std::vector<SimulatedMessage>& messages, std::size_t first, bool reconnects) {
+Bytes inputOf(const std::vector<SimulatedMessage>& messages, std::size_t first, std::size_t largest) {
   Bytes input;
   int steps = 0;
   for (std::size_t i = first; i < messages.size(); ++i) {
     const Bytes message = compact(messages[i].bytes);
-    if (input.size() + stepHeaderSize + message.size() > largestInput) break;
+    if (input.size() + stepHeaderSize + message.size() > largest) break;
     ++steps;
     std::uint8_t after = steps % 4 == 0 ? Generate : 0;
     if (steps % 8 == 0) after |= Save;
-    if (steps % 16 == 0 && reconnects) after |= Reconnect;
+    if (steps % 16 == 0) after |= Reconnect;
     appendStep(input, {after, message});
   }
   return input;
@@ -101,13 +113,14 @@ void makeGeneratorSeeds(SeedFolder& folder, std::string_view technology) {
   for (std::uint64_t seed = 1; seed <= walks; ++seed) {
     const auto messages = walk(technology, seed);
     for (const SimulatedMessage& message : messages) {
-      if (examples[kindOf(message.bytes)]++ >= examplesOfACode) continue;
+      const std::size_t example = examples[kindOf(message.bytes)]++;
+      if (example >= examplesOfACode) continue;
       Bytes input;
-      appendStep(input, {Generate | Save, message.bytes});
+      appendStep(input, {Generate | Save, example == 0 ? compact(message.bytes) : message.bytes});
       folder.add("message", input);
     }
     for (std::size_t first = 0; first < messages.size(); first += messages.size() / 3)
-      folder.add("walk", inputOf(messages, first, seed % 2 == 0));
+      folder.add("walk", inputOf(messages, first, folder.largest()));
   }
 }
 
@@ -209,6 +222,45 @@ void makeResourceSeeds(SeedFolder& folder, const ShippedResources& shipped) {
   }
 }
 
+// What a viewer saves after some messages.
+Value snapshotOf(std::string_view technology, const Services& services) {
+  const auto generator = LogGenerator::generatorFromTechnology(technology, services);
+  Dictionary state;
+  int count = 0;
+  for (const SimulatedMessage& message : walk(technology, 1)) {
+    generator->updateState_withData(state, message.bytes);
+    if (++count == 8) break;
+  }
+  generator->generateLogUsingState(state);
+  return snapshotContents(services.clock.now(), generator->getSaveContentsFromState(state), "by the lake");
+}
+
+// Two displays with what is hard to show, one of them without a date, and a binary log.
+Value smallSnapshot() {
+  Value list = oneOfEachKind();
+  Dictionary& entries = *list.dictionary();
+  const Value first = Value::ofDictionary();
+  first.dictionary()->set("Display", list.deepCopy());
+  first.dictionary()->set("Date", "2024-03-01 14:05:11 +0000");
+  const Value cell = Value::ofDictionary();
+  cell.dictionary()->set("_sorted", "");
+  cell.dictionary()->set("2;Level", "-85.5 dBm");
+  cell.dictionary()->set("1;Code, \"long\"", "0x1F");
+  const Value second = Value::ofDictionary();
+  second.dictionary()->set("Display", Value::ofArray({cell}));
+  const Value log = Value::ofDictionary();
+  log.dictionary()->set("DLF", Value::ofData({0, 1, 2}));
+  entries.set("Timestamp", "2024-03-01 14:05:14 +0000");
+  entries.set("Data", Value::ofArray({second, first, log, "text"}));
+  return list;
+}
+
+void makeSnapshotSeeds(SeedFolder& folder, FuzzHost& host) {
+  addInBothEncodings(folder, "small", smallSnapshot());
+  for (const Technology& technology : technologies)
+    addInBothEncodings(folder, "saved", snapshotOf(technology.identifier, host.services(host.shipped)));
+}
+
 void makePreferencesSeeds(SeedFolder& folder) {
   Value list = oneOfEachKind();
   addInBothEncodings(folder, "preferences", list);
@@ -219,18 +271,21 @@ void makePreferencesSeeds(SeedFolder& folder) {
 void makeSeeds(const fs::path& root) {
   FuzzHost host;
   for (const Technology& technology : technologies) {
-    SeedFolder folder(root, technology.target);
+    const bool sendsPictures = technology.identifier == technology::ifxGSM;
+    SeedFolder folder(root, technology.target, sendsPictures ? largestFile : largestPlay);
     makeGeneratorSeeds(folder, technology.identifier);
   }
   SeedFolder captures(root, "CaptureFuzz"), frames(root, "PortFrameFuzz");
   SeedFolder commands(root, "ChannelCommandFuzz"), lists(root, "PropertyListFuzz");
   SeedFolder resources(root, "ResourceFuzz"), preferences(root, "PreferencesFuzz");
+  SeedFolder snapshots(root, "SnapshotFuzz");
   makeCaptureSeeds(captures);
   makeFrameSeeds(frames);
   makeCommandSeeds(commands, host);
   makePropertyListSeeds(lists);
   makeResourceSeeds(resources, host.shipped);
   makePreferencesSeeds(preferences);
+  makeSnapshotSeeds(snapshots, host);
 }
 
 }  // namespace
