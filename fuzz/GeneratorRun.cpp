@@ -147,7 +147,7 @@ class GeneratorRun {
 
 // Takes many times as long as all the rest, so few inputs are looked at that closely.
 void inspect(GeneratorRun& run, ByteView input, Time now) {
-  constexpr std::size_t inputsPerTree = 64, inputsPerWriting = 256;
+  constexpr std::size_t inputsPerTree = 256, inputsPerWriting = 1024;
   const Value display = run.generate();
   if (isChosen(input, inputsPerTree)) checkTree(display);
   if (!isChosen(input, inputsPerWriting)) return;

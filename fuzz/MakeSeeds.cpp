@@ -26,7 +26,7 @@ namespace {
 namespace fs = std::filesystem;
 
 // As ./dev lets the fuzzer make them: of few messages, of whole files.
-constexpr std::size_t largestPlay = 1024, largestFile = 4096;
+constexpr std::size_t largestPlay = 768, largestFile = 4096;
 constexpr std::uint64_t walks = 6;
 constexpr int messagesOfAWalk = 1500;
 constexpr std::size_t examplesOfACode = 2;
