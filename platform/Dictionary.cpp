@@ -50,6 +50,24 @@ std::size_t Dictionary::find(std::string_view key) const {
   return nowhere;
 }
 
+Dictionary::Rewriting::~Rewriting() {
+  std::vector<Entry>& entries = _dictionary._entries;
+  entries.erase(entries.begin() + static_cast<std::ptrdiff_t>(_size), entries.end());
+  _dictionary._next = 0;
+  _dictionary.indexAll();
+}
+
+void Dictionary::Rewriting::add(std::string_view key, std::string_view text) {
+  std::vector<Entry>& entries = _dictionary._entries;
+  if (_size == entries.size()) {
+    entries.emplace_back(key, text);
+  } else {
+    entries[_size].key.assign(key);
+    entries[_size].value.assignText(text);
+  }
+  ++_size;
+}
+
 // The key may be a view of what stands in the dictionary, which moves when it grows.
 void Dictionary::append(std::string_view key, Value&& value) {
   _entries.emplace_back(key, std::move(value));

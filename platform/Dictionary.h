@@ -33,6 +33,23 @@ class Dictionary {
     std::size_t _position = 0;
   };
 
+  /// Fills a dictionary anew, in the room of what stands in it. The rows are those that are added, once this
+  /// is gone; what is found in the dictionary before then is of no meaning.
+  class Rewriting {
+   public:
+    explicit Rewriting(Dictionary& dictionary) : _dictionary(dictionary) {}
+    Rewriting(const Rewriting&) = delete;
+    Rewriting& operator=(const Rewriting&) = delete;
+    ~Rewriting();
+
+    /// Adds a row. No other one may have the key.
+    void add(std::string_view key, std::string_view text);
+
+   private:
+    Dictionary& _dictionary;
+    std::size_t _size = 0;
+  };
+
   /// The key's value; the absent value when there is no such key.
   const Value& get(std::string_view key) const;
   bool has(std::string_view key) const { return find(key) != nowhere; }

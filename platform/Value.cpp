@@ -31,6 +31,11 @@ Dictionary* Value::dictionary() const {
   return found ? found->get() : nullptr;
 }
 
+bool Value::sharesDictionary() const {
+  const DictionaryRef* found = std::get_if<DictionaryRef>(&_content);
+  return found && found->use_count() > 1;
+}
+
 std::optional<std::int32_t> Value::int32() const {
   if (const auto whole = integer()) return static_cast<std::int32_t>(*whole);
   const auto number = real();

@@ -63,6 +63,8 @@ class Value {
   /// The container itself, to read and to change: whoever shares it sees the change.
   Array* array() const;
   Dictionary* dictionary() const;
+  /// Whether another value has the same dictionary; false for any other kind.
+  bool sharesDictionary() const;
 
   /// The number as a signed 32-bit integer: integers wrap, reals are truncated towards zero and wrap, a real
   /// that is not finite gives 0. Nothing for any other kind; a boolean is no number.

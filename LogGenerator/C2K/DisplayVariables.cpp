@@ -30,6 +30,14 @@ Lookup::Lookup(const Value& placements) : _placements(placements) {
   }
 }
 
+Value Lookup::dictionaryFor(Variable variable) {
+  if (const auto shownAt = places(variable); !shownAt.empty()) {
+    const Value& shown = shownAt[0].section->get(shownAt[0].key);
+    if (shown.dictionary() && !shown.sharesDictionary()) return shown;
+  }
+  return Value::ofDictionary();
+}
+
 void addPlacement(Dictionary& placements, std::string_view variable, std::string_view key,
                   const Value& section) {
   if (!placements.has(variable)) placements.set(variable, Value::ofArray());

@@ -90,6 +90,9 @@ class Lookup {
   }
   /// In their order, up to the first placement that is none.
   std::span<Place> places(Variable variable) { return _places[variable.index()]; }
+  /// A dictionary to fill and to publish: the one that the variable shows, when nobody else has it, or else a
+  /// new one.
+  Value dictionaryFor(Variable variable);
 
  private:
   Value _placements;  // keeps the sections

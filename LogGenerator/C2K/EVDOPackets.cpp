@@ -64,12 +64,12 @@ void decodeEVDOActiveSet(const Packet& packet, State& /*state*/, Lookup& lookup)
              static_cast<std::uint32_t>(packet.size()), count);
     return;
   }
-  PilotStrengths pilots(count);
+  PilotStrengths pilots("kActiveSetPilots", lookup);
   for (std::size_t i = 0; i < count; ++i) {
     const Packet pilot = packet.from(evdoActiveSetSize + pilotSize * i);
     pilots.add(i, pilot.u16(0), decibelFormat, decibelsOfRatio512(pilot.u16(2)));
   }
-  storeDisplayValue("kActiveSetPilots", pilots.asDictionaryOrNone(), lookup);
+  pilots.publishOrNone();
 }
 
 void decodeFingerC2I(const Packet& packet, State& /*state*/, Lookup& lookup) {
@@ -82,14 +82,14 @@ void decodeFingerC2I(const Packet& packet, State& /*state*/, Lookup& lookup) {
              static_cast<std::uint32_t>(packet.size()), count, fingerC2ISize);
     return;
   }
-  PilotStrengths fingers(count);
+  PilotStrengths fingers("kFingerC2I", lookup);
   for (std::size_t i = 0; i < count; ++i) {
     const Packet finger = packet.from(fingerC2ISize + fingerSize * i);
     if (const std::uint16_t pn = finger.u16(0); pn != unassignedPN) {
       fingers.add(i, pn, decibelFormat, decibelsOfRatio512(finger.u16(6)));
     }
   }
-  storeDisplayValue("kFingerC2I", fingers.asDictionaryOrNone(), lookup);
+  fingers.publishOrNone();
 }
 
 }  // namespace varnel::c2k

@@ -3,23 +3,33 @@
 #include <cmath>
 #include <string>
 
-#include "LogGenerator/C2K/DisplayVariables.h"
-#include "platform/Dictionary.h"
-
 namespace varnel::c2k {
 
-PilotStrengths::PilotStrengths(std::size_t count) {
-  _rows.dictionary()->reserve(count + 1);
-  _rows.dictionary()->set(sortedMark, sortedMark);
-}
-
 void PilotStrengths::add(std::size_t index, std::uint16_t pn, const Format& format, double decibels) {
+  if (!_rewriting) begin();
   Formatter formatter;
-  _rows.dictionary()->setText(std::to_string(index) + ';' + std::to_string(pn),
-                              formatter.text(format, decibels));
+  _rewriting->add(std::to_string(index) + ';' + std::to_string(pn), formatter.text(format, decibels));
 }
 
-Value PilotStrengths::asDictionaryOrNone() const { return _rows.dictionary()->size() > 1 ? _rows : "(none)"; }
+void PilotStrengths::publish() {
+  if (!_rewriting) begin();
+  _rewriting.reset();
+  storeDisplayValue(_variable, _rows, _lookup);
+}
+
+void PilotStrengths::publishOrNone() {
+  if (_rewriting) {
+    publish();
+  } else {
+    storeDisplayText(_variable, "(none)", _lookup);
+  }
+}
+
+void PilotStrengths::begin() {
+  _rows = _lookup.dictionaryFor(_variable);
+  _rewriting.emplace(*_rows.dictionary());
+  _rewriting->add(sortedMark, sortedMark);
+}
 
 double decibels(double ratio) { return 10.0 * std::log10(ratio); }
 

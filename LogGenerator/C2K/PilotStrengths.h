@@ -2,27 +2,36 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <optional>
 
+#include "LogGenerator/C2K/DisplayVariables.h"
 #include "LogGenerator/Field.h"
+#include "platform/Dictionary.h"
 #include "platform/Value.h"
 
 namespace varnel::c2k {
 
-/// A row of up to so many pilots, each shown by its PN offset in the order of its index.
+/// Pilots, each shown by its PN offset in the order of its index, under one variable.
 class PilotStrengths {
  public:
-  explicit PilotStrengths(std::size_t count);
+  PilotStrengths(Variable variable, Lookup& lookup) : _variable(variable), _lookup(lookup) {}
 
-  /// Adds a pilot with its strength in dB, by a format made by `real`.
+  /// Adds a pilot with its strength in dB, by a format made by `real`. Every index comes once.
   void add(std::size_t index, std::uint16_t pn, const Format& format, double decibels);
 
-  /// The pilots as a sorted dictionary, which is empty but for its mark when there are none.
-  const Value& asDictionary() const { return _rows; }
-  /// The same, but the text "(none)" when there are none.
-  Value asDictionaryOrNone() const;
+  /// Ends the row and publishes it as a sorted dictionary, which is empty but for its mark when there are no
+  /// pilots.
+  void publish();
+  /// The same, but without pilots the text "(none)".
+  void publishOrNone();
 
  private:
-  Value _rows = Value::ofDictionary();
+  void begin();
+
+  Variable _variable;
+  Lookup& _lookup;
+  Value _rows;
+  std::optional<Dictionary::Rewriting> _rewriting;  // of the rows, once they have begun
 };
 
 /// How the strength of a pilot is shown.

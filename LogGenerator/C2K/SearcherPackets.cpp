@@ -86,14 +86,14 @@ void showActiveSet(const Packet& activeSet, Lookup& lookup) {
   const std::size_t extensions = activeSet.u8(9);
   const std::uint16_t referencePN = activeSet.u16(10);
   const std::size_t stride = (6 * extensions + 15) & 0xFFC;
-  PilotStrengths pilots(count);
+  PilotStrengths pilots("k1xActiveSetInfo", lookup);
   for (std::size_t i = 0; i < count; ++i) {
     const std::uint16_t pn = activeSet.u16(12 + i * stride);
     const std::uint16_t energy = activeSet.u16(24 + 4 * extensions + i * stride);
     pilots.add(i, pn, pn == referencePN ? referencePilot : decibelFormat, pilotStrength(integration, energy));
   }
   // Kept: unlike those of EV-DO, an active set without pilots shows no text.
-  storeDisplayValue("k1xActiveSetInfo", pilots.asDictionary(), lookup);
+  pilots.publish();
 }
 
 // The frame-error rate between 0 and 1. It is computed in single precision at every step.

@@ -206,6 +206,42 @@ TEST(Dictionary, ASlotServesSeveralDictionaries) {
   EXPECT_EQ(*first.get(slot).string(), "2");
 }
 
+TEST(Dictionary, RewritingLeavesJustTheRowsThatWereAdded) {
+  Dictionary dictionary;
+  for (const char* key : {"a", "b", "c"}) dictionary.set(key, "old");
+  {
+    Dictionary::Rewriting rewriting(dictionary);
+    rewriting.add("c", "1");
+    rewriting.add("d", "2");
+  }
+  EXPECT_EQ(keysOf(dictionary), "c d ");
+  EXPECT_EQ(textOf(dictionary, "c"), "1");
+  EXPECT_EQ(textOf(dictionary, "d"), "2");
+  EXPECT_FALSE(dictionary.has("a"));
+  EXPECT_FALSE(dictionary.has("b"));
+  { const Dictionary::Rewriting rewriting(dictionary); }
+  EXPECT_TRUE(dictionary.empty());
+  EXPECT_FALSE(dictionary.has("c"));
+}
+
+TEST(Dictionary, RewritingTakesOtherKindsAndGrows) {
+  Dictionary dictionary;
+  dictionary.set("a", Value::ofInteger(1));
+  {
+    Dictionary::Rewriting rewriting(dictionary);
+    for (int i = 0; i < 60; ++i) rewriting.add("key " + std::to_string(i), std::to_string(i));
+  }
+  EXPECT_EQ(dictionary.size(), 60u);
+  EXPECT_EQ(*dictionary.get("key 59").string(), "59");
+  EXPECT_TRUE(dictionary.get("a").isAbsent());
+  {
+    Dictionary::Rewriting rewriting(dictionary);
+    rewriting.add("key 59", "one");
+  }
+  EXPECT_EQ(keysOf(dictionary), "key 59 ");
+  EXPECT_EQ(textOf(dictionary, "key 59"), "one");
+}
+
 TEST(Dictionary, TakesItsOwnValuesAndKeys) {
   Dictionary dictionary;
   dictionary.set("key", "text");

@@ -46,6 +46,28 @@ TEST_F(EVDOActiveSetTest, WithoutPilotsItIsNone) {
   EXPECT_EQ(published(activeSet({})), R"~({kActiveSetPilots: "(none)"})~");
 }
 
+TEST_F(EVDOActiveSetTest, EachPacketLeavesItsOwnPilotsAlone) {
+  const auto shown = [&](const std::vector<Pilot>& pilots) {
+    generator.updateState_withData(state, activeSet(pilots));
+    return described(display.dictionary()->get("kActiveSetPilots"));
+  };
+  EXPECT_EQ(shown({{1, 512}, {2, 256}, {3, 512}}),
+            R"({_sorted: "_sorted", 0;1: "+0.00 dB", 1;2: "-3.01 dB", 2;3: "+0.00 dB"})");
+  EXPECT_EQ(shown({{2, 256}}), R"({_sorted: "_sorted", 0;2: "-3.01 dB"})");
+  EXPECT_EQ(shown({{2, 512}, {9, 256}}), R"({_sorted: "_sorted", 0;2: "+0.00 dB", 1;9: "-3.01 dB"})");
+  EXPECT_EQ(shown({}), R"~("(none)")~");
+  EXPECT_EQ(shown({{4, 512}}), R"({_sorted: "_sorted", 0;4: "+0.00 dB"})");
+}
+
+TEST_F(EVDOActiveSetTest, PilotsThatSomebodyHoldsStayAsTheyWere) {
+  generator.updateState_withData(state, activeSet({{1, 512}, {2, 256}}));
+  const Value held = display.dictionary()->get("kActiveSetPilots");
+  generator.updateState_withData(state, activeSet({{7, 512}}));
+  EXPECT_EQ(described(held), R"({_sorted: "_sorted", 0;1: "+0.00 dB", 1;2: "-3.01 dB"})");
+  EXPECT_EQ(described(display.dictionary()->get("kActiveSetPilots")),
+            R"({_sorted: "_sorted", 0;7: "+0.00 dB"})");
+}
+
 TEST_F(EVDOActiveSetTest, TheStrengthCountsIn512thsAndIsShownInDecibels) {
   EXPECT_EQ(shownStrength(512), R"("+0.00 dB")");
   EXPECT_EQ(shownStrength(256), R"("-3.01 dB")");
