@@ -16,6 +16,7 @@
 #include "fuzz/MemoryFile.h"
 #include "fuzz/MessageRules.h"
 #include "fuzz/Require.h"
+#include "model/VarnelModelNode.h"
 #include "platform/Dictionary.h"
 #include "platform/PropertyList.h"
 #include "programs/varnel-decode/GenerationWriters.h"
@@ -89,7 +90,7 @@ void addLeafPaths(std::vector<std::string>& paths, const VarnelModelNode& node, 
 void checkEveryDisplay(const std::vector<Generation>& generations) {
   Output output;
   EveryDisplay sink(output.file(), std::nullopt);
-  for (const Generation& generation : generations) sink.take(GenerationTree(generation));
+  for (const Generation& generation : generations) sink.take(generation);
   std::string_view lines = output.text();
   for (std::size_t count = generations.size(); count > 0; --count) {
     const std::size_t length = lines.find('\n');
@@ -103,13 +104,15 @@ void checkEveryDisplay(const std::vector<Generation>& generations) {
 void checkValueTable(const std::vector<Generation>& generations, const std::vector<std::string>& paths) {
   Output output;
   ValueTable sink(output.file(), paths, std::nullopt);
-  for (const Generation& generation : generations) sink.take(GenerationTree(generation));
+  for (const Generation& generation : generations) sink.take(generation);
   std::string_view table = output.text();
   for (const Generation& generation : generations) {
-    const GenerationTree tree(generation);
+    PathDictionary nodes;
+    static_cast<void>(VarnelModelNode::makeTreeFromObject_withPathDictionary(generation.display, nodes));
     takeField(table, ',');
     for (const std::string& path : paths) {
-      const std::string* value = tree.value(path);
+      const auto node = nodes.find(path);
+      const std::string* value = node == nodes.end() ? nullptr : node->second->value();
       const std::string field = takeField(table, &path == &paths.back() ? '\n' : ',');
       require(field == (value ? *value : ""), "a table holds the values under its paths");
     }
@@ -121,8 +124,8 @@ void checkPlot(const std::vector<Generation>& generations, const std::vector<std
   PlotRecorder recorder(paths);
   SeenPaths seen(paths);
   for (const Generation& generation : generations) {
-    recorder.take(GenerationTree(generation));
-    seen.take(GenerationTree(generation));
+    recorder.take(generation);
+    seen.take(generation);
   }
   const Plot plot = recorder.plot("from outside");
   require(plot.series.empty() == recorder.isEmpty(), "a plot without numbers has no series");
@@ -148,7 +151,9 @@ void checkGenerations(const SnapshotFile& snapshot) {
           "every stored display is shown");
   if (generations.empty()) return;
   std::vector<std::string> paths;
-  addLeafPaths(paths, *GenerationTree(generations.front()).root, "/");
+  PathDictionary nodes;
+  const Value& display = generations.front().display;
+  addLeafPaths(paths, *VarnelModelNode::makeTreeFromObject_withPathDictionary(display, nodes), "/");
   checkEveryDisplay(generations);
   if (paths.empty()) return;
   checkValueTable(generations, paths);
