@@ -11,10 +11,10 @@ namespace varnel {
 namespace {
 
 constexpr std::uint64_t powersOf10[] = {1, 10, 100, 1000};
-// Beyond, a mantissa of 53 bits times 1000 would not fit.
+// Numbers below have a fraction to shift out (up to 2^52 they have), and 13 digits before the point at most.
 constexpr double limit = 9e12;
-// Of a number within the limit, with its sign and decimals.
-constexpr std::ptrdiff_t longest = 18;
+// Sign, digits, point and decimals of such a number.
+constexpr std::ptrdiff_t longest = 1 + 13 + 1 + 3;
 
 // |number| × the factor as a whole number, rounded. The number is mantissa × 2^-shift.
 std::uint64_t scaled(double number, std::uint64_t factor) {

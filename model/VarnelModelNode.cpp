@@ -2,6 +2,8 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <set>
+#include <utility>
 
 #include "LogGenerator/ArrayLock.h"
 #include "platform/Dictionary.h"
@@ -102,37 +104,48 @@ class ObjectFinder {
   explicit ObjectFinder(std::string_view path) : _path(path) {}
 
   // The first so many characters of the path are the object's own. Null when nothing has the path.
-  const Value* findFrom(const Value& object, std::size_t length) const {
+  const Value* findFrom(const Value& object, std::size_t length) {
     if (length == _path.size()) return &object;
     if (_path[length - 1] != '/') {
       if (_path[length] != '/') return nullptr;
       ++length;
     }
-    if (const Dictionary* entries = object.dictionary()) return findAmong(*entries, length);
-    if (const Array* elements = object.array()) return findAmong(*elements, length);
+    if (const Dictionary* entries = object.dictionary()) return findIn(*entries, length);
+    if (const Array* elements = object.array()) return findIn(*elements, length);
     return nullptr;
   }
 
  private:
-  const Value* findAmong(const Dictionary& entries, std::size_t length) const {
+  // Rows of one name that share what is below them would have it searched over and over.
+  template <class Container>
+  const Value* findIn(const Container& container, std::size_t length) {
+    const std::pair<const void*, std::size_t> search(&container, length);
+    if (_failedSearches.contains(search)) return nullptr;
+    const Value* found = findAmong(container, length);
+    if (!found) _failedSearches.insert(search);
+    return found;
+  }
+
+  const Value* findAmong(const Dictionary& entries, std::size_t length) {
     const std::vector<Row> rows = rowsOf(entries);
     for (auto row = rows.rbegin(); row != rows.rend(); ++row)
       if (const Value* found = findNamed(row->name, *row->value, length)) return found;
     return nullptr;
   }
 
-  const Value* findAmong(const Array& elements, std::size_t length) const {
+  const Value* findAmong(const Array& elements, std::size_t length) {
     const ArrayLock::Scope lock;
     for (std::size_t i = elements.size(); i-- > 0;)
       if (const Value* found = findNamed(std::to_string(i), elements[i], length)) return found;
     return nullptr;
   }
 
-  const Value* findNamed(std::string_view name, const Value& object, std::size_t length) const {
+  const Value* findNamed(std::string_view name, const Value& object, std::size_t length) {
     return _path.substr(length).starts_with(name) ? findFrom(object, length + name.size()) : nullptr;
   }
 
   const std::string_view _path;
+  std::set<std::pair<const void*, std::size_t>> _failedSearches;
 };
 
 }  // namespace

@@ -49,14 +49,10 @@ class InputDecoding {
         _seen(watchedPaths(options)) {
     if (options.captures.size() > 1) _captureName = _path;
     if (options.output == Output::EveryDisplay)
-      _sinks.push_back(std::make_unique<EveryDisplay>(stdout, _captureName));
+      _streamed = std::make_unique<EveryDisplay>(stdout, _captureName);
     if (options.output == Output::ValueTable)
-      _sinks.push_back(std::make_unique<ValueTable>(stdout, options.tablePaths, _captureName));
-    if (options.plot) {
-      auto recorder = std::make_unique<PlotRecorder>(options.plot->paths);
-      _recorder = recorder.get();
-      _sinks.push_back(std::move(recorder));
-    }
+      _streamed = std::make_unique<ValueTable>(stdout, options.tablePaths, _captureName);
+    if (options.plot) _recorder.emplace(options.plot->paths);
   }
 
   int run(const DecodingServices& services) {
@@ -83,7 +79,7 @@ class InputDecoding {
     bool isDone = succeeds([&] { read(*capture, *generator, decoder, log); });
     const Value display = decoder.finish();
     const Time end = services.clock.now();
-    if (decoder.hasStarted()) isDone &= succeeds([&] { report({end, display}); });
+    if (decoder.hasStarted()) report({end, display});
     if (_options.snapshotPath || _options.binaryLogPath) {
       const Value items = decoder.saveContents();
       if (_options.snapshotPath) isDone &= succeeds([&] { writeSnapshotFile(end, items); });
@@ -91,7 +87,7 @@ class InputDecoding {
     }
     isDone &= drawPicture();
     isDone &= succeeds([&] { writeSummary(display); });
-    return isDone ? 0 : generalError;
+    return isDone && !_isOutputBroken ? 0 : generalError;
   }
 
   void read(CaptureReader& capture, const LogGenerator& generator, OfflineDecoder& decoder, HostLog& log) {
@@ -102,7 +98,7 @@ class InputDecoding {
         log, _options.logLevel);
     const bool isCounting = countsMessages();
     CaptureRecord record;
-    while (capture.next(record)) {
+    while (!isPointless() && capture.next(record)) {
       progress.recordRead();
       if (isCounting) _statistics.add(generator.fateOf(record.message));
       if (const auto generation = decoder.fireTicks(record.time)) report(*generation);
@@ -117,22 +113,29 @@ class InputDecoding {
       return mistake("--snapshot saves what was decoded of a capture, but " + _name + " is a snapshot").code;
     std::optional<SnapshotFile> snapshot;
     if (!succeeds([&] { snapshot.emplace(_path); })) return generalError;
-    bool isDone = _sinks.empty() || succeeds([&] {
-                    for (const Generation& generation : snapshot->generations()) report(generation);
-                  });
+    bool isDone = !wantsGenerations() || succeeds([&] {
+      for (const Generation& generation : snapshot->generations()) report(generation);
+    });
     isDone &= writeBinaryLog(snapshot->items());
     isDone &= drawPicture();
     isDone &= succeeds([&] { writeSummary(snapshot->shown()); });
-    return isDone ? 0 : generalError;
+    return isDone && !_isOutputBroken ? 0 : generalError;
   }
 
-  // After a failure there is no use in trying again.
+  bool wantsGenerations() const { return _streamed || _recorder; }
+
+  // An output that has failed gets no more; what goes to files goes on.
   void report(const Generation& generation) {
-    if (_sinks.empty() || _isReportBroken) return;
-    _isReportBroken = true;
-    _seen.take(generation);
-    for (const auto& sink : _sinks) sink->take(generation);
-    _isReportBroken = false;
+    if (wantsGenerations()) _seen.take(generation);
+    if (_recorder) _recorder->take(generation);
+    if (!_streamed || succeeds([&] { _streamed->take(generation); })) return;
+    _streamed.reset();
+    _isOutputBroken = true;
+  }
+
+  // Whether nobody would see what else the capture holds.
+  bool isPointless() const {
+    return _isOutputBroken && !_recorder && !_options.snapshotPath && !_options.binaryLogPath;
   }
 
   void writeSnapshotFile(Time time, const Value& items) const {
@@ -165,7 +168,7 @@ class InputDecoding {
   // A cell may never have been met; more likely its name was mistyped. Nothing is known when not all was
   // looked at.
   void tellUnseenPaths() const {
-    if (_isReportBroken) return;
+    if (isPointless()) return;
     for (const std::string& path : _seen.unseen()) {
       std::fprintf(stderr,
                    "%s: no display of %s has a value under '%s'; --format paths shows what there is\n",
@@ -204,12 +207,12 @@ class InputDecoding {
   const std::string _path;
   const std::string _name;  // as errors and headings tell it
   const bool _isFirst;
-  std::optional<std::string> _captureName;  // in the output; absent when there is but one
-  std::vector<std::unique_ptr<GenerationSink>> _sinks;
-  PlotRecorder* _recorder = nullptr;  // one of the sinks
+  std::optional<std::string> _captureName;    // in the output; absent when there is but one
+  std::unique_ptr<GenerationSink> _streamed;  // to standard output
+  std::optional<PlotRecorder> _recorder;
   SeenPaths _seen;
   MessageStatistics _statistics;
-  bool _isReportBroken = false;
+  bool _isOutputBroken = false;
 };
 
 }  // namespace

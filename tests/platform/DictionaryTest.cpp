@@ -172,7 +172,6 @@ TEST(Dictionary, SetTextLeavesCopiesOfTheValueAlone) {
   EXPECT_EQ(*copy.string(), "old");
 }
 
-// As the walk over a history record does: values go from one key to another of the same dictionary.
 TEST(Dictionary, ASlotFindsItsKeyWhereverItStands) {
   Dictionary dictionary;
   Dictionary::Slot slot("b");
@@ -242,6 +241,7 @@ TEST(Dictionary, RewritingTakesOtherKindsAndGrows) {
   EXPECT_EQ(textOf(dictionary, "key 59"), "one");
 }
 
+// As the walk over a history record does: values go from one key to another of the same dictionary.
 TEST(Dictionary, TakesItsOwnValuesAndKeys) {
   Dictionary dictionary;
   dictionary.set("key", "text");

@@ -98,6 +98,20 @@ TEST_F(DecodeGenerations, WhenTheReaderLeavesTheRestIsNotReadAndNothingIsSaidOfI
   EXPECT_EQ(result.error, "");
 }
 
+TEST_F(DecodeGenerations, WhenTheReaderLeavesTheFilesAreWrittenWhole) {
+  constexpr std::uint32_t displays = 10'000;
+  std::string capture = pcapHeader();
+  for (std::uint32_t i = 0; i < displays; ++i)
+    capture += pcapRecord(afternoon + 2 * i, 0, antennas(i % 2 == 0 ? 2 : 4));
+  const std::string path = write("capture", capture);
+  const std::string whole = folder.file("whole.dlf"), cut = folder.file("cut.dlf");
+  const std::string options = "--log-level -1 --csv A/B 'Serving Cell Info/Tx Antennas' --dlf ";
+  ASSERT_EQ(runInShell(options + whole + " -- " + path + " > /dev/null").status, 0);
+  const Result result = runInShell(options + cut + " -- " + path + " | head -n 1");
+  EXPECT_EQ(result.output, "Time,A/B,Serving Cell Info/Tx Antennas\n");
+  EXPECT_EQ(contentsOf(cut), contentsOf(whole));
+}
+
 TEST_F(DecodeGenerations, StatisticsCountEveryMessageOnce) {
   std::string capture = pcapHeader();
   for (const std::string& message :
