@@ -6,7 +6,6 @@
 #include <functional>
 #include <map>
 #include <memory>
-#include <new>
 #include <ostream>
 #include <string_view>
 #include <vector>
@@ -18,24 +17,11 @@
 #include "platform/host/FileResources.h"
 #include "platform/host/SystemClock.h"
 #include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+#include "tests/support/AllocationCounter.h"
 
 // Without arguments: the technologies, then the ways, a line each. With a technology and a way: what a
 // message of the technology's mixed stream takes, "NANOSECONDS ALLOCATIONS". With a number besides: goes over
 // the stream that often and measures nothing, for whoever counts the instructions of `measuredWay`.
-
-namespace {
-
-std::uint64_t allocations = 0;
-
-}  // namespace
-
-void* operator new(std::size_t size) {
-  ++allocations;
-  if (void* memory = std::malloc(size > 0 ? size : 1)) return memory;
-  throw std::bad_alloc();
-}
-void operator delete(void* memory) noexcept { std::free(memory); }
-void operator delete(void* memory, std::size_t) noexcept { std::free(memory); }
 
 namespace varnel {
 namespace {
@@ -145,11 +131,11 @@ Cost goOver(const Run& run, std::size_t size) {
   Clock::duration time{};
   std::uint64_t allocated = 0;
   for (std::size_t first = 0; first < size; first += messagesPerDisplay) {
-    const std::uint64_t before = allocations;
+    const std::uint64_t before = allocationCount();
     const auto start = Clock::now();
     measuredWay(run.way, first, std::min(first + messagesPerDisplay, size));
     time += Clock::now() - start;
-    allocated += allocations - before;
+    allocated += allocationCount() - before;
     run.between();
   }
   const auto count = static_cast<double>(size);

@@ -1,13 +1,23 @@
 #pragma once
 
+#include <string>
+
 #include "LogGenerator/LogGenerator.h"
 #include "platform/Dictionary.h"
 
 namespace varnel::c2k {
 
 /// The entries of the state that hold what one link had sent when it wrote its last packet, and those of the
-/// extra information that hold what it had sent then and before.
+/// extra information that hold what it had sent then and before. Their names begin with that of the link.
 struct LinkSlots {
+  explicit LinkSlots(const std::string& link)
+      : sequence(link + "DataSeqNum"),
+        sent(link + "DataSent"),
+        newSequence(link + "DataSeqNum1"),
+        newSent(link + "DataSent1"),
+        oldSequence(link + "DataSeqNum2"),
+        oldSent(link + "DataSent2") {}
+
   Dictionary::Slot sequence, sent;
   Dictionary::Slot newSequence, newSent;
   Dictionary::Slot oldSequence, oldSent;
@@ -19,22 +29,8 @@ struct StateSlots {
   Dictionary::Slot lookup{stateKey::lookup};
   Dictionary::Slot extraInfo{stateKey::extraInfo};
   Dictionary::Slot trafficFER{"TrafficFER"};
-  LinkSlots forwardLink{
-      .sequence = Dictionary::Slot("FLDataSeqNum"),
-      .sent = Dictionary::Slot("FLDataSent"),
-      .newSequence = Dictionary::Slot("FLDataSeqNum1"),
-      .newSent = Dictionary::Slot("FLDataSent1"),
-      .oldSequence = Dictionary::Slot("FLDataSeqNum2"),
-      .oldSent = Dictionary::Slot("FLDataSent2"),
-  };
-  LinkSlots reverseLink{
-      .sequence = Dictionary::Slot("RLDataSeqNum"),
-      .sent = Dictionary::Slot("RLDataSent"),
-      .newSequence = Dictionary::Slot("RLDataSeqNum1"),
-      .newSent = Dictionary::Slot("RLDataSent1"),
-      .oldSequence = Dictionary::Slot("RLDataSeqNum2"),
-      .oldSent = Dictionary::Slot("RLDataSent2"),
-  };
+  LinkSlots forwardLink{"FL"};
+  LinkSlots reverseLink{"RL"};
 };
 
 /// The state dictionary, in which decoders keep what they must remember until the next packet.

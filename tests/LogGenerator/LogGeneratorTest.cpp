@@ -126,7 +126,8 @@ template <class Index>
 std::vector<std::string> codesOf() {
   std::ostringstream standardOutput;
   std::vector<std::string> codes = Index(standardOutput).getAllLogCodes();
-  std::ranges::stable_partition(codes, [](const std::string& code) { return std::stol(code) < 0xFF0000; });
+  std::stable_partition(codes.begin(), codes.end(),
+                        [](const std::string& code) { return std::stol(code) < 0xFF0000; });
   return codes;
 }
 

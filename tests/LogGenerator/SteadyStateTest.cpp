@@ -1,31 +1,16 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <map>
 #include <memory>
-#include <new>
 #include <set>
 
 #include "LogGenerator/LogGenerator.h"
 #include "platform/TelephonyService.h"
 #include "platform/host/FileResources.h"
+#include "tests/support/AllocationCounter.h"
 #include "tests/support/SimulatedMessages.h"
 #include "tests/support/TestServices.h"
-
-namespace {
-
-std::uint64_t allocations = 0;
-
-}  // namespace
-
-void* operator new(std::size_t size) {
-  ++allocations;
-  if (void* memory = std::malloc(size > 0 ? size : 1)) return memory;
-  throw std::bad_alloc();
-}
-void operator delete(void* memory) noexcept { std::free(memory); }
-void operator delete(void* memory, std::size_t) noexcept { std::free(memory); }
 
 namespace varnel {
 namespace {
@@ -61,9 +46,9 @@ class Generator {
 
  private:
   std::uint64_t allocationsFor(const std::vector<SimulatedPacket>& messages) {
-    const std::uint64_t before = allocations;
+    const std::uint64_t before = allocationCount();
     take(messages);
-    return allocations - before;
+    return allocationCount() - before;
   }
 
   void take(const std::vector<SimulatedPacket>& messages) {

@@ -1,0 +1,11 @@
+#pragma once
+
+#include <cstdint>
+
+namespace varnel {
+
+/// How often this thread has taken memory with `new` so far. A program that links this counts its
+/// allocations.
+std::uint64_t allocationCount();
+
+}  // namespace varnel
