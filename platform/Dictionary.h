@@ -16,7 +16,8 @@ namespace varnel {
 class Dictionary {
  public:
   struct Entry {
-    Entry(std::string_view itsKey, Value itsValue) : key(itsKey), value(std::move(itsValue)) {}
+    Entry(std::string_view itsKey, Value&& itsValue) : key(itsKey), value(std::move(itsValue)) {}
+    Entry(std::string_view itsKey, const Value& itsValue) : key(itsKey), value(itsValue) {}
 
     std::string key;
     Value value;

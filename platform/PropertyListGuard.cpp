@@ -183,11 +183,10 @@ class BinaryWalk {
   };
 
   bool passValue(std::uint64_t index, Place place) {
-    return _pathBytes.take(place.path) && passObject(index, place);
+    return _pathBytes.take(place.path) && passObject(objectAt(index), place);
   }
 
-  bool passObject(std::uint64_t index, Place place) {
-    const auto object = objectAt(index);
+  bool passObject(const std::optional<Object>& object, Place place) {
     if (!object || !_nodes.take(1)) return false;
     const auto [kind, size, content] = *object;
     switch (kind) {
@@ -228,7 +227,7 @@ class BinaryWalk {
     for (std::size_t i = 0; i < size; ++i) {
       const auto key = objectAt(reference(content, i));
       if (!key || (key->kind != 0x5 && key->kind != 0x6)) return false;
-      if (!passObject(reference(content, i), place)) return false;
+      if (!passObject(key, place)) return false;
       // A unit of UTF-16 is three bytes of UTF-8 at most.
       const std::size_t length = key->kind == 0x6 ? 3 * key->size : key->size;
       if (!passValue(reference(content, size + i), place.below(length))) return false;

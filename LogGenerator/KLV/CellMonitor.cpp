@@ -95,6 +95,7 @@ Array cellMonitorList(const Array& records, std::string_view radioAccessTechnolo
     const Dictionary* cell = cellOfKind(record, radioAccessTechnology, cellType);
     if (!cell) continue;
     Value row = Value::ofDictionary();
+    row.dictionary()->reserve(columns.size());
     showCell(*row.dictionary(), *cell, columns);
     rows.push_back(std::move(row));
   }
