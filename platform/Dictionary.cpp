@@ -32,6 +32,7 @@ std::size_t Dictionary::find(std::string_view key) const {
   if (_next > 0 && _next <= _entries.size() && _entries[_next - 1].key == key) return _next - 1;
   if (_next >= _entries.size()) _next = 0;
   if (_entries[_next].key == key) return _next++;
+  if ((_kinds & kindOf(key)) == 0) return nowhere;
   if (!_positions.empty()) {
     const auto found = _positions.find(key);
     if (found == _positions.end()) return nowhere;
@@ -59,6 +60,7 @@ Dictionary::Rewriting::~Rewriting() {
 
 void Dictionary::Rewriting::add(std::string_view key, std::string_view text) {
   std::vector<Entry>& entries = _dictionary._entries;
+  _dictionary._kinds |= kindOf(key);
   if (_size == entries.size()) {
     entries.emplace_back(key, text);
   } else {
@@ -70,6 +72,7 @@ void Dictionary::Rewriting::add(std::string_view key, std::string_view text) {
 
 // The key may be a view of what stands in the dictionary, which moves when it grows.
 void Dictionary::append(std::string_view key, Value&& value) {
+  _kinds |= kindOf(key);
   _entries.emplace_back(key, std::move(value));
   if (!_positions.empty()) {
     _positions.emplace(_entries.back().key, _entries.size() - 1);

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <functional>
 #include <map>
 #include <string>
@@ -80,6 +81,12 @@ class Dictionary {
   // Up to here a walk over the entries beats an index.
   static constexpr std::size_t largestUnindexed = 48;
 
+  // One of 64 kinds of keys, as a bit.
+  static std::uint64_t kindOf(std::string_view key) {
+    const std::size_t last = key.empty() ? 0 : static_cast<unsigned char>(key.back());
+    return std::uint64_t{1} << ((key.size() * 5 + last) % 64);
+  }
+
   std::size_t find(std::string_view key) const;
   std::size_t find(Slot& slot) const {
     const std::size_t position = slot._position;
@@ -105,6 +112,8 @@ class Dictionary {
   std::map<std::string, std::size_t, std::less<>> _positions;
   // A packet sets its rows in the same order each time, so the next key is looked for behind the last one.
   mutable std::size_t _next = 0;
+  // The kinds of the keys that have ever stood here. A key of another kind need not be looked for.
+  std::uint64_t _kinds = 0;
 };
 
 }  // namespace varnel

@@ -4,19 +4,17 @@
 
 #include <cstdint>
 #include <cstdlib>
-#include <cstring>
 #include <limits>
 #include <memory>
 #include <string_view>
 
 #include "platform/Dictionary.h"
 #include "platform/PropertyListGuard.h"
+#include "platform/PropertyListText.h"
 
 namespace varnel {
 
 namespace {
-
-enum class Encoding { Xml, Binary };
 
 struct FreeNode {
   void operator()(plist_t node) const { plist_free(node); }
@@ -28,66 +26,19 @@ struct Free {
   void operator()(void* memory) const { std::free(memory); }
 };
 
-// Takes the first character of the text; 0 when it is no UTF-8.
-char32_t takeCharacter(std::string_view& text) {
-  const auto first = static_cast<unsigned char>(text[0]);
-  const std::size_t length = first < 0x80 ? 1 : first < 0xE0 ? 2 : first < 0xF0 ? 3 : 4;
-  if ((first >= 0x80 && first < 0xC2) || first > 0xF4 || text.size() < length) return 0;
-  char32_t character = length == 1 ? first : first & (0x7FU >> length);
-  for (std::size_t i = 1; i < length; ++i) {
-    const auto next = static_cast<unsigned char>(text[i]);
-    if ((next & 0xC0U) != 0x80) return 0;
-    character = character << 6U | (next & 0x3FU);
-  }
-  constexpr char32_t leastOfLength[] = {0, 0, 0x80, 0x800, 0x10000};
-  const bool isSurrogate = character >= 0xD800 && character <= 0xDFFF;
-  if (character < leastOfLength[length] || character > 0x10FFFF || isSurrogate) return 0;
-  text.remove_prefix(length);
-  return character;
-}
-
-bool isPlain(char character) {
-  const auto code = static_cast<unsigned char>(character);
-  return code >= 0x20 && code < 0x80;
-}
-
-// Whether the text begins with eight characters that are plain.
-bool beginsPlain(std::string_view text) {
-  constexpr std::uint64_t highBits = 0x8080808080808080;
-  constexpr std::uint64_t blanks = 0x2020202020202020;
-  std::uint64_t word = 0;
-  if (text.size() < sizeof word) return false;
-  std::memcpy(&word, text.data(), sizeof word);
-  return ((word | (word - blanks)) & highBits) == 0;
-}
-
-bool canHold(Encoding encoding, std::string_view text) {
-  while (!text.empty()) {
-    // Nearly every character is plain ASCII.
-    if (beginsPlain(text)) {
-      text.remove_prefix(sizeof(std::uint64_t));
-      continue;
-    }
-    if (isPlain(text[0])) {
-      text.remove_prefix(1);
-      continue;
-    }
-    const char32_t character = takeCharacter(text);
-    if (character == 0) return false;
-    if (encoding == Encoding::Binary) continue;
-    const bool isControl = character < 0x20 && character != '\t' && character != '\n' && character != '\r';
-    if (isControl || character == 0xFFFE || character == 0xFFFF) return false;
-  }
-  return true;
-}
-
 Value readNode(plist_t node, Encoding encoding);
+
+// The texts of a binary list have been looked at before it was parsed. Those of an XML list may have got
+// anything from their entities.
+bool isFit(std::string_view text, Encoding encoding) {
+  return encoding == Encoding::Binary || canHold(encoding, text);
+}
 
 Value readText(plist_t node, Encoding encoding) {
   std::uint64_t length = 0;
   const char* text = plist_get_string_ptr(node, &length);
   const std::string_view view(text, length);
-  return canHold(encoding, view) ? Value(view) : Value();
+  return isFit(view, encoding) ? Value(view) : Value();
 }
 
 // Of a date in the second before 2001 or in that after it, which the library tells alike. What it writes of a
@@ -140,15 +91,14 @@ Value readDictionary(plist_t node, Encoding encoding) {
   plist_dict_new_iter(node, &position);
   const std::unique_ptr<void, Free> positionOwner(position);
   for (;;) {
-    plist_t item = nullptr;
-    plist_dict_next_item(node, position, nullptr, &item);
-    if (!item) return Value(dictionary);
     char* text = nullptr;
-    plist_get_key_val(plist_dict_item_get_key(item), &text);
+    plist_t item = nullptr;
+    plist_dict_next_item(node, position, &text, &item);
+    if (!item) return Value(dictionary);
     const std::unique_ptr<char, Free> textOwner(text);
     const std::string_view key = text;
     Value value = readNode(item, encoding);
-    if (value.isAbsent() || !canHold(encoding, key)) return {};
+    if (value.isAbsent() || !isFit(key, encoding)) return {};
     dictionary->set(key, std::move(value));
   }
 }

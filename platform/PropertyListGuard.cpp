@@ -7,6 +7,8 @@
 #include <string_view>
 #include <vector>
 
+#include "platform/PropertyListText.h"
+
 namespace varnel {
 
 namespace {
@@ -183,12 +185,13 @@ class BinaryWalk {
   };
 
   bool passValue(std::uint64_t index, Place place) {
-    return _pathBytes.take(place.path) && passObject(objectAt(index), place);
+    const auto object = objectAt(index);
+    return object && _pathBytes.take(place.path) && passObject(*object, place);
   }
 
-  bool passObject(const std::optional<Object>& object, Place place) {
-    if (!object || !_nodes.take(1)) return false;
-    const auto [kind, size, content] = *object;
+  bool passObject(const Object& object, Place place) {
+    if (!_nodes.take(1)) return false;
+    const auto [kind, size, content] = object;
     switch (kind) {
       case 0x0:
         return size == 8 || size == 9;  // false and true
@@ -201,7 +204,8 @@ class BinaryWalk {
       case 0x4:
         return holds(content, size) && _textBytes.take(size);
       case 0x5:
-        return holds(content, size) && _textBytes.take(size) && !hasNull(content, size);
+        return holds(content, size) && _textBytes.take(size) &&
+               canHold(Encoding::Binary, text(content, size));
       case 0x6:
         return size <= contentLeft(content) / 2 && _textBytes.take(2 * size) && isUtf16(content, size);
       case 0xA:
@@ -226,8 +230,7 @@ class BinaryWalk {
     if (size > contentLeft(content) / _referenceSize / 2 || !_keyPairs.take(size * size)) return false;
     for (std::size_t i = 0; i < size; ++i) {
       const auto key = objectAt(reference(content, i));
-      if (!key || (key->kind != 0x5 && key->kind != 0x6)) return false;
-      if (!passObject(key, place)) return false;
+      if (!key || (key->kind != 0x5 && key->kind != 0x6) || !passObject(*key, place)) return false;
       // A unit of UTF-16 is three bytes of UTF-8 at most.
       const std::size_t length = key->kind == 0x6 ? 3 * key->size : key->size;
       if (!passValue(reference(content, size + i), place.below(length))) return false;
@@ -253,9 +256,8 @@ class BinaryWalk {
     return Object{object.kind, number(object.content + 1, width), object.content + 1 + width};
   }
 
-  bool hasNull(std::size_t content, std::size_t size) const {
-    const ByteView text = _bytes.subspan(content, size);
-    return std::find(text.begin(), text.end(), 0) != text.end();
+  std::string_view text(std::size_t content, std::size_t size) const {
+    return {reinterpret_cast<const char*>(_bytes.data()) + content, size};
   }
 
   // True when every surrogate has its other half and no unit is U+0000.

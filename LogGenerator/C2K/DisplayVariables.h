@@ -22,6 +22,7 @@ namespace varnel::c2k {
 /// The mark, as key and as text, of a dictionary whose rows are ordered by key.
 inline constexpr std::string_view sortedMark = "_sorted";
 
+/// The variables that decoders set, by the names under which the template places them.
 inline constexpr std::string_view variableNames[] = {
     "kChannel",         "k1xEVDODeviceState",
     "kBandClass",       "kRxAGC0",

@@ -51,7 +51,9 @@ std::optional<Value> readCellMonitorArray(const Packet& packet) {
 const Array* CellMonitorReader::read(const Packet& packet) {
   const ByteView payload = packet.payload();
   if (!_payload || !std::ranges::equal(payload, *_payload)) {
-    _payload.emplace(payload.begin(), payload.end());
+    if (!_payload) _payload.emplace();
+    _payload->assign(payload.begin(), payload.end());
+    _records.reset();  // gives its memory to the new one
     _records = parsedArray(payload);
   }
   if (_records) return _records->array();
