@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "LogGenerator/Services.h"
+#include "fuzz/Require.h"
 #include "platform/Log.h"
 #include "platform/host/FileResources.h"
 
@@ -20,6 +21,7 @@ class ShippedResources final : public Resources {
       const std::string name = path.substr(0, path.rfind('.'));
       _lists[name] = files.propertyList(name);
     }
+    require(!_lists.empty(), "the resources are there (VARNEL_RESOURCES names another folder)");
   }
   Value propertyList(std::string_view name) const override {
     const auto found = _lists.find(name);
