@@ -15,6 +15,8 @@ class FileResources final : public Resources {
   std::vector<std::string> propertyListPaths() const override;
 
  private:
+  std::filesystem::path fileOf(std::string_view name) const;
+
   std::filesystem::path _folder;
 };
 

@@ -16,6 +16,10 @@ using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
+std::string list(const std::string& text) {
+  return "<plist version=\"1.0\"><string>" + text + "</string></plist>";
+}
+
 class FileResourcesTest : public testing::Test {
  protected:
   void write(const std::string& path, const std::string& text) const {
@@ -42,6 +46,21 @@ TEST_F(FileResourcesTest, WhatCannotBeReadIsAbsent) {
   EXPECT_TRUE(_resources.propertyList("Empty").isAbsent());
   EXPECT_TRUE(_resources.propertyList("Folder").isAbsent());
   EXPECT_TRUE(_resources.propertyList("Missing").isAbsent());
+}
+
+TEST_F(FileResourcesTest, FindsAPropertyListByNameInAFolderBelow) {
+  write("z/LTE.plist", list("z"));
+  write("a/b/LTE.plist", list("a/b"));
+  EXPECT_EQ(*_resources.propertyList("LTE").string(), "a/b");
+  write("LTE.plist", list("top"));
+  EXPECT_EQ(*_resources.propertyList("LTE").string(), "top");
+}
+
+TEST_F(FileResourcesTest, LinksInACircleAreNoPropertyLists) {
+  std::filesystem::create_symlink("Circle.plist", _folder.file("Circle.plist"));
+  write("b.plist", list("b"));
+  EXPECT_THAT(_resources.propertyListPaths(), ElementsAre("b.plist"));
+  EXPECT_TRUE(_resources.propertyList("Circle").isAbsent());
 }
 
 TEST_F(FileResourcesTest, ListsPropertyListsInNameOrder) {
