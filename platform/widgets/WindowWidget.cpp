@@ -12,8 +12,8 @@ namespace {
 
 constexpr QSize smallest(240, 240);
 
-bool isStartOver(const QKeyEvent& event) {
-  return event.key() == Qt::Key_R && event.modifiers() == Qt::ControlModifier;
+bool isControlAnd(Qt::Key key, const QKeyEvent& event) {
+  return event.key() == key && event.modifiers() == Qt::ControlModifier;
 }
 
 }  // namespace
@@ -61,8 +61,9 @@ void WindowWidget::resizeEvent(QResizeEvent* event) {
 }
 
 void WindowWidget::keyPressEvent(QKeyEvent* event) {
-  if (isStartOver(*event) && _wishes.startOver) return _wishes.startOver();
-  if (event->matches(QKeySequence::Quit)) {
+  if (isControlAnd(Qt::Key_R, *event) && _wishes.startOver) return _wishes.startOver();
+  // Not every desktop has a key for quitting of its own.
+  if (event->matches(QKeySequence::Quit) || isControlAnd(Qt::Key_Q, *event)) {
     close();
     return;
   }

@@ -1,0 +1,73 @@
+#include "programs/varnel/WindowView.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <QApplication>
+#include <QTest>
+#include <QTimer>
+#include <cstdlib>
+#include <functional>
+
+#include "tests/support/Process.h"
+
+namespace varnel {
+namespace {
+
+using namespace std::chrono_literals;
+using testing::HasSubstr;
+
+// What the user does as soon as there is a window.
+std::function<void(QWidget& window)> deed;
+
+void awaitWindow() {
+  QTimer::singleShot(10ms, [] {
+    for (QWidget* const window : QApplication::topLevelWidgets()) {
+      if (window->isVisible()) return deed(*window);
+    }
+    awaitWindow();
+  });
+}
+Q_COREAPP_STARTUP_FUNCTION(awaitWindow)
+
+// The viewer from its start to its end, without a server, on a screen that nobody sees.
+class WindowViewTest : public testing::Test {
+ protected:
+  WindowViewTest() {
+    ::setenv("QT_QPA_PLATFORM", "offscreen", 1);
+    ::unsetenv("DBUS_SESSION_BUS_ADDRESS");
+  }
+
+  int statusAfter(std::function<void(QWidget& window)> whatIsDone) const {
+    deed = std::move(whatIsDone);
+    Options options;
+    options.deviceRoot = _device.path().string();
+    options.runtimeFolder = _runtime.path().string();
+    int argumentCount = 1;
+    std::string name = programName;
+    char* arguments[] = {name.data(), nullptr};
+    return viewInWindow(argumentCount, arguments, options, {.version = "1.0", .buildDate = "today"});
+  }
+  void expectThePreferenceBack() const {
+    EXPECT_THAT(contentsOf(_device.path() / "var/mobile/Library/Preferences/com.orvane.dockhall.plist"),
+                HasSubstr("DHShowGSMRSSI"));
+  }
+
+ private:
+  TemporaryFolder _runtime;
+  TemporaryFolder _device;
+};
+
+TEST_F(WindowViewTest, ClosingTheWindowEndsTheViewerAndPutsThePreferenceBack) {
+  EXPECT_EQ(statusAfter([](QWidget& window) { window.close(); }), 0);
+  expectThePreferenceBack();
+}
+
+TEST_F(WindowViewTest, ControlQEndsTheViewerAndPutsThePreferenceBack) {
+  EXPECT_EQ(statusAfter([](QWidget& window) { QTest::keyClick(&window, Qt::Key_Q, Qt::ControlModifier); }),
+            0);
+  expectThePreferenceBack();
+}
+
+}  // namespace
+}  // namespace varnel
