@@ -1,5 +1,7 @@
 #include "programs/varnel/Options.h"
 
+#include <limits>
+
 namespace varnel {
 
 void declare(CLI::App& parser, Options& options, const ApplicationInfo& application) {
@@ -9,7 +11,8 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       "var/mobile/Library/Logs/CrashReporter under the device root, on devices that allow it.\n"
       "\n"
       "In the window: arrow keys, Return to open, Escape to go back, Shift and Left or Right\n"
-      "for long values, Ctrl+S to save a snapshot, Ctrl+R to start over, Ctrl+Q to end.");
+      "for long values, Ctrl+S to save a snapshot, Ctrl+R to start over, Ctrl+Q to end.\n"
+      "In a terminal: S to save a snapshot, R to start over, Q to end.");
   parser.set_version_flag("--version",
                           programName + std::string(" ") + application.version.value_or("(none)"));
   parser
@@ -26,10 +29,12 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       ->type_name("DIR");
   parser
       .add_option("--log-level", options.logLevel,
-                  "also write log lines of this priority number and lower to standard error")
-      ->type_name("N");
+                  "also write log lines of this priority number and lower to standard error; -1 for none")
+      ->check(CLI::Range(-1, std::numeric_limits<int>::max()).description(""))
+      ->type_name("N")
+      ->capture_default_str();
   parser.add_option("--updates", options.updates, "end after that many refreshes")
-      ->check(CLI::PositiveNumber)
+      ->check(CLI::Range(1U, std::numeric_limits<unsigned>::max()).description(""))
       ->type_name("N");
 }
 

@@ -15,7 +15,7 @@ struct Options {
   std::string userInterface = "auto";
   std::string deviceRoot = "/";
   std::optional<std::string> runtimeFolder;
-  std::optional<int> logLevel;
+  int logLevel = -1;  ///< the highest priority number that goes to standard error; -1 for none
   std::optional<unsigned> updates;
 };
 

@@ -4,6 +4,7 @@
 
 #include "app/TextViewer.h"
 #include "platform/host/HostApplication.h"
+#include "platform/host/KeyWatcher.h"
 #include "platform/host/SignalWatcher.h"
 #include "programs/varnel/HostServices.h"
 #include "programs/varnel/StandardOutput.h"
@@ -27,6 +28,21 @@ int viewAsText(int& argumentCount, char** arguments, const Options& options,
         viewer.save();
         break;
       default:
+        host.end(0);
+    }
+  });
+  const KeyWatcher keys([&](char key) {
+    switch (key) {
+      case 'r':
+      case 'R':
+        viewer.startOver();
+        break;
+      case 's':
+      case 'S':
+        viewer.save();
+        break;
+      case 'q':
+      case 'Q':
         host.end(0);
     }
   });

@@ -30,11 +30,11 @@ class EndToEnd : public testing::Test {
         VARNEL_TELEPHONYD_PROGRAM,
         std::vector<std::string>{"--simulate", "kalvi-lte", "--seed", "7", "--runtime-dir", _runtime.path()});
   }
-  std::unique_ptr<Process> viewer(std::vector<std::string> more = {}) {
+  std::unique_ptr<Process> viewer(std::vector<std::string> more = {}, const Terminal* terminal = nullptr) {
     std::vector<std::string> arguments{"--ui",          "text",         "--runtime-dir", _runtime.path(),
                                        "--device-root", _device.path(), "--log-level",   "3"};
     arguments.insert(arguments.end(), more.begin(), more.end());
-    return std::make_unique<Process>(VARNEL_PROGRAM, arguments);
+    return std::make_unique<Process>(VARNEL_PROGRAM, arguments, std::vector<std::string>(), terminal);
   }
 
   // A viewer that is asked for a window, where the environment names no display but that one.
@@ -118,6 +118,34 @@ TEST_F(EndToEnd, StartingOverShowsALivingTreeAgain) {
   const std::size_t before = occurrences(varnel->output(), "EF-ICCID");
   EXPECT_TRUE(eventually([&] { return occurrences(varnel->output(), "EF-ICCID") > before; }))
       << varnel->error();
+}
+
+TEST_F(EndToEnd, KeysOfATerminalStartOverSaveAndEnd) {
+  const auto telephony = server();
+  for (const std::string keys : {"rsq", "RSQ"}) {
+    const Terminal terminal;
+    const auto varnel = viewer({}, &terminal);
+    ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), "EF-ICCID") >= 1; }));
+    EXPECT_FALSE(terminal.showsLines());
+    terminal.type("x\n" + keys.substr(0, 1));
+    ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), "Connecting...\n") == 2; }));
+    terminal.type(keys.substr(1, 1));
+    ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), "nothing is saved") == 1; }));
+    terminal.type(keys.substr(2, 1));
+    ASSERT_TRUE(varnel->waitForEnd());
+    EXPECT_EQ(varnel->exitStatus(), 0) << varnel->error();
+    EXPECT_TRUE(terminal.showsLines());
+  }
+}
+
+TEST_F(EndToEnd, AViewerEndsWithItsTerminal) {
+  const auto telephony = server();
+  auto terminal = std::make_unique<Terminal>();
+  const auto varnel = viewer({}, terminal.get());
+  ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), "EF-ICCID") >= 1; }));
+  terminal.reset();
+  EXPECT_TRUE(varnel->waitForEnd());
+  EXPECT_EQ(varnel->exitStatus(), -SIGHUP);
 }
 
 TEST_F(EndToEnd, ASnapshotIsSavedOnlyWithTheMarker) {

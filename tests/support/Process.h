@@ -4,14 +4,17 @@
 #include <gtest/gtest.h>
 #include <sys/resource.h>
 #include <sys/wait.h>
+#include <termios.h>
 #include <unistd.h>
 
 #include <chrono>
 #include <csignal>
+#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <string>
+#include <string_view>
 #include <thread>
 #include <vector>
 
@@ -55,21 +58,49 @@ bool eventually(Condition condition, std::chrono::milliseconds within = std::chr
   return true;
 }
 
+/// A terminal with nobody before it but the test. Who reads from it is told when it goes.
+class Terminal {
+ public:
+  Terminal() : _keyboard(::posix_openpt(O_RDWR | O_NOCTTY | O_CLOEXEC)) {
+    if (::grantpt(_keyboard) != 0 || ::unlockpt(_keyboard) != 0) ADD_FAILURE() << "no terminal";
+  }
+  ~Terminal() { ::close(_keyboard); }
+  Terminal(const Terminal&) = delete;
+  Terminal& operator=(const Terminal&) = delete;
+
+  void type(std::string_view keys) const {
+    EXPECT_EQ(::write(_keyboard, keys.data(), keys.size()), static_cast<ssize_t>(keys.size()));
+  }
+  /// Whether keys are shown as they are typed, and handed on by the line.
+  bool showsLines() const {
+    termios mode{};
+    ::tcgetattr(_keyboard, &mode);
+    return (mode.c_lflag & ECHO) != 0 && (mode.c_lflag & ICANON) != 0;
+  }
+  std::string name() const { return ::ptsname(_keyboard); }
+
+ private:
+  const int _keyboard;
+};
+
 /// A real program, its standard output and error in files. It is killed when the object goes.
 class Process {
  public:
   /// Environment: assignments ("NAME=value") and names to take out ("NAME"), on top of the test's own.
+  /// Standard input is the terminal, when there is one: that of the program, which is in its foreground.
   Process(const std::string& program, std::vector<std::string> arguments,
-          std::vector<std::string> environment = {}) {
+          std::vector<std::string> environment = {}, const Terminal* terminal = nullptr) {
     arguments.insert(arguments.begin(), program);
     std::vector<char*> pointers;
     pointers.reserve(arguments.size() + 1);
     for (std::string& argument : arguments) pointers.push_back(argument.data());
     pointers.push_back(nullptr);
     const std::string outputPath = _folder.file("output"), errorPath = _folder.file("error");
+    const std::string inputPath = terminal ? terminal->name() : "/dev/null";
     _id = ::fork();
     if (_id != 0) return;
-    const int in = ::open("/dev/null", O_RDONLY);
+    if (terminal) ::setsid();
+    const int in = ::open(inputPath.c_str(), O_RDONLY);
     const int out = ::open(outputPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
     const int error = ::open(errorPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
     ::dup2(in, STDIN_FILENO);
