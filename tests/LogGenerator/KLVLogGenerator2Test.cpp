@@ -323,6 +323,19 @@ TEST_F(KLVLogGenerator2Test, WhatIsNeitherTextNorContainerIsReportedAndLeftOut) 
                   "<3>Received an object of unknown type", "<4>Processing the template"));
 }
 
+TEST_F(KLVLogGenerator2Test, ATemplateThatIsNeitherTextNorContainerIsReportedTwiceAtEachMessage) {
+  host.resources.add("Rows", Value::ofInteger(1));
+  const auto lines = ElementsAre(HasSubstr("<4>Initialized class index: "), "<4>Dictionary = 1",
+                                 "<4>String = 0", "<3>Received an object of unknown type",
+                                 "<4>Processing the template", "<3>Received an object of unknown type");
+  for (int message = 0; message < 2; ++message) {
+    generator->updateState_withData(state, {});
+    EXPECT_THAT(log.takeTexts(), lines);
+    EXPECT_FALSE(state.has("Display"));
+    EXPECT_EQ(described(state.get("ExtraInfo")), "{}");
+  }
+}
+
 TEST_F(KLVLogGenerator2Test, ATemplateInTheStateIsNotLoadedAgain) {
   state.set("Template", dictionaryOf({{"Twice", dictionaryOf({{"A", "1"}})}}));
   generator->updateState_withData(state, {});

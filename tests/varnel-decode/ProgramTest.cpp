@@ -156,8 +156,7 @@ TEST_F(DecodeProgram, AnObjectOfAnUnknownKindAbortsWithFileLineAndDescription) {
   EXPECT_EQ(result.status, -SIGABRT);
   EXPECT_EQ(result.output, "");
   EXPECT_THAT(result.error, HasSubstr("Unknown object of type integer encountered"));
-  EXPECT_THAT(result.error, HasSubstr("LogGenerator/GSM/GSMLogGenerator"));
-  EXPECT_THAT(result.error, HasSubstr("78"));
+  EXPECT_THAT(result.error, HasSubstr("LogGenerator/GSM/GSMLogGenerator:78: "));
 }
 
 TEST_F(DecodeProgram, AnObjectThatIsNoPropertyListAbortsWithFileLineAndDescription) {
@@ -166,8 +165,7 @@ TEST_F(DecodeProgram, AnObjectThatIsNoPropertyListAbortsWithFileLineAndDescripti
   EXPECT_EQ(result.status, -SIGABRT);
   EXPECT_EQ(result.output, "");
   EXPECT_THAT(result.error, HasSubstr("Could not deserialize the object"));
-  EXPECT_THAT(result.error, HasSubstr("LogGenerator/GSM/GSMLogGenerator"));
-  EXPECT_THAT(result.error, HasSubstr("90"));
+  EXPECT_THAT(result.error, HasSubstr("LogGenerator/GSM/GSMLogGenerator:90: "));
 }
 
 TEST_F(DecodeProgram, StandardInputIsReadForADash) {

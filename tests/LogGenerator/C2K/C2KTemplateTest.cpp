@@ -209,6 +209,8 @@ TEST_F(C2KTemplateTest, ADiscardedDisplayIsRebuiltEmptyFromTheKeptTemplate) {
   EXPECT_EQ(state.get("FLDataSeqNum").integer(), 7);
   EXPECT_THAT(log.takeTexts(), ElementsAre(processing));
   EXPECT_THAT(host.resources.requests(), ElementsAre("C2KTemplate"));
+  receive(withoutFingers());
+  EXPECT_EQ(described(state.get("Display")), R"~({Fingers: "(none)"})~");
 }
 
 // A missing template.

@@ -133,7 +133,17 @@ TEST_F(NeighborCellsListTest, AllOnesShowTheHighEndOfEachScale) {
       R"(Ant 1 Frame Offset: "2047", Ant 1 Sample Offset: "524287"}])");
 }
 
-// The antennas share their bits, so the second pair of rows always equals the first one.
+TEST_F(NeighborCellsListTest, AntennaOneAlwaysShowsTheOffsetsOfAntennaZero) {
+  for (const std::size_t byte : {12, 13, 14, 15, 16, 17, 18, 19}) {
+    decode(counted(0, 0, 41).u16(33, 0xBDA3).u16(35, 0xE62D).u8(21 + byte, 0x5A).bytes());
+    EXPECT_EQ(shown("Ant 1 Frame Offset"), shown("Ant 0 Frame Offset")) << "byte " << byte;
+    EXPECT_EQ(shown("Ant 1 Sample Offset"), shown("Ant 0 Sample Offset")) << "byte " << byte;
+    if (byte < 16) continue;
+    EXPECT_EQ(shown("Ant 1 Frame Offset"), R"("1443")") << "byte " << byte;
+    EXPECT_EQ(shown("Ant 1 Sample Offset"), R"("312759")") << "byte " << byte;
+  }
+}
+
 TEST_F(NeighborCellsListTest, EachBitCountsInItsOwnRowsAlone) {
   const std::vector<std::string_view> rsrp = {"-139.50 dBm", "-139.00 dBm", "-138.00 dBm",
                                               "-136.00 dBm", "-132.00 dBm", "-124.00 dBm",
