@@ -97,6 +97,7 @@ class RecordingTable final : public TableView {
     load();
   }
   std::unique_ptr<TableCell> dequeueReusableCell(std::string_view reuseIdentifier) override {
+    if (auto cell = _reloaded.take(reuseIdentifier)) return cell;
     return _pool.take(reuseIdentifier);
   }
   std::unique_ptr<CellView> makeCellView(CellStyle style) override {
@@ -154,22 +155,23 @@ class RecordingTable final : public TableView {
     if (_delegate && _delegate->numberOfSectionsInTableView(*this) != 1)
       throw std::logic_error("a table has one section");
     _rows = _delegate ? _delegate->tableView_numberOfRowsInSection(*this, 0) : 0;
-    putAway([](std::size_t) { return true; });
+    putAway(_reloaded, [](std::size_t) { return true; });
     showVisibleRows();
+    _reloaded = CellPool();
   }
   void showVisibleRows() {
     const std::size_t end = std::min(_rows, _firstVisible + visibleRows);
-    putAway([&](std::size_t row) { return row < _firstVisible || row >= end; });
+    putAway(_pool, [&](std::size_t row) { return row < _firstVisible || row >= end; });
     for (std::size_t row = _firstVisible; row < end; ++row) {
       if (!_visible.contains(row))
         _visible[row] = _delegate->tableView_cellForRowAtIndexPath(*this, {0, row});
     }
   }
   template <class Condition>
-  void putAway(Condition condition) {
+  void putAway(CellPool& pool, Condition condition) {
     for (auto next = _visible.begin(); next != _visible.end();) {
       const auto current = next++;
-      if (condition(current->first)) _pool.put(std::move(_visible.extract(current).mapped()));
+      if (condition(current->first)) pool.put(std::move(_visible.extract(current).mapped()));
     }
   }
 
@@ -179,7 +181,8 @@ class RecordingTable final : public TableView {
   std::size_t _firstVisible = 0;
   std::map<std::size_t, std::unique_ptr<TableCell>> _visible;  // by row
   std::optional<IndexPath> _selected;
-  CellPool _pool;
+  CellPool _reloaded;  // cells that were visible when a reload began; those that no row takes go
+  CellPool _pool;      // cells that were scrolled away
 };
 
 }  // namespace varnel

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <QScrollBar>
+#include <algorithm>
 
 #include "tests/support/TestWidgets.h"
 
@@ -128,6 +129,24 @@ TEST_F(TableWidgetTest, AReloadWithFewerRowsDropsTheSelectionOfALostOneAndScroll
   EXPECT_EQ(selected(), -1);
   EXPECT_EQ(table.verticalScrollBar()->value(), 100);
   EXPECT_EQ(table.visibleRows().front()->row(), 2u);
+}
+
+TEST_F(TableWidgetTest, AReloadWithFewerRowsLeavesNoneOfTheLostOnesOnTheScreen) {
+  const auto shownRows = [this] {
+    const auto all = table.viewport()->findChildren<RowWidget*>();
+    return std::ranges::count_if(all, [](const RowWidget* each) { return each->isVisible(); });
+  };
+  showWith(leaves(8));
+  EXPECT_EQ(shownRows(), 8);
+  delegate.rows = leaves(3);
+  table.reloadData();
+  EXPECT_EQ(shownRows(), 3);
+  const std::vector<RowWidget*> kept = table.visibleRows();
+  delegate.rows = leaves(8);
+  table.reloadData();
+  EXPECT_EQ(shownRows(), 8);
+  EXPECT_EQ(delegate.made, 13u);
+  for (std::size_t index = 0; index < kept.size(); ++index) EXPECT_EQ(&row(index), kept[index]);
 }
 
 TEST_F(TableWidgetTest, ARowKeepsItsSidewaysPositionOverAReload) {
