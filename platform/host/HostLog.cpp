@@ -28,7 +28,7 @@ void writeStandardError(int priority, std::string_view text) {
 
 }  // namespace
 
-HostLog::HostLog(Options options) : _standardErrorLevel(options.standardErrorLevel.value_or(noLevel)) {
+HostLog::HostLog(Options options) : _standardErrorLevel(options.standardErrorLevel) {
   setLogSink(this, _standardErrorLevel);
   if (options.systemLog == SystemLog::Unused) return;
   _systemLog = std::make_unique<SystemLogQueue>(SystemLogQueue::Options{

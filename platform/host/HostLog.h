@@ -4,7 +4,6 @@
 #include <filesystem>
 #include <functional>
 #include <memory>
-#include <optional>
 #include <string>
 
 #include "platform/Log.h"
@@ -22,8 +21,8 @@ class HostLog final : public LogSink {
 
   struct Options {
     std::string programName{};
-    /// Lines of that priority number and lower go to standard error; none when absent.
-    std::optional<int> standardErrorLevel{};
+    /// Lines of that priority number and lower go to standard error; -1 for none.
+    int standardErrorLevel = -1;
     SystemLog systemLog = SystemLog::Used;
     /// Where the system log's listener has its socket.
     std::filesystem::path systemLogSocket = "/dev/log";

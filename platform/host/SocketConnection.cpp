@@ -66,7 +66,7 @@ bool SocketConnection::hasTrustedPeer() const {
   socklen_t size = sizeof peer;
   const auto descriptor = static_cast<int>(_socket->socketDescriptor());
   if (::getsockopt(descriptor, SOL_SOCKET, SO_PEERCRED, &peer, &size) != 0) return false;
-  return peer.uid == ::geteuid() || peer.uid == 0;
+  return isTrusted(peer.uid, ::geteuid());
 }
 
 bool SocketConnection::isOpen() const { return _socket->state() == QLocalSocket::ConnectedState; }

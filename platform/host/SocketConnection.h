@@ -1,5 +1,7 @@
 #pragma once
 
+#include <sys/types.h>
+
 #include <QDeadlineTimer>
 #include <QLocalSocket>
 #include <array>
@@ -17,6 +19,9 @@ namespace varnel {
 /// empty one, one with a slash, one that makes the path longer than socket addresses are.
 std::filesystem::path socketPath(const std::filesystem::path& folder, std::string_view name);
 
+/// Whether a process of the one user trusts a peer of the other: of the same user or of root.
+constexpr bool isTrusted(uid_t peer, uid_t self) { return peer == self || peer == 0; }
+
 /// One end of a local stream socket that carries frames.
 class SocketConnection final {
  public:
@@ -30,7 +35,7 @@ class SocketConnection final {
   /// What can go out without waiting still does.
   ~SocketConnection();
 
-  /// True when the process at the other end is of this user or of root.
+  /// True when the process at the other end is of a user whom this one trusts.
   bool hasTrustedPeer() const;
   /// False once the peer has gone, as far as that has been noticed, or has sent what is no frame. Frames that
   /// came before are still there to be taken.

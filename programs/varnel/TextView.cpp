@@ -1,5 +1,6 @@
 #include "programs/varnel/TextView.h"
 
+#include <cctype>
 #include <csignal>
 
 #include "app/TextViewer.h"
@@ -32,16 +33,13 @@ int viewAsText(int& argumentCount, char** arguments, const Options& options,
     }
   });
   const KeyWatcher keys([&](char key) {
-    switch (key) {
-      case 'r':
+    switch (std::toupper(static_cast<unsigned char>(key))) {
       case 'R':
         viewer.startOver();
         break;
-      case 's':
       case 'S':
         viewer.save();
         break;
-      case 'q':
       case 'Q':
         host.end(0);
     }

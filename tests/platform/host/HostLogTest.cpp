@@ -15,7 +15,7 @@ using namespace std::chrono_literals;
 
 class HostLogTest : public testing::Test {
  protected:
-  HostLog::Options options(std::optional<int> level) {
+  HostLog::Options options(int level) {
     return {.programName = "tests",
             .standardErrorLevel = level,
             .systemLogSocket = _folder.file("log"),
@@ -62,7 +62,7 @@ TEST_F(HostLogTest, TheExportsOwnPriorityIsPassedOn) {
 TEST_F(HostLogTest, EveryLineGoesToTheSystemLog) {
   const RawSocket listener = RawSocket::receivingAt(_folder.file("log"));
   {
-    const HostLog log(options(std::nullopt));
+    const HostLog log(options(-1));
     testing::internal::CaptureStderr();
     logError("one");
     logLine(7, "two");
@@ -82,7 +82,7 @@ TEST_F(HostLogTest, TakesOnlyWhatStandardErrorWantsWhileNobodyListens) {
 
 TEST_F(HostLogTest, TakesNothingWhenNobodyWantsAnything) {
   {
-    const HostLog log(options(std::nullopt));
+    const HostLog log(options(-1));
     EXPECT_FALSE(logTakes(0));
   }
   const HostLog log({.programName = "tests", .systemLog = HostLog::SystemLog::Unused});
