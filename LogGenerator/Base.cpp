@@ -4,7 +4,7 @@
 
 #include "LogGenerator/ArrayLock.h"
 #include "LogGenerator/ClassIndex.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

@@ -8,8 +8,8 @@
 #include <vector>
 
 #include "LogGenerator/Packet.h"
-#include "platform/Dictionary.h"
-#include "platform/Value.h"
+#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace varnel {
 

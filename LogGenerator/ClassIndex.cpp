@@ -2,7 +2,7 @@
 
 #include <ostream>
 
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

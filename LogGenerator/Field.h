@@ -8,7 +8,7 @@
 #include <string_view>
 
 #include "LogGenerator/Packet.h"
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel {
 

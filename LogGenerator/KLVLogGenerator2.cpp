@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <charconv>
 
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

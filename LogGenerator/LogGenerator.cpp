@@ -5,7 +5,7 @@
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMLogGenerator.h"
 #include "LogGenerator/KLV/LTE/LTELogGenerator.h"
 #include "LogGenerator/KLV/UTRAN/UTRANLogGenerator.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {

@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <cstring>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

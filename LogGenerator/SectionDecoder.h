@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "LogGenerator/Base.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

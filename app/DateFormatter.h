@@ -3,7 +3,7 @@
 #include <string>
 #include <string_view>
 
-#include "platform/Time.h"
+#include "base/Time.h"
 
 namespace varnel {
 

@@ -1,7 +1,7 @@
 #include "app/Snapshot.h"
 
-#include "platform/Dictionary.h"
-#include "platform/Log.h"
+#include "base/Dictionary.h"
+#include "base/Log.h"
 
 namespace varnel {
 

@@ -4,9 +4,9 @@
 #include <string>
 #include <string_view>
 
+#include "base/Value.h"
 #include "platform/Clock.h"
 #include "platform/DeviceFiles.h"
-#include "platform/Value.h"
 
 namespace varnel {
 

@@ -4,7 +4,7 @@
 #include "app/Snapshot.h"
 #include "app/Status.h"
 #include "app/TreeText.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

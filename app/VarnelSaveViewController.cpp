@@ -3,8 +3,8 @@
 #include <utility>
 
 #include "app/Snapshot.h"
-#include "platform/Dictionary.h"
-#include "platform/Log.h"
+#include "base/Dictionary.h"
+#include "base/Log.h"
 
 namespace varnel {
 

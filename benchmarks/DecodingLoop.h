@@ -5,8 +5,8 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "PacketCases.h"
-#include "platform/host/FileResources.h"
-#include "platform/host/SystemClock.h"
+#include "host/FileResources.h"
+#include "host/SystemClock.h"
 
 namespace varnel {
 

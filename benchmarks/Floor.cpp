@@ -6,7 +6,7 @@
 #include <charconv>
 #include <cstring>
 
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel {
 

@@ -5,8 +5,8 @@
 #include <string_view>
 #include <vector>
 
-#include "platform/Bytes.h"
-#include "platform/Value.h"
+#include "base/Bytes.h"
+#include "base/Value.h"
 
 namespace varnel {
 

@@ -2,8 +2,8 @@
 
 #include <cstring>
 
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {

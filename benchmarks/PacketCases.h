@@ -3,7 +3,7 @@
 #include <span>
 #include <string_view>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

@@ -12,10 +12,10 @@
 
 #include "Floor.h"
 #include "LogGenerator/LogGenerator.h"
-#include "platform/Log.h"
+#include "base/Log.h"
+#include "host/FileResources.h"
+#include "host/SystemClock.h"
 #include "platform/TelephonyService.h"
-#include "platform/host/FileResources.h"
-#include "platform/host/SystemClock.h"
 #include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
 #include "tests/support/AllocationCounter.h"
 

@@ -1,7 +1,7 @@
 #include <benchmark/benchmark.h>
 
+#include "base/Dictionary.h"
 #include "model/VarnelModelNode.h"
-#include "platform/Dictionary.h"
 
 namespace varnel {
 namespace {

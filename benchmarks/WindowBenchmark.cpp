@@ -9,8 +9,8 @@
 #include <string>
 
 #include "app/VarnelPaneController.h"
-#include "platform/widgets/PaneWidget.h"
-#include "platform/widgets/WidgetUserInterface.h"
+#include "widgets/PaneWidget.h"
+#include "widgets/WidgetUserInterface.h"
 
 namespace varnel {
 namespace {

@@ -22,9 +22,15 @@ if(VARNEL_FUZZ)
   target_compile_options(varnel_options INTERFACE -fsanitize=fuzzer-no-link -fno-sanitize-coverage=trace-cmp)
 endif()
 
-# varnel_layer(NAME SOURCES a.cpp ... USES lower_layer ...): a static library and what it may use.
+# varnel_layer(NAME SOURCES a.cpp ... USES lower_layer ...): a static library and what it may use. A layer without
+# sources is its headers.
 function(varnel_layer name)
   cmake_parse_arguments(ARG "" "" "SOURCES;USES" ${ARGN})
-  add_library(${name} STATIC ${ARG_SOURCES})
-  target_link_libraries(${name} PUBLIC varnel_options ${ARG_USES})
+  if(ARG_SOURCES)
+    add_library(${name} STATIC ${ARG_SOURCES})
+    target_link_libraries(${name} PUBLIC varnel_options ${ARG_USES})
+  else()
+    add_library(${name} INTERFACE)
+    target_link_libraries(${name} INTERFACE varnel_options ${ARG_USES})
+  endif()
 endfunction()

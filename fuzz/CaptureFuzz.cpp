@@ -5,7 +5,7 @@
 
 #include "fuzz/MemoryFile.h"
 #include "fuzz/Require.h"
-#include "platform/host/Capture.h"
+#include "host/Capture.h"
 
 using namespace varnel;
 

@@ -2,9 +2,9 @@
 #include <cstdint>
 #include <variant>
 
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 #include "fuzz/Require.h"
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
 #include "programs/varnel-telephonyd/ChannelCommand.h"
 
 using namespace varnel;

@@ -4,7 +4,7 @@
 #include <functional>
 #include <string_view>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

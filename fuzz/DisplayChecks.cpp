@@ -5,10 +5,10 @@
 #include <stdexcept>
 #include <string>
 
+#include "base/PropertyList.h"
 #include "fuzz/MessageRules.h"
 #include "fuzz/Require.h"
 #include "model/VarnelModelNode.h"
-#include "platform/PropertyList.h"
 #include "programs/varnel-decode/TreeWriters.h"
 
 namespace varnel {

@@ -6,9 +6,9 @@
 #include <vector>
 
 #include "LogGenerator/Services.h"
+#include "base/Log.h"
 #include "fuzz/Require.h"
-#include "platform/Log.h"
-#include "platform/host/FileResources.h"
+#include "host/FileResources.h"
 
 namespace varnel {
 

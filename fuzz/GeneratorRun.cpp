@@ -9,14 +9,14 @@
 #include "LogGenerator/KLVLogGenerator.h"
 #include "LogGenerator/LogGenerator.h"
 #include "app/Snapshot.h"
+#include "base/Assertion.h"
+#include "base/PropertyList.h"
 #include "fuzz/ChosenInputs.h"
 #include "fuzz/DisplayChecks.h"
 #include "fuzz/FuzzHost.h"
 #include "fuzz/InputSteps.h"
 #include "fuzz/MessageRules.h"
 #include "fuzz/Require.h"
-#include "platform/Assertion.h"
-#include "platform/PropertyList.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {

@@ -2,7 +2,7 @@
 
 #include <string_view>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

@@ -5,7 +5,7 @@
 #include <cstdint>
 #include <optional>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

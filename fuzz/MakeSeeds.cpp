@@ -9,14 +9,14 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "app/Snapshot.h"
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 #include "fuzz/FuzzHost.h"
 #include "fuzz/InputSteps.h"
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
+#include "host/Capture.h"
+#include "host/PortFrame.h"
+#include "host/WholeFile.h"
 #include "platform/TelephonyService.h"
-#include "platform/host/Capture.h"
-#include "platform/host/PortFrame.h"
-#include "platform/host/WholeFile.h"
 #include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
 
 namespace varnel {

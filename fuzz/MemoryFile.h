@@ -5,8 +5,8 @@
 
 #include <string>
 
+#include "base/Bytes.h"
 #include "fuzz/Require.h"
-#include "platform/Bytes.h"
 
 namespace varnel {
 

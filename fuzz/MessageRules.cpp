@@ -4,9 +4,9 @@
 #include <cstdint>
 #include <string>
 
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
-#include "platform/PropertyListGuard.h"
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
+#include "base/PropertyListGuard.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {

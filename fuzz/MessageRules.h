@@ -2,9 +2,9 @@
 
 #include <string_view>
 
-#include "platform/Bytes.h"
-#include "platform/PropertyList.h"
-#include "platform/Value.h"
+#include "base/Bytes.h"
+#include "base/PropertyList.h"
+#include "base/Value.h"
 
 namespace varnel {
 

@@ -3,7 +3,7 @@
 #include <cstdint>
 
 #include "fuzz/Require.h"
-#include "platform/host/PortFrame.h"
+#include "host/PortFrame.h"
 
 using namespace varnel;
 

@@ -5,11 +5,11 @@
 #include <fstream>
 #include <string>
 
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 #include "fuzz/Require.h"
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
-#include "platform/host/FilePreferences.h"
-#include "platform/host/WholeFile.h"
+#include "host/FilePreferences.h"
+#include "host/WholeFile.h"
 
 using namespace varnel;
 

@@ -4,10 +4,10 @@
 #include <cstdint>
 #include <cstdlib>
 
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 #include "fuzz/MessageRules.h"
 #include "fuzz/Require.h"
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
 
 using namespace varnel;
 

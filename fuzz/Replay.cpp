@@ -5,7 +5,7 @@
 #include <filesystem>
 #include <vector>
 
-#include "platform/host/WholeFile.h"
+#include "host/WholeFile.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
 

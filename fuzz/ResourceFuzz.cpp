@@ -5,12 +5,12 @@
 #include <vector>
 
 #include "LogGenerator/LogGenerator.h"
+#include "base/PropertyList.h"
 #include "fuzz/ChosenInputs.h"
 #include "fuzz/DisplayChecks.h"
 #include "fuzz/FuzzHost.h"
 #include "fuzz/MessageRules.h"
 #include "fuzz/Require.h"
-#include "platform/PropertyList.h"
 #include "platform/TelephonyService.h"
 #include "platform/ui/ScreenLayout.h"
 

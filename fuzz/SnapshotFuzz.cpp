@@ -12,13 +12,13 @@
 #include <string_view>
 #include <vector>
 
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 #include "fuzz/DisplayChecks.h"
 #include "fuzz/MemoryFile.h"
 #include "fuzz/MessageRules.h"
 #include "fuzz/Require.h"
 #include "model/VarnelModelNode.h"
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/PlotRecorder.h"
 #include "programs/varnel-decode/SnapshotFile.h"

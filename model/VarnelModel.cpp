@@ -1,7 +1,7 @@
 #include "model/VarnelModel.h"
 
-#include "platform/Log.h"
-#include "platform/PropertyList.h"
+#include "base/Log.h"
+#include "base/PropertyList.h"
 
 namespace varnel {
 

@@ -6,7 +6,7 @@
 #include <utility>
 
 #include "LogGenerator/ArrayLock.h"
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel {
 

@@ -7,7 +7,7 @@
 #include <unordered_map>
 #include <vector>
 
-#include "platform/Value.h"
+#include "base/Value.h"
 
 namespace varnel {
 

@@ -2,7 +2,7 @@
 
 #include <string>
 
-#include "platform/Value.h"
+#include "base/Value.h"
 
 namespace varnel {
 

@@ -7,7 +7,7 @@
 #include <optional>
 #include <string_view>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

@@ -2,7 +2,7 @@
 
 #include <string_view>
 
-#include "platform/Value.h"
+#include "base/Value.h"
 
 namespace varnel {
 

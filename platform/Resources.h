@@ -4,7 +4,7 @@
 #include <string_view>
 #include <vector>
 
-#include "platform/Value.h"
+#include "base/Value.h"
 
 namespace varnel {
 

@@ -20,16 +20,17 @@ struct Layer {
 
 // Longer folders first: a file belongs to the first layer that its path begins with.
 const std::vector<Layer> layers = {
-    {"platform/host/", {"platform/host/", "platform/"}, false},
-    {"platform/ui/", {"platform/ui/", "platform/"}, true},
-    {"platform/widgets/", {"platform/widgets/", "platform/host/", "platform/ui/", "platform/"}, false},
-    {"platform/", {"platform/"}, true},
-    {"LogGenerator/", {"LogGenerator/", "platform/"}, true},
-    {"model/", {"model/", "LogGenerator/", "platform/"}, true},
-    {"app/", {"app/", "model/", "LogGenerator/", "platform/ui/", "platform/"}, true},
+    {"base/", {"base/"}, true},
+    {"platform/ui/", {"platform/ui/", "platform/", "base/"}, true},
+    {"platform/", {"platform/", "base/"}, true},
+    {"host/", {"host/", "platform/", "base/"}, false},
+    {"widgets/", {"widgets/", "host/", "platform/ui/", "platform/", "base/"}, false},
+    {"LogGenerator/", {"LogGenerator/", "platform/", "base/"}, true},
+    {"model/", {"model/", "LogGenerator/", "platform/", "base/"}, true},
+    {"app/", {"app/", "model/", "LogGenerator/", "platform/ui/", "platform/", "base/"}, true},
     {"programs/",
-     {"programs/", "app/", "model/", "LogGenerator/", "platform/widgets/", "platform/host/", "platform/ui/",
-      "platform/"},
+     {"programs/", "app/", "model/", "LogGenerator/", "widgets/", "host/", "platform/ui/", "platform/",
+      "base/"},
      false},
 };
 
@@ -67,7 +68,7 @@ std::optional<std::string> fault(const Layer& layer, const std::string& line) {
     if (layer.isCore && !isProjectPath(header)) return "is no path from the root: " + line;
     return std::nullopt;
   }
-  const bool isPropertyListLibrary = layer.folder == "platform/" && header == "plist/plist.h";
+  const bool isPropertyListLibrary = layer.folder == "base/" && header == "plist/plist.h";
   if (layer.isCore && !isStandardHeader(header) && !isPropertyListLibrary)
     return "is no standard header: " + line;
   return std::nullopt;
@@ -76,7 +77,8 @@ std::optional<std::string> fault(const Layer& layer, const std::string& line) {
 TEST(Layers, IncludesPointDownwardAndTheCoreKnowsNoToolkit) {
   const fs::path root = VARNEL_SOURCE_DIR;
   int filesSeen = 0;
-  for (const char* top : {"platform", "LogGenerator", "model", "app", "programs"}) {
+  for (const char* top :
+       {"base", "platform", "host", "widgets", "LogGenerator", "model", "app", "programs"}) {
     for (const auto& entry : fs::recursive_directory_iterator(root / top)) {
       const std::string extension = entry.path().extension();
       if (extension != ".h" && extension != ".cpp") continue;
@@ -95,19 +97,19 @@ TEST(Layers, IncludesPointDownwardAndTheCoreKnowsNoToolkit) {
 TEST(Layers, TheRuleSeesWhatBreaksIt) {
   const Layer& model = *layerOf("model/VarnelModel.h");
   EXPECT_TRUE(fault(model, "#include \"app/TreeText.h\""));
-  EXPECT_TRUE(fault(model, "#include \"platform/host/HostLog.h\""));
+  EXPECT_TRUE(fault(model, "#include \"host/HostLog.h\""));
   EXPECT_TRUE(fault(model, "#include <QString>"));
   EXPECT_TRUE(fault(model, "#include <plist/plist.h>"));
   EXPECT_FALSE(fault(model, "#include \"LogGenerator/LogGenerator.h\""));
   EXPECT_FALSE(fault(model, "#include <memory>"));
-  EXPECT_FALSE(fault(*layerOf("platform/PropertyList.cpp"), "#include <plist/plist.h>"));
+  EXPECT_FALSE(fault(*layerOf("base/PropertyList.cpp"), "#include <plist/plist.h>"));
   const Layer& userInterface = *layerOf("platform/ui/Window.h");
   EXPECT_TRUE(fault(userInterface, "#include <QWidget>"));
-  EXPECT_TRUE(fault(userInterface, "#include \"platform/host/HostLog.h\""));
+  EXPECT_TRUE(fault(userInterface, "#include \"host/HostLog.h\""));
   EXPECT_TRUE(fault(userInterface, "#include \"app/TreeText.h\""));
-  EXPECT_FALSE(fault(userInterface, "#include \"platform/Value.h\""));
+  EXPECT_FALSE(fault(userInterface, "#include \"base/Value.h\""));
   EXPECT_FALSE(fault(*layerOf("app/TextViewer.h"), "#include \"platform/ui/Window.h\""));
-  EXPECT_TRUE(fault(*layerOf("platform/Value.h"), "#include \"platform/ui/Window.h\""))
+  EXPECT_TRUE(fault(*layerOf("base/Value.h"), "#include \"platform/ui/Window.h\""))
       << "the user interface is above the rest of the platform";
 }
 

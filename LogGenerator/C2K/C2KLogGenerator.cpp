@@ -4,7 +4,7 @@
 
 #include "LogGenerator/C2K/DisplayVariables.h"
 #include "LogGenerator/C2K/PacketDecoders.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

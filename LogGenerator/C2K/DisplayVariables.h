@@ -11,8 +11,8 @@
 #include <vector>
 
 #include "LogGenerator/Field.h"
-#include "platform/Dictionary.h"
-#include "platform/Value.h"
+#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace varnel::c2k {
 

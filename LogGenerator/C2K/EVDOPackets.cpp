@@ -2,7 +2,7 @@
 #include "LogGenerator/C2K/DisplayVariables.h"
 #include "LogGenerator/C2K/PacketDecoders.h"
 #include "LogGenerator/C2K/PilotStrengths.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel::c2k {
 

@@ -6,8 +6,8 @@
 
 #include "LogGenerator/C2K/DisplayVariables.h"
 #include "LogGenerator/Field.h"
-#include "platform/Dictionary.h"
-#include "platform/Value.h"
+#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace varnel::c2k {
 

@@ -6,7 +6,7 @@
 #include "LogGenerator/C2K/PacketDecoders.h"
 #include "LogGenerator/C2K/PilotStrengths.h"
 #include "LogGenerator/C2K/Subpackets.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel::c2k {
 

@@ -3,7 +3,7 @@
 #include <string>
 
 #include "LogGenerator/LogGenerator.h"
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel::c2k {
 

@@ -1,6 +1,6 @@
 #include "LogGenerator/C2K/Subpackets.h"
 
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel::c2k {
 

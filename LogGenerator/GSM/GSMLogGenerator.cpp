@@ -3,8 +3,8 @@
 #include <string>
 #include <utility>
 
-#include "platform/Assertion.h"
-#include "platform/PropertyList.h"
+#include "base/Assertion.h"
+#include "base/PropertyList.h"
 
 namespace varnel {
 

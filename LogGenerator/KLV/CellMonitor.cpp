@@ -4,8 +4,8 @@
 #include <limits>
 #include <string>
 
-#include "platform/Log.h"
-#include "platform/PropertyList.h"
+#include "base/Log.h"
+#include "base/PropertyList.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {

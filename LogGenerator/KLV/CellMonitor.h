@@ -6,8 +6,8 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/Packet.h"
-#include "platform/Dictionary.h"
-#include "platform/Value.h"
+#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace varnel {
 

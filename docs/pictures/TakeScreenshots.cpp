@@ -8,11 +8,11 @@
 #include <utility>
 
 #include "app/VarnelApp.h"
-#include "platform/host/BuildInfo.h"
-#include "platform/widgets/DesktopColours.h"
-#include "platform/widgets/WidgetApplication.h"
-#include "platform/widgets/WidgetUserInterface.h"
+#include "host/BuildInfo.h"
 #include "programs/varnel/HostServices.h"
+#include "widgets/DesktopColours.h"
+#include "widgets/WidgetApplication.h"
+#include "widgets/WidgetUserInterface.h"
 
 namespace varnel {
 namespace {

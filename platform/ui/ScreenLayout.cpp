@@ -4,7 +4,7 @@
 #include <string_view>
 #include <utility>
 
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel {
 

@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/Value.h"
+#include "base/Value.h"
 
 namespace varnel {
 

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "platform/Time.h"
-#include "platform/Value.h"
+#include "base/Time.h"
+#include "base/Value.h"
 
 namespace varnel {
 

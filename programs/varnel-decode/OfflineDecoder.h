@@ -4,10 +4,10 @@
 #include <optional>
 
 #include "LogGenerator/LogGenerator.h"
-#include "platform/Bytes.h"
-#include "platform/Dictionary.h"
-#include "platform/Time.h"
-#include "platform/Value.h"
+#include "base/Bytes.h"
+#include "base/Dictionary.h"
+#include "base/Time.h"
+#include "base/Value.h"
 #include "programs/varnel-decode/CaptureClock.h"
 #include "programs/varnel-decode/Generation.h"
 

@@ -6,7 +6,7 @@
 #include <variant>
 #include <vector>
 
-#include "platform/Log.h"
+#include "base/Log.h"
 #include "programs/varnel-decode/TreeWriters.h"
 
 namespace varnel {

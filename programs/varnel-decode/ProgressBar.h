@@ -4,8 +4,8 @@
 #include <cstdint>
 #include <optional>
 
-#include "platform/Log.h"
-#include "platform/host/Capture.h"
+#include "base/Log.h"
+#include "host/Capture.h"
 
 namespace varnel {
 

@@ -7,8 +7,8 @@
 #include <stdexcept>
 #include <system_error>
 
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 #include "programs/varnel-decode/Timestamps.h"
 
 namespace varnel {

@@ -3,8 +3,8 @@
 #include <string>
 #include <vector>
 
-#include "platform/Bytes.h"
-#include "platform/Value.h"
+#include "base/Bytes.h"
+#include "base/Value.h"
 #include "programs/varnel-decode/Generation.h"
 
 namespace varnel {

@@ -4,7 +4,7 @@
 #include <string>
 #include <string_view>
 
-#include "platform/Time.h"
+#include "base/Time.h"
 
 namespace varnel {
 

@@ -6,8 +6,8 @@
 #include <stdexcept>
 
 #include "app/TreeText.h"
+#include "base/PropertyList.h"
 #include "model/VarnelModelNode.h"
-#include "platform/PropertyList.h"
 
 namespace varnel {
 

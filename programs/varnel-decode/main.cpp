@@ -6,10 +6,10 @@
 #include <vector>
 
 #include "LogGenerator/LogGenerator.h"
+#include "host/BuildInfo.h"
+#include "host/FileResources.h"
+#include "host/TerminateHandler.h"
 #include "platform/TelephonyService.h"
-#include "platform/host/BuildInfo.h"
-#include "platform/host/FileResources.h"
-#include "platform/host/TerminateHandler.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/InputDecoding.h"
 #include "programs/varnel-decode/Jobs.h"

@@ -1,7 +1,7 @@
 #include "programs/varnel-telephonyd/ChannelCommand.h"
 
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 
 namespace varnel {
 

@@ -4,7 +4,7 @@
 #include <string_view>
 #include <variant>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 #include "programs/varnel-telephonyd/CodeFilter.h"
 
 namespace varnel {

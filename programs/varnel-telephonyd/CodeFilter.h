@@ -4,7 +4,7 @@
 #include <optional>
 #include <set>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

@@ -3,7 +3,7 @@
 #include <chrono>
 #include <optional>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

@@ -5,7 +5,7 @@
 #include <string>
 #include <variant>
 
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

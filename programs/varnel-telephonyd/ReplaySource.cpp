@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

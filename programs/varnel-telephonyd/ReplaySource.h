@@ -3,8 +3,8 @@
 #include <optional>
 #include <string>
 
-#include "platform/Time.h"
-#include "platform/host/Capture.h"
+#include "base/Time.h"
+#include "host/Capture.h"
 #include "programs/varnel-telephonyd/MessageSource.h"
 
 namespace varnel {

@@ -2,7 +2,7 @@
 
 #include <utility>
 
-#include "platform/Log.h"
+#include "base/Log.h"
 #include "programs/varnel-telephonyd/ChannelCommand.h"
 
 namespace varnel {

@@ -2,8 +2,8 @@
 
 #include <iostream>
 
-#include "platform/PropertyList.h"
-#include "platform/host/RuntimeFolder.h"
+#include "base/PropertyList.h"
+#include "host/RuntimeFolder.h"
 
 namespace varnel {
 

@@ -1,14 +1,14 @@
 #pragma once
 
+#include "host/EventLoopQueue.h"
+#include "host/FilePreferences.h"
+#include "host/FileResources.h"
+#include "host/HostLog.h"
+#include "host/RootedFiles.h"
+#include "host/SocketPorts.h"
+#include "host/SocketTelephonyService.h"
+#include "host/SystemClock.h"
 #include "model/VarnelModel.h"
-#include "platform/host/EventLoopQueue.h"
-#include "platform/host/FilePreferences.h"
-#include "platform/host/FileResources.h"
-#include "platform/host/HostLog.h"
-#include "platform/host/RootedFiles.h"
-#include "platform/host/SocketPorts.h"
-#include "platform/host/SocketTelephonyService.h"
-#include "platform/host/SystemClock.h"
 #include "programs/varnel/Options.h"
 
 namespace varnel {

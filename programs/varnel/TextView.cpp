@@ -4,9 +4,9 @@
 #include <csignal>
 
 #include "app/TextViewer.h"
-#include "platform/host/HostApplication.h"
-#include "platform/host/KeyWatcher.h"
-#include "platform/host/SignalWatcher.h"
+#include "host/HostApplication.h"
+#include "host/KeyWatcher.h"
+#include "host/SignalWatcher.h"
 #include "programs/varnel/HostServices.h"
 #include "programs/varnel/StandardOutput.h"
 

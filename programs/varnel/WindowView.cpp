@@ -3,10 +3,10 @@
 #include <csignal>
 
 #include "app/VarnelApp.h"
-#include "platform/host/SignalWatcher.h"
-#include "platform/widgets/WidgetApplication.h"
-#include "platform/widgets/WidgetUserInterface.h"
+#include "host/SignalWatcher.h"
 #include "programs/varnel/HostServices.h"
+#include "widgets/WidgetApplication.h"
+#include "widgets/WidgetUserInterface.h"
 
 namespace varnel {
 

@@ -1,11 +1,11 @@
 #include <iostream>
 
-#include "platform/host/BuildInfo.h"
-#include "platform/host/TerminateHandler.h"
-#include "platform/widgets/Display.h"
+#include "host/BuildInfo.h"
+#include "host/TerminateHandler.h"
 #include "programs/varnel/Options.h"
 #include "programs/varnel/TextView.h"
 #include "programs/varnel/WindowView.h"
+#include "widgets/Display.h"
 
 namespace varnel {
 

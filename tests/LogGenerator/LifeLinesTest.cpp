@@ -7,7 +7,7 @@
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMLogGenerator.h"
 #include "LogGenerator/KLV/LTE/LTELogGenerator.h"
 #include "LogGenerator/KLV/UTRAN/UTRANLogGenerator.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/TestServices.h"
 

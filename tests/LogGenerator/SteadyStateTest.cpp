@@ -6,8 +6,8 @@
 #include <set>
 
 #include "LogGenerator/LogGenerator.h"
+#include "host/FileResources.h"
 #include "platform/TelephonyService.h"
-#include "platform/host/FileResources.h"
 #include "tests/support/AllocationCounter.h"
 #include "tests/support/SimulatedMessages.h"
 #include "tests/support/TestServices.h"

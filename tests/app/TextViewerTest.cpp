@@ -3,7 +3,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "platform/PropertyList.h"
+#include "base/PropertyList.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/FakeDeviceFiles.h"
 #include "tests/support/FakeQueue.h"

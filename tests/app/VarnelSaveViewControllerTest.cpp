@@ -4,10 +4,10 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
-#include "platform/PropertyList.h"
-#include "platform/host/FileResources.h"
-#include "platform/host/RootedFiles.h"
-#include "platform/host/WholeFile.h"
+#include "base/PropertyList.h"
+#include "host/FileResources.h"
+#include "host/RootedFiles.h"
+#include "host/WholeFile.h"
 #include "tests/support/Describe.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/FakeClock.h"

@@ -8,7 +8,7 @@
 #include <cstdio>
 
 #include "LogGenerator/KLV/LTE/LTELogGenerator.h"
-#include "platform/PropertyList.h"
+#include "base/PropertyList.h"
 #include "tests/support/Describe.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/FakeQueue.h"

@@ -10,9 +10,9 @@
 #include <vector>
 
 #include "app/VarnelApp.h"
-#include "platform/Log.h"
-#include "platform/PropertyList.h"
-#include "platform/host/Capture.h"
+#include "base/Log.h"
+#include "base/PropertyList.h"
+#include "host/Capture.h"
 #include "programs/varnel/HostServices.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/EventLoop.h"

@@ -5,9 +5,9 @@
 #include <string>
 #include <string_view>
 
-#include "platform/Bytes.h"
-#include "platform/Dictionary.h"
-#include "platform/Value.h"
+#include "base/Bytes.h"
+#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace varnel {
 

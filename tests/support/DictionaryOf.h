@@ -2,7 +2,7 @@
 
 #include <initializer_list>
 
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel {
 

@@ -4,9 +4,9 @@
 #include <cstdint>
 #include <string_view>
 
-#include "platform/Bytes.h"
-#include "platform/PropertyList.h"
-#include "platform/Value.h"
+#include "base/Bytes.h"
+#include "base/PropertyList.h"
+#include "base/Value.h"
 
 namespace varnel {
 

@@ -2,7 +2,7 @@
 
 #include <cstdlib>
 
-#include "platform/host/HostApplication.h"
+#include "host/HostApplication.h"
 
 // The main of tests that need an event loop, in a locale that is not the one that programs start with.
 int main(int argumentCount, char** arguments) {

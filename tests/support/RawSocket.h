@@ -10,7 +10,7 @@
 #include <cstring>
 #include <string>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

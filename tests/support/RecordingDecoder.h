@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "LogGenerator/Base.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 #include "tests/support/Describe.h"
 
 namespace varnel {

@@ -5,8 +5,8 @@
 #include <string>
 #include <vector>
 
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 #include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
 
 namespace varnel {

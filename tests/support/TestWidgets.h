@@ -10,9 +10,9 @@
 #include <vector>
 
 #include "app/VarnelCell.h"
-#include "platform/widgets/FontMetrics.h"
-#include "platform/widgets/PaneWidget.h"
-#include "platform/widgets/WidgetUserInterface.h"
+#include "widgets/FontMetrics.h"
+#include "widgets/PaneWidget.h"
+#include "widgets/WidgetUserInterface.h"
 
 namespace varnel {
 

@@ -9,8 +9,8 @@
 #include <string_view>
 #include <vector>
 
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 #include "tests/support/Process.h"
 
 namespace varnel {

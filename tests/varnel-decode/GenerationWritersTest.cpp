@@ -5,7 +5,7 @@
 #include <memory>
 #include <stdexcept>
 
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel {
 namespace {

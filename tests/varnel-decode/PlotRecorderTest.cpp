@@ -4,7 +4,7 @@
 
 #include <algorithm>
 
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel {
 

@@ -7,8 +7,8 @@
 #include <stdexcept>
 #include <utility>
 
-#include "platform/Dictionary.h"
-#include "platform/PropertyList.h"
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
 
 namespace varnel {
 

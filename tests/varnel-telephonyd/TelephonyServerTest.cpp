@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/host/Capture.h"
+#include "host/Capture.h"
 #include "programs/varnel-telephonyd/ReplaySource.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "tests/support/FakeQueue.h"

@@ -1,7 +1,7 @@
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMLogGenerator.h"
 
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMClassIndex.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

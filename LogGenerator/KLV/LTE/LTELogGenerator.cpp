@@ -1,7 +1,7 @@
 #include "LogGenerator/KLV/LTE/LTELogGenerator.h"
 
 #include "LogGenerator/KLV/LTE/LTEClassIndex.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

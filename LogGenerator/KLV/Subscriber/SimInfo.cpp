@@ -1,7 +1,7 @@
 #include "LogGenerator/KLV/Subscriber/SimInfo.h"
 
-#include "platform/Log.h"
-#include "platform/PropertyList.h"
+#include "base/Log.h"
+#include "base/PropertyList.h"
 
 namespace varnel {
 

@@ -1,6 +1,6 @@
 #include "LogGenerator/KLV/UTRAN/RRC_State.h"
 
-#include "platform/Describe.h"
+#include "base/Describe.h"
 
 namespace varnel {
 

@@ -3,7 +3,7 @@
 #include <algorithm>
 
 #include "LogGenerator/KLV/UTRAN/UTRANClassIndex.h"
-#include "platform/Log.h"
+#include "base/Log.h"
 
 namespace varnel {
 

@@ -3,7 +3,7 @@
 #include <chrono>
 #include <vector>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 #include "programs/varnel-telephonyd/simulation/CDMA1xConnection.h"
 #include "programs/varnel-telephonyd/simulation/CDMACarrier.h"
 

@@ -1,6 +1,6 @@
 #include "programs/varnel-telephonyd/simulation/CellMonitor.h"
 
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/LTEMeasurement.h"
 #include "programs/varnel-telephonyd/simulation/UMTSCarrier.h"

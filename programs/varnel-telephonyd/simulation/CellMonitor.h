@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/Value.h"
+#include "base/Value.h"
 #include "programs/varnel-telephonyd/simulation/Walk.h"
 
 namespace varnel::simulation {

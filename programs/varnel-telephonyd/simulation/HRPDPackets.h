@@ -4,7 +4,7 @@
 #include <optional>
 #include <vector>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 #include "programs/varnel-telephonyd/simulation/CDMACarrier.h"
 #include "programs/varnel-telephonyd/simulation/HRPDConnection.h"
 #include "programs/varnel-telephonyd/simulation/HRPDTraffic.h"

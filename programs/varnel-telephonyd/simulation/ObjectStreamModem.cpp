@@ -1,6 +1,6 @@
 #include "programs/varnel-telephonyd/simulation/ObjectStreamModem.h"
 
-#include "platform/PropertyList.h"
+#include "base/PropertyList.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/PhonePicture.h"
 #include "programs/varnel-telephonyd/simulation/PhoneStates.h"

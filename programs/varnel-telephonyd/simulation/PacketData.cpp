@@ -1,6 +1,6 @@
 #include "programs/varnel-telephonyd/simulation/PacketData.h"
 
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel::simulation {
 

@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/Value.h"
+#include "base/Value.h"
 #include "programs/varnel-telephonyd/simulation/Random.h"
 
 namespace varnel::simulation {

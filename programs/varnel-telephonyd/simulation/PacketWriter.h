@@ -5,7 +5,7 @@
 #include <cstdint>
 #include <utility>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel::simulation {
 

@@ -4,7 +4,7 @@
 #include <cstdarg>
 #include <cstdio>
 
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 #include "programs/varnel-telephonyd/simulation/PhoneStates.h"
 
 namespace varnel::simulation {

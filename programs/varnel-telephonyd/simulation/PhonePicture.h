@@ -4,7 +4,7 @@
 #include <deque>
 #include <string>
 
-#include "platform/Value.h"
+#include "base/Value.h"
 #include "programs/varnel-telephonyd/simulation/PhoneActivity.h"
 #include "programs/varnel-telephonyd/simulation/Walk.h"
 

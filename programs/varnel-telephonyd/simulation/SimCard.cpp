@@ -2,7 +2,7 @@
 
 #include <cstdio>
 
-#include "platform/Dictionary.h"
+#include "base/Dictionary.h"
 
 namespace varnel::simulation {
 

@@ -3,7 +3,7 @@
 #include <cstdint>
 #include <string>
 
-#include "platform/Value.h"
+#include "base/Value.h"
 #include "programs/varnel-telephonyd/simulation/Cell.h"
 #include "programs/varnel-telephonyd/simulation/Random.h"
 

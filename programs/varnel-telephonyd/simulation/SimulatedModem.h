@@ -6,7 +6,7 @@
 #include <string_view>
 #include <vector>
 
-#include "platform/Bytes.h"
+#include "base/Bytes.h"
 
 namespace varnel {
 

@@ -1,6 +1,6 @@
 #include "programs/varnel-telephonyd/simulation/WalkingModem.h"
 
-#include "platform/PropertyList.h"
+#include "base/PropertyList.h"
 #include "programs/varnel-telephonyd/simulation/CellMonitor.h"
 #include "programs/varnel-telephonyd/simulation/PacketWriter.h"
 

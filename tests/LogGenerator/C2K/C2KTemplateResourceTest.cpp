@@ -5,7 +5,7 @@
 #include <iterator>
 #include <set>
 
-#include "platform/PropertyList.h"
+#include "base/PropertyList.h"
 #include "tests/support/C2KHarness.h"
 
 // The template that ships with the application.

@@ -8,8 +8,8 @@
 #include <exception>
 #include <optional>
 
-#include "platform/Assertion.h"
-#include "platform/PropertyList.h"
+#include "base/Assertion.h"
+#include "base/PropertyList.h"
 #include "tests/support/Describe.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/RecordingLog.h"

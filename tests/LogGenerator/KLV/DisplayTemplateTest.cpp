@@ -12,7 +12,7 @@
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMClassIndex.h"
 #include "LogGenerator/KLV/LTE/LTEClassIndex.h"
 #include "LogGenerator/KLV/UTRAN/UTRANClassIndex.h"
-#include "platform/PropertyList.h"
+#include "base/PropertyList.h"
 #include "tests/support/Describe.h"
 #include "tests/support/RecordingLog.h"
 #include "tests/support/SimulatedMessages.h"

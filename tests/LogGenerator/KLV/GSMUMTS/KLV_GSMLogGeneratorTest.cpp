@@ -8,7 +8,7 @@
 #include <iterator>
 #include <map>
 
-#include "platform/PropertyList.h"
+#include "base/PropertyList.h"
 #include "tests/support/CellMonitorRecords.h"
 #include "tests/support/Describe.h"
 #include "tests/support/PacketBuilder.h"

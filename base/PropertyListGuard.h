@@ -1,0 +1,33 @@
+#pragma once
+
+#include <cstddef>
+
+#include "base/Bytes.h"
+#include "base/PropertyList.h"
+
+namespace varnel {
+
+/// What is left of a limited amount.
+class Allowance {
+ public:
+  explicit Allowance(std::size_t amount) : _left(amount) {}
+  /// False, and nothing taken, when less than that is left.
+  bool take(std::size_t amount) {
+    if (amount > _left) return false;
+    _left -= amount;
+    return true;
+  }
+
+ private:
+  std::size_t _left;
+};
+
+/// True for bytes that begin as a binary property list does.
+bool isBinaryPropertyList(ByteView bytes);
+
+/// True when the bytes are within the limits and hold nothing that the parser must not see. What else is
+/// wrong with them is left to the parser. Takes time in proportion to the bytes and the expanded nodes and
+/// bytes.
+bool isSafeToParse(ByteView bytes, const PropertyListLimits& limits);
+
+}  // namespace varnel

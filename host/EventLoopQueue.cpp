@@ -1,0 +1,42 @@
+#include "host/EventLoopQueue.h"
+
+#include <QTimer>
+#include <utility>
+
+namespace varnel {
+
+namespace {
+
+// The event loop would go on after an exception, on some paths: it must not get there.
+auto endingWithExceptions(MainQueue::Task task) {
+  return [task = std::move(task)]() noexcept { task(); };
+}
+
+class EventLoopTimer final : public RepeatingTimer {
+ public:
+  EventLoopTimer(std::chrono::milliseconds interval, MainQueue::Task task) {
+    _timer.setTimerType(Qt::PreciseTimer);
+    // The connection keeps the task alive while it runs, also when the task destroys the timer.
+    _timer.callOnTimeout(&_timer, endingWithExceptions(std::move(task)));
+    _timer.start(interval);
+  }
+
+ private:
+  QTimer _timer;
+};
+
+}  // namespace
+
+void EventLoopQueue::async(Task task) {
+  QMetaObject::invokeMethod(&_context, endingWithExceptions(std::move(task)), Qt::QueuedConnection);
+}
+
+void EventLoopQueue::after(std::chrono::milliseconds delay, Task task) {
+  QTimer::singleShot(delay, Qt::PreciseTimer, &_context, endingWithExceptions(std::move(task)));
+}
+
+std::unique_ptr<RepeatingTimer> EventLoopQueue::repeating(std::chrono::milliseconds interval, Task task) {
+  return std::make_unique<EventLoopTimer>(interval, std::move(task));
+}
+
+}  // namespace varnel

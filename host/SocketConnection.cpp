@@ -1,0 +1,134 @@
+#include "host/SocketConnection.h"
+
+#include <poll.h>
+#include <sys/socket.h>
+#include <sys/un.h>
+#include <unistd.h>
+
+#include <QFile>
+#include <stdexcept>
+#include <string>
+
+namespace varnel {
+
+namespace {
+
+// Room for the final zero, and for a byte that QLocalServer wants to spare.
+constexpr std::size_t longestPath = sizeof(sockaddr_un::sun_path) - 2;
+constexpr int connectTimeout_ms = 1000;
+// Bytes that have arrived and wait to be taken, and bytes that wait to be sent, at most.
+constexpr qint64 readBufferSize = 1 << 20;
+constexpr qint64 sendBufferSize = 4 << 20;
+
+}  // namespace
+
+std::filesystem::path socketPath(const std::filesystem::path& folder, std::string_view name) {
+  if (name.empty() || name.find('/') != std::string_view::npos || name.find('\0') != std::string_view::npos)
+    throw std::runtime_error("\"" + std::string(name) + "\" cannot be the name of a socket");
+  std::filesystem::path path = folder / name;
+  if (path.native().size() > longestPath) {
+    throw std::runtime_error("the socket's path " + path.string() + " is longer than " +
+                             std::to_string(longestPath) +
+                             " bytes: choose a runtime folder with a shorter one");
+  }
+  return path;
+}
+
+std::unique_ptr<SocketConnection> SocketConnection::open(const std::filesystem::path& path) {
+  auto socket = std::make_unique<QLocalSocket>();
+  socket->connectToServer(QFile::decodeName(path.c_str()));
+  if (socket->state() == QLocalSocket::ConnectingState) socket->waitForConnected(connectTimeout_ms);
+  if (socket->state() != QLocalSocket::ConnectedState) return nullptr;
+  auto connection = std::make_unique<SocketConnection>(std::move(socket));
+  return connection->hasTrustedPeer() ? std::move(connection) : nullptr;
+}
+
+SocketConnection::SocketConnection(std::unique_ptr<QLocalSocket> socket) : _socket(std::move(socket)) {
+  // Without a bound a flood would fill the memory while its reader is busy.
+  _socket->setReadBufferSize(readBufferSize);
+  // Queued: a handler that destroys the socket must not do so from within the socket's own doings, and a wait
+  // for this socket must not have its frames handled elsewhere.
+  const auto handleActivity = [this] { callActivityHandler(); };
+  QObject::connect(_socket.get(), &QLocalSocket::readyRead, _socket.get(), handleActivity,
+                   Qt::QueuedConnection);
+  QObject::connect(_socket.get(), &QLocalSocket::disconnected, _socket.get(), handleActivity,
+                   Qt::QueuedConnection);
+}
+
+SocketConnection::~SocketConnection() {
+  _activityHandler = nullptr;
+  while (_socket->flush()) {
+  }
+}
+
+bool SocketConnection::hasTrustedPeer() const {
+  ucred peer{};
+  socklen_t size = sizeof peer;
+  const auto descriptor = static_cast<int>(_socket->socketDescriptor());
+  if (::getsockopt(descriptor, SOL_SOCKET, SO_PEERCRED, &peer, &size) != 0) return false;
+  return isTrusted(peer.uid, ::geteuid());
+}
+
+bool SocketConnection::isOpen() const { return _socket->state() == QLocalSocket::ConnectedState; }
+
+bool SocketConnection::peerHasGone() const {
+  if (!isOpen()) return true;
+  pollfd socket{static_cast<int>(_socket->socketDescriptor()), POLLRDHUP, 0};
+  return ::poll(&socket, 1, 0) > 0;
+}
+
+void SocketConnection::setActivityHandler(std::function<void()> handler) {
+  _activityHandler = std::move(handler);
+}
+
+void SocketConnection::wake() {
+  QMetaObject::invokeMethod(
+      _socket.get(), [this] { callActivityHandler(); }, Qt::QueuedConnection);
+}
+
+void SocketConnection::callActivityHandler() noexcept {
+  const auto handler = _activityHandler;  // which may destroy this connection
+  if (handler) handler();
+}
+
+std::optional<Frame> SocketConnection::nextFrame() {
+  while (true) {
+    if (const auto frame = _reader.next()) return frame;
+    if (_reader.isFaulty()) _socket->abort();
+    if (!isOpen() && _socket->bytesAvailable() == 0) return std::nullopt;
+    const qint64 count = _socket->read(_chunk.data(), static_cast<qint64>(_chunk.size()));
+    if (count <= 0) return std::nullopt;
+    _reader.feed({reinterpret_cast<const std::uint8_t*>(_chunk.data()), static_cast<std::size_t>(count)});
+  }
+}
+
+void SocketConnection::send(const Frame& frame) {
+  if (!hasRoom()) _socket->abort();
+  if (!isOpen()) return;
+  _outgoing.clear();
+  appendFrame(_outgoing, frame);
+  _socket->write(reinterpret_cast<const char*>(_outgoing.data()), static_cast<qint64>(_outgoing.size()));
+}
+
+bool SocketConnection::hasRoom() const { return _socket->bytesToWrite() < sendBufferSize; }
+
+bool SocketConnection::waitForRoom(const QDeadlineTimer& deadline) {
+  return waitUntilUnsent(sendBufferSize - 1, deadline);
+}
+
+bool SocketConnection::waitUntilSent(const QDeadlineTimer& deadline) { return waitUntilUnsent(0, deadline); }
+
+bool SocketConnection::waitUntilUnsent(qint64 limit, const QDeadlineTimer& deadline) {
+  while (isOpen() && _socket->bytesToWrite() > limit) {
+    if (deadline.hasExpired()) return false;
+    _socket->waitForBytesWritten(static_cast<int>(deadline.remainingTime()));
+  }
+  return isOpen();
+}
+
+bool SocketConnection::waitForArrival(const QDeadlineTimer& deadline) {
+  if (!isOpen() || deadline.hasExpired()) return false;
+  return _socket->waitForReadyRead(static_cast<int>(deadline.remainingTime()));
+}
+
+}  // namespace varnel

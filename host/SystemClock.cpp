@@ -1,0 +1,20 @@
+#include "host/SystemClock.h"
+
+#include <ctime>
+
+namespace varnel {
+
+Time SystemClock::now() const {
+  timespec moment{};
+  ::clock_gettime(CLOCK_REALTIME, &moment);
+  return {moment.tv_sec, static_cast<std::int32_t>(moment.tv_nsec)};
+}
+
+TimeZone SystemClock::zoneAt(Time time) const {
+  ::tzset();  // localtime_r alone need not see that the zone was changed
+  tm local{};
+  if (!::localtime_r(&time.seconds, &local)) return {};
+  return {static_cast<std::int32_t>(local.tm_gmtoff), local.tm_isdst > 0};
+}
+
+}  // namespace varnel

@@ -1,0 +1,47 @@
+#pragma once
+
+#include <filesystem>
+#include <functional>
+#include <memory>
+#include <string_view>
+#include <vector>
+
+#include "base/Bytes.h"
+#include "platform/TelephonyService.h"
+
+namespace varnel {
+
+class SocketConnection;
+class SocketServer;
+
+/// The server's side of the telephony service: takes connections, checks requests and notifies clients. Every
+/// new connection is greeted with one notification.
+class TelephonyListener final {
+ public:
+  /// Makes the log channel that delivers to the client's local port of that name. An exception that leaves it
+  /// ends the program.
+  using LogChannelMaker = std::function<TelephonyConnection::LogChannel(std::string_view localPortName)>;
+
+  /// Listens at once; everything happens on the event loop. The folder's path is absolute. Throws
+  /// std::runtime_error when another server runs in that folder or the socket cannot be made.
+  TelephonyListener(const std::filesystem::path& runtimeFolder, LogChannelMaker makeLogChannel);
+  TelephonyListener(const TelephonyListener&) = delete;
+  TelephonyListener& operator=(const TelephonyListener&) = delete;
+  ~TelephonyListener();
+
+  /// Sends a notification to every open connection.
+  void notifyAll();
+
+ private:
+  using Client = std::shared_ptr<SocketConnection>;
+
+  void add(Client client);
+  void serve(const Client& client);
+  TelephonyConnection::LogChannel answer(ByteView request) const;
+
+  LogChannelMaker _makeLogChannel;
+  std::vector<Client> _clients;
+  std::unique_ptr<SocketServer> _server;
+};
+
+}  // namespace varnel

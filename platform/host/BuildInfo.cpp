@@ -1,7 +1,0 @@
-#include "platform/host/BuildInfo.h"
-
-namespace varnel {
-
-ApplicationInfo applicationInfo() { return {VARNEL_VERSION, __DATE__ " " __TIME__}; }
-
-}  // namespace varnel

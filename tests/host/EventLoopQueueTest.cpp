@@ -1,0 +1,105 @@
+#include "host/EventLoopQueue.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <stdexcept>
+#include <vector>
+
+#include "tests/support/EventLoop.h"
+
+namespace varnel {
+namespace {
+
+using namespace std::chrono_literals;
+using Clock = std::chrono::steady_clock;
+using testing::ElementsAre;
+
+TEST(EventLoopQueue, RunsTasksInOrderAfterTheRunningOne) {
+  EventLoopQueue queue;
+  std::vector<int> ran;
+  queue.async([&] {
+    queue.async([&] { ran.push_back(3); });
+    ran.push_back(1);
+  });
+  queue.async([&] { ran.push_back(2); });
+  EXPECT_TRUE(ran.empty());
+  ASSERT_TRUE(runUntil([&] { return ran.size() == 3; }));
+  EXPECT_THAT(ran, ElementsAre(1, 2, 3));
+}
+
+TEST(EventLoopQueue, DropsWhatWaitsWhenItIsDestroyed) {
+  int ran = 0;
+  {
+    EventLoopQueue queue;
+    queue.async([&] { ++ran; });
+    queue.after(1ms, [&] { ++ran; });
+  }
+  runFor(20ms);
+  EXPECT_EQ(ran, 0);
+}
+
+TEST(EventLoopQueue, DelaysATask) {
+  EventLoopQueue queue;
+  const auto start = Clock::now();
+  bool hasRun = false;
+  queue.after(100ms, [&] { hasRun = true; });
+  ASSERT_TRUE(runUntil([&] { return hasRun; }));
+  EXPECT_GE(Clock::now() - start, 99ms);
+}
+
+TEST(EventLoopQueue, RepeatsATaskUntilItsTimerIsDestroyed) {
+  EventLoopQueue queue;
+  int ran = 0;
+  const auto start = Clock::now();
+  auto timer = queue.repeating(50ms, [&] { ++ran; });
+  ASSERT_TRUE(runUntil([&] { return ran == 4; }));
+  EXPECT_GE(Clock::now() - start, 199ms);
+  timer.reset();
+  runFor(120ms);
+  EXPECT_EQ(ran, 4);
+}
+
+TEST(EventLoopQueue, KeepsAnIntervalOfTwoSecondsToTheMillisecond) {
+  EventLoopQueue queue;
+  const auto start = Clock::now();
+  bool hasRun = false;
+  const auto timer = queue.repeating(2000ms, [&] { hasRun = true; });
+  ASSERT_TRUE(runUntil([&] { return hasRun; }));
+  EXPECT_GE(Clock::now() - start, 1999ms);
+  EXPECT_LT(Clock::now() - start, 2200ms);  // the machine may be busy
+}
+
+TEST(EventLoopQueue, LetsATaskDestroyItsTimer) {
+  EventLoopQueue queue;
+  int ran = 0;
+  std::unique_ptr<RepeatingTimer> timer;
+  const auto witness = std::make_shared<int>(7);
+  timer = queue.repeating(5ms, [&, witness] {
+    timer.reset();
+    ran += *witness;
+  });
+  runFor(50ms);
+  EXPECT_EQ(ran, 7);
+}
+
+TEST(EventLoopQueueDeathTest, AnExceptionThatLeavesATaskEndsTheProgram) {
+  testing::FLAGS_gtest_death_test_style = "threadsafe";
+  EventLoopQueue queue;
+  const auto task = [] { throw std::runtime_error("thrown by a task"); };
+  EXPECT_DEATH(
+      {
+        queue.async(task);
+        runFor(1s);
+      },
+      "thrown by a task");
+  EXPECT_DEATH(
+      {
+        const auto timer = queue.repeating(1ms, task);
+        runFor(1s);
+      },
+      "thrown by a task");
+}
+
+}  // namespace
+}  // namespace varnel

@@ -1,0 +1,197 @@
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <stdexcept>
+
+#include "base/Dictionary.h"
+#include "base/PropertyList.h"
+#include "host/PortFrame.h"
+#include "host/SocketTelephonyService.h"
+#include "host/TelephonyListener.h"
+#include "tests/support/EventLoop.h"
+#include "tests/support/Process.h"
+#include "tests/support/RawSocket.h"
+
+namespace varnel {
+namespace {
+
+using namespace std::chrono_literals;
+
+Bytes requestFrame(std::string_view dictionary) {
+  const std::string list = "<plist version=\"1.0\">" + std::string(dictionary) + "</plist>";
+  Bytes bytes;
+  appendFrame(bytes, {5, FrameMark::Request, Bytes(list.begin(), list.end())});
+  return bytes;
+}
+
+class SocketTelephony : public testing::Test {
+ protected:
+  // A server whose channel maker returns that channel.
+  std::unique_ptr<PeerThread> server(const TelephonyConnection::LogChannel& channel) {
+    return std::make_unique<PeerThread>([this, channel] {
+      return std::make_shared<TelephonyListener>(_folder.path(), [this, channel](std::string_view name) {
+        _askedFor = name;
+        return channel;
+      });
+    });
+  }
+
+  // The error with which a listener answers a request.
+  std::int64_t errorOf(std::string_view request) {
+    const TelephonyListener listener(_folder.path(), [this](std::string_view name) {
+      _askedFor = name;
+      return TelephonyConnection::LogChannel{0, "commands"};
+    });
+    const RawSocket client = RawSocket::connectedTo(path());
+    client.send(requestFrame(request));
+    FrameReader reader;
+    std::optional<Value> reply;
+    runUntil([&] {
+      if (client.waits(0ms)) reader.feed(client.receive());
+      while (const auto frame = reader.next()) {
+        if (frame->mark == FrameMark::Reply && frame->identifier == 5)
+          reply = readPropertyList(frame->payload);
+      }
+      return reply.has_value();
+    });
+    return reply ? reply->dictionary()->get("Error").integer().value_or(-1) : -2;
+  }
+
+  std::string path() const { return _folder.file("com.orvane.TelephonyServer"); }
+
+  TemporaryFolder _folder;
+  SocketTelephonyService _service{_folder.path(), 300ms};
+  std::string _askedFor;
+  int _notifications = 0;
+};
+
+TEST_F(SocketTelephony, CannotBeReachedWhenNobodyListens) {
+  EXPECT_FALSE(_service.connect([] {}));
+}
+
+TEST_F(SocketTelephony, MakesALogChannel) {
+  const auto listener = server({0, "com.orvane.commands"});
+  const auto connection = _service.connect([] {});
+  ASSERT_TRUE(connection);
+  const auto channel = connection->createLogChannel("com.orvane.local");
+  EXPECT_EQ(channel.error, 0);
+  EXPECT_EQ(channel.portName, "com.orvane.commands");
+  EXPECT_EQ(_askedFor, "com.orvane.local");
+}
+
+TEST_F(SocketTelephony, PassesErrorsAndAbsentPortNamesOn) {
+  const auto listener = server({-77, std::nullopt});
+  const auto connection = _service.connect({});
+  const auto channel = connection->createLogChannel("x");
+  EXPECT_EQ(channel.error, -77);
+  EXPECT_FALSE(channel.portName);
+}
+
+TEST_F(SocketTelephony, NoReplyInTimeIsAnError) {
+  const RawSocket silent = RawSocket::listeningAt(path());
+  const auto connection = _service.connect([this] { ++_notifications; });
+  const auto start = std::chrono::steady_clock::now();
+  EXPECT_EQ(connection->createLogChannel("x").error, 4);
+  EXPECT_GE(std::chrono::steady_clock::now() - start, 299ms);
+  EXPECT_EQ(_notifications, 0);
+}
+
+TEST_F(SocketTelephony, AReplyThatIsNoAnswerIsAnError) {
+  const RawSocket listener = RawSocket::listeningAt(path());
+  const auto connection = _service.connect({});
+  const RawSocket server = listener.accept();
+  Bytes reply;
+  appendFrame(reply, {0, FrameMark::Reply, Bytes{1, 2, 3}});
+  server.send(reply);
+  EXPECT_EQ(connection->createLogChannel("x").error, 5);
+}
+
+TEST_F(SocketTelephony, NotificationsComeDuringTheWaitAndFromTheEventLoop) {
+  TelephonyListener listener(_folder.path(),
+                             [](std::string_view) { return TelephonyConnection::LogChannel{}; });
+  auto connection = _service.connect([this] { ++_notifications; });
+  EXPECT_TRUE(runUntil([&] { return _notifications == 1; })) << "no greeting";
+  listener.notifyAll();
+  listener.notifyAll();
+  EXPECT_TRUE(runUntil([&] { return _notifications == 3; }));
+  listener.notifyAll();
+  QCoreApplication::processEvents();  // sends it
+  connection->createLogChannel("x");  // meets it, though nobody answers
+  EXPECT_EQ(_notifications, 4);
+  connection.reset();
+  listener.notifyAll();
+  runFor(20ms);
+  EXPECT_EQ(_notifications, 4);
+}
+
+TEST_F(SocketTelephony, TheNotificationHandlerMayDestroyTheConnection) {
+  TelephonyListener listener(_folder.path(),
+                             [](std::string_view) { return TelephonyConnection::LogChannel{}; });
+  std::unique_ptr<TelephonyConnection> connection;
+  const auto witness = std::make_shared<int>(1);
+  connection = _service.connect([&, witness] {
+    connection.reset();
+    _notifications += *witness;
+  });
+  EXPECT_TRUE(runUntil([&] { return _notifications == 1; }));
+  runFor(20ms);
+}
+
+TEST_F(SocketTelephony, ASecondListenerIsRefused) {
+  const TelephonyListener first(_folder.path(), {});
+  try {
+    const TelephonyListener second(_folder.path(), {});
+    FAIL() << "two servers in one folder";
+  } catch (const std::runtime_error& error) {
+    EXPECT_EQ(error.what(), "another process serves " + path());
+  }
+}
+
+constexpr auto rights = "<key>Rights</key><array><string>internal</string><string>spi</string></array>";
+constexpr auto command = "<key>Command</key><string>CreateLogChannel</string>";
+constexpr auto portName = "<key>PortName</key><string>local</string>";
+
+std::string dictionary(const std::vector<std::string>& entries) {
+  std::string text = "<dict>";
+  for (const std::string& entry : entries) text += entry;
+  return text + "</dict>";
+}
+
+TEST_F(SocketTelephony, BothRightsAreNeeded) {
+  EXPECT_EQ(errorOf(dictionary({command, portName, rights})), 0);
+  EXPECT_EQ(_askedFor, "local");
+  _askedFor.clear();
+  EXPECT_EQ(errorOf(dictionary({command, portName})), 3);
+  for (const std::string right : {"spi", "internal"}) {
+    const std::string one = "<key>Rights</key><array><string>" + right + "</string></array>";
+    EXPECT_EQ(errorOf(dictionary({command, portName, one})), 3);
+  }
+  EXPECT_EQ(_askedFor, "");
+}
+
+TEST_F(SocketTelephony, RequestsThatMakeNoSenseAreRefused) {
+  EXPECT_EQ(errorOf("<array/>"), 1);
+  EXPECT_EQ(errorOf(dictionary({command, rights})), 1);
+  EXPECT_EQ(errorOf(dictionary({portName, rights})), 2);
+  EXPECT_EQ(errorOf(dictionary({"<key>Command</key><string>Dance</string>", portName, rights})), 2);
+  EXPECT_EQ(_askedFor, "");
+}
+
+TEST_F(SocketTelephony, AClientThatSendsNoFramesIsDroppedAndOthersAreServed) {
+  TelephonyListener listener(_folder.path(), {});
+  const auto connection = _service.connect([this] { ++_notifications; });
+  const RawSocket rude = RawSocket::connectedTo(path());
+  rude.send(Bytes(100, 0xFF));
+  EXPECT_TRUE(runUntil([&] { return _notifications == 1; }));
+  Bytes greeting;
+  appendFrame(greeting, {0, FrameMark::Notification, {}});
+  EXPECT_EQ(rude.receive(), greeting);
+  runFor(20ms);
+  EXPECT_TRUE(rude.waits(0ms));
+  EXPECT_TRUE(rude.receive().empty());
+  listener.notifyAll();
+  EXPECT_TRUE(runUntil([&] { return _notifications == 2; }));
+}
+
+}  // namespace
+}  // namespace varnel

@@ -1,0 +1,84 @@
+#include "widgets/DesktopColours.h"
+
+#include <gtest/gtest.h>
+
+#include <QApplication>
+#include <QPalette>
+#include <QTest>
+
+#include "tests/support/PrivateBus.h"
+#include "widgets/Colours.h"
+
+namespace varnel {
+
+/// A desktop's settings portal with one setting.
+class FakePortal final : public QObject {
+  Q_OBJECT
+  Q_CLASSINFO("D-Bus Interface", "org.freedesktop.portal.Settings")
+
+ public:
+  explicit FakePortal(QDBusConnection bus) {
+    bus.registerObject("/org/freedesktop/portal/desktop", this,
+                       QDBusConnection::ExportAllSlots | QDBusConnection::ExportAllSignals);
+    bus.registerService("org.freedesktop.portal.Desktop");
+  }
+  void change(unsigned scheme) {
+    Q_EMIT SettingChanged("org.freedesktop.appearance", "color-scheme", QDBusVariant(scheme));
+  }
+
+  Q_SLOT QDBusVariant Read(const QString& group, const QString& key) {
+    EXPECT_EQ(group, "org.freedesktop.appearance");
+    EXPECT_EQ(key, "color-scheme");
+    return QDBusVariant(QVariant::fromValue(QDBusVariant(1U)));
+  }
+  Q_SIGNAL void SettingChanged(const QString& group, const QString& key, const QDBusVariant& value);
+};
+
+namespace {
+
+bool isDark() { return QApplication::palette().color(QPalette::Base).lightness() < 60; }
+
+class DesktopColoursTest : public testing::Test {
+ protected:
+  ~DesktopColoursTest() override { QApplication::setPalette(QPalette()); }
+};
+
+TEST_F(DesktopColoursTest, DarkAndBackAgain) {
+  const QColor light = QApplication::palette().color(QPalette::Base);
+  ASSERT_GT(light.lightness(), 200);
+  DesktopColours::apply(DesktopColours::Scheme::Dark);
+  const QPalette dark = QApplication::palette();
+  EXPECT_TRUE(isDark());
+  EXPECT_GT(contrast(dark.color(QPalette::Base), dark.color(QPalette::Text)), 7);
+  EXPECT_GT(contrast(dark.color(QPalette::Window), dark.color(QPalette::WindowText)), 7);
+  DesktopColours::apply(DesktopColours::Scheme::NoPreference);
+  EXPECT_EQ(QApplication::palette().color(QPalette::Base), light);
+  DesktopColours::apply(DesktopColours::Scheme::Light);
+  EXPECT_EQ(QApplication::palette().color(QPalette::Base), light);
+}
+
+TEST_F(DesktopColoursTest, FollowsTheDesktopsPortal) {
+  PrivateBus bus;
+  ASSERT_TRUE(bus.start()) << "dbus-daemon is needed";
+  // The program's one session bus, which nothing else here asks for.
+  ::setenv("DBUS_SESSION_BUS_ADDRESS", bus.address().c_str(), 1);
+  const QDBusConnection connection = QDBusConnection::sessionBus();
+  ASSERT_TRUE(connection.isConnected());
+  {
+    const DesktopColours colours(bus.address());
+    QTest::qWait(100);
+    EXPECT_FALSE(isDark()) << "there is no portal";
+  }
+  FakePortal portal(connection);
+  const DesktopColours colours(bus.address());
+  EXPECT_TRUE(QTest::qWaitFor(isDark)) << "what the portal says at first";
+  portal.change(2);
+  EXPECT_TRUE(QTest::qWaitFor([] { return !isDark(); }));
+  portal.change(1);
+  EXPECT_TRUE(QTest::qWaitFor(isDark));
+}
+
+}  // namespace
+}  // namespace varnel
+
+#include "DesktopColoursTest.moc"

@@ -1,0 +1,59 @@
+#include "widgets/HeaderWidget.h"
+
+#include <gtest/gtest.h>
+
+#include <QTest>
+
+namespace varnel {
+namespace {
+
+class HeaderWidgetTest : public testing::Test {
+ protected:
+  void show(const QString& title, const QString& parentTitle, int width) {
+    header.setTitle(title);
+    if (!parentTitle.isEmpty()) header.showBackButton(parentTitle);
+    header.resize(width, 48);
+    header.show();
+    QCoreApplication::processEvents();
+  }
+  QLabel& label() { return *header.findChild<QLabel*>(); }
+  TextButton& back() { return *header.findChild<TextButton*>(); }
+  bool titleIsWhole() { return label().fontMetrics().horizontalAdvance(label().text()) <= label().width(); }
+
+  HeaderWidget header;
+};
+
+TEST_F(HeaderWidgetTest, ATitleStandsInTheMiddle) {
+  show("Varnel", "", 360);
+  EXPECT_NEAR(label().geometry().center().x(), 180, 1);
+  EXPECT_FALSE(back().isVisible());
+}
+
+TEST_F(HeaderWidgetTest, AShortTitleHasTheWholeWayBackBesideIt) {
+  show("SIM", "Varnel", 360);
+  EXPECT_EQ(back().width(), back().sizeHint().width());
+  EXPECT_NEAR(label().geometry().center().x(), 180, 1);
+}
+
+TEST_F(HeaderWidgetTest, ALongTitleIsNotCut) {
+  show("UTRAN Neighbhor Measurements", "Serving Cell Info", 360);
+  EXPECT_TRUE(titleIsWhole());
+  EXPECT_FALSE(label().geometry().intersects(back().geometry()));
+  EXPECT_GE(label().font().pixelSize(), 13);
+  EXPECT_LE(label().geometry().right(), 350);
+}
+
+TEST_F(HeaderWidgetTest, TheWayBackIsAtLeastAsLargeAsAFinger) {
+  show("A title so long that no letters of it are small enough for the bar", "Varnel", 360);
+  EXPECT_GE(back().width(), 40);
+  EXPECT_GE(back().height(), 44);
+}
+
+TEST_F(HeaderWidgetTest, TitlesAreNoMarkUp) {
+  show("<b>A</b> & B", "<i>C</i> & D", 360);
+  EXPECT_EQ(label().textFormat(), Qt::PlainText);
+  EXPECT_TRUE(back().shortcut().isEmpty());
+}
+
+}  // namespace
+}  // namespace varnel

@@ -1,0 +1,163 @@
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <QLabel>
+#include <QScrollBar>
+
+#include "app/VarnelApp.h"
+#include "base/PropertyList.h"
+#include "host/FileResources.h"
+#include "tests/support/DictionaryOf.h"
+#include "tests/support/FakeDeviceFiles.h"
+#include "tests/support/FakeQueue.h"
+#include "tests/support/FakeTelephony.h"
+#include "tests/support/MemoryPorts.h"
+#include "tests/support/PacketBuilder.h"
+#include "tests/support/RecordingLog.h"
+#include "tests/support/RecordingPreferences.h"
+#include "tests/support/TestServices.h"
+#include "tests/support/TestWidgets.h"
+
+namespace varnel {
+namespace {
+
+using namespace std::chrono_literals;
+using testing::SizeIs;
+
+constexpr std::string_view channel = "com.orvane.BasebandStateReport.LogChannel";
+constexpr const char* marker = "/OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
+
+// The whole application on real widgets, with a telephony server in the hands of the test.
+class ScreensTest : public testing::TestWithParam<std::pair<int, int>> {
+ protected:
+  ScreensTest() {
+    host.resources.add(
+        "LTE", dictionaryOf({{"PDP Context Info", Value::ofArray()},
+                             {"Connected Mode Intra-Frequency Measurement Results", Value::ofDictionary()}}));
+    const FileResources resources(resourceFolder());
+    host.resources.add("VarnelSaveViewController", resources.propertyList("VarnelSaveViewController"));
+    host.clock.set({1709294709, 0});
+    files.existing.insert(marker);
+    ports.answer = [](const MemoryPorts::Request&) {
+      return RemotePort::SendResult{0, writeXmlPropertyList(dictionaryOf({{"GetTechnology", "kalvi-lte"}}))};
+    };
+    app.applicationDidFinishLaunching();
+    window().setGeometry(0, 0, GetParam().first, GetParam().second);
+    EXPECT_TRUE(QTest::qWaitForWindowActive(&window()));
+    queue.run();
+    receive("internet");
+  }
+  void receive(const std::string& apn) {
+    const Value list = Value::ofArray();
+    list.array()->push_back(dictionaryOf({{"APN", apn}, {"State", "Active"}}));
+    ports.deliver(channel, 0, serverMessage(0xFF0002, list));
+    queue.advance(2s);
+    QCoreApplication::processEvents();
+  }
+  void press(Qt::Key key, Qt::KeyboardModifiers modifiers = Qt::NoModifier) {
+    QTest::keyClick(QApplication::focusWidget(), key, modifiers);
+    QCoreApplication::processEvents();
+  }
+  WindowWidget& window() { return static_cast<WindowWidget&>(*app.window()); }
+  NavigationWidget& stack() { return *dynamic_cast<NavigationWidget*>(window().children().first()); }
+  PaneWidget& pane() { return stack().topPane(); }
+  std::vector<std::string> descriptions() {
+    std::vector<std::string> all;
+    for (const RowWidget* row : pane().tableWidget().visibleRows())
+      all.push_back(row->description().toStdString());
+    return all;
+  }
+  // Whether something is painted in the last column of the row's content.
+  static bool touchesItsEdge(RowWidget& row) {
+    const QImage picture = row.grab().toImage();
+    const int x = static_cast<int>(row.contentBounds().width) - 1;
+    for (int y = 5; y < 45; ++y) {
+      if (picture.pixelColor(x, y) != picture.pixelColor(2, 2)) return true;
+    }
+    return false;
+  }
+
+  RecordingLog log;
+  TestServices host;
+  FakeQueue queue;
+  MemoryPorts ports;
+  FakeTelephony telephony;
+  FakeDeviceFiles files;
+  RecordingPreferences preferences;
+  WidgetUserInterface userInterface{{.startOver = [this] { app.startOver(); }}};
+  VarnelApp app{
+      {{ports, telephony, queue, host.services, writeXmlPropertyList}, files, preferences, userInterface}};
+};
+
+TEST_P(ScreensTest, ThePaneFillsTheWindowAndNothingIsCut) {
+  EXPECT_EQ(pane().size(), window().size());
+  for (RowWidget* row : pane().tableWidget().visibleRows())
+    EXPECT_TRUE(row->sidewaysRange() > 0 || !touchesItsEdge(*row)) << row->description().toStdString();
+  for (const QLabel* label : pane().findChildren<QLabel*>())
+    EXPECT_GE(label->width(), label->fontMetrics().horizontalAdvance(label->text()))
+        << label->text().toStdString();
+}
+
+TEST_P(ScreensTest, WhatDoesNotFitCanBeScrolledIntoView) {
+  RowWidget& row = *pane().tableWidget().visibleRows().at(1);
+  ASSERT_EQ(row.description(), "Connected Mode Intra-Frequency Measurement Results");
+  EXPECT_EQ(row.sidewaysRange() > 0, GetParam().first == 360);
+  if (row.sidewaysRange() == 0) return;
+  EXPECT_TRUE(touchesItsEdge(row));
+  press(Qt::Key_End);
+  for (int i = 0; i < 10; ++i) press(Qt::Key_Right, Qt::ShiftModifier);
+  EXPECT_EQ(row.sidewaysPosition(), row.sidewaysRange());
+}
+
+TEST_P(ScreensTest, KeysOpenPanesAndComeBack) {
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  EXPECT_THAT(stack().controllers(), SizeIs(2));
+  EXPECT_EQ(pane().header().title(), "PDP Context Info");
+  press(Qt::Key_Escape);
+  EXPECT_THAT(stack().controllers(), SizeIs(1));
+  press(Qt::Key_Right);
+  EXPECT_THAT(stack().controllers(), SizeIs(2)) << "the row is still the current one";
+}
+
+TEST_P(ScreensTest, ARefreshOfAnOpenPaneShowsTheNewValueInTheSameRow) {
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  const auto rows = pane().tableWidget().visibleRows();
+  EXPECT_THAT(descriptions(), testing::Contains("APN: internet"));
+  press(Qt::Key_Down);
+  receive("ims");
+  EXPECT_THAT(descriptions(), testing::Contains("APN: ims"));
+  EXPECT_EQ(pane().tableWidget().visibleRows(), rows);
+  EXPECT_TRUE(rows.front()->emphasis().isSelected);
+}
+
+TEST_P(ScreensTest, ControlSOpensTheSaveScreenAndSavesOnIt) {
+  press(Qt::Key_S, Qt::ControlModifier);
+  ASSERT_NE(stack().modalScreen(), nullptr);
+  EXPECT_EQ(stack().modalScreen()->size(), window().size());
+  QTest::keyClicks(QApplication::focusWidget(), "in the lift");
+  press(Qt::Key_S, Qt::ControlModifier);
+  queue.run();
+  EXPECT_EQ(stack().modalScreen(), nullptr);
+  ASSERT_THAT(files.writes, SizeIs(1));
+}
+
+TEST_P(ScreensTest, ControlRStartsOverAtTheEmptyRoot) {
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  press(Qt::Key_R, Qt::ControlModifier);
+  EXPECT_THAT(stack().controllers(), SizeIs(1));
+  EXPECT_TRUE(descriptions().empty());
+  queue.run();
+  receive("again");
+  EXPECT_FALSE(descriptions().empty());
+}
+
+INSTANTIATE_TEST_SUITE_P(, ScreensTest, testing::Values(std::pair(360, 640), std::pair(1920, 1080)),
+                         [](const auto& info) { return info.param.first == 360 ? "Phone" : "FullHD"; });
+
+}  // namespace
+}  // namespace varnel

@@ -1,0 +1,63 @@
+#include "widgets/TouchScrolling.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <QPointingDevice>
+#include <QScrollBar>
+
+#include "tests/support/TestWidgets.h"
+
+namespace varnel {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+class TouchScrollingTest : public testing::Test {
+ protected:
+  TouchScrollingTest() {
+    table.resize(360, 400);
+    table.setDelegate(&delegate);
+    table.show();
+    EXPECT_TRUE(QTest::qWaitForWindowExposed(&table));
+  }
+  // A finger goes from one place to the other in ten steps of 10 ms.
+  void drag(const QPoint& from, const QPoint& to) {
+    QTest::touchEvent(&table, finger.get()).press(0, from, table.viewport());
+    for (int step = 1; step <= 10; ++step) {
+      QTest::qWait(10);
+      QTest::touchEvent(&table, finger.get()).move(0, from + (to - from) * step / 10, table.viewport());
+    }
+    QTest::touchEvent(&table, finger.get()).release(0, to, table.viewport());
+  }
+
+  std::unique_ptr<QPointingDevice> finger{QTest::createTouchDevice()};
+  TestRows delegate{leaves(100, std::string(200, 'x'))};
+  TableWidget table;
+};
+
+TEST_F(TouchScrollingTest, AFingerUpScrollsTheTableDown) {
+  drag({100, 350}, {100, 150});
+  EXPECT_GT(table.verticalScrollBar()->value(), 100);
+  EXPECT_THAT(delegate.chosen, IsEmpty());
+  for (const RowWidget* row : table.visibleRows()) EXPECT_EQ(row->sidewaysPosition(), 0);
+}
+
+TEST_F(TouchScrollingTest, AFingerSidewaysScrollsItsRowOnly) {
+  drag({300, 75}, {100, 80});
+  EXPECT_GT(table.visibleRows().at(1)->sidewaysPosition(), 100);
+  EXPECT_EQ(table.visibleRows().at(0)->sidewaysPosition(), 0);
+  EXPECT_EQ(table.verticalScrollBar()->value(), 0);
+  EXPECT_THAT(delegate.chosen, IsEmpty());
+}
+
+TEST_F(TouchScrollingTest, ATapChoosesItsRowOnce) {
+  QTest::touchEvent(&table, finger.get()).press(0, QPoint(100, 125), table.viewport());
+  QTest::touchEvent(&table, finger.get()).release(0, QPoint(101, 126), table.viewport());
+  QTest::qWait(20);
+  EXPECT_THAT(delegate.chosen, ElementsAre(2));
+}
+
+}  // namespace
+}  // namespace varnel

@@ -1,0 +1,60 @@
+#include "widgets/Colours.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace varnel {
+
+namespace {
+
+// The least contrast at which small text reads well (WCAG 2.1, level AA).
+constexpr double readable = 4.5;
+
+double linear(double channel) {
+  return channel <= 0.04045 ? channel / 12.92 : std::pow((channel + 0.055) / 1.055, 2.4);
+}
+
+double luminance(const QColor& colour) {
+  return 0.2126 * linear(colour.redF()) + 0.7152 * linear(colour.greenF()) + 0.0722 * linear(colour.blueF());
+}
+
+}  // namespace
+
+QColor blend(const QColor& from, const QColor& to, double share) {
+  const auto mixed = [share](float a, float b) {
+    return static_cast<float>((1 - share) * static_cast<double>(a) + share * static_cast<double>(b));
+  };
+  return QColor::fromRgbF(mixed(from.redF(), to.redF()), mixed(from.greenF(), to.greenF()),
+                          mixed(from.blueF(), to.blueF()));
+}
+
+double contrast(const QColor& one, const QColor& other) {
+  const auto [dark, light] = std::minmax({luminance(one), luminance(other)});
+  return (light + 0.05) / (dark + 0.05);
+}
+
+QColor separatorColour(const QPalette& palette) {
+  return blend(palette.color(QPalette::Base), palette.color(QPalette::Text), 0.16);
+}
+
+QColor barColour(const QPalette& palette) {
+  return blend(palette.color(QPalette::Base), palette.color(QPalette::Text), 0.3);
+}
+
+QColor markColour(const QPalette& palette) {
+  return blend(palette.color(QPalette::Base), palette.color(QPalette::Text), 0.5);
+}
+
+QColor selectionColour(const QPalette& palette) {
+  return blend(palette.color(QPalette::Base), palette.color(QPalette::Highlight), 0.3);
+}
+
+QColor accentColour(const QPalette& palette, const QColor& ground) {
+  const QColor highlight = palette.color(QPalette::Highlight);
+  const QColor text = palette.color(QPalette::WindowText);
+  double share = 0;
+  while (share < 1 && contrast(blend(highlight, text, share), ground) < readable) share += 0.05;
+  return blend(highlight, text, std::min(share, 1.0));
+}
+
+}  // namespace varnel

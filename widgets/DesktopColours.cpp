@@ -1,0 +1,97 @@
+#include "widgets/DesktopColours.h"
+
+#include <QApplication>
+#include <QDBusMessage>
+#include <QDBusPendingCallWatcher>
+#include <QDBusPendingReply>
+#include <QPalette>
+
+namespace varnel {
+
+namespace {
+
+const QString service = QStringLiteral("org.freedesktop.portal.Desktop");
+const QString objectPath = QStringLiteral("/org/freedesktop/portal/desktop");
+const QString interface = QStringLiteral("org.freedesktop.portal.Settings");
+const QString appearance = QStringLiteral("org.freedesktop.appearance");
+const QString colourScheme = QStringLiteral("color-scheme");
+
+const QString connectionName = QStringLiteral("varnel-colours");
+
+QDBusMessage busMethod(const QString& name) {
+  const QString bus = QStringLiteral("org.freedesktop.DBus");
+  return QDBusMessage::createMethodCall(bus, QStringLiteral("/org/freedesktop/DBus"), bus, name);
+}
+
+// The number within a variant, which may be within others.
+DesktopColours::Scheme schemeIn(QVariant value) {
+  while (value.metaType() == QMetaType::fromType<QDBusVariant>())
+    value = value.value<QDBusVariant>().variant();
+  return static_cast<DesktopColours::Scheme>(value.toUInt());
+}
+
+// The palette's other colours come from these by the style's own rules.
+QPalette darkPalette() {
+  QPalette palette(QColor(48, 48, 48), QColor(36, 36, 36));
+  palette.setColor(QPalette::Base, QColor(24, 24, 24));
+  palette.setColor(QPalette::Highlight, QColor(53, 132, 228));
+  palette.setColor(QPalette::HighlightedText, Qt::white);
+  return palette;
+}
+
+}  // namespace
+
+// A bus connection of the toolkit's own would wait for the bus. So this one goes to the bus as to any peer,
+// and introduces itself.
+DesktopColours::DesktopColours(const std::string& busAddress)
+    : _bus(QDBusConnection::connectToPeer(QString::fromStdString(busAddress), connectionName)) {
+  if (_bus.isConnected()) introduceItself();
+}
+
+DesktopColours::~DesktopColours() { QDBusConnection::disconnectFromPeer(connectionName); }
+
+void DesktopColours::introduceItself() {
+  auto* const watcher = new QDBusPendingCallWatcher(_bus.asyncCall(busMethod(QStringLiteral("Hello"))), this);
+  connect(watcher, &QDBusPendingCallWatcher::finished, this, [this, watcher] {
+    watcher->deleteLater();
+    if (watcher->isError()) return;
+    listen();
+    ask();
+  });
+}
+
+void DesktopColours::listen() {
+  _bus.connect(QString(), objectPath, interface, QStringLiteral("SettingChanged"), this,
+               SLOT(settingChanged(QString, QString, QDBusVariant)));
+  QDBusMessage wish = busMethod(QStringLiteral("AddMatch"));
+  wish << QStringLiteral(
+              "type='signal',sender='%1',path='%2',interface='%3',member='SettingChanged',arg0='%4'")
+              .arg(service, objectPath, interface, appearance);
+  _bus.asyncCall(wish);
+}
+
+void DesktopColours::ask() {
+  QDBusMessage question =
+      QDBusMessage::createMethodCall(service, objectPath, interface, QStringLiteral("Read"));
+  question << appearance << colourScheme;
+  auto* const watcher = new QDBusPendingCallWatcher(_bus.asyncCall(question), this);
+  connect(watcher, &QDBusPendingCallWatcher::finished, this, [watcher] {
+    watcher->deleteLater();
+    const QDBusPendingReply<QDBusVariant> reply = *watcher;
+    if (!reply.isError()) apply(schemeIn(reply.value().variant()));
+  });
+}
+
+void DesktopColours::settingChanged(const QString& group, const QString& key, const QDBusVariant& value) {
+  if (group == appearance && key == colourScheme) apply(schemeIn(value.variant()));
+}
+
+void DesktopColours::apply(Scheme scheme) {
+  // Back to the toolkit's own, which may be dark already.
+  QApplication::setPalette(QPalette());
+  constexpr int halfLight = 128;
+  const bool isDark = QApplication::palette().color(QPalette::Window).lightness() < halfLight;
+  if (scheme == Scheme::Dark && !isDark) QApplication::setPalette(darkPalette());
+}
+
+}  // namespace varnel

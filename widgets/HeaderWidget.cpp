@@ -1,0 +1,92 @@
+#include "widgets/HeaderWidget.h"
+
+#include <QPainter>
+#include <array>
+#include <cmath>
+
+#include "widgets/Colours.h"
+#include "widgets/QtValues.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr int barHeight = 48;
+constexpr int inset = 10;
+constexpr std::array<double, 3> titleSizes = {17, 15, 13};
+
+int widthOf(const QString& text, double size) {
+  const double width = QFontMetricsF(qtFont(Font::boldSystem(size))).horizontalAdvance(text);
+  return static_cast<int>(std::ceil(width)) + 2;
+}
+
+}  // namespace
+
+HeaderWidget::HeaderWidget(QWidget* parent)
+    : QWidget(parent), _back(TextButton::Mark::Back, this), _title(this) {
+  setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Fixed);
+  _back.hide();
+  _title.setTextFormat(Qt::PlainText);
+  _title.setAlignment(Qt::AlignCenter);
+  connect(&_back, &QAbstractButton::clicked, this, [this] {
+    if (_backAction) _backAction();
+  });
+}
+
+void HeaderWidget::setTitle(const QString& title) {
+  if (title == _title.text()) return;
+  _title.setText(title);
+  arrange();
+}
+
+void HeaderWidget::showBackButton(const QString& parentTitle) {
+  if (_leadsBack && parentTitle == _back.text()) return;
+  _leadsBack = true;
+  _back.setText(parentTitle);
+  _back.setShortcut({});  // an ampersand of the title is no mnemonic
+  _back.setAccessibleName(QStringLiteral("Back to ") + parentTitle);
+  _back.show();
+  arrange();
+}
+
+QSize HeaderWidget::sizeHint() const { return {320, barHeight}; }
+
+void HeaderWidget::resizeEvent(QResizeEvent* event) {
+  QWidget::resizeEvent(event);
+  arrange();
+}
+
+void HeaderWidget::arrange() {
+  for (const BackButton backButton : {BackButton::Whole, BackButton::Mark}) {
+    for (const double size : titleSizes) {
+      if (arrangeWith(_leadsBack ? backButton : BackButton::Hidden, size)) return;
+    }
+  }
+}
+
+// False when the title does not fit; it stands where it would be cut least then.
+bool HeaderWidget::arrangeWith(BackButton backButton, double titleSize) {
+  int backWidth = 0;
+  if (backButton == BackButton::Whole) backWidth = _back.sizeHint().width();
+  if (backButton == BackButton::Mark) backWidth = _back.minimumSizeHint().width();
+  const int titleWidth = widthOf(_title.text(), titleSize);
+  _back.setGeometry(0, (barHeight - _back.sizeHint().height()) / 2, backWidth, _back.sizeHint().height());
+  _title.setFont(qtFont(Font::boldSystem(titleSize)));
+  _title.setGeometry(titleRoom(backWidth, titleWidth));
+  return titleWidth <= _title.width();
+}
+
+// In the middle of the bar, or as near to it as the way back allows.
+QRect HeaderWidget::titleRoom(int backWidth, int titleWidth) const {
+  const int left = backWidth > 0 ? backWidth : inset;
+  const int width = std::min(titleWidth, this->width() - left - inset);
+  return {std::max(left, (this->width() - width) / 2), 0, std::max(0, width), barHeight - 1};
+}
+
+void HeaderWidget::paintEvent(QPaintEvent*) {
+  QPainter painter(this);
+  const double thickness = 1 / devicePixelRatioF();
+  painter.fillRect(QRectF(0, height() - thickness, width(), thickness), separatorColour(palette()));
+}
+
+}  // namespace varnel

@@ -1,0 +1,51 @@
+#pragma once
+
+#include <QVBoxLayout>
+#include <QWidget>
+#include <map>
+#include <string>
+
+#include "platform/ui/ModalScreen.h"
+#include "platform/ui/ScreenLayout.h"
+#include "widgets/TableWidget.h"
+#include "widgets/TextFieldWidget.h"
+
+namespace varnel {
+
+/// A screen over the panes, made from a layout. Rows are no wider than reads well.
+///
+/// Buttons that are named after what a standard key does answer to it: "Save" to Ctrl+S, "Cancel" to Escape.
+class ModalScreenWidget final : public QWidget, public ModalScreen {
+ public:
+  ModalScreenWidget(const ScreenLayout& layout, Actions actions);
+
+  void setFrame(const Rect& frame) override;
+  TableView* table(std::string_view outlet) override;
+  TextField* textField(std::string_view outlet) override;
+
+  /// Comes over that widget, hidden yet.
+  void enter(QWidget& below);
+  /// Goes from it and calls no action any more.
+  void leave();
+  /// Gives the keyboard to the first field, else to the screen itself.
+  void takeKeyboard();
+
+ protected:
+  void keyPressEvent(QKeyEvent* event) override;
+  void mousePressEvent(QMouseEvent* event) override;
+  bool focusNextPrevChild(bool next) override;
+
+ private:
+  void addRow(QVBoxLayout& column, const std::vector<ScreenElement>& elements, int spacing);
+  void addElement(QBoxLayout& row, const ScreenElement& element);
+  QWidget* makeButton(const ScreenElement& element);
+  void perform(const std::string& action);
+
+  Actions _actions;
+  std::string _backgroundAction;
+  std::map<std::string, TableWidget*, std::less<>> _tables;           // by outlet
+  std::map<std::string, TextFieldWidget*, std::less<>> _fields;       // by outlet
+  std::map<std::string, std::string, std::less<>> _actionsOfButtons;  // by the button's title
+};
+
+}  // namespace varnel

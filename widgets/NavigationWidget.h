@@ -1,0 +1,64 @@
+#pragma once
+
+#include <QPointer>
+#include <QWidget>
+#include <memory>
+#include <vector>
+
+#include "platform/ui/NavigationStack.h"
+#include "widgets/ModalScreenWidget.h"
+#include "widgets/PaneWidget.h"
+#include "widgets/SlideOverlay.h"
+
+namespace varnel {
+
+/// Panes one above the other. What it is asked for happens at once; an animation is a picture of it above.
+///
+/// Escape, Left, Backspace, the desktop's key for going back and the mouse's button for it go back. Ctrl+S
+/// presses the top pane's Save button.
+class NavigationWidget final : public QWidget, public NavigationStack {
+ public:
+  explicit NavigationWidget(std::shared_ptr<PaneController> root);
+  ~NavigationWidget() override;
+
+  void setDelegate(NavigationStackDelegate* delegate) override { _delegate = delegate; }
+  std::vector<std::shared_ptr<PaneController>> controllers() const override { return _controllers; }
+  std::shared_ptr<PaneController> topController() const override { return _controllers.back(); }
+  void push(std::shared_ptr<PaneController> controller, Animation animation) override;
+  void popTo(const PaneController& controller, Animation animation) override;
+  void showToolbar() override;
+  void present(std::shared_ptr<ModalController> controller, Animation animation) override;
+  void dismiss(Animation animation) override;
+
+  /// The window becomes visible: the top pane appears, which the delegate is not told of.
+  void appear();
+  /// Gives the keyboard to what is on top.
+  void takeKeyboard();
+  PaneWidget& topPane() const;
+  /// Null while none is presented.
+  ModalScreenWidget* modalScreen() const;
+
+ protected:
+  void resizeEvent(QResizeEvent* event) override;
+  void keyPressEvent(QKeyEvent* event) override;
+  void mousePressEvent(QMouseEvent* event) override;
+
+ private:
+  void adopt(std::size_t index);
+  void release(PaneController& controller);
+  void changeTop(std::vector<std::shared_ptr<PaneController>> controllers, Animation animation,
+                 SlideOverlay::Movement movement);
+  void showTop();
+  void showWayBack(std::size_t index);
+  void goBack();
+  void slide(const QPixmap& former, const QPixmap& next, SlideOverlay::Movement movement);
+  void releaseLater(std::shared_ptr<void> leaving);
+
+  std::vector<std::shared_ptr<PaneController>> _controllers;
+  std::shared_ptr<ModalController> _modal;
+  NavigationStackDelegate* _delegate = nullptr;
+  bool _showsToolbar = false;
+  QPointer<SlideOverlay> _overlay;
+};
+
+}  // namespace varnel

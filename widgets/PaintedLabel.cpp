@@ -1,0 +1,34 @@
+#include "widgets/PaintedLabel.h"
+
+#include "widgets/QtValues.h"
+
+namespace varnel {
+
+void PaintedLabel::setFont(const Font& font) {
+  QFont wanted = qtFont(font);
+  if (wanted == _font) return;
+  _font = std::move(wanted);
+  _row.update();
+}
+
+void PaintedLabel::setText(std::string_view text) {
+  if (text == _text) return;
+  _text = text;
+  _shownText = singleLine(text);
+  _row.update();
+}
+
+void PaintedLabel::setFrame(const Rect& frame) {
+  const QRectF wanted = qtRect(frame);
+  if (wanted == _frame) return;
+  _frame = wanted;
+  _row.update();
+}
+
+void PaintedLabel::paint(QPainter& painter) const {
+  painter.setFont(_font);
+  painter.drawText(_frame, Qt::AlignLeft | Qt::AlignAbsolute | Qt::AlignVCenter | Qt::TextSingleLine,
+                   _shownText);
+}
+
+}  // namespace varnel

@@ -1,0 +1,40 @@
+#pragma once
+
+#include <QVBoxLayout>
+#include <QWidget>
+#include <functional>
+
+#include "platform/ui/NavigationStack.h"
+#include "widgets/HeaderWidget.h"
+#include "widgets/TableWidget.h"
+#include "widgets/ToolbarWidget.h"
+
+namespace varnel {
+
+/// What a navigation stack shows at a time: title bar, table, toolbar.
+class PaneWidget final : public QWidget, public TablePane {
+ public:
+  PaneWidget();
+
+  TableView& table() override { return _table; }
+  void setTitle(std::string_view title) override;
+  void setToolbarItems(std::vector<ToolbarItem> items, Animation animation) override;
+  void resignFirstResponder() override;
+
+  TableWidget& tableWidget() { return _table; }
+  HeaderWidget& header() { return _header; }
+  ToolbarWidget& toolbar() { return _toolbar; }
+  /// Called when the title has changed.
+  void setTitleObserver(std::function<void()> observer) { _titleObserver = std::move(observer); }
+  /// Calls nobody from now on.
+  void fallSilent();
+
+ private:
+  QVBoxLayout _column;
+  HeaderWidget _header;
+  TableWidget _table;
+  ToolbarWidget _toolbar;
+  std::function<void()> _titleObserver;
+};
+
+}  // namespace varnel

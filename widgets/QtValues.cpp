@@ -1,0 +1,36 @@
+#include "widgets/QtValues.h"
+
+#include <QGuiApplication>
+#include <algorithm>
+
+namespace varnel {
+
+QString singleLine(std::string_view text) {
+  QString line = QString::fromUtf8(text.data(), static_cast<qsizetype>(text.size()));
+  const auto bendsTheLine = [](QChar character) {
+    return character.category() == QChar::Other_Control || character == QChar::LineSeparator ||
+           character == QChar::ParagraphSeparator;
+  };
+  if (std::any_of(line.cbegin(), line.cend(), bendsTheLine))
+    std::replace_if(line.begin(), line.end(), bendsTheLine, u' ');
+  return line;
+}
+
+std::string utf8(const QString& text) { return text.toStdString(); }
+
+QFont qtFont(const Font& font) {
+  QFont made = QGuiApplication::font();
+  if (!font.family.empty()) {
+    made.setFamilies({QString::fromStdString(font.family)});
+    made.setStyleHint(QFont::SansSerif);
+  }
+  made.setPixelSize(std::max(1, qRound(font.size)));
+  made.setBold(font.weight == Font::Weight::Bold);
+  return made;
+}
+
+QRectF qtRect(const Rect& rect) { return {rect.x, rect.y, rect.width, rect.height}; }
+
+QRect qtPixels(const Rect& rect) { return qtRect(rect).toRect(); }
+
+}  // namespace varnel

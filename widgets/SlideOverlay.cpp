@@ -1,0 +1,54 @@
+#include "widgets/SlideOverlay.h"
+
+#include <QPainter>
+
+namespace varnel {
+
+namespace {
+
+constexpr int duration_ms = 180;
+// How much of the upper picture's way the lower one goes.
+constexpr double lowerShare = 0.3;
+
+bool bringsNewOneAbove(SlideOverlay::Movement movement) {
+  return movement == SlideOverlay::Movement::Forth || movement == SlideOverlay::Movement::Rise;
+}
+
+bool isSideways(SlideOverlay::Movement movement) {
+  return movement == SlideOverlay::Movement::Forth || movement == SlideOverlay::Movement::Back;
+}
+
+}  // namespace
+
+SlideOverlay::SlideOverlay(const QPixmap& former, const QPixmap& next, Movement movement, QWidget& parent)
+    : QWidget(&parent),
+      _below(bringsNewOneAbove(movement) ? former : next),
+      _above(bringsNewOneAbove(movement) ? next : former),
+      _movement(movement) {
+  setAttribute(Qt::WA_TransparentForMouseEvents);
+  setAttribute(Qt::WA_OpaquePaintEvent);
+  setGeometry(parent.rect());
+  connect(&_animation, &QVariantAnimation::valueChanged, this, [this] { update(); });
+  connect(&_animation, &QVariantAnimation::finished, this, &QObject::deleteLater);
+  // From where the upper picture stands at first to where it ends, as shares of the way.
+  _animation.setStartValue(bringsNewOneAbove(movement) ? 1.0 : 0.0);
+  _animation.setEndValue(bringsNewOneAbove(movement) ? 0.0 : 1.0);
+  _animation.setEasingCurve(QEasingCurve::OutCubic);
+  _animation.setDuration(duration_ms);
+  _animation.start();
+}
+
+void SlideOverlay::paintEvent(QPaintEvent*) {
+  const double share = _animation.currentValue().toDouble();
+  QPainter painter(this);
+  painter.fillRect(rect(), palette().color(QPalette::Window));
+  if (isSideways(_movement)) {
+    painter.drawPixmap(QPointF(-lowerShare * (1 - share) * width(), 0), _below);
+    painter.drawPixmap(QPointF(share * width(), 0), _above);
+  } else {
+    painter.drawPixmap(QPointF(0, 0), _below);
+    painter.drawPixmap(QPointF(0, share * height()), _above);
+  }
+}
+
+}  // namespace varnel

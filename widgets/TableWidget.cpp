@@ -1,0 +1,325 @@
+#include "widgets/TableWidget.h"
+
+#include <QAccessible>
+#include <QKeyEvent>
+#include <QMouseEvent>
+#include <QScrollBar>
+#include <QWheelEvent>
+#include <algorithm>
+#include <cmath>
+#include <utility>
+
+namespace varnel {
+
+namespace {
+
+constexpr int rowHeight = static_cast<int>(tableRowHeight);
+constexpr double sidewaysStep = 60;  // of a key, logical pixels
+
+// Every cell's view was made by `makeCellView`.
+RowWidget& rowOf(const TableCell& cell) { return static_cast<RowWidget&>(cell.cellView()); }
+
+// How far a wheel has turned sideways, in logical pixels; 0 when it has turned up or down.
+double sidewaysMovement(const QWheelEvent& event) {
+  const QPoint turned = event.pixelDelta().isNull() ? event.angleDelta() / 2 : event.pixelDelta();
+  if (std::abs(turned.x()) > std::abs(turned.y())) return turned.x();
+  return event.modifiers().testFlag(Qt::ShiftModifier) ? turned.y() : 0;
+}
+
+}  // namespace
+
+TableWidget::TableWidget(QWidget* parent)
+    : QAbstractScrollArea(parent),
+      _touch(
+          *this,
+          [this](const QPoint& position) {
+            const auto row = rowAt(position);
+            return row ? visibleRow(*row) : nullptr;
+          },
+          [this](const QPoint& position) {
+            _keysAreUsed = false;
+            if (const auto row = rowAt(position)) chooseRow(*row);
+          }) {
+  setFrameShape(QFrame::NoFrame);
+  setFocusPolicy(Qt::StrongFocus);
+  setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+  verticalScrollBar()->setSingleStep(rowHeight / 2);
+  viewport()->setBackgroundRole(QPalette::Base);
+  viewport()->setAutoFillBackground(true);
+}
+
+TableWidget::~TableWidget() = default;
+
+void TableWidget::setDelegate(TableViewDelegate* delegate) {
+  _delegate = delegate;
+  if (!_delegate && _isLoaded) load();
+}
+
+void TableWidget::reloadData() { load(); }
+
+void TableWidget::load() {
+  _isLoaded = true;
+  measureRows();
+  putAwayAllRows();
+  updateScrollRange();
+  updateVisibleRows();
+  dropUnusedCells();
+  showEmphasis();
+}
+
+void TableWidget::measureRows() {
+  std::vector<std::size_t> rows;
+  if (_delegate) {
+    rows.resize(_delegate->numberOfSectionsInTableView(*this));
+    for (std::size_t section = 0; section < rows.size(); ++section)
+      rows[section] = _delegate->tableView_numberOfRowsInSection(*this, section);
+  }
+  _rows = RowIndex(std::move(rows));
+  if (_current && *_current >= _rows.rows()) {
+    _current.reset();
+    _currentIsSelected = false;
+  }
+  if (_sizesToFit) setMaximumHeight(static_cast<int>(_rows.rows()) * rowHeight);
+}
+
+void TableWidget::updateScrollRange() {
+  const int hidden = static_cast<int>(_rows.rows()) * rowHeight - viewport()->height();
+  verticalScrollBar()->setPageStep(viewport()->height());
+  verticalScrollBar()->setRange(0, std::max(0, hidden));
+}
+
+void TableWidget::updateVisibleRows() {
+  if (!_isLoaded) return;
+  const auto top = static_cast<std::size_t>(verticalScrollBar()->value());
+  const auto bottom = top + static_cast<std::size_t>(viewport()->height());
+  const std::size_t begin = std::min(_rows.rows(), top / rowHeight);
+  const std::size_t end = std::min(_rows.rows(), (bottom + rowHeight - 1) / rowHeight);
+  putAwayRowsOutside(begin, end);
+  if (!_delegate) return;
+  for (std::size_t row = begin; row < end; ++row) {
+    if (!_visible.contains(row)) showRow(row);
+  }
+}
+
+void TableWidget::showRow(std::size_t row) {
+  std::unique_ptr<TableCell> cell = _delegate->tableView_cellForRowAtIndexPath(*this, _rows.pathOf(row));
+  RowWidget& widget = rowOf(*cell);
+  widget.setRow(row);
+  widget.fitLabels();
+  placeRow(widget);
+  widget.setEmphasis({_current == row && _currentIsSelected, _current == row && _keysAreUsed && hasFocus()});
+  widget.show();
+  _visible[row] = std::move(cell);
+}
+
+void TableWidget::placeRow(RowWidget& row) const {
+  const int top = static_cast<int>(row.row()) * rowHeight - verticalScrollBar()->value();
+  row.setGeometry(0, top, viewport()->width(), rowHeight);
+}
+
+void TableWidget::putAwayRowsOutside(std::size_t begin, std::size_t end) {
+  for (auto next = _visible.begin(); next != _visible.end();) {
+    const auto current = next++;
+    if (current->first >= begin && current->first < end) continue;
+    rowOf(*current->second).hide();
+    _pool.put(std::move(_visible.extract(current).mapped()));
+  }
+}
+
+// They stay on the screen, where most rows come back to them.
+void TableWidget::putAwayAllRows() {
+  for (auto& [row, cell] : _visible) _reloaded.put(std::move(cell));
+  _visible.clear();
+}
+
+// Cells that no row has come back to go. Kept for later, they would come before the rows' own at the next
+// reload.
+void TableWidget::dropUnusedCells() { _reloaded = CellPool(); }
+
+std::unique_ptr<TableCell> TableWidget::dequeueReusableCell(std::string_view reuseIdentifier) {
+  if (auto cell = _reloaded.take(reuseIdentifier)) return cell;
+  return _pool.take(reuseIdentifier);
+}
+
+std::unique_ptr<CellView> TableWidget::makeCellView(CellStyle style) {
+  return std::make_unique<RowWidget>(style, *viewport());
+}
+
+void TableWidget::deselectRow(const IndexPath& path, Animation) {
+  if (!_current || _rows.pathOf(*_current) != path) return;
+  _currentIsSelected = false;
+  showEmphasis();
+}
+
+void TableWidget::sizeToFit() {
+  _sizesToFit = true;
+  if (_isLoaded) measureRows();
+}
+
+std::vector<RowWidget*> TableWidget::visibleRows() const {
+  std::vector<RowWidget*> rows;
+  for (const auto& [row, cell] : _visible) rows.push_back(&rowOf(*cell));
+  return rows;
+}
+
+RowWidget* TableWidget::visibleRow(std::size_t row) const {
+  const auto found = _visible.find(row);
+  return found == _visible.end() ? nullptr : &rowOf(*found->second);
+}
+
+std::optional<std::size_t> TableWidget::rowAt(const QPoint& position) const {
+  if (position.y() < 0) return std::nullopt;
+  const auto row = static_cast<std::size_t>((position.y() + verticalScrollBar()->value()) / rowHeight);
+  return row < _rows.rows() ? std::optional(row) : std::nullopt;
+}
+
+QSize TableWidget::sizeHint() const { return {320, 4 * rowHeight}; }
+
+void TableWidget::showEvent(QShowEvent* event) {
+  QAbstractScrollArea::showEvent(event);
+  if (!_isLoaded) load();
+}
+
+void TableWidget::resizeEvent(QResizeEvent* event) {
+  QAbstractScrollArea::resizeEvent(event);
+  updateScrollRange();
+  updateVisibleRows();
+  for (const auto& [row, cell] : _visible) {
+    placeRow(rowOf(*cell));
+    if (event->size().width() == event->oldSize().width()) continue;
+    cell->layOutAgain();
+    rowOf(*cell).fitLabels();
+  }
+}
+
+void TableWidget::scrollContentsBy(int, int dy) {
+  viewport()->scroll(0, dy);
+  updateVisibleRows();
+}
+
+bool TableWidget::viewportEvent(QEvent* event) {
+  return _touch.take(*event) || QAbstractScrollArea::viewportEvent(event);
+}
+
+void TableWidget::keyPressEvent(QKeyEvent* event) {
+  _keysAreUsed = true;
+  if (event->modifiers().testFlag(Qt::ShiftModifier) && scrollCurrentRowSideways(event->key())) return;
+  // Others, with their meaning for scroll bars, are for whom the table stands in.
+  if ((event->modifiers() & ~Qt::KeypadModifier) != Qt::NoModifier) return event->ignore();
+  switch (event->key()) {
+    case Qt::Key_Return:
+    case Qt::Key_Enter:
+    case Qt::Key_Space:
+    case Qt::Key_Right:
+      return chooseCurrentRow();
+    case Qt::Key_Up:
+    case Qt::Key_Down:
+    case Qt::Key_PageUp:
+    case Qt::Key_PageDown:
+    case Qt::Key_Home:
+    case Qt::Key_End:
+      return moveTo(rowThatKeyLeadsTo(event->key()));
+    default:
+      event->ignore();
+  }
+}
+
+std::optional<std::size_t> TableWidget::rowThatKeyLeadsTo(int key) const {
+  if (_rows.rows() == 0) return std::nullopt;
+  const std::size_t last = _rows.rows() - 1;
+  if (key == Qt::Key_Home) return 0;
+  if (key == Qt::Key_End) return last;
+  if (!_current) return std::min(last, firstWhollyVisibleRow());
+  const std::size_t step = key == Qt::Key_PageUp || key == Qt::Key_PageDown ? rowsOnScreen() : 1;
+  const bool isUpward = key == Qt::Key_Up || key == Qt::Key_PageUp;
+  return isUpward ? *_current - std::min(*_current, step) : std::min(last, *_current + step);
+}
+
+void TableWidget::moveTo(std::optional<std::size_t> row) {
+  if (!row) return;
+  makeCurrent(*row);
+  scrollToRow(*row);
+}
+
+std::size_t TableWidget::firstWhollyVisibleRow() const {
+  return static_cast<std::size_t>((verticalScrollBar()->value() + rowHeight - 1) / rowHeight);
+}
+
+std::size_t TableWidget::rowsOnScreen() const {
+  return static_cast<std::size_t>(std::max(1, viewport()->height() / rowHeight));
+}
+
+void TableWidget::scrollToRow(std::size_t row) {
+  const int top = static_cast<int>(row) * rowHeight;
+  QScrollBar& bar = *verticalScrollBar();
+  if (top < bar.value()) bar.setValue(top);
+  if (top + rowHeight > bar.value() + viewport()->height())
+    bar.setValue(top + rowHeight - viewport()->height());
+}
+
+bool TableWidget::scrollCurrentRowSideways(int key) {
+  if (key != Qt::Key_Left && key != Qt::Key_Right) return false;
+  if (RowWidget* row = _current ? visibleRow(*_current) : nullptr)
+    row->scrollSidewaysTo(row->sidewaysPosition() + (key == Qt::Key_Right ? sidewaysStep : -sidewaysStep));
+  return true;
+}
+
+void TableWidget::chooseCurrentRow() {
+  if (_current) chooseRow(*_current);
+}
+
+void TableWidget::makeCurrent(std::size_t row) {
+  _current = row;
+  _currentIsSelected = true;
+  showEmphasis();
+  RowWidget* widget = visibleRow(row);
+  if (!widget || !hasFocus()) return;
+  QAccessibleEvent focus(widget, QAccessible::Focus);
+  QAccessible::updateAccessibility(&focus);
+}
+
+void TableWidget::chooseRow(std::size_t row) {
+  makeCurrent(row);
+  if (_delegate) _delegate->tableView_didSelectRowAtIndexPath(*this, _rows.pathOf(row));
+}
+
+void TableWidget::showEmphasis() {
+  for (RowWidget* row : visibleRows()) {
+    const bool isCurrent = _current == row->row();
+    row->setEmphasis({isCurrent && _currentIsSelected, isCurrent && _keysAreUsed && hasFocus()});
+  }
+}
+
+void TableWidget::mousePressEvent(QMouseEvent* event) {
+  if (event->button() != Qt::LeftButton) return event->ignore();
+  _keysAreUsed = false;
+  _pressed = rowAt(event->position().toPoint());
+}
+
+void TableWidget::mouseReleaseEvent(QMouseEvent* event) {
+  if (event->button() != Qt::LeftButton) return event->ignore();
+  const auto pressed = std::exchange(_pressed, std::nullopt);
+  if (pressed && pressed == rowAt(event->position().toPoint())) chooseRow(*pressed);
+}
+
+void TableWidget::wheelEvent(QWheelEvent* event) {
+  const double movement = sidewaysMovement(*event);
+  if (movement == 0) return QAbstractScrollArea::wheelEvent(event);
+  const auto row = rowAt(event->position().toPoint());
+  if (RowWidget* widget = row ? visibleRow(*row) : nullptr)
+    widget->scrollSidewaysTo(widget->sidewaysPosition() - movement);
+  event->accept();
+}
+
+void TableWidget::focusInEvent(QFocusEvent* event) {
+  if (event->reason() == Qt::TabFocusReason || event->reason() == Qt::BacktabFocusReason) _keysAreUsed = true;
+  QAbstractScrollArea::focusInEvent(event);
+  showEmphasis();
+}
+
+void TableWidget::focusOutEvent(QFocusEvent* event) {
+  QAbstractScrollArea::focusOutEvent(event);
+  showEmphasis();
+}
+
+}  // namespace varnel

@@ -1,0 +1,136 @@
+#include "widgets/ToolbarWidget.h"
+
+#include <QLabel>
+#include <QPainter>
+#include <algorithm>
+#include <utility>
+
+#include "widgets/Colours.h"
+#include "widgets/QtValues.h"
+#include "widgets/SpinnerWidget.h"
+#include "widgets/TextButton.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr int barHeight = 48;
+constexpr int inset = 10;
+
+QLabel* makeLabel() {
+  auto* label = new QLabel;
+  label->setTextFormat(Qt::PlainText);
+  // A window that is narrower than the text may be.
+  label->setMinimumWidth(1);
+  return label;
+}
+
+// The widget of an item; null for a space.
+QWidget* makeWidget(const ToolbarItem& item) {
+  if (std::holds_alternative<ActivityIndicator>(item)) return new SpinnerWidget;
+  if (std::holds_alternative<ToolbarLabel>(item)) return makeLabel();
+  if (std::holds_alternative<BarButton>(item)) return new TextButton;
+  return nullptr;
+}
+
+QString titleOf(BarButton::SystemItem item) {
+  switch (item) {
+    case BarButton::SystemItem::Save:
+      return QStringLiteral("Save");
+  }
+  return {};
+}
+
+void display(const ActivityIndicator& indicator, QWidget& widget) {
+  static_cast<SpinnerWidget&>(widget).setAnimating(indicator.isAnimating);
+}
+
+void display(const ToolbarLabel& label, QWidget& widget) {
+  auto& shown = static_cast<QLabel&>(widget);
+  const QFont font = qtFont(label.font);
+  if (shown.font() != font) shown.setFont(font);
+  shown.setText(singleLine(label.text));
+}
+
+void display(const BarButton& button, QWidget& widget) {
+  static_cast<TextButton&>(widget).setText(titleOf(button.item));
+}
+
+void display(const FlexibleSpace&, QWidget&) {}
+
+}  // namespace
+
+ToolbarWidget::ToolbarWidget(QWidget* parent) : QWidget(parent), _row(this) {
+  setFixedHeight(barHeight);
+  _row.setContentsMargins(inset, 0, 0, 0);
+  _row.setSpacing(inset);
+}
+
+void ToolbarWidget::setItems(std::vector<ToolbarItem> items) {
+  const bool isSame = hasSameKinds(items);
+  // Kept until the end: the action that runs may be one of those that go.
+  const auto former = std::exchange(_items, std::move(items));
+  if (!isSame) rebuild(_items);
+  for (std::size_t index = 0; index < _items.size(); ++index) showItem(index);
+}
+
+bool ToolbarWidget::hasSameKinds(const std::vector<ToolbarItem>& items) const {
+  return std::ranges::equal(items, _items, [](const ToolbarItem& one, const ToolbarItem& other) {
+    return one.index() == other.index();
+  });
+}
+
+void ToolbarWidget::rebuild(const std::vector<ToolbarItem>& items) {
+  for (QWidget* widget : _widgets) {
+    if (!widget) continue;
+    widget->hide();
+    widget->deleteLater();
+  }
+  _widgets.clear();
+  while (QLayoutItem* placed = _row.takeAt(0)) delete placed;
+  for (std::size_t index = 0; index < items.size(); ++index) {
+    QWidget* widget = _widgets.emplace_back(makeWidget(items[index]));
+    if (!widget) {
+      _row.addStretch(1);
+      continue;
+    }
+    _row.addWidget(widget);
+    if (auto* button = dynamic_cast<QAbstractButton*>(widget))
+      connect(button, &QAbstractButton::clicked, this, [this, index] { perform(index); });
+  }
+}
+
+void ToolbarWidget::showItem(std::size_t index) {
+  if (!_widgets[index]) return;
+  std::visit([&](const auto& item) { display(item, *_widgets[index]); }, _items[index]);
+}
+
+void ToolbarWidget::perform(std::size_t index) {
+  const auto* button = std::get_if<BarButton>(&_items[index]);
+  if (!button) return;
+  // A copy: the action may set other items.
+  if (const auto action = button->action) action();
+}
+
+bool ToolbarWidget::press(BarButton::SystemItem item) {
+  for (std::size_t index = 0; index < _items.size(); ++index) {
+    const auto* button = std::get_if<BarButton>(&_items[index]);
+    if (!button || button->item != item) continue;
+    perform(index);
+    return true;
+  }
+  return false;
+}
+
+void ToolbarWidget::fallSilent() {
+  for (ToolbarItem& item : _items) {
+    if (auto* button = std::get_if<BarButton>(&item)) button->action = nullptr;
+  }
+}
+
+void ToolbarWidget::paintEvent(QPaintEvent*) {
+  QPainter painter(this);
+  painter.fillRect(QRectF(0, 0, width(), 1 / devicePixelRatioF()), separatorColour(palette()));
+}
+
+}  // namespace varnel

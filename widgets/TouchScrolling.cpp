@@ -1,0 +1,104 @@
+#include "widgets/TouchScrolling.h"
+
+#include <QApplication>
+#include <QScrollBar>
+#include <QScrollEvent>
+#include <QScrollPrepareEvent>
+#include <QScroller>
+#include <QTouchEvent>
+#include <utility>
+
+namespace varnel {
+
+namespace {
+
+// A finger that moves mostly along one axis moves along that one only.
+constexpr double axisLock = 0.75;
+
+// The scroller hears of the finger from here: the gesture recogniser that the toolkit would set up for each
+// table is never freed.
+void tell(QWidget& viewport, QScroller::Input input, const QTouchEvent& event) {
+  if (event.points().isEmpty()) return;
+  const auto time_ms = static_cast<qint64>(event.timestamp());
+  QScroller::scroller(&viewport)->handleInput(input, event.points().front().position(), time_ms);
+}
+
+void setUp(QScroller& scroller) {
+  QScrollerProperties properties = scroller.scrollerProperties();
+  properties.setScrollMetric(QScrollerProperties::AxisLockThreshold, axisLock);
+  const auto never = QVariant::fromValue(QScrollerProperties::OvershootAlwaysOff);
+  properties.setScrollMetric(QScrollerProperties::HorizontalOvershootPolicy, never);
+  properties.setScrollMetric(QScrollerProperties::VerticalOvershootPolicy, never);
+  scroller.setScrollerProperties(properties);
+}
+
+}  // namespace
+
+TouchScrolling::TouchScrolling(QAbstractScrollArea& area, RowAt rowAt, Tapped tapped)
+    : _area(area), _rowAt(std::move(rowAt)), _tapped(std::move(tapped)) {
+  _area.viewport()->setAttribute(Qt::WA_AcceptTouchEvents);
+  setUp(*QScroller::scroller(_area.viewport()));
+}
+
+bool TouchScrolling::take(QEvent& event) {
+  switch (event.type()) {
+    case QEvent::ScrollPrepare:
+      prepare(static_cast<QScrollPrepareEvent&>(event));
+      return true;
+    case QEvent::Scroll:
+      scroll(static_cast<QScrollEvent&>(event));
+      return true;
+    case QEvent::TouchBegin:
+      begin(static_cast<QTouchEvent&>(event));
+      return true;
+    case QEvent::TouchEnd:
+      end(static_cast<QTouchEvent&>(event));
+      return true;
+    case QEvent::TouchUpdate:
+      event.accept();
+      tell(*_area.viewport(), QScroller::InputMove, static_cast<QTouchEvent&>(event));
+      return true;
+    case QEvent::TouchCancel:
+      event.accept();
+      _tapBegan.reset();
+      QScroller::scroller(_area.viewport())->stop();
+      return true;
+    default:
+      return false;
+  }
+}
+
+void TouchScrolling::prepare(QScrollPrepareEvent& event) {
+  _row = _rowAt(event.startPos().toPoint());
+  const QScrollBar& bar = *_area.verticalScrollBar();
+  event.setViewportSize(_area.viewport()->size());
+  event.setContentPosRange({0, 0, _row ? _row->sidewaysRange() : 0, static_cast<double>(bar.maximum())});
+  event.setContentPos({_row ? _row->sidewaysPosition() : 0, static_cast<double>(bar.value())});
+  event.accept();
+}
+
+void TouchScrolling::scroll(QScrollEvent& event) {
+  _area.verticalScrollBar()->setValue(qRound(event.contentPos().y()));
+  if (_row) _row->scrollSidewaysTo(event.contentPos().x());
+  event.accept();
+}
+
+void TouchScrolling::begin(QTouchEvent& event) {
+  // Accepted: no mouse is made of it.
+  event.accept();
+  const bool stopsMovement = QScroller::scroller(_area.viewport())->state() == QScroller::Scrolling;
+  _tapBegan.reset();
+  if (!stopsMovement && event.points().size() == 1) _tapBegan = event.points().front().position();
+  tell(*_area.viewport(), QScroller::InputPress, event);
+}
+
+void TouchScrolling::end(QTouchEvent& event) {
+  event.accept();
+  tell(*_area.viewport(), QScroller::InputRelease, event);
+  const auto began = std::exchange(_tapBegan, std::nullopt);
+  if (!began || event.points().isEmpty()) return;
+  const QPointF movement = event.points().front().position() - *began;
+  if (movement.manhattanLength() < QApplication::startDragDistance()) _tapped(began->toPoint());
+}
+
+}  // namespace varnel

@@ -1,0 +1,68 @@
+#include "widgets/WidgetApplication.h"
+
+#include <pthread.h>
+
+#include <QIcon>
+#include <cerrno>
+#include <clocale>
+#include <csignal>
+#include <cstdlib>
+#include <iostream>
+#include <stdexcept>
+
+#include "host/SessionBus.h"
+#include "widgets/Display.h"
+
+namespace varnel {
+
+namespace {
+
+// While the application object is made. Without it the toolkit would say several lines and abort.
+void endInsteadOfAborting(QtMsgType type, const QMessageLogContext&, const QString&) {
+  if (type != QtFatalMsg) return;
+  std::cerr << program_invocation_short_name << ": cannot open a window on " << wantedDisplay()
+            << "; --ui text needs no display\n";
+  std::_Exit(EXIT_FAILURE);
+}
+
+std::unique_ptr<QApplication> makeApplication(int& argumentCount, char** arguments) {
+  if (wantedDisplay().empty())
+    throw std::runtime_error(
+        "there is no display (neither WAYLAND_DISPLAY nor DISPLAY is set); --ui text needs none");
+  if (!displayIsThere())
+    throw std::runtime_error("cannot reach " + wantedDisplay() + "; --ui text needs no display");
+  const QtMessageHandler formerHandler = qInstallMessageHandler(endInsteadOfAborting);
+  // The toolkit's threads are to leave signals to this one.
+  sigset_t everySignal;
+  sigset_t formerMask;
+  ::sigfillset(&everySignal);
+  ::pthread_sigmask(SIG_SETMASK, &everySignal, &formerMask);
+  auto application = std::make_unique<QApplication>(argumentCount, arguments);
+  ::pthread_sigmask(SIG_SETMASK, &formerMask, nullptr);
+  qInstallMessageHandler(formerHandler);
+  return application;
+}
+
+}  // namespace
+
+WidgetApplication::WidgetApplication(int& argumentCount, char** arguments)
+    : _application(makeApplication(argumentCount, arguments)) {
+  std::setlocale(LC_NUMERIC, "C");  // the application object has set the user's locale
+  QApplication::setQuitOnLastWindowClosed(false);
+  if (const auto bus = sessionBusAddress()) _colours = std::make_unique<DesktopColours>(*bus);
+  QApplication::setApplicationDisplayName(QStringLiteral("Varnel"));
+  // By its identity a desktop finds the menu entry and the icon that were installed.
+  const QString applicationID = QStringLiteral("org.varnel.Varnel");
+  QGuiApplication::setDesktopFileName(applicationID);
+  QApplication::setWindowIcon(QIcon::fromTheme(applicationID));
+}
+
+int WidgetApplication::run() { return QApplication::exec(); }
+
+void WidgetApplication::end(int exitStatus) {
+  // Queued: an end that is asked for before the event loop runs counts as well.
+  QMetaObject::invokeMethod(
+      _application.get(), [exitStatus] { QApplication::exit(exitStatus); }, Qt::QueuedConnection);
+}
+
+}  // namespace varnel

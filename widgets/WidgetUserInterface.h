@@ -1,0 +1,35 @@
+#pragma once
+
+#include <QPointer>
+
+#include "platform/ui/UserInterface.h"
+#include "widgets/FontMetrics.h"
+#include "widgets/WindowWidget.h"
+
+namespace varnel {
+
+/// The user interface on Qt 6 Widgets. It needs a `WidgetApplication`.
+class WidgetUserInterface final : public UserInterface {
+ public:
+  /// The wishes are those of every window that it makes.
+  explicit WidgetUserInterface(WindowWidget::Wishes wishes);
+
+  Rect screenBounds() const override;
+  Rect applicationFrame() const override;
+  const TextMetrics& textMetrics() const override { return _textMetrics; }
+
+  std::unique_ptr<Window> makeWindow(const Rect& frame) override;
+  std::unique_ptr<TablePane> makeTablePane() override;
+  std::unique_ptr<NavigationStack> makeNavigationStack(std::shared_ptr<PaneController> root) override;
+  std::unique_ptr<ModalScreen> makeModalScreen(const ScreenLayout& layout,
+                                               ModalScreen::Actions actions) override;
+  /// Shows nothing while there is no window.
+  void showAlert(const Alert& alert) override;
+
+ private:
+  WindowWidget::Wishes _wishes;
+  FontMetrics _textMetrics;
+  QPointer<WindowWidget> _window;  // the one made last
+};
+
+}  // namespace varnel
