@@ -2,6 +2,8 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <stdexcept>
+#include <system_error>
 
 #include "base/PropertyList.h"
 #include "host/WholeFile.h"
@@ -13,6 +15,7 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr std::string_view extension = ".plist";
+constexpr const char* folderVariable = "VARNEL_RESOURCES";
 
 bool isWithin(const fs::path& path, const fs::path& folder) {
   return std::ranges::mismatch(folder, path).in1 == folder.end();
@@ -55,10 +58,21 @@ std::vector<std::string> FileResources::propertyListPaths() const {
 }
 
 fs::path resourceFolder() {
-  if (const char* const folder = std::getenv("VARNEL_RESOURCES")) return folder;
+  if (const char* const folder = std::getenv(folderVariable); folder && *folder != '\0') return folder;
   const fs::path program = fs::read_symlink("/proc/self/exe");
   if (isWithin(program, fs::weakly_canonical(VARNEL_BUILD_FOLDER))) return VARNEL_SOURCE_RESOURCES;
   return (program.parent_path() / VARNEL_INSTALLED_RESOURCES).lexically_normal();
+}
+
+fs::path readableResourceFolder() {
+  fs::path folder = resourceFolder();
+  std::error_code failure;
+  const fs::directory_iterator reading(folder, failure);
+  if (failure) {
+    throw std::runtime_error("cannot read the resource folder " + folder.string() + ": " + failure.message() +
+                             "; let " + folderVariable + " name the one that has LTE.plist in it");
+  }
+  return folder;
 }
 
 }  // namespace varnel

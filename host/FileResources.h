@@ -22,6 +22,11 @@ class FileResources final : public Resources {
 
 /// Where the application's resources are: the folder that $VARNEL_RESOURCES names; else, for a program that
 /// runs from the build tree, the source tree's; else those of the installation that the program is part of.
+/// An empty $VARNEL_RESOURCES names none.
 std::filesystem::path resourceFolder();
+
+/// The same for programs, which show nothing without it. Throws std::runtime_error, with what to do about it,
+/// when the folder is missing or cannot be read.
+std::filesystem::path readableResourceFolder();
 
 }  // namespace varnel

@@ -12,7 +12,7 @@ HostServices::HostServices(const Options& options, const ApplicationInfo& applic
       _folder(runtimeFolder(options.runtimeFolder)),
       _ports(_folder),
       _telephony(_folder),
-      _resources(resourceFolder()),
+      _resources(readableResourceFolder()),
       _files(options.deviceRoot),
       _preferences(options.deviceRoot),
       _application(application) {}

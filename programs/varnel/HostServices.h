@@ -17,7 +17,7 @@ namespace varnel {
 class HostServices final {
  public:
   /// The application information outlives it. Throws std::runtime_error when the runtime folder cannot be
-  /// used.
+  /// used or the resources cannot be read.
   HostServices(const Options& options, const ApplicationInfo& application);
 
   ModelServices model();

@@ -12,7 +12,10 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       "\n"
       "In the window: arrow keys, Return to open, Escape to go back, Shift and Left or Right\n"
       "for long values, Ctrl+S to save a snapshot, Ctrl+R to start over, Ctrl+Q to end.\n"
-      "In a terminal: S to save a snapshot, R to start over, Q to end.");
+      "In a terminal: S to save a snapshot, R to start over, Q to end.\n"
+      "\n"
+      "VARNEL_RESOURCES in the environment names the folder of the display templates and the\n"
+      "screen layout, if not the installed one.");
   parser.set_version_flag("--version",
                           programName + std::string(" ") + application.version.value_or("(none)"));
   parser

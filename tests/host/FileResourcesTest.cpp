@@ -89,5 +89,31 @@ TEST(ResourceFolder, IsWhatTheEnvironmentNames) {
   ::unsetenv("VARNEL_RESOURCES");
 }
 
+TEST(ResourceFolder, AnEmptyNameIsNone) {
+  ::setenv("VARNEL_RESOURCES", "", 1);
+  EXPECT_THAT(FileResources(resourceFolder()).propertyListPaths(), Contains("LTE.plist"));
+  ::unsetenv("VARNEL_RESOURCES");
+}
+
+TEST(ResourceFolder, AMissingOneIsAnErrorThatNamesItAndTheWayOut) {
+  ::setenv("VARNEL_RESOURCES", "/some/where", 1);
+  try {
+    readableResourceFolder();
+    ADD_FAILURE() << "no error";
+  } catch (const std::runtime_error& error) {
+    EXPECT_STREQ(error.what(),
+                 "cannot read the resource folder /some/where: No such file or directory; let "
+                 "VARNEL_RESOURCES name the one that has LTE.plist in it");
+  }
+  ::unsetenv("VARNEL_RESOURCES");
+}
+
+TEST(ResourceFolder, OneThatIsThereIsPassedOn) {
+  const TemporaryFolder folder;
+  ::setenv("VARNEL_RESOURCES", folder.path().c_str(), 1);
+  EXPECT_EQ(readableResourceFolder(), folder.path());
+  ::unsetenv("VARNEL_RESOURCES");
+}
+
 }  // namespace
 }  // namespace varnel

@@ -39,13 +39,15 @@ class EndToEnd : public testing::Test {
 
   // A viewer that is asked for a window, where the environment names no display but that one.
   std::unique_ptr<Process> window(std::vector<std::string> more, const std::string& display,
-                                  const std::string& userInterface = "window") {
+                                  const std::string& userInterface = "window",
+                                  const std::vector<std::string>& environment = {}) {
     std::vector<std::string> arguments{"--ui",          userInterface,  "--runtime-dir", _runtime.path(),
                                        "--device-root", _device.path(), "--log-level",   "3"};
     arguments.insert(arguments.end(), more.begin(), more.end());
-    return std::make_unique<Process>(VARNEL_PROGRAM, arguments,
-                                     std::vector<std::string>{"QT_QPA_PLATFORM", "WAYLAND_DISPLAY", "DISPLAY",
-                                                              "DBUS_SESSION_BUS_ADDRESS", display});
+    std::vector<std::string> whole{"QT_QPA_PLATFORM", "WAYLAND_DISPLAY", "DISPLAY",
+                                   "DBUS_SESSION_BUS_ADDRESS", display};
+    whole.insert(whole.end(), environment.begin(), environment.end());
+    return std::make_unique<Process>(VARNEL_PROGRAM, arguments, whole);
   }
   std::string preference() const {
     return contentsOf(_device.path() / "var/mobile/Library/Preferences/com.orvane.dockhall.plist");
@@ -215,6 +217,17 @@ TEST_F(EndToEnd, AutoIsTextWithoutADisplayAndTheWindowWithOne) {
   ASSERT_TRUE(shown->waitForEnd());
   EXPECT_THAT(shown->output(), Not(HasSubstr("Connecting")));
   EXPECT_EQ(shown->exitStatus(), 0) << shown->error();
+}
+
+TEST_F(EndToEnd, AMissingResourceFolderIsOneLineAndStatusOne) {
+  for (const std::string kind : {"text", "window"}) {
+    const auto varnel = window({}, "QT_QPA_PLATFORM=offscreen", kind, {"VARNEL_RESOURCES=/some/where"});
+    ASSERT_TRUE(varnel->waitForEnd());
+    EXPECT_EQ(varnel->exitStatus(), 1) << varnel->error();
+    EXPECT_EQ(varnel->output(), "");
+    EXPECT_EQ(occurrences(varnel->error(), "\n"), 1u) << varnel->error();
+    EXPECT_THAT(varnel->error(), HasSubstr("/some/where"));
+  }
 }
 
 TEST_F(EndToEnd, AWrongOptionIsOneLineAndStatusTwo) {
