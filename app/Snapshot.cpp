@@ -18,12 +18,12 @@ Value snapshotContents(Time created, const Value& saveContents,
   return contents;
 }
 
-bool writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& contents) {
+FileWriting writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& contents) {
   const std::string path =
       std::string(snapshotFolder) + "/VarnelSnapshot-" + std::to_string(clock.now().seconds) + ".varnel";
-  if (files.writePropertyList(contents, path)) return true;
-  logError("Unable to write snapshot to %s", path);
-  return false;
+  FileWriting writing = files.writePropertyList(contents, path);
+  if (!writing.isDone()) logError("Unable to write snapshot to %s", path);
+  return writing;
 }
 
 void saveSnapshotWithoutDescription(DeviceFiles& files, const Clock& clock, const Value& saveContents) {

@@ -19,9 +19,9 @@ inline constexpr std::string_view internalDeviceMarker =
 Value snapshotContents(Time created, const Value& saveContents,
                        const std::optional<std::string>& description);
 
-/// Writes the snapshot file of that moment into the device's folder of diagnostic logs. False, and a line in
-/// the log, when that fails.
-bool writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& contents);
+/// Writes the snapshot file of that moment into the device's folder of diagnostic logs; one of the same
+/// second takes its place. A failure is also a line in the log.
+FileWriting writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& contents);
 
 /// Writes these save contents at once with an empty description, where the device allows snapshots; elsewhere
 /// a line in the log says why not.

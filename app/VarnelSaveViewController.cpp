@@ -70,7 +70,7 @@ void VarnelSaveViewController::viewWillAppear(Animation) {
 void VarnelSaveViewController::savePressed() {
   const auto description = _saveDescription ? _saveDescription->text() : std::nullopt;
   const Value contents = snapshotContents(_timeStamp, _saveHistory, description);
-  if (!writeSnapshot(_host.files, _host.clock, contents))
+  if (!writeSnapshot(_host.files, _host.clock, contents).isDone())
     _host.userInterface.showAlert({"File Error", "Unable to write file to disk", "Close"});
   _host.saveControl.closeSaveViewLater();
 }

@@ -1,5 +1,8 @@
 #include "host/RootedFiles.h"
 
+#include <cerrno>
+#include <system_error>
+
 #include "base/PropertyList.h"
 #include "host/PrivateFile.h"
 
@@ -10,9 +13,15 @@ bool RootedFiles::exists(const std::string& path) const {
   return std::filesystem::exists(below(path), ignored);
 }
 
-bool RootedFiles::writePropertyList(const Value& list, const std::string& path) {
+FileWriting RootedFiles::writePropertyList(const Value& list, const std::string& path) {
+  const std::filesystem::path place = below(path);
   const auto bytes = writeXmlPropertyList(list);
-  return bytes && writePrivateFile(below(path), *bytes);
+  if (!bytes) return {.place = place, .failure = "it has no property-list form"};
+  std::error_code ignored;
+  const bool isThere = std::filesystem::exists(place, ignored);
+  if (!writePrivateFile(place, *bytes))
+    return {.place = place, .failure = std::generic_category().message(errno)};
+  return {.place = place, .failure = {}, .hasReplaced = isThere};
 }
 
 std::filesystem::path RootedFiles::below(const std::string& path) const {

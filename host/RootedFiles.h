@@ -13,7 +13,7 @@ class RootedFiles final : public DeviceFiles {
 
   bool exists(const std::string& path) const override;
   /// A new file is for its owner alone (mode 0600).
-  bool writePropertyList(const Value& list, const std::string& path) override;
+  FileWriting writePropertyList(const Value& list, const std::string& path) override;
 
  private:
   std::filesystem::path below(const std::string& path) const;

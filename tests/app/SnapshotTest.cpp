@@ -72,7 +72,7 @@ TEST(Snapshot, WithoutADescriptionThereIsNone) {
 class SnapshotFile : public testing::Test {
  protected:
   SnapshotFile() { clock.set(friday); }
-  bool write() { return writeSnapshot(files, clock, contents); }
+  FileWriting write() { return writeSnapshot(files, clock, contents); }
 
   RecordingLog log;
   FakeClock clock;
@@ -81,7 +81,7 @@ class SnapshotFile : public testing::Test {
 };
 
 TEST_F(SnapshotFile, IsNamedByTheWholeSecondsOfTheMomentOfWriting) {
-  EXPECT_TRUE(write());
+  EXPECT_TRUE(write().isDone());
   ASSERT_EQ(files.writes.size(), 1u);
   EXPECT_EQ(files.writes[0].path, "/var/mobile/Library/Logs/CrashReporter/VarnelSnapshot-1709301909.varnel");
 }
@@ -107,7 +107,7 @@ TEST_F(SnapshotFile, ThatIsWrittenNeedsNoLine) {
 
 TEST_F(SnapshotFile, ThatCannotBeWrittenIsLoggedWithItsPath) {
   files.refusesWrites = true;
-  EXPECT_FALSE(write());
+  EXPECT_EQ(write().failure, "No space left on device");
   const auto lines = log.take();
   ASSERT_EQ(lines.size(), 1u);
   EXPECT_EQ(lines[0].priority, 3);

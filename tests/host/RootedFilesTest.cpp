@@ -34,7 +34,7 @@ TEST_F(RootedFilesTest, WhatStandsOnThisMachineDoesNotCount) { EXPECT_FALSE(file
 
 TEST_F(RootedFilesTest, APropertyListIsWrittenAsXmlUnderTheRootForItsOwnerAlone) {
   fs::create_directories(root.path() / "logs");
-  ASSERT_TRUE(files.writePropertyList(list, "/logs/a.varnel"));
+  ASSERT_TRUE(files.writePropertyList(list, "/logs/a.varnel").isDone());
   EXPECT_THAT(contentsOf(root.file("logs/a.varnel")),
               HasSubstr("<key>Description</key>\n\t<string>in the lift</string>"));
   EXPECT_EQ(fs::status(root.file("logs/a.varnel")).permissions(), fs::perms(0600));
@@ -42,22 +42,29 @@ TEST_F(RootedFilesTest, APropertyListIsWrittenAsXmlUnderTheRootForItsOwnerAlone)
 
 TEST_F(RootedFilesTest, ALaterListTakesThePlaceOfTheWholeFile) {
   std::ofstream(root.file("a.varnel")) << std::string(10000, 'x');
-  ASSERT_TRUE(files.writePropertyList(list, "/a.varnel"));
+  ASSERT_TRUE(files.writePropertyList(list, "/a.varnel").isDone());
   EXPECT_EQ(contentsOf(root.file("a.varnel")).find('x', 200), std::string::npos);
 }
 
+TEST_F(RootedFilesTest, WhereTheFileIsOnThisMachineIsToldAndWhetherItTookTheNameOfAnother) {
+  const FileWriting first = files.writePropertyList(list, "/a.varnel");
+  EXPECT_EQ(first.place, root.file("a.varnel"));
+  EXPECT_FALSE(first.hasReplaced);
+  EXPECT_TRUE(files.writePropertyList(list, "/a.varnel").hasReplaced);
+}
+
 TEST_F(RootedFilesTest, NoFolderIsMade) {
-  EXPECT_FALSE(files.writePropertyList(list, "/missing/a.varnel"));
+  EXPECT_EQ(files.writePropertyList(list, "/missing/a.varnel").failure, "No such file or directory");
   EXPECT_FALSE(fs::exists(root.path() / "missing"));
 }
 
 TEST(RootedFilesOfTheWholeMachine, AFolderThatTakesNoFilesIsAnError) {
   // Nobody, not even root, makes a file there.
-  EXPECT_FALSE(RootedFiles("/proc").writePropertyList(Value::ofDictionary(), "/a.varnel"));
+  EXPECT_FALSE(RootedFiles("/proc").writePropertyList(Value::ofDictionary(), "/a.varnel").isDone());
 }
 
 TEST_F(RootedFilesTest, WhatHasNoPropertyListFormIsNotWritten) {
-  EXPECT_FALSE(files.writePropertyList(Value(), "/a.varnel"));
+  EXPECT_FALSE(files.writePropertyList(Value(), "/a.varnel").isDone());
   EXPECT_FALSE(fs::exists(root.path() / "a.varnel"));
 }
 

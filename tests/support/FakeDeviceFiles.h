@@ -23,9 +23,11 @@ class FakeDeviceFiles final : public DeviceFiles {
   std::vector<Write> writes;
 
   bool exists(const std::string& path) const override { return existing.contains(path); }
-  bool writePropertyList(const Value& list, const std::string& path) override {
+  FileWriting writePropertyList(const Value& list, const std::string& path) override {
     writes.push_back({path, list});
-    return !refusesWrites;
+    if (refusesWrites) return {.place = path, .failure = "No space left on device"};
+    const bool isThere = !existing.insert(path).second;
+    return {.place = path, .failure = {}, .hasReplaced = isThere};
   }
 };
 
