@@ -15,6 +15,7 @@ namespace varnel {
 
 class Base;
 class CodeDictionary;
+class SectionFormats;
 
 /// Section name → the decoder that owns that section.
 using ClassDictionary = std::map<std::string_view, Base*>;
@@ -42,6 +43,8 @@ class Base {
   virtual std::vector<std::uint32_t> getLogCodeArray() const = 0;
   /// The shortest packet of that log code, header included, that the decoder does not drop unread.
   virtual std::size_t minimumLength(std::uint32_t /*logCode*/) const { return 0; }
+  /// Tells how the section's entries write numbers that have a unit or other texts around them.
+  virtual void listNumberFormats(SectionFormats& /*formats*/) const {}
   /// Decodes one whole packet, header included, into the section.
   virtual void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) = 0;
 

@@ -30,6 +30,13 @@ Base* ClassIndex::getClass(std::string_view sectionName) const {
   return found == classDict.end() ? nullptr : found->second;
 }
 
+void ClassIndex::listNumberFormats(NumberFormats& formats) const {
+  for (const auto& [sectionName, decoder] : classDict) {
+    SectionFormats section(formats, sectionName);
+    decoder->listNumberFormats(section);
+  }
+}
+
 void ClassIndex::status() const {
   // The class dictionary has been a dictionary, and no string, ever since the compiler knows its type.
   logWarning("Dictionary = %d", 1);

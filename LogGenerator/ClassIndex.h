@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "LogGenerator/Base.h"
+#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -44,6 +45,8 @@ class ClassIndex {
   std::span<Base* const> getSubscribers(std::uint32_t code) const { return codeDictionary.subscribers(code); }
   /// Every subscribed code as decimal text.
   std::vector<std::string> getAllLogCodes() const { return codeDictionary.keys(); }
+  /// How the sections of all decoders write numbers.
+  void listNumberFormats(NumberFormats& formats) const;
   /// A debugging aid: logs what kind of object the class dictionary is.
   void status() const;
 

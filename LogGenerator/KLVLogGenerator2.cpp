@@ -74,6 +74,12 @@ MessageFate KLVLogGenerator2::fateOf(ByteView message) const {
   return {isTaken ? Decoded : TooShort, logCode};
 }
 
+NumberFormats KLVLogGenerator2::numberFormats() const {
+  NumberFormats formats;
+  if (cIndex) cIndex->listNumberFormats(formats);
+  return formats;
+}
+
 Value KLVLogGenerator2::getDisplayFromState(Dictionary& state) {
   if (const Value& display = state.get(stateKey::display); !display.isAbsent()) return display;
   Value displayTemplate = state.get(stateKey::displayTemplate);

@@ -20,6 +20,7 @@ class KLVLogGenerator2 : public KLVLogGenerator {
   Value generateLogUsingState(Dictionary& state) override;
   Value getStartCommand() const override;
   MessageFate fateOf(ByteView message) const override;
+  NumberFormats numberFormats() const override;
 
  protected:
   /// Takes ownership of both. A generator without a template resource has neither: it decodes nothing.

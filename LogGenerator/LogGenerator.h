@@ -4,6 +4,7 @@
 #include <string_view>
 
 #include "LogGenerator/MessageFate.h"
+#include "LogGenerator/NumberFormats.h"
 #include "LogGenerator/Services.h"
 #include "base/Bytes.h"
 #include "base/Dictionary.h"
@@ -46,6 +47,9 @@ class LogGenerator {
   /// What becomes of a message, which is not decoded for that; for those who count messages. Without packets,
   /// as here, all are decoded and none has a log code.
   virtual MessageFate fateOf(ByteView /*message*/) const { return {MessageFate::Outcome::Decoded}; }
+  /// How the display writes its numbers; for those who want them without their units. Without packets, as
+  /// here, nothing is known of units.
+  virtual NumberFormats numberFormats() const { return {}; }
 
  protected:
   /// Appends a snapshot record to the state's "History", which keeps the newest five.

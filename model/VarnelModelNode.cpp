@@ -6,24 +6,17 @@
 #include <utility>
 
 #include "LogGenerator/ArrayLock.h"
+#include "LogGenerator/SortedKey.h"
 #include "base/Dictionary.h"
 
 namespace varnel {
 
 namespace {
 
-constexpr std::string_view sortMark = "_sorted";
 constexpr std::string_view unknownValue = "(unknown)";
 
 using Node = std::shared_ptr<const VarnelModelNode>;
 using Children = VarnelModelNode::Children;
-
-// In a sorted dictionary "order;name" is shown as the name; a key with no ";" or with several is shown whole.
-std::string_view displayNameOfSortedKey(std::string_view key) {
-  const std::size_t semicolon = key.find(';');
-  const bool hasTwoParts = semicolon != std::string_view::npos && semicolon == key.rfind(';');
-  return hasTwoParts ? key.substr(semicolon + 1) : key;
-}
 
 // A row of a dictionary as the tree shows it.
 struct Row {

@@ -56,6 +56,22 @@ bool hasRightLength(const PacketKind& kind, const Packet& packet) {
   return false;
 }
 
+using VariableFormats = std::vector<c2k::VariableFormat>;
+
+// Gives every row of a template the formats of the variable that it names.
+void addFormats(std::string_view section, const Dictionary& rows, const VariableFormats& variables,
+                NumberFormats& formats) {
+  for (const auto& [key, value] : rows) {
+    const std::string_view name = displayNameOfSortedKey(key);
+    if (const Dictionary* const inner = value.dictionary()) addFormats(name, *inner, variables, formats);
+    const std::string* const variable = value.string();
+    if (!variable) continue;
+    for (const c2k::VariableFormat& known : variables) {
+      if (known.variable.name() == *variable) formats.add(section, name, known.format);
+    }
+  }
+}
+
 }  // namespace
 
 std::unique_ptr<LogGenerator> C2KLogGenerator::generator(const Services& services) {
@@ -136,6 +152,17 @@ void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView message, c2k
   if (kind == std::end(packetKinds)) return;
   if (hasRightLength(*kind, packet)) kind->decode(packet, state, lookup);
   _binData.insert(_binData.end(), message.begin(), message.end());
+}
+
+NumberFormats C2KLogGenerator::numberFormats() const {
+  VariableFormats variables;
+  c2k::listEVDOFormats(variables);
+  c2k::listSearcherFormats(variables);
+  c2k::listDataRateFormats(variables);
+  NumberFormats formats;
+  const Value displayTemplate = services().resources.propertyList(templateName);
+  if (const Dictionary* const rows = displayTemplate.dictionary()) addFormats({}, *rows, variables, formats);
+  return formats;
 }
 
 // Any log type will do, as in decoding.

@@ -18,6 +18,7 @@ class C2KLogGenerator final : public KLVLogGenerator {
   Value generateLogUsingState(Dictionary& state) override;
   Value getStartCommand() const override;
   MessageFate fateOf(ByteView message) const override;
+  NumberFormats numberFormats() const override;
 
   /// Fills the display, a dictionary, with the shape of the template, and the lookup with an array for each
   /// variable: a placement {"key": the row, "dict": the dictionary of the display that holds the row} for

@@ -24,6 +24,10 @@ static_assert(flCounterCount == 56 && rlRateCount == 12);
 
 constexpr std::size_t counterSize = 4;
 
+constexpr Variable forwardRate = "kFLDataRate";
+constexpr Variable reverseRate = "kRLDataRate";
+constexpr Format rateFormat = real("%.2f kbps");
+
 constexpr std::size_t flSequenceOffset = 13;
 constexpr std::size_t flCounters = 17;
 static_assert(flCounters + counterSize * flCounterCount == flDataRateSize);
@@ -62,7 +66,7 @@ void showRate(Variable variable, const Progress& previous, const Progress& now, 
   const auto steps = static_cast<std::int32_t>(now.sequence - previous.sequence);
   if (steps < 1) return;
   const auto bits = static_cast<double>(static_cast<std::int64_t>(now.bits - previous.bits));
-  storeDisplayNumber(variable, real("%.2f kbps"), bits / (steps * 1024.0), lookup);
+  storeDisplayNumber(variable, rateFormat, bits / (steps * 1024.0), lookup);
 }
 
 void updateRate(Variable variable, const Progress& now, State& state, LinkSlots& link, Lookup& lookup) {
@@ -92,7 +96,7 @@ void decodeFLDataRate(const Packet& packet, State& state, Lookup& lookup) {
   const auto counters = packet.numbers<flCounterCount>(flCounters);
   const std::uint64_t bits =
       std::inner_product(counters.begin(), counters.end(), std::begin(flWeights), std::uint64_t{0});
-  updateRate("kFLDataRate", {packet.u32(flSequenceOffset), bits}, state, state.slots.forwardLink, lookup);
+  updateRate(forwardRate, {packet.u32(flSequenceOffset), bits}, state, state.slots.forwardLink, lookup);
 }
 
 void decodeRLDataRate(const Packet& packet, State& state, Lookup& lookup) {
@@ -100,7 +104,12 @@ void decodeRLDataRate(const Packet& packet, State& state, Lookup& lookup) {
   for (std::size_t rate = 0; rate < rlRateCount; ++rate) {
     bits += rlPacketsAtRate(packet, rate) * rlWeights[rate];
   }
-  updateRate("kRLDataRate", {packet.u32(rlSequenceOffset), bits}, state, state.slots.reverseLink, lookup);
+  updateRate(reverseRate, {packet.u32(rlSequenceOffset), bits}, state, state.slots.reverseLink, lookup);
+}
+
+void listDataRateFormats(std::vector<VariableFormat>& formats) {
+  formats.push_back({forwardRate, rateFormat});
+  formats.push_back({reverseRate, rateFormat});
 }
 
 }  // namespace varnel::c2k

@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "LogGenerator/Field.h"
+#include "LogGenerator/SortedKey.h"
 #include "base/Dictionary.h"
 #include "base/Value.h"
 
@@ -20,7 +21,7 @@ namespace varnel::c2k {
 // each variable that the template names: its placements {"key": a row, "dict": the dictionary that holds it}.
 
 /// The mark, as key and as text, of a dictionary whose rows are ordered by key.
-inline constexpr std::string_view sortedMark = "_sorted";
+inline constexpr std::string_view sortedMark = sortMark;
 
 /// The variables that decoders set, by the names under which the template places them.
 inline constexpr std::string_view variableNames[] = {
@@ -47,6 +48,7 @@ class Variable {
   consteval Variable(const char* name) : _index(indexOf(name)) {}
   /// Its place among the names.
   constexpr std::size_t index() const { return _index; }
+  constexpr std::string_view name() const { return variableNames[_index]; }
 
  private:
   static consteval std::uint8_t indexOf(std::string_view name) {
@@ -63,6 +65,12 @@ struct VariableField {
   Source source;
   Variable variable;
   Format format = integer();
+};
+
+/// A variable, and one of the formats in which it shows numbers.
+struct VariableFormat {
+  Variable variable;
+  Format format;
 };
 
 /// For static_assert: does not compile when a field reads past that many bytes.

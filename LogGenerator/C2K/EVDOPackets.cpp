@@ -43,6 +43,9 @@ static_assert(within(channel, evdoStatusSize) && within(levelsInUse, evdoStatusS
 
 constexpr std::uint16_t unassignedPN = 0xFFFF;
 
+constexpr Variable activeSetVariable = "kActiveSetPilots";
+constexpr Variable fingersVariable = "kFingerC2I";
+
 }  // namespace
 
 void decodeEVDOStatus(const Packet& packet, State& /*state*/, Lookup& lookup) {
@@ -64,7 +67,7 @@ void decodeEVDOActiveSet(const Packet& packet, State& /*state*/, Lookup& lookup)
              static_cast<std::uint32_t>(packet.size()), count);
     return;
   }
-  PilotStrengths pilots("kActiveSetPilots", lookup);
+  PilotStrengths pilots(activeSetVariable, lookup);
   for (std::size_t i = 0; i < count; ++i) {
     const Packet pilot = packet.from(evdoActiveSetSize + pilotSize * i);
     pilots.add(i, pilot.u16(0), decibelFormat, decibelsOfRatio512(pilot.u16(2)));
@@ -82,7 +85,7 @@ void decodeFingerC2I(const Packet& packet, State& /*state*/, Lookup& lookup) {
              static_cast<std::uint32_t>(packet.size()), count, fingerC2ISize);
     return;
   }
-  PilotStrengths fingers("kFingerC2I", lookup);
+  PilotStrengths fingers(fingersVariable, lookup);
   for (std::size_t i = 0; i < count; ++i) {
     const Packet finger = packet.from(fingerC2ISize + fingerSize * i);
     if (const std::uint16_t pn = finger.u16(0); pn != unassignedPN) {
@@ -90,6 +93,16 @@ void decodeFingerC2I(const Packet& packet, State& /*state*/, Lookup& lookup) {
     }
   }
   fingers.publishOrNone();
+}
+
+void listEVDOFormats(std::vector<VariableFormat>& formats) {
+  for (const std::span<const VariableField> table :
+       {std::span<const VariableField>(channel), std::span<const VariableField>(levelsInUse),
+        std::span<const VariableField>(session)}) {
+    for (const VariableField& field : table) formats.push_back({field.variable, field.format});
+  }
+  formats.push_back({activeSetVariable, decibelFormat});
+  formats.push_back({fingersVariable, decibelFormat});
 }
 
 }  // namespace varnel::c2k

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <vector>
 
 #include "LogGenerator/C2K/DisplayVariables.h"
 #include "LogGenerator/C2K/State.h"
@@ -19,6 +20,12 @@ inline constexpr std::uint32_t subpacketsSize = 17;
 inline constexpr std::uint32_t systemInfoSize = 171;
 inline constexpr std::uint32_t flDataRateSize = 241;
 inline constexpr std::uint32_t rlDataRateSize = 1750;
+
+/// How the decoders of each file write numbers that have a unit or other texts around them; those of a
+/// variable that shows pilots hold for each of its pilots.
+void listEVDOFormats(std::vector<VariableFormat>& formats);
+void listSearcherFormats(std::vector<VariableFormat>& formats);
+void listDataRateFormats(std::vector<VariableFormat>& formats);
 
 /// 0x1183: state of the EV-DO session, its channel and its signal levels.
 void decodeEVDOStatus(const Packet& packet, State& state, Lookup& lookup);

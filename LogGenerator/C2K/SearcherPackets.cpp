@@ -40,10 +40,19 @@ constexpr VariableField secondChain[] = {
     {u8(5), "k1xRx1BandClass", bandClass},
     {u16(8), "k1xRx1ChanNum"},
 };
-constexpr Variable inTrafficOnly[] = {"k1xRx1BandClass", "k1xRx1ChanNum", "k1xRxAGC1", "k1xTxAGC"};
+constexpr Variable firstReceiveLevel = "k1xRxAGC0";
+constexpr Variable secondReceiveLevel = "k1xRxAGC1";
+constexpr Variable transmitLevel = "k1xTxAGC";
+constexpr Variable levels[] = {firstReceiveLevel, secondReceiveLevel, transmitLevel};
+constexpr Variable inTrafficOnly[] = {"k1xRx1BandClass", "k1xRx1ChanNum", secondReceiveLevel, transmitLevel};
 constexpr Format dBm = real("%+.2f dBm");
 
+constexpr Variable activeSetVariable = "k1xActiveSetInfo";
+constexpr Format referencePilot = real("(ref pilot) %+.2f dB");
+
 constexpr Variable trafficFERVariable = "k1xTrafficFER";
+constexpr Format errorRate = real("%.02f%%");
+constexpr Format oldErrorRate = real("%.02f%% (old)");
 
 double receiveAGC(std::int8_t raw) { return raw * 334 / 1000.0 - 63.248; }
 
@@ -51,11 +60,11 @@ double transmitPower(std::uint16_t tenths) { return static_cast<std::int16_t>(te
 
 void showRF(const Packet& rf, bool isInTraffic, Lookup& lookup) {
   storeDisplayFields(rf, firstChain, lookup);
-  storeDisplayNumber("k1xRxAGC0", dBm, receiveAGC(static_cast<std::int8_t>(rf.u8(10))), lookup);
+  storeDisplayNumber(firstReceiveLevel, dBm, receiveAGC(static_cast<std::int8_t>(rf.u8(10))), lookup);
   if (isInTraffic) {
     storeDisplayFields(rf, secondChain, lookup);
-    storeDisplayNumber("k1xRxAGC1", dBm, receiveAGC(static_cast<std::int8_t>(rf.u8(11))), lookup);
-    storeDisplayNumber("k1xTxAGC", dBm, transmitPower(rf.u16(12)), lookup);
+    storeDisplayNumber(secondReceiveLevel, dBm, receiveAGC(static_cast<std::int8_t>(rf.u8(11))), lookup);
+    storeDisplayNumber(transmitLevel, dBm, transmitPower(rf.u16(12)), lookup);
   } else {
     for (const Variable variable : inTrafficOnly) storeDisplayText(variable, "N/A", lookup);
   }
@@ -78,7 +87,6 @@ double pilotStrength(const Integration& integration, std::uint16_t energy) {
 }
 
 void showActiveSet(const Packet& activeSet, Lookup& lookup) {
-  constexpr Format referencePilot = real("(ref pilot) %+.2f dB");
   const Integration integration{.length = static_cast<double>(activeSet.u16(4)),
                                 .gain = static_cast<double>(activeSet.u8(6)),
                                 .exponent = activeSet.u8(7)};
@@ -86,7 +94,7 @@ void showActiveSet(const Packet& activeSet, Lookup& lookup) {
   const std::size_t extensions = activeSet.u8(9);
   const std::uint16_t referencePN = activeSet.u16(10);
   const std::size_t stride = (6 * extensions + 15) & 0xFFC;
-  PilotStrengths pilots("k1xActiveSetInfo", lookup);
+  PilotStrengths pilots(activeSetVariable, lookup);
   for (std::size_t i = 0; i < count; ++i) {
     const std::uint16_t pn = activeSet.u16(12 + i * stride);
     const std::uint16_t energy = activeSet.u16(24 + 4 * extensions + i * stride);
@@ -108,7 +116,7 @@ std::optional<float> trafficFER(const State& state) {
 void endTrafficFER(State& state, Lookup& lookup) {
   const auto rate = trafficFER(state);
   if (!rate) return;
-  storeDisplayNumber(trafficFERVariable, real("%.02f%% (old)"), *rate * 100.0F, lookup);
+  storeDisplayNumber(trafficFERVariable, oldErrorRate, *rate * 100.0F, lookup);
   state.entries.remove(state.slots.trafficFER);
 }
 
@@ -143,7 +151,13 @@ void decode1xTrafficFER(const Packet& packet, State& state, Lookup& lookup) {
   const auto previous = trafficFER(state);
   const float rate = previous ? sample + *previous * (63.0F / 64) : sample;
   state.entries.set(state.slots.trafficFER, Value::ofReal(rate));
-  storeDisplayNumber(trafficFERVariable, real("%.02f%%"), rate * 100.0F, lookup);
+  storeDisplayNumber(trafficFERVariable, errorRate, rate * 100.0F, lookup);
+}
+
+void listSearcherFormats(std::vector<VariableFormat>& formats) {
+  for (const Variable variable : levels) formats.push_back({variable, dBm});
+  for (const Format& format : {referencePilot, decibelFormat}) formats.push_back({activeSetVariable, format});
+  for (const Format& format : {errorRate, oldErrorRate}) formats.push_back({trafficFERVariable, format});
 }
 
 }  // namespace varnel::c2k

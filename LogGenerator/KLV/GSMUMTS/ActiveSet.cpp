@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/GSMUMTS/CellSet.h"
+#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -31,6 +32,11 @@ std::int32_t receivedSignalStrength(const Packet& packet) {
 constinit const PacketHandlers<ActiveSet> ActiveSet::handlers = {
     {cellSet::logCode, cellSet::minimumSize, &ActiveSet::update},
 };
+
+void ActiveSet::listNumberFormats(SectionFormats& formats) const {
+  formats.add("RSCP", level);
+  formats.add("Energy Per Chip", level);
+}
 
 void ActiveSet::update(const Packet& packet) {
   clearElementsInArray(list());

@@ -11,6 +11,8 @@ class ActiveSet final : public SectionDecoder<ActiveSet> {
   static constexpr std::string_view traceLine = "ActiveSet";
   static const PacketHandlers<ActiveSet> handlers;
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void update(const Packet& packet);
 };

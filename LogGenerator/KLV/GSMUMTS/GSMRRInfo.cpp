@@ -3,6 +3,7 @@
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/GSMUMTS/GPRSCellOptions.h"
 #include "LogGenerator/KLV/GSMUMTS/GSMMeasurement.h"
+#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -75,6 +76,8 @@ constinit const PacketHandlers<GSMRRInfo> GSMRRInfo::handlers = {
     {transmissionLogCode, transmissionSize, &GSMRRInfo::updateTransmission},
     {gprsCellOptions::logCode, gprsCellOptions::minimumSize, &GSMRRInfo::updateReception},
 };
+
+void GSMRRInfo::listNumberFormats(SectionFormats& formats) const { formats.add(reception); }
 
 void GSMRRInfo::updateState(const Packet& packet) { setFields(rows(), packet, state); }
 

@@ -11,6 +11,8 @@ class GSMRRInfo final : public SectionDecoder<GSMRRInfo> {
   static constexpr std::string_view traceLine = "GSMRRInfo";
   static const PacketHandlers<GSMRRInfo> handlers;
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void updateState(const Packet& packet);
   void updateMeasurement(const Packet& packet);

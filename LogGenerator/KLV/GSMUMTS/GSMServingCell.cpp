@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/GSMUMTS/GSMMeasurement.h"
+#include "LogGenerator/NumberFormats.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
@@ -50,6 +51,8 @@ constinit const PacketHandlers<GSMServingCell> GSMServingCell::handlers = {
     {dedicatedChannelLogCode, dedicatedChannelSize, &GSMServingCell::updateDedicatedChannel},
     {cellMonitorLogCode, 0, &GSMServingCell::updateFromCellMonitor},
 };
+
+void GSMServingCell::listNumberFormats(SectionFormats& formats) const { formats.add(measurement); }
 
 void GSMServingCell::updateIdentity(const Packet& packet) { setFields(rows(), packet, identity); }
 

@@ -14,6 +14,8 @@ class GSMServingCell final : public SectionDecoder<GSMServingCell> {
 
   explicit GSMServingCell(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void updateIdentity(const Packet& packet);
   void updateMeasurement(const Packet& packet);

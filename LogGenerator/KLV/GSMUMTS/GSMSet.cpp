@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/GSMUMTS/CellRanking.h"
+#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -22,6 +23,8 @@ static_assert(within(cell, recordSize));
 constinit const PacketHandlers<GSMSet> GSMSet::handlers = {
     {cellRanking::logCode, cellRanking::minimumSize, &GSMSet::update},
 };
+
+void GSMSet::listNumberFormats(SectionFormats& formats) const { formats.add(cell); }
 
 void GSMSet::update(const Packet& packet) {
   using namespace cellRanking;

@@ -11,6 +11,8 @@ class GSMSet final : public SectionDecoder<GSMSet> {
   static constexpr std::string_view traceLine = "GSMSet";
   static const PacketHandlers<GSMSet> handlers;
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void update(const Packet& packet);
 };

@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/GSMUMTS/GSMMeasurement.h"
+#include "LogGenerator/NumberFormats.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
@@ -37,6 +38,11 @@ constinit const PacketHandlers<NeighboringCells> NeighboringCells::handlers = {
     {identityCodesLogCode, identityCodesSize, &NeighboringCells::updateIdentityCodes},
     {cellMonitorLogCode, 0, &NeighboringCells::updateFromCellMonitor},
 };
+
+void NeighboringCells::listNumberFormats(SectionFormats& formats) const {
+  formats.add(cell);
+  formats.add(cellMonitorColumns);
+}
 
 void NeighboringCells::updateMeasurements(const Packet& packet) {
   using namespace gsmMeasurement;

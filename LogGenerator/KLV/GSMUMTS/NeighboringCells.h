@@ -17,6 +17,8 @@ class NeighboringCells final : public SectionDecoder<NeighboringCells> {
 
   explicit NeighboringCells(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void updateMeasurements(const Packet& packet);
   void updateIdentityCodes(const Packet& packet);

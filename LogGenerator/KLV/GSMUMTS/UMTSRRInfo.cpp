@@ -3,6 +3,7 @@
 #include <limits>
 
 #include "LogGenerator/Field.h"
+#include "LogGenerator/NumberFormats.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
@@ -49,6 +50,8 @@ constexpr Field ciphering[] = {
 static_assert(within(ciphering, cipheringSize));
 
 constexpr std::string_view channelRow = "UARFCN";
+constexpr std::string_view transmitPowerRow = "Transmit Power";
+constexpr Format transmitPower = real("%4.2f dBm");
 
 constexpr CellMonitorRow cellMonitorRows[] = {
     {cellMonitor::cellIdentity, "Cell ID", "UMTSRRInfo: Failed to retrieve Cell ID\n"},
@@ -81,11 +84,15 @@ constinit const PacketHandlers<UMTSRRInfo> UMTSRRInfo::handlers = {
     {cellMonitorLogCode, 0, &UMTSRRInfo::updateFromCellMonitor},
 };
 
+void UMTSRRInfo::listNumberFormats(SectionFormats& formats) const {
+  formats.add(transmitPowerRow, transmitPower);
+}
+
 void UMTSRRInfo::updateState(const Packet& packet) { setFields(rows(), packet, state); }
 
 void UMTSRRInfo::updateTransmitPower(const Packet& packet) {
   // Kept: " nan dBm" when there is nothing to take the mean of.
-  setReal(rows(), "Transmit Power", real("%4.2f dBm"), meanTransmitPower(packet));
+  setReal(rows(), transmitPowerRow, transmitPower, meanTransmitPower(packet));
 }
 
 void UMTSRRInfo::updateServingCell(const Packet& packet) {

@@ -14,6 +14,8 @@ class UMTSRRInfo final : public SectionDecoder<UMTSRRInfo> {
 
   explicit UMTSRRInfo(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void updateState(const Packet& packet);
   void updateTransmitPower(const Packet& packet);

@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/GSMUMTS/CellRanking.h"
+#include "LogGenerator/NumberFormats.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
@@ -37,6 +38,11 @@ constinit const PacketHandlers<UMTSSet> UMTSSet::handlers = {
     {cellRanking::logCode, cellRanking::minimumSize, &UMTSSet::updateFromRanking},
     {cellMonitorLogCode, 0, &UMTSSet::updateFromCellMonitor},
 };
+
+void UMTSSet::listNumberFormats(SectionFormats& formats) const {
+  formats.add(cell);
+  formats.add(cellMonitorColumns);
+}
 
 void UMTSSet::updateFromRanking(const Packet& packet) {
   using namespace cellRanking;

@@ -14,6 +14,8 @@ class UMTSSet final : public SectionDecoder<UMTSSet> {
 
   explicit UMTSSet(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void updateFromRanking(const Packet& packet);
   void updateFromCellMonitor(const Packet& packet);

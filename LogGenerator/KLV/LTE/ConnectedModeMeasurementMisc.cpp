@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/LTE/ConnectedModeMeasurement.h"
+#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -25,6 +26,10 @@ constinit const PacketHandlers<ConnectedModeMeasurementMisc> ConnectedModeMeasur
     {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize,
      &ConnectedModeMeasurementMisc::update},
 };
+
+void ConnectedModeMeasurementMisc::listNumberFormats(SectionFormats& formats) const {
+  formats.add(servingCell);
+}
 
 void ConnectedModeMeasurementMisc::update(const Packet& packet) { setFields(rows(), packet, servingCell); }
 

@@ -11,6 +11,8 @@ class ConnectedModeMeasurementMisc final : public SectionDecoder<ConnectedModeMe
   static constexpr std::string_view traceLine = "Connected mode LTE Intra-frequency Measurement";
   static const PacketHandlers<ConnectedModeMeasurementMisc> handlers;
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void update(const Packet& packet);
 };

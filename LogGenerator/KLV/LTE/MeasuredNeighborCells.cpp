@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/LTE/ConnectedModeMeasurement.h"
+#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -20,6 +21,8 @@ constinit const PacketHandlers<MeasuredNeighborCells> MeasuredNeighborCells::han
     {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize,
      &MeasuredNeighborCells::update},
 };
+
+void MeasuredNeighborCells::listNumberFormats(SectionFormats& formats) const { formats.add(neighbor); }
 
 void MeasuredNeighborCells::update(const Packet& packet) {
   using namespace connectedModeMeasurement;

@@ -11,6 +11,8 @@ class MeasuredNeighborCells final : public SectionDecoder<MeasuredNeighborCells>
   static constexpr std::string_view traceLine = "Measured Neighbor Cells";
   static const PacketHandlers<MeasuredNeighborCells> handlers;
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void update(const Packet& packet);
 };

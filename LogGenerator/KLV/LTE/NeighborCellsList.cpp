@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/LTE/NeighborMeasurement.h"
+#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -48,6 +49,8 @@ void trace(const Packet& record) {
 constinit const PacketHandlers<NeighborCellsList> NeighborCellsList::handlers = {
     {neighborMeasurement::logCode, neighborMeasurement::minimumSize, &NeighborCellsList::update},
 };
+
+void NeighborCellsList::listNumberFormats(SectionFormats& formats) const { formats.add(cell); }
 
 void NeighborCellsList::update(const Packet& packet) {
   clearElementsInArray(list());

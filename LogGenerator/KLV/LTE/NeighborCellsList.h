@@ -11,6 +11,8 @@ class NeighborCellsList final : public SectionDecoder<NeighborCellsList> {
   static constexpr std::string_view traceLine = "Neighbor Cells List";
   static const PacketHandlers<NeighborCellsList> handlers;
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void update(const Packet& packet);
 };

@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/LTE/NeighborMeasurement.h"
+#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -19,6 +20,8 @@ static_assert(within(frequency, neighborMeasurement::minimumSize));
 constinit const PacketHandlers<NeighborMeasurementMisc> NeighborMeasurementMisc::handlers = {
     {neighborMeasurement::logCode, neighborMeasurement::minimumSize, &NeighborMeasurementMisc::update},
 };
+
+void NeighborMeasurementMisc::listNumberFormats(SectionFormats& formats) const { formats.add(frequency); }
 
 void NeighborMeasurementMisc::update(const Packet& packet) { setFields(rows(), packet, frequency); }
 

@@ -11,6 +11,8 @@ class NeighborMeasurementMisc final : public SectionDecoder<NeighborMeasurementM
   static constexpr std::string_view traceLine = "Neighbor Measurements";
   static const PacketHandlers<NeighborMeasurementMisc> handlers;
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void update(const Packet& packet);
 };

@@ -1,6 +1,7 @@
 #include "LogGenerator/KLV/LTE/ServingCellMeasurement.h"
 
 #include "LogGenerator/Field.h"
+#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -45,6 +46,8 @@ static_assert(within(measurement, minimumSize));
 constinit const PacketHandlers<ServingCellMeasurement> ServingCellMeasurement::handlers = {
     {logCode, minimumSize, &ServingCellMeasurement::update},
 };
+
+void ServingCellMeasurement::listNumberFormats(SectionFormats& formats) const { formats.add(measurement); }
 
 void ServingCellMeasurement::update(const Packet& packet) { setFields(rows(), packet, measurement); }
 

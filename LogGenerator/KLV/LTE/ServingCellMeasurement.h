@@ -11,6 +11,8 @@ class ServingCellMeasurement final : public SectionDecoder<ServingCellMeasuremen
   static constexpr std::string_view traceLine = "Serving Cell Measurements";
   static const PacketHandlers<ServingCellMeasurement> handlers;
 
+  void listNumberFormats(SectionFormats& formats) const override;
+
  private:
   void update(const Packet& packet);
 };
