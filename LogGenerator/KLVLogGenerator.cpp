@@ -109,7 +109,20 @@ Value KLVLogGenerator::getSaveContentsFromState(const Dictionary& state) const {
   return items;
 }
 
+void KLVLogGenerator::keepNoRawBytes() {
+  _binData.clear();
+  _roomForRawBytes = 0;
+}
+
+void KLVLogGenerator::leaveOut() {
+  if (_roomForRawBytes > 0) ++_leftOut;
+}
+
 void KLVLogGenerator::storeBinDataInState(Dictionary& state) {
+  if (const auto count = _leftOut - std::exchange(_leftOutBefore, _leftOut); count > 0) {
+    logWarning("The binary log lacks %ld messages of this interval, which brought more than %ld bytes", count,
+               mostRawBytes);
+  }
   Bytes next;
   next.reserve(_binData.size());  // the next display brings about as much
   state.set(stateKey::displayState, Value::ofData(std::exchange(_binData, std::move(next))));

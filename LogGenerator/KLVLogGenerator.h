@@ -31,23 +31,43 @@ DLFStatus DLFAddVersionReport(std::uint8_t* buffer, std::uint32_t capacity, std:
                               const DLFTime& time);
 
 /// The base of the generators that receive binary log packets: it collects the raw bytes of each interval
-/// between two displays and exports them as a DLF binary log.
+/// between two displays and exports them as a DLF binary log. An interval has a bound, for a flood must not
+/// fill the memory: a message that no longer fits is left out whole.
 class KLVLogGenerator : public LogGenerator {
  public:
   using LogGenerator::LogGenerator;
 
+  /// The raw bytes of an interval at most.
+  static constexpr std::size_t mostRawBytes = std::size_t{16} << 20;
+
   /// The records of the history, then the DLF item when the export succeeded.
   Value getSaveContentsFromState(const Dictionary& state) const override;
+  std::uint64_t messagesLeftOutOfLog() const override { return _leftOut; }
+  void keepNoRawBytes() override;
 
  protected:
+  /// Keeps the bytes of a message for the binary log, or counts it as left out.
+  void collect(ByteView message) {
+    if (message.size() > _roomForRawBytes - _binData.size()) return leaveOut();
+    _binData.insert(_binData.end(), message.begin(), message.end());
+  }
+
   /// The version report and the raw bytes of every history record, oldest first; nothing when a record holds
   /// something else.
   std::optional<Bytes> generateDlfFromState(const Dictionary& state) const;
 
-  /// Moves the bytes collected so far into the state's "DisplayState".
+  /// Moves the bytes collected so far into the state's "DisplayState", and logs how many messages this
+  /// interval lacks, if any.
   void storeBinDataInState(Dictionary& state);
 
   Bytes _binData;
+
+ private:
+  void leaveOut();
+
+  std::size_t _roomForRawBytes = mostRawBytes;  // never less than what is collected; 0 when nothing is kept
+  std::uint64_t _leftOut = 0;
+  std::uint64_t _leftOutBefore = 0;  // as it was when this interval began
 };
 
 }  // namespace varnel

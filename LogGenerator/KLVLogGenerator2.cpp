@@ -41,7 +41,7 @@ KLVLogGenerator2::~KLVLogGenerator2() {
 void KLVLogGenerator2::updateState_withData(Dictionary& state, ByteView data) {
   getDisplayFromState(state);
   updateWithData(data);
-  _binData.insert(_binData.end(), data.begin(), data.end());
+  collect(data);
 }
 
 void KLVLogGenerator2::updateWithData(ByteView data) {

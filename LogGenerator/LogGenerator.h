@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <memory>
 #include <string_view>
 
@@ -50,6 +51,12 @@ class LogGenerator {
   /// How the display writes its numbers; for those who want them without their units. Without packets, as
   /// here, nothing is known of units.
   virtual NumberFormats numberFormats() const { return {}; }
+  /// How many messages the binary log lacks because their interval had brought too much already. They were
+  /// decoded like all others. Always 0 without a binary log, as here.
+  virtual std::uint64_t messagesLeftOutOfLog() const { return 0; }
+  /// Collects no raw bytes from now on, for those who save nothing: the records of the history hold empty
+  /// data in their place. Nothing happens without a binary log, as here.
+  virtual void keepNoRawBytes() {}
 
  protected:
   /// Appends a snapshot record to the state's "History", which keeps the newest five.

@@ -207,4 +207,8 @@ Value VarnelModel::getSaveContents() const {
   return _logGenerator ? _logGenerator->getSaveContentsFromState(_state) : Value();
 }
 
+std::uint64_t VarnelModel::messagesLeftOutOfLog() const {
+  return _logGenerator ? _logGenerator->messagesLeftOutOfLog() : 0;
+}
+
 }  // namespace varnel

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <optional>
@@ -66,6 +67,9 @@ class VarnelModel {
   std::shared_ptr<const VarnelModelNode> nodeAtPath(const std::string& path);
   /// What the save screen writes: an array of items; absent while there is no generator.
   Value getSaveContents() const;
+  /// How many messages since the link was opened the binary log lacks because too many came at a time. They
+  /// are shown all the same.
+  std::uint64_t messagesLeftOutOfLog() const;
 
  private:
   bool createPorts();

@@ -151,7 +151,7 @@ void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView message, c2k
   const auto kind = std::ranges::find(packetKinds, logCode, &PacketKind::logCode);
   if (kind == std::end(packetKinds)) return;
   if (hasRightLength(*kind, packet)) kind->decode(packet, state, lookup);
-  _binData.insert(_binData.end(), message.begin(), message.end());
+  collect(message);
 }
 
 NumberFormats C2KLogGenerator::numberFormats() const {

@@ -206,6 +206,14 @@ TEST_F(KLVLogGenerator2Test, EveryMessageIsCollectedAsReceived) {
             "00e0d0000000000000>");
 }
 
+TEST_F(KLVLogGenerator2Test, AMessageThatIsLeftOutOfTheBinaryLogIsDecodedAllTheSame) {
+  linesOf(Bytes(KLVLogGenerator::mostRawBytes, 0x00));
+  EXPECT_THAT(linesOf(PacketBuilder(0xD0E0, 13).bytes()),
+              ElementsAre("<4>Serving Cell gets 53472: <010d00e0d00000000000000000>"));
+  EXPECT_EQ(generator->_binData.size(), 16'777'216u);
+  EXPECT_EQ(generator->messagesLeftOutOfLog(), 1u);
+}
+
 // The display.
 
 TEST_F(KLVLogGenerator2Test, TheFirstMessageLoadsTheTemplateAndTheGenerationBehindItYieldsTheDisplay) {

@@ -121,6 +121,7 @@ TEST(DLFAddVersionReport, ALargerBufferKeepsItsRest) {
 class Generator final : public KLVLogGenerator {
  public:
   using KLVLogGenerator::_binData;
+  using KLVLogGenerator::collect;
   using KLVLogGenerator::generateDlfFromState;
   using KLVLogGenerator::KLVLogGenerator;
   using KLVLogGenerator::storeBinDataInState;
@@ -292,6 +293,48 @@ TEST_F(KLVLogGeneratorTest, TheCollectedBytesMoveIntoTheState) {
   EXPECT_THAT(generator._binData, IsEmpty());
   generator.storeBinDataInState(state);
   EXPECT_EQ(described(state), "{DisplayState: <>}");
+}
+
+constexpr std::size_t sixteenMebibytes = 16'777'216;
+
+TEST_F(KLVLogGeneratorTest, AnIntervalHolds16MebibytesOfRawBytesAndNoMessageInPart) {
+  generator.collect(Bytes(sixteenMebibytes - 3, 0x01));
+  generator.collect(Bytes(4, 0x02));  // a byte too many
+  generator.collect(Bytes(3, 0x03));
+  generator.collect(Bytes(1, 0x04));
+  generator.collect(Bytes());
+  ASSERT_EQ(generator._binData.size(), sixteenMebibytes);
+  EXPECT_EQ(described(ByteView(generator._binData).last(4)), "<01030303>");
+  EXPECT_EQ(generator.messagesLeftOutOfLog(), 2u);
+}
+
+TEST_F(KLVLogGeneratorTest, WhatAnIntervalLeavesOutIsLoggedOnceItIsOverAndCountedOnAndOn) {
+  generator.collect(Bytes(sixteenMebibytes, 0x01));
+  for (int i = 0; i < 3; ++i) generator.collect(Bytes{0x02});
+  EXPECT_THAT(log.takeTexts(), IsEmpty());
+  generator.storeBinDataInState(state);
+  EXPECT_THAT(
+      log.takeTexts(),
+      ElementsAre("<4>The binary log lacks 3 messages of this interval, which brought more than 16777216 "
+                  "bytes"));
+  generator.collect(Bytes{0x03});
+  generator.storeBinDataInState(state);
+  EXPECT_THAT(log.takeTexts(), IsEmpty());
+  EXPECT_EQ(described(state), "{DisplayState: <03>}");
+  EXPECT_EQ(generator.messagesLeftOutOfLog(), 3u);
+  generator.collect(Bytes(sixteenMebibytes + 1, 0x04));
+  EXPECT_EQ(generator.messagesLeftOutOfLog(), 4u);
+}
+
+TEST_F(KLVLogGeneratorTest, OneThatKeepsNoRawBytesStoresEmptyDataAndLeavesNothingOut) {
+  generator.collect(Bytes{0x01});
+  generator.keepNoRawBytes();
+  generator.collect(Bytes{0x02});
+  generator.collect(Bytes(sixteenMebibytes + 1, 0x03));
+  generator.storeBinDataInState(state);
+  EXPECT_EQ(described(state), "{DisplayState: <>}");
+  EXPECT_EQ(generator.messagesLeftOutOfLog(), 0u);
+  EXPECT_THAT(log.takeTexts(), IsEmpty());
 }
 
 }  // namespace

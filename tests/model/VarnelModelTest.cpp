@@ -587,6 +587,17 @@ TEST_F(ModelTest, TheHistoryKeepsTheNewestFiveSnapshots) {
   EXPECT_EQ(*(*contents.array())[4].dictionary()->get("DisplayState").data(), antennas(6));
 }
 
+TEST_F(ModelTest, TellsHowManyMessagesTheBinaryLogLacksSinceTheLinkWasOpened) {
+  EXPECT_EQ(model->messagesLeftOutOfLog(), 0u);
+  model->startMonitor();
+  model->updateWithData(Bytes(16'777'216));
+  EXPECT_EQ(model->messagesLeftOutOfLog(), 0u);
+  model->updateWithData(antennas(2));
+  EXPECT_EQ(model->messagesLeftOutOfLog(), 1u);
+  model->restartMonitor();
+  EXPECT_EQ(model->messagesLeftOutOfLog(), 0u);
+}
+
 TEST_F(ModelTest, InvalidationOfTheLocalPortIsLoggedAndRestartsTheMonitor) {
   start();
   const std::string port = address(ports.localPort(channel));

@@ -136,6 +136,14 @@ TEST_F(C2KDispatchTest, RecordLengthAndTimestampAreNotRead) {
   EXPECT_THAT(log.takeTexts(), IsEmpty());
 }
 
+TEST_F(C2KDispatchTest, APacketThatIsLeftOutOfTheBinaryLogIsDecodedAllTheSame) {
+  Bytes flood = fingers();
+  flood.resize(16'777'216);
+  published(flood);
+  EXPECT_EQ(published(fingers()), shownFingers);
+  EXPECT_EQ(generator.messagesLeftOutOfLog(), 1u);
+}
+
 TEST_F(C2KDispatchTest, EachKnownPacketIsCollectedWholeWhateverItsDecoderMadeOfIt) {
   published(PacketBuilder(0x108A, 24).u8(23, 0xAA).bytes());  // refused
   published(PacketBuilder(0x1234, 30).bytes());               // unknown
