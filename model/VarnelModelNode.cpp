@@ -89,19 +89,46 @@ class TreeBuilder {
   PathDictionary& _paths;
 };
 
+// The text of what is shown as a leaf; nothing for what has rows.
+std::optional<std::string_view> leafText(const Value& object) {
+  if (object.dictionary() || object.array()) return std::nullopt;
+  const std::string* text = object.string();
+  return text ? std::string_view(*text) : unknownValue;
+}
+
+// The first row, in the tree's order, of which the function says yes; null when there is none.
+template <class Predicate>
+const Value* firstRow(const Value& object, const Predicate& isWanted) {
+  if (const Dictionary* entries = object.dictionary()) {
+    for (const auto& [name, value] : rowsOf(*entries))
+      if (isWanted(name, *value)) return value;
+  } else if (const Array* elements = object.array()) {
+    const ArrayLock::Scope lock;
+    for (std::size_t i = 0; i < elements->size(); ++i)
+      if (isWanted(std::to_string(i), (*elements)[i])) return &(*elements)[i];
+  }
+  return nullptr;
+}
+
 // Finds what the tree would have under a path. A node is recorded after all below it, and of two with the
 // same path the later one counts: so the walk begins with the node itself and goes on with its last child. It
 // enters nothing but what may lead to the path.
 class ObjectFinder {
  public:
-  explicit ObjectFinder(std::string_view path) : _path(path) {}
+  enum class Brackets { BelongToNames, MaySelect };
+
+  ObjectFinder(std::string_view path, Brackets brackets) : _path(path), _brackets(brackets) {}
 
   // The first so many characters of the path are the object's own. Null when nothing has the path.
   const Value* findFrom(const Value& object, std::size_t length) {
     if (length == _path.size()) return &object;
+    if (const Selection selection = select(object, length); selection.record)
+      return findFrom(*selection.record, selection.length);
     if (_path[length - 1] != '/') {
       if (_path[length] != '/') return nullptr;
       ++length;
+      if (const Selection selection = select(object, length); selection.record)
+        return findFrom(*selection.record, selection.length);
     }
     if (const Dictionary* entries = object.dictionary()) return findIn(*entries, length);
     if (const Array* elements = object.array()) return findIn(*elements, length);
@@ -109,6 +136,49 @@ class ObjectFinder {
   }
 
  private:
+  struct Selection {
+    const Value* record;
+    std::size_t length;  // of the path up to the end of what selects the record
+  };
+
+  // The first record that has all the rows which stand in brackets at this place of the path.
+  Selection select(const Value& list, std::size_t length) {
+    if (_brackets != Brackets::MaySelect || length == _path.size() || _path[length] != '[')
+      return {nullptr, length};
+    const std::pair<const Value*, std::size_t> search(&list, length);
+    if (_failedSelections.contains(search)) return {nullptr, length};
+    std::size_t end = length;
+    const Value* record = firstRow(list, [&](std::string_view /*name*/, const Value& candidate) {
+      end = endOfBrackets(candidate, length);
+      return end != length;
+    });
+    if (!record) _failedSelections.insert(search);
+    return {record, end};
+  }
+
+  // The same place when the record lacks one of the rows. What stands in the brackets is held against the
+  // record's rows, not taken apart: names and values may hold any character.
+  std::size_t endOfBrackets(const Value& record, std::size_t length) const {
+    std::size_t end = length;
+    while (end < _path.size() && _path[end] == '[') {
+      std::string_view rest = _path.substr(end + 1);
+      const Value* row = firstRow(record, [&](std::string_view name, const Value& value) {
+        rest = _path.substr(end + 1);
+        const auto text = leafText(value);
+        return text && skip(rest, name) && skip(rest, "=") && skip(rest, *text) && skip(rest, "]");
+      });
+      if (!row) return length;
+      end = _path.size() - rest.size();
+    }
+    return end;
+  }
+
+  static bool skip(std::string_view& text, std::string_view beginning) {
+    if (!text.starts_with(beginning)) return false;
+    text.remove_prefix(beginning.size());
+    return true;
+  }
+
   // Rows of one name that share what is below them would have it searched over and over.
   template <class Container>
   const Value* findIn(const Container& container, std::size_t length) {
@@ -138,7 +208,9 @@ class ObjectFinder {
   }
 
   const std::string_view _path;
+  const Brackets _brackets;
   std::set<std::pair<const void*, std::size_t>> _failedSearches;
+  std::set<std::pair<const Value*, std::size_t>> _failedSelections;
 };
 
 }  // namespace
@@ -149,11 +221,12 @@ std::shared_ptr<const VarnelModelNode> VarnelModelNode::makeTreeFromObject_withP
 }
 
 std::optional<std::string_view> leafValueUnderPath(const Value& object, std::string_view path) {
+  using Brackets = ObjectFinder::Brackets;
   if (!path.starts_with('/')) return std::nullopt;
-  const Value* found = ObjectFinder(path).findFrom(object, 1);
-  if (!found || found->dictionary() || found->array()) return std::nullopt;
-  const std::string* text = found->string();
-  return text ? std::string_view(*text) : unknownValue;
+  const Value* found = ObjectFinder(path, Brackets::BelongToNames).findFrom(object, 1);
+  if (!found && path.find('[') != std::string_view::npos)
+    found = ObjectFinder(path, Brackets::MaySelect).findFrom(object, 1);
+  return found ? leafText(*found) : std::nullopt;
 }
 
 std::string childPath(std::string_view parentPath, std::string_view name) {

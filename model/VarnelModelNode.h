@@ -68,6 +68,10 @@ class VarnelModelTreeNode final : public VarnelModelNode {
 
 /// The value of the leaf that the display object's tree would have under the path, found without building the
 /// tree; nothing when that is an inner node or nothing has the path. Valid until the object changes.
+///
+/// Where no node has the path as it stands, `[name=value]` behind a list's path selects the first of its
+/// records that has a leaf of that name and value: "/Cells[ID=16]/RSRP". Several in a row select the first
+/// record that has all of them.
 std::optional<std::string_view> leafValueUnderPath(const Value& object, std::string_view path);
 
 /// The path of a child: the parent's, a "/" unless it ends in one, and the name as it is. Names may hold "/".

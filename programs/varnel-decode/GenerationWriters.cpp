@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "model/VarnelModelNode.h"
+#include "programs/varnel-decode/Printable.h"
 #include "programs/varnel-decode/StandardOutput.h"
 #include "programs/varnel-decode/Timestamps.h"
 #include "programs/varnel-decode/TreeWriters.h"
@@ -11,8 +12,9 @@ namespace varnel {
 
 namespace {
 
-std::string csvField(std::string_view text) {
-  if (text.find_first_of(",\"\r\n") == std::string_view::npos) return std::string(text);
+std::string csvField(std::string_view value) {
+  const std::string text = printable(value, "\t\r\n");
+  if (text.find_first_of(",\"\r\n") == std::string::npos) return text;
   std::string quoted = "\"";
   for (const char character : text) {
     if (character == '"') quoted += '"';
@@ -60,6 +62,7 @@ void SeenPaths::take(const Generation& generation) {
   std::erase_if(_unseen, [&](const std::string& path) {
     return leafValueUnderPath(generation.display, treePath(path)).has_value();
   });
+  if (!_unseen.empty()) _shown.take(generation.display);
 }
 
 }  // namespace varnel

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "programs/varnel-decode/Generation.h"
+#include "programs/varnel-decode/NearestPaths.h"
 
 namespace varnel {
 
@@ -41,7 +42,8 @@ enum class TableColumns { TimeAndValues, CaptureTimeAndValues };
 std::string csvHeader(const std::vector<std::string>& paths, TableColumns columns);
 
 /// One line of comma-separated values (quoted as RFC 4180 has it, ended by a newline) a generation: its time,
-/// then the value under each path. A value that is absent is an empty field.
+/// then the value under each path. A value that is absent is an empty field. Control characters are escapes
+/// (`\u001B`) but for tabs and line ends.
 class ValueTable final : public GenerationSink {
  public:
   ValueTable(std::FILE* output, const std::vector<std::string>& paths,
@@ -62,9 +64,12 @@ class SeenPaths final : public GenerationSink {
 
   /// Those that no display has had, as they were given.
   const std::vector<std::string>& unseen() const { return _unseen; }
+  /// Those that displays have had and that an unseen one may mean.
+  std::vector<std::string> nearestTo(std::string_view path) const { return _shown.to(path); }
 
  private:
   std::vector<std::string> _unseen;
+  NearestPaths _shown;
 };
 
 }  // namespace varnel

@@ -12,16 +12,19 @@
 #include "app/Snapshot.h"
 #include "base/PropertyList.h"
 #include "host/Capture.h"
+#include "host/FileResources.h"
 #include "host/HostLog.h"
 #include "host/PrivateFile.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/MessageStatistics.h"
 #include "programs/varnel-decode/OfflineDecoder.h"
 #include "programs/varnel-decode/PlotRecorder.h"
+#include "programs/varnel-decode/Printable.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/ProgressBar.h"
 #include "programs/varnel-decode/SnapshotFile.h"
 #include "programs/varnel-decode/StandardOutput.h"
+#include "programs/varnel-decode/TechnologyGuess.h"
 
 namespace varnel {
 
@@ -59,7 +62,9 @@ class InputDecoding {
     if (SnapshotFile::isPropertyList(_path)) return showSnapshot();
     if (!_options.technology)
       return mistake("--technology is needed to decode " + _name + ", a capture").code;
-    return decodeCapture(services);
+    const int status = decodeCapture(services);
+    tellGuess(services);
+    return status;
   }
 
  private:
@@ -76,7 +81,9 @@ class InputDecoding {
     const auto generator = LogGenerator::generatorFromTechnology(*_options.technology, services.services);
     OfflineDecoder decoder(*generator, services.clock);
 
-    bool isDone = succeeds([&] { read(*capture, *generator, decoder, log); });
+    bool isDone = succeeds([&] { read(*capture, *generator, decoder, log, services.templates); });
+    if (services.templates.missing()) return failWithout(*services.templates.missing());
+    if (isDone && !isPointless()) isDone = succeeds([&] { requireRecords(decoder); });
     const Value display = decoder.finish();
     const Time end = services.clock.now();
     if (decoder.hasStarted()) report({end, display});
@@ -90,7 +97,20 @@ class InputDecoding {
     return isDone && !_isOutputBroken ? 0 : generalError;
   }
 
-  void read(CaptureReader& capture, const LogGenerator& generator, OfflineDecoder& decoder, HostLog& log) {
+  static int failWithout(const std::string& displayTemplate) {
+    tell("the display template " + (resourceFolder() / (displayTemplate + ".plist")).string() +
+         " is missing or damaged, so nothing can be shown; install it, or name the folder that has it by "
+         "VARNEL_RESOURCES");
+    return generalError;
+  }
+
+  void requireRecords(const OfflineDecoder& decoder) const {
+    if (!decoder.hasStarted())
+      throw std::runtime_error(_name + " has no records, so there is nothing to show");
+  }
+
+  void read(CaptureReader& capture, const LogGenerator& generator, OfflineDecoder& decoder, HostLog& log,
+            const TemplateWatch& templates) {
     const bool isStreaming = _options.output == Output::EveryDisplay || _options.output == Output::ValueTable;
     ProgressBar progress(
         capture,
@@ -98,12 +118,23 @@ class InputDecoding {
         log, _options.logLevel);
     const bool isCounting = countsMessages();
     CaptureRecord record;
-    while (!isPointless() && capture.next(record)) {
+    while (!isPointless() && !templates.missing() && capture.next(record)) {
       progress.recordRead();
-      if (isCounting) _statistics.add(generator.fateOf(record.message));
+      if (isCounting || !_guess.isAnyKnown()) count(record.message, generator.fateOf(record.message));
       if (const auto generation = decoder.fireTicks(record.time)) report(*generation);
       decoder.deliver(record.time, record.message);
     }
+  }
+
+  void count(ByteView message, const MessageFate& fate) {
+    if (countsMessages()) _statistics.add(fate);
+    if (!_guess.isAnyKnown()) _guess.take(message, fate);
+  }
+
+  // The technology is more likely wrong than the capture.
+  void tellGuess(const DecodingServices& services) const {
+    if (!_guess.isNeeded() || services.templates.missing()) return;
+    tell(_guess.sentence(_name, *_options.technology, services.technologies, services.services));
   }
 
   int showSnapshot() {
@@ -126,6 +157,7 @@ class InputDecoding {
 
   // An output that has failed gets no more; what goes to files goes on.
   void report(const Generation& generation) {
+    _isAnyShown = true;
     if (wantsGenerations()) _seen.take(generation);
     if (_recorder) _recorder->take(generation);
     if (!_streamed || succeeds([&] { _streamed->take(generation); })) return;
@@ -166,14 +198,20 @@ class InputDecoding {
   }
 
   // A cell may never have been met; more likely its name was mistyped. Nothing is known when not all was
-  // looked at.
+  // looked at, and another line says so when there was nothing to see.
   void tellUnseenPaths() const {
-    if (isPointless()) return;
-    for (const std::string& path : _seen.unseen()) {
-      std::fprintf(stderr,
-                   "%s: no display of %s has a value under '%s'; --format paths shows what there is\n",
-                   programName, _name.c_str(), path.c_str());
-    }
+    if (isPointless() || !_isAnyShown || _guess.isNeeded()) return;
+    for (const std::string& path : _seen.unseen())
+      tell("no display of " + _name + " has a value under '" + path + "'; " + adviceFor(path));
+  }
+
+  std::string adviceFor(const std::string& path) const {
+    const auto nearest = _seen.nearestTo(path);
+    if (nearest.empty()) return "--format paths shows what there is";
+    std::string advice = "did you mean ";
+    for (std::size_t i = 0; i < nearest.size(); ++i)
+      advice += (i == 0 ? "" : i + 1 < nearest.size() ? ", " : " or ") + ("'" + nearest[i] + "'");
+    return advice + "?";
   }
 
   // What is written once all is read.
@@ -196,7 +234,7 @@ class InputDecoding {
 
   std::string heading() const {
     if (!_options.namesEachCapture) return {};
-    return (_isFirst ? "==> " : "\n==> ") + _name + " <==\n";
+    return (_isFirst ? "==> " : "\n==> ") + printable(_name) + " <==\n";
   }
 
   bool countsMessages() const {
@@ -212,6 +250,8 @@ class InputDecoding {
   std::optional<PlotRecorder> _recorder;
   SeenPaths _seen;
   MessageStatistics _statistics;
+  TechnologyGuess _guess;
+  bool _isAnyShown = false;
   bool _isOutputBroken = false;
 };
 

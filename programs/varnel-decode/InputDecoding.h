@@ -1,17 +1,22 @@
 #pragma once
 
 #include <cstddef>
+#include <string>
+#include <vector>
 
 #include "LogGenerator/Services.h"
 #include "programs/varnel-decode/CaptureClock.h"
 #include "programs/varnel-decode/Options.h"
+#include "programs/varnel-decode/TemplateWatch.h"
 
 namespace varnel {
 
-/// What the decoders get; the clock is the one that the services show.
+/// What the decoders get; clock and templates are those that the services show.
 struct DecodingServices {
   const Services& services;
   CaptureClock& clock;
+  const TemplateWatch& templates;
+  const std::vector<std::string>& technologies;  ///< all that there are
 };
 
 /// Does for one of the captures or snapshots all that the options ask for. The process's exit status: 0, 1

@@ -127,8 +127,8 @@ class JobQueue {
     copy(job.output.get(), stdout, "standard output");
     copy(job.error.get(), stderr, "standard error");
     if (WIFEXITED(*job.waitStatus)) return WEXITSTATUS(*job.waitStatus);
-    std::fprintf(stderr, "%s: decoding %s was ended by a signal: %s\n", programName,
-                 _names[job.piece].c_str(), ::strsignal(WTERMSIG(*job.waitStatus)));
+    tell("decoding " + _names[job.piece] +
+         " was ended by a signal: " + ::strsignal(WTERMSIG(*job.waitStatus)));
     return generalError;
   }
 

@@ -2,8 +2,10 @@
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
-#include <iostream>
+#include <filesystem>
 #include <limits>
+#include <span>
+#include <system_error>
 
 #include "programs/varnel-decode/ProgramError.h"
 
@@ -17,7 +19,13 @@ constexpr unsigned mostJobs = 256;
 constexpr const char* examples =
     "PATH names a value as --format paths shows it: 'Serving Cell Measurements/Average RSRP'. --csv and "
     "--plot take all that\n"
-    "follows them but the last; put several captures before them, or after a --.\n"
+    "follows them but the last; put several captures before them, or after a --. In place of a row's number "
+    "a value may\n"
+    "select the row: 'Neighbor Cells List[Physical Cell ID=16]/Measured RSRP' is the first neighbor that has "
+    "it. The\n"
+    "display templates are read from the folder that the environment variable VARNEL_RESOURCES names; else "
+    "from the\n"
+    "installed one.\n"
     "\n"
     "  varnel-decode --technology kalvi-lte walk.pcap\n"
     "  varnel-decode --technology kalvi-lte --every walk.pcap\n"
@@ -103,6 +111,25 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
   return std::nullopt;
 }
 
+// A file among the paths of an option, which takes all that follows it but the last. A path that happens to
+// be the name of a file as well can be written with a slash before it.
+std::optional<std::string> fileTakenForPath(std::string_view option, std::span<const std::string> paths) {
+  const auto isFile = [](const std::string& path) {
+    std::error_code failure;
+    const auto status = std::filesystem::status(path, failure);
+    return std::filesystem::exists(status) && !std::filesystem::is_directory(status);
+  };
+  const auto found = std::ranges::find_if(paths, isFile);
+  if (found == paths.end()) return std::nullopt;
+  return std::string(option) + " took " + *found + " for a path; put -- before it";
+}
+
+std::optional<std::string> fileTakenForPath(const Options& options, const Wishes& wishes) {
+  if (const auto taken = fileTakenForPath("--csv", options.tablePaths)) return taken;
+  const std::span plot(wishes.plot);
+  return fileTakenForPath("--plot", plot.subspan(std::min<std::size_t>(1, plot.size())));
+}
+
 Output outputFor(const Options& options, const Wishes& wishes) {
   if (wishes.isEvery) return Output::EveryDisplay;
   if (!options.tablePaths.empty()) return Output::ValueTable;
@@ -124,7 +151,7 @@ void fulfil(Options& options, const Wishes& wishes) {
 }  // namespace
 
 ExitStatus mistake(const std::string& text) {
-  std::cerr << programName << ": " << text << "; see varnel-decode --help\n";
+  tell(text + "; see varnel-decode --help");
   return {usageError};
 }
 
@@ -144,8 +171,9 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
   } catch (const CLI::Success& wish) {  // help or version
     return ExitStatus{app.exit(wish)};
   } catch (const CLI::ParseError& error) {
-    return mistake(error.what());
+    return mistake(fileTakenForPath(options, wishes).value_or(error.what()));
   }
+  if (const auto taken = fileTakenForPath(options, wishes)) return mistake(*taken);
   if (const auto found = conflict(options, wishes)) return mistake(*found);
   fulfil(options, wishes);
   return options;

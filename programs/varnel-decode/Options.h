@@ -32,7 +32,9 @@ struct Options {
   Output output = Output::Display;
   DisplayWriter writeDisplay = displayAsText;
   std::vector<std::string> tablePaths;  ///< the columns of a value table
-  int logLevel = logErrorPriority;  ///< the highest priority number that goes to standard error; -1 for none
+  /// The highest priority number that goes to standard error; -1 for none. The decoders' own remarks, such as
+  /// that one of several decoders of a log code does not know it, are of no use beside counts.
+  int logLevel = logErrorPriority - 1;
   std::optional<std::string> snapshotPath;   ///< where to write a snapshot file
   std::optional<std::string> binaryLogPath;  ///< where to write the binary log
   std::optional<PlotWish> plot;

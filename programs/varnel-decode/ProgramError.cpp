@@ -4,22 +4,20 @@
 #include <stdexcept>
 #include <system_error>
 
+#include "programs/varnel-decode/Printable.h"
+
 namespace varnel {
 
-namespace {
-
-void tell(const std::runtime_error& error) { std::fprintf(stderr, "%s: %s\n", programName, error.what()); }
-
-}  // namespace
+void tell(std::string_view text) { std::fprintf(stderr, "%s: %s\n", programName, printable(text).c_str()); }
 
 bool succeeds(const std::function<void()>& part) {
   try {
     part();
     return true;
   } catch (const std::system_error& error) {
-    if (error.code() != std::errc::broken_pipe) tell(error);
+    if (error.code() != std::errc::broken_pipe) tell(error.what());
   } catch (const std::runtime_error& error) {
-    tell(error);
+    tell(error.what());
   }
   return false;
 }

@@ -8,6 +8,7 @@
 #include "app/TreeText.h"
 #include "base/PropertyList.h"
 #include "model/VarnelModelNode.h"
+#include "programs/varnel-decode/Printable.h"
 
 namespace varnel {
 
@@ -18,33 +19,32 @@ std::shared_ptr<const VarnelModelNode> treeOf(const Value& display) {
   return VarnelModelNode::makeTreeFromObject_withPathDictionary(display, paths);
 }
 
-void appendEscaped(std::string& lines, std::string_view text) {
+std::string escaped(std::string_view text) {
+  std::string escaped;
   for (const char character : text) {
     switch (character) {
       case '\\':
-        lines += "\\\\";
+        escaped += "\\\\";
         break;
       case '\t':
-        lines += "\\t";
+        escaped += "\\t";
         break;
       case '\n':
-        lines += "\\n";
+        escaped += "\\n";
         break;
       case '\r':
-        lines += "\\r";
+        escaped += "\\r";
         break;
       default:
-        lines += character;
+        escaped += character;
     }
   }
+  return printable(escaped);
 }
 
 void appendPaths(std::string& lines, const VarnelModelNode& node, const std::string& path) {
-  appendEscaped(lines, path);
-  if (const std::string* value = node.value()) {
-    lines += '\t';
-    appendEscaped(lines, *value);
-  }
+  lines += escaped(path);
+  if (const std::string* value = node.value()) lines += '\t' + escaped(*value);
   lines += '\n';
   if (!node.childNodes()) return;
   for (const auto& child : *node.childNodes())
@@ -85,7 +85,8 @@ std::string displayAsPaths(const Value& display) {
 
 std::string jsonString(const std::string& text) {
   using Json = nlohmann::json;
-  return Json(text).dump(-1, ' ', false, Json::error_handler_t::replace);
+  // The library escapes all control characters but DEL and those of C1.
+  return printable(Json(text).dump(-1, ' ', false, Json::error_handler_t::replace));
 }
 
 std::string treeAsJson(const Value& display) {

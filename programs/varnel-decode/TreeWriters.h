@@ -14,7 +14,7 @@ using DisplayWriter = std::string (*)(const Value& display);
 std::string displayAsText(const Value& display);
 
 /// One line a tree node, in pre-order: its path, and for a leaf a tab and its value. Backslash, tab, newline
-/// and carriage return are written as `\\`, `\t`, `\n` and `\r`.
+/// and carriage return are written as `\\`, `\t`, `\n` and `\r`, other control characters as `\u001B`.
 std::string displayAsPaths(const Value& display);
 
 /// The display tree as one line of JSON, names as shown and in the tree's order. A name that occurs twice is

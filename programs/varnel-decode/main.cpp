@@ -16,6 +16,7 @@
 #include "programs/varnel-decode/Options.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/StandardOutput.h"
+#include "programs/varnel-decode/TemplateWatch.h"
 
 namespace varnel {
 
@@ -52,12 +53,14 @@ int run(int argumentCount, char** arguments) {
   CaptureClock clock;
   // The lines that generators write to standard output would spoil the data there.
   std::ostream nowhere(nullptr);
-  const Services services{resources, clock, application, nowhere};
+  const TemplateWatch templates(resources);
+  const Services services{templates, clock, application, nowhere};
 
-  const auto choice = readOptions(argumentCount, arguments, technologiesWithGenerator(services),
-                                  application.version.value_or("(none)"));
+  const std::vector<std::string> technologies = technologiesWithGenerator(services);
+  const auto choice =
+      readOptions(argumentCount, arguments, technologies, application.version.value_or("(none)"));
   if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
-  return decodeAll(std::get<Options>(choice), {services, clock});
+  return decodeAll(std::get<Options>(choice), {services, clock, templates, technologies});
 }
 
 }  // namespace

@@ -372,6 +372,73 @@ TEST(LeafValueUnderPath, ANodeTakesThePathOfARowWithoutAName) {
   EXPECT_EQ(leafAt(nested, "/a/"), none);
 }
 
+Value threeCells() {
+  return Value::ofArray(
+      {dictionaryOf({{"ID", "7"}, {"Band", "1"}, {"RSRP", "-90 dBm"}}),
+       dictionaryOf({{"ID", "16"}, {"Band", "1"}, {"RSRP", "-95 dBm"}}),
+       dictionaryOf({{"ID", "16"}, {"Band", "3"}, {"RSRP", "-99 dBm"}, {"RSRQ", "-9 dB"}})});
+}
+
+TEST(LeafValueUnderPath, BracketsSelectTheFirstRecordWithThatValue) {
+  const Value object = dictionaryOf({{"Cells", threeCells()}});
+  EXPECT_EQ(leafAt(object, "/Cells[ID=7]/RSRP"), "-90 dBm");
+  EXPECT_EQ(leafAt(object, "/Cells[ID=16]/RSRP"), "-95 dBm");
+  EXPECT_EQ(leafAt(object, "/Cells[Band=3]/ID"), "16");
+  EXPECT_EQ(leafAt(object, "/Cells/[Band=3]/ID"), "16") << "in place of a row's number";
+  EXPECT_EQ(leafAt(threeCells(), "/[Band=3]/ID"), "16");
+  EXPECT_EQ(leafAt(object, "/Cells[ID=16]/RSRQ"), none)
+      << "the first record counts, even where it lacks the row";
+  for (const std::string_view path :
+       {"/Cells[ID=1]/RSRP", "/Cells[ID=160]/RSRP", "/Cells[ID=]/RSRP", "/Cells[ID]/RSRP",
+        "/Cells[id=16]/RSRP", "/Cells[ID=16]RSRP", "/Cells[ID=16]", "/Cells[ID=16]/", "/Cells[ID=16",
+        "/Cells[", "/Cells[]/RSRP", "/[", "/Cells/0[ID=7]/RSRP", "/Cells/0/ID[ID=7]"})
+    EXPECT_EQ(leafAt(object, path), none) << path;
+}
+
+TEST(LeafValueUnderPath, SeveralBracketsSelectTheFirstRecordWithAllValues) {
+  const Value object = dictionaryOf({{"Cells", threeCells()}});
+  EXPECT_EQ(leafAt(object, "/Cells[ID=16][Band=3]/RSRP"), "-99 dBm");
+  EXPECT_EQ(leafAt(object, "/Cells[Band=1][ID=16]/RSRP"), "-95 dBm");
+  EXPECT_EQ(leafAt(object, "/Cells[ID=7][Band=3]/RSRP"), none);
+}
+
+TEST(LeafValueUnderPath, RecordsMayBeRowsOfASectionInTheOrderOfTheTree) {
+  const Value object =
+      dictionaryOf({{"Cells", dictionaryOf({{"_sorted", ""},
+                                            {"2;Later", dictionaryOf({{"ID", "1"}, {"Level", "b"}})},
+                                            {"1;Earlier", dictionaryOf({{"ID", "1"}, {"Level", "a"}})}})}});
+  EXPECT_EQ(leafAt(object, "/Cells[ID=1]/Level"), "a");
+}
+
+TEST(LeafValueUnderPath, SelectedRecordsMayHoldListsToSelectFrom) {
+  const Value object = dictionaryOf(
+      {{"A",
+        Value::ofArray({dictionaryOf({{"x", "0"}}), dictionaryOf({{"x", "1"}, {"Cells", threeCells()}})})}});
+  EXPECT_EQ(leafAt(object, "/A[x=1]/Cells[Band=3]/RSRP"), "-99 dBm");
+  EXPECT_EQ(leafAt(object, "/A[x=1]/Cells/0/RSRP"), "-90 dBm");
+}
+
+TEST(LeafValueUnderPath, SelectingNamesAndValuesMayHoldAnyCharacter) {
+  const Value object =
+      dictionaryOf({{"List", Value::ofArray({dictionaryOf({{"a/b=[c]", "x]/y=[z"}, {"v", "1"}}),
+                                             dictionaryOf({{"n", Value::ofInteger(7)}, {"v", "2"}}),
+                                             Value::ofArray({"p", "q"})})}});
+  EXPECT_EQ(leafAt(object, "/List[a/b=[c]=x]/y=[z]/v"), "1");
+  EXPECT_EQ(leafAt(object, "/List[n=(unknown)]/v"), "2");
+  EXPECT_EQ(leafAt(object, "/List[0=p]/1"), "q");
+}
+
+TEST(LeafValueUnderPath, ANameWithBracketsComesBeforeASelection) {
+  const Value object = dictionaryOf({{"Cells[ID=7]", dictionaryOf({{"RSRP", "name"}})},
+                                     {"Cells", threeCells()},
+                                     {"Cells[ID=16]", "leaf"},
+                                     {"Level [dBm]", "-3"}});
+  EXPECT_EQ(leafAt(object, "/Cells[ID=7]/RSRP"), "name");
+  EXPECT_EQ(leafAt(object, "/Cells[ID=16]"), "leaf");
+  EXPECT_EQ(leafAt(object, "/Cells[ID=16]/RSRP"), "-95 dBm");
+  EXPECT_EQ(leafAt(object, "/Level [dBm]"), "-3");
+}
+
 // Every path of the tree, and every path that is a character longer or shorter.
 void expectLikeTheTree(const Value& object) {
   const Tree tree{object};

@@ -76,6 +76,13 @@ TEST_F(GenerationWritersTest, CommaQuoteAndLineEndsAreQuotedAndNothingElse) {
             "2024-03-01T14:05:09.250Z,\"\"\"\"\n");
 }
 
+TEST_F(GenerationWritersTest, OtherControlCharactersAreEscapes) {
+  ValueTable(file.get(), {"Cell/Level"}, "a\x1B").take(generation(cell("b\x7F\xC2\x80,\t")));
+  EXPECT_EQ(written(), "a\\u001B,2024-03-01T14:05:09.250Z,\"b\\u007F\\u0080,\t\"\n");
+  EXPECT_EQ(csvHeader({"c\x9"}, TableColumns::TimeAndValues), "Time,c\t\n");
+  EXPECT_EQ(csvHeader({"c\x01"}, TableColumns::TimeAndValues), "Time,c\\u0001\n");
+}
+
 TEST_F(GenerationWritersTest, AbsentValuesAndSectionsAreEmptyFields) {
   ValueTable(file.get(), {"Cell", "Cell/Level", "Cell/None", "None/Level", ""}, {})
       .take(generation(cell("7")));

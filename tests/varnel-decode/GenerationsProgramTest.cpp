@@ -53,6 +53,36 @@ TEST_F(DecodeGenerations, CsvHasARowForEachDisplay) {
   EXPECT_THAT(result.error, HasSubstr("'Serving Cell Info'")) << "a section has no value";
 }
 
+TEST_F(DecodeGenerations, AMistypedPathIsToldWithTheNearestOnes) {
+  const Result result =
+      decode(threeRecords(), {"--csv", "Serving Cell Info/Num Antennas", "Serving Cell/X[Y=1"});
+  EXPECT_EQ(result.status, 0);
+  EXPECT_EQ(result.error,
+            "varnel-decode: no display of " + folder.file("capture") +
+                " has a value under 'Serving Cell Info/Num Antennas'; did you mean "
+                "'Serving Cell Info/Num Tx Antennas'?\n"
+                "varnel-decode: no display of " +
+                folder.file("capture") +
+                " has a value under 'Serving Cell/X[Y=1'; --format paths shows what there is\n");
+}
+
+TEST_F(DecodeGenerations, CsvFollowsARowByItsValue) {
+  const auto row = [](const std::string& id, const std::string& level) {
+    return "<dict><key>ID</key><string>" + id + "</string><key>Level</key><string>" + level +
+           "</string></dict>";
+  };
+  const auto rows = [](const std::string& content) { return pdpContexts("<array>" + content + "</array>"); };
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, rows(row("7", "a") + row("16", "b"))) +
+                                   pcapRecord(afternoon + 2, 0, rows(row("16", "c") + row("16", "d"))) +
+                                   pcapRecord(afternoon + 4, 0, rows(row("8", "e"))),
+                               {"--csv", "PDP Context Info[ID=16]/Level", "PDP Context Info/0/Level"});
+  EXPECT_EQ(result.output,
+            "Time,PDP Context Info[ID=16]/Level,PDP Context Info/0/Level\n"
+            "2024-03-01T14:05:11.000Z,b,a\n"
+            "2024-03-01T14:05:13.000Z,c,c\n"
+            "2024-03-01T14:05:13.000Z,,e\n");
+}
+
 TEST_F(DecodeGenerations, CsvTakesCapturesBeforeItOrBehindADoubleDash) {
   const std::string path = write("capture", threeRecords());
   const std::string antennasPath = "Serving Cell Info/Num Tx Antennas";

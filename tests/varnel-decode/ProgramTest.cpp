@@ -79,12 +79,88 @@ TEST_F(DecodeProgram, PropertyListKeepsEveryKindOfValue) {
   EXPECT_EQ(*sim->get("EF-ICCID").data(), (Bytes{1, 2}));
 }
 
-TEST_F(DecodeProgram, ACaptureWithoutRecordsHasNoDisplay) {
+TEST_F(DecodeProgram, ACaptureWithoutRecordsHasNoDisplayAndIsStatusOne) {
   EXPECT_EQ(decode(pcapHeader(), {"--format", "paths"}).output, "/\t(unknown)\n");
   EXPECT_EQ(decode(pcapHeader(), {"--format", "json"}).output, "\"(unknown)\"\n");
   EXPECT_EQ(decode(pcapHeader(), {"--format", "text"}).output, "(unknown)\n");
   EXPECT_EQ(decode(pcapHeader(), {"--format", "plist"}).output, "");
-  EXPECT_EQ(decode(pcapHeader()).status, 0);
+  const Result result = decode(pcapHeader());
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(result.error,
+            "varnel-decode: " + folder.file("capture") + " has no records, so there is nothing to show\n");
+}
+
+TEST_F(DecodeProgram, ACaptureOfAnotherTechnologyIsToldByItsLogCodes) {
+  const std::string lte = pcapHeader() + pcapRecord(afternoon, 0, antennas(2)) +
+                          pcapRecord(afternoon, 0, pdpContexts("<array/>")) +
+                          pcapRecord(afternoon, 0, antennas(4));
+  const std::string path = write("walk.pcap", lte);
+  for (const char* technology : {"kalvi-gsm-umts", "kalvi-utran-2", "kalvi-cdma"}) {
+    const Result result = run({"--technology", technology, "--format", "none", path});
+    EXPECT_EQ(result.status, 0);
+    EXPECT_THAT(result.error, StartsWith(std::string("varnel-decode: ") + technology +
+                                         " knows none of the 2 modem messages"));
+    EXPECT_THAT(result.error, HasSubstr(path + " (log codes 0xB0C1); try --technology kalvi-lte\n"));
+    EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  }
+  EXPECT_EQ(run({"--technology", "kalvi-lte", "--format", "none", path}).error, "");
+}
+
+TEST_F(DecodeProgram, ACaptureOfObjectsIsToldAsSuch) {
+  const std::string path =
+      write("walk.pcap", pcapHeader() + pcapRecord(afternoon, 0, list("<string>object</string>")));
+  const Result result = run({"--technology", "kalvi-lte", "--format", "none", path});
+  EXPECT_EQ(result.error, "varnel-decode: kalvi-lte knows none of the 1 modem messages of " + path +
+                              "; try --technology ifx-gsm\n");
+}
+
+TEST_F(DecodeProgram, ACaptureThatNoTechnologyKnowsIsToldAndItsPathsAreNot) {
+  const Result result =
+      decode(pcapHeader() + pcapRecord(afternoon, 0, packet(1, 0xFFFE, "?")), {"--csv", "Serving Cell"});
+  EXPECT_EQ(result.status, 0);
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  EXPECT_THAT(result.error, HasSubstr("(log codes 0xFFFE); nor does any other technology\n"));
+}
+
+TEST_F(DecodeProgram, AMissingTemplateEndsItWithALineThatNamesTheFile) {
+  const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)));
+  const std::string resources = folder.file("resources");
+  std::filesystem::create_directory(resources);
+  std::ofstream(resources + "/Other.plist") << list("<string>other</string>");
+  for (const bool isDamaged : {false, true}) {
+    if (isDamaged) std::ofstream(resources + "/LTE.plist") << "no list";
+    Process process("/bin/sh",
+                    {"-c", "VARNEL_RESOURCES=" + resources +
+                               " exec " VARNEL_DECODE_PROGRAM " --technology kalvi-lte --every " + path});
+    const Result result = finish(process);
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+    EXPECT_THAT(result.error, StartsWith("varnel-decode: the display template " + resources + "/LTE.plist"));
+  }
+}
+
+TEST_F(DecodeProgram, NothingFromACaptureSteersATerminal) {
+  // ESC, DEL and the one-character CSI of C1.
+  const std::string object = list("<dict><key>a\x7F</key><string>b\xC2\x9B\xC3\xA9</string></dict>");
+  const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, object));
+  const auto outputAs = [&](std::vector<std::string> options) {
+    options.insert(options.begin(), {"--technology", "ifx-gsm", path});
+    return run(options).output;
+  };
+  EXPECT_EQ(outputAs({"--format", "paths"}), "/\n/a\\u007F\tb\\u009B\xC3\xA9\n");
+  EXPECT_EQ(outputAs({"--format", "json"}), "{\"a\\u007F\":\"b\\u009B\xC3\xA9\"}\n");
+  EXPECT_EQ(outputAs({"--format", "text"}), "a\\x7f  b\\x9b\xC3\xA9\n");
+  EXPECT_THAT(outputAs({"--csv", "a\x7F"}), StartsWith("Time,a\\u007F\n"));
+  EXPECT_THAT(outputAs({"--csv", "a\x7F"}), HasSubstr(",b\\u009B\xC3\xA9\n"));
+}
+
+TEST_F(DecodeProgram, HeadingsAndMessagesShowNamesOfFilesPrintable) {
+  const std::string path = write("walk\n\x1B[2J.pcap", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)));
+  const std::string shown = folder.file("walk\\u000A\\u001B[2J.pcap");
+  EXPECT_THAT(run({"--technology", "kalvi-lte", path, path}).output, StartsWith("==> " + shown + " <==\n"));
+  EXPECT_THAT(run({"--technology", "kalvi-lte", path + "x"}).error, HasSubstr(shown + "x"));
+  EXPECT_THAT(run({path}).error, HasSubstr(shown));
 }
 
 TEST_F(DecodeProgram, ADisplayThatNoPropertyListHoldsIsAnError) {
@@ -104,13 +180,18 @@ TEST_F(DecodeProgram, EveryTechnologyKeepsItsLinesOutOfTheData) {
   const std::string path = write("capture", pcapHeader());
   for (const char* technology : {"ifx-gsm", "kalvi-gsm-umts", "kalvi-lte", "kalvi-utran-2"}) {
     const Result result = run({"--technology", technology, "--format", "paths", path});
-    EXPECT_EQ(result.status, 0) << technology << ": " << result.error;
-    EXPECT_EQ(result.output, "/\t(unknown)\n") << technology;
+    EXPECT_EQ(result.output, "/\t(unknown)\n") << technology << ": " << result.error;
   }
 }
 
-TEST_F(DecodeProgram, ErrorLinesAreLoggedByDefaultAndWarningsAreNot) {
-  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)));
+TEST_F(DecodeProgram, ByDefaultNoLogLineContradictsTheCounts) {
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)), {"--stats"});
+  EXPECT_THAT(result.output, HasSubstr("\n0xB0C1                 1            1 "));
+  EXPECT_EQ(result.error, "");
+}
+
+TEST_F(DecodeProgram, LogLevelThreeAddsErrorLinesAndNoWarnings) {
+  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, antennas(2)), {"--log-level", "3"});
   EXPECT_THAT(result.error, StartsWith("<3>Creating LTELogGenerator object\n"));
   EXPECT_THAT(result.error, HasSubstr("\n<3>Received an unknown log message: 45249\n"));
   EXPECT_THAT(result.error, Not(HasSubstr("<4>")));
@@ -133,7 +214,8 @@ TEST_F(DecodeProgram, LogLevelMinusOneSilencesTheLog) {
 }
 
 TEST_F(DecodeProgram, ANewlineThatEndsALogTextIsNotDoubled) {
-  const Result result = decode(pcapHeader() + pcapRecord(afternoon, 0, packet(0xFF, 1, "no list")));
+  const Result result =
+      decode(pcapHeader() + pcapRecord(afternoon, 0, packet(0xFF, 1, "no list")), {"--log-level", "3"});
   EXPECT_THAT(result.error, HasSubstr("\n<3>Failed to get Cell Array\n"));
   EXPECT_THAT(result.error, Not(HasSubstr("\n\n")));
 }
@@ -142,7 +224,7 @@ TEST_F(DecodeProgram, AnUnreadableSIMPayloadAbortsAfterItsLogLineWithoutADisplay
   const std::string snapshot = folder.file("snapshot");
   const Result result = decode(
       pcapHeader() + pcapRecord(afternoon, 0, antennas(2)) + pcapRecord(afternoon, 0, packet(0xFF, 0, "?")),
-      {"--snapshot", snapshot});
+      {"--snapshot", snapshot, "--log-level", "3"});
   EXPECT_EQ(result.status, -SIGABRT);
   EXPECT_EQ(result.output, "");
   EXPECT_THAT(result.error, HasSubstr("\n<3>SIM File dictionary data could not be constructed\n"));
@@ -270,6 +352,34 @@ TEST_F(DecodeProgram, AnUnknownTechnologyNamesThoseThatExist) {
   }
 }
 
+TEST_F(DecodeProgram, AFileThatWasTakenForAPathIsNamed) {
+  const std::string path = write("walk.pcap", pcapHeader());
+  const std::string other = write("other.pcap", pcapHeader());
+  const std::string plot = folder.file("plot.svg");
+  const std::string advice = " took " + path + " for a path; put -- before it; see varnel-decode --help\n";
+  struct Case {
+    std::vector<std::string> arguments;
+    const char* option;
+  };
+  const Case cases[] = {{{"--csv", path}, "--csv"},
+                        {{"--csv", "A/B", path, other}, "--csv"},
+                        {{other, "--csv", "A/B", path}, "--csv"},
+
+                        {{"--plot", plot, "A/B", path, other}, "--plot"}};
+  for (const auto& [arguments, option] : cases) {
+    std::vector<std::string> all = {"--technology", "kalvi-lte"};
+    all.insert(all.end(), arguments.begin(), arguments.end());
+    const Result result = run(all);
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.error, std::string("varnel-decode: ") + option + advice)
+        << ::testing::PrintToString(all);
+  }
+}
+
+TEST_F(DecodeProgram, HelpNamesTheFolderOfTheTemplates) {
+  EXPECT_THAT(run({"--help"}).output, HasSubstr("VARNEL_RESOURCES"));
+}
+
 TEST_F(DecodeProgram, HelpIsOnStandardOutput) {
   const Result result = run({"--help"});
   EXPECT_EQ(result.status, 0);
@@ -334,7 +444,7 @@ TEST_F(DecodeProgram, ASnapshotHoldsTheHistoryByTheCapturesClockAndTheBinaryLog)
 
 TEST_F(DecodeProgram, TheSnapshotOfAnEmptyCaptureIsOf1970) {
   const std::string path = folder.file("snapshot");
-  EXPECT_EQ(decode(pcapHeader(), {"--snapshot", path}).status, 0);
+  EXPECT_EQ(decode(pcapHeader(), {"--snapshot", path}).status, 1);
   EXPECT_THAT(contentsOf(path), HasSubstr("<string>1970-01-01 00:00:00 +0000</string>"));
 }
 
@@ -349,7 +459,7 @@ TEST_F(DecodeProgram, ASnapshotThatCannotBeWrittenLeavesTheDisplayAndIsStatusOne
 }
 
 TEST_F(DecodeProgram, AnOutputThatCannotBeWrittenIsStatusOne) {
-  const std::string path = write("capture", pcapHeader());
+  const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)));
   for (const char* output : {" >/dev/full", " >&-"}) {
     const Result result = runInShell("--log-level -1 " + path + output);
     EXPECT_EQ(result.status, 1) << output;
