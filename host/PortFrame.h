@@ -42,6 +42,8 @@ class FrameReader {
   /// True once a length or a mark has been met that no frame has. What follows cannot be understood: there
   /// are no more frames, and bytes are dropped.
   bool isFaulty() const { return _isFaulty; }
+  /// True while some but not all bytes of a frame have arrived, once `next` has returned nothing.
+  bool hasUnfinishedFrame() const { return _bytes.size() > _taken; }
 
  private:
   void giveUp();

@@ -5,22 +5,31 @@
 #include <sys/un.h>
 #include <unistd.h>
 
-#include <QFile>
+#include <cerrno>
 #include <stdexcept>
 #include <string>
+#include <utility>
+
+#include "base/Log.h"
 
 namespace varnel {
 
 namespace {
 
-// Room for the final zero, and for a byte that QLocalServer wants to spare.
+// Room for the final zero and for one more byte.
 constexpr std::size_t longestPath = sizeof(sockaddr_un::sun_path) - 2;
-constexpr int connectTimeout_ms = 1000;
 // Bytes that have arrived and wait to be taken, and bytes that wait to be sent, at most.
 constexpr qint64 readBufferSize = 1 << 20;
 constexpr qint64 sendBufferSize = 4 << 20;
 
 }  // namespace
+
+sockaddr_un socketAddress(const std::filesystem::path& path) {
+  sockaddr_un address{};
+  address.sun_family = AF_UNIX;
+  path.native().copy(address.sun_path, sizeof address.sun_path - 1);
+  return address;
+}
 
 std::filesystem::path socketPath(const std::filesystem::path& folder, std::string_view name) {
   if (name.empty() || name.find('/') != std::string_view::npos || name.find('\0') != std::string_view::npos)
@@ -29,21 +38,25 @@ std::filesystem::path socketPath(const std::filesystem::path& folder, std::strin
   if (path.native().size() > longestPath) {
     throw std::runtime_error("the socket's path " + path.string() + " is longer than " +
                              std::to_string(longestPath) +
-                             " bytes: choose a runtime folder with a shorter one");
+                             " bytes: choose a runtime folder with a shorter one, with --runtime-dir");
   }
   return path;
 }
 
-std::unique_ptr<SocketConnection> SocketConnection::open(const std::filesystem::path& path) {
-  auto socket = std::make_unique<QLocalSocket>();
-  socket->connectToServer(QFile::decodeName(path.c_str()));
-  if (socket->state() == QLocalSocket::ConnectingState) socket->waitForConnected(connectTimeout_ms);
-  if (socket->state() != QLocalSocket::ConnectedState) return nullptr;
+SocketConnection::Opening SocketConnection::open(const std::filesystem::path& path) {
+  FileDescriptor socket(::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
+  const sockaddr_un address = socketAddress(path);
+  if (::connect(socket.number(), reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0)
+    return {nullptr, errno};
   auto connection = std::make_unique<SocketConnection>(std::move(socket));
-  return connection->hasTrustedPeer() ? std::move(connection) : nullptr;
+  if (!connection->hasTrustedPeer()) return {nullptr, EPERM};
+  return {std::move(connection), 0};
 }
 
-SocketConnection::SocketConnection(std::unique_ptr<QLocalSocket> socket) : _socket(std::move(socket)) {
+SocketConnection::SocketConnection(FileDescriptor socket, std::shared_ptr<const void> place,
+                                   std::chrono::milliseconds frameTime)
+    : _place(std::move(place)), _socket(std::make_unique<QLocalSocket>()) {
+  _socket->setSocketDescriptor(socket.release());
   // Without a bound a flood would fill the memory while its reader is busy.
   _socket->setReadBufferSize(readBufferSize);
   // Queued: a handler that destroys the socket must not do so from within the socket's own doings, and a wait
@@ -53,6 +66,12 @@ SocketConnection::SocketConnection(std::unique_ptr<QLocalSocket> socket) : _sock
                    Qt::QueuedConnection);
   QObject::connect(_socket.get(), &QLocalSocket::disconnected, _socket.get(), handleActivity,
                    Qt::QueuedConnection);
+  _frameTime.setSingleShot(true);
+  _frameTime.setInterval(frameTime);
+  _frameTime.callOnTimeout(_socket.get(), [this] {
+    _isOverdue = true;
+    wake();
+  });
 }
 
 SocketConnection::~SocketConnection() {
@@ -93,12 +112,35 @@ void SocketConnection::callActivityHandler() noexcept {
 
 std::optional<Frame> SocketConnection::nextFrame() {
   while (true) {
-    if (const auto frame = _reader.next()) return frame;
+    if (const auto frame = _reader.next()) {
+      _frameTime.stop();
+      _isOverdue = false;
+      return frame;
+    }
     if (_reader.isFaulty()) _socket->abort();
     if (!isOpen() && _socket->bytesAvailable() == 0) return std::nullopt;
-    const qint64 count = _socket->read(_chunk.data(), static_cast<qint64>(_chunk.size()));
-    if (count <= 0) return std::nullopt;
-    _reader.feed({reinterpret_cast<const std::uint8_t*>(_chunk.data()), static_cast<std::size_t>(count)});
+    if (feedReader()) continue;
+    // What came while this program was held up counts.
+    if (_isOverdue && _socket->waitForReadyRead(0)) continue;
+    watchFrameTime();
+    return std::nullopt;
+  }
+}
+
+bool SocketConnection::feedReader() {
+  const qint64 count = _socket->read(_chunk.data(), static_cast<qint64>(_chunk.size()));
+  if (count <= 0) return false;
+  _reader.feed({reinterpret_cast<const std::uint8_t*>(_chunk.data()), static_cast<std::size_t>(count)});
+  return true;
+}
+
+void SocketConnection::watchFrameTime() {
+  if (!_reader.hasUnfinishedFrame()) return;
+  if (_isOverdue) {
+    logWarning("A peer's frame was not whole in time: the connection ends");
+    _socket->abort();
+  } else if (!_frameTime.isActive()) {
+    _frameTime.start();
   }
 }
 

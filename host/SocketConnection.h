@@ -1,16 +1,20 @@
 #pragma once
 
 #include <sys/types.h>
+#include <sys/un.h>
 
 #include <QDeadlineTimer>
 #include <QLocalSocket>
+#include <QTimer>
 #include <array>
+#include <chrono>
 #include <filesystem>
 #include <functional>
 #include <memory>
 #include <optional>
 #include <string_view>
 
+#include "host/FileDescriptor.h"
 #include "host/PortFrame.h"
 
 namespace varnel {
@@ -19,17 +23,30 @@ namespace varnel {
 /// empty one, one with a slash, one that makes the path longer than socket addresses are.
 std::filesystem::path socketPath(const std::filesystem::path& folder, std::string_view name);
 
+/// The address of the socket at a path that `socketPath` has made.
+sockaddr_un socketAddress(const std::filesystem::path& path);
+
 /// Whether a process of the one user trusts a peer of the other: of the same user or of root.
 constexpr bool isTrusted(uid_t peer, uid_t self) { return peer == self || peer == 0; }
+
+/// How long a frame may take from its first byte to its last.
+inline constexpr std::chrono::milliseconds longestFrameTime = std::chrono::seconds(10);
 
 /// One end of a local stream socket that carries frames.
 class SocketConnection final {
  public:
-  /// Connects to the socket at that path; null when nobody answers there, or somebody who is not trusted.
-  static std::unique_ptr<SocketConnection> open(const std::filesystem::path& path);
+  struct Opening {
+    std::unique_ptr<SocketConnection> connection;  ///< null when it could not be made
+    int error = 0;                                 ///< the system's; EPERM for a peer who is not trusted
+  };
+  /// Connects to the socket at that path, at once or not at all: a peer whose queue is full is not waited
+  /// for.
+  static Opening open(const std::filesystem::path& path);
 
-  /// Takes over a socket that is connected.
-  explicit SocketConnection(std::unique_ptr<QLocalSocket> socket);
+  /// Takes over a socket that is connected, and the place that it has among others until it goes. A frame
+  /// that is not whole after that time ends the connection.
+  explicit SocketConnection(FileDescriptor socket, std::shared_ptr<const void> place = nullptr,
+                            std::chrono::milliseconds frameTime = longestFrameTime);
   SocketConnection(const SocketConnection&) = delete;
   SocketConnection& operator=(const SocketConnection&) = delete;
   /// What can go out without waiting still does.
@@ -66,8 +83,13 @@ class SocketConnection final {
  private:
   bool waitUntilUnsent(qint64 limit, const QDeadlineTimer& deadline);
   void callActivityHandler() noexcept;
+  bool feedReader();
+  void watchFrameTime();
 
+  std::shared_ptr<const void> _place;
   std::unique_ptr<QLocalSocket> _socket;
+  QTimer _frameTime;        // runs while a frame is not whole
+  bool _isOverdue = false;  // true once the frame that is not whole has had its time
   FrameReader _reader;
   std::array<char, 65536> _chunk;
   Bytes _outgoing;  // one frame while it is being queued; kept for its room

@@ -4,11 +4,12 @@
 #include <exception>
 #include <string>
 #include <utility>
-#include <vector>
 
 #include "base/Log.h"
+#include "host/LinkMonitor.h"
 #include "host/SocketConnection.h"
 #include "host/SocketServer.h"
+#include "host/TelephonyProtocol.h"
 
 namespace varnel {
 
@@ -19,14 +20,15 @@ class SocketLocalPort final : public LocalPort {
   SocketLocalPort(const std::filesystem::path& path, MessageHandler handler)
       : _delivery(std::make_shared<Delivery>(Delivery{std::move(handler)})),
         _server(std::make_unique<SocketServer>(
-            path, [this](std::unique_ptr<SocketConnection> peer) { add(std::move(peer)); })) {}
+            path, [this](std::unique_ptr<SocketConnection> peer) { setPeer(std::move(peer)); },
+            SocketLimits{.connections = 1})) {}
   SocketLocalPort(const SocketLocalPort&) = delete;
   SocketLocalPort& operator=(const SocketLocalPort&) = delete;
   ~SocketLocalPort() override { end(); }
 
   void deliverOnMainQueue() override {
     _delivery->hasBegun = true;
-    for (const auto& peer : _peers) peer->wake();
+    if (_peer) _peer->wake();
   }
 
   void setInvalidationHandler(InvalidationHandler handler) override {
@@ -51,17 +53,17 @@ class SocketLocalPort final : public LocalPort {
   void end() {
     _delivery->hasEnded = true;
     _server.reset();
-    _peers.clear();
+    _peer.reset();
   }
 
-  void add(std::shared_ptr<SocketConnection> peer) {
+  void setPeer(std::shared_ptr<SocketConnection> peer) {
     peer->setActivityHandler([this, weak = std::weak_ptr(peer)] {
       const auto active = weak.lock();
       const auto delivery = _delivery;
       if (!deliver(*delivery, *active) || active->isOpen()) return;
       invalidate();
     });
-    _peers.push_back(std::move(peer));
+    _peer = std::move(peer);
   }
 
   // Delivers what the peer has sent. False when the port does not deliver, or no longer exists.
@@ -91,14 +93,14 @@ class SocketLocalPort final : public LocalPort {
 
   std::shared_ptr<Delivery> _delivery;
   InvalidationHandler _invalidationHandler;
-  std::vector<std::shared_ptr<SocketConnection>> _peers;
-  std::unique_ptr<SocketServer> _server;  // null once the port has ended
+  std::shared_ptr<SocketConnection> _peer;  // null until somebody has connected
+  std::unique_ptr<SocketServer> _server;    // null once the port has ended
 };
 
 class SocketRemotePort final : public RemotePort {
  public:
-  explicit SocketRemotePort(std::unique_ptr<SocketConnection> connection)
-      : _connection(std::move(connection)) {
+  SocketRemotePort(std::unique_ptr<SocketConnection> connection, LinkMonitor* monitor)
+      : _connection(std::move(connection)), _monitor(monitor) {
     // Nobody waits: replies that come now are late.
     _connection->setActivityHandler([this] {
       while (takeFrame()) {
@@ -120,7 +122,9 @@ class SocketRemotePort final : public RemotePort {
     ++_awaitedReplies;
     const bool isSent = _connection->waitUntilSent(sendDeadline);
     if (!isSent && _connection->isOpen()) return {sendTimeout, std::nullopt};
-    return awaitReply(QDeadlineTimer(*replyTimeout));
+    const SendResult result = awaitReply(QDeadlineTimer(*replyTimeout));
+    if (result.status != 0 && _monitor) _monitor->commandWentUnanswered();
+    return result;
   }
 
   bool isValid() const override { return _connection && !_connection->peerHasGone(); }
@@ -155,29 +159,44 @@ class SocketRemotePort final : public RemotePort {
   }
 
   std::unique_ptr<SocketConnection> _connection;  // null once the port was invalidated
-  std::uint64_t _awaitedReplies = 0;              // requests that no answer has come for
+  LinkMonitor* _monitor;
+  std::uint64_t _awaitedReplies = 0;  // requests that no answer has come for
 };
+
+// The handler gets these messages too, whose identifier it does not know.
+LocalPort::MessageHandler showingReports(LinkMonitor& monitor, LocalPort::MessageHandler handler) {
+  return [&monitor, handler = std::move(handler)](std::int32_t identifier, ByteView data) {
+    if (identifier == telephonyProtocol::streamReportIdentifier) monitor.takeStreamReport(data);
+    return handler(identifier, data);
+  };
+}
 
 }  // namespace
 
 MessagePorts::LocalPortCreation SocketPorts::createLocalPort(std::string_view name,
                                                              LocalPort::MessageHandler handler) {
+  if (_monitor) handler = showingReports(*_monitor, std::move(handler));
   try {
     return {std::make_unique<SocketLocalPort>(socketPath(_folder, name), std::move(handler)), false};
   } catch (const SocketNameTaken&) {
+    if (_monitor) _monitor->portNameIsTaken();
     return {nullptr, true};
   } catch (const std::runtime_error& error) {
     logError("%s", error.what());
+    if (_monitor) _monitor->failed(error.what());
     return {};
   }
 }
 
 std::unique_ptr<RemotePort> SocketPorts::createRemotePort(std::string_view name) {
   try {
-    auto connection = SocketConnection::open(socketPath(_folder, name));
-    return connection ? std::make_unique<SocketRemotePort>(std::move(connection)) : nullptr;
+    auto [connection, error] = SocketConnection::open(socketPath(_folder, name));
+    if (_monitor && connection) _monitor->linkIsOpen();
+    if (_monitor && !connection) _monitor->serverIsOutOfReach(error);
+    return connection ? std::make_unique<SocketRemotePort>(std::move(connection), _monitor) : nullptr;
   } catch (const std::runtime_error& error) {
     logError("%s", error.what());
+    if (_monitor) _monitor->failed(error.what());
     return nullptr;
   }
 }

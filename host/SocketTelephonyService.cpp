@@ -6,6 +6,7 @@
 #include "base/Dictionary.h"
 #include "base/Log.h"
 #include "base/PropertyList.h"
+#include "host/LinkMonitor.h"
 #include "host/SocketConnection.h"
 #include "host/TelephonyProtocol.h"
 
@@ -36,9 +37,10 @@ TelephonyConnection::LogChannel logChannel(ByteView reply) {
 class SocketTelephonyConnection final : public TelephonyConnection {
  public:
   SocketTelephonyConnection(std::shared_ptr<SocketConnection> connection, std::chrono::milliseconds timeout,
-                            std::function<void()> notificationHandler)
+                            LinkMonitor* monitor, std::function<void()> notificationHandler)
       : _connection(std::move(connection)),
         _replyTimeout(timeout),
+        _monitor(monitor),
         _notificationHandler(std::make_shared<std::function<void()>>(std::move(notificationHandler))) {
     _connection->setActivityHandler([weak = std::weak_ptr(_connection), handler = _notificationHandler] {
       const auto active = weak.lock();
@@ -47,6 +49,14 @@ class SocketTelephonyConnection final : public TelephonyConnection {
   }
 
   LogChannel createLogChannel(std::string_view localPortName) override {
+    LinkMonitor* const monitor = _monitor;  // as this object may go meanwhile
+    LogChannel channel = askForLogChannel(localPortName);
+    if (channel.error != 0 && monitor) monitor->channelWasRefused(channel.error);
+    return channel;
+  }
+
+ private:
+  LogChannel askForLogChannel(std::string_view localPortName) {
     // Held here, since the notification handler may destroy this object.
     const auto connection = _connection;
     const auto handler = _notificationHandler;
@@ -63,13 +73,13 @@ class SocketTelephonyConnection final : public TelephonyConnection {
     return {protocol::noReply, std::nullopt};
   }
 
- private:
   static void notify(const Frame& frame, const std::function<void()>& handler) noexcept {
     if (frame.mark == FrameMark::Notification && handler) handler();
   }
 
   std::shared_ptr<SocketConnection> _connection;
   std::chrono::milliseconds _replyTimeout;
+  LinkMonitor* _monitor;
   std::shared_ptr<const std::function<void()>> _notificationHandler;
 };
 
@@ -78,12 +88,16 @@ class SocketTelephonyConnection final : public TelephonyConnection {
 std::unique_ptr<TelephonyConnection> SocketTelephonyService::connect(
     std::function<void()> notificationHandler) {
   try {
-    auto connection = SocketConnection::open(socketPath(_folder, protocol::socketName));
-    if (!connection) return nullptr;
-    return std::make_unique<SocketTelephonyConnection>(std::move(connection), _replyTimeout,
+    auto [connection, error] = SocketConnection::open(socketPath(_folder, protocol::socketName));
+    if (!connection) {
+      if (_monitor) _monitor->serverIsOutOfReach(error);
+      return nullptr;
+    }
+    return std::make_unique<SocketTelephonyConnection>(std::move(connection), _replyTimeout, _monitor,
                                                        std::move(notificationHandler));
   } catch (const std::runtime_error& error) {
     logError("%s", error.what());
+    if (_monitor) _monitor->failed(error.what());
     return nullptr;
   }
 }

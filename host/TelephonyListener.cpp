@@ -4,7 +4,6 @@
 
 #include "base/Dictionary.h"
 #include "base/PropertyList.h"
-#include "host/SocketServer.h"
 #include "host/TelephonyProtocol.h"
 
 namespace varnel {
@@ -27,14 +26,22 @@ std::optional<Bytes> replyOf(const TelephonyConnection::LogChannel& channel) {
   return writeXmlPropertyList(reply);
 }
 
+// What a client reads whom there is no room for, as if it had asked.
+Bytes refusal() {
+  Bytes bytes;
+  const auto reply = replyOf({protocol::tooManyConnections, std::nullopt});
+  appendFrame(bytes, {0, FrameMark::Reply, reply.value()});
+  return bytes;
+}
+
 }  // namespace
 
 TelephonyListener::TelephonyListener(const std::filesystem::path& runtimeFolder,
-                                     LogChannelMaker makeLogChannel)
+                                     LogChannelMaker makeLogChannel, const SocketLimits& limits)
     : _makeLogChannel(std::move(makeLogChannel)),
       _server(std::make_unique<SocketServer>(
           socketPath(runtimeFolder, protocol::socketName),
-          [this](std::unique_ptr<SocketConnection> client) { add(std::move(client)); })) {}
+          [this](std::unique_ptr<SocketConnection> client) { add(std::move(client)); }, limits, refusal())) {}
 
 TelephonyListener::~TelephonyListener() = default;
 

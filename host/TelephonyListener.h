@@ -7,12 +7,10 @@
 #include <vector>
 
 #include "base/Bytes.h"
+#include "host/SocketServer.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
-
-class SocketConnection;
-class SocketServer;
 
 /// The server's side of the telephony service: takes connections, checks requests and notifies clients. Every
 /// new connection is greeted with one notification.
@@ -24,7 +22,8 @@ class TelephonyListener final {
 
   /// Listens at once; everything happens on the event loop. The folder's path is absolute. Throws
   /// std::runtime_error when another server runs in that folder or the socket cannot be made.
-  TelephonyListener(const std::filesystem::path& runtimeFolder, LogChannelMaker makeLogChannel);
+  TelephonyListener(const std::filesystem::path& runtimeFolder, LogChannelMaker makeLogChannel,
+                    const SocketLimits& limits = {});
   TelephonyListener(const TelephonyListener&) = delete;
   TelephonyListener& operator=(const TelephonyListener&) = delete;
   ~TelephonyListener();

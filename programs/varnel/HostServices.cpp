@@ -10,8 +10,9 @@ namespace varnel {
 HostServices::HostServices(const Options& options, const ApplicationInfo& application)
     : _log({.programName = programName, .standardErrorLevel = options.logLevel}),
       _folder(runtimeFolder(options.runtimeFolder)),
-      _ports(_folder),
-      _telephony(_folder),
+      _link(_folder),
+      _ports(_folder, &_link),
+      _telephony(_folder, std::chrono::seconds(1), &_link),
       _resources(readableResourceFolder()),
       _files(options.deviceRoot),
       _preferences(options.deviceRoot),

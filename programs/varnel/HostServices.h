@@ -4,6 +4,7 @@
 #include "host/FilePreferences.h"
 #include "host/FileResources.h"
 #include "host/HostLog.h"
+#include "host/LinkMonitor.h"
 #include "host/RootedFiles.h"
 #include "host/SocketPorts.h"
 #include "host/SocketTelephonyService.h"
@@ -21,12 +22,14 @@ class HostServices final {
   HostServices(const Options& options, const ApplicationInfo& application);
 
   ModelServices model();
+  const LinkReports& link() const { return _link; }
   DeviceFiles& files() { return _files; }
   Preferences& preferences() { return _preferences; }
 
  private:
   HostLog _log;
   std::filesystem::path _folder;
+  LinkMonitor _link;
   SocketPorts _ports;
   SocketTelephonyService _telephony;
   EventLoopQueue _queue;
