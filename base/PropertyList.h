@@ -18,6 +18,11 @@ struct PropertyListLimits {
   std::size_t keyPairs;  ///< squared number of keys, summed over the dictionaries: each may meet each other
   std::size_t entityMoves;  ///< entities of an XML text times its bytes, summed over the texts
   std::size_t pathBytes;    ///< bytes of the keys that lead to a value, one more each, summed over the values
+
+  enum class Expansion {
+    Allowed,        ///< up to these bounds, however short the list
+    GrowsWithSize,  ///< a short list no further than a message, a longer one in proportion to its size
+  } expansion = Expansion::Allowed;
 };
 
 /// For messages of the log channel and whatever else arrives by itself. Whatever the message, reading it
@@ -31,7 +36,8 @@ inline constexpr PropertyListLimits messageLimits{
     .entityMoves = std::size_t{1} << 30,
     .pathBytes = std::size_t{8} << 20,
 };
-/// For files that the user names: snapshots, templates.
+/// For files that the user names: snapshots, templates. A short file that expands to a long one is no work of
+/// a user's.
 inline constexpr PropertyListLimits fileLimits{
     .size = std::size_t{256} << 20,
     .depth = 128,
@@ -40,6 +46,7 @@ inline constexpr PropertyListLimits fileLimits{
     .keyPairs = std::size_t{1} << 30,
     .entityMoves = std::size_t{1} << 36,
     .pathBytes = std::size_t{1} << 30,
+    .expansion = PropertyListLimits::Expansion::GrowsWithSize,
 };
 
 /// Reads an XML or binary property list, the order of keys kept; of a key that occurs twice the first place

@@ -297,6 +297,19 @@ class BinaryWalk {
   std::uint64_t _objectCount = 0;
 };
 
+// Writers share equal texts, so those expand; no writer shares containers.
+PropertyListLimits limitsForSize(PropertyListLimits limits, std::size_t size) {
+  if (limits.expansion == PropertyListLimits::Expansion::Allowed) return limits;
+  constexpr std::size_t nodesPerByte = 1, bytesPerByte = 64, pathBytesPerByte = 1024;
+  const auto lower = [size](std::size_t& bound, std::size_t ofMessages, std::size_t perByte) {
+    bound = std::min(bound, ofMessages + perByte * size);
+  };
+  lower(limits.expandedNodes, messageLimits.expandedNodes, nodesPerByte);
+  lower(limits.expandedBytes, messageLimits.expandedBytes, bytesPerByte);
+  lower(limits.pathBytes, 4 * messageLimits.pathBytes, pathBytesPerByte);
+  return limits;
+}
+
 }  // namespace
 
 bool isBinaryPropertyList(ByteView bytes) {
@@ -304,8 +317,9 @@ bool isBinaryPropertyList(ByteView bytes) {
          std::equal(binaryMagic.begin(), binaryMagic.end(), bytes.begin());
 }
 
-bool isSafeToParse(ByteView bytes, const PropertyListLimits& limits) {
-  if (bytes.size() > limits.size) return false;
+bool isSafeToParse(ByteView bytes, const PropertyListLimits& widest) {
+  if (bytes.size() > widest.size) return false;
+  const PropertyListLimits limits = limitsForSize(widest, bytes.size());
   return isBinaryPropertyList(bytes) ? BinaryWalk(bytes, limits).passes() : XmlScan(bytes, limits).passes();
 }
 

@@ -505,6 +505,43 @@ TEST(PropertyListLimit, BytesCountAsOftenAsTheyAreReferredTo) {
   EXPECT_FALSE(read(binary({"\x64\x00w\x00x\x00y\x00z"s}), limits));
 }
 
+// Arrays in arrays, each holding the next one twelve times: 248,832 values at the fifth level.
+std::string nodeBomb(std::string_view padding = {}) {
+  std::vector<std::string> objects;
+  for (char next = 1; next <= 5; ++next) objects.push_back("\xAC" + std::string(12, next));
+  objects.emplace_back("\x09");
+  objects.emplace_back(padding);  // which nothing refers to
+  return binary(objects);
+}
+
+TEST(PropertyListLimit, AShortFileExpandsToNoMoreNodesThanAMessage) {
+  ASSERT_LT(nodeBomb().size(), 165u);
+  EXPECT_FALSE(read(nodeBomb(), fileLimits));
+}
+
+TEST(PropertyListLimit, ALongerFileMayExpandToANodeMoreForEachByte) {
+  EXPECT_FALSE(read(nodeBomb(std::string(200'000, '\0')), fileLimits));
+  EXPECT_TRUE(read(nodeBomb(std::string(206'000, '\0')), fileLimits));  // 271,453 nodes
+}
+
+TEST(PropertyListLimit, TextsThatAShortFileSharesExpandTo64TimesItsSizeAndThatOfAMessage) {
+  const auto shared = [](std::size_t times) {
+    return binary(
+        {sized(0xA, times) + std::string(times, '\x01'), sized(0x5, 100'000) + repeated("x", 100'000)});
+  };
+  EXPECT_TRUE(read(shared(100), fileLimits));   // 10,000,000 bytes of 4,194,304 + 64 * 100,166
+  EXPECT_FALSE(read(shared(110), fileLimits));  // 11,000,000
+}
+
+TEST(PropertyListLimit, PathsThatAShortFileSharesHaveABoundThatGrowsWithIt) {
+  const auto shared = [](std::size_t values) {
+    return binary({"\xD1\x01\x02", sized(0x5, 10'000) + repeated("k", 10'000),
+                   sized(0xA, values) + std::string(values, '\x03'), "\x09"});
+  };
+  EXPECT_TRUE(read(shared(4'000), fileLimits));   // 40 MB
+  EXPECT_FALSE(read(shared(6'000), fileLimits));  // 60 MB of 33,554,432 + 1024 * 16,098
+}
+
 TEST(PropertyListLimit, KeyPairsAreSummedOverTheDictionaries) {
   PropertyListLimits limits = wide;
   limits.keyPairs = 8;
