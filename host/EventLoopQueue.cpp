@@ -1,6 +1,8 @@
 #include "host/EventLoopQueue.h"
 
 #include <QTimer>
+#include <algorithm>
+#include <limits>
 #include <utility>
 
 namespace varnel {
@@ -12,13 +14,19 @@ auto endingWithExceptions(MainQueue::Task task) {
   return [task = std::move(task)]() noexcept { task(); };
 }
 
+// What the toolkit's timer can hold, which is 24.8 days at most.
+std::chrono::milliseconds clamped(std::chrono::milliseconds delay) {
+  constexpr std::chrono::milliseconds longest(std::numeric_limits<int>::max());
+  return std::clamp(delay, std::chrono::milliseconds(0), longest);
+}
+
 class EventLoopTimer final : public RepeatingTimer {
  public:
   EventLoopTimer(std::chrono::milliseconds interval, MainQueue::Task task) {
     _timer.setTimerType(Qt::PreciseTimer);
     // The connection keeps the task alive while it runs, also when the task destroys the timer.
     _timer.callOnTimeout(&_timer, endingWithExceptions(std::move(task)));
-    _timer.start(interval);
+    _timer.start(clamped(interval));
   }
 
  private:
@@ -32,7 +40,7 @@ void EventLoopQueue::async(Task task) {
 }
 
 void EventLoopQueue::after(std::chrono::milliseconds delay, Task task) {
-  QTimer::singleShot(delay, Qt::PreciseTimer, &_context, endingWithExceptions(std::move(task)));
+  QTimer::singleShot(clamped(delay), Qt::PreciseTimer, &_context, endingWithExceptions(std::move(task)));
 }
 
 std::unique_ptr<RepeatingTimer> EventLoopQueue::repeating(std::chrono::milliseconds interval, Task task) {

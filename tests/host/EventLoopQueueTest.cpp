@@ -48,6 +48,25 @@ TEST(EventLoopQueue, DelaysATask) {
   EXPECT_GE(Clock::now() - start, 99ms);
 }
 
+TEST(EventLoopQueue, ADelayThatTheTimerCannotHoldIsNoShortOne) {
+  EventLoopQueue queue;
+  int ran = 0;
+  bool hasWaited = false;
+  queue.after(4294967297ms, [&] { ++ran; });  // 1 ms more than 32 bits hold
+  queue.after(std::chrono::milliseconds::max(), [&] { ++ran; });
+  const auto timer = queue.repeating(4294967297ms, [&] { ++ran; });
+  queue.after(100ms, [&] { hasWaited = true; });
+  ASSERT_TRUE(runUntil([&] { return hasWaited; }));
+  EXPECT_EQ(ran, 0);
+}
+
+TEST(EventLoopQueue, ADelayThatIsOverAlreadyIsNone) {
+  EventLoopQueue queue;
+  bool hasRun = false;
+  queue.after(std::chrono::milliseconds::min(), [&] { hasRun = true; });
+  EXPECT_TRUE(runUntil([&] { return hasRun; }));
+}
+
 TEST(EventLoopQueue, RepeatsATaskUntilItsTimerIsDestroyed) {
   EventLoopQueue queue;
   int ran = 0;
