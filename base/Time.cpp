@@ -1,9 +1,20 @@
 #include "base/Time.h"
 
-#include <chrono>
 #include <cstdio>
+#include <limits>
 
 namespace varnel {
+
+std::chrono::nanoseconds durationBetween(Time start, Time end) {
+  if (end < start) return -durationBetween(end, start);
+  // Unsigned seconds wrap, so that their difference comes out right.
+  const std::uint64_t seconds =
+      static_cast<std::uint64_t>(end.seconds) - static_cast<std::uint64_t>(start.seconds);
+  constexpr std::uint64_t mostSeconds = std::numeric_limits<std::int64_t>::max() / 1'000'000'000;
+  if (seconds >= mostSeconds) return std::chrono::nanoseconds::max();
+  return std::chrono::nanoseconds(static_cast<std::int64_t>(seconds) * 1'000'000'000 + end.nanoseconds -
+                                  start.nanoseconds);
+}
 
 CalendarTime calendarTime(Time time, TimeZone zone) {
   constexpr std::int64_t daySeconds = 86400;

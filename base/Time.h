@@ -1,5 +1,6 @@
 #pragma once
 
+#include <chrono>
 #include <compare>
 #include <cstdint>
 #include <string>
@@ -14,6 +15,10 @@ struct Time {
   friend auto operator<=>(const Time&,
                           const Time&) = default;  // NOLINT(modernize-use-nullptr): no pointer here
 };
+
+/// How long after the one moment the other is, negative when it is before. What nanoseconds cannot tell (292
+/// years and more) comes out as the longest time that they can.
+std::chrono::nanoseconds durationBetween(Time start, Time end);
 
 /// How far a local clock stands from UTC.
 struct TimeZone {

@@ -25,6 +25,7 @@
 #include "programs/varnel-decode/SnapshotFile.h"
 #include "programs/varnel-decode/StandardOutput.h"
 #include "programs/varnel-decode/TechnologyGuess.h"
+#include "programs/varnel-decode/Timestamps.h"
 
 namespace varnel {
 
@@ -79,16 +80,18 @@ class InputDecoding {
     if (!succeeds([&] { capture.emplace(_path); })) return generalError;
     HostLog log({.standardErrorLevel = _options.logLevel, .systemLog = HostLog::SystemLog::Unused});
     const auto generator = LogGenerator::generatorFromTechnology(*_options.technology, services.services);
-    OfflineDecoder decoder(*generator, services.clock);
+    OfflineDecoder decoder(*generator, services.clock, isSaving() ? RawBytes::Kept : RawBytes::NotKept);
 
     bool isDone = succeeds([&] { read(*capture, *generator, decoder, log, services.templates); });
     if (services.templates.missing()) return failWithout(*services.templates.missing());
     if (isDone && !isPointless()) isDone = succeeds([&] { requireRecords(decoder); });
+    tellClockSteps(decoder.clockSteps());
     const Value display = decoder.finish();
     const Time end = services.clock.now();
     if (decoder.hasStarted()) report({end, display});
-    if (_options.snapshotPath || _options.binaryLogPath) {
+    if (isSaving()) {
       const Value items = decoder.saveContents();
+      tellLeftOut(generator->messagesLeftOutOfLog());
       if (_options.snapshotPath) isDone &= succeeds([&] { writeSnapshotFile(end, items); });
       isDone &= writeBinaryLog(items);
     }
@@ -166,9 +169,9 @@ class InputDecoding {
   }
 
   // Whether nobody would see what else the capture holds.
-  bool isPointless() const {
-    return _isOutputBroken && !_recorder && !_options.snapshotPath && !_options.binaryLogPath;
-  }
+  bool isPointless() const { return _isOutputBroken && !_recorder && !isSaving(); }
+
+  bool isSaving() const { return _options.snapshotPath || _options.binaryLogPath; }
 
   void writeSnapshotFile(Time time, const Value& items) const {
     const auto list = writeXmlPropertyList(snapshotContents(time, items, ""));
@@ -195,6 +198,19 @@ class InputDecoding {
                                  " was not written; --format paths shows what there is");
       writeFile(_options.plot->file, bytesOf(drawPlot(_recorder->plot(_name))));
     });
+  }
+
+  void tellClockSteps(const ClockSteps& steps) const {
+    if (steps.count == 0) return;
+    const std::string howOften = steps.count == 1 ? "once" : std::to_string(steps.count) + " times";
+    tell("the clock of " + _name + " jumps " + howOften + ", first from " + timestamp(steps.from) + " to " +
+         timestamp(steps.to) + "; displays are due every 2 s from there on");
+  }
+
+  void tellLeftOut(std::uint64_t count) const {
+    if (count == 0) return;
+    tell(_name + " brought more than 16 MiB at a time: " + std::to_string(count) +
+         " of its messages were decoded but are missing from the raw bytes that are saved");
   }
 
   // A cell may never have been met; more likely its name was mistyped. Nothing is known when not all was

@@ -82,14 +82,23 @@ void PlotLine::add(double seconds, double value) {
   if (_columns.empty()) _start = seconds;
   const auto number = static_cast<std::int64_t>(std::floor((seconds - _start) / _width));
   const Point point{seconds, value};
-  if (!_columns.empty() && number <= _columns.back().number) {
-    _columns.back().take(point);
-  } else {
+  if (_columns.empty() || number > _columns.back().number) {
     const bool isGapSeen = _isInterrupted && !isNextTo(number);
     _columns.push_back({number, point, point, _columns.empty() || isGapSeen});
+  } else {
+    addAmongOthers(number, point);
   }
   _isInterrupted = false;
   while (_columns.size() > mostColumns) halve();
+}
+
+// Nearly always the last column; an earlier one once the clock was set back.
+void PlotLine::addAmongOthers(std::int64_t number, const Point& point) {
+  const auto column = std::ranges::lower_bound(_columns, number, {}, &Column::number);
+  if (column->number == number) return column->take(point);
+  const bool isFirst = column == _columns.begin();
+  column->startsNewLine = column->startsNewLine && !isFirst;
+  _columns.insert(column, {number, point, point, isFirst});
 }
 
 bool PlotLine::isNextTo(std::int64_t number) const {
@@ -98,7 +107,7 @@ bool PlotLine::isNextTo(std::int64_t number) const {
 
 void PlotLine::halve() {
   for (Column column : std::exchange(_columns, {})) {
-    column.number /= 2;
+    column.number = column.number / 2 - (column.number % 2 < 0 ? 1 : 0);  // rounded down
     if (!_columns.empty() && _columns.back().number == column.number) {
       _columns.back().take(column.lowest);
       _columns.back().take(column.highest);

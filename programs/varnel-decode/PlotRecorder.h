@@ -27,7 +27,8 @@ class PlotLine {
  public:
   static constexpr std::size_t mostColumns = 1000;
 
-  /// Times are those of displays, which come in order but for the last one. Seconds since 1970.
+  /// Times are those of displays. They come in order until the clock is set back; then each value still goes
+  /// where its time is. Seconds since 1970.
   void add(double seconds, double value);
   /// There is no value at this time: no line crosses it.
   void interrupt() { _isInterrupted = true; }
@@ -47,11 +48,12 @@ class PlotLine {
     void take(const Point& point);
   };
 
+  void addAmongOthers(std::int64_t number, const Point& point);
   void halve();
   bool isNextTo(std::int64_t number) const;
 
   std::vector<Column> _columns;
-  double _start = 0;           // of the first column
+  double _start = 0;           // of the column 0, in which the first value lies
   double _width = 1.0 / 1024;  // of each, in seconds; doubled whenever there are too many
   bool _isInterrupted = false;
 };

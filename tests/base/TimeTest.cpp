@@ -20,6 +20,21 @@ std::string calendarOf(std::int64_t seconds, TimeZone zone = {}) {
 
 }  // namespace
 
+TEST(DurationBetween, CountsNanosecondsInBothDirections) {
+  EXPECT_EQ(durationBetween({100, 999'999'999}, {101, 1}).count(), 2);
+  EXPECT_EQ(durationBetween({101, 1}, {100, 999'999'999}).count(), -2);
+  EXPECT_EQ(durationBetween({-1, 0}, {1, 5}).count(), 2'000'000'005);
+  EXPECT_EQ(durationBetween({7, 8}, {7, 8}).count(), 0);
+}
+
+TEST(DurationBetween, MomentsCenturiesApartAreTheLongestDuration) {
+  constexpr std::int64_t longest = 9'223'372'036'854'775'807;
+  EXPECT_EQ(durationBetween({0, 0}, {9'223'372'035, 999'999'999}).count(), 9'223'372'035'999'999'999);
+  EXPECT_EQ(durationBetween({0, 0}, {9'223'372'036, 0}).count(), longest);
+  EXPECT_EQ(durationBetween({-longest - 1, 0}, {longest, 999'999'999}).count(), longest);
+  EXPECT_EQ(durationBetween({longest, 999'999'999}, {-longest - 1, 0}).count(), -longest);
+}
+
 TEST(CalendarTime, BeginsIn1970) { EXPECT_EQ(calendarOf(0), "1970 1 1 0 0 0"); }
 
 TEST(CalendarTime, CountsLeapDays) {

@@ -94,6 +94,44 @@ TEST_F(DecodeGenerations, CsvTakesCapturesBeforeItOrBehindADoubleDash) {
   EXPECT_EQ(run({"--technology", "kalvi-lte", "--csv", antennasPath, "--", path}).output, expected);
 }
 
+// Ten rounds of a hundred records in 9.9 s each, every one dated an hour before the last.
+std::string setBackAgainAndAgain() {
+  std::string capture = pcapHeader();
+  for (std::uint32_t round = 0; round < 10; ++round) {
+    for (std::uint32_t i = 0; i < 100; ++i)
+      capture += pcapRecord(afternoon - 3600 * round + i / 10, i % 10 * 100'000'000, antennas(2));
+  }
+  return capture;
+}
+
+TEST_F(DecodeGenerations, AClockThatGoesBackAnHourEvery100RecordsLosesNoDisplayAndIsToldOnce) {
+  const std::string capture = setBackAgainAndAgain();
+  const char* const told =
+      " jumps 9 times, first from 2024-03-01T14:05:18.900Z to 2024-03-01T13:05:09.000Z; displays are due "
+      "every 2 s from there on\n";
+  for (const auto& options : {std::vector<std::string>{"--log-level", "-1", "--every"},
+                              {"--log-level", "-1", "--csv", "Serving Cell Info/Num Tx Antennas", "--"}}) {
+    const Result result = decode(capture, options);
+    EXPECT_EQ(result.status, 0) << result.error;
+    // Each round has four on the grid and one at its end.
+    EXPECT_EQ(linesOf(result.output), options.back() == "--every" ? 50u : 51u);
+    EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+    EXPECT_THAT(result.error, HasSubstr(told));
+  }
+}
+
+TEST_F(DecodeGenerations, DecadesWithoutRecordsAreOneStep) {
+  const Result result =
+      decode(pcapHeader() + pcapRecord(0, 0, antennas(2)) + pcapRecord(2'147'483'647, 0, antennas(4)),
+             {"--csv", "Serving Cell Info/Num Tx Antennas", "--"});
+  EXPECT_EQ(result.output,
+            "Time,Serving Cell Info/Num Tx Antennas\n"
+            "1970-01-01T00:00:02.000Z,2\n"
+            "2038-01-19T03:14:07.000Z,4\n");
+  EXPECT_THAT(result.error, HasSubstr(" jumps once, first from 1970-01-01T00:00:00.000Z to "
+                                      "2038-01-19T03:14:07.000Z;"));
+}
+
 TEST_F(DecodeGenerations, CsvQuotesWhatTheCaptureHolds) {
   const Result result = decode(
       pcapHeader() + pcapRecord(afternoon, 0, pdpContexts("<array><string>a,\"b\"\n</string></array>")),

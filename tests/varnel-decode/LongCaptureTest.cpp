@@ -20,13 +20,16 @@ constexpr std::size_t bytesASecond = 100'000;
 struct Cost {
   std::size_t memory;
   std::chrono::microseconds time;
+  std::string error;
 };
+
+enum class ItsClock { Runs, StandsInThePastSinceTheFirstSecond };
 
 class LongCapture : public DecodeProgram {
  protected:
   // The first messages of a simulated modem, over and over, close together. Written without any allocation,
   // for the memory that the test takes would count as that of the program.
-  std::string capture(std::string_view technology, std::uint32_t duration_s) const {
+  std::string capture(std::string_view technology, std::uint32_t duration_s, ItsClock clock) const {
     constexpr std::size_t differentMessages = 1000;
     const auto modem = simulatedModem(technology, 1);
     std::vector<std::string> records;
@@ -39,7 +42,8 @@ class LongCapture : public DecodeProgram {
     file << pcapHeader();
     std::size_t count = 0;
     for (std::uint32_t second = 0; second < duration_s; ++second) {
-      const std::string time = littleEndian(afternoon + second, 4);
+      const bool isSetBack = clock == ItsClock::StandsInThePastSinceTheFirstSecond && second > 0;
+      const std::string time = littleEndian(isSetBack ? afternoon - 3600 : afternoon + second, 4);
       for (std::size_t size = 0; size < bytesASecond; ++count) {
         std::string& record = records[count % records.size()];
         record.replace(0, time.size(), time);
@@ -57,20 +61,22 @@ class LongCapture : public DecodeProgram {
                     {"ASAN_OPTIONS=quarantine_size_mb=1:thread_local_quarantine_size_kb=64"});
     EXPECT_TRUE(process.waitForEnd());
     EXPECT_EQ(process.exitStatus(), 0) << process.error();
-    EXPECT_EQ(process.error(), "");
-    return {process.peakMemory(), process.processorTime()};
+    return {process.peakMemory(), process.processorTime(), process.error()};
   }
 
   // Both captures are written first, so that the test has as much memory when it starts either.
-  void expectSameCost(std::string_view technology, const std::vector<std::string>& options) const {
+  void expectSameCost(std::string_view technology, const std::vector<std::string>& options,
+                      ItsClock clock = ItsClock::Runs) const {
     const auto costOf = [&](const std::string& path) {
       std::vector<std::string> arguments{"--technology", std::string(technology), path};
       arguments.insert(arguments.end(), options.begin(), options.end());
       return cost(arguments);
     };
-    const std::string shortPath = capture(technology, shortCapture_s);
-    const std::string longPath = capture(technology, longCapture_s);
+    const std::string shortPath = capture(technology, shortCapture_s, clock);
+    const std::string longPath = capture(technology, longCapture_s, clock);
     const Cost shortCost = costOf(shortPath), longCost = costOf(longPath);
+    for (const Cost& each : {shortCost, longCost})
+      EXPECT_EQ(linesOf(each.error), clock == ItsClock::Runs ? 0u : 1u) << each.error;
     // The long one is 14 MB longer.
     EXPECT_LT(longCost.memory, shortCost.memory + 4'000'000);
     // Eight times as long, and as much again for what else the processor has to do.
@@ -88,6 +94,10 @@ TEST_F(LongCapture, OfLTETakesNoMoreMemoryThanAShortOneAndNoMoreTimeForAMessage)
 
 TEST_F(LongCapture, OfGSMAndUMTSTakesNoMoreMemoryThanAShortOneAndNoMoreTimeForAMessage) {
   expectSameCost("kalvi-gsm-umts", everythingAbout("UMTS/UMTS RR Info/UARFCN"));
+}
+
+TEST_F(LongCapture, WithAClockThatStandsInThePastTakesNoMoreMemoryAndNoMoreTimeForAMessage) {
+  expectSameCost("kalvi-lte", {"--every"}, ItsClock::StandsInThePastSinceTheFirstSecond);
 }
 
 TEST_F(LongCapture, CountingTakesNoMoreMemoryAndNoMoreTimeForAMessage) {

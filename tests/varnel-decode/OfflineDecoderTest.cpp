@@ -50,6 +50,8 @@ class RecordingGenerator final : public LogGenerator {
   Value getStartCommand() const override { return {}; }
   Value getSaveContentsFromState(const Dictionary& state) const override { return state.get("History"); }
 
+  void keepNoRawBytes() override { calls.emplace_back("no raw bytes"); }
+
   struct ArrayOutOfBounds {};
   std::vector<std::string> calls;
   int displays = 0;
@@ -66,7 +68,7 @@ class OfflineDecoderTest : public ::testing::Test {
   ApplicationInfo application;
   std::ostream nowhere{nullptr};
   RecordingGenerator generator{{resources, clock, application, nowhere}};
-  OfflineDecoder decoder{generator, clock};
+  OfflineDecoder decoder{generator, clock, RawBytes::Kept};
 };
 
 constexpr std::int64_t earliest = std::numeric_limits<std::int64_t>::min();
@@ -153,7 +155,7 @@ TEST_F(OfflineDecoderTest, ATickFiresOnceEvenWhenTimeGoesBack) {
   deliver({105, 999'999'999}, "d");
   deliver({106, 0}, "e");
   EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000000", "display at 102.000000000",
-                                           "message b at 105.000000000", "message c at 99.000000000",
+                                           "message b at 105.000000000", "message c at 105.000000000",
                                            "message d at 105.999999999", "display at 106.000000000",
                                            "message e at 106.000000000"));
 }
@@ -170,11 +172,90 @@ TEST_F(OfflineDecoderTest, TimesFromEndToEndOfTheCalendarAreOneStep) {
                   "display at 9223372036854775807.000000002"));
 }
 
-TEST_F(OfflineDecoderTest, NoTickFiresBeforeTheFirstRecord) {
+TEST_F(OfflineDecoderTest, ARecordDatedUpToTenSecondsBeforeCountsAsOfTheTimeBefore) {
+  deliver({100, 5}, "a");
+  deliver({90, 5}, "b");
+  deliver({91, 0}, "c");
+  deliver({101, 0}, "d");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000005", "message b at 100.000000005",
+                                           "message c at 100.000000005", "message d at 101.000000000"));
+  EXPECT_EQ(decoder.clockSteps().count, 0u);
+}
+
+TEST_F(OfflineDecoderTest, AClockSetBackFiresOneTickAndTheTimerStartsAnewThere) {
+  deliver({100, 5}, "a");
+  deliver({90, 4}, "b");
+  deliver({92, 3}, "c");
+  deliver({92, 4}, "d");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000005", "display at 102.000000005",
+                                           "message b at 90.000000004", "message c at 92.000000003",
+                                           "display at 92.000000004", "message d at 92.000000004"));
+}
+
+TEST_F(OfflineDecoderTest, AClockAheadByMoreThanADayFiresOneTickAndTheTimerStartsAnewThere) {
+  deliver({100, 0}, "a");
+  deliver({86500, 1}, "b");
+  deliver({86502, 0}, "c");
+  deliver({86502, 1}, "d");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000000", "display at 102.000000000",
+                                           "message b at 86500.000000001", "message c at 86502.000000000",
+                                           "display at 86502.000000001", "message d at 86502.000000001"));
+}
+
+TEST_F(OfflineDecoderTest, APauseOfADayKeepsTheGrid) {
+  deliver({100, 0}, "a");
+  deliver({86500, 0}, "b");
+  deliver({86501, 999'999'999}, "c");
+  deliver({86502, 0}, "d");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 100.000000000", "display at 102.000000000",
+                                           "message b at 86500.000000000", "message c at 86501.999999999",
+                                           "display at 86502.000000000", "message d at 86502.000000000"));
+  EXPECT_EQ(decoder.clockSteps().count, 0u);
+}
+
+TEST_F(OfflineDecoderTest, AClockThatStandsStillAfterItWasSetBackFiresOneTick) {
+  deliver({5000, 0}, "a");
+  for (int i = 0; i < 3; ++i) deliver({1400, 0}, "b");
+  EXPECT_THAT(generator.calls, ElementsAre("message a at 5000.000000000", "display at 5002.000000000",
+                                           "message b at 1400.000000000", "message b at 1400.000000000",
+                                           "message b at 1400.000000000"));
+}
+
+TEST_F(OfflineDecoderTest, AClockThatGoesBackAnHourEvery100RecordsLosesNoDisplay) {
+  constexpr int rounds = 50, recordsARound = 100;
+  int generations = 0;
+  for (int round = 0; round < rounds; ++round) {
+    for (int i = 0; i < recordsARound; ++i) {
+      const Time time{1'000'000 - round * 3600 + i / 10, i % 10 * 100'000'000};
+      if (decoder.fireTicks(time)) ++generations;
+      deliver(time);
+    }
+  }
+  // Of 9.9 s each: four ticks on the grid, and one when the clock is set.
+  EXPECT_EQ(generations, rounds * 5 - 1);
+  EXPECT_EQ(decoder.clockSteps().count, 49u);
+}
+
+TEST_F(OfflineDecoderTest, TheFirstStepOfTheClockIsToldWithItsTimes) {
+  for (const std::int64_t second : {100, 105, 50, 90'000, 200'000}) deliver({second, 7});
+  const ClockSteps& steps = decoder.clockSteps();
+  EXPECT_EQ(steps.count, 3u);
+  EXPECT_EQ(steps.from, (Time{105, 7}));
+  EXPECT_EQ(steps.to, (Time{50, 7}));
+}
+
+TEST_F(OfflineDecoderTest, AClockSetFromTheEndOfTimeToItsBeginningFiresOneTickAtTheEnd) {
   deliver({latest, 0}, "a");
   deliver({earliest, 0}, "b");
   EXPECT_THAT(generator.calls, ElementsAre("message a at 9223372036854775807.000000000",
+                                           "display at 9223372036854775807.000000000",
                                            "message b at -9223372036854775808.000000000"));
+}
+
+TEST_F(OfflineDecoderTest, RawBytesAreKeptOnlyWhereTheyAreAskedFor) {
+  EXPECT_THAT(generator.calls, ElementsAre());
+  OfflineDecoder(generator, clock, RawBytes::NotKept);
+  EXPECT_THAT(generator.calls, ElementsAre("no raw bytes"));
 }
 
 TEST_F(OfflineDecoderTest, TheLastDisplayIsTheOneReturned) {

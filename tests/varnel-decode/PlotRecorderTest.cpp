@@ -114,14 +114,29 @@ TEST(PlotLine, AGapThatIsWiderThanAColumnStays) {
   EXPECT_EQ(std::ranges::count(line.points(), true, &PlotPoint::startsNewLine), 2);
 }
 
-TEST(PlotLine, ATimeThatGoesBackIsShownWhereTheLineIs) {
+TEST(PlotLine, WhatAClockThatWasSetBackDatesStandsAtItsTime) {
   PlotLine line;
   line.add(100, 1);
   line.add(102, 2);
   line.add(50, 3);
   line.add(104, 4);
-  EXPECT_THAT(line.points(), ElementsAre(PlotPoint{100, 1, true}, PlotPoint{50, 3, false},
+  EXPECT_THAT(line.points(), ElementsAre(PlotPoint{50, 3, true}, PlotPoint{100, 1, false},
                                          PlotPoint{102, 2, false}, PlotPoint{104, 4, false}));
+}
+
+TEST(PlotLine, AClockThatIsSetBackAgainAndAgainKeepsLowestAndHighestOfEachColumn) {
+  PlotLine line;
+  for (int round = 0; round < 2000; ++round) {
+    for (int i = 0; i < 50; ++i) line.add(1e9 - 3600.0 * round + 2.0 * i, i == 25 ? round : 0);
+  }
+  const auto points = line.points();
+  EXPECT_LE(points.size(), 2000u);
+  EXPECT_GE(points.size(), 500u);
+  EXPECT_TRUE(std::ranges::is_sorted(points, {}, &PlotPoint::seconds));
+  const auto isLastPeak = [](const PlotPoint& point) {
+    return point.value == 1999 && point.seconds == 1e9 - 7'196'350;
+  };
+  EXPECT_EQ(std::ranges::count_if(points, isLastPeak), 1);
 }
 
 TEST(PlotLine, TimesFromEndToEndOfTheCalendarAreDrawn) {
