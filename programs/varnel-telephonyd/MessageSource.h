@@ -2,6 +2,7 @@
 
 #include <chrono>
 #include <optional>
+#include <string>
 
 #include "base/Bytes.h"
 
@@ -19,6 +20,8 @@ class MessageSource {
   virtual ~MessageSource() = default;
   /// The next message, no earlier than the one before; nothing when the stream has ended.
   virtual std::optional<StreamMessage> next() = 0;
+  /// What log lines call the message that came last, as "Record 17 of walk.pcap".
+  virtual std::string nameOfLast() const { return "A message"; }
 };
 
 }  // namespace varnel

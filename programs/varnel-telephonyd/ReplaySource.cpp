@@ -1,19 +1,12 @@
 #include "programs/varnel-telephonyd/ReplaySource.h"
 
 #include <algorithm>
+#include <utility>
 
+#include "base/ClockStep.h"
 #include "base/Log.h"
 
 namespace varnel {
-
-namespace {
-
-double secondsBetween(Time from, Time to) {
-  return static_cast<double>(to.seconds) - static_cast<double>(from.seconds) +
-         (to.nanoseconds - from.nanoseconds) * 1e-9;
-}
-
-}  // namespace
 
 std::optional<StreamMessage> ReplaySource::next() {
   CaptureRecord record;
@@ -23,24 +16,53 @@ std::optional<StreamMessage> ReplaySource::next() {
     logError("The replay ends: %s", error.what());
     return std::nullopt;
   }
-  if (!_first) _first = record.time;
-  _last = std::max(_last, _roundStart + playingTime(secondsBetween(*_first, record.time)));
-  return StreamMessage{_last, Bytes(record.message.begin(), record.message.end())};
+  _last = following(record.time);
+  return StreamMessage{_last->at, Bytes(record.message.begin(), record.message.end())};
+}
+
+std::string ReplaySource::nameOfLast() const {
+  return "Record " + std::to_string(_recordsRead) + " of " + _path;
 }
 
 bool ReplaySource::readRecord(CaptureRecord& record) {
   if (!_capture) _capture.emplace(_path);
+  ++_recordsRead;
   if (_capture->next(record)) return true;
-  if (_atEnd == AtEnd::Stop || !_first) return false;
+  if (_atEnd == AtEnd::Stop || !_last) return false;
   _capture.emplace(_path);
-  _roundStart = _last + playingTime(1);
-  return _capture->next(record);
+  _recordsRead = 1;
+  if (!_capture->next(record)) return false;
+  const auto pause = std::min(playingTime(std::chrono::seconds(1)), longestWait);
+  _last = _origin = {record.time, _last->at + pause};
+  return true;
 }
 
-std::chrono::milliseconds ReplaySource::playingTime(double seconds) const {
-  constexpr double longest_s = 1e9;  // for the times in a file may be anything
-  const std::chrono::duration<double> time(std::clamp(seconds / _speed, 0.0, longest_s));
-  return std::chrono::round<std::chrono::milliseconds>(time);
+// Distances are measured from an origin: those from record to record would add up their roundings.
+ReplaySource::Moment ReplaySource::following(Time time) {
+  if (!_last) return _origin = {time, std::chrono::milliseconds(0)};
+  switch (clockStep(_last->time, time)) {
+    case ClockStep::Overtaking:
+      return *_last;
+    case ClockStep::Back:
+      return _origin = {time, _last->at};
+    case ClockStep::None:
+    case ClockStep::Ahead:
+      break;
+  }
+  const Moment moment{time, _origin.at + playingTime(durationBetween(_origin.time, time))};
+  if (moment.at - _last->at <= longestWait) return moment;
+  tellShortening(time);
+  return _origin = {time, _last->at + longestWait};
+}
+
+void ReplaySource::tellShortening(Time time) {
+  if (std::exchange(_hasToldShortening, true)) return;
+  logError("The replay of %s waits for no message longer than 5 seconds, as between %s and %s", _path,
+           dateDescription(_last->time), dateDescription(time));
+}
+
+std::chrono::milliseconds ReplaySource::playingTime(std::chrono::nanoseconds duration) const {
+  return std::chrono::round<std::chrono::milliseconds>(std::chrono::duration<double>(duration) / _speed);
 }
 
 }  // namespace varnel

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <optional>
 #include <string>
 
@@ -9,31 +10,44 @@
 
 namespace varnel {
 
-/// Plays a capture back: its messages in their order and at their distances in time, a message that is dated
-/// before its predecessor together with that one.
+/// Plays a capture back: its messages in their order and at their distances in time. None lets one wait for
+/// more than five seconds. A message that is dated before its predecessor comes together with that one; when
+/// its clock was set back, those that follow keep their distances to it.
 class ReplaySource final : public MessageSource {
  public:
   enum class AtEnd { Stop, StartOver };
+
+  static constexpr std::chrono::milliseconds longestWait{5000};
 
   /// The capture is played that many times as fast. When it starts over, the first message follows the last
   /// one after a second of the capture's time.
   ReplaySource(std::string path, double speed, AtEnd atEnd)
       : _path(std::move(path)), _speed(speed), _atEnd(atEnd) {}
 
-  /// A fault of the capture is logged and ends the stream.
+  /// A fault of the capture is logged and ends the stream. So is, once, that a wait was shortened.
   std::optional<StreamMessage> next() override;
+  std::string nameOfLast() const override;
 
  private:
+  /// A moment of the capture, and when it is played.
+  struct Moment {
+    Time time;
+    std::chrono::milliseconds at;  // of the stream
+  };
+
   bool readRecord(CaptureRecord& record);
-  std::chrono::milliseconds playingTime(double seconds) const;
+  Moment following(Time time);
+  void tellShortening(Time time);
+  std::chrono::milliseconds playingTime(std::chrono::nanoseconds duration) const;
 
   const std::string _path;
   const double _speed;
   const AtEnd _atEnd;
-  std::optional<CaptureReader> _capture;     // open while it is being played
-  std::optional<Time> _first;                // the first record's time, once it was read
-  std::chrono::milliseconds _roundStart{0};  // of the stream, when the first record was played
-  std::chrono::milliseconds _last{0};
+  std::optional<CaptureReader> _capture;  // open while it is being played
+  std::size_t _recordsRead = 0;           // of this round
+  std::optional<Moment> _last;            // absent before the first record
+  Moment _origin{};                       // from which the distances are measured
+  bool _hasToldShortening = false;
 };
 
 }  // namespace varnel

@@ -3,6 +3,7 @@
 #include <utility>
 
 #include "base/Log.h"
+#include "host/PortFrame.h"
 #include "programs/varnel-telephonyd/ChannelCommand.h"
 
 namespace varnel {
@@ -15,6 +16,8 @@ using namespace std::chrono_literals;
 constexpr int messagesAtATime = 64;
 constexpr std::chrono::milliseconds retryInterval = 20ms;
 constexpr std::chrono::milliseconds patience = 5s;
+// A capture that is played over and over must not fill the log.
+constexpr std::uint64_t mostNamedAsTooLong = 10;
 
 }  // namespace
 
@@ -61,7 +64,7 @@ void ServedChannel::sendWhatIsDue() {
     if (!_next) return;
     const auto wait = _startedAt + _next->at - _host.uptime();
     if (wait.count() > 0) return sendLater(wait);
-    if (_filter.takes(_next->bytes)) {
+    if (_filter.takes(_next->bytes) && fitsChannel(_next->bytes)) {
       const Delivery delivery = deliver(_next->bytes);
       if (delivery == Delivery::NoRoom) return sendLater(retryInterval);
       if (delivery == Delivery::Ended) return end();
@@ -75,6 +78,15 @@ void ServedChannel::sendLater(std::chrono::milliseconds delay) {
   _host.queue.after(delay, [weak = weak_from_this()] {
     if (const auto channel = weak.lock()) channel->sendWhatIsDue();
   });
+}
+
+// The transport would take the connection of one that does not for broken.
+bool ServedChannel::fitsChannel(ByteView message) {
+  if (message.size() <= maximumPayload) return true;
+  if (++_tooLongForChannel <= mostNamedAsTooLong)
+    logError("%s is left out: it has %ld bytes, and the channel takes %ld", _source->nameOfLast(),
+             message.size(), maximumPayload);
+  return false;
 }
 
 ServedChannel::Delivery ServedChannel::deliver(ByteView message) {

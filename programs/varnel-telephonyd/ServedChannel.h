@@ -1,6 +1,7 @@
 #pragma once
 
 #include <chrono>
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <optional>
@@ -40,6 +41,9 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   /// port cannot be made.
   bool open(const std::string& commandPortName, std::function<void()> ended);
 
+  /// How many messages were left out so far because they are longer than the channel takes.
+  std::uint64_t tooLongForChannel() const { return _tooLongForChannel; }
+
   /// Looks whether the viewer is still there.
   void checkViewer();
 
@@ -50,6 +54,7 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   void start(CodeFilter filter);
   void sendWhatIsDue();
   void sendLater(std::chrono::milliseconds delay);
+  bool fitsChannel(ByteView message);
   Delivery deliver(ByteView message);
   Delivery waitForRoom();
   void end();
@@ -64,6 +69,7 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   std::chrono::milliseconds _startedAt{0};
   std::optional<StreamMessage> _next;
   std::optional<std::chrono::milliseconds> _withoutRoomSince;
+  std::uint64_t _tooLongForChannel = 0;
 };
 
 }  // namespace varnel

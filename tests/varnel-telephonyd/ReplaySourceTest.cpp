@@ -7,6 +7,8 @@
 #include <utility>
 #include <vector>
 
+#include "tests/support/RecordingLog.h"
+
 namespace varnel {
 namespace {
 
@@ -49,14 +51,56 @@ TEST_F(Replay, MessagesKeepTheirOrderAndDistances) {
 }
 
 TEST_F(Replay, SpeedDividesTheDistances) {
-  write({{{1000, 0}, {1}}, {{1004, 0}, {2}}});
-  EXPECT_EQ(play({path(), 4, AtEnd::Stop}), (Messages{{0ms, {1}}, {1000ms, {2}}}));
-  EXPECT_EQ(play({path(), 0.5, AtEnd::Stop}), (Messages{{0ms, {1}}, {8000ms, {2}}}));
+  write({{{1000, 0}, {1}}, {{1002, 0}, {2}}});
+  EXPECT_EQ(play({path(), 4, AtEnd::Stop}), (Messages{{0ms, {1}}, {500ms, {2}}}));
+  EXPECT_EQ(play({path(), 0.5, AtEnd::Stop}), (Messages{{0ms, {1}}, {4000ms, {2}}}));
 }
 
-TEST_F(Replay, ATimeThatGoesBackIsWaitedForByNobody) {
-  write({{{1000, 0}, {1}}, {{1002, 0}, {2}}, {{900, 0}, {3}}, {{1003, 0}, {4}}});
+TEST_F(Replay, DistancesOfLessThanAMillisecondAddUp) {
+  std::vector<std::pair<Time, Bytes>> records;
+  for (int i = 0; i <= 1000; ++i) records.push_back({{1000, 400'000 * i}, {1}});
+  write(records);
+  EXPECT_EQ(play({path(), 1, AtEnd::Stop}, 2000).back().first, 400ms);
+}
+
+TEST_F(Replay, AMessageThatAnotherOvertookComesTogetherWithIt) {
+  write({{{1000, 0}, {1}}, {{1002, 0}, {2}}, {{992, 0}, {3}}, {{1003, 0}, {4}}});
   EXPECT_EQ(play({path(), 1, AtEnd::Stop}), (Messages{{0ms, {1}}, {2s, {2}}, {2s, {3}}, {3s, {4}}}));
+}
+
+TEST_F(Replay, AfterAClockWasSetBackTheDistancesAreThoseOfItsNewTime) {
+  write({{{5000, 0}, {1}}, {{5002, 0}, {2}}, {{1400, 0}, {3}}, {{1403, 0}, {4}}});
+  RecordingLog log;
+  EXPECT_EQ(play({path(), 1, AtEnd::Stop}), (Messages{{0ms, {1}}, {2s, {2}}, {2s, {3}}, {5s, {4}}}));
+  EXPECT_TRUE(log.lines().empty());
+}
+
+TEST_F(Replay, NoWaitIsLongerThanFiveSecondsWhichIsToldOnce) {
+  write(
+      {{{0, 0}, {1}}, {{5, 0}, {2}}, {{1709301909, 0}, {3}}, {{1709301910, 0}, {4}}, {{1709301916, 0}, {5}}});
+  RecordingLog log;
+  EXPECT_EQ(play({path(), 1, AtEnd::Stop}),
+            (Messages{{0ms, {1}}, {5s, {2}}, {10s, {3}}, {11s, {4}}, {16s, {5}}}));
+  EXPECT_EQ(log.takeTexts(),
+            (std::vector<std::string>{"<3>The replay of " + path() +
+                                      " waits for no message longer than 5 seconds, as between 1970-01-01 "
+                                      "00:00:05 +0000 and 2024-03-01 14:05:09 +0000"}));
+}
+
+TEST_F(Replay, TheFiveSecondsAreThoseOfTheListener) {
+  write({{{1000, 0}, {1}}, {{1050, 0}, {2}}, {{1051, 0}, {3}}});
+  EXPECT_EQ(play({path(), 10, AtEnd::Stop}), (Messages{{0ms, {1}}, {5s, {2}}, {5100ms, {3}}}));
+  EXPECT_EQ(play({path(), 0.001, AtEnd::StartOver}, 4),
+            (Messages{{0ms, {1}}, {5s, {2}}, {10s, {3}}, {15s, {1}}}));
+}
+
+TEST_F(Replay, NamesTheRecordOfTheLastMessage) {
+  write({{{1000, 0}, {1}}, {{1001, 0}, {2}}});
+  ReplaySource source(path(), 1, AtEnd::StartOver);
+  for (const char* number : {"1", "2", "1"}) {
+    source.next();
+    EXPECT_EQ(source.nameOfLast(), std::string("Record ") + number + " of " + path());
+  }
 }
 
 TEST_F(Replay, StartingOverLeavesASecondBetweenTheRounds) {

@@ -11,6 +11,7 @@
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "tests/support/FakeQueue.h"
 #include "tests/support/MemoryPorts.h"
+#include "tests/support/RecordingLog.h"
 
 namespace varnel {
 namespace {
@@ -142,6 +143,41 @@ TEST_F(TelephonyServerTest, ManyMessagesAtOnceComeInOrder) {
   const Sent messages = sent();
   ASSERT_EQ(messages.size(), 1000u);
   EXPECT_EQ(messages[999], Bytes{999 % 256});
+}
+
+TEST_F(TelephonyServerTest, AMessageThatIsTooLongForTheChannelIsLeftOutWithALineAndTheStreamGoesOn) {
+  Bytes longest = modemPacket(1), tooLong = modemPacket(2);
+  longest.resize(1'048'576);
+  tooLong.resize(1'048'577);
+  _stream = {{0ms, tooLong}, {0ms, longest}, {1ms, modemPacket(3)}};
+  _ports.deliver(channel(), 0, startEverything);
+  RecordingLog log;
+  _queue.advance(1s);
+  EXPECT_EQ(sent(), (Sent{longest, modemPacket(3)}));
+  EXPECT_EQ(_recorded, (Sent{longest, modemPacket(3)}));
+  EXPECT_EQ(_server.channels(), 1u);
+  EXPECT_EQ(log.takeTexts(),
+            (std::vector<std::string>{
+                "<3>A message is left out: it has 1048577 bytes, and the channel takes 1048576"}));
+}
+
+TEST_F(TelephonyServerTest, ManyMessagesThatAreTooLongDoNotFillTheLog) {
+  _stream.assign(20, {0ms, Bytes(1'048'577)});
+  _ports.deliver(channel(), 0, startEverything);
+  RecordingLog log;
+  _queue.advance(1s);
+  EXPECT_EQ(sent(), Sent());
+  EXPECT_EQ(log.lines().size(), 10u);
+}
+
+TEST_F(TelephonyServerTest, AMessageTooLongForTheChannelThatNobodyAskedForIsNone) {
+  Bytes tooLong = modemPacket(2);
+  tooLong.resize(1'048'577);
+  _stream = {{0ms, tooLong}};
+  _ports.deliver(channel(), 0, startWith("<integer>1</integer>", ""));
+  RecordingLog log;
+  _queue.advance(1s);
+  EXPECT_TRUE(log.lines().empty());
 }
 
 TEST_F(TelephonyServerTest, MalformedCommandsGetNoAnswerAndChangeNothing) {
