@@ -201,7 +201,7 @@ class InputDecoding {
   }
 
   void tellClockSteps(const ClockSteps& steps) const {
-    if (steps.count == 0) return;
+    if (steps.count == 0 || isPointless()) return;
     const std::string howOften = steps.count == 1 ? "once" : std::to_string(steps.count) + " times";
     tell("the clock of " + _name + " jumps " + howOften + ", first from " + timestamp(steps.from) + " to " +
          timestamp(steps.to) + "; displays are due every 2 s from there on");
@@ -210,7 +210,7 @@ class InputDecoding {
   void tellLeftOut(std::uint64_t count) const {
     if (count == 0) return;
     tell(_name + " brought more than 16 MiB at a time: " + std::to_string(count) +
-         " of its messages were decoded but are missing from the raw bytes that are saved");
+         " of its messages were decoded, but their raw bytes were not kept");
   }
 
   // A cell may never have been met; more likely its name was mistyped. Nothing is known when not all was
