@@ -9,11 +9,22 @@
 
 namespace varnel {
 
+namespace {
+
+bool isIgnored(int signal) {
+  struct sigaction action {};
+  return ::sigaction(signal, nullptr, &action) == 0 && action.sa_handler == SIG_IGN;
+}
+
+}  // namespace
+
 SignalWatcher::SignalWatcher(std::initializer_list<int> signals, std::function<void(int)> handler)
     : _handler(std::move(handler)) {
   sigset_t watched;
   ::sigemptyset(&watched);
-  for (const int signal : signals) ::sigaddset(&watched, signal);
+  for (const int signal : signals) {
+    if (signal != SIGHUP || !isIgnored(signal)) ::sigaddset(&watched, signal);
+  }
   _descriptor = ::signalfd(-1, &watched, SFD_NONBLOCK | SFD_CLOEXEC);
   if (_descriptor < 0) throw std::system_error(errno, std::generic_category(), "cannot watch for signals");
   ::pthread_sigmask(SIG_BLOCK, &watched, &_formerMask);

@@ -8,7 +8,8 @@
 
 namespace varnel {
 
-/// Turns signals into calls from the event loop. As long as it lives they do nothing else.
+/// Turns signals into calls from the event loop. As long as it lives they do nothing else. A hang-up stays
+/// ignored where the program was started to ignore it, as nohup(1) does.
 class SignalWatcher final {
  public:
   /// An exception that leaves the handler ends the program. Throws std::system_error when the system lacks

@@ -18,7 +18,9 @@ AccessibleRow::AccessibleRow(RowWidget& row) : QAccessibleWidget(&row, QAccessib
 RowWidget& AccessibleRow::row() const { return static_cast<RowWidget&>(*widget()); }
 
 QString AccessibleRow::text(QAccessible::Text kind) const {
-  return kind == QAccessible::Name ? row().description() : QAccessibleWidget::text(kind);
+  if (kind == QAccessible::Name) return row().description();
+  if (kind == QAccessible::Description && row().reachesPastItsEdge()) return row().description();
+  return QAccessibleWidget::text(kind);
 }
 
 QAccessible::State AccessibleRow::state() const {

@@ -6,7 +6,8 @@
 
 namespace varnel {
 
-/// A row for screen readers: an item of a list, named "name: value", that can be pressed.
+/// A row for screen readers: an item of a list, named "name: value", that can be pressed. Where the row is
+/// too short for its text, that is its description as well.
 class AccessibleRow final : public QAccessibleWidget {
  public:
   explicit AccessibleRow(RowWidget& row);

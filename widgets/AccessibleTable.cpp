@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "widgets/AccessibleRow.h"
+#include "widgets/WindowWidget.h"
 
 namespace varnel {
 
@@ -11,6 +12,8 @@ namespace {
 QAccessibleInterface* interfaceFor(const QString&, QObject* object) {
   if (auto* row = dynamic_cast<RowWidget*>(object)) return new AccessibleRow(*row);
   if (auto* table = dynamic_cast<TableWidget*>(object)) return new AccessibleTable(*table);
+  if (auto* window = dynamic_cast<WindowWidget*>(object))
+    return new QAccessibleWidget(window, QAccessible::Window);
   return nullptr;
 }
 

@@ -19,7 +19,7 @@ class AccessibleTable final : public QAccessibleWidget {
   TableWidget& table() const;
 };
 
-/// Has screen readers told of tables and rows. It is enough to call it once a program.
+/// Has screen readers told of windows, tables and rows. It is enough to call it once a program.
 void describeTablesToScreenReaders();
 
 }  // namespace varnel

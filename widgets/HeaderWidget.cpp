@@ -34,8 +34,9 @@ HeaderWidget::HeaderWidget(QWidget* parent)
 }
 
 void HeaderWidget::setTitle(const QString& title) {
-  if (title == _title.text()) return;
-  _title.setText(title);
+  if (title == _wholeTitle) return;
+  _wholeTitle = title;
+  _title.setAccessibleName(title);
   arrange();
 }
 
@@ -69,11 +70,18 @@ bool HeaderWidget::arrangeWith(BackButton backButton, double titleSize) {
   int backWidth = 0;
   if (backButton == BackButton::Whole) backWidth = _back.sizeHint().width();
   if (backButton == BackButton::Mark) backWidth = _back.minimumSizeHint().width();
-  const int titleWidth = widthOf(_title.text(), titleSize);
+  const int titleWidth = widthOf(_wholeTitle, titleSize);
   _back.setGeometry(0, (barHeight - _back.sizeHint().height()) / 2, backWidth, _back.sizeHint().height());
-  _title.setFont(qtFont(Font::boldSystem(titleSize)));
   _title.setGeometry(titleRoom(backWidth, titleWidth));
+  showAsMuchAsFits(qtFont(Font::boldSystem(titleSize)));
   return titleWidth <= _title.width();
+}
+
+void HeaderWidget::showAsMuchAsFits(const QFont& font) {
+  const QString fitting = QFontMetricsF(font).elidedText(_wholeTitle, Qt::ElideRight, _title.width());
+  _title.setFont(font);
+  _title.setText(fitting);
+  _title.setToolTip(fitting == _wholeTitle ? QString() : plainTooltip(_wholeTitle));
 }
 
 // In the middle of the bar, or as near to it as the way back allows.

@@ -10,13 +10,14 @@ namespace varnel {
 
 /// The bar above a pane: its title in the middle, and on the left the way back, named after the pane that it
 /// leads to. Where both do not fit, the title's letters get smaller, then the way back is the arrowhead
-/// alone.
+/// alone, then the title is cut at its end and stands whole in its tooltip.
 class HeaderWidget final : public QWidget {
  public:
   explicit HeaderWidget(QWidget* parent = nullptr);
 
   void setTitle(const QString& title);
-  QString title() const { return _title.text(); }
+  /// Whole, also where there is no room for all of it.
+  QString title() const { return _wholeTitle; }
   /// Shows the way back to the pane of that title.
   void showBackButton(const QString& parentTitle);
   /// Called when the user wants to go back.
@@ -33,10 +34,12 @@ class HeaderWidget final : public QWidget {
 
   void arrange();
   bool arrangeWith(BackButton backButton, double titleSize);
+  void showAsMuchAsFits(const QFont& font);
   QRect titleRoom(int backWidth, int titleWidth) const;
 
   TextButton _back;
   QLabel _title;
+  QString _wholeTitle;
   std::function<void()> _backAction;
   bool _leadsBack = false;
 };

@@ -1,5 +1,8 @@
 #include "widgets/PaintedLabel.h"
 
+#include <QFontMetricsF>
+#include <algorithm>
+
 #include "widgets/QtValues.h"
 
 namespace varnel {
@@ -23,6 +26,10 @@ void PaintedLabel::setFrame(const Rect& frame) {
   if (wanted == _frame) return;
   _frame = wanted;
   _row.update();
+}
+
+double PaintedLabel::endOfText() const {
+  return std::min(_frame.right(), _frame.left() + QFontMetricsF(_font).horizontalAdvance(_shownText));
 }
 
 void PaintedLabel::paint(QPainter& painter) const {

@@ -23,6 +23,8 @@ class PaintedLabel final : public Label {
 
   const QRectF& frame() const { return _frame; }
   const QString& shownText() const { return _shownText; }
+  /// Where its letters end, which may be before its frame does; where they begin when it has none.
+  double endOfText() const;
   /// Paints the text in the painter's pen.
   void paint(QPainter& painter) const;
 

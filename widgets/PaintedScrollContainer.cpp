@@ -1,5 +1,6 @@
 #include "widgets/PaintedScrollContainer.h"
 
+#include <QLinearGradient>
 #include <algorithm>
 
 #include "widgets/QtValues.h"
@@ -12,6 +13,13 @@ constexpr double barThickness = 2;
 constexpr double barInset = 10;  // at its ends
 constexpr double barBottom = 4;  // between the bar and the container's edge
 constexpr double shortestBar = 24;
+
+// Where texts go on past an edge.
+constexpr double fadeWidth = 14;
+constexpr double dotsWidth = 24;
+constexpr double dotRadius = 1.5;
+constexpr double firstDot = 6;  // from the edge to its middle, and from one dot's to the next one's
+constexpr int dots = 3;
 
 }  // namespace
 
@@ -39,6 +47,21 @@ double PaintedScrollContainer::endOfLabels() const {
   return end;
 }
 
+double PaintedScrollContainer::endOfTexts() const {
+  double end = 0;
+  for (const auto& label : _labels) end = std::max(end, label->endOfText());
+  return end;
+}
+
+bool PaintedScrollContainer::hasMoreThanFits() const { return range() > 0 && endOfTexts() > _frame.width; }
+
+bool PaintedScrollContainer::goesOnPast(Edge edge) const {
+  if (edge == Edge::Right) return endOfTexts() - _position > _frame.width;
+  return std::ranges::any_of(_labels, [this](const auto& label) {
+    return !label->shownText().isEmpty() && label->frame().left() < _position;
+  });
+}
+
 double PaintedScrollContainer::range() const { return std::max(0.0, _contentSize.width - _frame.width); }
 
 void PaintedScrollContainer::scrollTo(double position) {
@@ -48,13 +71,36 @@ void PaintedScrollContainer::scrollTo(double position) {
   _row.update();
 }
 
-void PaintedScrollContainer::paint(QPainter& painter, const QColor& bar) const {
+void PaintedScrollContainer::paint(QPainter& painter, const Colours& colours) const {
   painter.save();
   painter.setClipRect(qtRect(_frame));
   painter.translate(_frame.x - _position, _frame.y);
   for (const auto& label : _labels) label->paint(painter);
   painter.restore();
-  if (range() > 0) paintBar(painter, bar);
+  if (range() <= 0) return;
+  for (const Edge edge : {Edge::Left, Edge::Right}) {
+    if (goesOnPast(edge)) paintMore(painter, edge, colours);
+  }
+  paintBar(painter, colours.bar);
+}
+
+void PaintedScrollContainer::paintMore(QPainter& painter, Edge edge, const Colours& colours) const {
+  painter.save();
+  painter.setRenderHint(QPainter::Antialiasing);
+  painter.setPen(Qt::NoPen);
+  // From here on x is the distance from the edge.
+  painter.translate(edge == Edge::Left ? _frame.x : _frame.x + _frame.width, _frame.y);
+  if (edge == Edge::Right) painter.scale(-1, 1);
+  QLinearGradient fade(dotsWidth, 0, dotsWidth + fadeWidth, 0);
+  QColor transparent = colours.ground;
+  transparent.setAlpha(0);
+  fade.setColorAt(0, colours.ground);
+  fade.setColorAt(1, transparent);
+  painter.fillRect(QRectF(0, 0, dotsWidth + fadeWidth, _frame.height), fade);
+  painter.setBrush(colours.mark);
+  for (int dot = 1; dot <= dots; ++dot)
+    painter.drawEllipse(QPointF(dot * firstDot, _frame.height / 2), dotRadius, dotRadius);
+  painter.restore();
 }
 
 void PaintedScrollContainer::paintBar(QPainter& painter, const QColor& colour) const {

@@ -14,6 +14,13 @@ namespace varnel {
 /// keys move it.
 class PaintedScrollContainer final : public ScrollContainer {
  public:
+  /// What is painted beside the texts.
+  struct Colours {
+    QColor ground;  ///< what the row is painted on
+    QColor bar;
+    QColor mark;
+  };
+
   /// The row outlives the container.
   explicit PaintedScrollContainer(QWidget& row) : _row(row) {}
 
@@ -29,10 +36,18 @@ class PaintedScrollContainer final : public ScrollContainer {
   double position() const { return _position; }
   /// Scrolls to the nearest position that there is.
   void scrollTo(double position);
-  /// Paints labels in the painter's pen, and while there is something to scroll a thin bar below them.
-  void paint(QPainter& painter, const QColor& bar) const;
+  /// False when all of its texts can be seen at once.
+  bool hasMoreThanFits() const;
+  /// Paints labels in the painter's pen, and while there is something to scroll a thin bar below them. Where
+  /// texts go on past an edge, they fade out there before three dots.
+  void paint(QPainter& painter, const Colours& colours) const;
 
  private:
+  enum class Edge { Left, Right };
+
+  double endOfTexts() const;
+  bool goesOnPast(Edge edge) const;
+  void paintMore(QPainter& painter, Edge edge, const Colours& colours) const;
   void paintBar(QPainter& painter, const QColor& colour) const;
 
   QWidget& _row;

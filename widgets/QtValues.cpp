@@ -16,6 +16,24 @@ QString singleLine(std::string_view text) {
   return line;
 }
 
+QString plainTooltip(const QString& text) {
+  // Lines are wrapped at blanks alone. What has none for long may be wrapped there as well.
+  constexpr qsizetype longestWord = 40;
+  constexpr QChar zeroWidthSpace(0x200B);
+  QString wrappable;
+  qsizetype wordLength = 0;
+  for (const QChar character : text) {
+    if (wordLength >= longestWord && !character.isLowSurrogate()) {
+      wrappable += zeroWidthSpace;
+      wordLength = 0;
+    }
+    wrappable += character;
+    wordLength = character.isSpace() ? 0 : wordLength + 1;
+  }
+  return QStringLiteral("<p style=\"white-space: pre-wrap\">") + wrappable.toHtmlEscaped() +
+         QStringLiteral("</p>");
+}
+
 std::string utf8(const QString& text) { return text.toStdString(); }
 
 QFont qtFont(const Font& font) {

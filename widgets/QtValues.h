@@ -16,6 +16,9 @@ namespace varnel {
 QString singleLine(std::string_view text);
 std::string utf8(const QString& text);
 
+/// A tooltip that shows the text character by character as it is, in as many lines as it needs.
+QString plainTooltip(const QString& text);
+
 QFont qtFont(const Font& font);
 
 QRectF qtRect(const Rect& rect);

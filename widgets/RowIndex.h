@@ -17,6 +17,8 @@ class RowIndex {
   /// The row is less than `rows`.
   IndexPath pathOf(std::size_t row) const;
 
+  friend bool operator==(const RowIndex&, const RowIndex&) = default;
+
  private:
   std::vector<std::size_t> _rowsOfSections;
   std::size_t _rows = 0;

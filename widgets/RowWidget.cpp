@@ -3,6 +3,8 @@
 #include <QPainter>
 #include <QPainterPath>
 #include <QStringList>
+#include <QToolTip>
+#include <algorithm>
 
 #include "platform/ui/TableView.h"
 #include "widgets/Colours.h"
@@ -115,6 +117,25 @@ QString RowWidget::description() const {
   return parts.join(QStringLiteral(": "));
 }
 
+QString RowWidget::name() const {
+  if (!_builtInText.isEmpty()) return _builtInText;
+  for (const PaintedScrollContainer* part : {&_labels, &scrolledPart()}) {
+    if (!part->labels().empty()) return part->labels().front()->shownText();
+  }
+  return {};
+}
+
+bool RowWidget::reachesPastItsEdge() const {
+  if (QFontMetricsF(_builtInFont).horizontalAdvance(_builtInText) > builtInRoom().width()) return true;
+  return _labels.hasMoreThanFits() ||
+         std::ranges::any_of(_containers, [](const auto& container) { return container->hasMoreThanFits(); });
+}
+
+void RowWidget::showTooltip(const QPoint& globalPosition) const {
+  if (!reachesPastItsEdge()) return QToolTip::hideText();
+  QToolTip::showText(globalPosition, plainTooltip(description()), parentWidget(), geometry());
+}
+
 double RowWidget::sidewaysRange() const { return scrolledPart().range(); }
 
 double RowWidget::sidewaysPosition() const { return scrolledPart().position(); }
@@ -130,21 +151,24 @@ void RowWidget::scrollSidewaysTo(double position) {
 
 void RowWidget::paintEvent(QPaintEvent*) {
   QPainter painter(this);
-  painter.fillRect(rect(),
-                   _emphasis.isSelected ? selectionColour(palette()) : palette().color(QPalette::Base));
+  const QColor ground = _emphasis.isSelected ? selectionColour(palette()) : palette().color(QPalette::Base);
+  painter.fillRect(rect(), ground);
   painter.setPen(palette().color(QPalette::Text));
   paintBuiltInText(painter);
-  _labels.paint(painter, barColour(palette()));
-  for (const auto& container : _containers) container->paint(painter, barColour(palette()));
+  const PaintedScrollContainer::Colours colours{ground, barColour(palette()), markColour(palette())};
+  _labels.paint(painter, colours);
+  for (const auto& container : _containers) container->paint(painter, colours);
   paintAccessory(painter);
   paintSeparator(painter);
   if (_emphasis.hasFocusFrame) paintFocusFrame(painter);
 }
 
+QRectF RowWidget::builtInRoom() const { return qtRect(contentArea()).adjusted(textInset, 0, -textInset, 0); }
+
 void RowWidget::paintBuiltInText(QPainter& painter) const {
   if (_builtInText.isEmpty()) return;
   painter.setFont(_builtInFont);
-  const QRectF room = qtRect(contentArea()).adjusted(textInset, 0, -textInset, 0);
+  const QRectF room = builtInRoom();
   const QString cut = QFontMetricsF(_builtInFont).elidedText(_builtInText, Qt::ElideRight, room.width());
   painter.drawText(room, Qt::AlignLeft | Qt::AlignAbsolute | Qt::AlignVCenter | Qt::TextSingleLine, cut);
 }

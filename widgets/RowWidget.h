@@ -44,6 +44,13 @@ class RowWidget final : public QWidget, public CellView {
   void fitLabels();
   /// What a screen reader reads: "name: value".
   QString description() const;
+  /// What the row is called: the first of its texts.
+  QString name() const;
+  /// True when a part of its text cannot be seen where the row begins, so that it has to be scrolled, or is
+  /// cut.
+  bool reachesPastItsEdge() const;
+  /// Shows all of a text that the row is too short for, beside the mouse; takes away any tooltip otherwise.
+  void showTooltip(const QPoint& globalPosition) const;
 
   /// How far it can be scrolled sideways; 0 when everything fits.
   double sidewaysRange() const;
@@ -54,6 +61,7 @@ class RowWidget final : public QWidget, public CellView {
   void paintEvent(QPaintEvent* event) override;
 
  private:
+  QRectF builtInRoom() const;
   void paintBuiltInText(QPainter& painter) const;
   void paintAccessory(QPainter& painter) const;
   void paintSeparator(QPainter& painter) const;

@@ -4,6 +4,7 @@
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QScrollBar>
+#include <QToolTip>
 #include <QWheelEvent>
 #include <algorithm>
 #include <cmath>
@@ -59,27 +60,76 @@ void TableWidget::reloadData() { load(); }
 
 void TableWidget::load() {
   _isLoaded = true;
-  measureRows();
+  const auto formerNames = namesOfVisibleRows();
+  const auto sidewaysPositions = sidewaysPositionsByName();
+  Rows rows = measureRows();
   putAwayAllRows();
+  if (rows == Rows::Changed) forgetCells();
   updateScrollRange();
   updateVisibleRows();
-  dropUnusedCells();
+  // Cells that no row has come back to go. Kept for later, they would come before the rows' own at the next
+  // reload.
+  _reloaded = CellPool();
+  if (rows == Rows::Same && haveOtherNames(formerNames)) {
+    rows = Rows::Changed;
+    putAwayAllRows();
+    forgetCells();
+    updateVisibleRows();
+  }
+  if (rows == Rows::Changed) settleNewCells(sidewaysPositions);
   showEmphasis();
 }
 
-void TableWidget::measureRows() {
+// What the user does with a row goes on in its new cell.
+void TableWidget::settleNewCells(const std::map<QString, double>& sidewaysPositions) {
+  for (RowWidget* row : visibleRows()) {
+    const auto found = sidewaysPositions.find(row->name());
+    if (found != sidewaysPositions.end()) row->scrollSidewaysTo(found->second);
+  }
+  if (_current) tellOfFocusOn(*_current);
+}
+
+void TableWidget::forgetCells() {
+  _reloaded = CellPool();
+  _pool = CellPool();
+}
+
+std::map<std::size_t, QString> TableWidget::namesOfVisibleRows() const {
+  std::map<std::size_t, QString> names;
+  for (const auto& [row, cell] : _visible) names.emplace(row, rowOf(*cell).name());
+  return names;
+}
+
+// Of the rows that have been scrolled sideways.
+std::map<QString, double> TableWidget::sidewaysPositionsByName() const {
+  std::map<QString, double> positions;
+  for (const RowWidget* row : visibleRows()) {
+    if (row->sidewaysPosition() > 0) positions.emplace(row->name(), row->sidewaysPosition());
+  }
+  return positions;
+}
+
+bool TableWidget::haveOtherNames(const std::map<std::size_t, QString>& formerNames) const {
+  return std::ranges::any_of(formerNames, [this](const auto& former) {
+    const RowWidget* const row = visibleRow(former.first);
+    return row && row->name() != former.second;
+  });
+}
+
+TableWidget::Rows TableWidget::measureRows() {
   std::vector<std::size_t> rows;
   if (_delegate) {
     rows.resize(_delegate->numberOfSectionsInTableView(*this));
     for (std::size_t section = 0; section < rows.size(); ++section)
       rows[section] = _delegate->tableView_numberOfRowsInSection(*this, section);
   }
-  _rows = RowIndex(std::move(rows));
+  const RowIndex former = std::exchange(_rows, RowIndex(std::move(rows)));
   if (_current && *_current >= _rows.rows()) {
     _current.reset();
     _currentIsSelected = false;
   }
   if (_sizesToFit) setMaximumHeight(static_cast<int>(_rows.rows()) * rowHeight);
+  return _rows == former ? Rows::Same : Rows::Changed;
 }
 
 void TableWidget::updateScrollRange() {
@@ -131,10 +181,6 @@ void TableWidget::putAwayAllRows() {
   for (auto& [row, cell] : _visible) _reloaded.put(std::move(cell));
   _visible.clear();
 }
-
-// Cells that no row has come back to go. Kept for later, they would come before the rows' own at the next
-// reload.
-void TableWidget::dropUnusedCells() { _reloaded = CellPool(); }
 
 std::unique_ptr<TableCell> TableWidget::dequeueReusableCell(std::string_view reuseIdentifier) {
   if (auto cell = _reloaded.take(reuseIdentifier)) return cell;
@@ -198,7 +244,18 @@ void TableWidget::scrollContentsBy(int, int dy) {
 }
 
 bool TableWidget::viewportEvent(QEvent* event) {
+  if (event->type() == QEvent::ToolTip) {
+    showTooltip(static_cast<const QHelpEvent&>(*event));
+    return true;
+  }
   return _touch.take(*event) || QAbstractScrollArea::viewportEvent(event);
+}
+
+void TableWidget::showTooltip(const QHelpEvent& event) {
+  const auto row = rowAt(event.pos());
+  if (const RowWidget* widget = row ? visibleRow(*row) : nullptr)
+    return widget->showTooltip(event.globalPos());
+  QToolTip::hideText();
 }
 
 void TableWidget::keyPressEvent(QKeyEvent* event) {
@@ -212,10 +269,11 @@ void TableWidget::keyPressEvent(QKeyEvent* event) {
     case Qt::Key_Space:
     case Qt::Key_Right:
       return chooseCurrentRow();
-    case Qt::Key_Up:
-    case Qt::Key_Down:
     case Qt::Key_PageUp:
     case Qt::Key_PageDown:
+      return turnPage(event->key());
+    case Qt::Key_Up:
+    case Qt::Key_Down:
     case Qt::Key_Home:
     case Qt::Key_End:
       return moveTo(rowThatKeyLeadsTo(event->key()));
@@ -230,9 +288,21 @@ std::optional<std::size_t> TableWidget::rowThatKeyLeadsTo(int key) const {
   if (key == Qt::Key_Home) return 0;
   if (key == Qt::Key_End) return last;
   if (!_current) return std::min(last, firstWhollyVisibleRow());
-  const std::size_t step = key == Qt::Key_PageUp || key == Qt::Key_PageDown ? rowsOnScreen() : 1;
-  const bool isUpward = key == Qt::Key_Up || key == Qt::Key_PageUp;
-  return isUpward ? *_current - std::min(*_current, step) : std::min(last, *_current + step);
+  return key == Qt::Key_Up ? *_current - std::min<std::size_t>(*_current, 1) : std::min(last, *_current + 1);
+}
+
+// The whole table moves by a page, and the current row with it: it keeps its place on the screen. Where the
+// table is at its end, the row still goes there.
+void TableWidget::turnPage(int key) {
+  if (_rows.rows() == 0) return;
+  const std::size_t last = _rows.rows() - 1;
+  const std::size_t page = rowsOnScreen();
+  const bool isOnScreen = _current && _visible.contains(*_current);
+  const std::size_t from = isOnScreen ? *_current : std::min(last, firstWhollyVisibleRow());
+  QScrollBar& bar = *verticalScrollBar();
+  const int distance = static_cast<int>(page) * rowHeight;
+  bar.setValue(bar.value() + (key == Qt::Key_PageUp ? -distance : distance));
+  moveTo(key == Qt::Key_PageUp ? from - std::min(from, page) : std::min(last, from + page));
 }
 
 void TableWidget::moveTo(std::optional<std::size_t> row) {
@@ -272,6 +342,11 @@ void TableWidget::makeCurrent(std::size_t row) {
   _current = row;
   _currentIsSelected = true;
   showEmphasis();
+  tellOfFocusOn(row);
+}
+
+// Screen readers read that row out.
+void TableWidget::tellOfFocusOn(std::size_t row) const {
   RowWidget* widget = visibleRow(row);
   if (!widget || !hasFocus()) return;
   QAccessibleEvent focus(widget, QAccessible::Focus);
@@ -293,13 +368,20 @@ void TableWidget::showEmphasis() {
 void TableWidget::mousePressEvent(QMouseEvent* event) {
   if (event->button() != Qt::LeftButton) return event->ignore();
   _keysAreUsed = false;
-  _pressed = rowAt(event->position().toPoint());
+  _press.reset();
+  const auto row = rowAt(event->position().toPoint());
+  if (const RowWidget* widget = row ? visibleRow(*row) : nullptr) _press.emplace(*widget, event->position());
+}
+
+void TableWidget::mouseMoveEvent(QMouseEvent* event) {
+  if (RowWidget* row = _press ? visibleRow(_press->row()) : nullptr) _press->moveTo(event->position(), *row);
 }
 
 void TableWidget::mouseReleaseEvent(QMouseEvent* event) {
   if (event->button() != Qt::LeftButton) return event->ignore();
-  const auto pressed = std::exchange(_pressed, std::nullopt);
-  if (pressed && pressed == rowAt(event->position().toPoint())) chooseRow(*pressed);
+  const auto press = std::exchange(_press, std::nullopt);
+  if (press && !press->isDrag() && press->row() == rowAt(event->position().toPoint()))
+    chooseRow(press->row());
 }
 
 void TableWidget::wheelEvent(QWheelEvent* event) {

@@ -1,12 +1,14 @@
 #pragma once
 
 #include <QAbstractScrollArea>
+#include <QHelpEvent>
 #include <map>
 #include <memory>
 #include <optional>
 
 #include "platform/ui/CellPool.h"
 #include "platform/ui/TableView.h"
+#include "widgets/MousePress.h"
 #include "widgets/RowIndex.h"
 #include "widgets/RowWidget.h"
 #include "widgets/TouchScrolling.h"
@@ -14,6 +16,9 @@
 namespace varnel {
 
 /// A table that has widgets for its visible rows only.
+///
+/// A reload hands each row its own cell, as long as there are the same rows: as many, and the visible ones of
+/// the same names. When there are others, every cell is made anew.
 ///
 /// One row is the current one: arrow keys go on from it. It is selected as well until it is deselected.
 /// Choosing a row (click, tap, Return, Enter, Space, Right) makes it the current one and tells the delegate.
@@ -45,6 +50,7 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   bool viewportEvent(QEvent* event) override;
   void keyPressEvent(QKeyEvent* event) override;
   void mousePressEvent(QMouseEvent* event) override;
+  void mouseMoveEvent(QMouseEvent* event) override;
   void mouseReleaseEvent(QMouseEvent* event) override;
   void wheelEvent(QWheelEvent* event) override;
   void focusInEvent(QFocusEvent* event) override;
@@ -52,14 +58,19 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
 
  private:
   void load();
-  void measureRows();
+  enum class Rows { Same, Changed };
+  Rows measureRows();
   void updateScrollRange();
   void updateVisibleRows();
   void showRow(std::size_t row);
   void placeRow(RowWidget& row) const;
   void putAwayRowsOutside(std::size_t begin, std::size_t end);
   void putAwayAllRows();
-  void dropUnusedCells();
+  void forgetCells();
+  void settleNewCells(const std::map<QString, double>& sidewaysPositions);
+  std::map<QString, double> sidewaysPositionsByName() const;
+  bool haveOtherNames(const std::map<std::size_t, QString>& formerNames) const;
+  std::map<std::size_t, QString> namesOfVisibleRows() const;
 
   RowWidget* visibleRow(std::size_t row) const;
   std::optional<std::size_t> rowAt(const QPoint& position) const;
@@ -67,8 +78,11 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   std::size_t firstWhollyVisibleRow() const;
   std::size_t rowsOnScreen() const;
   void makeCurrent(std::size_t row);
+  void tellOfFocusOn(std::size_t row) const;
   void moveTo(std::optional<std::size_t> row);
+  void turnPage(int key);
   std::optional<std::size_t> rowThatKeyLeadsTo(int key) const;
+  void showTooltip(const QHelpEvent& event);
   bool scrollCurrentRowSideways(int key);
   void chooseCurrentRow();
   void showEmphasis();
@@ -83,7 +97,7 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   std::optional<std::size_t> _current;
   bool _currentIsSelected = false;
   bool _keysAreUsed = false;  // rather than mouse or finger: the current row gets a frame
-  std::optional<std::size_t> _pressed;
+  std::optional<MousePress> _press;
   TouchScrolling _touch;
 };
 

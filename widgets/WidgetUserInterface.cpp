@@ -7,32 +7,34 @@
 #include "base/Log.h"
 #include "widgets/AccessibleTable.h"
 #include "widgets/AlertWidget.h"
+#include "widgets/FirstSize.h"
+#include "widgets/QtValues.h"
 
 namespace varnel {
 
 namespace {
 
-// On a desktop the window is at first about as large as a phone's screen.
-constexpr QSize preferredSize(480, 800);
-// A screen that is hardly larger is taken whole.
-constexpr QSize smallScreen(640, 960);
+// A desktop may be without any screen for a while.
+constexpr QRect roomWithoutAScreen(0, 0, 800, 900);
+
+QRect availableRoom() {
+  const QScreen* const screen = QGuiApplication::primaryScreen();
+  return screen ? screen->availableGeometry() : roomWithoutAScreen;
+}
 
 }  // namespace
 
-WidgetUserInterface::WidgetUserInterface(WindowWidget::Wishes wishes) : _wishes(std::move(wishes)) {
+WidgetUserInterface::WidgetUserInterface(WindowWidget::Wishes wishes, RememberedSize lastSize)
+    : _wishes(std::move(wishes)), _lastSize(std::move(lastSize)) {
   describeTablesToScreenReaders();
 }
 
 Rect WidgetUserInterface::screenBounds() const {
-  const QScreen* const screen = QGuiApplication::primaryScreen();
-  // A desktop may be without any screen for a while.
-  const QRect available = screen ? screen->availableGeometry() : QRect(QPoint(), preferredSize);
-  QRect bounds = available;
-  if (available.width() > smallScreen.width()) {
-    bounds.setSize(preferredSize.boundedTo(available.size()));
-    bounds.moveCenter(available.center());
-  }
-  return {double(bounds.x()), double(bounds.y()), double(bounds.width()), double(bounds.height())};
+  const QRect room = availableRoom();
+  if (isTakenWhole(room.size()))
+    return {double(room.x()), double(room.y()), double(room.width()), double(room.height())};
+  const QSize size = firstSize(room.size(), _lastSize.size());
+  return {0, 0, double(size.width()), double(size.height())};
 }
 
 Rect WidgetUserInterface::applicationFrame() const {
@@ -42,6 +44,11 @@ Rect WidgetUserInterface::applicationFrame() const {
 
 std::unique_ptr<Window> WidgetUserInterface::makeWindow(const Rect& frame) {
   auto window = std::make_unique<WindowWidget>(frame, _wishes);
+  if (isTakenWhole(availableRoom().size())) {
+    window->setGeometry(qtPixels(frame));
+  } else {
+    window->setLeavingObserver([this](const QSize& size) { _lastSize.keep(size); });
+  }
   _window = window.get();
   return window;
 }

@@ -4,6 +4,7 @@
 
 #include "platform/ui/UserInterface.h"
 #include "widgets/FontMetrics.h"
+#include "widgets/RememberedSize.h"
 #include "widgets/WindowWidget.h"
 
 namespace varnel {
@@ -12,7 +13,7 @@ namespace varnel {
 class WidgetUserInterface final : public UserInterface {
  public:
   /// The wishes are those of every window that it makes.
-  explicit WidgetUserInterface(WindowWidget::Wishes wishes);
+  explicit WidgetUserInterface(WindowWidget::Wishes wishes, RememberedSize lastSize = RememberedSize());
 
   Rect screenBounds() const override;
   Rect applicationFrame() const override;
@@ -28,6 +29,7 @@ class WidgetUserInterface final : public UserInterface {
 
  private:
   WindowWidget::Wishes _wishes;
+  RememberedSize _lastSize;
   FontMetrics _textMetrics;
   QPointer<WindowWidget> _window;  // the one made last
 };

@@ -4,13 +4,12 @@
 #include <QKeyEvent>
 #include <utility>
 
+#include "widgets/FirstSize.h"
 #include "widgets/QtValues.h"
 
 namespace varnel {
 
 namespace {
-
-constexpr QSize smallest(240, 240);
 
 bool isControlAnd(Qt::Key key, const QKeyEvent& event) {
   return event.key() == key && event.modifiers() == Qt::ControlModifier;
@@ -20,8 +19,8 @@ bool isControlAnd(Qt::Key key, const QKeyEvent& event) {
 
 WindowWidget::WindowWidget(const Rect& frame, Wishes wishes) : _wishes(std::move(wishes)) {
   setWindowTitle(QStringLiteral("Varnel"));
-  setMinimumSize(smallest);
-  setGeometry(qtPixels(frame));
+  setMinimumSize(smallestWindowSide, smallestWindowSide);
+  resize(qtPixels(frame).size());
 }
 
 WindowWidget::~WindowWidget() { dropRoot(); }
@@ -75,6 +74,17 @@ void WindowWidget::keyPressEvent(QKeyEvent* event) {
 void WindowWidget::closeEvent(QCloseEvent* event) {
   event->accept();
   if (_wishes.close) _wishes.close();
+}
+
+void WindowWidget::hideEvent(QHideEvent* event) {
+  QWidget::hideEvent(event);
+  const bool isMinimized = event->spontaneous();
+  if (!isMinimized && _leavingObserver) _leavingObserver(ordinarySize());
+}
+
+QSize WindowWidget::ordinarySize() const {
+  const bool fillsTheScreen = isMaximized() || isFullScreen();
+  return fillsTheScreen && normalGeometry().isValid() ? normalGeometry().size() : size();
 }
 
 }  // namespace varnel

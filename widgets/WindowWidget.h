@@ -3,6 +3,7 @@
 #include <QPointer>
 #include <QWidget>
 #include <functional>
+#include <utility>
 
 #include "platform/ui/Window.h"
 #include "widgets/NavigationWidget.h"
@@ -18,6 +19,7 @@ class WindowWidget final : public QWidget, public Window {
     std::function<void()> startOver{};
   };
 
+  /// As large as the frame. Where it stands, the desktop decides.
   WindowWidget(const Rect& frame, Wishes wishes);
   ~WindowWidget() override;
 
@@ -25,6 +27,11 @@ class WindowWidget final : public QWidget, public Window {
   void makeKeyAndVisible() override;
   void hide() override { QWidget::hide(); }
 
+  /// Called when the window is taken off the screen, with the size that it has while it is neither maximized
+  /// nor full-screen.
+  void setLeavingObserver(std::function<void(const QSize&)> observer) {
+    _leavingObserver = std::move(observer);
+  }
   /// Gives the keyboard to what is on top.
   void takeKeyboard();
 
@@ -32,11 +39,15 @@ class WindowWidget final : public QWidget, public Window {
   void resizeEvent(QResizeEvent* event) override;
   void keyPressEvent(QKeyEvent* event) override;
   void closeEvent(QCloseEvent* event) override;
+  void hideEvent(QHideEvent* event) override;
 
  private:
   void dropRoot();
 
+  QSize ordinarySize() const;
+
   Wishes _wishes;
+  std::function<void(const QSize&)> _leavingObserver;
   QPointer<NavigationWidget> _root;
 };
 

@@ -45,7 +45,8 @@ class TableView {
   /// is on the screen or reloaded.
   virtual void setDelegate(TableViewDelegate* delegate) = 0;
   /// Asks for everything again. The position and the selection stay as far as the rows do. The visible cells
-  /// go through a `CellPool`, in row order.
+  /// go through a `CellPool`, in row order, as long as there are as many rows as before. When a reload
+  /// changes which rows there are, no cell that was there before it is handed out again.
   virtual void reloadData() = 0;
   /// A cell of that identifier that is not in use; null when there is none.
   virtual std::unique_ptr<TableCell> dequeueReusableCell(std::string_view reuseIdentifier) = 0;

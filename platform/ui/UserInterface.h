@@ -26,7 +26,8 @@ class UserInterface {
  public:
   virtual ~UserInterface() = default;
 
-  /// The main screen: all of a phone's, and on a desktop the area that the window is to have at first.
+  /// The main screen: all of a phone's, and on a desktop the size that the window is to have at first, at
+  /// (0, 0): the desktop decides where it stands.
   virtual Rect screenBounds() const = 0;
   /// The part of it that is the application's: less the status bar; on a desktop the window's area as it is
   /// now.

@@ -20,7 +20,7 @@ int viewAsText(int& argumentCount, char** arguments, const Options& options,
 
   TextViewer viewer(services.model(), services.files(), output);
   if (options.updates) viewer.afterUpdates(*options.updates, [&host] { host.end(0); });
-  const SignalWatcher watcher({SIGINT, SIGTERM, SIGUSR1, SIGUSR2}, [&](int signal) {
+  const SignalWatcher watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [&](int signal) {
     switch (signal) {
       case SIGUSR1:
         viewer.startOver();

@@ -4,6 +4,7 @@
 
 #include "app/VarnelApp.h"
 #include "host/SignalWatcher.h"
+#include "host/StateFolder.h"
 #include "programs/varnel/HostServices.h"
 #include "widgets/WidgetApplication.h"
 #include "widgets/WidgetUserInterface.h"
@@ -16,11 +17,12 @@ int viewInWindow(int& argumentCount, char** arguments, const Options& options,
   HostServices services(options, application);
   VarnelApp* viewer = nullptr;
   WidgetUserInterface userInterface(
-      {.close = [&host] { host.end(0); }, .startOver = [&viewer] { viewer->startOver(); }});
+      {.close = [&host] { host.end(0); }, .startOver = [&viewer] { viewer->startOver(); }},
+      RememberedSize(stateFolder()));
   VarnelApp app({services.model(), services.files(), services.preferences(), userInterface});
   viewer = &app;
   if (options.updates) app.afterUpdates(*options.updates, [&host] { host.end(0); });
-  const SignalWatcher watcher({SIGINT, SIGTERM, SIGUSR1, SIGUSR2}, [&](int signal) {
+  const SignalWatcher watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [&](int signal) {
     switch (signal) {
       case SIGUSR1:
         app.startOver();

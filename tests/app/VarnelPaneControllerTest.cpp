@@ -243,6 +243,12 @@ TEST_F(VarnelPaneControllerTest, ALeafInANameOnlyCellShowsItsNameOnly) {
   EXPECT_EQ(table().cellView(0).labels[0]->frame, (Rect{10, 15, 40, 20}));
 }
 
+TEST_F(VarnelPaneControllerTest, ALeafShowsItsValueAsSoonAsThereAreMoreRows) {
+  show(tree(dictionaryOf({{"Row", dictionaryOf({})}})));
+  controller->reloadWithNode(tree(dictionaryOf({{"Row", "-71 dBm"}, {"Other", dictionaryOf({})}})));
+  EXPECT_EQ(value(0), "-71 dBm");
+}
+
 TEST_F(VarnelPaneControllerTest, AnInnerNodeInANameAndValueCellShowsNoValue) {
   show(tree(dictionaryOf({{"RSSI", "-71 dBm"}})));
   controller->reloadWithNode(tree(dictionaryOf({{"Cells", dictionaryOf({})}})));

@@ -25,6 +25,19 @@ TEST(SignalWatcher, TurnsSignalsIntoCallsFromTheEventLoop) {
   EXPECT_THAT(taken, ElementsAre(SIGTERM, SIGUSR1));
 }
 
+TEST(SignalWatcher, AHangUpThatTheProgramWasStartedToIgnoreStaysIgnored) {
+  ::signal(SIGHUP, SIG_IGN);
+  std::vector<int> taken;
+  {
+    const SignalWatcher watcher({SIGHUP, SIGUSR1}, [&](int signal) { taken.push_back(signal); });
+    ::kill(::getpid(), SIGHUP);
+    ::kill(::getpid(), SIGUSR1);
+    EXPECT_TRUE(runUntil([&] { return !taken.empty(); }));
+  }
+  ::signal(SIGHUP, SIG_DFL);
+  EXPECT_THAT(taken, ElementsAre(SIGUSR1));
+}
+
 TEST(SignalWatcherDeathTest, LeavesSignalsAloneAfterwards) {
   testing::FLAGS_gtest_death_test_style = "threadsafe";
   const auto die = [] {

@@ -6,6 +6,7 @@
 #include <QApplication>
 #include <QTest>
 #include <QTimer>
+#include <csignal>
 #include <cstdlib>
 #include <functional>
 
@@ -36,6 +37,7 @@ class WindowViewTest : public testing::Test {
   WindowViewTest() {
     ::setenv("QT_QPA_PLATFORM", "offscreen", 1);
     ::unsetenv("DBUS_SESSION_BUS_ADDRESS");
+    ::setenv("XDG_STATE_HOME", _state.path().c_str(), 1);
   }
 
   int statusAfter(std::function<void(QWidget& window)> whatIsDone) const {
@@ -56,6 +58,9 @@ class WindowViewTest : public testing::Test {
  private:
   TemporaryFolder _runtime;
   TemporaryFolder _device;
+
+ protected:
+  TemporaryFolder _state;
 };
 
 TEST_F(WindowViewTest, ClosingTheWindowEndsTheViewerAndPutsThePreferenceBack) {
@@ -67,6 +72,19 @@ TEST_F(WindowViewTest, ControlQEndsTheViewerAndPutsThePreferenceBack) {
   EXPECT_EQ(statusAfter([](QWidget& window) { QTest::keyClick(&window, Qt::Key_Q, Qt::ControlModifier); }),
             0);
   expectThePreferenceBack();
+}
+
+TEST_F(WindowViewTest, AHangUpEndsTheViewerAndPutsThePreferenceBack) {
+  EXPECT_EQ(statusAfter([](QWidget&) { ::kill(::getpid(), SIGHUP); }), 0);
+  expectThePreferenceBack();
+}
+
+TEST_F(WindowViewTest, TheWindowsSizeIsKeptForTheNextRun) {
+  statusAfter([](QWidget& window) {
+    window.resize(500, 450);
+    window.close();
+  });
+  EXPECT_EQ(contentsOf(_state.path() / "varnel/window-size"), "500 450\n");
 }
 
 }  // namespace

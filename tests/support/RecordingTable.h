@@ -154,8 +154,13 @@ class RecordingTable final : public TableView {
     _isLoaded = true;
     if (_delegate && _delegate->numberOfSectionsInTableView(*this) != 1)
       throw std::logic_error("a table has one section");
+    const std::size_t formerRows = _rows;
     _rows = _delegate ? _delegate->tableView_numberOfRowsInSection(*this, 0) : 0;
     putAway(_reloaded, [](std::size_t) { return true; });
+    if (_rows != formerRows) {
+      _reloaded = CellPool();
+      _pool = CellPool();
+    }
     showVisibleRows();
     _reloaded = CellPool();
   }

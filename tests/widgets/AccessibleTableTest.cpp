@@ -40,6 +40,24 @@ TEST_F(AccessibleTableTest, RowsAreNamedNameAndValue) {
   EXPECT_EQ(row(2).text(QAccessible::Name), "Empty");
 }
 
+TEST_F(AccessibleTableTest, ARowThatIsTooShortForItsValueIsDescribedByAllOfIt) {
+  delegate.rows[1].value = std::string(80, 'x');
+  table.reloadData();
+  EXPECT_EQ(row(1).text(QAccessible::Description).toStdString(), "RSRP: " + std::string(80, 'x'));
+  EXPECT_EQ(row(0).text(QAccessible::Description), "");
+}
+
+TEST(AccessibleWindow, AWindowIsAWindowNamedByItsTitle) {
+  describeTablesToScreenReaders();
+  WindowWidget window({0, 0, 360, 640}, {});
+  QAccessibleInterface& accessible = *QAccessible::queryAccessibleInterface(&window);
+  EXPECT_EQ(accessible.role(), QAccessible::Window);
+  EXPECT_EQ(accessible.text(QAccessible::Name), window.windowTitle());
+  window.show();
+  ASSERT_TRUE(QTest::qWaitForWindowActive(&window));
+  EXPECT_TRUE(accessible.state().active);
+}
+
 TEST_F(AccessibleTableTest, TheCurrentRowHasFocusAndSelection) {
   QTest::keyClick(&table, Qt::Key_Down);
   QTest::keyClick(&table, Qt::Key_Down);

@@ -49,6 +49,21 @@ TEST_F(HeaderWidgetTest, TheWayBackIsAtLeastAsLargeAsAFinger) {
   EXPECT_GE(back().height(), 44);
 }
 
+TEST_F(HeaderWidgetTest, ATitleThatDoesNotFitIsCutAtItsEndAndWholeInItsTooltip) {
+  const QString title = "A title so long that no letters of it are <small> enough for the bar";
+  show(title, "Varnel", 360);
+  EXPECT_TRUE(titleIsWhole()) << "what is shown is not cut again";
+  EXPECT_TRUE(label().text().startsWith("A title so long")) << label().text().toStdString();
+  EXPECT_TRUE(label().text().endsWith(QChar(0x2026))) << label().text().toStdString();
+  EXPECT_EQ(header.title(), title);
+  EXPECT_EQ(label().accessibleName(), title);
+  EXPECT_TRUE(label().toolTip().contains("A title so long that no letters of it are &lt;small&gt; enough"));
+  header.resize(900, 48);
+  QCoreApplication::processEvents();
+  EXPECT_EQ(label().text(), title);
+  EXPECT_EQ(label().toolTip(), "");
+}
+
 TEST_F(HeaderWidgetTest, TitlesAreNoMarkUp) {
   show("<b>A</b> & B", "<i>C</i> & D", 360);
   EXPECT_EQ(label().textFormat(), Qt::PlainText);

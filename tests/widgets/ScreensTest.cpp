@@ -103,7 +103,7 @@ TEST_P(ScreensTest, WhatDoesNotFitCanBeScrolledIntoView) {
   ASSERT_EQ(row.description(), "Connected Mode Intra-Frequency Measurement Results");
   EXPECT_EQ(row.sidewaysRange() > 0, GetParam().first == 360);
   if (row.sidewaysRange() == 0) return;
-  EXPECT_TRUE(touchesItsEdge(row));
+  EXPECT_TRUE(row.reachesPastItsEdge());
   press(Qt::Key_End);
   for (int i = 0; i < 10; ++i) press(Qt::Key_Right, Qt::ShiftModifier);
   EXPECT_EQ(row.sidewaysPosition(), row.sidewaysRange());

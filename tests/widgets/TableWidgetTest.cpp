@@ -4,8 +4,11 @@
 #include <gtest/gtest.h>
 
 #include <QScrollBar>
+#include <QTextDocument>
+#include <QToolTip>
 #include <algorithm>
 
+#include "tests/support/EventLoop.h"
 #include "tests/support/TestWidgets.h"
 
 namespace varnel {
@@ -141,12 +144,54 @@ TEST_F(TableWidgetTest, AReloadWithFewerRowsLeavesNoneOfTheLostOnesOnTheScreen) 
   delegate.rows = leaves(3);
   table.reloadData();
   EXPECT_EQ(shownRows(), 3);
-  const std::vector<RowWidget*> kept = table.visibleRows();
   delegate.rows = leaves(8);
   table.reloadData();
   EXPECT_EQ(shownRows(), 8);
-  EXPECT_EQ(delegate.made, 13u);
-  for (std::size_t index = 0; index < kept.size(); ++index) EXPECT_EQ(&row(index), kept[index]);
+}
+
+TEST_F(TableWidgetTest, ASectionThatBecomesALeafShowsItsNameOnlyUntilAReloadChangesHowManyRowsThereAre) {
+  showWith({{"Cells"}, {"RSRP", "-97 dBm"}});
+  delegate.rows[0].value = "none";
+  table.reloadData();
+  EXPECT_EQ(row(0).description(), "Cells");
+  table.reloadData();
+  EXPECT_EQ(row(0).description(), "Cells");
+  delegate.rows.push_back({"RSRQ", "-11 dB"});
+  table.reloadData();
+  EXPECT_EQ(row(0).description(), "Cells: none");
+  EXPECT_EQ(delegate.made, 5u);
+}
+
+TEST_F(TableWidgetTest, AReloadWithOtherNamesMakesFreshCells) {
+  showWith({{"Cells"}, {"RSRP", "-97 dBm"}});
+  delegate.rows = {{"RSRP", "-97 dBm"}, {"RSRQ", "-11 dB"}};
+  table.reloadData();
+  EXPECT_EQ(row(0).description(), "RSRP: -97 dBm");
+  EXPECT_EQ(row(1).description(), "RSRQ: -11 dB");
+}
+
+TEST_F(TableWidgetTest, CellsThatWereScrolledAwayBeforeTheRowsChangedAreNotHandedOutAfterwards) {
+  showWith(leaves(20));
+  for (TestRow& each : delegate.rows) each.value.reset();
+  delegate.rows.pop_back();
+  table.reloadData();
+  table.verticalScrollBar()->setValue(500);  // sections' cells into the pool
+  table.verticalScrollBar()->setValue(0);
+  delegate.rows = leaves(20);
+  table.reloadData();
+  table.verticalScrollBar()->setValue(25);  // a ninth cell
+  EXPECT_EQ(row(8).description(), "Row 8: 8");
+}
+
+TEST_F(TableWidgetTest, ARowKeepsSidewaysPositionAndFocusWhenTheRowsChange) {
+  showWith(leaves(2, std::string(200, 'x')));
+  press(Qt::Key_Down);
+  press(Qt::Key_Right, Qt::ShiftModifier);
+  delegate.rows = leaves(3, std::string(200, 'x'));
+  table.reloadData();
+  EXPECT_EQ(row(0).sidewaysPosition(), 60);
+  EXPECT_EQ(row(1).sidewaysPosition(), 0);
+  EXPECT_EQ(current(), 0);
 }
 
 TEST_F(TableWidgetTest, ARowKeepsItsSidewaysPositionOverAReload) {
@@ -237,14 +282,50 @@ TEST_F(TableWidgetTest, PageAndEndKeysScroll) {
   press(Qt::Key_Down);
   press(Qt::Key_PageDown);
   EXPECT_EQ(current(), 8);
-  EXPECT_EQ(table.verticalScrollBar()->value(), 50);
+  EXPECT_EQ(table.verticalScrollBar()->value(), 400);
   press(Qt::Key_End);
   EXPECT_EQ(current(), 99);
   EXPECT_EQ(table.verticalScrollBar()->value(), 4600);
   press(Qt::Key_PageUp);
   EXPECT_EQ(current(), 91);
+  EXPECT_EQ(table.verticalScrollBar()->value(), 4200);
   press(Qt::Key_Home);
   EXPECT_EQ(table.verticalScrollBar()->value(), 0);
+}
+
+TEST_F(TableWidgetTest, TheFirstPageDownPagesWithoutACurrentRow) {
+  showWith(leaves(100));
+  press(Qt::Key_PageDown);
+  EXPECT_EQ(table.verticalScrollBar()->value(), 400);
+  EXPECT_EQ(current(), 8);
+}
+
+TEST_F(TableWidgetTest, TheFirstPageDownAfterAClickPagesAndKeepsTheRowsPlaceOnTheScreen) {
+  showWith(leaves(100));
+  click({100, 125});
+  press(Qt::Key_PageDown);
+  EXPECT_EQ(table.verticalScrollBar()->value(), 400);
+  EXPECT_EQ(current(), 10);
+  press(Qt::Key_PageUp);
+  EXPECT_EQ(table.verticalScrollBar()->value(), 0);
+  EXPECT_EQ(current(), 2);
+}
+
+TEST_F(TableWidgetTest, APageGoesOnFromTheScreenWhenTheClickedRowWasScrolledAway) {
+  showWith(leaves(100));
+  click({100, 125});
+  table.verticalScrollBar()->setValue(2000);
+  press(Qt::Key_PageDown);
+  EXPECT_EQ(table.verticalScrollBar()->value(), 2400);
+  EXPECT_EQ(current(), 48);
+}
+
+TEST_F(TableWidgetTest, AtTheEndAPageLeadsToTheLastRow) {
+  showWith(leaves(10));
+  click({100, 275});
+  press(Qt::Key_PageDown);
+  EXPECT_EQ(table.verticalScrollBar()->value(), 100);
+  EXPECT_EQ(current(), 9);
 }
 
 TEST_F(TableWidgetTest, ReturnEnterSpaceAndRightChooseTheCurrentRow) {
@@ -287,6 +368,58 @@ TEST_F(TableWidgetTest, AMouseThatLeavesTheRowChoosesNothing) {
   QTest::mousePress(table.viewport(), Qt::LeftButton, {}, {100, 25});
   QTest::mouseRelease(table.viewport(), Qt::LeftButton, {}, {100, 75});
   EXPECT_THAT(delegate.chosen, IsEmpty());
+}
+
+TEST_F(TableWidgetTest, AMouseDragScrollsALongValueAndChoosesNothing) {
+  showWith(leaves(3, std::string(200, 'x')));
+  QTest::mousePress(table.viewport(), Qt::LeftButton, {}, {300, 75});
+  QTest::mouseMove(table.viewport(), {220, 80});
+  EXPECT_EQ(row(1).sidewaysPosition(), 80);
+  QTest::mouseMove(table.viewport(), {295, 80});
+  EXPECT_EQ(row(1).sidewaysPosition(), 5);
+  QTest::mouseRelease(table.viewport(), Qt::LeftButton, {}, {295, 80});
+  EXPECT_EQ(row(0).sidewaysPosition(), 0);
+  EXPECT_THAT(delegate.chosen, IsEmpty());
+}
+
+TEST_F(TableWidgetTest, ATremblingClickOnALongValueChoosesItsRow) {
+  showWith(leaves(3, std::string(200, 'x')));
+  QTest::mousePress(table.viewport(), Qt::LeftButton, {}, {300, 75});
+  QTest::mouseMove(table.viewport(), {298, 76});
+  QTest::mouseRelease(table.viewport(), Qt::LeftButton, {}, {298, 76});
+  EXPECT_EQ(row(1).sidewaysPosition(), 0);
+  EXPECT_THAT(delegate.chosen, ElementsAre(1));
+}
+
+TEST_F(TableWidgetTest, ADragOverAReloadGoesOn) {
+  showWith(leaves(3, std::string(200, 'x')));
+  QTest::mousePress(table.viewport(), Qt::LeftButton, {}, {300, 75});
+  delegate.rows.push_back({"More", "1"});
+  table.reloadData();
+  QTest::mouseMove(table.viewport(), {260, 75});
+  EXPECT_EQ(row(1).sidewaysPosition(), 40);
+  delegate.rows.clear();
+  table.reloadData();
+  QTest::mouseMove(table.viewport(), {200, 75});
+  QTest::mouseRelease(table.viewport(), Qt::LeftButton, {}, {200, 75});
+  EXPECT_THAT(delegate.chosen, IsEmpty());
+}
+
+TEST_F(TableWidgetTest, ARowThatIsTooShortForItsValueTellsAllOfItInATooltip) {
+  const auto pointAt = [this](const QPoint& position) {
+    QHelpEvent event(QEvent::ToolTip, position, table.viewport()->mapToGlobal(position));
+    QApplication::sendEvent(table.viewport(), &event);
+  };
+  showWith({{"Short", "1"}, {"Number", std::string(80, 'x') + " <b>&"}});
+  pointAt({100, 75});
+  EXPECT_TRUE(QToolTip::isVisible());
+  QTextDocument tip;
+  tip.setHtml(QToolTip::text());
+  EXPECT_EQ(tip.toPlainText().remove(QChar(0x200B)).toStdString(),
+            "Number: " + std::string(80, 'x') + " <b>&");
+  pointAt({100, 25});
+  // The toolkit takes a tooltip away with a delay, its text at once.
+  EXPECT_TRUE(runUntil([] { return !QToolTip::isVisible(); }));
 }
 
 TEST_F(TableWidgetTest, WithoutADelegateItIsEmpty) {
