@@ -190,8 +190,17 @@ class InputDecoding {
     });
   }
 
+  // Values that are no numbers, such as states, have no place in a picture.
+  void tellUnplottedPaths() const {
+    if (!_recorder) return;
+    for (const auto& [path, value] : _recorder->unplotted())
+      tell("no value of " + _name + " under '" + path + "' begins with a number (one is '" + value +
+           "'), so no line shows it");
+  }
+
   bool drawPicture() const {
     tellUnseenPaths();
+    tellUnplottedPaths();
     return !_recorder || succeeds([&] {
       if (_recorder->isEmpty())
         throw std::runtime_error(_name + " has no number under the paths to plot, so " + _options.plot->file +

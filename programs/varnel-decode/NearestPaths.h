@@ -17,8 +17,8 @@ class NearestPaths {
   void take(const Value& display);
 
   /// Those that one gets from the path by the fewest edits, or by going on from a section; at most three, the
-  /// nearest first. None where more than a third of the path would have to change. As users write them, without the first
-  /// slash.
+  /// nearest first. None where more than a third of the path would have to change. As users write them,
+  /// without the first slash.
   std::vector<std::string> to(std::string_view path) const;
 
  private:

@@ -11,6 +11,7 @@
 #include <utility>
 
 #include "model/VarnelModelNode.h"
+#include "programs/varnel-decode/Printable.h"
 #include "programs/varnel-decode/plot/ChartModule.h"
 
 namespace varnel {
@@ -50,6 +51,35 @@ double secondsOf(Time time) {
   return std::clamp(seconds, earliest, latest);
 }
 
+// A text that a picture can hold: longer ones are cut, which takes no character of UTF-8 apart.
+std::string shortened(std::string_view text) {
+  constexpr std::size_t mostCharacters = 200;
+  std::size_t characters = 0, size = 0;
+  for (; size < text.size(); ++size) {
+    const bool isContinuation = (static_cast<unsigned char>(text[size]) & 0xC0) == 0x80;
+    if (!isContinuation && ++characters > mostCharacters) break;
+  }
+  // A text of continuations alone has no characters.
+  size = std::min(size, 4 * mostCharacters);
+  return printable(text.substr(0, size)) + (size < text.size() ? "…" : "");
+}
+
+// The path of the section or list that all of several paths lead through; empty for one alone.
+std::string_view commonSection(const std::vector<std::string_view>& paths) {
+  if (paths.size() < 2) return {};
+  std::string_view common = paths.front();
+  for (const std::string_view path : paths)
+    common = common.substr(0, std::ranges::mismatch(common, path).in1 - common.begin());
+  // Not in the middle of a name or of what selects a row.
+  std::size_t end = 0, open = 0;
+  for (std::size_t i = 0; i < common.size(); ++i) {
+    if (open == 0 && (common[i] == '/' || common[i] == '[')) end = i;
+    if (common[i] == '[') ++open;
+    if (common[i] == ']' && open > 0) --open;
+  }
+  return common.substr(0, end);
+}
+
 // Beside the program in the build tree, else where it was installed.
 fs::path modulePath() {
   const fs::path folder = fs::read_symlink("/proc/self/exe").parent_path();
@@ -73,32 +103,44 @@ std::optional<Measurement> measurementIn(std::string_view text) {
   return Measurement{number, unitIn({rest, end})};
 }
 
-void PlotLine::Column::take(const Point& point) {
-  if (point.value < lowest.value) lowest = point;
-  if (point.value > highest.value) highest = point;
+void PlotLine::Column::take(const Column& later) {
+  until = std::max(until, later.until);
+  lowest = std::min(lowest, later.lowest);
+  highest = std::max(highest, later.highest);
+  sum += later.sum;
+  count += later.count;
 }
 
 void PlotLine::add(double seconds, double value) {
-  if (_columns.empty()) _start = seconds;
-  const auto number = static_cast<std::int64_t>(std::floor((seconds - _start) / _width));
-  const Point point{seconds, value};
-  if (_columns.empty() || number > _columns.back().number) {
-    const bool isGapSeen = _isInterrupted && !isNextTo(number);
-    _columns.push_back({number, point, point, _columns.empty() || isGapSeen});
+  // What steps back less are records that overtake each other.
+  constexpr double largestOvertaking = 10;
+  const bool isBack = !_columns.empty() && seconds < _latest - largestOvertaking;
+  const auto number = static_cast<std::int64_t>(std::floor((seconds - earliest) / _width));
+  const bool isSameColumn = !_columns.empty() && !isBack && number <= _columns.back().number;
+  const bool isGap = _isInterrupted && !isSameColumn && !isNextTo(number);
+  if (!_columns.empty() && !isBack && !isGap)
+    _columns.back().until = std::max(_columns.back().until, seconds);
+  const Column column{.number = number,
+                      .start = seconds,
+                      .until = seconds,
+                      .lowest = value,
+                      .highest = value,
+                      .sum = value,
+                      .count = 1,
+                      .startsNewLine = _columns.empty() || isBack || isGap};
+  if (isSameColumn) {
+    _columns.back().take(column);
   } else {
-    addAmongOthers(number, point);
+    _columns.push_back(column);
   }
+  _latest = seconds;
   _isInterrupted = false;
   while (_columns.size() > mostColumns) halve();
 }
 
-// Nearly always the last column; an earlier one once the clock was set back.
-void PlotLine::addAmongOthers(std::int64_t number, const Point& point) {
-  const auto column = std::ranges::lower_bound(_columns, number, {}, &Column::number);
-  if (column->number == number) return column->take(point);
-  const bool isFirst = column == _columns.begin();
-  column->startsNewLine = column->startsNewLine && !isFirst;
-  _columns.insert(column, {number, point, point, isFirst});
+void PlotLine::interrupt(double seconds) {
+  if (!_columns.empty() && !_isInterrupted) _columns.back().until = std::max(_columns.back().until, seconds);
+  _isInterrupted = true;
 }
 
 bool PlotLine::isNextTo(std::int64_t number) const {
@@ -107,46 +149,48 @@ bool PlotLine::isNextTo(std::int64_t number) const {
 
 void PlotLine::halve() {
   for (Column column : std::exchange(_columns, {})) {
-    column.number = column.number / 2 - (column.number % 2 < 0 ? 1 : 0);  // rounded down
+    column.number /= 2;
     if (!_columns.empty() && _columns.back().number == column.number) {
-      _columns.back().take(column.lowest);
-      _columns.back().take(column.highest);
-    } else {
-      if (isNextTo(column.number)) column.startsNewLine = false;
-      _columns.push_back(column);
+      _columns.back().take(column);
+      continue;
     }
+    if (isNextTo(column.number)) {
+      column.startsNewLine = false;
+      _columns.back().until = column.start;
+    }
+    _columns.push_back(column);
   }
   _width *= 2;
 }
 
 std::vector<PlotPoint> PlotLine::points() const {
   std::vector<PlotPoint> points;
-  for (const auto& [number, lowest, highest, startsNewLine] : _columns) {
-    const bool isRising = lowest.seconds <= highest.seconds;
-    const Point& first = isRising ? lowest : highest;
-    const Point& second = isRising ? highest : lowest;
-    points.push_back({first.seconds, first.value, startsNewLine});
-    if (second.seconds != first.seconds || second.value != first.value)
-      points.push_back({second.seconds, second.value, false});
+  for (const Column& column : _columns) {
+    // The sum of equal values need not be a multiple of them.
+    const double mean =
+        std::clamp(column.sum / static_cast<double>(column.count), column.lowest, column.highest);
+    points.push_back({column.start, column.until, column.lowest, mean, column.highest, column.startsNewLine});
   }
   return points;
 }
 
 PlotRecorder::PlotRecorder(const std::vector<std::string>& paths) {
   for (const std::string& path : paths)
-    _series.push_back({.path = treePath(path), .label = treePath(path).substr(1), .unit = {}, .line = {}});
+    _series.push_back({.path = treePath(path), .unit = {}, .otherText = {}, .line = {}});
 }
 
 void PlotRecorder::take(const Generation& generation) {
+  const double seconds = secondsOf(generation.time);
   for (Series& series : _series) {
     const auto text = leafValueUnderPath(generation.display, series.path);
     const auto measurement = text ? measurementIn(*text) : std::nullopt;
     if (!measurement) {
-      series.line.interrupt();
+      if (text && !series.otherText) series.otherText = *text;
+      series.line.interrupt(seconds);
       continue;
     }
     if (!series.unit) series.unit = measurement->unit;
-    series.line.add(secondsOf(generation.time), measurement->number);
+    series.line.add(seconds, measurement->number);
   }
 }
 
@@ -154,11 +198,25 @@ bool PlotRecorder::isEmpty() const {
   return std::ranges::all_of(_series, [](const Series& series) { return series.line.isEmpty(); });
 }
 
+std::vector<PlotRecorder::Unplotted> PlotRecorder::unplotted() const {
+  std::vector<Unplotted> unplotted;
+  for (const Series& series : _series)
+    if (series.line.isEmpty() && series.otherText)
+      unplotted.push_back({series.path.substr(1), shortened(*series.otherText)});
+  return unplotted;
+}
+
 Plot PlotRecorder::plot(const std::string& title) const {
-  Plot plot{title, {}};
+  std::vector<std::string_view> labels;
+  for (const Series& series : _series)
+    if (!series.line.isEmpty()) labels.push_back(std::string_view(series.path).substr(1));
+  const std::string_view section = commonSection(labels);
+  Plot plot{shortened(title + (section.empty() ? "" : ": " + std::string(section))), {}};
   for (const Series& series : _series) {
     if (series.line.isEmpty()) continue;
-    plot.series.push_back({series.label, series.unit.value_or(""), series.line.points()});
+    std::string label = series.path.substr(1 + section.size());
+    if (!section.empty() && label.starts_with('/')) label.erase(0, 1);
+    plot.series.push_back({shortened(label), series.unit.value_or(""), series.line.points()});
   }
   return plot;
 }

@@ -20,41 +20,39 @@ struct Measurement {
 /// Nothing for a text that does not begin with a number; blanks before it count for nothing.
 std::optional<Measurement> measurementIn(std::string_view text);
 
-/// Values over time, thinned out as they come in: never more than two for each of a thousand columns of the
-/// picture, its lowest and its highest; gaps that are narrower than a column close. Short sequences are kept
-/// whole.
+/// Values over time, each of which holds until the next is there. They are thinned out as they come in: of
+/// the values in each of a thousand columns of the picture lowest, mean and highest are kept; gaps that are
+/// narrower than a column close. Short sequences are kept whole.
 class PlotLine {
  public:
   static constexpr std::size_t mostColumns = 1000;
 
-  /// Times are those of displays. They come in order until the clock is set back; then each value still goes
-  /// where its time is. Seconds since 1970.
+  /// Seconds since 1970, not before the year 1. Where time steps back by more than ten seconds, a new line
+  /// begins.
   void add(double seconds, double value);
-  /// There is no value at this time: no line crosses it.
-  void interrupt() { _isInterrupted = true; }
+  /// There is no value from this time on: no line crosses it.
+  void interrupt(double seconds);
 
   bool isEmpty() const { return _columns.empty(); }
   std::vector<PlotPoint> points() const;
 
  private:
-  struct Point {
-    double seconds, value;
-  };
   struct Column {
     std::int64_t number;
-    Point lowest, highest;
+    double start, until;
+    double lowest, highest, sum;
+    std::uint64_t count;
     bool startsNewLine;
 
-    void take(const Point& point);
+    void take(const Column& later);
   };
 
-  void addAmongOthers(std::int64_t number, const Point& point);
   void halve();
   bool isNextTo(std::int64_t number) const;
 
   std::vector<Column> _columns;
-  double _start = 0;           // of the column 0, in which the first value lies
   double _width = 1.0 / 1024;  // of each, in seconds; doubled whenever there are too many
+  double _latest = 0;
   bool _isInterrupted = false;
 };
 
@@ -65,12 +63,20 @@ class PlotRecorder final : public GenerationSink {
   void take(const Generation& generation) override;
 
   bool isEmpty() const;
+  /// The picture of all that had numbers. What the labels have in common stands in the title.
   Plot plot(const std::string& title) const;
+
+  /// A path that had values, none of which begins with a number.
+  struct Unplotted {
+    std::string path, value;
+  };
+  std::vector<Unplotted> unplotted() const;
 
  private:
   struct Series {
-    std::string path, label;
-    std::optional<std::string> unit;  // absent before the first number
+    std::string path;
+    std::optional<std::string> unit;       // absent before the first number
+    std::optional<std::string> otherText;  // the first value that is no number
     PlotLine line;
   };
   std::vector<Series> _series;

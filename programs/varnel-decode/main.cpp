@@ -35,6 +35,8 @@ std::vector<std::string> technologiesWithGenerator(const Services& services) {
 }
 
 int decodeAll(const Options& options, const DecodingServices& services) {
+  if (options.technology && !succeeds([] { static_cast<void>(readableResourceFolder()); }))
+    return generalError;
   int status = generalError;
   const auto decodeOne = [&](std::size_t index) { return decodeInput(options, index, services); };
   const bool isPassedOn = succeeds([&] {

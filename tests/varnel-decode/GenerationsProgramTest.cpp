@@ -235,6 +235,92 @@ TEST_F(DecodeGenerations, APlotIsAPictureWithLegendUnitAndTime) {
   EXPECT_THAT(svg, HasSubstr("<polyline"));
 }
 
+// A failure that shows the whole picture helps nobody.
+bool holds(const std::string& svg, const std::string& text) { return svg.find(text) != std::string::npos; }
+
+TEST_F(DecodeGenerations, EveryLineOfAPlotStandsInTheLegendAndEachAxisHasItsUnit) {
+  std::string rows;
+  std::vector<std::string> arguments = {
+      "--technology",         "kalvi-lte", "--format", "none", write("capture", ""), "--plot",
+      folder.file("plot.svg")};
+  for (int i = 0; i < 40; ++i) {
+    const std::string name = "A number of no small importance " + std::to_string(i);
+    rows += "<key>" + name + "</key><string>" + std::to_string(i) + (i % 2 == 0 ? " dBm" : "") + "</string>";
+    arguments.push_back("PDP Context Info[Context=5]/" + name);
+  }
+  write("capture", pcapHeader() + pcapRecord(afternoon, 0,
+                                             pdpContexts("<array><dict><key>Context</key><string>5</string>" +
+                                                         rows + "</dict></array>")));
+  const Result result = run(arguments);
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_EQ(result.error, "");
+  const std::string svg = contentsOf(folder.file("plot.svg"));
+  for (int i = 0; i < 40; ++i)
+    EXPECT_TRUE(holds(svg, ">A number of no small importance " + std::to_string(i) +
+                               (i % 2 == 0 ? " (dBm)</text>" : "</text>")))
+        << i;
+  for (const char* text : {"PDP Context Info[Context=5]</text>", ">dBm</text>", ">(no unit)</text>"})
+    EXPECT_TRUE(holds(svg, text)) << text;
+  EXPECT_FALSE(holds(svg, "viewBox=\"0 0 1200 600\"")) << "a long legend makes the picture higher";
+}
+
+TEST_F(DecodeGenerations, TheTimeAxisHasRoundTicks) {
+  struct Length {
+    std::uint32_t seconds;
+    std::vector<std::string> labels;
+  };
+  const Length lengths[] = {
+      {30, {"14:05:15", "14:05:20", "14:05:35"}},
+      {600, {"14:06", "14:08", "14:14"}},
+      {5 * 3600, {"15:00", "16:00", "19:00"}},
+      {20 * 3600, {"03-01 18:00", "03-02 00:00", "03-02 06:00"}},
+      {9 * 86400, {"2024-03-02", "2024-03-04", "2024-03-10"}},
+  };
+  for (const auto& [seconds, labels] : lengths) {
+    const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)) +
+                                                  pcapRecord(afternoon + 2, 0, antennas(4)) +
+                                                  pcapRecord(afternoon + seconds, 0, antennas(2)));
+    const Result result = run({"--technology", "kalvi-lte", "--format", "none", path, "--plot",
+                               folder.file("plot.svg"), "Serving Cell Info/Num Tx Antennas"});
+    EXPECT_EQ(result.status, 0) << result.error;
+    const std::string svg = contentsOf(folder.file("plot.svg"));
+    for (const std::string& label : labels) EXPECT_TRUE(holds(svg, ">" + label + "</text>")) << label;
+  }
+}
+
+TEST_F(DecodeGenerations, ThePictureOfALongPathAndAStrangeNameIsXml) {
+  const std::string name(100'000, 'x');
+  const std::string rows = "<key>" + name + "</key><string>1</string><key>b&amp;\x7F</key><string>2</string>";
+  const std::string path =
+      write("a<&>\x1B\xEF\xBF\xBF.pcap",
+            pcapHeader() + pcapRecord(afternoon, 0, pdpContexts("<array><dict>" + rows + "</dict></array>")));
+  const Result result =
+      run({"--technology", "kalvi-lte", "--format", "none", path, "--plot", folder.file("plot.svg"),
+           "PDP Context Info/0/" + name, "PDP Context Info/0/b&\x7F"});
+  ASSERT_EQ(result.status, 0);
+  const std::string svg = contentsOf(folder.file("plot.svg"));
+  EXPECT_LT(svg.size(), 1u << 20);
+  for (const char* strange : {"\x1B", "\x7F", "\xEF\xBF\xBF", "<&>", "&\\u"})
+    EXPECT_FALSE(holds(svg, strange)) << strange;
+  for (const char* text :
+       {"a&lt;&amp;&gt;\\u001B\xEF\xBF\xBD.pcap: PDP Context Info/0", ">b&amp;\\u007F</text>"})
+    EXPECT_TRUE(holds(svg, text)) << text;
+}
+
+TEST_F(DecodeGenerations, APathToPlotThatHasNoNumbersIsTold) {
+  const std::string path =
+      write("capture", pcapHeader() + pcapRecord(afternoon, 0,
+                                                 pdpContexts("<array><string>Idle</string>"
+                                                             "<string>7</string></array>")));
+  const Result result = run({"--technology", "kalvi-lte", "--format", "none", path, "--plot",
+                             folder.file("plot.svg"), "PDP Context Info/0", "PDP Context Info/1"});
+  EXPECT_EQ(result.status, 0);
+  EXPECT_EQ(result.error, "varnel-decode: no value of " + path +
+                              " under 'PDP Context Info/0' begins with a number (one is 'Idle'), so no line "
+                              "shows it\n");
+  EXPECT_THAT(contentsOf(folder.file("plot.svg")), HasSubstr("</svg>"));
+}
+
 TEST_F(DecodeGenerations, APlotIsMadeBesideWhateverGoesToStandardOutput) {
   const std::string plot = folder.file("plot.svg");
   const std::string path = write("capture", threeRecords());

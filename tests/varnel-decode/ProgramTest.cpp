@@ -140,6 +140,18 @@ TEST_F(DecodeProgram, AMissingTemplateEndsItWithALineThatNamesTheFile) {
   }
 }
 
+TEST_F(DecodeProgram, AMissingResourceFolderIsToldAtTheStart) {
+  const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)));
+  const std::string missing = folder.file("missing");
+  Process process("/bin/sh", {"-c", "VARNEL_RESOURCES=" + missing +
+                                        " exec " VARNEL_DECODE_PROGRAM " --technology kalvi-lte " + path});
+  const Result result = finish(process);
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(result.output, "");
+  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  EXPECT_THAT(result.error, HasSubstr(missing));
+}
+
 TEST_F(DecodeProgram, NothingFromACaptureSteersATerminal) {
   // ESC, DEL and the one-character CSI of C1.
   const std::string object = list("<dict><key>a\x7F</key><string>b\xC2\x9B\xC3\xA9</string></dict>");

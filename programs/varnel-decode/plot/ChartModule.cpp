@@ -1,52 +1,63 @@
 #include "programs/varnel-decode/plot/ChartModule.h"
 
 #include <QApplication>
+#include <QAreaSeries>
 #include <QBuffer>
+#include <QCategoryAxis>
 #include <QChart>
 #include <QDateTime>
-#include <QDateTimeAxis>
 #include <QGraphicsLayout>
 #include <QGraphicsScene>
 #include <QLegend>
-#include <QLegendMarker>
 #include <QLineSeries>
 #include <QPainter>
+#include <QPen>
 #include <QScatterSeries>
 #include <QSvgGenerator>
-#include <QTimeZone>
 #include <QValueAxis>
 #include <algorithm>
 #include <array>
-#include <cstdlib>
-#include <ctime>
+#include <cstdio>
 #include <limits>
 #include <map>
 #include <span>
 #include <vector>
 
+#include "programs/varnel-decode/plot/Legend.h"
+#include "programs/varnel-decode/plot/TimeTicks.h"
+
 namespace varnel {
 
 namespace {
 
-constexpr QSize pictureSize(1200, 600);  // points of an SVG viewer's screen
-constexpr int resolution = 96;           // a point each
-constexpr int timeTicks = 7;
+constexpr double pictureWidth = 1200, pictureHeight = 600;  // points of an SVG viewer's screen
+constexpr double leastChartHeight = 440;                    // a picture with a longer legend is higher
+constexpr int resolution = 96;                              // a point each
 constexpr int valueTicks = 6;
 constexpr double dotSize = 5;
 constexpr double lineWidth = 1.6;
+constexpr int bandOpacity = 60;  // of 255
 
-// Told apart also by those who do not see all colours.
-constexpr std::array<QRgb, 8> colours = {0x0072B2, 0xD55E00, 0x009E73, 0xCC79A7,
-                                         0x56B4E9, 0xE69F00, 0x000000, 0x8C6D31};
+// Told apart also by those who do not see all colors.
+constexpr std::array<QRgb, 8> colors = {0x0072B2, 0xD55E00, 0x009E73, 0xCC79A7,
+                                        0x56B4E9, 0xE69F00, 0x000000, 0x8C6D31};
 
-qint64 milliseconds(double seconds) { return static_cast<qint64>(seconds * 1000); }
+// More lines than there are colors are told apart by their dashes.
+constexpr std::array<Qt::PenStyle, 3> styles = {Qt::SolidLine, Qt::DashLine, Qt::DotLine};
 
-QString text(const std::string& bytes) { return QString::fromStdString(bytes); }
+QPen penOf(std::size_t series) {
+  const Qt::PenStyle style = styles[series / colors.size() % styles.size()];
+  return {QColor(colors[series % colors.size()]), lineWidth, style, Qt::FlatCap};
+}
 
-// What tells one tick of the time axis from the next.
-QString timeFormat(double seconds, bool isOneDay) {
-  if (!isOneDay) return seconds < 600 ? QStringLiteral("MM-dd HH:mm:ss") : QStringLiteral("MM-dd HH:mm");
-  return seconds < 2 * timeTicks ? QStringLiteral("HH:mm:ss.zzz") : QStringLiteral("HH:mm:ss");
+double milliseconds(double seconds) { return seconds * 1000; }
+
+// Without the two characters that XML cannot hold; others that it cannot have been replaced before.
+QString text(const std::string& bytes) {
+  QString text = QString::fromStdString(bytes);
+  for (QChar& character : text)
+    if (character >= QChar(0xFFFE)) character = QChar::ReplacementCharacter;
+  return text;
 }
 
 struct Range {
@@ -59,6 +70,20 @@ struct Range {
   }
 };
 
+bool isBand(const PlotPoint& point) { return point.lowest < point.highest; }
+
+// A value that holds until the next is a step.
+QLineSeries* steps(std::span<const PlotPoint> points, double PlotPoint::*value, QObject* owner) {
+  QList<QPointF> corners;
+  for (const PlotPoint& point : points) {
+    corners.append({milliseconds(point.seconds), point.*value});
+    if (point.until > point.seconds) corners.append({milliseconds(point.until), point.*value});
+  }
+  auto* line = new QLineSeries(owner);
+  line->append(corners);
+  return line;
+}
+
 // Axes, and which series goes with which: one time axis, and a value axis for each unit.
 class ChartMaker {
  public:
@@ -67,35 +92,55 @@ class ChartMaker {
     chart.setLocalizeNumbers(false);
     chart.setBackgroundRoundness(0);
     chart.layout()->setContentsMargins(0, 0, 0, 0);
-    chart.legend()->setAlignment(Qt::AlignBottom);
-    chart.legend()->setMarkerShape(QLegend::MarkerShapeFromSeries);
+    chart.legend()->hide();
     addTimeAxis(plot);
     for (const PlotSeries& series : plot.series) addValueAxis(series, plot);
-    for (std::size_t i = 0; i < plot.series.size(); ++i)
-      addSeries(plot.series[i], QColor(colours[i % colours.size()]));
+    for (std::size_t i = 0; i < plot.series.size(); ++i) addBands(plot.series[i], penOf(i).color());
+    for (std::size_t i = 0; i < plot.series.size(); ++i) addLines(plot.series[i], penOf(i));
     // Round numbers beside the lines, once the axes know what they show.
     for (const auto& [unit, axis] : _valueAxes) axis->applyNiceNumbers();
+  }
+
+  std::vector<LegendEntry> legend(const Plot& plot) const {
+    std::vector<LegendEntry> entries;
+    for (std::size_t i = 0; i < plot.series.size(); ++i)
+      entries.push_back({text(legendOf(plot.series[i])), penOf(i)});
+    return entries;
   }
 
  private:
   void addTimeAxis(const Plot& plot) {
     Range range;
-    for (const PlotSeries& series : plot.series)
-      for (const PlotPoint& point : series.points) range.take(point.seconds);
-    if (range.lowest == range.highest) range.highest += 1;
-    const QDateTime start = QDateTime::fromMSecsSinceEpoch(milliseconds(range.lowest), Qt::UTC);
-    const QDateTime end = QDateTime::fromMSecsSinceEpoch(milliseconds(range.highest), Qt::UTC);
-    const bool isOneDay = start.date() == end.date();
-    const QString day = QStringLiteral("yyyy-MM-dd");
-    auto* axis = new QDateTimeAxis(&_chart);
-    axis->setFormat(timeFormat(range.highest - range.lowest, isOneDay));
-    axis->setTickCount(timeTicks);
-    axis->setTitleText(
-        isOneDay ? QStringLiteral("UTC, %1").arg(start.toString(day))
-                 : QStringLiteral("UTC, from %1 to %2").arg(start.toString(day), end.toString(day)));
-    axis->setRange(start, end);
+    bool hasBands = false;
+    for (const PlotSeries& series : plot.series) {
+      for (const PlotPoint& point : series.points) {
+        range.take(milliseconds(point.seconds));
+        range.take(milliseconds(point.until));
+        hasBands |= isBand(point);
+      }
+    }
+    if (range.lowest == range.highest) range.highest += 1000;
+    auto* axis = new QCategoryAxis(&_chart);
+    axis->setLabelsPosition(QCategoryAxis::AxisLabelsPositionOnValue);
+    axis->setRange(range.lowest, range.highest);
+    axis->setStartValue(range.lowest);
+    for (const TimeTick& tick : timeTicks(range.lowest, range.highest))
+      axis->append(tick.label, tick.milliseconds);
+    axis->setTitleText(days(range) + (hasBands
+                                          ? QStringLiteral("; bands: lowest to highest, lines: their mean")
+                                          : QString()));
     _chart.addAxis(axis, Qt::AlignBottom);
     _timeAxis = axis;
+  }
+
+  static QString days(const Range& range) {
+    const auto dayOf = [](double time) {
+      return QDateTime::fromMSecsSinceEpoch(static_cast<qint64>(time), Qt::UTC)
+          .toString(QStringLiteral("yyyy-MM-dd"));
+    };
+    const QString first = dayOf(range.lowest), last = dayOf(range.highest);
+    return first == last ? QStringLiteral("UTC, %1").arg(first)
+                         : QStringLiteral("UTC, from %1 to %2").arg(first, last);
   }
 
   void addValueAxis(const PlotSeries& series, const Plot& plot) {
@@ -103,43 +148,73 @@ class ChartMaker {
     Range range;
     for (const PlotSeries& other : plot.series) {
       if (other.unit != series.unit) continue;
-      for (const PlotPoint& point : other.points) range.take(point.value);
+      for (const PlotPoint& point : other.points) {
+        range.take(point.lowest);
+        range.take(point.highest);
+      }
     }
     if (range.lowest > range.highest) range = {0, 1};
     if (range.lowest == range.highest) range = {range.lowest - 1, range.highest + 1};
     auto* axis = new QValueAxis(&_chart);
     axis->setTickCount(valueTicks);
-    axis->setTitleText(text(series.unit).toHtmlEscaped());
+    axis->setTitleText(series.unit.empty() ? QStringLiteral("(no unit)") : text(series.unit).toHtmlEscaped());
     axis->setRange(range.lowest, range.highest);
     const bool isOdd = _valueAxes.size() % 2 != 0;
     _chart.addAxis(axis, isOdd ? Qt::AlignRight : Qt::AlignLeft);
     _valueAxes.emplace(series.unit, axis);
   }
 
-  // The chart knows no gaps: each unbroken line is a series of its own, points without neighbours are
-  // another, and the first of them all stands in the legend.
-  void addSeries(const PlotSeries& series, const QColor& colour) {
+  // The chart knows no gaps: each unbroken line is a series of its own.
+  static std::vector<std::span<const PlotPoint>> unbroken(const PlotSeries& series) {
     const std::span points(series.points);
-    std::vector<QXYSeries*> parts;
-    QList<QPointF> lonePoints;
+    std::vector<std::span<const PlotPoint>> parts;
     for (std::size_t start = 0, end = 0; start < points.size(); start = end) {
       for (end = start + 1; end < points.size() && !points[end].startsNewLine;) ++end;
-      QList<QPointF> line;
-      for (const PlotPoint& point : points.subspan(start, end - start))
-        line.append({static_cast<double>(milliseconds(point.seconds)), point.value});
-      if (line.size() > 1) {
-        parts.push_back(addLine(line, colour));
+      parts.push_back(points.subspan(start, end - start));
+    }
+    return parts;
+  }
+
+  void addBands(const PlotSeries& series, QColor color) {
+    color.setAlpha(bandOpacity);
+    for (const auto points : unbroken(series)) {
+      if (std::ranges::none_of(points, isBand)) continue;
+      auto* band = new QAreaSeries(steps(points, &PlotPoint::highest, &_chart),
+                                   steps(points, &PlotPoint::lowest, &_chart));
+      band->setPen(Qt::NoPen);
+      band->setBrush(color);
+      add(*band, series.unit);
+    }
+  }
+
+  void addLines(const PlotSeries& series, const QPen& pen) {
+    QList<QPointF> dots;
+    for (const auto points : unbroken(series)) {
+      QLineSeries* line = steps(points, &PlotPoint::mean, &_chart);
+      if (line->count() > 1) {
+        line->setPen(pen);
+        add(*line, series.unit);
       } else {
-        lonePoints += line;
+        dots += line->points();
+        delete line;
       }
     }
-    if (!lonePoints.isEmpty()) parts.push_back(addDots(lonePoints, colour));
-    for (QXYSeries* part : parts) {
-      part->attachAxis(_timeAxis);
-      part->attachAxis(_valueAxes.at(series.unit));
-      part->setName(text(legendOf(series)).toHtmlEscaped());
-      if (part != parts.front()) _chart.legend()->markers(part).constFirst()->setVisible(false);
-    }
+    if (!dots.isEmpty()) addDots(dots, series.unit, pen.color());
+  }
+
+  void addDots(const QList<QPointF>& points, const std::string& unit, const QColor& color) {
+    auto* dots = new QScatterSeries(&_chart);
+    dots->append(points);
+    dots->setMarkerSize(dotSize);
+    dots->setColor(color);
+    dots->setBorderColor(color);
+    add(*dots, unit);
+  }
+
+  void add(QAbstractSeries& series, const std::string& unit) {
+    _chart.addSeries(&series);
+    series.attachAxis(_timeAxis);
+    series.attachAxis(_valueAxes.at(unit));
   }
 
   // Where there are several axes, the unit tells which one is meant.
@@ -148,26 +223,8 @@ class ChartMaker {
     return isUnitNeeded ? series.label + " (" + series.unit + ")" : series.label;
   }
 
-  QXYSeries* addLine(const QList<QPointF>& points, const QColor& colour) {
-    auto* line = new QLineSeries(&_chart);
-    line->append(points);
-    line->setPen(QPen(colour, lineWidth));
-    _chart.addSeries(line);
-    return line;
-  }
-
-  QXYSeries* addDots(const QList<QPointF>& points, const QColor& colour) {
-    auto* dots = new QScatterSeries(&_chart);
-    dots->append(points);
-    dots->setMarkerSize(dotSize);
-    dots->setColor(colour);
-    dots->setBorderColor(colour);
-    _chart.addSeries(dots);
-    return dots;
-  }
-
   QChart& _chart;
-  QDateTimeAxis* _timeAxis = nullptr;
+  QCategoryAxis* _timeAxis = nullptr;
   std::map<std::string, QValueAxis*> _valueAxes;
 };
 
@@ -181,15 +238,21 @@ QByteArray draw(const Plot& plot) {
   auto* chart = new QChart;
   scene.addItem(chart);
   const ChartMaker maker(*chart, plot);
-  chart->resize(pictureSize);
-  scene.setSceneRect(QRectF(QPointF(), QSizeF(pictureSize)));
-  QApplication::processEvents();  // lays out axes and legend
+  auto* legend = new Legend(maker.legend(plot), pictureWidth);
+  scene.addItem(legend);
+  const double chartHeight = std::max(leastChartHeight, pictureHeight - legend->height());
+  const QSize size = QSizeF(pictureWidth, chartHeight + legend->height()).toSize();
+  chart->resize(pictureWidth, chartHeight);
+  legend->setPos(0, chartHeight);
+  scene.setBackgroundBrush(chart->backgroundBrush());
+  scene.setSceneRect(QRectF(QPointF(), QSizeF(size)));
+  QApplication::processEvents();  // lays out the axes
 
   QBuffer file;
   QSvgGenerator generator;
   generator.setOutputDevice(&file);
-  generator.setSize(pictureSize);
-  generator.setViewBox(QRect(QPoint(), pictureSize));
+  generator.setSize(size);
+  generator.setViewBox(QRect(QPoint(), size));
   generator.setResolution(resolution);
   generator.setTitle(text(plot.title));
   QPainter painter(&generator);
@@ -204,9 +267,6 @@ QByteArray draw(const Plot& plot) {
 }  // namespace varnel
 
 extern "C" void varnelDrawPlot(const varnel::Plot& plot, std::string& svg) {
-  // The time axis knows local time only.
-  ::setenv("TZ", "UTC", 1);
-  ::tzset();
   qInstallMessageHandler(varnel::ignoreRemarks);
   std::array<char, 14> name = {"varnel-decode"};
   std::array<char, 10> option = {"-platform"};
