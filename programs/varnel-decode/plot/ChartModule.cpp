@@ -254,7 +254,7 @@ QByteArray draw(const Plot& plot) {
   generator.setSize(size);
   generator.setViewBox(QRect(QPoint(), size));
   generator.setResolution(resolution);
-  generator.setTitle(text(plot.title));
+  generator.setTitle(text(plot.title).toHtmlEscaped());  // which it writes as it is
   QPainter painter(&generator);
   painter.setRenderHint(QPainter::Antialiasing);
   scene.render(&painter, scene.sceneRect(), scene.sceneRect());
