@@ -22,6 +22,13 @@ class MessageSource {
   virtual std::optional<StreamMessage> next() = 0;
   /// What log lines call the message that came last, as "Record 17 of walk.pcap".
   virtual std::string nameOfLast() const { return "A message"; }
+
+  /// What becomes of messages whose receiver has no room when they are due.
+  enum class Lateness { Waits, IsDropped };
+  /// A stream that is not of this moment waits.
+  virtual Lateness lateness() const { return Lateness::Waits; }
+  /// One sentence for the user about a stream that has ended; empty when there is nothing to tell.
+  virtual std::string endNote() const { return {}; }
 };
 
 }  // namespace varnel

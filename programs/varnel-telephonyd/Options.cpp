@@ -41,6 +41,7 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
   app.add_option("--technology", options.replayTechnology, "the modem that was captured")
       ->needs(replay)
       ->default_val(technology::kalviLTE)
+      ->check(CLI::IsMember(technologies))
       ->type_name("TECHNOLOGY");
   app.add_option("--speed", options.speed, "replay that many times as fast")
       ->needs(replay)

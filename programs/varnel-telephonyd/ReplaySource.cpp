@@ -11,9 +11,13 @@ namespace varnel {
 std::optional<StreamMessage> ReplaySource::next() {
   CaptureRecord record;
   try {
-    if (!readRecord(record)) return std::nullopt;
+    if (!readRecord(record)) {
+      _endNote = "the replay of " + _path + " has ended";
+      return std::nullopt;
+    }
   } catch (const CaptureError& error) {
     logError("The replay ends: %s", error.what());
+    _endNote = std::string("the replay has ended early: ") + error.what();
     return std::nullopt;
   }
   _last = following(record.time);

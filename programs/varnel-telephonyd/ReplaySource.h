@@ -27,6 +27,7 @@ class ReplaySource final : public MessageSource {
   /// A fault of the capture is logged and ends the stream. So is, once, that a wait was shortened.
   std::optional<StreamMessage> next() override;
   std::string nameOfLast() const override;
+  std::string endNote() const override { return _endNote; }
 
  private:
   /// A moment of the capture, and when it is played.
@@ -48,6 +49,7 @@ class ReplaySource final : public MessageSource {
   std::optional<Moment> _last;            // absent before the first record
   Moment _origin{};                       // from which the distances are measured
   bool _hasToldShortening = false;
+  std::string _endNote;  // empty until the end
 };
 
 }  // namespace varnel

@@ -4,6 +4,7 @@
 
 #include "base/Log.h"
 #include "host/PortFrame.h"
+#include "host/TelephonyProtocol.h"
 #include "programs/varnel-telephonyd/ChannelCommand.h"
 
 namespace varnel {
@@ -18,6 +19,9 @@ constexpr std::chrono::milliseconds retryInterval = 20ms;
 constexpr std::chrono::milliseconds patience = 5s;
 // A capture that is played over and over must not fill the log.
 constexpr std::uint64_t mostNamedAsTooLong = 10;
+constexpr std::chrono::milliseconds commandPatience = 10s;
+// What is shown is of this moment, or is not shown.
+constexpr std::chrono::milliseconds longestDelay = 1s;
 
 }  // namespace
 
@@ -31,11 +35,32 @@ bool ServedChannel::open(const std::string& commandPortName, std::function<void(
   _ended = std::move(ended);
   _commands->setInvalidationHandler([this] { end(); });
   _commands->deliverOnMainQueue();
+  _host.queue.after(commandPatience, [weak = weak_from_this()] {
+    if (const auto channel = weak.lock()) channel->endWithoutCommand();
+  });
   return true;
 }
 
+void ServedChannel::endWithoutCommand() {
+  if (_hasCommand) return;
+  logWarning("A log channel gets no command and is closed");
+  end();
+}
+
 void ServedChannel::checkViewer() {
-  if (!_viewer->isValid()) end();
+  if (!_viewer->isValid()) return end();
+  reportToViewer();
+}
+
+void ServedChannel::reportToViewer() {
+  StreamReport report = _report;
+  report.dropped = _counts.dropped;
+  report.tooLong = _counts.tooLong;
+  if (report == _sentReport) return;
+  // Without room it goes with a later look.
+  const auto sent = _viewer->sendRequest(telephonyProtocol::streamReportIdentifier, writeStreamReport(report),
+                                         0ms, std::nullopt);
+  if (sent.status == 0) _sentReport = std::move(report);
 }
 
 std::optional<Bytes> ServedChannel::takeCommand(ByteView data) {
@@ -44,6 +69,7 @@ std::optional<Bytes> ServedChannel::takeCommand(ByteView data) {
     logWarning("A command of %ld bytes cannot be understood", data.size());
     return std::nullopt;
   }
+  _hasCommand = true;
   if (std::holds_alternative<TechnologyRequest>(*command)) return technologyReply(_host.technology);
   start(std::get<StartRequest>(*command).filter);
   return std::nullopt;
@@ -55,7 +81,7 @@ void ServedChannel::start(CodeFilter filter) {
   if (_source) return;
   _source = _host.makeSource();
   _startedAt = _host.uptime();
-  _next = _source->next();
+  takeNext();
   sendLater(0ms);
 }
 
@@ -64,14 +90,23 @@ void ServedChannel::sendWhatIsDue() {
     if (!_next) return;
     const auto wait = _startedAt + _next->at - _host.uptime();
     if (wait.count() > 0) return sendLater(wait);
-    if (_filter.takes(_next->bytes) && fitsChannel(_next->bytes)) {
-      const Delivery delivery = deliver(_next->bytes);
-      if (delivery == Delivery::NoRoom) return sendLater(retryInterval);
-      if (delivery == Delivery::Ended) return end();
-    }
-    _next = _source->next();
+    if (!std::exchange(_isReceived, true)) ++_counts.received;
+    const Delivery delivery = deliver(_next->bytes);
+    if (delivery == Delivery::NoRoom) return sendLater(retryInterval);
+    if (delivery == Delivery::Ended) return end();
+    takeNext();
   }
   sendLater(0ms);
+}
+
+void ServedChannel::takeNext() {
+  _isReceived = false;
+  _next = _source->next();
+  if (_next) return;
+  const std::string sentence = _source->endNote();
+  if (sentence.empty()) return;
+  note(sentence);
+  _host.tell(sentence);
 }
 
 void ServedChannel::sendLater(std::chrono::milliseconds delay) {
@@ -80,16 +115,12 @@ void ServedChannel::sendLater(std::chrono::milliseconds delay) {
   });
 }
 
-// The transport would take the connection of one that does not for broken.
-bool ServedChannel::fitsChannel(ByteView message) {
-  if (message.size() <= maximumPayload) return true;
-  if (++_tooLongForChannel <= mostNamedAsTooLong)
-    logError("%s is left out: it has %ld bytes, and the channel takes %ld", _source->nameOfLast(),
-             message.size(), maximumPayload);
-  return false;
-}
-
 ServedChannel::Delivery ServedChannel::deliver(ByteView message) {
+  if (!_filter.takes(message)) {
+    ++_counts.notAskedFor;
+    return Delivery::Done;
+  }
+  if (message.size() > maximumPayload) return refuseLength(message.size());
   const std::int32_t status = _viewer->sendRequest(0, message, 0ms, std::nullopt).status;
   if (status == RemotePort::sendTimeout) return waitForRoom();
   if (status != 0) {
@@ -97,6 +128,7 @@ ServedChannel::Delivery ServedChannel::deliver(ByteView message) {
     return Delivery::Ended;
   }
   _withoutRoomSince.reset();
+  ++_counts.delivered;
   _host.messageSent(message);
   return Delivery::Done;
 }
@@ -104,12 +136,26 @@ ServedChannel::Delivery ServedChannel::deliver(ByteView message) {
 ServedChannel::Delivery ServedChannel::waitForRoom() {
   const auto now = _host.uptime();
   if (!_withoutRoomSince) _withoutRoomSince = now;
-  if (now - *_withoutRoomSince < patience) return Delivery::NoRoom;
-  logError("A viewer that does not read is dropped");
-  return Delivery::Ended;
+  if (now - *_withoutRoomSince >= patience) {
+    logError("A viewer that does not read is dropped");
+    return Delivery::Ended;
+  }
+  const bool isLate = now - (_startedAt + _next->at) > longestDelay;
+  if (!isLate || _source->lateness() == MessageSource::Lateness::Waits) return Delivery::NoRoom;
+  ++_counts.dropped;
+  return Delivery::Done;
+}
+
+// The transport would take the connection of a message that is too long for broken.
+ServedChannel::Delivery ServedChannel::refuseLength(std::size_t length) {
+  if (++_counts.tooLong <= mostNamedAsTooLong)
+    logError("%s is left out: it has %ld bytes, and the channel takes %ld", _source->nameOfLast(), length,
+             maximumPayload);
+  return Delivery::Done;
 }
 
 void ServedChannel::end() {
+  if (_next && _isReceived) ++_counts.dropped;
   _next.reset();
   // The last deed: it may release this channel.
   if (const auto ended = std::exchange(_ended, nullptr)) ended();

@@ -7,9 +7,11 @@
 #include <optional>
 #include <string>
 
+#include "host/StreamReport.h"
 #include "platform/MainQueue.h"
 #include "platform/MessagePort.h"
 #include "programs/varnel-telephonyd/CodeFilter.h"
+#include "programs/varnel-telephonyd/MessageCounts.h"
 #include "programs/varnel-telephonyd/MessageSource.h"
 
 namespace varnel {
@@ -26,26 +28,32 @@ struct ChannelHost {
   std::function<std::unique_ptr<MessageSource>()> makeSource;
   /// Sees every message that was sent.
   std::function<void(ByteView message)> messageSent;
+  /// Tells the server's user one sentence.
+  std::function<void(const std::string& sentence)> tell;
 };
 
 /// The server's side of one log channel: it takes the viewer's commands on a port of its own and sends the
-/// stream, at its pace, to the viewer's port. A viewer that has no room is given time; sending never waits.
+/// stream, at its pace, to the viewer's port. A viewer that has no room is given time, which costs it
+/// messages of a source that does not wait; sending never waits.
 class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
  public:
   /// The viewer's port is owned from now on. The host outlives the channel.
   ServedChannel(const ChannelHost& host, std::unique_ptr<RemotePort> viewer)
       : _host(host), _viewer(std::move(viewer)) {}
 
-  /// Takes commands on a new port of that name, and calls the handler once when the viewer has gone away or
-  /// has taken nothing for too long; the handler may release the channel. False, with nothing begun, when the
-  /// port cannot be made.
+  /// Takes commands on a new port of that name, and calls the handler once when the viewer has gone away, has
+  /// taken nothing for too long or has given no command for ten seconds; the handler may release the channel.
+  /// False, with nothing begun, when the port cannot be made.
   bool open(const std::string& commandPortName, std::function<void()> ended);
 
-  /// How many messages were left out so far because they are longer than the channel takes.
-  std::uint64_t tooLongForChannel() const { return _tooLongForChannel; }
-
-  /// Looks whether the viewer is still there.
+  /// Looks whether the viewer is still there, and reports to it what is new.
   void checkViewer();
+  /// Ends the channel, as if the viewer had gone away.
+  void end();
+
+  /// Lets the viewer know that sentence with the next report.
+  void note(const std::string& sentence) { _report.note = sentence; }
+  const MessageCounts& counts() const { return _counts; }
 
  private:
   enum class Delivery { Done, NoRoom, Ended };
@@ -54,10 +62,12 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   void start(CodeFilter filter);
   void sendWhatIsDue();
   void sendLater(std::chrono::milliseconds delay);
-  bool fitsChannel(ByteView message);
   Delivery deliver(ByteView message);
   Delivery waitForRoom();
-  void end();
+  Delivery refuseLength(std::size_t length);
+  void takeNext();
+  void endWithoutCommand();
+  void reportToViewer();
 
   const ChannelHost& _host;
   std::unique_ptr<RemotePort> _viewer;
@@ -69,7 +79,12 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   std::chrono::milliseconds _startedAt{0};
   std::optional<StreamMessage> _next;
   std::optional<std::chrono::milliseconds> _withoutRoomSince;
-  std::uint64_t _tooLongForChannel = 0;
+
+  bool _hasCommand = false;  // true once a command was understood
+  bool _isReceived = false;  // true once the next message was due, and counted
+  MessageCounts _counts;
+  StreamReport _report;  // but for the numbers
+  StreamReport _sentReport;
 };
 
 }  // namespace varnel

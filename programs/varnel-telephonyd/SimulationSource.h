@@ -18,6 +18,9 @@ class SimulationSource final : public MessageSource {
     return StreamMessage{message.at, std::move(message.bytes)};
   }
 
+  /// A modem does not wait.
+  Lateness lateness() const override { return Lateness::IsDropped; }
+
  private:
   const std::unique_ptr<SimulatedModem> _modem;
 };

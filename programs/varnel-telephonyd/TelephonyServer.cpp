@@ -3,12 +3,20 @@
 #include <string>
 
 #include "base/Log.h"
+#include "host/TelephonyProtocol.h"
 
 namespace varnel {
 
 namespace {
+
+namespace protocol = telephonyProtocol;
+
+// Begins with the name of the service's socket, as every port of its own does.
 constexpr std::string_view commandPortPrefix = "com.orvane.TelephonyServer.LogChannel.";
 constexpr std::chrono::milliseconds viewerCheckInterval = std::chrono::seconds(1);
+constexpr std::chrono::milliseconds lossesInterval = std::chrono::seconds(10);
+constexpr std::size_t mostChannels = 16;
+
 }  // namespace
 
 TelephonyServer::TelephonyServer(ChannelHost host)
@@ -16,18 +24,27 @@ TelephonyServer::TelephonyServer(ChannelHost host)
       _viewerCheck(_host.queue.repeating(viewerCheckInterval, [this] { checkViewers(); })) {}
 
 TelephonyConnection::LogChannel TelephonyServer::createLogChannel(std::string_view viewerPortName) {
+  if (viewerPortName.starts_with(protocol::socketName)) {
+    logWarning("A log channel was asked for \"%s\", a port of the server's own", viewerPortName);
+    return {protocol::portOfTheService, std::nullopt};
+  }
+  if (_channels.size() >= mostChannels) {
+    logWarning("A log channel was asked for, and %ld are open", _channels.size());
+    return {protocol::tooManyChannels, std::nullopt};
+  }
   auto viewer = _host.ports.createRemotePort(viewerPortName);
   if (!viewer) {
     logWarning("A log channel was asked for port \"%s\", which does not answer", viewerPortName);
-    return {viewerPortMissing, std::nullopt};
+    return {protocol::viewerPortMissing, std::nullopt};
   }
   const unsigned number = freeNumber();
   const std::string portName = std::string(commandPortPrefix) + std::to_string(number);
   const auto channel = std::make_shared<ServedChannel>(_host, std::move(viewer));
   if (!channel->open(portName, [this, number] { close(number); })) {
     logError("The port \"%s\" could not be made", portName);
-    return {commandPortNotMade, std::nullopt};
+    return {protocol::commandPortNotMade, std::nullopt};
   }
+  channel->note(_note);
   _channels.emplace(number, channel);
   logLine(logNoticePriority, "A log channel to port \"%s\" is open", viewerPortName);
   return {0, portName};
@@ -40,13 +57,42 @@ unsigned TelephonyServer::freeNumber() const {
 }
 
 void TelephonyServer::close(unsigned number) {
-  _channels.erase(number);
-  logLine(logNoticePriority, "A log channel is closed");
+  const auto ended = _channels.extract(number);
+  const MessageCounts& counts = ended.mapped()->counts();
+  _endedCounts += counts;
+  logLine(logNoticePriority, "A log channel is closed: %s", inWords(counts));
+}
+
+void TelephonyServer::end() {
+  const auto channels = _channels;
+  for (const auto& [number, channel] : channels) channel->end();
+}
+
+void TelephonyServer::note(const std::string& sentence) {
+  _note = sentence;
+  for (const auto& [number, channel] : _channels) channel->note(sentence);
+}
+
+MessageCounts TelephonyServer::counts() const {
+  MessageCounts counts = _endedCounts;
+  for (const auto& [number, channel] : _channels) counts += channel->counts();
+  return counts;
 }
 
 void TelephonyServer::checkViewers() {
   const auto channels = _channels;  // for a check may end its channel
   for (const auto& [number, channel] : channels) channel->checkViewer();
+  tellLosses();
+}
+
+void TelephonyServer::tellLosses() {
+  const MessageCounts all = counts();
+  const std::uint64_t losses = all.dropped + all.tooLong;
+  const auto now = _host.uptime();
+  if (losses == _toldLosses || (_toldLosses > 0 && now - _lossesToldAt < lossesInterval)) return;
+  _toldLosses = losses;
+  _lossesToldAt = now;
+  _host.tell(inWords(all));
 }
 
 }  // namespace varnel

@@ -3,9 +3,11 @@
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <string>
 #include <string_view>
 
 #include "platform/TelephonyService.h"
+#include "programs/varnel-telephonyd/MessageCounts.h"
 #include "programs/varnel-telephonyd/ServedChannel.h"
 
 namespace varnel {
@@ -17,22 +19,31 @@ class TelephonyServer {
   TelephonyServer(const TelephonyServer&) = delete;
   TelephonyServer& operator=(const TelephonyServer&) = delete;
 
-  /// Errors of a request for a log channel.
-  static constexpr std::int64_t viewerPortMissing = 6;  ///< no port of that name answers
-  static constexpr std::int64_t commandPortNotMade = 7;
-
-  /// Makes a channel that delivers to the viewer's port of that name and takes commands on a new port.
+  /// Makes a channel that delivers to the viewer's port of that name and takes commands on a new port. There
+  /// are 16 channels at most; the ports of the telephony service itself are refused.
   TelephonyConnection::LogChannel createLogChannel(std::string_view viewerPortName);
 
+  /// Lets every viewer know that sentence, those that come later too.
+  void note(const std::string& sentence);
+  /// Ends every channel.
+  void end();
+
   std::size_t channels() const { return _channels.size(); }
+  /// Of all channels, those included that have ended.
+  MessageCounts counts() const;
 
  private:
   unsigned freeNumber() const;
   void close(unsigned number);
   void checkViewers();
+  void tellLosses();
 
   const ChannelHost _host;
   std::map<unsigned, std::shared_ptr<ServedChannel>> _channels;  // by the number in their port's name
+  MessageCounts _endedCounts;                                    // of channels that have ended
+  std::string _note;
+  std::uint64_t _toldLosses = 0;
+  std::chrono::milliseconds _lossesToldAt{0};
   // A viewer may go away without a word while nothing is sent to it.
   std::unique_ptr<RepeatingTimer> _viewerCheck;
 };

@@ -4,6 +4,7 @@
 
 #include "host/BuildInfo.h"
 #include "host/Capture.h"
+#include "host/DescriptorLimit.h"
 #include "host/EventLoopQueue.h"
 #include "host/HostApplication.h"
 #include "host/HostLog.h"
@@ -24,6 +25,14 @@ namespace {
 
 constexpr const char* programName = "varnel-telephonyd";
 constexpr int generalError = 1;
+// 64 connections, 16 channels with half a dozen files each, and plenty to spare.
+constexpr std::size_t mostFiles = 1024;
+
+// As standard error is for what goes wrong, standard output is for what the user may like to know.
+void tell(const std::string& sentence) {
+  std::printf("%s: %s\n", programName, sentence.c_str());
+  std::fflush(stdout);
+}
 
 int fail(const std::runtime_error& error) {
   std::fprintf(stderr, "%s: %s\n", programName, error.what());
@@ -70,6 +79,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   // A capture that cannot be replayed at all is told now, not when the first viewer comes.
   if (options.replayPath) CaptureReader{*options.replayPath};
 
+  raiseDescriptorLimit(mostFiles);
   HostApplication application(argumentCount, arguments);
   const SignalWatcher signals({SIGINT, SIGTERM}, [&](int /*signal*/) { application.end(0); });
   const HostLog log({.programName = programName, .standardErrorLevel = options.logLevel});
@@ -77,15 +87,22 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   SocketPorts ports(folder);
   EventLoopQueue queue;
   Recorder recorder(options.recordPath, application);
+  const std::string technology = options.simulatedTechnology.value_or(options.replayTechnology);
   TelephonyServer server({.ports = ports,
                           .queue = queue,
                           .uptime = uptime,
-                          .technology = options.simulatedTechnology.value_or(options.replayTechnology),
+                          .technology = technology,
                           .makeSource = [&] { return makeSource(options); },
-                          .messageSent = [&](ByteView message) { recorder.record(message); }});
+                          .messageSent = [&](ByteView message) { recorder.record(message); },
+                          .tell = tell});
   const TelephonyListener listener(
       folder, [&](std::string_view viewerPortName) { return server.createLogChannel(viewerPortName); });
-  return application.run();
+  tell("serving " + technology + " in " + folder.string() + "; now start varnel" +
+       (options.runtimeFolder ? " --runtime-dir " + *options.runtimeFolder : ""));
+  const int status = application.run();
+  server.end();
+  tell(inWords(server.counts()));
+  return status;
 }
 
 int run(int argumentCount, char** arguments) {
@@ -104,5 +121,7 @@ int run(int argumentCount, char** arguments) {
 
 int main(int argumentCount, char** arguments) {
   varnel::installTerminateHandler(varnel::programName);
+  // Who no longer reads what this program tells does not end its service.
+  std::signal(SIGPIPE, SIG_IGN);
   return varnel::run(argumentCount, arguments);
 }

@@ -60,6 +60,7 @@ TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
   const std::vector<std::vector<const char*>> mistakes = {
       {},
       {"--simulate", "kalvi-5g"},
+      {"--replay", "walk.pcap", "--technology", "kalvi-5g"},
       {"--simulate", "kalvi-lte", "--replay", "walk.pcap"},
       {"--simulate", "kalvi-lte", "--speed", "2"},
       {"--replay", "walk.pcap", "--seed", "2"},

@@ -122,5 +122,19 @@ TEST_F(Replay, ADamagedCaptureEndsAtTheFault) {
 
 TEST_F(Replay, ACaptureThatIsGoneHasNoMessages) { EXPECT_TRUE(play({path(), 1, AtEnd::Stop}).empty()); }
 
+TEST_F(Replay, TellsHowItHasEnded) {
+  write({{{1000, 0}, {1}}});
+  ReplaySource source(path(), 1, AtEnd::Stop);
+  ASSERT_TRUE(source.next());
+  EXPECT_EQ(source.endNote(), "");
+  ASSERT_FALSE(source.next());
+  EXPECT_EQ(source.endNote(), "the replay of " + path() + " has ended");
+
+  std::filesystem::resize_file(path(), std::filesystem::file_size(path()) - 1);
+  ReplaySource cut(path(), 1, AtEnd::Stop);
+  ASSERT_FALSE(cut.next());
+  EXPECT_TRUE(cut.endNote().starts_with("the replay has ended early: ")) << cut.endNote();
+}
+
 }  // namespace
 }  // namespace varnel

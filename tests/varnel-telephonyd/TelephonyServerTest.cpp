@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "host/Capture.h"
+#include "host/StreamReport.h"
 #include "programs/varnel-telephonyd/ReplaySource.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "tests/support/FakeQueue.h"
@@ -38,14 +39,19 @@ Bytes serverPacket(std::uint8_t code) { return {0xFF, 12, 0, code, 0, 0, 0, 0, 0
 
 class ListSource final : public MessageSource {
  public:
-  explicit ListSource(std::vector<StreamMessage> messages) : _messages(std::move(messages)) {}
+  ListSource(std::vector<StreamMessage> messages, Lateness lateness, std::string endNote)
+      : _messages(std::move(messages)), _lateness(lateness), _endNote(std::move(endNote)) {}
   std::optional<StreamMessage> next() override {
     if (_next == _messages.size()) return std::nullopt;
     return _messages[_next++];
   }
+  Lateness lateness() const override { return _lateness; }
+  std::string endNote() const override { return _endNote; }
 
  private:
   const std::vector<StreamMessage> _messages;
+  const Lateness _lateness;
+  const std::string _endNote;
   std::size_t _next = 0;
 };
 
@@ -59,22 +65,37 @@ class TelephonyServerTest : public testing::Test {
     return made.portName.value_or("");
   }
 
-  // What was sent since the last call.
+  // The messages of the stream that were sent since the last call. Reports are kept apart.
   Sent sent() {
     Sent messages;
     for (const auto& request : _ports.requests) {
-      EXPECT_EQ(request.identifier, 0);
       EXPECT_EQ(request.timeout, 0ms);
       EXPECT_EQ(request.replyTimeout, std::nullopt);
-      messages.push_back(request.data);
+      if (request.identifier == 1) {
+        _reports.push_back(readStreamReport(request.data).value());
+      } else {
+        EXPECT_EQ(request.identifier, 0);
+        messages.push_back(request.data);
+      }
     }
     _ports.requests.clear();
     return messages;
   }
 
+  // Makes the viewer's port take nothing while the test says so.
+  void takeOnlyWhile(const bool& hasRoom) {
+    _ports.answer = [&hasRoom](const MemoryPorts::Request&) {
+      return RemotePort::SendResult{hasRoom ? 0 : RemotePort::sendTimeout, std::nullopt};
+    };
+  }
+
   std::vector<StreamMessage> _stream{
       {0ms, modemPacket(1)}, {100ms, serverPacket(2)}, {250ms, modemPacket(3)}};
   std::vector<Bytes> _recorded;
+  std::vector<std::string> _told;
+  std::vector<StreamReport> _reports;
+  MessageSource::Lateness _lateness = MessageSource::Lateness::Waits;
+  std::string _endNote;
   MemoryPorts _ports;
   FakeQueue _queue;
   TelephonyServer _server{
@@ -82,8 +103,9 @@ class TelephonyServerTest : public testing::Test {
        .queue = _queue,
        .uptime = [this] { return _queue.now(); },
        .technology = "kalvi-lte",
-       .makeSource = [this] { return std::make_unique<ListSource>(_stream); },
-       .messageSent = [this](ByteView message) { _recorded.emplace_back(message.begin(), message.end()); }}};
+       .makeSource = [this] { return std::make_unique<ListSource>(_stream, _lateness, _endNote); },
+       .messageSent = [this](ByteView message) { _recorded.emplace_back(message.begin(), message.end()); },
+       .tell = [this](const std::string& sentence) { _told.push_back(sentence); }}};
 };
 
 TEST_F(TelephonyServerTest, TellsTheTechnology) {
@@ -291,6 +313,171 @@ TEST_F(TelephonyServerTest, AViewerThatComesBackStartsAtTheBeginning) {
   EXPECT_EQ(_server.channels(), 1u);
 }
 
+TEST_F(TelephonyServerTest, PortsOfTheServersOwnAreRefused) {
+  for (const char* const name : {"com.orvane.TelephonyServer", "com.orvane.TelephonyServer.LogChannel.1",
+                                 "com.orvane.TelephonyServer.LogChannel.7"}) {
+    const auto made = _server.createLogChannel(name);
+    EXPECT_EQ(made.error, 9) << name;
+    EXPECT_EQ(made.portName, std::nullopt);
+  }
+  EXPECT_EQ(_server.channels(), 0u);
+  EXPECT_EQ(_ports.remotePort(), nullptr);
+  EXPECT_EQ(_server.createLogChannel("com.orvane.BasebandStateReport.LogChannel").error, 0);
+}
+
+TEST_F(TelephonyServerTest, ThereAreSixteenChannelsAtMost) {
+  std::string last;
+  for (int i = 0; i < 16; ++i) last = channel();
+  EXPECT_EQ(_server.createLogChannel("viewer").error, 8);
+  EXPECT_EQ(_server.channels(), 16u);
+  _ports.invalidateLocalPort(last);
+  EXPECT_EQ(_server.createLogChannel("viewer").error, 0);
+}
+
+TEST_F(TelephonyServerTest, AChannelWithoutACommandEndsAfterTenSeconds) {
+  const std::string port = channel();
+  _ports.deliver(port, 0, bytesOf("nonsense"));
+  _queue.advance(9999ms);
+  EXPECT_EQ(_server.channels(), 1u);
+  _queue.advance(1ms);
+  EXPECT_EQ(_server.channels(), 0u);
+  EXPECT_FALSE(_ports.hasLocalPort(port));
+  EXPECT_EQ(_ports.remotePort(), nullptr);
+}
+
+TEST_F(TelephonyServerTest, AChannelWithACommandStays) {
+  _ports.deliver(channel(), 0, technologyRequest);
+  _queue.advance(1h);
+  EXPECT_EQ(_server.channels(), 1u);
+}
+
+TEST_F(TelephonyServerTest, EveryMessageThatIsDueIsCountedOnce) {
+  _stream = {{0ms, modemPacket(1)},
+             {0ms, Bytes((1 << 20) + 1, 1)},
+             {0ms, modemPacket(3)},
+             {0ms, Bytes(1 << 20, 1)},
+             {1h, modemPacket(1)}};
+  const std::string port = channel();
+  // The long messages are packets of code 0x101.
+  _ports.deliver(port, 0, startWith("<integer>1</integer><integer>257</integer>", ""));
+  _queue.advance(1s);
+  EXPECT_EQ(_server.counts(), (MessageCounts{.received = 4, .delivered = 2, .tooLong = 1, .notAskedFor = 1}));
+  EXPECT_EQ(sent().size(), 2u);
+  EXPECT_EQ(_reports, (std::vector{StreamReport{"", 0, 1}}));
+  _ports.invalidateLocalPort(port);
+  EXPECT_EQ(_server.counts(), (MessageCounts{.received = 4, .delivered = 2, .tooLong = 1, .notAskedFor = 1}));
+}
+
+TEST_F(TelephonyServerTest, AMessageInHandWhenTheViewerGoesIsDropped) {
+  const bool hasRoom = false;
+  takeOnlyWhile(hasRoom);
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.advance(200ms);
+  EXPECT_EQ(_server.counts(), (MessageCounts{.received = 1}));
+  _server.end();
+  EXPECT_EQ(_server.counts(), (MessageCounts{.received = 1, .dropped = 1}));
+  EXPECT_EQ(_server.channels(), 0u);
+}
+
+TEST_F(TelephonyServerTest, CountsOfAllChannelsAreAdded) {
+  _ports.deliver(channel(), 0, startEverything);
+  _ports.deliver(channel(), 0, startWith("<integer>1</integer>", ""));
+  _queue.advance(1s);
+  EXPECT_EQ(_server.counts(), (MessageCounts{.received = 6, .delivered = 4, .notAskedFor = 2}));
+}
+
+TEST_F(TelephonyServerTest, AModemDoesNotWaitForAViewerWithoutRoom) {
+  _lateness = MessageSource::Lateness::IsDropped;
+  bool hasRoom = false;
+  takeOnlyWhile(hasRoom);
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.advance(1200ms);  // the first two messages are more than a second late, the third one is not
+  hasRoom = true;
+  _queue.advance(1s);
+  EXPECT_EQ(_recorded, (Sent{modemPacket(3)}));
+  EXPECT_EQ(_server.counts(), (MessageCounts{.received = 3, .delivered = 1, .dropped = 2}));
+  sent();
+  EXPECT_EQ(_reports.back(), (StreamReport{"", 2, 0}));
+}
+
+TEST_F(TelephonyServerTest, AReportThatFoundNoRoomIsSentLater) {
+  _stream.resize(1);
+  _endNote = "the end";
+  bool hasRoom = true;
+  takeOnlyWhile(hasRoom);
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.run();
+  hasRoom = false;
+  _queue.advance(1s);
+  hasRoom = true;
+  _ports.requests.clear();
+  _queue.advance(5s);
+  sent();
+  EXPECT_EQ(_reports, (std::vector{StreamReport{"the end", 0, 0}}));
+}
+
+TEST_F(TelephonyServerTest, LossesAreToldAtOnceAndThenEveryTenSecondsWhileTheyGrow) {
+  _stream.clear();
+  for (int second = 0; second < 30; ++second)
+    _stream.push_back({std::chrono::seconds(second), Bytes((1 << 20) + 1, 1)});
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.advance(1min);
+  const auto told = [](const std::string& count) {
+    return "messages: " + count + " received, 0 delivered, 0 dropped, " + count + " refused (" + count +
+           " too long for the channel, 0 not asked for)";
+  };
+  EXPECT_EQ(_told, (std::vector<std::string>{told("1"), told("11"), told("21"), told("30")}));
+}
+
+TEST_F(TelephonyServerTest, TheEndOfAStreamIsToldOnBothSides) {
+  _endNote = "the replay of walk.pcap has ended";
+  _ports.deliver(channel(), 0, startEverything);
+  _queue.advance(249ms);
+  EXPECT_TRUE(_told.empty());
+  _queue.advance(10s);
+  EXPECT_EQ(_told, (std::vector<std::string>{"the replay of walk.pcap has ended"}));
+  EXPECT_EQ(sent().size(), 3u);
+  EXPECT_EQ(_reports, (std::vector{StreamReport{"the replay of walk.pcap has ended", 0, 0}}));
+}
+
+TEST_F(TelephonyServerTest, ANoteReachesEveryViewerAndThoseThatComeLater) {
+  _ports.deliver(channel(), 0, technologyRequest);
+  _server.note("the recording has ended");
+  _queue.advance(1s);
+  sent();
+  EXPECT_EQ(_reports, (std::vector{StreamReport{"the recording has ended", 0, 0}}));
+  _ports.deliver(channel(), 0, technologyRequest);
+  _queue.advance(1s);
+  sent();
+  EXPECT_EQ(_reports.size(), 2u);
+  EXPECT_EQ(_reports.back(), (StreamReport{"the recording has ended", 0, 0}));
+}
+
+// As many messages as come in a tenth of a second, all at once, for a viewer that has room for some.
+TEST_F(TelephonyServerTest, AFloodIsCountedToTheLastMessage) {
+  _lateness = MessageSource::Lateness::IsDropped;
+  _stream.assign(100'000, {0ms, modemPacket(1)});
+  for (std::size_t i = 0; i < _stream.size(); i += 100) _stream[i].bytes = modemPacket(2);
+  std::uint64_t taken = 0;
+  _ports.answer = [&](const MemoryPorts::Request& request) {
+    const bool takes = _queue.now() < 3s ? taken < 20'000 : true;
+    taken += takes && request.identifier == 0 ? 1 : 0;
+    return RemotePort::SendResult{takes ? 0 : RemotePort::sendTimeout, std::nullopt};
+  };
+  const std::string port = channel();
+  _ports.deliver(port, 0, startWith("<integer>1</integer>", ""));
+  _queue.advance(1min);
+  const MessageCounts counts = _server.counts();
+  EXPECT_EQ(counts.received, 100'000u);
+  EXPECT_EQ(counts.delivered, taken);
+  EXPECT_EQ(counts.delivered, 20'000u);
+  EXPECT_EQ(counts.dropped, 79'000u);
+  EXPECT_EQ(counts.refused(), 1'000u);
+  EXPECT_EQ(_server.channels(), 1u);
+  sent();
+  EXPECT_EQ(_reports.back(), (StreamReport{"", 79'000, 0}));
+}
+
 struct SimulatedStream {
   const char* technology;
   Bytes start;                 // the viewer's command
@@ -319,11 +506,14 @@ class SimulatedStreamTest : public testing::TestWithParam<SimulatedStream> {
                             .uptime = [this] { return _queue.now(); },
                             .technology = GetParam().technology,
                             .makeSource = makeSource,
-                            .messageSent = messageSent}};
+                            .messageSent = messageSent,
+                            .tell = [](const std::string& /*sentence*/) {}}};
     _ports.deliver(server.createLogChannel("viewer").portName.value(), 0, GetParam().start);
     _queue.advance(30s);
     std::vector<Bytes> sent;
-    for (const auto& request : _ports.requests) sent.push_back(request.data);
+    for (const auto& request : _ports.requests) {
+      if (request.identifier == 0) sent.push_back(request.data);
+    }
     return sent;
   }
   static std::unique_ptr<MessageSource> simulation() {

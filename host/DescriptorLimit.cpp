@@ -1,0 +1,17 @@
+#include "host/DescriptorLimit.h"
+
+#include <sys/resource.h>
+
+#include <algorithm>
+
+namespace varnel {
+
+void raiseDescriptorLimit(std::size_t files) {
+  rlimit limit{};
+  if (::getrlimit(RLIMIT_NOFILE, &limit) != 0 || limit.rlim_cur >= files) return;
+  limit.rlim_cur = std::min<rlim_t>(files, limit.rlim_max);
+  // Who has fewer turns peers away sooner: sockets keep a descriptor for that.
+  static_cast<void>(::setrlimit(RLIMIT_NOFILE, &limit));
+}
+
+}  // namespace varnel

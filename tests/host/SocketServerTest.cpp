@@ -1,0 +1,266 @@
+#include "host/SocketServer.h"
+
+#include <fcntl.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+
+#include <filesystem>
+#include <fstream>
+#include <string>
+#include <vector>
+
+#include "host/DescriptorLimit.h"
+#include "host/SocketPorts.h"
+#include "host/TelephonyListener.h"
+#include "tests/support/EventLoop.h"
+#include "tests/support/Process.h"
+#include "tests/support/RawSocket.h"
+
+namespace varnel {
+namespace {
+
+using namespace std::chrono_literals;
+namespace fs = std::filesystem;
+
+class SocketServerTest : public testing::Test {
+ protected:
+  std::unique_ptr<SocketServer> server(const SocketLimits& limits = {}) {
+    return std::make_unique<SocketServer>(
+        path(), [this](std::unique_ptr<SocketConnection> connection) { add(std::move(connection)); }, limits,
+        Bytes{'f', 'u', 'l', 'l'});
+  }
+  void add(std::shared_ptr<SocketConnection> connection) {
+    connection->setActivityHandler([weak = std::weak_ptr(connection), this] {
+      const auto active = weak.lock();
+      while (active->nextFrame()) ++_frames;
+      if (!active->isOpen()) std::erase(_connections, active);
+    });
+    _connections.push_back(std::move(connection));
+  }
+  // What a client whom the server turns away reads.
+  Bytes refusal() {
+    const RawSocket client = RawSocket::connectedTo(path());
+    EXPECT_TRUE(runUntil([&] { return client.waits(0ms); }));
+    return client.receive();
+  }
+  bool isServed() {
+    const std::size_t before = _connections.size();
+    const auto client = SocketConnection::open(path());
+    return client.connection && runUntil([&] { return _connections.size() > before; });
+  }
+
+  std::string path() const { return _folder.file("name"); }
+  std::string lockPath() const { return path() + ".lock"; }
+
+  TemporaryFolder _folder;
+  std::vector<std::shared_ptr<SocketConnection>> _connections;
+  int _frames = 0;
+};
+
+TEST_F(SocketServerTest, TakesSixtyFourConnectionsAndTurnsAwayTheNextOne) {
+  const auto listening = server();
+  std::vector<RawSocket> clients;
+  for (int i = 0; i < 64; ++i) clients.push_back(RawSocket::connectedTo(path()));
+  ASSERT_TRUE(runUntil([&] { return _connections.size() == 64; }));
+  EXPECT_EQ(refusal(), (Bytes{'f', 'u', 'l', 'l'}));
+  EXPECT_EQ(_connections.size(), 64u);
+  clients.pop_back();
+  ASSERT_TRUE(runUntil([&] { return _connections.size() == 63; }));
+  EXPECT_TRUE(isServed());
+}
+
+TEST_F(SocketServerTest, AThousandConnectionsDoNotMakeItDeaf) {
+  const auto listening = server();
+  for (int round = 0; round < 20; ++round) {
+    std::vector<RawSocket> clients;
+    for (int i = 0; i < 50; ++i) clients.push_back(RawSocket::connectedTo(path()));
+    ASSERT_TRUE(runUntil([&] { return _connections.size() == 50; })) << _connections.size();
+    clients.clear();
+    ASSERT_TRUE(runUntil([&] { return _connections.empty(); }));
+  }
+  EXPECT_TRUE(isServed());
+}
+
+TEST_F(SocketServerTest, WithoutADescriptorItTurnsAwayAndServesAgainLater) {
+  const auto listening = server();
+  runFor(10ms);
+  rlimit before{};
+  ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
+  std::vector<FileDescriptor> others;
+  const rlimit few{256, before.rlim_max};
+  ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &few), 0);
+  for (int i = 0; i < 3; ++i) {
+    do {
+      others.emplace_back(::open("/dev/null", O_RDONLY | O_CLOEXEC));
+    } while (others.back().isOpen());
+    others.resize(others.size() - 2);  // which makes room for the client's
+    const RawSocket client = RawSocket::connectedTo(path());
+    EXPECT_TRUE(runUntil([&] { return client.waits(0ms); }));
+    EXPECT_EQ(client.receive(), (Bytes{'f', 'u', 'l', 'l'}));
+  }
+  EXPECT_TRUE(_connections.empty());
+  others.clear();
+  ::setrlimit(RLIMIT_NOFILE, &before);
+  EXPECT_TRUE(isServed());
+}
+
+TEST_F(SocketServerTest, AFrameThatIsNotWholeInTimeEndsItsConnection) {
+  const auto listening = server({.frameTime = 50ms});
+  const RawSocket slow = RawSocket::connectedTo(path());
+  const RawSocket other = RawSocket::connectedTo(path());
+  slow.send(Bytes{5, 0, 0, 0, 0});
+  ASSERT_TRUE(runUntil([&] { return _connections.size() == 2; }));
+  ASSERT_TRUE(runUntil([&] { return _connections.size() == 1; }));
+  EXPECT_TRUE(slow.receive().empty());
+  Bytes whole;
+  appendFrame(whole, {0, FrameMark::Message, {}});
+  EXPECT_TRUE(other.send(whole));
+  EXPECT_TRUE(runUntil([&] { return _frames == 1; }));
+}
+
+TEST_F(SocketServerTest, AFrameThatComesInPiecesIsTakenAndTheTimeStartsAnewForTheNext) {
+  const auto listening = server({.frameTime = 1h});
+  const RawSocket client = RawSocket::connectedTo(path());
+  Bytes whole;
+  appendFrame(whole, {0, FrameMark::Message, Bytes{1, 2, 3}});
+  for (int round = 1; round <= 3; ++round) {
+    client.send(ByteView(whole).first(4));
+    runFor(5ms);
+    client.send(ByteView(whole).subspan(4));
+    EXPECT_TRUE(runUntil([&] { return _frames == round; }));
+  }
+  EXPECT_EQ(_connections.size(), 1u);
+}
+
+// What came before the time was up counts, also when nobody had looked.
+TEST_F(SocketServerTest, AReceiverThatIsHeldUpEndsNobodysConnection) {
+  const auto listening = server({.frameTime = 20ms});
+  const RawSocket client = RawSocket::connectedTo(path());
+  Bytes whole;
+  appendFrame(whole, {0, FrameMark::Message, Bytes{1, 2, 3}});
+  client.send(ByteView(whole).first(4));
+  ASSERT_TRUE(runUntil([&] { return _connections.size() == 1; }));
+  runFor(5ms);
+  client.send(ByteView(whole).subspan(4));
+  QThread::msleep(60);  // held up
+  EXPECT_TRUE(runUntil([&] { return _frames == 1 || _connections.empty(); }));
+  EXPECT_EQ(_connections.size(), 1u);
+}
+
+TEST_F(SocketServerTest, SocketAndLockGoWithTheirOwner) {
+  auto listening = server();
+  struct stat status {};
+  ASSERT_EQ(::stat(path().c_str(), &status), 0);
+  EXPECT_TRUE(S_ISSOCK(status.st_mode));
+  EXPECT_EQ(status.st_mode & 0777, 0600u);
+  EXPECT_TRUE(fs::exists(lockPath()));
+  listening.reset();
+  EXPECT_TRUE(fs::is_empty(_folder.path()));
+}
+
+TEST_F(SocketServerTest, ASecondServerIsRefusedAlsoWhenTheLockFileWasRemoved) {
+  const auto first = server();
+  EXPECT_THROW(server(), SocketNameTaken);
+  fs::remove(lockPath());
+  EXPECT_THROW(server(), SocketNameTaken);
+  runUntil([&] { return !_connections.empty(); }, 100ms);
+  EXPECT_TRUE(isServed());
+}
+
+TEST_F(SocketServerTest, MakesItsLockAnewWhenSomebodyHasRemovedIt) {
+  const auto listening = server({.lookInterval = 10ms});
+  fs::remove(lockPath());
+  EXPECT_TRUE(runUntil([&] { return fs::exists(lockPath()); }));
+  EXPECT_THROW(server(), SocketNameTaken);
+}
+
+TEST_F(SocketServerTest, MakesItsSocketAnewWhenSomebodyHasRemovedIt) {
+  const auto listening = server({.lookInterval = 10ms});
+  fs::remove(path());
+  ASSERT_TRUE(runUntil([&] { return fs::exists(path()); }));
+  EXPECT_TRUE(isServed());
+}
+
+TEST_F(SocketServerTest, KeepsItsFilesFresh) {
+  const auto listening = server({.lookInterval = 10ms});
+  const timespec longAgo[2] = {{1000, 0}, {1000, 0}};
+  for (const std::string& file : {path(), lockPath()})
+    ASSERT_EQ(::utimensat(AT_FDCWD, file.c_str(), longAgo, 0), 0);
+  const auto isFresh = [](const std::string& file) {
+    struct stat status {};
+    return ::stat(file.c_str(), &status) == 0 && status.st_mtime > 1000 && status.st_atime > 1000;
+  };
+  EXPECT_TRUE(runUntil([&] { return isFresh(path()) && isFresh(lockPath()); }));
+}
+
+TEST_F(SocketServerTest, ALockFileThatADeadProcessLeftIsTakenOver) {
+  std::ofstream(lockPath()) << "";
+  EXPECT_NO_THROW(server());
+}
+
+TEST_F(SocketServerTest, AStrangersConnectionDoesNotEndThePortOfItsFirstPeer) {
+  SocketPorts ports(_folder.path());
+  std::vector<std::string> messages;
+  int invalidations = 0;
+  const auto local = ports
+                         .createLocalPort("port",
+                                          [&](std::int32_t, ByteView data) {
+                                            messages.emplace_back(data.begin(), data.end());
+                                            return std::optional<Bytes>();
+                                          })
+                         .port;
+  local->setInvalidationHandler([&] { ++invalidations; });
+  local->deliverOnMainQueue();
+  auto first = ports.createRemotePort("port");
+  ASSERT_TRUE(first);
+  first->sendRequest(0, Bytes{'1'}, 1s, std::nullopt);
+  ASSERT_TRUE(runUntil([&] { return messages.size() == 1; }));
+  {
+    const RawSocket stranger = RawSocket::connectedTo(_folder.file("port"));
+    Bytes intrusion;
+    appendFrame(intrusion, {0, FrameMark::Message, Bytes{'X'}});
+    stranger.send(intrusion);
+    EXPECT_TRUE(runUntil([&] { return stranger.waits(0ms); }));
+    EXPECT_TRUE(stranger.receive().empty());
+  }
+  first->sendRequest(0, Bytes{'2'}, 1s, std::nullopt);
+  ASSERT_TRUE(runUntil([&] { return messages.size() == 2; }));
+  EXPECT_EQ(messages, (std::vector<std::string>{"1", "2"}));
+  EXPECT_EQ(invalidations, 0);
+  first.reset();
+  EXPECT_TRUE(runUntil([&] { return invalidations == 1; }));
+}
+
+TEST_F(SocketServerTest, ASocketWhoseQueueIsFullIsNotWaitedFor) {
+  const RawSocket silent = RawSocket::listeningAt(path());
+  std::vector<std::unique_ptr<SocketConnection>> waiting;
+  while (true) {
+    auto [connection, error] = SocketConnection::open(path());
+    if (!connection) {
+      EXPECT_EQ(error, EAGAIN);
+      break;
+    }
+    waiting.push_back(std::move(connection));
+    ASSERT_LT(waiting.size(), 100u);
+  }
+}
+
+TEST(DescriptorLimit, IsRaisedAsFarAsTheSystemAllowsAndNeverLowered) {
+  rlimit before{};
+  ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
+  const rlimit few{64, before.rlim_max};
+  ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &few), 0);
+  raiseDescriptorLimit(100);
+  rlimit now{};
+  ::getrlimit(RLIMIT_NOFILE, &now);
+  EXPECT_EQ(now.rlim_cur, 100u);
+  raiseDescriptorLimit(80);
+  ::getrlimit(RLIMIT_NOFILE, &now);
+  EXPECT_EQ(now.rlim_cur, 100u);
+  ::setrlimit(RLIMIT_NOFILE, &before);
+}
+
+}  // namespace
+}  // namespace varnel
