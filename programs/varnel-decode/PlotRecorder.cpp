@@ -10,6 +10,7 @@
 #include <stdexcept>
 #include <utility>
 
+#include "base/ClockStep.h"
 #include "model/VarnelModelNode.h"
 #include "programs/varnel-decode/Printable.h"
 #include "programs/varnel-decode/plot/ChartModule.h"
@@ -80,6 +81,16 @@ std::string_view commonSection(const std::vector<std::string_view>& paths) {
   return common.substr(0, end);
 }
 
+Time timeAt(double seconds) {
+  const double whole = std::floor(seconds);
+  return {static_cast<std::int64_t>(whole), static_cast<std::int32_t>((seconds - whole) * 1e9)};
+}
+
+bool isClockSetBetween(double earlier, double later) {
+  const ClockStep step = clockStep(timeAt(earlier), timeAt(later));
+  return step == ClockStep::Back || step == ClockStep::Ahead;
+}
+
 // Beside the program in the build tree, else where it was installed.
 fs::path modulePath() {
   const fs::path folder = fs::read_symlink("/proc/self/exe").parent_path();
@@ -112,13 +123,11 @@ void PlotLine::Column::take(const Column& later) {
 }
 
 void PlotLine::add(double seconds, double value) {
-  // What steps back less are records that overtake each other.
-  constexpr double largestOvertaking = 10;
-  const bool isBack = !_columns.empty() && seconds < _latest - largestOvertaking;
+  const bool isClockSet = !_columns.empty() && isClockSetBetween(_latest, seconds);
   const auto number = static_cast<std::int64_t>(std::floor((seconds - earliest) / _width));
-  const bool isSameColumn = !_columns.empty() && !isBack && number <= _columns.back().number;
+  const bool isSameColumn = !_columns.empty() && !isClockSet && number <= _columns.back().number;
   const bool isGap = _isInterrupted && !isSameColumn && !isNextTo(number);
-  if (!_columns.empty() && !isBack && !isGap)
+  if (!_columns.empty() && !isClockSet && !isGap)
     _columns.back().until = std::max(_columns.back().until, seconds);
   const Column column{.number = number,
                       .start = seconds,
@@ -127,7 +136,7 @@ void PlotLine::add(double seconds, double value) {
                       .highest = value,
                       .sum = value,
                       .count = 1,
-                      .startsNewLine = _columns.empty() || isBack || isGap};
+                      .startsNewLine = _columns.empty() || isClockSet || isGap};
   if (isSameColumn) {
     _columns.back().take(column);
   } else {

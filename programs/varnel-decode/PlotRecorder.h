@@ -27,8 +27,7 @@ class PlotLine {
  public:
   static constexpr std::size_t mostColumns = 1000;
 
-  /// Seconds since 1970, not before the year 1. Where time steps back by more than ten seconds, a new line
-  /// begins.
+  /// Seconds since 1970, not before the year 1. Where the clock was set (`clockStep`) a new line begins.
   void add(double seconds, double value);
   /// There is no value from this time on: no line crosses it.
   void interrupt(double seconds);

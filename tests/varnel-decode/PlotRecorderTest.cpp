@@ -155,6 +155,16 @@ TEST(PlotLine, AClockThatIsSetBackBeginsANewLine) {
                           held(1402, 1404, 3, Line::Begins), held(1404, 1404, 4, Line::GoesOn)));
 }
 
+TEST(PlotLine, NoValueHoldsWhereTheClockLeapsAhead) {
+  PlotLine line;
+  line.add(100, 1);
+  line.add(86'500, 2);
+  line.add(86'500 + 86'401, 3);
+  EXPECT_THAT(line.points(),
+              ElementsAre(held(100, 86'500, 1, Line::Begins), held(86'500, 86'500, 2, Line::GoesOn),
+                          held(172'901, 172'901, 3, Line::Begins)));
+}
+
 TEST(PlotLine, AClockThatJumpsToAndFroFillsNoMoreColumns) {
   PlotLine line;
   for (int i = 0; i < 10'000; ++i) line.add(i % 2 == 0 ? -62135596800.0 : 253402300799.0, i);
