@@ -1,6 +1,7 @@
 #include "widgets/RememberedSize.h"
 
-#include <cerrno>
+#include <QFile>
+#include <QSaveFile>
 #include <charconv>
 #include <string>
 #include <string_view>
@@ -8,7 +9,6 @@
 #include <utility>
 
 #include "base/Log.h"
-#include "host/PrivateFile.h"
 #include "host/WholeFile.h"
 #include "widgets/FirstSize.h"
 
@@ -47,8 +47,12 @@ std::optional<std::string> write(const fs::path& file, const std::string& text) 
   std::error_code failure;
   makeFolder(file.parent_path(), failure);
   if (failure) return failure.message();
-  if (writePrivateFile(file, Bytes(text.begin(), text.end()))) return std::nullopt;
-  return std::generic_category().message(errno);
+  // Whole or not there, and its owner's alone.
+  QSaveFile saved(QString::fromStdString(file.string()));
+  const bool isWritten = saved.open(QIODevice::WriteOnly) &&
+                         saved.setPermissions(QFile::ReadOwner | QFile::WriteOwner) &&
+                         saved.write(text.data(), static_cast<qint64>(text.size())) >= 0 && saved.commit();
+  return isWritten ? std::nullopt : std::optional(saved.errorString().toStdString());
 }
 
 }  // namespace

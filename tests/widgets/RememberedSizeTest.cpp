@@ -1,5 +1,6 @@
 #include "widgets/RememberedSize.h"
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "tests/support/Process.h"
@@ -34,6 +35,17 @@ TEST_F(RememberedSizeTest, WhatWasKeptIsThereInTheNextRun) {
   EXPECT_EQ(contentsOf(file), "480 655\n");
 }
 
+TEST_F(RememberedSizeTest, TheFileIsReplacedWholeAndLeavesNothingBeside) {
+  writeFile("damaged");
+  fs::permissions(file, fs::perms::all);
+  std::ifstream former(file);
+  RememberedSize(folder).keep({480, 655});
+  EXPECT_EQ(std::string(std::istreambuf_iterator<char>(former), {}), "damaged") << "not written in place";
+  EXPECT_EQ(contentsOf(file), "480 655\n");
+  EXPECT_EQ(fs::status(file).permissions(), fs::perms::owner_read | fs::perms::owner_write);
+  EXPECT_EQ(std::distance(fs::directory_iterator(folder), fs::directory_iterator()), 1);
+}
+
 TEST_F(RememberedSizeTest, FolderAndFileAreTheUsersOwn) {
   RememberedSize(folder).keep({480, 655});
   EXPECT_EQ(fs::status(folder).permissions(), fs::perms::owner_all);
@@ -61,7 +73,8 @@ TEST_F(RememberedSizeTest, AFolderInItsPlaceIsIgnoredAndTold) {
   EXPECT_EQ(RememberedSize(folder).size(), std::nullopt);
   RememberedSize(folder).keep({480, 655});
   ASSERT_EQ(log.lines().size(), 1u);
-  EXPECT_EQ(log.lines()[0].text, "Unable to keep the window's size in " + file.string() + ": Is a directory");
+  EXPECT_THAT(log.lines()[0].text,
+              testing::StartsWith("Unable to keep the window's size in " + file.string() + ": "));
 }
 
 TEST_F(RememberedSizeTest, WithoutAFolderNothingIsRemembered) {
