@@ -20,7 +20,7 @@ class SectionFormats;
 /// Section name → the decoder that owns that section.
 using ClassDictionary = std::map<std::string_view, Base*>;
 
-/// Raised for a record index at or past the record count. Nobody catches it: the program ends.
+/// Declared for a record index at or past the record count; nothing raises it. It would end the program.
 class ArrayOutOfBoundsException : public std::exception {
  public:
   const char* what() const noexcept override { return "ArrayOutOfBoundsException"; }

@@ -47,7 +47,7 @@ TEST_F(ArrayLockTest, AScopeHoldsItForItsLength) {
 
 TEST_F(ArrayLockTest, CanBeTakenAgainByTheThreadThatHoldsIt) {
   const auto nest = [] {
-    alarm(10);
+    alarm(60);
     ArrayLock::lockArray();
     ArrayLock::lockArray();
     endWell(true);
@@ -62,7 +62,7 @@ TEST_F(ArrayLockTest, TakenAndReleasedOneAfterTheOtherIsFreeEachTime) {
 
 TEST_F(ArrayLockTest, AnInnerReleaseLeavesItHeld) {
   const auto releaseOnce = [] {
-    alarm(10);
+    alarm(60);
     ArrayLock::lockArray();
     ArrayLock::lockArray();
     ArrayLock::unlockArray();
@@ -74,7 +74,7 @@ TEST_F(ArrayLockTest, AnInnerReleaseLeavesItHeld) {
 
 TEST_F(ArrayLockTest, AThreadThatNestedItKeepsItThoughItReleasedAsOften) {
   const auto nestAndRelease = [] {
-    alarm(10);
+    alarm(60);
     ArrayLock::lockArray();
     ArrayLock::lockArray();
     ArrayLock::unlockArray();
@@ -87,7 +87,7 @@ TEST_F(ArrayLockTest, AThreadThatNestedItKeepsItThoughItReleasedAsOften) {
 
 TEST_F(ArrayLockTest, TheCounterWrapsAtEightBits) {
   const auto nestAndReleaseRoundTheCounter = [] {
-    alarm(10);
+    alarm(60);
     ArrayLock::lockArray();
     ArrayLock::lockArray();
     ArrayLock::unlockArray();

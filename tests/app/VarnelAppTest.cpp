@@ -240,9 +240,10 @@ TEST_F(VarnelAppTest, ARefreshWithoutAConnectionShowsTheTreeAndThatItIsConnectin
   ports.deliver(channel, 0, contexts(3));
   telephony.refusesConnections = true;
   ports.endRemotePorts();
+  host.clock.set({1709294711, 0});
   queue.advance(2s);
   EXPECT_EQ(pane().toolbarText(), connecting);
-  EXPECT_EQ(app.updateMessage(), "Updated 2024-03-01 at 14:05:09");
+  EXPECT_EQ(app.updateMessage(), "Updated 2024-03-01 at 14:05:09") << "the time when it was connected";
   pane().table().select(0);
   EXPECT_EQ(pane().table().rows(), 3u);
 }

@@ -155,7 +155,7 @@ class PreferencesBus : public FilePreferencesTest {
         "/usr/bin/env", std::vector<std::string>{"dbus-monitor", "--address", address(),
                                                  "type='signal',interface='com.orvane.Preferences'"});
     // Its own name is the first that it hears.
-    return eventually([&] { return listener->output().find("NameAcquired") != std::string::npos; }, 5s);
+    return eventually([&] { return listener->output().find("NameAcquired") != std::string::npos; });
   }
   std::size_t heard() const {
     std::size_t count = 0;
@@ -234,7 +234,8 @@ TEST_F(PreferencesBus, ABusThatDoesNotAnswerHoldsNothingUp) {
 
   const auto begin = std::chrono::steady_clock::now();
   preferences.notifyChanged(domain, key);
-  EXPECT_LT(std::chrono::steady_clock::now() - begin, 3s);
+  // A call that is left to itself waits for 25 s.
+  EXPECT_LT(std::chrono::steady_clock::now() - begin, 20s);
   EXPECT_EQ(log.takeTexts().size(), 1u);
   ::close(listening);
 }

@@ -45,7 +45,7 @@ TEST(SignalWatcherDeathTest, LeavesSignalsAloneAfterwards) {
       const SignalWatcher watcher({SIGTERM}, [](int) {});
     }
     ::kill(::getpid(), SIGTERM);
-    runFor(1s);
+    runFor(1min);
   };
   EXPECT_EXIT(die(), testing::KilledBySignal(SIGTERM), "");
 }

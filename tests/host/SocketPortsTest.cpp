@@ -121,7 +121,7 @@ TEST_F(SocketPortsTest, ABatchOfSmallMessagesArrivesWholeAndFast) {
     std::shared_ptr<RemotePort> remote = _ports.createRemotePort(_name);
     const Bytes message(40, 0x5A);
     for (int i = 0; i < count; ++i) {
-      const auto sent = remote->sendRequest(i, message, 5s, {});
+      const auto sent = remote->sendRequest(i, message, 1min, {});
       if (sent.status != 0) ADD_FAILURE() << "message " << i << " has status " << sent.status;
     }
     return remote;
@@ -148,7 +148,7 @@ TEST_F(SocketPortsTest, ARequestGetsItsReply) {
     return std::optional(reply);
   });
   const auto remote = _ports.createRemotePort(_name);
-  const auto result = remote->sendRequest('!', bytesOf("ask"), 1s, 2s);
+  const auto result = remote->sendRequest('!', bytesOf("ask"), 1s, 1min);
   EXPECT_EQ(result.status, 0);
   EXPECT_EQ(result.reply, bytesOf("ask!"));
 }
@@ -156,11 +156,10 @@ TEST_F(SocketPortsTest, ARequestGetsItsReply) {
 TEST_F(SocketPortsTest, ARequestWithoutReplyLearnsSoAtOnce) {
   const auto peer = answeringPeer([](std::int32_t, ByteView) { return std::optional<Bytes>(); });
   const auto remote = _ports.createRemotePort(_name);
-  const auto start = Clock::now();
-  const auto result = remote->sendRequest(0, bytesOf("ask"), 1s, 5s);
+  // Who waited for a reply would meet a timeout.
+  const auto result = remote->sendRequest(0, bytesOf("ask"), 1s, 1min);
   EXPECT_EQ(result.status, 0);
   EXPECT_FALSE(result.reply);
-  EXPECT_LT(Clock::now() - start, 3s);
 }
 
 TEST_F(SocketPortsTest, AReplyThatDoesNotComeIsAReceiveTimeout) {
@@ -169,7 +168,6 @@ TEST_F(SocketPortsTest, AReplyThatDoesNotComeIsAReceiveTimeout) {
   const auto start = Clock::now();
   EXPECT_EQ(remote->sendRequest(0, bytesOf("ask"), 1s, 100ms).status, RemotePort::receiveTimeout);
   EXPECT_GE(Clock::now() - start, 99ms);
-  EXPECT_LT(Clock::now() - start, 1s);
   EXPECT_TRUE(remote->isValid());
 }
 
@@ -178,13 +176,16 @@ TEST_F(SocketPortsTest, ForeignFramesDoNotProlongTheWait) {
   const auto remote = _ports.createRemotePort(_name);
   const RawSocket peer = listener.accept();
   std::atomic<bool> isEnding = false;
+  std::atomic<bool> hasStopped = false;
   std::thread flood([&] {
-    while (!isEnding && peer.send(frameBytes(0, FrameMark::Notification, "news")))
+    // For a minute: a request that frames prolong ends after it.
+    const auto end = Clock::now() + 1min;
+    while (!isEnding && Clock::now() < end && peer.send(frameBytes(0, FrameMark::Notification, "news")))
       std::this_thread::sleep_for(5ms);
+    hasStopped = true;
   });
-  const auto start = Clock::now();
   EXPECT_EQ(remote->sendRequest(0, bytesOf("ask"), 1s, 100ms).status, RemotePort::receiveTimeout);
-  EXPECT_LT(Clock::now() - start, 1s);
+  EXPECT_FALSE(hasStopped);
   isEnding = true;
   flood.join();
 }
@@ -200,7 +201,7 @@ TEST_F(SocketPortsTest, ALateReplyIsNotTakenForTheNextOne) {
   peer.send(frameBytes(0, FrameMark::Reply, "late 2"));
   peer.send(frameBytes(0, FrameMark::Notification, "news"));
   peer.send(frameBytes(0, FrameMark::Reply, "in time"));
-  EXPECT_EQ(remote->sendRequest(0, bytesOf("3"), 1s, 1s).reply, bytesOf("in time"));
+  EXPECT_EQ(remote->sendRequest(0, bytesOf("3"), 1s, 1min).reply, bytesOf("in time"));
 }
 
 TEST_F(SocketPortsTest, NothingElseIsDeliveredWhileARequestWaits) {
@@ -224,7 +225,7 @@ TEST_F(SocketPortsTest, AReplyCountsAlsoWhenThePeerGoesRightAfterIt) {
     peer.receive();
     peer.send(frameBytes(0, FrameMark::Reply, "bye"));
   });
-  const auto result = remote->sendRequest(0, bytesOf("ask"), 1s, 2s);
+  const auto result = remote->sendRequest(0, bytesOf("ask"), 1s, 1min);
   answering.join();
   EXPECT_EQ(result.status, 0);
   EXPECT_EQ(result.reply, bytesOf("bye"));
@@ -235,9 +236,9 @@ TEST_F(SocketPortsTest, APeerThatGoesWhileARequestWaitsMakesThePortInvalid) {
   const RawSocket listener = RawSocket::listeningAt(path());
   const auto remote = _ports.createRemotePort(_name);
   std::thread leaving([&] { listener.accept().receive(); });
-  EXPECT_EQ(remote->sendRequest(0, bytesOf("ask"), 1s, 2s).status, RemotePort::becameInvalid);
+  EXPECT_EQ(remote->sendRequest(0, bytesOf("ask"), 1s, 1min).status, RemotePort::becameInvalid);
   leaving.join();
-  EXPECT_EQ(remote->sendRequest(0, bytesOf("ask"), 1s, 2s).status, RemotePort::isInvalid);
+  EXPECT_EQ(remote->sendRequest(0, bytesOf("ask"), 1s, 1min).status, RemotePort::isInvalid);
 }
 
 TEST_F(SocketPortsTest, ARemotePortIsInvalidAsSoonAsItsPeerHasGone) {
@@ -431,12 +432,12 @@ TEST_F(SocketPortsTest, PeersAreServedUnlessTheyAreOfAnotherUser) {
     if (isRoot && ::setuid(12345) != 0) ::_exit(1);
     const RawSocket peer = RawSocket::connectedTo(path());
     peer.send(frameBytes(0, FrameMark::Message, "hello"));
-    ::_exit(!isRoot || peer.waits(5s) ? 0 : 2);
+    ::_exit(!isRoot || peer.waits(1min) ? 0 : 2);
   }
   int status = -1;
   ASSERT_TRUE(runUntil([&] { return ::waitpid(child, &status, WNOHANG) == child; }));
   EXPECT_EQ(status, 0);
-  EXPECT_EQ(runUntil([&] { return _invalidations == 1; }, isRoot ? 20ms : 5000ms), !isRoot);
+  EXPECT_EQ(runUntil([&] { return _invalidations == 1; }, isRoot ? 20ms : 60000ms), !isRoot);
   EXPECT_EQ(_messages.size(), isRoot ? 0u : 1u);
 }
 
@@ -563,7 +564,7 @@ TEST_F(SocketPortsDeathTest, AnExceptionThatLeavesTheMessageHandlerEndsTheProgra
         local->deliverOnMainQueue();
         const RawSocket peer = RawSocket::connectedTo(path());
         peer.send(frameBytes(0, FrameMark::Message, ""));
-        runFor(1s);
+        runFor(1min);
       },
       "thrown by a handler");
 }

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <filesystem>
 #include <memory>
+#include <regex>
 
 #include "tests/support/Process.h"
 
@@ -21,6 +22,11 @@ std::size_t occurrences(const std::string& text, const std::string& part) {
     ++count;
   return count;
 }
+
+const std::string streaming = "<3>Starting the display update timer\n";
+const std::string connecting = "Connecting...\n";
+const std::string lost = "<3> ***** INVALIDATED 0x";
+const std::string noLink = "<3>Could not create the ports necessary\n";
 
 // A real server with a simulated LTE modem and real viewers, in a runtime folder of their own.
 class EndToEnd : public testing::Test {
@@ -53,6 +59,17 @@ class EndToEnd : public testing::Test {
     whole.insert(whole.end(), environment.begin(), environment.end());
     return std::make_unique<Process>(VARNEL_PROGRAM, arguments, whole);
   }
+  // How often a viewer has logged the line. Without a link it tries every five seconds, and logs each time:
+  // how often it has, depends on who was quicker.
+  static std::size_t logged(const Process& viewer, const std::string& line) {
+    return occurrences(viewer.error(), line);
+  }
+  // Waits until it has logged the line more often than before.
+  static testing::AssertionResult logsAgain(const Process& viewer, const std::string& line,
+                                            std::size_t before = 0) {
+    if (eventually([&] { return logged(viewer, line) > before; })) return testing::AssertionSuccess();
+    return testing::AssertionFailure() << "not logged: " << line << "but:\n" << viewer.error();
+  }
   std::string preference() const {
     return contentsOf(_device.path() / "var/mobile/Library/Preferences/com.orvane.dockhall.plist");
   }
@@ -60,8 +77,6 @@ class EndToEnd : public testing::Test {
   TemporaryFolder _runtime;
   TemporaryFolder _device;
 };
-
-const std::string streaming = "<3>Starting the display update timer\n";
 
 TEST_F(EndToEnd, ALivingTreeAppears) {
   const auto telephony = server();
@@ -77,19 +92,17 @@ TEST_F(EndToEnd, ALivingTreeAppears) {
   EXPECT_THAT(output, testing::ContainsRegex("EF-ICCID +[0-9]"));
 }
 
-TEST_F(EndToEnd, AKilledServerIsNoticedAndItsReturnWithinFiveSeconds) {
+TEST_F(EndToEnd, AKilledServerIsNoticedAndSoIsItsReturn) {
   auto telephony = server();
   const auto varnel = viewer();
-  ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), streaming) == 1; })) << varnel->error();
+  ASSERT_TRUE(logsAgain(*varnel, streaming));
+  const std::size_t links = logged(*varnel, streaming), losses = logged(*varnel, lost),
+                    failures = logged(*varnel, noLink);
   telephony->signal(SIGKILL);
-  ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), "<3> ***** INVALIDATED 0x") == 1; }, 5s));
-  ASSERT_TRUE(eventually(
-      [&] { return occurrences(varnel->error(), "<3>Could not create the ports necessary\n") == 1; }, 5s))
-      << varnel->error();
+  ASSERT_TRUE(logsAgain(*varnel, lost, losses));
+  ASSERT_TRUE(logsAgain(*varnel, noLink, failures));
   telephony = server();
-  // Five seconds by the timer, and some for a busy machine.
-  EXPECT_TRUE(eventually([&] { return occurrences(varnel->error(), streaming) == 2; }, 10s))
-      << varnel->error();
+  EXPECT_TRUE(logsAgain(*varnel, streaming, links));
 }
 
 TEST_F(EndToEnd, TheServerSaysWhatItServesAndWhatBecameOfItsMessages) {
@@ -113,33 +126,30 @@ TEST_F(EndToEnd, TheServerSaysWhatItServesAndWhatBecameOfItsMessages) {
 
 TEST_F(EndToEnd, AViewerWithoutAServerKeepsTrying) {
   const auto varnel = viewer();
-  ASSERT_TRUE(eventually(
-      [&] { return occurrences(varnel->error(), "<3>Could not create the ports necessary\n") == 1; }));
+  ASSERT_TRUE(logsAgain(*varnel, noLink));
   const auto telephony = server();
-  EXPECT_TRUE(eventually([&] { return occurrences(varnel->error(), streaming) == 1; }, 12s))
-      << varnel->error();
+  EXPECT_TRUE(logsAgain(*varnel, streaming));
 }
 
 TEST_F(EndToEnd, ASecondViewerWaitsForTheChannelName) {
   const auto telephony = server();
   auto first = viewer();
-  ASSERT_TRUE(eventually([&] { return occurrences(first->error(), streaming) == 1; }));
+  ASSERT_TRUE(logsAgain(*first, streaming));
   const auto second = viewer();
-  ASSERT_TRUE(eventually(
-      [&] { return occurrences(second->error(), "<3>Local messsage port already exists\n") == 1; }));
+  ASSERT_TRUE(logsAgain(*second, "<3>Local messsage port already exists\n"));
   first->signal(SIGTERM);
   ASSERT_TRUE(first->waitForEnd());
   EXPECT_EQ(first->exitStatus(), 0);
-  EXPECT_TRUE(eventually([&] { return occurrences(second->error(), streaming) == 1; }, 7s))
-      << second->error();
+  EXPECT_TRUE(logsAgain(*second, streaming));
 }
 
 TEST_F(EndToEnd, StartingOverShowsALivingTreeAgain) {
   const auto telephony = server();
   const auto varnel = viewer();
   ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), "EF-ICCID") >= 1; }));
+  const std::size_t starts = occurrences(varnel->output(), connecting);
   varnel->signal(SIGUSR1);
-  ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), "Connecting...\n") == 2; }));
+  ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), connecting) > starts; }));
   const std::size_t before = occurrences(varnel->output(), "EF-ICCID");
   EXPECT_TRUE(eventually([&] { return occurrences(varnel->output(), "EF-ICCID") > before; }))
       << varnel->error();
@@ -152,8 +162,9 @@ TEST_F(EndToEnd, KeysOfATerminalStartOverSaveAndEnd) {
     const auto varnel = viewer({}, &terminal);
     ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), "EF-ICCID") >= 1; }));
     EXPECT_FALSE(terminal.showsLines());
+    const std::size_t starts = occurrences(varnel->output(), connecting);
     terminal.type("x\n" + keys.substr(0, 1));
-    ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), "Connecting...\n") == 2; }));
+    ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), connecting) > starts; }));
     terminal.type(keys.substr(1, 1));
     ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), "nothing is saved") == 1; }));
     terminal.type(keys.substr(2, 1));
@@ -186,9 +197,15 @@ TEST_F(EndToEnd, ASnapshotIsSavedOnlyWithTheMarker) {
 
   fs::create_directories(_device.path() / "OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle");
   varnel->signal(SIGUSR2);
-  ASSERT_TRUE(eventually([&] { return !fs::is_empty(logs); }));
-  const fs::path snapshot = fs::directory_iterator(logs)->path();
-  EXPECT_THAT(snapshot.filename().string(), testing::MatchesRegex("VarnelSnapshot-[0-9]+\\.varnel"));
+  // Beside it may stand what is still being written.
+  fs::path snapshot;
+  ASSERT_TRUE(eventually([&] {
+    for (const auto& entry : fs::directory_iterator(logs)) {
+      if (std::regex_match(entry.path().filename().string(), std::regex("VarnelSnapshot-[0-9]+\\.varnel")))
+        snapshot = entry.path();
+    }
+    return !snapshot.empty();
+  }));
   EXPECT_EQ(fs::status(snapshot).permissions(), fs::perms::owner_read | fs::perms::owner_write);
   EXPECT_TRUE(eventually([&] { return contentsOf(snapshot).find("DLF binary (") != std::string::npos; }));
 }
@@ -206,9 +223,10 @@ TEST_F(EndToEnd, SignalsEndTheWindowInOrder) {
   for (const int signal : {SIGTERM, SIGINT, SIGHUP}) {
     const auto telephony = server();
     const auto varnel = window({}, "QT_QPA_PLATFORM=offscreen");
-    ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), streaming) == 1; })) << varnel->error();
+    ASSERT_TRUE(logsAgain(*varnel, streaming));
+    const std::size_t links = logged(*varnel, streaming);
     varnel->signal(SIGUSR1);
-    ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), streaming) == 2; })) << varnel->error();
+    ASSERT_TRUE(logsAgain(*varnel, streaming, links));
     varnel->signal(SIGUSR2);
     ASSERT_TRUE(eventually([&] { return occurrences(varnel->error(), "nothing is saved") == 1; }));
     EXPECT_EQ(preference(), "");

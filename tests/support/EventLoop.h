@@ -11,7 +11,7 @@ namespace varnel {
 
 /// Runs the calling thread's event loop until the condition holds; false when it does not within the time.
 inline bool runUntil(const std::function<bool()>& condition,
-                     std::chrono::milliseconds within = std::chrono::seconds(10)) {
+                     std::chrono::milliseconds within = std::chrono::seconds(60)) {
   const auto deadline = std::chrono::steady_clock::now() + within;
   while (!condition()) {
     if (std::chrono::steady_clock::now() > deadline) return false;
@@ -21,7 +21,7 @@ inline bool runUntil(const std::function<bool()>& condition,
   return true;
 }
 
-/// Runs the event loop for that long.
+/// Runs the event loop for that long: for what must not happen. What must is waited for.
 inline void runFor(std::chrono::milliseconds duration) {
   runUntil([] { return false; }, duration);
 }
@@ -35,7 +35,7 @@ class PeerThread {
       : _thread(QThread::create([this, setUp = std::move(setUp)] {
           const auto peer = setUp();
           _isReady = true;
-          runUntil([this] { return _isEnding.load(); }, std::chrono::minutes(1));
+          runUntil([this] { return _isEnding.load(); }, std::chrono::minutes(10));
         })) {
     _thread->start();
     runUntil([this] { return _isReady.load(); });

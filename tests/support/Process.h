@@ -47,9 +47,10 @@ inline std::string contentsOf(const std::string& path) {
   return std::string(std::istreambuf_iterator<char>(file), {});
 }
 
-/// Waits until the condition holds; false when it does not within the time.
+/// Waits until the condition holds; false when it does not within the time, which is to be long: other work
+/// may keep every core busy.
 template <class Condition>
-bool eventually(Condition condition, std::chrono::milliseconds within = std::chrono::seconds(20)) {
+bool eventually(Condition condition, std::chrono::milliseconds within = std::chrono::seconds(60)) {
   const auto deadline = std::chrono::steady_clock::now() + within;
   while (!condition()) {
     if (std::chrono::steady_clock::now() > deadline) return false;
@@ -121,7 +122,7 @@ class Process {
   void signal(int number) const { ::kill(_id, number); }
 
   /// True when the program ends by itself within the time.
-  bool waitForEnd(std::chrono::milliseconds within = std::chrono::seconds(30)) {
+  bool waitForEnd(std::chrono::milliseconds within = std::chrono::seconds(120)) {
     return eventually(
         [this] { return _hasEnded || (_hasEnded = ::wait4(_id, &_status, WNOHANG, &_usage) == _id); },
         within);

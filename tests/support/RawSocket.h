@@ -48,7 +48,7 @@ class RawSocket {
     return true;
   }
   /// Whatever arrives next within the time; empty when nothing does or the peer has gone.
-  Bytes receive(std::chrono::milliseconds within = std::chrono::seconds(5)) const {
+  Bytes receive(std::chrono::milliseconds within = std::chrono::seconds(60)) const {
     Bytes bytes(65536);
     const ssize_t count = waits(within) ? ::recv(_descriptor, bytes.data(), bytes.size(), 0) : ssize_t{0};
     bytes.resize(count > 0 ? static_cast<std::size_t>(count) : 0);

@@ -16,6 +16,9 @@
 
 namespace varnel {
 
+/// How long something may take on a busy machine.
+constexpr int patience_ms = 60'000;
+
 /// A row of a test's table: a leaf when it has a value, else an inner node.
 struct TestRow {
   std::string name;

@@ -32,10 +32,13 @@ class JobsTest : public ::testing::Test {
 TEST_F(JobsTest, OutputsComeInOrderWhicheverPieceIsDoneFirst) {
   ::testing::internal::CaptureStdout();
   ::testing::internal::CaptureStderr();
-  const int status = runJobs(names(4), 4, [](std::size_t piece) {
+  const int status = runJobs(names(4), 4, [this](std::size_t piece) {
     std::printf("begin %zu\n", piece);
     std::fflush(stdout);
-    std::this_thread::sleep_for(60ms * (4 - piece));
+    // The last is done first: each of the others waits for the one behind it.
+    const auto mark = [this](std::size_t which) { return folder.file(std::to_string(which)); };
+    if (piece < 3 && !eventually([&] { return std::filesystem::exists(mark(piece + 1)); })) return 1;
+    std::ofstream(mark(piece)).flush();
     std::printf("end %zu\n", piece);
     std::fprintf(stderr, "error %zu\n", piece);
     return 0;
@@ -53,7 +56,7 @@ TEST_F(JobsTest, AsManyRunAtTheSameTimeAsAllowedAndNoMore) {
       const std::string mark = folder.file(std::to_string(piece));
       std::ofstream(mark).flush();
       // Waits for the others until there are as many as there may be.
-      eventually([&] { return running() >= most; }, piece < most ? 5s : 100ms);
+      eventually([&] { return running() >= most; }, piece < most ? 60s : 100ms);
       std::printf("%zu ", running());
       std::filesystem::remove(mark);
       return 0;

@@ -1,5 +1,6 @@
 #include <gmock/gmock.h>
 
+#include <algorithm>
 #include <fstream>
 #include <string>
 #include <string_view>
@@ -74,12 +75,17 @@ class LongCapture : public DecodeProgram {
     };
     const std::string shortPath = capture(technology, shortCapture_s, clock);
     const std::string longPath = capture(technology, longCapture_s, clock);
-    const Cost shortCost = costOf(shortPath), longCost = costOf(longPath);
+    Cost shortCost = costOf(shortPath), longCost = costOf(longPath);
     for (const Cost& each : {shortCost, longCost})
       EXPECT_EQ(linesOf(each.error), clock == ItsClock::Runs ? 0u : 1u) << each.error;
     // The long one is 14 MB longer.
     EXPECT_LT(longCost.memory, shortCost.memory + 4'000'000);
-    // Eight times as long, and as much again for what else the processor has to do.
+    // Eight times as long, and as much again for what else the processor has to do. Whoever shares its caches
+    // takes time, and not always the same; what grows with the square takes more than that each time.
+    for (int left = 5; left > 0 && longCost.time >= 16 * shortCost.time; --left) {
+      shortCost.time = std::min(shortCost.time, costOf(shortPath).time);
+      longCost.time = std::min(longCost.time, costOf(longPath).time);
+    }
     EXPECT_LT(longCost.time, 16 * shortCost.time);
   }
 

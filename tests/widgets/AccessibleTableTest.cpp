@@ -16,7 +16,7 @@ class AccessibleTableTest : public testing::Test {
     table.show();
     table.activateWindow();
     table.setFocus();
-    EXPECT_TRUE(QTest::qWaitForWindowActive(&table));
+    EXPECT_TRUE(QTest::qWaitForWindowActive(&table, patience_ms));
   }
   QAccessibleInterface& list() { return *QAccessible::queryAccessibleInterface(&table); }
   QAccessibleInterface& row(int index) { return *list().child(index); }

@@ -15,7 +15,7 @@ class AlertWidgetTest : public testing::Test {
     window = userInterface.makeWindow({0, 0, 360, 640});
     window->setRoot(stack);
     window->makeKeyAndVisible();
-    EXPECT_TRUE(QTest::qWaitForWindowActive(&widget()));
+    EXPECT_TRUE(QTest::qWaitForWindowActive(&widget(), patience_ms));
   }
   WindowWidget& widget() { return static_cast<WindowWidget&>(*window); }
   void show(const std::string& title = "File Error") {

@@ -57,7 +57,7 @@ class ModalScreenWidgetTest : public testing::Test {
   ModalScreenWidgetTest() {
     window.setRoot(stack);
     window.makeKeyAndVisible();
-    EXPECT_TRUE(QTest::qWaitForWindowActive(&window));
+    EXPECT_TRUE(QTest::qWaitForWindowActive(&window, patience_ms));
     stack.present(modal, Animation::Animated);
     QCoreApplication::processEvents();
   }
@@ -161,8 +161,7 @@ TEST_F(ModalScreenWidgetTest, TheStackKeepsTheControllerUntilItIsOff) {
   modal.reset();
   EXPECT_FALSE(weak.expired());
   stack.dismiss(Animation::None);
-  QTest::qWait(10);
-  EXPECT_TRUE(weak.expired());
+  EXPECT_TRUE(QTest::qWaitFor([&] { return weak.expired(); }, patience_ms));
 }
 
 TEST_F(ModalScreenWidgetTest, UnknownOutletsAreNull) {

@@ -31,7 +31,7 @@ class NavigationWidgetTest : public testing::Test {
     stack.setDelegate(&delegate);
     window.setRoot(stack);
     window.makeKeyAndVisible();
-    EXPECT_TRUE(QTest::qWaitForWindowActive(&window));
+    EXPECT_TRUE(QTest::qWaitForWindowActive(&window, patience_ms));
   }
   std::shared_ptr<TestController> push(const std::string& name) {
     auto controller = std::make_shared<TestController>(name, events);
@@ -179,7 +179,7 @@ TEST_F(NavigationWidgetTest, ControlRStartsOver) {
   WindowWidget other({0, 0, 360, 640}, {.startOver = [&] { ++starts; }});
   other.setRoot(stack);
   other.makeKeyAndVisible();
-  ASSERT_TRUE(QTest::qWaitForWindowActive(&other));
+  ASSERT_TRUE(QTest::qWaitForWindowActive(&other, patience_ms));
   press(Qt::Key_R, Qt::ControlModifier);
   EXPECT_EQ(starts, 1u);
 }

@@ -43,7 +43,7 @@ class ScreensTest : public testing::TestWithParam<std::pair<int, int>> {
     };
     app.applicationDidFinishLaunching();
     window().setGeometry(0, 0, GetParam().first, GetParam().second);
-    EXPECT_TRUE(QTest::qWaitForWindowActive(&window()));
+    EXPECT_TRUE(QTest::qWaitForWindowActive(&window(), patience_ms));
     queue.run();
     receive("internet");
   }

@@ -28,7 +28,7 @@ class TableWidgetTest : public testing::Test {
     table.show();
     table.activateWindow();
     table.setFocus();
-    ASSERT_TRUE(QTest::qWaitForWindowActive(&table));
+    ASSERT_TRUE(QTest::qWaitForWindowActive(&table, patience_ms));
     ASSERT_TRUE(table.hasFocus());
     QCoreApplication::processEvents();
   }
@@ -103,11 +103,16 @@ TEST_F(TableWidgetTest, AReloadRepaintsOnlyWhatHasChanged) {
   showWith(leaves(8));
   PaintCounter counter;
   for (RowWidget* each : table.visibleRows()) counter.watch(*each);
+  // So that no painting of the start is still to come.
+  for (RowWidget* each : table.visibleRows()) each->update();
+  ASSERT_TRUE(QTest::qWaitFor([&] { return counter.painted.size() >= 8; }, patience_ms));
+  counter.painted.clear();
   table.reloadData();
   QTest::qWait(50);
   EXPECT_THAT(counter.painted, IsEmpty());
   delegate.rows[5].value = "new";
   table.reloadData();
+  ASSERT_TRUE(QTest::qWaitFor([&] { return !counter.painted.empty(); }, patience_ms));
   QTest::qWait(50);
   EXPECT_THAT(counter.painted, ElementsAre(&row(5)));
 }

@@ -20,7 +20,7 @@ class TouchScrollingTest : public testing::Test {
     table.resize(360, 400);
     table.setDelegate(&delegate);
     table.show();
-    EXPECT_TRUE(QTest::qWaitForWindowExposed(&table));
+    EXPECT_TRUE(QTest::qWaitForWindowExposed(&table, patience_ms));
   }
   // A finger goes from one place to the other in ten steps of 10 ms.
   void drag(const QPoint& from, const QPoint& to) {
@@ -55,6 +55,7 @@ TEST_F(TouchScrollingTest, AFingerSidewaysScrollsItsRowOnly) {
 TEST_F(TouchScrollingTest, ATapChoosesItsRowOnce) {
   QTest::touchEvent(&table, finger.get()).press(0, QPoint(100, 125), table.viewport());
   QTest::touchEvent(&table, finger.get()).release(0, QPoint(101, 126), table.viewport());
+  EXPECT_TRUE(QTest::qWaitFor([&] { return !delegate.chosen.empty(); }, patience_ms));
   QTest::qWait(20);
   EXPECT_THAT(delegate.chosen, ElementsAre(2));
 }
