@@ -25,14 +25,14 @@ constexpr int connectionsAtATime = 64;
 constexpr std::chrono::milliseconds refusalLineInterval = 10s;
 constexpr std::chrono::milliseconds descriptorWait = 100ms;
 
-FileIdentity identityOf(const struct stat& status) { return {status.st_dev, status.st_ino}; }
+SocketFile identityOf(const struct stat& status) { return {status.st_dev, status.st_ino}; }
 
-std::optional<FileIdentity> fileUnder(const fs::path& path) {
+std::optional<SocketFile> fileUnder(const fs::path& path) {
   struct stat status {};
   return ::lstat(path.c_str(), &status) == 0 ? std::optional(identityOf(status)) : std::nullopt;
 }
 
-std::optional<FileIdentity> fileOf(const FileDescriptor& file) {
+std::optional<SocketFile> fileOf(const FileDescriptor& file) {
   struct stat status {};
   return ::fstat(file.number(), &status) == 0 ? std::optional(identityOf(status)) : std::nullopt;
 }

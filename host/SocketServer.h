@@ -34,12 +34,12 @@ struct SocketLimits {
   std::chrono::milliseconds lookInterval = std::chrono::minutes(1);
 };
 
-/// Which file stands under a name; none when it is gone.
-struct FileIdentity {
+/// Which file a name or a descriptor stands for.
+struct SocketFile {
   dev_t device = 0;
   ino_t inode = 0;
 
-  bool operator==(const FileIdentity&) const = default;
+  bool operator==(const SocketFile&) const = default;
 };
 
 /// The end of a named local socket that others connect to. A socket that a dead process left behind is taken
@@ -93,7 +93,7 @@ class SocketServer final {
   NameLock _lock;         // held until the socket is gone
   FileDescriptor _spare;  // given up for a moment to turn somebody away when there are no others
   FileDescriptor _listening;
-  std::optional<FileIdentity> _socketFile;
+  std::optional<SocketFile> _socketFile;
   std::unique_ptr<QSocketNotifier> _notifier;
   QTimer _look;
   std::shared_ptr<const int> _places;  // each connection holds one more reference

@@ -28,11 +28,8 @@ constexpr int generalError = 1;
 // 64 connections, 16 channels with half a dozen files each, and plenty to spare.
 constexpr std::size_t mostFiles = 1024;
 
-// As standard error is for what goes wrong, standard output is for what the user may like to know.
-void tell(const std::string& sentence) {
-  std::printf("%s: %s\n", programName, sentence.c_str());
-  std::fflush(stdout);
-}
+// On standard error, since a recording may go to standard output.
+void tell(const std::string& sentence) { std::fprintf(stderr, "%s: %s\n", programName, sentence.c_str()); }
 
 int fail(const std::runtime_error& error) {
   std::fprintf(stderr, "%s: %s\n", programName, error.what());
