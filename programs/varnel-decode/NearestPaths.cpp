@@ -80,6 +80,7 @@ std::vector<std::string> NearestPaths::to(std::string_view path) const {
   std::ranges::stable_sort(suggestions, {}, &Suggestion::distance);
   if (suggestions.size() > mostSuggestions) suggestions.resize(mostSuggestions);
   std::vector<std::string> nearest;
+  nearest.reserve(suggestions.size());
   for (const Suggestion& found : suggestions) nearest.emplace_back(found.path);
   return nearest;
 }

@@ -125,7 +125,7 @@ std::optional<std::string> fileTakenForPath(std::string_view option, std::span<c
 }
 
 std::optional<std::string> fileTakenForPath(const Options& options, const Wishes& wishes) {
-  if (const auto taken = fileTakenForPath("--csv", options.tablePaths)) return taken;
+  if (auto taken = fileTakenForPath("--csv", options.tablePaths)) return taken;
   const std::span plot(wishes.plot);
   return fileTakenForPath("--plot", plot.subspan(std::min<std::size_t>(1, plot.size())));
 }
