@@ -234,8 +234,10 @@ class InputDecoding {
     const auto nearest = _seen.nearestTo(path);
     if (nearest.empty()) return "--format paths shows what there is";
     std::string advice = "did you mean ";
-    for (std::size_t i = 0; i < nearest.size(); ++i)
-      advice += (i == 0 ? "" : i + 1 < nearest.size() ? ", " : " or ") + ("'" + nearest[i] + "'");
+    for (std::size_t i = 0; i < nearest.size(); ++i) {
+      if (i > 0) advice += i + 1 < nearest.size() ? ", " : " or ";
+      advice.append("'").append(nearest[i]).append("'");
+    }
     return advice + "?";
   }
 
