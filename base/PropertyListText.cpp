@@ -40,6 +40,12 @@ bool beginsPlain(std::string_view text) {
   return ((word | (word - blanks)) & highBits) == 0;
 }
 
+bool isFit(Encoding encoding, char32_t character) {
+  if (character == 0 || encoding == Encoding::Binary) return character != 0;
+  const bool isControl = character < 0x20 && character != '\t' && character != '\n' && character != '\r';
+  return !isControl && character != 0xFFFE && character != 0xFFFF;
+}
+
 }  // namespace
 
 bool canHold(Encoding encoding, std::string_view text) {
@@ -53,13 +59,23 @@ bool canHold(Encoding encoding, std::string_view text) {
       text.remove_prefix(1);
       continue;
     }
-    const char32_t character = takeCharacter(text);
-    if (character == 0) return false;
-    if (encoding == Encoding::Binary) continue;
-    const bool isControl = character < 0x20 && character != '\t' && character != '\n' && character != '\r';
-    if (isControl || character == 0xFFFE || character == 0xFFFF) return false;
+    if (!isFit(encoding, takeCharacter(text))) return false;
   }
   return true;
+}
+
+std::string replacedWhereUnfit(Encoding encoding, std::string_view text) {
+  std::string replaced;
+  while (!text.empty()) {
+    const std::string_view before = text;
+    const char32_t character = takeCharacter(text);
+    if (text.size() == before.size()) text.remove_prefix(1);  // no UTF-8
+    if (isFit(encoding, character))
+      replaced += before.substr(0, before.size() - text.size());
+    else
+      replaced += "\uFFFD";
+  }
+  return replaced;
 }
 
 }  // namespace varnel

@@ -6,6 +6,7 @@
 #include "fuzz/MemoryFile.h"
 #include "fuzz/Require.h"
 #include "host/Capture.h"
+#include "host/CaptureWriter.h"
 
 using namespace varnel;
 

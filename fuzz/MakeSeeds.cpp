@@ -13,7 +13,7 @@
 #include "base/PropertyList.h"
 #include "fuzz/FuzzHost.h"
 #include "fuzz/InputSteps.h"
-#include "host/Capture.h"
+#include "host/CaptureWriter.h"
 #include "host/PortFrame.h"
 #include "host/WholeFile.h"
 #include "platform/TelephonyService.h"
@@ -129,7 +129,7 @@ void makeCaptureSeeds(SeedFolder& folder) {
   for (const Technology& technology : technologies) {
     const auto messages = walk(technology.identifier, 1);
     {
-      CaptureWriter writer(path);
+      CaptureWriter writer(path, ExistingRecording::Replaced);
       std::int64_t second = 0;
       for (const SimulatedMessage& message : messages) {
         if (message.bytes.size() > 400) continue;

@@ -24,7 +24,8 @@ class MemoryFile {
 
   /// Replaces what is in it.
   void set(ByteView bytes) {
-    require(ftruncate(_descriptor, 0) == 0, "memory file can be emptied");
+    require(ftruncate(_descriptor, 0) == 0 && lseek(_descriptor, 0, SEEK_SET) == 0,
+            "memory file can be emptied");
     const ssize_t written = pwrite(_descriptor, bytes.data(), bytes.size(), 0);
     require(written == static_cast<ssize_t>(bytes.size()), "memory file can be written");
   }

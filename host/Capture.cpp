@@ -11,6 +11,8 @@
 #include <new>
 #include <system_error>
 
+#include "host/OutputStream.h"
+
 namespace varnel {
 
 namespace {
@@ -23,8 +25,6 @@ constexpr std::int64_t nanosecondsPerSecond = 1'000'000'000;
 // messages may be longer, so it is shown a header that says so.
 constexpr int longRecordLinkType = DLT_DBUS;
 constexpr int longRecordSnapshotLength = std::numeric_limits<int>::max();
-
-std::string lastSystemError() { return std::generic_category().message(errno); }
 
 std::string linkTypeText(int linkType) {
   const char* name = pcap_datalink_val_to_name(linkType);
@@ -133,10 +133,10 @@ void CaptureReader::Closer::operator()(pcap* capture) const { pcap_close(capture
 
 CaptureReader::CaptureReader(const std::string& path) : _name(path == "-" ? "standard input" : path) {
   std::FILE* file = path == "-" ? stdin : std::fopen(path.c_str(), "rb");
-  if (!file) throw CaptureError("cannot open " + _name + ": " + lastSystemError());
+  if (!file) throw CaptureError("cannot open " + _name + ": " + lastSystemError().message());
   _file = file;
   auto shown = std::make_unique<ShownFile>(file);
-  if (std::ferror(file)) throw CaptureError("cannot read " + _name + ": " + lastSystemError());
+  if (std::ferror(file)) throw CaptureError("cannot read " + _name + ": " + lastSystemError().message());
   if (shown->header.bytes().empty()) throw CaptureError(_name + " is empty, and so no capture");
   const bool isOfLogChannel = shown->header.isOfLogChannel();
   if (isOfLogChannel) shown->header.announceLongRecords();
@@ -180,33 +180,6 @@ std::optional<std::uint64_t> CaptureReader::fileSize() const {
   struct stat status {};
   if (::fstat(::fileno(_file), &status) != 0 || !S_ISREG(status.st_mode)) return std::nullopt;
   return static_cast<std::uint64_t>(status.st_size);
-}
-
-void CaptureWriter::Closer::operator()(pcap* format) const { pcap_close(format); }
-void CaptureWriter::Closer::operator()(pcap_dumper* file) const { pcap_dump_close(file); }
-
-CaptureWriter::CaptureWriter(const std::string& path) : _name(path == "-" ? "standard output" : path) {
-  _format.reset(pcap_open_dead_with_tstamp_precision(logChannelLinkType, longRecordSnapshotLength,
-                                                     PCAP_TSTAMP_PRECISION_NANO));
-  std::FILE* file = path == "-" ? stdout : std::fopen(path.c_str(), "wb");
-  if (!file) throw CaptureError("cannot write " + _name + ": " + lastSystemError());
-  _file.reset(pcap_dump_fopen(_format.get(), file));
-  if (!_file) throw CaptureError("cannot write " + _name + ": " + pcap_geterr(_format.get()));
-  flush();
-}
-
-void CaptureWriter::write(Time time, ByteView message) {
-  pcap_pkthdr header{};
-  header.ts.tv_sec = time.seconds;
-  header.ts.tv_usec = time.nanoseconds;  // which is what the field holds at this precision
-  header.caplen = header.len = static_cast<bpf_u_int32>(message.size());
-  pcap_dump(reinterpret_cast<u_char*>(_file.get()), &header, message.data());
-  flush();
-}
-
-void CaptureWriter::flush() {
-  if (pcap_dump_flush(_file.get()) == 0 && !std::ferror(pcap_dump_file(_file.get()))) return;
-  throw CaptureError("cannot write " + _name + ": " + lastSystemError());
 }
 
 }  // namespace varnel

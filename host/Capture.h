@@ -12,11 +12,10 @@
 #include "base/Time.h"
 
 struct pcap;
-struct pcap_dumper;
 
 namespace varnel {
 
-/// A capture that cannot be read or written. The text is one line that says what, which file, and where it
+/// A capture that cannot be read. The text is one line that says what, which file, and where it
 /// helps what to do.
 class CaptureError : public std::runtime_error {
  public:
@@ -53,29 +52,6 @@ class CaptureReader {
   std::FILE* _file = nullptr;  // belongs to the capture, unless it is standard input
   std::unique_ptr<pcap, Closer> _capture;
   std::size_t _recordsRead = 0;
-};
-
-/// Writes messages to a pcap file of link type USER0 (147) with nanoseconds. What was written is in the file
-/// when the call returns.
-class CaptureWriter {
- public:
-  /// Takes the place of a file that is there; "-" is standard output. Throws CaptureError.
-  explicit CaptureWriter(const std::string& path);
-
-  /// Throws CaptureError when the message cannot be written. Seconds are kept as 32 bits.
-  void write(Time time, ByteView message);
-
- private:
-  struct Closer {
-    void operator()(pcap* format) const;
-    void operator()(pcap_dumper* file) const;
-  };
-
-  void flush();
-
-  std::string _name;
-  std::unique_ptr<pcap, Closer> _format;
-  std::unique_ptr<pcap_dumper, Closer> _file;
 };
 
 }  // namespace varnel

@@ -1,7 +1,5 @@
 #include "host/FilePreferences.h"
 
-#include <QFile>
-#include <QSaveFile>
 #include <optional>
 #include <utility>
 
@@ -37,14 +35,8 @@ std::optional<std::string> writeList(const fs::path& path, const Value& list) {
   std::error_code failure;
   fs::create_directories(path.parent_path(), failure);
   if (failure) return failure.message();
-  const bool isNew = !fs::exists(path, failure);
-  QSaveFile file(QString::fromStdString(path.string()));
-  const bool isWritten =
-      file.open(QIODevice::WriteOnly) &&
-      (!isNew || file.setPermissions(QFile::ReadOwner | QFile::WriteOwner)) &&
-      file.write(reinterpret_cast<const char*>(bytes->data()), static_cast<qint64>(bytes->size())) >= 0 &&
-      file.commit();
-  return isWritten ? std::nullopt : std::optional(file.errorString().toStdString());
+  failure = writeWholeFile(path, *bytes, ReplacedMode::Kept);
+  return failure ? std::optional(failure.message()) : std::nullopt;
 }
 
 }  // namespace

@@ -1,10 +1,10 @@
 #include "host/RootedFiles.h"
 
-#include <cerrno>
 #include <system_error>
 
+#include "base/FitForXml.h"
 #include "base/PropertyList.h"
-#include "host/PrivateFile.h"
+#include "host/WholeFile.h"
 
 namespace varnel {
 
@@ -15,12 +15,12 @@ bool RootedFiles::exists(const std::string& path) const {
 
 FileWriting RootedFiles::writePropertyList(const Value& list, const std::string& path) {
   const std::filesystem::path place = below(path);
-  const auto bytes = writeXmlPropertyList(list);
-  if (!bytes) return {.place = place, .failure = "it has no property-list form"};
+  const auto bytes = writeXmlPropertyList(fitForXml(list));
+  if (!bytes) return {.place = place, .failure = "it is too large, or holds what no property list can"};
   std::error_code ignored;
   const bool isThere = std::filesystem::exists(place, ignored);
-  if (!writePrivateFile(place, *bytes))
-    return {.place = place, .failure = std::generic_category().message(errno)};
+  if (const auto failure = writeWholeFile(place, *bytes))
+    return {.place = place, .failure = failure.message()};
   return {.place = place, .failure = {}, .hasReplaced = isThere};
 }
 

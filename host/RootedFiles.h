@@ -12,7 +12,8 @@ class RootedFiles final : public DeviceFiles {
   explicit RootedFiles(std::filesystem::path root) : _root(std::move(root)) {}
 
   bool exists(const std::string& path) const override;
-  /// A new file is for its owner alone (mode 0600).
+  /// The file is whole or not there, and for its owner alone (mode 0600). What XML cannot hold of a text is
+  /// U+FFFD in it.
   FileWriting writePropertyList(const Value& list, const std::string& path) override;
 
  private:

@@ -17,4 +17,10 @@ TimeZone SystemClock::zoneAt(Time time) const {
   return {static_cast<std::int32_t>(local.tm_gmtoff), local.tm_isdst > 0};
 }
 
+std::chrono::nanoseconds timeSinceBoot() {
+  timespec moment{};
+  ::clock_gettime(CLOCK_BOOTTIME, &moment);
+  return std::chrono::seconds(moment.tv_sec) + std::chrono::nanoseconds(moment.tv_nsec);
+}
+
 }  // namespace varnel

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <chrono>
+
 #include "platform/Clock.h"
 
 namespace varnel {
@@ -11,5 +13,8 @@ class SystemClock final : public Clock {
   Time now() const override;
   TimeZone zoneAt(Time time) const override;
 };
+
+/// The time since the machine was started. It never steps, and goes on while the machine sleeps.
+std::chrono::nanoseconds timeSinceBoot();
 
 }  // namespace varnel

@@ -2,6 +2,7 @@
 
 #include <filesystem>
 #include <optional>
+#include <system_error>
 
 #include "base/Bytes.h"
 
@@ -10,5 +11,25 @@ namespace varnel {
 /// The bytes of a file; nothing when there is no regular file, it cannot be read, or it is larger than
 /// property-list files may be.
 std::optional<Bytes> readWholeFile(const std::filesystem::path& path);
+
+/// The mode of a file that takes the place of another one. Where there was none, it is its owner's alone.
+enum class ReplacedMode {
+  OwnerAlone,  ///< 0600
+  Kept,
+};
+
+/// Writes a file so that it is whole or not there: it is written beside, and takes the place of the old file,
+/// which stays as it is after a failure, once it is on the disk. No folder is made. Nothing is written
+/// through a symbolic link: a link that has the name is an error, and so is whatever else is no regular file,
+/// and a file that may not be written. The error's message is a phrase for users.
+std::error_code writeWholeFile(const std::filesystem::path& path, ByteView bytes,
+                               ReplacedMode mode = ReplacedMode::OwnerAlone);
+
+/// Writes what the user has named for output. A pipe, a terminal and the like (`isStream`) get the bytes as
+/// they come, anything else as a whole file.
+std::error_code writeOutputFile(const std::filesystem::path& path, ByteView bytes);
+
+/// The error of a name that is a symbolic link.
+std::error_code isLinkError();
 
 }  // namespace varnel

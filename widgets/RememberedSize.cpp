@@ -1,7 +1,5 @@
 #include "widgets/RememberedSize.h"
 
-#include <QFile>
-#include <QSaveFile>
 #include <charconv>
 #include <string>
 #include <string_view>
@@ -47,12 +45,8 @@ std::optional<std::string> write(const fs::path& file, const std::string& text) 
   std::error_code failure;
   makeFolder(file.parent_path(), failure);
   if (failure) return failure.message();
-  // Whole or not there, and its owner's alone.
-  QSaveFile saved(QString::fromStdString(file.string()));
-  const bool isWritten = saved.open(QIODevice::WriteOnly) &&
-                         saved.setPermissions(QFile::ReadOwner | QFile::WriteOwner) &&
-                         saved.write(text.data(), static_cast<qint64>(text.size())) >= 0 && saved.commit();
-  return isWritten ? std::nullopt : std::optional(saved.errorString().toStdString());
+  failure = writeWholeFile(file, Bytes(text.begin(), text.end()));
+  return failure ? std::optional(failure.message()) : std::nullopt;
 }
 
 }  // namespace

@@ -1,6 +1,5 @@
 #include "programs/varnel-decode/InputDecoding.h"
 
-#include <cerrno>
 #include <cstdio>
 #include <memory>
 #include <optional>
@@ -10,11 +9,12 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "app/Snapshot.h"
+#include "base/FitForXml.h"
 #include "base/PropertyList.h"
 #include "host/Capture.h"
 #include "host/FileResources.h"
 #include "host/HostLog.h"
-#include "host/PrivateFile.h"
+#include "host/WholeFile.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/MessageStatistics.h"
 #include "programs/varnel-decode/OfflineDecoder.h"
@@ -34,8 +34,8 @@ namespace {
 constexpr int generalError = 1;
 
 void writeFile(const std::string& path, ByteView bytes) {
-  if (!writePrivateFile(path, bytes))
-    throw std::system_error(errno, std::generic_category(), "cannot write " + path);
+  if (const auto failure = writeOutputFile(path, bytes))
+    throw std::system_error(failure, "cannot write " + path);
 }
 
 ByteView bytesOf(const std::string& text) {
@@ -174,9 +174,10 @@ class InputDecoding {
   bool isSaving() const { return _options.snapshotPath || _options.binaryLogPath; }
 
   void writeSnapshotFile(Time time, const Value& items) const {
-    const auto list = writeXmlPropertyList(snapshotContents(time, items, ""));
+    const auto list = writeXmlPropertyList(fitForXml(snapshotContents(time, items, "")));
     if (!list)
-      throw std::runtime_error("the snapshot holds what an XML property list cannot, so it was not written");
+      throw std::runtime_error("the snapshot is larger than a property list may be, so " +
+                               *_options.snapshotPath + " was not written");
     writeFile(*_options.snapshotPath, *list);
   }
 

@@ -8,12 +8,14 @@
 #include "LogGenerator/LogGenerator.h"
 #include "host/BuildInfo.h"
 #include "host/FileResources.h"
+#include "host/ProgramStart.h"
 #include "host/TerminateHandler.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/InputDecoding.h"
 #include "programs/varnel-decode/Jobs.h"
 #include "programs/varnel-decode/Options.h"
+#include "programs/varnel-decode/OutputClash.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/StandardOutput.h"
 #include "programs/varnel-decode/TemplateWatch.h"
@@ -62,7 +64,9 @@ int run(int argumentCount, char** arguments) {
   const auto choice =
       readOptions(argumentCount, arguments, technologies, application.version.value_or("(none)"));
   if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
-  return decodeAll(std::get<Options>(choice), {services, clock, templates, technologies});
+  const auto& options = std::get<Options>(choice);
+  if (const auto clash = outputClash(options)) return mistake(*clash).code;
+  return decodeAll(options, {services, clock, templates, technologies});
 }
 
 }  // namespace
@@ -70,6 +74,7 @@ int run(int argumentCount, char** arguments) {
 }  // namespace varnel
 
 int main(int argumentCount, char** arguments) {
+  varnel::startProgram();
   varnel::installTerminateHandler(varnel::programName);
   // Whoever reads the output may leave early: that is a failed write, not the end by a signal.
   std::signal(SIGPIPE, SIG_IGN);

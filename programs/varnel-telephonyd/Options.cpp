@@ -1,11 +1,13 @@
 #include "programs/varnel-telephonyd/Options.h"
 
+#include <unistd.h>
+
 #include <CLI/CLI.hpp>
-#include <filesystem>
 #include <iostream>
 #include <limits>
 #include <vector>
 
+#include "host/FileIdentity.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
 
@@ -48,9 +50,15 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
       ->type_name("X")
       ->capture_default_str();
   app.add_flag("--loop", options.loops, "start the capture over at its end")->needs(replay);
-  app.add_option("--record", options.recordPath,
-                 "write what is sent to viewers to a capture that can be replayed and decoded")
-      ->type_name("CAPTURE");
+  auto* record =
+      app.add_option("--record", options.recordPath,
+                     "write what is sent to viewers to a capture that can be replayed and decoded; a file "
+                     "that is there and not empty is refused")
+          ->type_name("CAPTURE");
+  app.add_flag_callback(
+         "--overwrite", [&options] { options.existingRecording = ExistingRecording::Replaced; },
+         "have the recording take the place of a file that is there, with its first message")
+      ->needs(record);
   app.add_option("--runtime-dir", options.runtimeFolder,
                  "where viewer and server meet; $XDG_RUNTIME_DIR/varnel unless given")
       ->type_name("DIR");
@@ -61,6 +69,10 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
       ->capture_default_str();
 }
 
+FileIdentity identityOfRecording(const std::string& path) {
+  return path == "-" ? FileIdentity::ofDescriptor(STDOUT_FILENO) : FileIdentity::ofPath(path);
+}
+
 // What is wrong with options that are fine one by one; nothing when they go together.
 std::optional<std::string> conflict(const Options& options) {
   if (!options.simulatedTechnology && !options.replayPath) return "one of --simulate and --replay is needed";
@@ -68,8 +80,8 @@ std::optional<std::string> conflict(const Options& options) {
   if (*options.replayPath == "-") return "--replay needs a file, for it is read once for every viewer";
   const bool isPlayable = options.speed >= slowest && options.speed <= fastest;  // which no NaN is
   if (!isPlayable) return "--speed must lie between 0.001 and 1000000";
-  std::error_code ignored;
-  if (options.recordPath && std::filesystem::equivalent(*options.replayPath, *options.recordPath, ignored))
+  if (options.recordPath &&
+      identityOfRecording(*options.recordPath).isSameFileAs(FileIdentity::ofPath(*options.replayPath)))
     return "--record would overwrite the capture that is to be replayed";
   return std::nullopt;
 }

@@ -6,6 +6,7 @@
 #include <variant>
 
 #include "base/Log.h"
+#include "host/RecordingFile.h"
 
 namespace varnel {
 
@@ -20,6 +21,7 @@ struct Options {
   bool loops = false;
 
   std::optional<std::string> recordPath;  ///< absent: nothing is recorded
+  ExistingRecording existingRecording = ExistingRecording::Refused;
   std::optional<std::string> runtimeFolder;
   int logLevel = logErrorPriority;  ///< the highest priority number that goes to standard error
 };

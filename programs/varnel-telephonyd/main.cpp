@@ -1,6 +1,6 @@
 #include <csignal>
 #include <cstdio>
-#include <optional>
+#include <memory>
 
 #include "host/BuildInfo.h"
 #include "host/Capture.h"
@@ -8,6 +8,7 @@
 #include "host/EventLoopQueue.h"
 #include "host/HostApplication.h"
 #include "host/HostLog.h"
+#include "host/ProgramStart.h"
 #include "host/RuntimeFolder.h"
 #include "host/SignalWatcher.h"
 #include "host/SocketPorts.h"
@@ -15,6 +16,7 @@
 #include "host/TelephonyListener.h"
 #include "host/TerminateHandler.h"
 #include "programs/varnel-telephonyd/Options.h"
+#include "programs/varnel-telephonyd/Recorder.h"
 #include "programs/varnel-telephonyd/ReplaySource.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "programs/varnel-telephonyd/TelephonyServer.h"
@@ -36,28 +38,21 @@ int fail(const std::runtime_error& error) {
   return generalError;
 }
 
-// Writes what is sent to a capture. A failure ends the program.
-class Recorder {
- public:
-  Recorder(const std::optional<std::string>& path, HostApplication& application) : _application(application) {
-    if (path) _writer.emplace(*path);
-  }
-
-  void record(ByteView message) {
-    if (!_writer) return;
-    try {
-      _writer->write(_clock.now(), message);
-    } catch (const CaptureError& error) {
-      _writer.reset();
-      _application.end(fail(error));
-    }
-  }
-
- private:
-  HostApplication& _application;
-  const SystemClock _clock;
-  std::optional<CaptureWriter> _writer;
-};
+// The recording that is asked for; none when that is so. Whoever serves the folder makes it: another server
+// there has its own.
+std::unique_ptr<Recorder> makeRecorder(const Options& options, MainQueue& queue, TelephonyServer& server) {
+  if (!options.recordPath) return nullptr;
+  const auto tellEnd = [&queue, &server](const std::string& why) {
+    tell(why);
+    // A channel is sending just now.
+    queue.after(std::chrono::milliseconds(0), [&server, why] { server.note(why); });
+  };
+  return std::make_unique<Recorder>(Recorder::Setup{.path = *options.recordPath,
+                                                    .existing = options.existingRecording,
+                                                    .now = [] { return SystemClock().now(); },
+                                                    .uptime = timeSinceBoot,
+                                                    .ended = tellEnd});
+}
 
 std::chrono::milliseconds uptime() {
   return std::chrono::duration_cast<std::chrono::milliseconds>(
@@ -83,17 +78,21 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   const std::filesystem::path folder = runtimeFolder(options.runtimeFolder);
   SocketPorts ports(folder);
   EventLoopQueue queue;
-  Recorder recorder(options.recordPath, application);
+  std::unique_ptr<Recorder> recorder;
   const std::string technology = options.simulatedTechnology.value_or(options.replayTechnology);
   TelephonyServer server({.ports = ports,
                           .queue = queue,
                           .uptime = uptime,
                           .technology = technology,
                           .makeSource = [&] { return makeSource(options); },
-                          .messageSent = [&](ByteView message) { recorder.record(message); },
+                          .messageSent =
+                              [&](ByteView message) {
+                                if (recorder) recorder->record(message);
+                              },
                           .tell = tell});
   const TelephonyListener listener(
       folder, [&](std::string_view viewerPortName) { return server.createLogChannel(viewerPortName); });
+  recorder = makeRecorder(options, queue, server);
   tell("serving " + technology + " in " + folder.string() + "; now start varnel" +
        (options.runtimeFolder ? " --runtime-dir " + *options.runtimeFolder : ""));
   const int status = application.run();
@@ -117,6 +116,7 @@ int run(int argumentCount, char** arguments) {
 }  // namespace varnel
 
 int main(int argumentCount, char** arguments) {
+  varnel::startProgram();
   varnel::installTerminateHandler(varnel::programName);
   // Who no longer reads what this program tells does not end its service.
   std::signal(SIGPIPE, SIG_IGN);

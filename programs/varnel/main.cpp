@@ -1,6 +1,7 @@
 #include <iostream>
 
 #include "host/BuildInfo.h"
+#include "host/ProgramStart.h"
 #include "host/TerminateHandler.h"
 #include "programs/varnel/Options.h"
 #include "programs/varnel/TextView.h"
@@ -45,6 +46,7 @@ int run(int argumentCount, char** arguments) {
 }  // namespace varnel
 
 int main(int argumentCount, char** arguments) {
+  varnel::startProgram();
   varnel::installTerminateHandler(varnel::programName);
   return varnel::run(argumentCount, arguments);
 }

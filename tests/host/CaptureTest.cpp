@@ -1,4 +1,5 @@
 #include "host/Capture.h"
+#include "host/CaptureWriter.h"
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
@@ -285,17 +286,17 @@ TEST_F(Capture, WhatIsWrittenIsReadBack) {
 }
 
 TEST_F(Capture, TheWriterWritesNanosecondsAndTheLinkType) {
-  { CaptureWriter writer(path()); }
+  CaptureWriter(path()).write({1, 2}, Bytes{3});
   std::ifstream file(path(), std::ios::binary);
   const std::string header(std::istreambuf_iterator<char>(file), {});
-  ASSERT_EQ(header.size(), 24u);
+  ASSERT_EQ(header.size(), 41u);
   EXPECT_THAT(header, StartsWith(std::string("\x4D\x3C\xB2\xA1\x02\x00\x04\x00", 8)));
-  EXPECT_EQ(header.substr(20), std::string("\x93\x00\x00\x00", 4));
+  EXPECT_EQ(header.substr(20, 4), std::string("\x93\x00\x00\x00", 4));
 }
 
 TEST_F(Capture, AFileThatCannotBeWrittenIsAnError) {
-  EXPECT_THROW(CaptureWriter(path("no/such/folder.pcap")), CaptureError);
-  EXPECT_THROW(CaptureWriter("/dev/full"), CaptureError);
+  EXPECT_THROW(CaptureWriter(path("no/such/folder.pcap")), std::runtime_error);
+  EXPECT_THROW(CaptureWriter("/dev/full").write({1, 2}, Bytes{3}), std::runtime_error);
 }
 
 }  // namespace

@@ -106,6 +106,17 @@ TEST_F(FilePreferencesTest, AFileThatIsThereKeepsItsMode) {
   EXPECT_EQ(fs::status(file()).permissions(), fs::perms(0644));
 }
 
+TEST_F(FilePreferencesTest, NothingIsWrittenThroughALink) {
+  const std::string text = "<plist version=\"1.0\"><dict/></plist>";
+  writeFile(text);
+  fs::rename(file(), root.file("elsewhere.plist"));
+  fs::create_symlink(root.file("elsewhere.plist"), file());
+  setFalse();
+  EXPECT_EQ(contentsOf(root.file("elsewhere.plist")), text);
+  EXPECT_THAT(log.takeTexts(), ElementsAre("<3>Unable to write preferences to " + file() +
+                                           ": it is a symbolic link; name the file that it leads to"));
+}
+
 TEST_F(FilePreferencesTest, NoOtherFileIsLeftBehind) {
   setFalse();
   setFalse();

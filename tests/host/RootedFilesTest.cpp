@@ -6,6 +6,7 @@
 #include <fstream>
 
 #include "tests/support/DictionaryOf.h"
+#include "tests/support/FileSizeLimit.h"
 #include "tests/support/Process.h"
 
 namespace varnel {
@@ -51,6 +52,20 @@ TEST_F(RootedFilesTest, WhereTheFileIsOnThisMachineIsToldAndWhetherItTookTheName
   EXPECT_EQ(first.place, root.file("a.varnel"));
   EXPECT_FALSE(first.hasReplaced);
   EXPECT_TRUE(files.writePropertyList(list, "/a.varnel").hasReplaced);
+}
+
+TEST_F(RootedFilesTest, WhatXmlCannotHoldOfATextIsReplacedInTheFileOnly) {
+  const Value odd = dictionaryOf({{"Description", "a\x01z"}});
+  ASSERT_TRUE(files.writePropertyList(odd, "/a.varnel").isDone());
+  EXPECT_THAT(contentsOf(root.file("a.varnel")), HasSubstr("<string>a\uFFFDz</string>"));
+  EXPECT_EQ(*odd.dictionary()->get("Description").string(), "a\x01z");
+}
+
+TEST_F(RootedFilesTest, AListThatDoesNotFitLeavesTheEarlierOneAndAReason) {
+  std::ofstream(root.file("a.varnel")) << "earlier";
+  const FileSizeLimit limit(100);
+  EXPECT_EQ(files.writePropertyList(list, "/a.varnel").failure, "File too large");
+  EXPECT_EQ(contentsOf(root.file("a.varnel")), "earlier");
 }
 
 TEST_F(RootedFilesTest, NoFolderIsMade) {

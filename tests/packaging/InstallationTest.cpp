@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-#include "host/Capture.h"
+#include "host/CaptureWriter.h"
 #include "tests/support/Process.h"
 
 // What `cmake --install` makes of this build, in a folder that was not known when it was built.

@@ -13,6 +13,7 @@
 #include "base/Log.h"
 #include "base/PropertyList.h"
 #include "host/Capture.h"
+#include "host/CaptureWriter.h"
 #include "programs/varnel/HostServices.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/EventLoop.h"
@@ -54,7 +55,7 @@ class WindowEndToEnd : public testing::Test {
   // Returns when the server can be reached.
   void startServer(Texts source) {
     fs::remove(_serverSocket);  // that of a server that was killed
-    source.insert(source.end(), {"--runtime-dir", _runtime.path(), "--record", _record});
+    source.insert(source.end(), {"--runtime-dir", _runtime.path(), "--record", _record, "--overwrite"});
     _server = std::make_unique<Process>(VARNEL_TELEPHONYD_PROGRAM, source);
     ASSERT_TRUE(eventually([this] { return fs::exists(_serverSocket); }, patience)) << _server->error();
   }

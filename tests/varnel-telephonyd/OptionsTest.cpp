@@ -54,6 +54,13 @@ TEST(TelephonydOptions, AReplayMayBeFasterAndStartOver) {
   EXPECT_EQ(reading.options().speed, 2.5);
   EXPECT_TRUE(reading.options().loops);
   EXPECT_EQ(reading.options().recordPath, "a");
+  EXPECT_EQ(reading.options().existingRecording, ExistingRecording::Refused);
+}
+
+TEST(TelephonydOptions, ARecordingMayReplaceAnEarlierOneWhereThatIsSaid) {
+  const Reading reading = read({"--simulate", "kalvi-lte", "--record", "a", "--overwrite"});
+  EXPECT_EQ(reading.error, "");
+  EXPECT_EQ(reading.options().existingRecording, ExistingRecording::Replaced);
 }
 
 TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
@@ -68,6 +75,8 @@ TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
       {"--replay", "walk.pcap", "--speed", "nan"},
       {"--replay", "-"},
       {"--replay", "/etc/passwd", "--record", "/etc/../etc/passwd"},
+      {"--replay", "/etc/no-such-file", "--record", "/etc/../etc/no-such-file"},
+      {"--simulate", "kalvi-lte", "--overwrite"},
       {"--simulate", "kalvi-lte", "--nonsense"},
       {"--simulate", "kalvi-lte", "--seed", "x"},
   };
@@ -85,7 +94,7 @@ TEST(TelephonydOptions, HelpAndVersionGoToStandardOutput) {
   const Reading help = read({"--help"});
   EXPECT_EQ(std::get<ExitStatus>(help.choice).code, 0);
   for (const char* option : {"--simulate", "--seed", "--replay", "--technology", "--speed", "--loop",
-                             "--record", "--runtime-dir", "--log-level", "--version"})
+                             "--record", "--overwrite", "--runtime-dir", "--log-level", "--version"})
     EXPECT_THAT(help.output, HasSubstr(option));
   const Reading version = read({"--version"});
   EXPECT_EQ(std::get<ExitStatus>(version.choice).code, 0);

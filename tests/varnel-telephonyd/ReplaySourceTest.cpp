@@ -7,6 +7,7 @@
 #include <utility>
 #include <vector>
 
+#include "host/CaptureWriter.h"
 #include "tests/support/RecordingLog.h"
 
 namespace varnel {

@@ -8,6 +8,7 @@
 
 #include "host/Capture.h"
 #include "host/StreamReport.h"
+#include "host/CaptureWriter.h"
 #include "programs/varnel-telephonyd/ReplaySource.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "tests/support/FakeQueue.h"
