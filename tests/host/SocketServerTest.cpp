@@ -35,6 +35,7 @@ class SocketServerTest : public testing::Test {
     connection->setActivityHandler([weak = std::weak_ptr(connection), this] {
       const auto active = weak.lock();
       while (active->nextFrame()) ++_frames;
+      if (const auto deed = std::exchange(_onceRead, nullptr)) deed();
       if (!active->isOpen()) std::erase(_connections, active);
     });
     _connections.push_back(std::move(connection));
@@ -46,9 +47,11 @@ class SocketServerTest : public testing::Test {
     return client.receive();
   }
   bool isServed() {
-    const std::size_t before = _connections.size();
+    const int before = _frames;
     const auto client = SocketConnection::open(path());
-    return client.connection && runUntil([&] { return _connections.size() > before; });
+    if (!client.connection) return false;
+    client.connection->send({0, FrameMark::Message, {}});
+    return runUntil([&] { return _frames > before; });
   }
 
   std::string path() const { return _folder.file("name"); }
@@ -57,6 +60,7 @@ class SocketServerTest : public testing::Test {
   TemporaryFolder _folder;
   std::vector<std::shared_ptr<SocketConnection>> _connections;
   int _frames = 0;
+  std::function<void()> _onceRead;  // done when some bytes were read, before anything else happens
 };
 
 TEST_F(SocketServerTest, TakesSixtyFourConnectionsAndTurnsAwayTheNextOne) {
@@ -111,9 +115,9 @@ TEST_F(SocketServerTest, AFrameThatIsNotWholeInTimeEndsItsConnection) {
   const RawSocket slow = RawSocket::connectedTo(path());
   const RawSocket other = RawSocket::connectedTo(path());
   slow.send(Bytes{5, 0, 0, 0, 0});
-  ASSERT_TRUE(runUntil([&] { return _connections.size() == 2; }));
-  ASSERT_TRUE(runUntil([&] { return _connections.size() == 1; }));
+  ASSERT_TRUE(runUntil([&] { return slow.waits(0ms); }));
   EXPECT_TRUE(slow.receive().empty());
+  EXPECT_EQ(_connections.size(), 1u);
   Bytes whole;
   appendFrame(whole, {0, FrameMark::Message, {}});
   EXPECT_TRUE(other.send(whole));
@@ -141,10 +145,13 @@ TEST_F(SocketServerTest, AReceiverThatIsHeldUpEndsNobodysConnection) {
   Bytes whole;
   appendFrame(whole, {0, FrameMark::Message, Bytes{1, 2, 3}});
   client.send(ByteView(whole).first(4));
-  ASSERT_TRUE(runUntil([&] { return _connections.size() == 1; }));
-  runFor(5ms);
-  client.send(ByteView(whole).subspan(4));
-  QThread::msleep(60);  // held up
+  bool wasHeldUp = false;
+  _onceRead = [&] {
+    client.send(ByteView(whole).subspan(4));
+    QThread::msleep(60);
+    wasHeldUp = true;
+  };
+  ASSERT_TRUE(runUntil([&] { return wasHeldUp; }));
   EXPECT_TRUE(runUntil([&] { return _frames == 1 || _connections.empty(); }));
   EXPECT_EQ(_connections.size(), 1u);
 }
