@@ -1,5 +1,6 @@
 #include "LogGenerator/ClassIndex.h"
 
+#include <algorithm>
 #include <ostream>
 
 #include "base/Log.h"
@@ -7,14 +8,21 @@
 namespace varnel {
 
 void CodeDictionary::subscribe(std::uint32_t code, Base& decoder) {
-  auto& decoders = _subscribers[code];
+  auto& [decoders, shortestTaken] = _subscriptions[code];
+  const std::size_t shortest = decoder.minimumLength(code);
+  shortestTaken = decoders.empty() ? shortest : std::min(shortestTaken, shortest);
   if (decoders.empty()) _codes.push_back(code);
   decoders.push_back(&decoder);
 }
 
+const CodeDictionary::Subscription* CodeDictionary::subscription(std::uint32_t code) const {
+  const auto found = _subscriptions.find(code);
+  return found == _subscriptions.end() ? nullptr : &found->second;
+}
+
 std::span<Base* const> CodeDictionary::subscribers(std::uint32_t code) const {
-  const auto found = _subscribers.find(code);
-  return found == _subscribers.end() ? std::span<Base* const>() : found->second;
+  const Subscription* found = subscription(code);
+  return found ? std::span<Base* const>(found->decoders) : std::span<Base* const>();
 }
 
 std::vector<std::string> CodeDictionary::keys() const {

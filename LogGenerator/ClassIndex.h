@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <iosfwd>
 #include <memory>
@@ -18,8 +19,17 @@ namespace varnel {
 /// which they were first subscribed to.
 class CodeDictionary {
  public:
+  /// Who wants a code.
+  struct Subscription {
+    std::vector<Base*> decoders;
+    /// The shortest packet, header included, that one of them does not drop unread.
+    std::size_t shortestTaken = 0;
+  };
+
   /// A decoder that subscribes twice receives each packet twice.
   void subscribe(std::uint32_t code, Base& decoder);
+  /// Null for a code that nobody wants.
+  const Subscription* subscription(std::uint32_t code) const;
   /// Empty for a code that nobody wants.
   std::span<Base* const> subscribers(std::uint32_t code) const;
   /// The codes as decimal texts.
@@ -27,7 +37,7 @@ class CodeDictionary {
 
  private:
   std::vector<std::uint32_t> _codes;
-  std::unordered_map<std::uint32_t, std::vector<Base*>> _subscribers;
+  std::unordered_map<std::uint32_t, Subscription> _subscriptions;
 };
 
 /// The root of the per-technology indexes, which create every decoder of their technology once.
@@ -41,6 +51,10 @@ class ClassIndex {
 
   /// The decoder of that section; null when there is none.
   Base* getClass(std::string_view sectionName) const;
+  /// Null when nobody wants the code.
+  const CodeDictionary::Subscription* subscription(std::uint32_t code) const {
+    return codeDictionary.subscription(code);
+  }
   /// Empty when nobody wants the code.
   std::span<Base* const> getSubscribers(std::uint32_t code) const { return codeDictionary.subscribers(code); }
   /// Every subscribed code as decimal text.

@@ -1,6 +1,5 @@
 #include "LogGenerator/KLVLogGenerator2.h"
 
-#include <algorithm>
 #include <charconv>
 
 #include "base/Log.h"
@@ -45,18 +44,21 @@ void KLVLogGenerator2::updateState_withData(Dictionary& state, ByteView data) {
 }
 
 void KLVLogGenerator2::updateWithData(ByteView data) {
-  if (data.size() < Packet::headerSize) return;
+  if (data.size() < Packet::headerSize) return countMessageNotDecoded();
   // Kept: the length was tested with the prefix, so a packet behind one may lack two bytes of its header.
   if (data[0] == prefixMark) data = data.subspan(prefixSize);
   const Packet packet(data);
   const std::uint8_t logType = packet.u8(0);
   if (logType != modemLogType && logType != extraLogType) {
     logError("Invalid log type: %x. Dropping.", logType);
-    return;
+    return countMessageNotDecoded();
   }
   const std::uint32_t logCode = packet.u16(logCodeOffset) | (logType == extraLogType ? extraCodeBase : 0);
-  if (!cIndex) return;
-  for (Base* decoder : cIndex->getSubscribers(logCode)) decoder->updateWithData_logCode(packet, logCode);
+  const auto* subscription = cIndex ? cIndex->subscription(logCode) : nullptr;
+  if (!subscription) return countMessageNotDecoded();
+  if (packet.size() < subscription->shortestTaken) [[unlikely]]
+    countMessageNotDecoded();
+  for (Base* decoder : subscription->decoders) decoder->updateWithData_logCode(packet, logCode);
 }
 
 MessageFate KLVLogGenerator2::fateOf(ByteView message) const {
@@ -67,11 +69,19 @@ MessageFate KLVLogGenerator2::fateOf(ByteView message) const {
   const std::uint8_t logType = packet.u8(0);
   if (logType != modemLogType && logType != extraLogType) return {Unknown};
   const std::uint32_t logCode = packet.u16(logCodeOffset) | (logType == extraLogType ? extraCodeBase : 0);
-  const auto subscribers = cIndex ? cIndex->getSubscribers(logCode) : std::span<Base* const>();
-  if (subscribers.empty()) return {Unknown, logCode};
-  const bool isTaken = std::ranges::any_of(
-      subscribers, [&](const Base* decoder) { return packet.size() >= decoder->minimumLength(logCode); });
-  return {isTaken ? Decoded : TooShort, logCode};
+  const auto* subscription = cIndex ? cIndex->subscription(logCode) : nullptr;
+  if (!subscription) return {Unknown, logCode};
+  return {packet.size() < subscription->shortestTaken ? TooShort : Decoded, logCode};
+}
+
+std::optional<std::string> KLVLogGenerator2::missingTemplate() const {
+  if (!_lacksTemplate) return std::nullopt;
+  return pListName + ".plist";
+}
+
+// A display that stands in the state already is another's, and so are its sections.
+bool KLVLogGenerator2::changesDisplayOf(const Dictionary& state) const {
+  return _hasBuiltDisplay || state.get(stateKey::display).isAbsent();
 }
 
 NumberFormats KLVLogGenerator2::numberFormats() const {
@@ -85,7 +95,8 @@ Value KLVLogGenerator2::getDisplayFromState(Dictionary& state) {
   Value displayTemplate = state.get(stateKey::displayTemplate);
   if (displayTemplate.isAbsent()) {
     if (cIndex) displayTemplate = services().resources.propertyList(pListName);
-    if (displayTemplate.isAbsent()) {
+    _lacksTemplate = displayTemplate.isAbsent();
+    if (_lacksTemplate) {
       logError("Cannot load template for display");
       return {};
     }
@@ -97,6 +108,7 @@ Value KLVLogGenerator2::getDisplayFromState(Dictionary& state) {
   const Value display = processTemplate(displayTemplate);
   printDict(display);
   state.set(stateKey::display, display);
+  _hasBuiltDisplay = true;
   state.set(stateKey::extraInfo, Value::ofDictionary());
   return {};
 }

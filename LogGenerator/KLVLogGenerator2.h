@@ -21,6 +21,8 @@ class KLVLogGenerator2 : public KLVLogGenerator {
   Value getStartCommand() const override;
   MessageFate fateOf(ByteView message) const override;
   NumberFormats numberFormats() const override;
+  std::optional<std::string> missingTemplate() const override;
+  bool changesDisplayOf(const Dictionary& state) const override;
 
  protected:
   /// Takes ownership of both. A generator without a template resource has neither: it decodes nothing.
@@ -39,6 +41,8 @@ class KLVLogGenerator2 : public KLVLogGenerator {
 
   std::string pListName;
   std::shared_ptr<ClassIndex> cIndex;
+  bool _lacksTemplate = false;
+  bool _hasBuiltDisplay = false;
 };
 
 }  // namespace varnel

@@ -56,6 +56,12 @@ std::unique_ptr<LogGenerator> LogGenerator::generatorFromTechnology(const Value&
   return nullptr;
 }
 
+std::vector<std::string_view> LogGenerator::technologies() {
+  std::vector<std::string_view> names;
+  for (const Registration& registration : registry) names.push_back(registration.technology);
+  return names;
+}
+
 void LogGenerator::updateHistoryInState(Dictionary& state) const {
   Array* history = state.get(stateKey::history).array();
   if (!history) {

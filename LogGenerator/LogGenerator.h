@@ -2,7 +2,10 @@
 
 #include <cstdint>
 #include <memory>
+#include <optional>
+#include <string>
 #include <string_view>
+#include <vector>
 
 #include "LogGenerator/MessageFate.h"
 #include "LogGenerator/NumberFormats.h"
@@ -36,6 +39,8 @@ class LogGenerator {
   /// none.
   static std::unique_ptr<LogGenerator> generatorFromTechnology(const Value& technology,
                                                                const Services& services);
+  /// The names of the technologies that have a generator.
+  static std::vector<std::string_view> technologies();
 
   /// Folds one incoming message into the state.
   virtual void updateState_withData(Dictionary& state, ByteView data) = 0;
@@ -57,14 +62,23 @@ class LogGenerator {
   /// Collects no raw bytes from now on, for those who save nothing: the records of the history hold empty
   /// data in their place. Nothing happens without a binary log, as here.
   virtual void keepNoRawBytes() {}
+  /// How many of the messages folded in were of another fate than to be decoded.
+  std::uint64_t messagesNotDecoded() const { return _messagesNotDecoded; }
+
+  /// The resource file without which there is no display, when it could not be loaded; absent otherwise.
+  virtual std::optional<std::string> missingTemplate() const { return std::nullopt; }
+  /// False when the state's display was made by an earlier generator and no message changes it any more.
+  virtual bool changesDisplayOf(const Dictionary& /*state*/) const { return true; }
 
  protected:
   /// Appends a snapshot record to the state's "History", which keeps the newest five.
   void updateHistoryInState(Dictionary& state) const;
   const Services& services() const { return _services; }
+  void countMessageNotDecoded() { ++_messagesNotDecoded; }
 
  private:
   const Services _services;
+  std::uint64_t _messagesNotDecoded = 0;
 };
 
 }  // namespace varnel

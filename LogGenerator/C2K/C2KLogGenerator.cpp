@@ -119,11 +119,12 @@ void C2KLogGenerator::processTemplate_storeDisplayIntoDict_storeLookupIntoDict(
   logWarning("Processing the template");
 }
 
-Value C2KLogGenerator::getDisplayFromState(Dictionary& state) const {
+Value C2KLogGenerator::getDisplayFromState(Dictionary& state) {
   if (const Value& display = state.get(stateKey::display); !display.isAbsent()) return display;
   Value displayTemplate = state.get(stateKey::displayTemplate);
   if (displayTemplate.isAbsent()) displayTemplate = services().resources.propertyList(templateName);
-  if (!displayTemplate.dictionary()) {
+  _lacksTemplate = !displayTemplate.dictionary();
+  if (_lacksTemplate) {
     logError("Cannot load C2K template for display");
     return {};
   }
@@ -140,7 +141,7 @@ Value C2KLogGenerator::getDisplayFromState(Dictionary& state) const {
 
 void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView message, c2k::Lookup& lookup,
                                                            c2k::State& state) {
-  if (message.size() < Packet::headerSize) return;
+  if (message.size() < Packet::headerSize) return countMessageNotDecoded();
   // Kept: the length was tested with the prefix, so a packet behind one may lack two bytes of its header.
   if (message[0] == prefixMark) message = message.subspan(prefixSize);
   const Packet packet(message);
@@ -149,8 +150,12 @@ void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView message, c2k
   if (logType != modemLogType) logError("Invalid log type: %x. Dropping.", logType);
   const std::uint32_t logCode = packet.u16(logCodeOffset) | (logType == extraLogType ? extraCodeBase : 0);
   const auto kind = std::ranges::find(packetKinds, logCode, &PacketKind::logCode);
-  if (kind == std::end(packetKinds)) return;
-  if (hasRightLength(*kind, packet)) kind->decode(packet, state, lookup);
+  if (kind == std::end(packetKinds)) return countMessageNotDecoded();
+  if (hasRightLength(*kind, packet)) {
+    kind->decode(packet, state, lookup);
+  } else {
+    countMessageNotDecoded();
+  }
   collect(message);
 }
 
@@ -178,6 +183,15 @@ MessageFate C2KLogGenerator::fateOf(ByteView message) const {
   if (packet.size() < kind->length) return {TooShort, logCode};
   const bool isTooLong = kind->rule == Length::Exact && packet.size() > kind->length;
   return {isTooLong ? TooLong : Decoded, logCode};
+}
+
+std::optional<std::string> C2KLogGenerator::missingTemplate() const {
+  return _lacksTemplate ? std::optional(std::string(templateName) + ".plist") : std::nullopt;
+}
+
+// The lookup outlives a reconnection like the display, so another generator of this kind goes on with it.
+bool C2KLogGenerator::changesDisplayOf(const Dictionary& state) const {
+  return state.get(stateKey::display).isAbsent() || !state.get(stateKey::lookup).isAbsent();
 }
 
 }  // namespace varnel

@@ -19,6 +19,8 @@ class C2KLogGenerator final : public KLVLogGenerator {
   Value getStartCommand() const override;
   MessageFate fateOf(ByteView message) const override;
   NumberFormats numberFormats() const override;
+  std::optional<std::string> missingTemplate() const override;
+  bool changesDisplayOf(const Dictionary& state) const override;
 
   /// Fills the display, a dictionary, with the shape of the template, and the lookup with an array for each
   /// variable: a placement {"key": the row, "dict": the dictionary of the display that holds the row} for
@@ -29,12 +31,13 @@ class C2KLogGenerator final : public KLVLogGenerator {
 
  private:
   /// The display in the state, which is made with its lookup on first use; absent without a template.
-  Value getDisplayFromState(Dictionary& state) const;
+  Value getDisplayFromState(Dictionary& state);
   /// Decodes one message. Packets of the known log codes are kept for the binary log, decodable or not.
   void updateFromLog_usingLookup_usingState(ByteView message, c2k::Lookup& lookup, c2k::State& state);
 
   c2k::StateSlots _slots;
   c2k::Lookup _lookup;  // made from the one in the state
+  bool _lacksTemplate = false;
 };
 
 }  // namespace varnel

@@ -92,6 +92,31 @@ TEST_F(MessageFateTest, CDMAPacketsOfAnotherLogTypeAreDecodedAllTheSame) {
   EXPECT_EQ(ofCDMA(typed(0xFF, 0x108A)), known(Unknown, 0xFF108A));
 }
 
+TEST_F(MessageFateTest, GeneratorsCountTheMessagesOfAnotherFateThanToBeDecoded) {
+  services.resources.add("LTE", Value::ofDictionary());
+  const std::vector<Bytes> messages = {Bytes(12, 0x01),
+                                       typed(2, 0xB0C1),
+                                       PacketBuilder(0xB0C0, 40).bytes(),
+                                       PacketBuilder(0xB17F, 32).bytes(),
+                                       PacketBuilder(0xB17F, 33).bytes(),
+                                       PacketBuilder(0xB179, 13).bytes(),
+                                       PacketBuilder(0xFF0001, 13).bytes(),
+                                       PacketBuilder(0x1183, 49).bytes(),
+                                       PacketBuilder(0x1183, 50).bytes(),
+                                       PacketBuilder(0x1183, 51).bytes()};
+  for (const auto name : {technology::kalviLTE, technology::kalviCDMA}) {
+    const auto generator = LogGenerator::generatorFromTechnology(name, services.services);
+    Dictionary state;
+    std::uint64_t expected = 0;
+    for (const Bytes& message : messages) {
+      if (generator->fateOf(message).outcome != Decoded) ++expected;
+      generator->updateState_withData(state, message);
+      EXPECT_EQ(generator->messagesNotDecoded(), expected) << name;
+    }
+    EXPECT_EQ(expected, name == technology::kalviLTE ? 8u : 9u);
+  }
+}
+
 TEST_F(MessageFateTest, ObjectsAreDecodedAndHaveNoLogCode) {
   EXPECT_EQ(fate(technology::ifxGSM, {}), nameless(Decoded));
   EXPECT_EQ(fate(technology::ifxGSM, {'<'}), nameless(Decoded));

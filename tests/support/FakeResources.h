@@ -16,6 +16,8 @@ class FakeResources final : public Resources {
   /// Adds a property list by its path below the resource folder, without the extension: "LTE", "folder/LTE".
   void add(std::string_view path, Value list) { _lists[std::string(path) + ".plist"] = std::move(list); }
 
+  void remove(std::string_view path) { _lists.erase(std::string(path) + ".plist"); }
+
   Value propertyList(std::string_view name) const override {
     _requests.emplace_back(name);
     const std::string file = std::string(name) + ".plist";

@@ -43,4 +43,9 @@ std::unique_ptr<LogGenerator> UTRANLogGenerator::generator(const Services& servi
   return std::make_unique<UTRANLogGenerator>(services);
 }
 
+// Whatever its name was to be: this is the one that ships.
+std::optional<std::string> UTRANLogGenerator::missingTemplate() const {
+  return KLVLogGenerator2::missingTemplate() ? std::optional("UTRAN.plist") : std::nullopt;
+}
+
 }  // namespace varnel

@@ -10,6 +10,7 @@ class UTRANLogGenerator final : public KLVLogGenerator2 {
  public:
   explicit UTRANLogGenerator(const Services& services);
   static std::unique_ptr<LogGenerator> generator(const Services& services);
+  std::optional<std::string> missingTemplate() const override;
 
  private:
   UTRANLogGenerator(const Services& services, const std::string& listName);
