@@ -62,6 +62,12 @@ std::string asSentence(std::string_view text) {
 
 }  // namespace
 
+LinkReport LinkMonitor::linkReport() const {
+  LinkReport report = _report;
+  report.place = _folder.string();
+  return report;
+}
+
 void LinkMonitor::tell(std::string_view what, std::string_view whatToDo) {
   _report.trouble = asSentence(what);
   if (const auto at = _report.trouble.find('%'); at != std::string::npos)

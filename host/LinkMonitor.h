@@ -14,7 +14,7 @@ class LinkMonitor final : public LinkReports {
  public:
   explicit LinkMonitor(std::filesystem::path runtimeFolder) : _folder(std::move(runtimeFolder)) {}
 
-  LinkReport linkReport() const override { return _report; }
+  LinkReport linkReport() const override;
 
   /// Another process has the name of this viewer's port.
   void portNameIsTaken();

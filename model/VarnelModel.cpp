@@ -16,6 +16,8 @@ constexpr std::chrono::milliseconds sendTimeout = 1s;
 constexpr std::chrono::milliseconds replyTimeout = 1s;
 constexpr std::chrono::milliseconds refreshInterval = 2s;
 constexpr std::chrono::milliseconds retryDelay = 5s;
+// Those that are known are shorter; a strange server may name anything.
+constexpr std::size_t longestTechnologyKept = 64;
 
 }  // namespace
 
@@ -39,31 +41,39 @@ void VarnelModel::restartMonitorLater() { _services.queue.async(whileAlive(&Varn
 
 void VarnelModel::startMonitor() {
   if (_displayUpdateTimer) return;
-  if (!startStream()) retryLater();
+  if (startStream()) return _observer.linkWasOpened();
+  retryLater();
+  _observer.linkWasLookedAt();
 }
 
 bool VarnelModel::startStream() {
+  _streamFailure = failureToStart();
+  return _streamFailure == StreamFailure::None;
+}
+
+StreamFailure VarnelModel::failureToStart() {
   if (!createPorts()) {
     logError("Could not create the ports necessary");
-    return false;
+    return StreamFailure::Link;
   }
+  if (!_logGenerator) _technology.clear();
   configureGenerator();
   if (!_logGenerator) {
     logError("No log generator technology works");
-    return false;
+    return _technology.empty() ? StreamFailure::NoTechnology : StreamFailure::UnknownTechnology;
   }
   const auto command = _services.writePropertyList(_logGenerator->getStartCommand());
   if (!command) {
     logError(" Could not generate PLIST");
-    return false;
+    return StreamFailure::Command;
   }
   if (const auto sent = send(*command, std::nullopt); sent.status != 0) {
     logError(" ***** Could not send the START command (got error=%d)", sent.status);
-    return false;
+    return StreamFailure::Command;
   }
   logError("Starting the display update timer");
   _displayUpdateTimer = _services.queue.repeating(refreshInterval, whileAlive(&VarnelModel::refresh));
-  return true;
+  return StreamFailure::None;
 }
 
 void VarnelModel::retryLater() {
@@ -163,11 +173,24 @@ void VarnelModel::configureGenerator() {
   }
   _logGenerator = LogGenerator::generatorFromTechnology(technology, _services.generator);
   logError("Got log generated: %p", static_cast<const void*>(_logGenerator.get()));
+  _technology = technology.string() ? technology.string()->substr(0, longestTechnologyKept) : std::string();
+  noteWhetherDisplayStands();
+}
+
+// The state outlives the generators, and a display in it may be out of reach of a new one.
+void VarnelModel::noteWhetherDisplayStands() {
+  if (!_logGenerator) return;
+  if (_logGenerator->changesDisplayOf(_state)) {
+    _displayTechnology = _technology;
+    _standingDisplay.reset();
+  } else if (!_standingDisplay) {
+    _standingDisplay = {_displayTechnology, _services.generator.clock.now()};
+  }
 }
 
 void VarnelModel::refresh() {
   if (isConnected() && !_sendPort->isValid()) _recvPort->invalidate();
-  if (!_updated) return;
+  if (!_updated) return _observer.linkWasLookedAt();
   _updated = false;
   _nodes.reset();
   _nodesByPath.reset();
@@ -201,6 +224,19 @@ std::shared_ptr<const VarnelModelNode> VarnelModel::nodeAtPath(const std::string
   if (!_nodesByPath) return nullptr;
   const auto found = _nodesByPath->find(path);
   return found == _nodesByPath->end() ? nullptr : found->second;
+}
+
+bool VarnelModel::hasHistory() const {
+  const Array* history = _state.get(stateKey::history).array();
+  return history && !history->empty();
+}
+
+std::optional<std::string> VarnelModel::missingTemplate() const {
+  return _logGenerator ? _logGenerator->missingTemplate() : std::nullopt;
+}
+
+std::uint64_t VarnelModel::messagesNotDecoded() const {
+  return _logGenerator ? _logGenerator->messagesNotDecoded() : 0;
 }
 
 Value VarnelModel::getSaveContents() const {

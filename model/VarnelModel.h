@@ -4,10 +4,12 @@
 #include <functional>
 #include <memory>
 #include <optional>
+#include <string>
 #include <string_view>
 
 #include "LogGenerator/LogGenerator.h"
 #include "model/VarnelModelNode.h"
+#include "platform/LinkReports.h"
 #include "platform/MainQueue.h"
 #include "platform/MessagePort.h"
 #include "platform/TelephonyService.h"
@@ -23,6 +25,26 @@ class VarnelModelObserver {
   /// The link to the telephony service was lost and has been started anew: `isConnected` may say otherwise
   /// than before, while the tree stays what it is.
   virtual void linkWasLost() {}
+  /// The stream has started: `isConnected` says so, while the tree stays what it is until data arrives.
+  virtual void linkWasOpened() {}
+  /// The link was looked at and brought no data, or could not be opened: what is to be told of it may be
+  /// another thing than before.
+  virtual void linkWasLookedAt() {}
+};
+
+/// A display that no message changes any more, since a new link's generator cannot write to it.
+struct StandingDisplay {
+  std::string technology;  ///< whose display it is
+  Time since;              ///< when the new link was opened
+};
+
+/// Why the stream did not start.
+enum class StreamFailure {
+  None,               ///< it did, or was not tried yet
+  Link,               ///< there is no link to the telephony service
+  NoTechnology,       ///< the service does not tell its technology
+  UnknownTechnology,  ///< no generator is there for it
+  Command,            ///< the start command could not be sent
 };
 
 /// What the model may ask of its host. Everything outlives the model.
@@ -33,6 +55,8 @@ struct ModelServices {
   Services generator;
   /// Serialises a command; nothing when it cannot.
   std::function<std::optional<Bytes>(const Value& command)> writePropertyList;
+  /// What the host knows of the link; null when it knows nothing. The model itself does not ask.
+  const LinkReports* linkReports = nullptr;
 };
 
 /// The link to the telephony service and the display tree made of what arrives on it.
@@ -71,11 +95,26 @@ class VarnelModel {
   /// are shown all the same.
   std::uint64_t messagesLeftOutOfLog() const;
 
+  /// How the last attempt to start the stream went.
+  StreamFailure streamFailure() const { return _streamFailure; }
+  /// The technology that the service named last, cut to 64 bytes; empty before it has named one.
+  const std::string& technology() const { return _technology; }
+  /// Absent while what arrives changes the display, and while there is none.
+  const std::optional<StandingDisplay>& standingDisplay() const { return _standingDisplay; }
+  /// True once a display has been made of what arrived.
+  bool hasHistory() const;
+  /// The file without which there is no display, when it could not be loaded; absent otherwise.
+  std::optional<std::string> missingTemplate() const;
+  /// How many messages since the link was opened no decoder took, because of their log code or length.
+  std::uint64_t messagesNotDecoded() const;
+
  private:
   bool createPorts();
   void destroyPorts();
   void configureGenerator();
   bool startStream();
+  StreamFailure failureToStart();
+  void noteWhetherDisplayStands();
   void retryLater();
   void updateObserver();
   void localPortWasInvalidated(const LocalPort* port);
@@ -90,6 +129,10 @@ class VarnelModel {
   std::unique_ptr<RemotePort> _sendPort;
   std::unique_ptr<RepeatingTimer> _displayUpdateTimer;
   bool _updated = false;
+  StreamFailure _streamFailure = StreamFailure::None;
+  std::string _technology;
+  std::string _displayTechnology;  // that of the generator that made the display, or is to make it
+  std::optional<StandingDisplay> _standingDisplay;
   std::unique_ptr<LogGenerator> _logGenerator;
   Dictionary _state;
   std::shared_ptr<const VarnelModelNode> _nodes;

@@ -10,6 +10,8 @@ struct LinkReport {
   /// One sentence: why the last attempt to connect failed, where it looked, and what to type. Empty after one
   /// that went well, and before the first.
   std::string trouble;
+  /// Where viewer and server meet, by the name that users have for it. Empty when there is no such name.
+  std::string place;
   /// One sentence that the server said last about where its messages come from, as that a replay has ended.
   /// Empty when it said none since the link was opened.
   std::string serverNote;
