@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/DeviceFiles.h"
+
 namespace varnel {
 
 /// What panes and the save screen may ask of the application.
@@ -12,6 +14,8 @@ class SaveControl {
   virtual void showSaveView() = 0;
   /// Has the main queue close the save screen, once whoever asks for it has returned.
   virtual void closeSaveViewLater() = 0;
+  /// The save screen has written a snapshot, or could not.
+  virtual void snapshotWasWritten(const FileWriting& writing) = 0;
 };
 
 }  // namespace varnel

@@ -26,12 +26,13 @@ FileWriting writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& c
   return writing;
 }
 
-void saveSnapshotWithoutDescription(DeviceFiles& files, const Clock& clock, const Value& saveContents) {
+std::optional<FileWriting> saveSnapshotWithoutDescription(DeviceFiles& files, const Clock& clock,
+                                                          const Value& saveContents) {
   if (!files.exists(std::string(internalDeviceMarker))) {
     logError("This device has no marker that allows snapshots: nothing is saved");
-    return;
+    return std::nullopt;
   }
-  writeSnapshot(files, clock, snapshotContents(clock.now(), saveContents, ""));
+  return writeSnapshot(files, clock, snapshotContents(clock.now(), saveContents, ""));
 }
 
 }  // namespace varnel

@@ -24,7 +24,8 @@ Value snapshotContents(Time created, const Value& saveContents,
 FileWriting writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& contents);
 
 /// Writes these save contents at once with an empty description, where the device allows snapshots; elsewhere
-/// a line in the log says why not.
-void saveSnapshotWithoutDescription(DeviceFiles& files, const Clock& clock, const Value& saveContents);
+/// a line in the log says why not, and nothing is returned.
+std::optional<FileWriting> saveSnapshotWithoutDescription(DeviceFiles& files, const Clock& clock,
+                                                          const Value& saveContents);
 
 }  // namespace varnel

@@ -12,6 +12,9 @@ namespace {
 // Kept: without the dots that every later status of that kind has.
 constexpr std::string_view firstStatus = "Connecting";
 
+constexpr std::string_view applicationName = "Varnel";
+constexpr std::string_view titleSeparator = " — ";
+
 constexpr std::string_view homeScreenDomain = "com.orvane.dockhall";
 constexpr std::string_view signalStrengthKey = "DHShowGSMRSSI";
 
@@ -22,7 +25,10 @@ VarnelPaneController& varnelPane(PaneController& controller) {
 
 }  // namespace
 
-VarnelApp::VarnelApp(const Host& host) : _host(host), _alive(std::make_shared<VarnelApp*>(this)) {}
+VarnelApp::VarnelApp(const Host& host)
+    : _host(host),
+      _notices(host.model, host.wayToStartOver, [this] { showNotice(); }),
+      _alive(std::make_shared<VarnelApp*>(this)) {}
 
 VarnelApp::~VarnelApp() = default;
 
@@ -30,6 +36,7 @@ void VarnelApp::applicationDidFinishLaunching() {
   getSaveButtonPref();
   setWindow(_host.userInterface.makeWindow(_host.userInterface.screenBounds()));
   _model = std::make_unique<VarnelModel>(_host.model, *this);
+  _notices.begin(*_model);
   setUpdateMessage(std::string(notConnectedStatus));
   _dateFormatter.emplace(updateStatusPattern);
 
@@ -39,28 +46,42 @@ void VarnelApp::applicationDidFinishLaunching() {
   _navController->setDelegate(this);
   _window->setRoot(*_navController);
   _window->makeKeyAndVisible();
+  showWindowTitle();
 
   _model->restartMonitorLater();
 }
 
-void VarnelApp::showFirstStatus(VarnelPaneController& root) { root.setStatus_isLoading(firstStatus, true); }
+void VarnelApp::showFirstStatus(VarnelPaneController& root) {
+  _showsFirstStatus = true;
+  root.setStatus_isLoading(firstStatus, true);
+}
 
 void VarnelApp::startOver() {
   if (!_model) return;
   closeSaveView();
   setUpdateMessage(std::string(notConnectedStatus));
+  _notices.end();
   _model.reset();  // one model at a time has the channel
   _model = std::make_unique<VarnelModel>(_host.model, *this);
+  _notices.begin(*_model);
   const auto root = _navController->controllers().front();
   _navController->popTo(*root, Animation::None);
   varnelPane(*root).reloadWithNode(nullptr);
   showFirstStatus(varnelPane(*root));
+  showNotice();
+  showWindowTitle();
   _model->restartMonitorLater();
 }
 
 void VarnelApp::save() {
   if (!_model) return;
-  saveSnapshotWithoutDescription(_host.files, _host.model.generator.clock, _model->getSaveContents());
+  const auto writing =
+      saveSnapshotWithoutDescription(_host.files, _host.model.generator.clock, _model->getSaveContents());
+  if (writing) {
+    _notices.snapshotWasWritten(*writing);
+  } else {
+    _notices.snapshotIsNotAllowed();
+  }
 }
 
 void VarnelApp::getSaveButtonPref() {
@@ -74,12 +95,41 @@ void VarnelApp::afterUpdates(unsigned count, std::function<void()> task) {
 void VarnelApp::updateViewControllerFromModel() {
   reloadPanes();
   if (isConnected()) setUpdateMessage(updateMessageForNow());
-  updateStatusForViewController(varnelPane(*_navController->topController()));
+  _showsFirstStatus = false;
+  updateStatusForViewController(topPane());
+  showWindowTitle();
+  linkWasLookedAt();
   _awaitedUpdates.countOne();
 }
 
 void VarnelApp::linkWasLost() {
-  if (_navController) updateStatusForViewController(varnelPane(*_navController->topController()));
+  if (_navController) updateStatusForViewController(topPane());
+  linkWasLookedAt();
+}
+
+void VarnelApp::linkWasOpened() {
+  if (!_showsFirstStatus) updateStatusForViewController(topPane());
+  showWindowTitle();
+  linkWasLookedAt();
+}
+
+void VarnelApp::linkWasLookedAt() {
+  if (_notices.update()) showNotice();
+}
+
+VarnelPaneController& VarnelApp::topPane() const { return varnelPane(*_navController->topController()); }
+
+void VarnelApp::showNotice() {
+  if (_navController) _navController->setNotice(_notices.text());
+}
+
+void VarnelApp::showWindowTitle() {
+  if (!_window || !_model) return;
+  std::string title;
+  // The root pane is no section.
+  if (_navController->controllers().size() > 1) title.append(topPane().title()).append(titleSeparator);
+  if (!_model->technology().empty()) title.append(_model->technology()).append(titleSeparator);
+  _window->setTitle(title.append(applicationName));
 }
 
 void VarnelApp::reloadPanes() {
@@ -113,6 +163,7 @@ void VarnelApp::updateStatusForViewController(VarnelPaneController& pane) {
 void VarnelApp::navigationController_willShowViewController_animated(NavigationStack&,
                                                                      PaneController& controller, Animation) {
   updateStatusForViewController(varnelPane(controller));
+  showWindowTitle();
 }
 
 void VarnelApp::showSaveView() {
@@ -120,7 +171,9 @@ void VarnelApp::showSaveView() {
   const VarnelSaveViewController::Host host{_host.userInterface, _host.model.generator.resources, _host.files,
                                             _host.model.generator.clock, *this};
   setSaveViewController(VarnelSaveViewController::initWithSaveHistory(host, _model->getSaveContents()));
-  if (_saveViewController) _navController->present(_saveViewController, Animation::Animated);
+  if (!_saveViewController) return;
+  _navController->present(_saveViewController, Animation::Animated);
+  _notices.snapshotIsWanted();
 }
 
 void VarnelApp::closeSaveView() {
@@ -141,6 +194,7 @@ void VarnelApp::setSaveViewController(std::shared_ptr<VarnelSaveViewController> 
 
 void VarnelApp::applicationWillTerminate() {
   _setGSMRSSI(false);
+  _notices.end();
   setUpdateMessage(std::nullopt);
   _dateFormatter.reset();
   setSaveViewController(nullptr);

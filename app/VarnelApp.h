@@ -7,6 +7,7 @@
 
 #include "app/AwaitedUpdates.h"
 #include "app/DateFormatter.h"
+#include "app/NoticeKeeper.h"
 #include "app/SaveControl.h"
 #include "app/VarnelPaneController.h"
 #include "app/VarnelSaveViewController.h"
@@ -27,6 +28,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
     DeviceFiles& files;
     Preferences& preferences;
     UserInterface& userInterface;
+    /// What users do to start over, as notices tell them.
+    std::string wayToStartOver = "press Ctrl+R";
   };
 
   explicit VarnelApp(const Host& host);
@@ -50,6 +53,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void getSaveButtonPref();
   void updateViewControllerFromModel() override;
   void linkWasLost() override;
+  void linkWasOpened() override;
+  void linkWasLookedAt() override;
   /// Shows the present status in that pane.
   void updateStatusForViewController(VarnelPaneController& pane);
   void navigationController_willShowViewController_animated(NavigationStack& stack,
@@ -59,6 +64,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   /// Closes the save screen, if it is open.
   void closeSaveView();
   void closeSaveViewLater() override;
+  void snapshotWasWritten(const FileWriting& writing) override { _notices.snapshotWasWritten(writing); }
 
   /// Null before launch and after the end.
   Window* window() const { return _window.get(); }
@@ -76,6 +82,9 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void showFirstStatus(VarnelPaneController& root);
   bool isConnected() const { return _model && _model->isConnected(); }
   void reloadPanes();
+  VarnelPaneController& topPane() const;
+  void showNotice();
+  void showWindowTitle();
   std::string updateMessageForNow() const;
   /// Writes the preference that is shared with the home-screen application.
   void _setGSMRSSI(bool value);
@@ -85,6 +94,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   std::optional<std::string> _updateMessage;
   std::optional<DateFormatter> _dateFormatter;
   AwaitedUpdates _awaitedUpdates;
+  NoticeKeeper _notices;
+  bool _showsFirstStatus = true;
   std::unique_ptr<VarnelModel> _model;
   std::shared_ptr<VarnelSaveViewController> _saveViewController;
   std::unique_ptr<NavigationStack> _navController;

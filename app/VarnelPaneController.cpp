@@ -116,8 +116,10 @@ VarnelPaneController::Node VarnelPaneController::childAt(const IndexPath& path) 
   return _nodes->childNodes()->at(path.row);
 }
 
-void VarnelPaneController::showTitle() {
-  _pane->setTitle(_nodes ? std::string_view(_nodes->displayName()) : titleWithoutNode);
+std::string_view VarnelPaneController::title() const {
+  return _nodes ? std::string_view(_nodes->displayName()) : titleWithoutNode;
 }
+
+void VarnelPaneController::showTitle() { _pane->setTitle(title()); }
 
 }  // namespace varnel

@@ -24,6 +24,8 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
 
   /// The node's path in the tree, "/" for the root.
   const std::string& path() const { return _keyPath; }
+  /// What its title bar says: the name of the node, "Varnel" without one.
+  std::string_view title() const;
   /// Shows the status, none as an empty text, and whether something is awaited.
   void setStatus_isLoading(std::optional<std::string_view> status, bool isLoading);
   /// Shows another node, or none.

@@ -70,7 +70,9 @@ void VarnelSaveViewController::viewWillAppear(Animation) {
 void VarnelSaveViewController::savePressed() {
   const auto description = _saveDescription ? _saveDescription->text() : std::nullopt;
   const Value contents = snapshotContents(_timeStamp, _saveHistory, description);
-  if (!writeSnapshot(_host.files, _host.clock, contents).isDone())
+  const FileWriting writing = writeSnapshot(_host.files, _host.clock, contents);
+  _host.saveControl.snapshotWasWritten(writing);
+  if (!writing.isDone())
     _host.userInterface.showAlert({"File Error", "Unable to write file to disk", "Close"});
   _host.saveControl.closeSaveViewLater();
 }

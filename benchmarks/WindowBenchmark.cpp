@@ -22,6 +22,7 @@ class NoSaving : public SaveControl {
   bool allowSaveButton() const override { return true; }
   void showSaveView() override {}
   void closeSaveViewLater() override {}
+  void snapshotWasWritten(const FileWriting&) override {}
 };
 
 // A pane of so many leaves whose values hold that number.

@@ -20,6 +20,9 @@ class KeyWatcher final {
   /// Leaves the terminal as it was.
   ~KeyWatcher();
 
+  /// False where no key will ever come.
+  bool isWatching() const { return _notifier != nullptr; }
+
  private:
   void takeKeys() noexcept;
 

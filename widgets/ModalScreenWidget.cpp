@@ -44,6 +44,7 @@ ModalScreenWidget::ModalScreenWidget(const ScreenLayout& layout, Actions actions
   auto* column = new QVBoxLayout(rows);
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(qRound(layout.spacing));
+  column->addWidget(&_notice);
   for (const auto& row : layout.rows) addRow(*column, row, qRound(layout.spacing));
   column->addStretch(0);
 }

@@ -7,6 +7,7 @@
 
 #include "platform/ui/ModalScreen.h"
 #include "platform/ui/ScreenLayout.h"
+#include "widgets/NoticeWidget.h"
 #include "widgets/TableWidget.h"
 #include "widgets/TextFieldWidget.h"
 
@@ -27,6 +28,8 @@ class ModalScreenWidget final : public QWidget, public ModalScreen {
   void enter(QWidget& below);
   /// Goes from it and calls no action any more.
   void leave();
+  /// What it tells above its rows.
+  NoticeWidget& notice() { return _notice; }
   /// Gives the keyboard to the first field, else to the screen itself.
   void takeKeyboard();
 
@@ -41,6 +44,7 @@ class ModalScreenWidget final : public QWidget, public ModalScreen {
   QWidget* makeButton(const ScreenElement& element);
   void perform(const std::string& action);
 
+  NoticeWidget _notice;
   Actions _actions;
   std::string _backgroundAction;
   std::map<std::string, TableWidget*, std::less<>> _tables;           // by outlet

@@ -52,6 +52,7 @@ void NavigationWidget::adopt(std::size_t index) {
   pane.setParent(this);
   pane.setGeometry(rect());
   pane.toolbar().setVisible(_showsToolbar);
+  pane.notice().setText(_notice);
   pane.header().setBackAction([this] { goBack(); });
   showWayBack(index);
   pane.setTitleObserver([this, index] {
@@ -129,6 +130,12 @@ void NavigationWidget::showToolbar() {
   for (const auto& controller : _controllers) paneOf(*controller).toolbar().show();
 }
 
+void NavigationWidget::setNotice(std::string_view text) {
+  _notice = text;
+  for (const auto& controller : _controllers) paneOf(*controller).notice().setText(_notice);
+  if (ModalScreenWidget* screen = modalScreen()) screen->notice().setText(_notice);
+}
+
 void NavigationWidget::present(std::shared_ptr<ModalController> controller, Animation animation) {
   dismiss(Animation::None);
   const Animation shownAs = isShownHappening(*this, animation) ? animation : Animation::None;
@@ -136,6 +143,7 @@ void NavigationWidget::present(std::shared_ptr<ModalController> controller, Anim
   _modal = std::move(controller);
   ModalScreenWidget& screen = screenOf(*_modal);
   screen.enter(*this);
+  screen.notice().setText(_notice);
   _modal->viewDidLoad();
   _modal->viewWillAppear(shownAs);
   screen.show();

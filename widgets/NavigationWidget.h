@@ -3,6 +3,8 @@
 #include <QPointer>
 #include <QWidget>
 #include <memory>
+#include <string>
+#include <string_view>
 #include <vector>
 
 #include "platform/ui/NavigationStack.h"
@@ -27,6 +29,7 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   void push(std::shared_ptr<PaneController> controller, Animation animation) override;
   void popTo(const PaneController& controller, Animation animation) override;
   void showToolbar() override;
+  void setNotice(std::string_view text) override;
   void present(std::shared_ptr<ModalController> controller, Animation animation) override;
   void dismiss(Animation animation) override;
 
@@ -58,6 +61,7 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   std::shared_ptr<ModalController> _modal;
   NavigationStackDelegate* _delegate = nullptr;
   bool _showsToolbar = false;
+  std::string _notice;
   QPointer<SlideOverlay> _overlay;
 };
 

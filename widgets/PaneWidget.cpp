@@ -9,6 +9,7 @@ PaneWidget::PaneWidget() : _column(this) {
   _column.setContentsMargins(0, 0, 0, 0);
   _column.setSpacing(0);
   _column.addWidget(&_header);
+  _column.addWidget(&_notice);
   _column.addWidget(&_table, 1);
   _column.addWidget(&_toolbar);
   _toolbar.hide();

@@ -6,12 +6,13 @@
 
 #include "platform/ui/NavigationStack.h"
 #include "widgets/HeaderWidget.h"
+#include "widgets/NoticeWidget.h"
 #include "widgets/TableWidget.h"
 #include "widgets/ToolbarWidget.h"
 
 namespace varnel {
 
-/// What a navigation stack shows at a time: title bar, table, toolbar.
+/// What a navigation stack shows at a time: title bar, notice, table, toolbar.
 class PaneWidget final : public QWidget, public TablePane {
  public:
   PaneWidget();
@@ -24,6 +25,7 @@ class PaneWidget final : public QWidget, public TablePane {
   TableWidget& tableWidget() { return _table; }
   HeaderWidget& header() { return _header; }
   ToolbarWidget& toolbar() { return _toolbar; }
+  NoticeWidget& notice() { return _notice; }
   /// Called when the title has changed.
   void setTitleObserver(std::function<void()> observer) { _titleObserver = std::move(observer); }
   /// Calls nobody from now on.
@@ -32,6 +34,7 @@ class PaneWidget final : public QWidget, public TablePane {
  private:
   QVBoxLayout _column;
   HeaderWidget _header;
+  NoticeWidget _notice;
   TableWidget _table;
   ToolbarWidget _toolbar;
   std::function<void()> _titleObserver;

@@ -11,7 +11,10 @@ namespace {
 
 constexpr int side = 20;
 constexpr int spokes = 12;
-constexpr int stepTime_ms = 83;  // a turn a second
+constexpr std::chrono::milliseconds fastStep(83);  // a turn a second
+// Whoever waits longer is told why, and the wheel need not wake the machine so often.
+constexpr int stepsAtFullSpeed = 3 * spokes;
+constexpr std::chrono::milliseconds slowStep(500);
 
 }  // namespace
 
@@ -23,6 +26,12 @@ SpinnerWidget::SpinnerWidget(QWidget* parent) : QWidget(parent) {
 void SpinnerWidget::setAnimating(bool isAnimating) { setVisible(isAnimating); }
 
 QSize SpinnerWidget::sizeHint() const { return {side, side}; }
+
+std::chrono::milliseconds SpinnerWidget::timeOfPicture() const {
+  return _step < stepsAtFullSpeed ? fastStep : slowStep;
+}
+
+void SpinnerWidget::turn() { _timer.start(static_cast<int>(timeOfPicture().count()), this); }
 
 void SpinnerWidget::paintEvent(QPaintEvent*) {
   QPainter painter(this);
@@ -41,13 +50,14 @@ void SpinnerWidget::paintEvent(QPaintEvent*) {
 
 void SpinnerWidget::timerEvent(QTimerEvent* event) {
   if (event->timerId() != _timer.timerId()) return QWidget::timerEvent(event);
-  _step = (_step + 1) % spokes;
+  if (++_step == stepsAtFullSpeed) turn();
   update();
 }
 
 void SpinnerWidget::showEvent(QShowEvent* event) {
   QWidget::showEvent(event);
-  if (desktopWantsMotion()) _timer.start(stepTime_ms, this);
+  _step = 0;
+  if (desktopWantsMotion()) turn();
 }
 
 void SpinnerWidget::hideEvent(QHideEvent* event) {

@@ -2,15 +2,19 @@
 
 #include <QBasicTimer>
 #include <QWidget>
+#include <chrono>
 
 namespace varnel {
 
-/// A small grey wheel that turns while it is on; hidden while it is off.
+/// A small grey wheel that turns while it is on: for three seconds once a second, then two pictures a second.
+/// Hidden while it is off.
 class SpinnerWidget final : public QWidget {
  public:
   explicit SpinnerWidget(QWidget* parent = nullptr);
   void setAnimating(bool isAnimating);
   QSize sizeHint() const override;
+  /// How long each picture stands.
+  std::chrono::milliseconds timeOfPicture() const;
 
  protected:
   void paintEvent(QPaintEvent* event) override;
@@ -19,8 +23,10 @@ class SpinnerWidget final : public QWidget {
   void hideEvent(QHideEvent* event) override;
 
  private:
+  void turn();
+
   QBasicTimer _timer;
-  int _step = 0;
+  int _step = 0;  // since it was shown
 };
 
 }  // namespace varnel

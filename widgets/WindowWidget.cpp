@@ -50,6 +50,8 @@ void WindowWidget::makeKeyAndVisible() {
   activateWindow();
 }
 
+void WindowWidget::setTitle(std::string_view title) { setWindowTitle(singleLine(title)); }
+
 void WindowWidget::takeKeyboard() {
   if (_root) _root->takeKeyboard();
 }

@@ -25,6 +25,7 @@ class WindowWidget final : public QWidget, public Window {
 
   void setRoot(NavigationStack& stack) override;
   void makeKeyAndVisible() override;
+  void setTitle(std::string_view title) override;
   void hide() override { QWidget::hide(); }
 
   /// Called when the window is taken off the screen, with the size that it has while it is neither maximized

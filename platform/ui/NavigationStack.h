@@ -76,6 +76,9 @@ class NavigationStack {
   virtual void popTo(const PaneController& controller, Animation animation) = 0;
   /// The toolbar is hidden until then.
   virtual void showToolbar() = 0;
+  /// What there is to tell beside the toolbars' status, lines with a newline between them: it stands below
+  /// the title, whichever pane is on top, and on a presented screen. Empty text takes no room.
+  virtual void setNotice(std::string_view text) = 0;
 
   /// Lays a screen over the stack. Calls the controller's `viewDidLoad` before its first `viewWillAppear`.
   /// The stack keeps the controller until its screen is off.

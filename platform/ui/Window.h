@@ -1,5 +1,7 @@
 #pragma once
 
+#include <string_view>
+
 #include "platform/ui/NavigationStack.h"
 
 namespace varnel {
@@ -12,6 +14,8 @@ class Window {
   virtual void setRoot(NavigationStack& stack) = 0;
   /// Shows the window, which gets the keyboard; the stack's top pane appears.
   virtual void makeKeyAndVisible() = 0;
+  /// What the desktop calls the window; plain text.
+  virtual void setTitle(std::string_view title) = 0;
   /// Takes the window off the screen.
   virtual void hide() = 0;
 };

@@ -1,7 +1,5 @@
 #include "programs/varnel/HostServices.h"
 
-#include <iostream>
-
 #include "base/PropertyList.h"
 #include "host/RuntimeFolder.h"
 
@@ -18,8 +16,10 @@ HostServices::HostServices(const Options& options, const ApplicationInfo& applic
       _preferences(options.deviceRoot),
       _application(application) {}
 
-ModelServices HostServices::model() {
-  return {_ports, _telephony, _queue, {_resources, _clock, _application, std::cout}, writeXmlPropertyList};
+ModelServices HostServices::model(std::ostream& standardOutput) {
+  return {
+      _ports, _telephony, _queue, {_resources, _clock, _application, standardOutput}, writeXmlPropertyList,
+      &_link};
 }
 
 }  // namespace varnel

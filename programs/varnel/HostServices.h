@@ -1,5 +1,7 @@
 #pragma once
 
+#include <iostream>
+
 #include "host/EventLoopQueue.h"
 #include "host/FilePreferences.h"
 #include "host/FileResources.h"
@@ -21,8 +23,8 @@ class HostServices final {
   /// used or the resources cannot be read.
   HostServices(const Options& options, const ApplicationInfo& application);
 
-  ModelServices model();
-  const LinkReports& link() const { return _link; }
+  /// What generators have to say on standard output goes to that stream, which outlives the models.
+  ModelServices model(std::ostream& standardOutput = std::cout);
   DeviceFiles& files() { return _files; }
   Preferences& preferences() { return _preferences; }
 

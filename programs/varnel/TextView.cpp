@@ -2,6 +2,10 @@
 
 #include <cctype>
 #include <csignal>
+#include <cstdlib>
+#include <cstring>
+#include <iostream>
+#include <optional>
 
 #include "app/TextViewer.h"
 #include "host/HostApplication.h"
@@ -15,32 +19,45 @@ namespace varnel {
 int viewAsText(int& argumentCount, char** arguments, const Options& options,
                const ApplicationInfo& application) {
   HostApplication host(argumentCount, arguments);
-  HostServices services(options, application);
   StandardOutput output;
-
-  TextViewer viewer(services.model(), services.files(), output);
-  if (options.updates) viewer.afterUpdates(*options.updates, [&host] { host.end(0); });
-  const SignalWatcher watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [&](int signal) {
-    switch (signal) {
-      case SIGUSR1:
-        viewer.startOver();
-        break;
-      case SIGUSR2:
-        viewer.save();
-        break;
-      default:
-        host.end(0);
+  HostServices services(options, application);
+  int status = 0;
+  output.setEndHandler([&](int error) {
+    if (error != 0) {
+      status = EXIT_FAILURE;
+      std::cerr << programName << ": cannot write to standard output: " << std::strerror(error) << '\n';
     }
+    host.end(status);
   });
+
+  std::optional<TextViewer> viewer;
   const KeyWatcher keys([&](char key) {
     switch (std::toupper(static_cast<unsigned char>(key))) {
       case 'R':
-        viewer.startOver();
+        viewer->startOver();
         break;
       case 'S':
-        viewer.save();
+        viewer->save();
         break;
       case 'Q':
+        host.end(0);
+    }
+  });
+  viewer.emplace(services.model(output.lines()), services.files(), output,
+                 keys.isWatching() ? "press R" : "send it SIGUSR1");
+  if (options.updates) viewer->afterUpdates(*options.updates, [&] { host.end(status); });
+  const SignalWatcher watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2, SIGWINCH}, [&](int signal) {
+    switch (signal) {
+      case SIGUSR1:
+        viewer->startOver();
+        break;
+      case SIGUSR2:
+        viewer->save();
+        break;
+      case SIGWINCH:
+        output.showAgain();
+        break;
+      default:
         host.end(0);
     }
   });

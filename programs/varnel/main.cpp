@@ -1,3 +1,4 @@
+#include <csignal>
 #include <iostream>
 
 #include "host/BuildInfo.h"
@@ -48,5 +49,7 @@ int run(int argumentCount, char** arguments) {
 int main(int argumentCount, char** arguments) {
   varnel::startProgram();
   varnel::installTerminateHandler(varnel::programName);
+  // Whoever reads the output may leave early: that is a failed write, not the end by a signal.
+  std::signal(SIGPIPE, SIG_IGN);
   return varnel::run(argumentCount, arguments);
 }

@@ -6,6 +6,7 @@
 #include "base/PropertyList.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/FakeDeviceFiles.h"
+#include "tests/support/FakeLinkReports.h"
 #include "tests/support/FakeQueue.h"
 #include "tests/support/FakeTelephony.h"
 #include "tests/support/MemoryPorts.h"
@@ -19,6 +20,7 @@ namespace {
 using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::EndsWith;
+using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::SizeIs;
 using testing::StartsWith;
@@ -31,7 +33,7 @@ Bytes antennas(std::uint8_t number) { return PacketBuilder(0xB0C1, 22).u8(20, nu
 
 class RecordedPages final : public TextOutput {
  public:
-  void show(const std::string& page) override { pages.push_back(page); }
+  void show(const TextPage& page) override { pages.push_back(page.text()); }
 
   std::vector<std::string> pages;
 };
@@ -61,8 +63,10 @@ class TextViewerTest : public testing::Test {
   MemoryPorts ports;
   FakeTelephony telephony;
   FakeDeviceFiles files;
+  FakeLinkReports link;
   RecordedPages output;
-  TextViewer viewer{{ports, telephony, queue, host.services, writeXmlPropertyList}, files, output};
+  TextViewer viewer{
+      {ports, telephony, queue, host.services, writeXmlPropertyList, &link}, files, output, "press R"};
 };
 
 TEST_F(TextViewerTest, TheFirstPageIsTheStatusAlone) { EXPECT_THAT(pages(), ElementsAre("Connecting...\n")); }
@@ -75,9 +79,67 @@ TEST_F(TextViewerTest, ConnectsOnceTheQueueRuns) {
   EXPECT_THAT(pages(), SizeIs(1));
 }
 
-TEST_F(TextViewerTest, ShowsNoPageWhileNothingArrives) {
+TEST_F(TextViewerTest, WhileNothingArrivesTheOneMorePageSaysSo) {
   queue.advance(60s);
-  EXPECT_THAT(pages(), SizeIs(1));
+  EXPECT_THAT(pages(), ElementsAre("Connecting...\n",
+                                   "Connecting...\nNotice: Connected to a modem of the technology "
+                                   "\"kalvi-lte\", but nothing has arrived yet\n"));
+}
+
+TEST_F(TextViewerTest, TheNoticeStandsBetweenStatusAndTreeALineForEachMatter) {
+  queue.run();
+  link.report.serverNote = "The replay has ended";
+  link.report.droppedByServer = 12;
+  show(2);
+  EXPECT_THAT(pages().back(),
+              StartsWith("Updated 2024-03-01 at 14:05:09\n"
+                         "Notice: The replay has ended\n"
+                         "Notice: Messages that the server dropped, since they were read too slowly: 12\n"
+                         "Serving Cell Info\n"));
+}
+
+TEST_F(TextViewerTest, ANoticeThatComesOrGoesIsAPageOfItsOwn) {
+  queue.run();
+  show(2);
+  ASSERT_THAT(pages(), SizeIs(2));
+  link.report.serverNote = "The replay has ended";
+  queue.advance(60s);
+  ASSERT_THAT(pages(), SizeIs(3));
+  EXPECT_THAT(pages()[2], StartsWith("Updated 2024-03-01 at 14:05:09\nNotice: The replay has ended\n"));
+  link.report = {};
+  queue.advance(60s);
+  ASSERT_THAT(pages(), SizeIs(4));
+  EXPECT_EQ(pages()[3], pages()[1]);
+}
+
+TEST_F(TextViewerTest, WhyItIsConnectingIsToldAfterThreeSeconds) {
+  telephony.refusesConnections = true;
+  link.report.trouble = "No server is in /run/varnel";
+  queue.advance(3s);
+  EXPECT_THAT(pages(),
+              ElementsAre("Connecting...\n", "Connecting...\nNotice: No server is in /run/varnel\n"));
+}
+
+TEST_F(TextViewerTest, TheStatusIsRightAsSoonAsTheLinkIsBack) {
+  queue.run();
+  show(2);
+  telephony.refusesConnections = true;
+  ports.invalidateLocalPort(channel);
+  ASSERT_THAT(pages().back(), StartsWith("Connecting...\n"));
+  telephony.refusesConnections = false;
+  host.clock.set({1709298309, 0});
+  queue.advance(5s);
+  EXPECT_THAT(pages().back(), StartsWith("Updated 2024-03-01 at 14:05:09\nNotice: The display stands still "
+                                         "since 2024-03-01 at 15:05:09,"));
+}
+
+TEST_F(TextViewerTest, TheFirstStatusStaysUntilTheFirstRefresh) {
+  queue.run();
+  telephony.refusesConnections = true;
+  ports.invalidateLocalPort(channel);
+  telephony.refusesConnections = false;
+  queue.advance(5s);
+  EXPECT_THAT(pages().back(), StartsWith("Connecting...\n"));
 }
 
 TEST_F(TextViewerTest, EachRefreshShowsTheTimeOfTheLocalZoneAndTheTree) {
@@ -170,6 +232,7 @@ TEST_F(TextViewerTest, SavesNothingWithoutTheMarkerOfAnInternalDevice) {
   viewer.save();
   EXPECT_THAT(files.writes, IsEmpty());
   EXPECT_THAT(log.take(), SizeIs(1)) << "the reason";
+  EXPECT_THAT(pages().back(), HasSubstr("\nNotice: Not saved: this device allows no snapshots"));
 }
 
 TEST_F(TextViewerTest, ASnapshotThatCannotBeWrittenIsLogged) {
@@ -182,6 +245,19 @@ TEST_F(TextViewerTest, ASnapshotThatCannotBeWrittenIsLogged) {
   EXPECT_THAT(log.takeTexts(), ElementsAre("<3>Unable to write snapshot to "
                                            "/var/mobile/Library/Logs/CrashReporter/"
                                            "VarnelSnapshot-1709294709.varnel"));
+  EXPECT_THAT(pages().back(), HasSubstr("\nNotice: Not saved: /var/mobile/Library/Logs/CrashReporter/"
+                                        "VarnelSnapshot-1709294709.varnel: No space left on device\n"));
+}
+
+TEST_F(TextViewerTest, ASecondSnapshotOfASecondSaysThatItHasReplacedTheFirst) {
+  files.existing = {marker};
+  queue.run();
+  show(2);
+  viewer.save();
+  EXPECT_THAT(pages().back(), HasSubstr("VarnelSnapshot-1709294709.varnel\n"));
+  viewer.save();
+  EXPECT_THAT(pages().back(), HasSubstr("VarnelSnapshot-1709294709.varnel, in place of the snapshot of the "
+                                        "same second\n"));
 }
 
 TEST_F(TextViewerTest, AfterAReconnectionTheDisplayStaysAsItWasUntilOneStartsOver) {
@@ -205,6 +281,7 @@ TEST_F(TextViewerTest, StartingOverShowsTheFirstStatusAgainAndConnectsAnew) {
   queue.run();
   EXPECT_EQ(telephony.attempts, 2u);
   EXPECT_TRUE(ports.hasLocalPort(channel));
+  queue.advance(3s);
   EXPECT_EQ(queue.liveTimers(), 1u);
 }
 

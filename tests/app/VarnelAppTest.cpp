@@ -6,6 +6,7 @@
 #include "base/PropertyList.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/FakeDeviceFiles.h"
+#include "tests/support/FakeLinkReports.h"
 #include "tests/support/FakeQueue.h"
 #include "tests/support/FakeTelephony.h"
 #include "tests/support/MemoryPorts.h"
@@ -77,6 +78,7 @@ class VarnelAppTest : public testing::Test {
   }
   RecordingStack& stack() const { return *userInterface.stack; }
   RecordingPane& pane() const { return stack().pane(); }
+  const std::string& title() const { return static_cast<RecordingWindow&>(*app.window()).title; }
   std::string path() const { return static_cast<VarnelPaneController&>(*stack().topController()).path(); }
   // The root pane's first row, and of the pane that it opens the row of that number.
   void openContext(std::size_t row) {
@@ -91,10 +93,13 @@ class VarnelAppTest : public testing::Test {
   MemoryPorts ports;
   FakeTelephony telephony;
   FakeDeviceFiles files;
+  FakeLinkReports link;
   RecordingPreferences preferences;
   RecordingUserInterface userInterface;
-  VarnelApp app{
-      {{ports, telephony, queue, host.services, writeXmlPropertyList}, files, preferences, userInterface}};
+  VarnelApp app{{{ports, telephony, queue, host.services, writeXmlPropertyList, &link},
+                 files,
+                 preferences,
+                 userInterface}};
 };
 
 TEST_F(VarnelAppTest, LaunchShowsAWindowAsLargeAsTheScreen) {
@@ -272,6 +277,103 @@ TEST_F(VarnelAppTest, TheStatusReturnsWithTheLink) {
   queue.advance(5s);
   receive(1);
   EXPECT_EQ(pane().toolbarText(), updated);
+}
+
+TEST_F(VarnelAppTest, TheStatusIsRightAsSoonAsTheLinkIsBack) {
+  launchWith(1);
+  loseTheLink();
+  pane().table().select(0);
+  ASSERT_EQ(pane().toolbarText(), connecting);
+  telephony.refusesConnections = false;
+  host.clock.set({1709298309, 0});
+  queue.advance(5s);
+  EXPECT_EQ(pane().toolbarText(), updated) << "of the last refresh";
+  EXPECT_EQ(stack().pane(0).toolbarText(), connecting) << "only the top pane is told";
+}
+
+TEST_F(VarnelAppTest, ALinkThatIsBackBeforeTheFirstRefreshLeavesTheStatus) {
+  launch();
+  queue.run();
+  loseTheLink();
+  ASSERT_EQ(pane().toolbarText(), connecting);
+  telephony.refusesConnections = false;
+  queue.advance(5s);
+  EXPECT_EQ(pane().toolbarText(), connecting);
+  receive(1);
+  EXPECT_EQ(pane().toolbarText(), updated);
+}
+
+TEST_F(VarnelAppTest, TheTitleBarNamesSectionTechnologyAndProgram) {
+  launch();
+  EXPECT_EQ(title(), "Varnel");
+  queue.run();
+  EXPECT_EQ(title(), "kalvi-lte — Varnel");
+  receive(1);
+  pane().table().select(0);
+  EXPECT_EQ(title(), "PDP Context Info — kalvi-lte — Varnel");
+  EXPECT_EQ(pane().title, "PDP Context Info");
+  pane().table().select(0);
+  EXPECT_EQ(title(), "0 — kalvi-lte — Varnel");
+  stack().goBack();
+  EXPECT_EQ(title(), "PDP Context Info — kalvi-lte — Varnel");
+  app.startOver();
+  EXPECT_EQ(title(), "Varnel");
+}
+
+TEST_F(VarnelAppTest, TheNoticeTellsAfterThreeSecondsWhyItIsConnecting) {
+  telephony.refusesConnections = true;
+  link.report.trouble = "No server is in /run/varnel";
+  launch();
+  queue.advance(3s - 1ms);
+  EXPECT_EQ(stack().notice, "");
+  queue.advance(1ms);
+  EXPECT_EQ(stack().notice, "No server is in /run/varnel");
+  EXPECT_EQ(pane().toolbarText(), "[wheel] [Connecting] [space]");
+}
+
+TEST_F(VarnelAppTest, TheNoticeTellsHowToStartADisplayThatStandsStill) {
+  launchWith(1);
+  ports.invalidateLocalPort(channel);
+  EXPECT_EQ(
+      stack().notice,
+      "The display stands still since 2024-03-01 at 14:05:09, when the link was opened anew; press Ctrl+R "
+      "to start over");
+  app.startOver();
+  EXPECT_EQ(stack().notice, "");
+}
+
+TEST_F(VarnelAppTest, TheNoticeTellsWhereASnapshotWasSaved) {
+  files.existing = {marker};
+  launchWith(1);
+  for (const char* outcome : {"", ", in place of the snapshot of the same second"}) {
+    pane().pressSave();
+    stack().screen().press("Save");
+    queue.run();
+    EXPECT_EQ(stack().notice,
+              "Saved: /var/mobile/Library/Logs/CrashReporter/VarnelSnapshot-1709294709.varnel" +
+                  std::string(outcome));
+  }
+}
+
+TEST_F(VarnelAppTest, TheNoticeTellsWhyASnapshotWasNotSaved) {
+  launchWith(1);
+  app.save();
+  EXPECT_THAT(stack().notice, testing::StartsWith("Not saved: this device allows no snapshots"));
+  files.existing = {marker};
+  files.refusesWrites = true;
+  app.save();
+  EXPECT_EQ(
+      stack().notice,
+      "Not saved: /var/mobile/Library/Logs/CrashReporter/VarnelSnapshot-1709294709.varnel: No space left "
+      "on device");
+}
+
+TEST_F(VarnelAppTest, ASaveScreenWithoutDataSaysThatNothingHasArrivedYet) {
+  files.existing = {marker};
+  launch();
+  pane().pressSave();
+  EXPECT_TRUE(stack().isPresenting());
+  EXPECT_EQ(stack().notice, "Nothing has arrived yet: a snapshot saved now is empty");
 }
 
 TEST_F(VarnelAppTest, SaveOpensOneScreenHoweverOftenItIsPressed) {

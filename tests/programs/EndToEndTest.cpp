@@ -268,6 +268,42 @@ TEST_F(EndToEnd, AutoIsTextWithoutADisplayAndTheWindowWithOne) {
   EXPECT_EQ(shown->exitStatus(), 0) << shown->error();
 }
 
+TEST_F(EndToEnd, AViewerThatFindsNoServerSaysWhereAndWhatToType) {
+  const auto varnel = viewer();
+  EXPECT_TRUE(eventually([&] {
+    return occurrences(varnel->output(), "Connecting...\nNotice: No telephony server serves in " +
+                                             _runtime.path().string() + "; start varnel-telephonyd") == 1;
+  })) << varnel->output();
+}
+
+TEST_F(EndToEnd, AViewerEndsWithTheReaderOfItsPages) {
+  const std::string command = std::string("exec ") + VARNEL_PROGRAM + " --ui text --runtime-dir " +
+                              _runtime.path().string() + " --device-root " + _device.path().string();
+  Process pipeline("/bin/sh", {"-c", command + " | head -n 1"});
+  ASSERT_TRUE(pipeline.waitForEnd());
+  EXPECT_EQ(pipeline.output(), "Connecting...\n");
+  EXPECT_EQ(pipeline.error(), "");
+}
+
+TEST_F(EndToEnd, APageThatCannotBeWrittenIsOneLineAndStatusOne) {
+  const std::string command = std::string("exec ") + VARNEL_PROGRAM + " --ui text --runtime-dir " +
+                              _runtime.path().string() + " --device-root " + _device.path().string();
+  Process full("/bin/sh", {"-c", command + " > /dev/full"});
+  ASSERT_TRUE(full.waitForEnd());
+  EXPECT_EQ(full.exitStatus(), 1);
+  EXPECT_EQ(full.error(), "varnel: cannot write to standard output: No space left on device\n");
+}
+
+TEST_F(EndToEnd, WhatGeneratorsSayStandsBetweenPages) {
+  const auto telephony = server();
+  const auto varnel = viewer();
+  ASSERT_TRUE(eventually([&] { return occurrences(varnel->output(), "EF-ICCID") >= 1; }));
+  varnel->signal(SIGUSR1);
+  EXPECT_TRUE(eventually([&] {
+    return occurrences(varnel->output(), "\nDeallocing ClassIndex\nConnecting...\n") == 1;
+  })) << varnel->output();
+}
+
 TEST_F(EndToEnd, AMissingResourceFolderIsOneLineAndStatusOne) {
   for (const std::string kind : {"text", "window"}) {
     const auto varnel = window({}, "QT_QPA_PLATFORM=offscreen", kind, {"VARNEL_RESOURCES=/some/where"});

@@ -138,6 +138,7 @@ class RecordingStack final : public NavigationStack {
     showTop(*formerTop, animation);
   }
   void showToolbar() override { isToolbarShown = true; }
+  void setNotice(std::string_view text) override { notice = text; }
 
   void present(std::shared_ptr<ModalController> controller, Animation animation) override {
     _events.push_back(described("present", animation));
@@ -170,6 +171,7 @@ class RecordingStack final : public NavigationStack {
   RecordingModalScreen& screen() const { return static_cast<RecordingModalScreen&>(_presented->screen()); }
 
   bool isToolbarShown = false;
+  std::string notice;
 
  private:
   void showTop(PaneController& formerTop, Animation animation) {
@@ -204,7 +206,10 @@ class RecordingWindow final : public Window {
     _events.emplace_back("window visible");
     _root->appear();
   }
+  void setTitle(std::string_view title) override { this->title = title; }
   void hide() override { _events.emplace_back("window hidden"); }
+
+  std::string title;
 
  private:
   RecordedEvents& _events;

@@ -1,0 +1,15 @@
+#pragma once
+
+#include "platform/LinkReports.h"
+
+namespace varnel {
+
+/// A host that tells of the link what the test says.
+class FakeLinkReports final : public LinkReports {
+ public:
+  LinkReport linkReport() const override { return report; }
+
+  LinkReport report;
+};
+
+}  // namespace varnel
