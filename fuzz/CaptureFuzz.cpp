@@ -1,12 +1,14 @@
 #include <cstddef>
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "fuzz/MemoryFile.h"
 #include "fuzz/Require.h"
-#include "host/Capture.h"
-#include "host/CaptureWriter.h"
+#include "host/captures/Capture.h"
+#include "host/captures/PcapEncoders.h"
+#include "host/captures/StreamEncoders.h"
 
 using namespace varnel;
 
@@ -14,8 +16,11 @@ namespace {
 
 struct Record {
   Time time;
+  Dating dating;
+  std::optional<std::uint8_t> subscription;
   Bytes message;
 
+  CaptureRecord view() const { return {time, dating, message, subscription}; }
   friend bool operator==(const Record&, const Record&) = default;
 };
 
@@ -25,11 +30,12 @@ bool isOneLine(const std::string& text) { return !text.empty() && text.find('\n'
 std::vector<Record> recordsOf(const std::string& path) {
   std::vector<Record> records;
   try {
-    CaptureReader reader(path);
-    for (CaptureRecord record; reader.next(record);) {
+    const auto capture = openCapture(path);
+    for (CaptureRecord record; capture->next(record);) {
       require(record.time.nanoseconds >= 0 && record.time.nanoseconds < 1'000'000'000,
               "nanoseconds are a part");
-      records.push_back({record.time, Bytes(record.message.begin(), record.message.end())});
+      records.push_back({record.time, record.dating, record.subscription,
+                         Bytes(record.message.begin(), record.message.end())});
     }
   } catch (const CaptureError& error) {
     require(isOneLine(error.what()), "an error is one line");
@@ -37,22 +43,56 @@ std::vector<Record> recordsOf(const std::string& path) {
   return records;
 }
 
+// The bytes, and how many of the records are in them.
+struct Encoded {
+  Bytes bytes;
+  std::size_t records;
+};
+
+Encoded encoded(CaptureEncoder& encoder, const std::vector<Record>& records) {
+  const ByteView beginning = encoder.beginning();
+  Bytes bytes(beginning.begin(), beginning.end());
+  for (const Record& record : records) {
+    const ByteView more = encoder.encode(record.view());
+    bytes.insert(bytes.end(), more.begin(), more.end());
+  }
+  return {bytes, records.size() - encoder.leftOut()};
+}
+
+void checkPcap(std::vector<Record> records, MemoryFile& copy) {
+  PcapWriter writer;
+  copy.set(encoded(writer, records).bytes);
+  // A capture keeps 32 bits of the seconds, and those of pcap have a date.
+  for (Record& record : records) {
+    record.time.seconds = static_cast<std::uint32_t>(record.time.seconds);
+    record.dating = Dating::Known;
+  }
+  require(recordsOf(copy.path()) == records, "a capture that is written again holds the same records");
+}
+
+void checkFrames(const std::vector<Record>& records, MemoryFile& copy) {
+  FramedWriter first, second;
+  const Encoded frames = encoded(first, records);
+  // The first frame is looked for in the first 64 KiB.
+  constexpr std::size_t longest = 16'000;
+  for (const Record& record : records) {
+    if (record.message.size() > longest) return;
+  }
+  copy.set(frames.bytes);
+  const std::vector<Record> read = recordsOf(copy.path());
+  require(read.size() == frames.records, "all frames that are written are read");
+  require(encoded(second, read).bytes == frames.bytes, "frames are written as they were read");
+}
+
 }  // namespace
 
-// The input is a whole capture. What could be read of it can be written, and then reads the same.
+// The input is a whole capture of any kind. What could be read of it can be written, and then reads the same.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   static MemoryFile file;
   static MemoryFile copy;
   file.set({data, size});
-  std::vector<Record> records = recordsOf(file.path());
-  {
-    CaptureWriter writer(copy.path());
-    for (const auto& [time, message] : records) writer.write(time, message);
-  }
-  // A capture keeps 32 bits of the seconds.
-  for (Record& record : records) record.time.seconds = static_cast<std::uint32_t>(record.time.seconds);
-  std::vector<Record> copied = recordsOf(copy.path());
-  for (Record& record : copied) record.time.seconds = static_cast<std::uint32_t>(record.time.seconds);
-  require(copied == records, "a capture that is written again holds the same records");
+  const std::vector<Record> records = recordsOf(file.path());
+  checkPcap(records, copy);
+  checkFrames(records, copy);
   return 0;
 }

@@ -134,7 +134,8 @@ void checkPlot(const std::vector<Generation>& generations, const std::vector<std
     require(!series.points.empty() && series.points.size() <= 2 * PlotLine::mostColumns,
             "a series has two points a column at the most");
     for (const PlotPoint& point : series.points)
-      require(std::isfinite(point.seconds) && std::isfinite(point.value), "points can be drawn");
+      require(std::isfinite(point.seconds) && std::isfinite(point.lowest) && std::isfinite(point.highest),
+              "points can be drawn");
   }
 }
 
@@ -190,11 +191,12 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   if (isLaborious(bytes, fileLimits)) return 0;
   file.set(bytes);
   const std::string path = file.path();
-  const bool isList = SnapshotFile::isPropertyList(path);
-  require(isList == (size > 0 && (data[0] == '<' || data[0] == 'b')), "a snapshot begins as lists do");
+  ByteWindow window(openFile(path, AtEndOfFile::Stop));
+  const bool isList = SnapshotFile::isPropertyList(window);
+  require(!isList || data[0] == '<' || data[0] == 'b', "a snapshot begins as lists do");
   std::optional<SnapshotFile> snapshot;
   try {
-    snapshot.emplace(path);
+    snapshot.emplace(window, path);
   } catch (const std::runtime_error& error) {
     require(isOneLine(error.what()), "an error is one line");
   }

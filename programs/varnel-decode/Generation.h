@@ -1,7 +1,10 @@
 #pragma once
 
+#include <chrono>
+
 #include "base/Time.h"
 #include "base/Value.h"
+#include "host/captures/CaptureRecord.h"
 
 namespace varnel {
 
@@ -10,6 +13,9 @@ namespace varnel {
 struct Generation {
   Time time;
   Value display;
+  /// Where the date is unknown the time means nothing to a user, who gets `elapsed` in its place.
+  Dating dating = Dating::Known;
+  std::chrono::nanoseconds elapsed{0};  ///< since the first record, without what the clock was set by
 };
 
 }  // namespace varnel

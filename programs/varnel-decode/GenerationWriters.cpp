@@ -23,6 +23,14 @@ std::string csvField(std::string_view value) {
   return quoted + '"';
 }
 
+// Without a date there is none to show, but how long it took to come there.
+std::string timeAsJson(const Generation& generation) {
+  if (generation.dating == Dating::Known) return jsonString(timestamp(generation.time));
+  char elapsed[32];
+  std::snprintf(elapsed, sizeof elapsed, "%.3f", std::chrono::duration<double>(generation.elapsed).count());
+  return std::string("null,\"Elapsed\":") + elapsed;
+}
+
 }  // namespace
 
 std::string treePath(std::string_view path) {
@@ -32,7 +40,7 @@ std::string treePath(std::string_view path) {
 void EveryDisplay::take(const Generation& generation) {
   std::string line = "{";
   if (_captureName) line += "\"Capture\":" + jsonString(*_captureName) + ',';
-  line += "\"Time\":" + jsonString(timestamp(generation.time)) + ",\"Display\":";
+  line += "\"Time\":" + timeAsJson(generation) + ",\"Display\":";
   writeOutput(_output, line + treeAsJson(generation.display) + "}\n");
 }
 
@@ -50,7 +58,7 @@ ValueTable::ValueTable(std::FILE* output, const std::vector<std::string>& paths,
 
 void ValueTable::take(const Generation& generation) {
   std::string line = _captureName ? csvField(*_captureName) + ',' : std::string();
-  line += timestamp(generation.time);
+  if (generation.dating == Dating::Known) line += timestamp(generation.time);
   for (const std::string& path : _paths) {
     line += ',';
     if (const auto value = leafValueUnderPath(generation.display, path)) line += csvField(*value);

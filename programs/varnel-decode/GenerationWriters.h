@@ -22,8 +22,8 @@ class GenerationSink {
 /// The path of a node as users write it ("Section/Label") as the tree keeps it ("/Section/Label").
 std::string treePath(std::string_view path);
 
-/// One line of JSON a generation: {"Time": …, "Display": …}. With a capture's name it comes first, as
-/// "Capture".
+/// One line of JSON a generation: {"Time": …, "Display": …}; without a date {"Time": null, "Elapsed": …, …}.
+/// With a capture's name it comes first, as "Capture".
 class EveryDisplay final : public GenerationSink {
  public:
   EveryDisplay(std::FILE* output, std::optional<std::string> captureName)

@@ -1,5 +1,6 @@
 #include "programs/varnel-decode/InputDecoding.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <memory>
 #include <optional>
@@ -11,10 +12,11 @@
 #include "app/Snapshot.h"
 #include "base/FitForXml.h"
 #include "base/PropertyList.h"
-#include "host/Capture.h"
 #include "host/FileResources.h"
 #include "host/HostLog.h"
 #include "host/WholeFile.h"
+#include "host/captures/Capture.h"
+#include "programs/varnel-decode/ElapsedTime.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/MessageStatistics.h"
 #include "programs/varnel-decode/OfflineDecoder.h"
@@ -48,7 +50,7 @@ class InputDecoding {
   InputDecoding(const Options& options, std::size_t index)
       : _options(options),
         _path(options.captures[index]),
-        _name(_path == "-" ? "standard input" : _path),
+        _name(captureName(_path)),
         _isFirst(index == 0),
         _seen(watchedPaths(options)) {
     if (options.captures.size() > 1) _captureName = _path;
@@ -60,12 +62,17 @@ class InputDecoding {
   }
 
   int run(const DecodingServices& services) {
-    if (SnapshotFile::isPropertyList(_path)) return showSnapshot();
-    if (!_options.technology)
-      return mistake("--technology is needed to decode " + _name + ", a capture").code;
-    const int status = decodeCapture(services);
-    tellGuess(services);
-    return status;
+    std::optional<ByteWindow> bytes;
+    bool isSnapshot = false;
+    const bool isOpen = succeeds([&] {
+      bytes.emplace(openFile(_path, _options.atEnd));
+      isSnapshot = SnapshotFile::isPropertyList(*bytes);
+    });
+    if (!isOpen) return generalError;
+    if (isSnapshot) return showSnapshot(*bytes);
+    std::unique_ptr<Capture> capture;
+    if (!succeeds([&] { capture = openCapture({std::move(*bytes), _name, tell}); })) return generalError;
+    return decodeCapture(*capture, services);
   }
 
  private:
@@ -75,14 +82,30 @@ class InputDecoding {
     return paths;
   }
 
-  int decodeCapture(const DecodingServices& services) {
-    std::optional<CaptureReader> capture;
-    if (!succeeds([&] { capture.emplace(_path); })) return generalError;
+  // What the user says overrules what the capture says.
+  static std::optional<std::string> technologyOf(const Capture& capture, const Options& options,
+                                                 const std::vector<std::string>& technologies) {
+    if (options.technology) return options.technology;
+    const auto named = capture.technology();
+    const bool isKnown = named && std::ranges::find(technologies, *named) != technologies.end();
+    return isKnown ? named : std::nullopt;
+  }
+
+  int decodeCapture(Capture& capture, const DecodingServices& services) {
+    const auto technology = technologyOf(capture, _options, services.technologies);
+    if (!technology)
+      return mistake("--technology is needed to decode " + _name + ", a capture that names none").code;
+    const int status = decodeCaptureOf(*technology, capture, services);
+    tellGuess(*technology, services);
+    return status;
+  }
+
+  int decodeCaptureOf(const std::string& technology, Capture& capture, const DecodingServices& services) {
     HostLog log({.standardErrorLevel = _options.logLevel, .systemLog = HostLog::SystemLog::Unused});
-    const auto generator = LogGenerator::generatorFromTechnology(*_options.technology, services.services);
+    const auto generator = LogGenerator::generatorFromTechnology(technology, services.services);
     OfflineDecoder decoder(*generator, services.clock, isSaving() ? RawBytes::Kept : RawBytes::NotKept);
 
-    bool isDone = succeeds([&] { read(*capture, *generator, decoder, log, services.templates); });
+    bool isDone = succeeds([&] { read(capture, *generator, decoder, log, services.templates); });
     if (services.templates.missing()) return failWithout(*services.templates.missing());
     if (isDone && !isPointless()) isDone = succeeds([&] { requireRecords(decoder); });
     tellClockSteps(decoder.clockSteps());
@@ -112,7 +135,7 @@ class InputDecoding {
       throw std::runtime_error(_name + " has no records, so there is nothing to show");
   }
 
-  void read(CaptureReader& capture, const LogGenerator& generator, OfflineDecoder& decoder, HostLog& log,
+  void read(Capture& capture, const LogGenerator& generator, OfflineDecoder& decoder, HostLog& log,
             const TemplateWatch& templates) {
     const bool isStreaming = _options.output == Output::EveryDisplay || _options.output == Output::ValueTable;
     ProgressBar progress(
@@ -125,6 +148,8 @@ class InputDecoding {
       progress.recordRead();
       if (isCounting || !_guess.isAnyKnown()) count(record.message, generator.fateOf(record.message));
       if (const auto generation = decoder.fireTicks(record.time)) report(*generation);
+      _elapsed.record(record.time);
+      _dating = record.dating;
       decoder.deliver(record.time, record.message);
     }
   }
@@ -135,18 +160,18 @@ class InputDecoding {
   }
 
   // The technology is more likely wrong than the capture.
-  void tellGuess(const DecodingServices& services) const {
+  void tellGuess(const std::string& technology, const DecodingServices& services) const {
     if (!_guess.isNeeded() || services.templates.missing()) return;
-    tell(_guess.sentence(_name, *_options.technology, services.technologies, services.services));
+    tell(_guess.sentence(_name, technology, services.technologies, services.services));
   }
 
-  int showSnapshot() {
+  int showSnapshot(ByteWindow& bytes) {
     if (countsMessages())
       return mistake("--stats counts the messages of captures, but " + _name + " is a snapshot").code;
     if (_options.snapshotPath)
       return mistake("--snapshot saves what was decoded of a capture, but " + _name + " is a snapshot").code;
     std::optional<SnapshotFile> snapshot;
-    if (!succeeds([&] { snapshot.emplace(_path); })) return generalError;
+    if (!succeeds([&] { snapshot.emplace(bytes, _name); })) return generalError;
     bool isDone = !wantsGenerations() || succeeds([&] {
       for (const Generation& generation : snapshot->generations()) report(generation);
     });
@@ -159,7 +184,9 @@ class InputDecoding {
   bool wantsGenerations() const { return _streamed || _recorder; }
 
   // An output that has failed gets no more; what goes to files goes on.
-  void report(const Generation& generation) {
+  void report(Generation generation) {
+    generation.dating = _dating;
+    generation.elapsed = _elapsed.at(generation.time);
     _isAnyShown = true;
     if (wantsGenerations()) _seen.take(generation);
     if (_recorder) _recorder->take(generation);
@@ -279,6 +306,8 @@ class InputDecoding {
   SeenPaths _seen;
   MessageStatistics _statistics;
   TechnologyGuess _guess;
+  ElapsedTime _elapsed;
+  Dating _dating = Dating::Known;  // of the last record
   bool _isAnyShown = false;
   bool _isOutputBroken = false;
 };

@@ -38,6 +38,7 @@ constexpr const char* examples =
 struct Wishes {
   std::string format;
   bool isEvery = false;
+  bool isFollowing = false;
   bool isStatistics = false;
   std::vector<std::string> plot;
 };
@@ -52,7 +53,8 @@ DisplayWriter writerNamed(std::string_view name) {
   return std::ranges::find(displayFormats, name, &DisplayFormat::name)->write;
 }
 
-void declareInput(CLI::App& app, Options& options, const std::vector<std::string>& technologies) {
+void declareInput(CLI::App& app, Options& options, Wishes& wishes,
+                  const std::vector<std::string>& technologies) {
   app.add_option("--technology", options.technology, "the modem that was captured; snapshots need none")
       ->check(CLI::IsMember(technologies));
   app.add_option("--jobs", options.jobs, "decode up to that many captures at the same time")
@@ -64,8 +66,10 @@ void declareInput(CLI::App& app, Options& options, const std::vector<std::string
       ->check(CLI::Range(-1, std::numeric_limits<int>::max()).description(""))
       ->type_name("N")
       ->capture_default_str();
+  app.add_flag("--follow", wishes.isFollowing, "wait for more where the file ends, until interrupted");
   app.add_option("CAPTURE", options.captures,
-                 "pcap or pcapng of link type USER0, or a snapshot (.varnel); - is standard input")
+                 "what a diagnostic port sends, log records, pcap of link type USER0, or a snapshot; - is "
+                 "standard input")
       ->required()
       ->type_name("");
 }
@@ -103,7 +107,10 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
   if (options.snapshotPath == "") return "--snapshot: the name of the file is empty";
   if (options.binaryLogPath == "") return "--dlf: the name of the file is empty";
   if (!wishes.plot.empty() && wishes.plot.front().empty()) return "--plot: the name of the file is empty";
+  if (wishes.isFollowing && !wishes.isEvery && options.tablePaths.empty())
+    return "--follow needs --every or --csv, for all else is written at the end";
   if (options.captures.size() < 2) return std::nullopt;
+  if (wishes.isFollowing) return "--follow takes one capture at a time";
   if (format == "plist") return "--format plist takes one capture at a time";
   if (options.snapshotPath || options.binaryLogPath || !wishes.plot.empty())
     return "--snapshot, --dlf and --plot take one capture at a time, for each would overwrite the one before";
@@ -140,6 +147,7 @@ Output outputFor(const Options& options, const Wishes& wishes) {
 void fulfil(Options& options, const Wishes& wishes) {
   const std::string format = wishes.format.empty() ? "text" : wishes.format;
   options.output = outputFor(options, wishes);
+  if (wishes.isFollowing) options.atEnd = AtEndOfFile::WaitForMore;
   options.writeDisplay = writerNamed(format);
   const bool isForReading = (options.output == Output::Display && (format == "text" || format == "paths")) ||
                             options.output == Output::StatisticsTable;
@@ -164,7 +172,7 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
                programName);
   app.footer(examples);
   app.set_version_flag("--version", programName + (" " + version));
-  declareInput(app, options, technologies);
+  declareInput(app, options, wishes, technologies);
   declareOutput(app, options, wishes);
   try {
     app.parse(argumentCount, arguments);

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "base/Log.h"
+#include "host/captures/ByteSource.h"
 #include "programs/varnel-decode/TreeWriters.h"
 
 namespace varnel {
@@ -38,9 +39,10 @@ struct Options {
   std::optional<std::string> snapshotPath;   ///< where to write a snapshot file
   std::optional<std::string> binaryLogPath;  ///< where to write the binary log
   std::optional<PlotWish> plot;
-  unsigned jobs = 1;                  ///< how many captures are decoded at the same time
-  bool namesEachCapture = false;      ///< text of several captures: a line before each says which it is
-  std::vector<std::string> captures;  ///< captures and snapshots, at least one; "-" is standard input
+  AtEndOfFile atEnd = AtEndOfFile::Stop;  ///< what happens where a capture ends
+  unsigned jobs = 1;                      ///< how many captures are decoded at the same time
+  bool namesEachCapture = false;          ///< text of several captures: a line before each says which it is
+  std::vector<std::string> captures;      ///< captures and snapshots, at least one; "-" is standard input
 };
 
 /// The status to end with when the command line leaves nothing to do: 0 after help, 2 after a mistake.

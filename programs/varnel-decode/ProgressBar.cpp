@@ -24,7 +24,7 @@ bool isTerminalThatErases(int file) {
 
 }  // namespace
 
-ProgressBar::ProgressBar(const CaptureReader& capture, Output output, LogSink& log, int logLevel,
+ProgressBar::ProgressBar(const Capture& capture, Output output, LogSink& log, int logLevel,
                          std::chrono::milliseconds delay)
     : _capture(capture), _log(log), _logLevel(logLevel), _nextDrawing(Clock::now() + delay) {
   if (!isTerminalThatErases(STDERR_FILENO)) return;

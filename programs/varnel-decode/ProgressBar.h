@@ -5,7 +5,7 @@
 #include <optional>
 
 #include "base/Log.h"
-#include "host/Capture.h"
+#include "host/captures/Capture.h"
 
 namespace varnel {
 
@@ -18,7 +18,7 @@ class ProgressBar final : public LogSink {
 
   /// Draws nothing beside lines that go to the same terminal. The log takes the lines of that priority number
   /// and lower, and outlives the bar.
-  ProgressBar(const CaptureReader& capture, Output output, LogSink& log, int logLevel,
+  ProgressBar(const Capture& capture, Output output, LogSink& log, int logLevel,
               std::chrono::milliseconds delay = std::chrono::milliseconds(500));
   ProgressBar(const ProgressBar&) = delete;
   ProgressBar& operator=(const ProgressBar&) = delete;
@@ -39,7 +39,7 @@ class ProgressBar final : public LogSink {
   void draw(std::uint64_t bytesRead);
   void erase();
 
-  const CaptureReader& _capture;
+  const Capture& _capture;
   LogSink& _log;
   const int _logLevel;
   std::optional<std::uint64_t> _size;  // absent when no bar is to be drawn

@@ -1,11 +1,9 @@
 #include "programs/varnel-decode/SnapshotFile.h"
 
-#include <cerrno>
-#include <cstdio>
-#include <filesystem>
-#include <memory>
+#include <algorithm>
 #include <stdexcept>
-#include <system_error>
+#include <string_view>
+#include <utility>
 
 #include "base/Dictionary.h"
 #include "base/PropertyList.h"
@@ -23,32 +21,11 @@ constexpr std::string_view dateKey = "Date";
 constexpr std::string_view descriptionKey = "Description";
 constexpr std::string_view timestampKey = "Timestamp";
 
-struct CloseFile {
-  void operator()(std::FILE* file) const {
-    if (file != stdin) std::fclose(file);
-  }
-};
-using File = std::unique_ptr<std::FILE, CloseFile>;
-
-File openFile(const std::string& path) { return File(path == "-" ? stdin : std::fopen(path.c_str(), "rb")); }
-
-[[noreturn]] void failToRead(const std::string& name) {
-  throw std::system_error(errno, std::generic_category(), "cannot read " + name);
-}
-
 // A little more than a property list may be long, so that a longer one is refused.
-Bytes contentsOf(const std::string& path, const std::string& name) {
-  const File file = openFile(path);
-  if (!file) failToRead(name);
-  Bytes bytes;
-  std::uint8_t part[1 << 16];
-  while (bytes.size() <= fileLimits.size) {
-    const std::size_t count = std::fread(part, 1, sizeof part, file.get());
-    if (count == 0 && std::ferror(file.get())) failToRead(name);
-    if (count == 0) break;
-    bytes.insert(bytes.end(), part, part + count);
-  }
-  return bytes;
+Bytes contentsOf(ByteWindow& bytes) {
+  bytes.holds(fileLimits.size + 1);
+  const auto contents = bytes.unread();
+  return {contents.begin(), contents.end()};
 }
 
 Value itemAsShown(const Value& item) {
@@ -71,19 +48,19 @@ std::optional<Time> timeIn(const Dictionary& entries, std::string_view key) {
 
 }  // namespace
 
-bool SnapshotFile::isPropertyList(const std::string& path) {
-  std::error_code ignored;
-  if (path != "-" && !std::filesystem::is_regular_file(path, ignored)) return false;
-  const File file = openFile(path);
-  if (!file) return false;
-  const int first = std::getc(file.get());
-  std::ungetc(first, file.get());
-  // XML and binary; no capture begins like this.
-  return first == '<' || first == 'b';
+// A record of 60 bytes begins with '<', and so may a frame; but letters follow it only in XML.
+bool SnapshotFile::isPropertyList(ByteWindow& bytes) {
+  constexpr std::string_view binary = "bplist";
+  if (!bytes.holds(2)) return bytes.holds(1) && bytes.unread()[0] == '<';
+  const std::uint8_t first = bytes.unread()[0], second = bytes.unread()[1];
+  if (first == '<') return second >= ' ' && second < 0x7F;
+  if (first != binary[0] || second != binary[1] || !bytes.holds(binary.size())) return false;
+  const auto begin = bytes.unread().first(binary.size());
+  return std::equal(begin.begin(), begin.end(), binary.begin());
 }
 
-SnapshotFile::SnapshotFile(const std::string& path) : _name(path == "-" ? "standard input" : path) {
-  auto contents = readPropertyList(contentsOf(path, _name), fileLimits);
+SnapshotFile::SnapshotFile(ByteWindow& bytes, std::string name) : _name(std::move(name)) {
+  auto contents = readPropertyList(contentsOf(bytes), fileLimits);
   if (!contents)
     throw std::runtime_error(_name +
                              " begins like a snapshot but is no property list; is it cut off or damaged?");

@@ -5,6 +5,7 @@
 
 #include "base/Bytes.h"
 #include "base/Value.h"
+#include "host/captures/ByteWindow.h"
 #include "programs/varnel-decode/Generation.h"
 
 namespace varnel {
@@ -12,12 +13,12 @@ namespace varnel {
 /// A snapshot as the viewer saves it.
 class SnapshotFile {
  public:
-  /// True when what the path names begins like a property list, and not like a capture. "-" is standard
-  /// input, which stays as it was; of pipes by name nothing is read, and they are taken for captures.
-  static bool isPropertyList(const std::string& path);
+  /// True when the bytes begin like a property list, and not like a capture. None of them is dropped. Throws
+  /// CaptureError.
+  static bool isPropertyList(ByteWindow& bytes);
 
-  /// Reads the file; "-" is standard input. Throws std::runtime_error for what is no snapshot.
-  explicit SnapshotFile(const std::string& path);
+  /// Reads them all; the name is that of errors. Throws std::runtime_error for what is no snapshot.
+  SnapshotFile(ByteWindow& bytes, std::string name);
 
   /// The snapshot as it is shown: its dictionary without raw messages and binary log.
   Value shown() const;

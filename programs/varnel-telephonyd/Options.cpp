@@ -36,13 +36,13 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
       ->capture_default_str();
   auto* replay =
       app.add_option("--replay", options.replayPath,
-                     "send the messages of a capture, pcap or pcapng of link type USER0, in their own "
+                     "send the messages of a capture of any kind that varnel-decode reads, in their own "
                      "time; every viewer gets them from the start")
           ->excludes(simulate)
           ->type_name("CAPTURE");
-  app.add_option("--technology", options.replayTechnology, "the modem that was captured")
+  app.add_option("--technology", options.replayTechnology,
+                 "the modem that was captured; unless given what the capture says, else kalvi-lte")
       ->needs(replay)
-      ->default_val(technology::kalviLTE)
       ->check(CLI::IsMember(technologies))
       ->type_name("TECHNOLOGY");
   app.add_option("--speed", options.speed, "replay that many times as fast")

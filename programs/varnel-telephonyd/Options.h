@@ -16,7 +16,8 @@ struct Options {
   std::uint64_t seed = 1;
 
   std::optional<std::string> replayPath;
-  std::string replayTechnology;  ///< what viewers are told
+  /// What viewers are told; absent: what the capture says.
+  std::optional<std::string> replayTechnology;
   double speed = 1;
   bool loops = false;
 

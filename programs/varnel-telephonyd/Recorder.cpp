@@ -17,7 +17,9 @@ Time later(Time start, std::chrono::nanoseconds passed) {
 
 }  // namespace
 
-Recorder::Recorder(Setup setup) : _setup(std::move(setup)) { _writer.emplace(_setup.path, _setup.existing); }
+Recorder::Recorder(Setup setup) : _setup(std::move(setup)) {
+  _writer.emplace(_setup.path, _setup.existing, _setup.technology);
+}
 
 void Recorder::record(ByteView message) {
   if (!_writer) return;

@@ -17,6 +17,7 @@ class Recorder {
   struct Setup {
     std::string path;  ///< "-" is standard output
     ExistingRecording existing = ExistingRecording::Refused;
+    std::optional<std::string> technology{};  ///< what the recording says that it is of; absent: nothing
     std::function<Time()> now;
     /// The time since any one moment; it never steps.
     std::function<std::chrono::nanoseconds()> uptime;

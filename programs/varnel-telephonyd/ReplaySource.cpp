@@ -29,11 +29,11 @@ std::string ReplaySource::nameOfLast() const {
 }
 
 bool ReplaySource::readRecord(CaptureRecord& record) {
-  if (!_capture) _capture.emplace(_path);
+  if (!_capture) _capture = open();
   ++_recordsRead;
   if (_capture->next(record)) return true;
   if (_atEnd == AtEnd::Stop || !_last) return false;
-  _capture.emplace(_path);
+  _capture = open();
   _recordsRead = 1;
   if (!_capture->next(record)) return false;
   const auto pause = std::min(playingTime(std::chrono::seconds(1)), longestWait);
@@ -67,6 +67,10 @@ void ReplaySource::tellShortening(Time time) {
 
 std::chrono::milliseconds ReplaySource::playingTime(std::chrono::nanoseconds duration) const {
   return std::chrono::round<std::chrono::milliseconds>(std::chrono::duration<double>(duration) / _speed);
+}
+
+std::unique_ptr<Capture> ReplaySource::open() const {
+  return openCapture(_path, {.tell = [](const std::string& line) { logError("%s", line); }});
 }
 
 }  // namespace varnel

@@ -1,11 +1,12 @@
 #pragma once
 
 #include <cstddef>
+#include <memory>
 #include <optional>
 #include <string>
 
 #include "base/Time.h"
-#include "host/Capture.h"
+#include "host/captures/Capture.h"
 #include "programs/varnel-telephonyd/MessageSource.h"
 
 namespace varnel {
@@ -40,14 +41,15 @@ class ReplaySource final : public MessageSource {
   Moment following(Time time);
   void tellShortening(Time time);
   std::chrono::milliseconds playingTime(std::chrono::nanoseconds duration) const;
+  std::unique_ptr<Capture> open() const;
 
   const std::string _path;
   const double _speed;
   const AtEnd _atEnd;
-  std::optional<CaptureReader> _capture;  // open while it is being played
-  std::size_t _recordsRead = 0;           // of this round
-  std::optional<Moment> _last;            // absent before the first record
-  Moment _origin{};                       // from which the distances are measured
+  std::unique_ptr<Capture> _capture;  // open while it is being played
+  std::size_t _recordsRead = 0;       // of this round
+  std::optional<Moment> _last;        // absent before the first record
+  Moment _origin{};                   // from which the distances are measured
   bool _hasToldShortening = false;
   std::string _endNote;  // empty until the end
 };

@@ -1,9 +1,9 @@
+#include <algorithm>
 #include <csignal>
 #include <cstdio>
 #include <memory>
 
 #include "host/BuildInfo.h"
-#include "host/Capture.h"
 #include "host/DescriptorLimit.h"
 #include "host/EventLoopQueue.h"
 #include "host/HostApplication.h"
@@ -15,6 +15,8 @@
 #include "host/SystemClock.h"
 #include "host/TelephonyListener.h"
 #include "host/TerminateHandler.h"
+#include "host/captures/Capture.h"
+#include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/Options.h"
 #include "programs/varnel-telephonyd/Recorder.h"
 #include "programs/varnel-telephonyd/ReplaySource.h"
@@ -40,7 +42,8 @@ int fail(const std::runtime_error& error) {
 
 // The recording that is asked for; none when that is so. Whoever serves the folder makes it: another server
 // there has its own.
-std::unique_ptr<Recorder> makeRecorder(const Options& options, MainQueue& queue, TelephonyServer& server) {
+std::unique_ptr<Recorder> makeRecorder(const Options& options, MainQueue& queue, TelephonyServer& server,
+                                       const std::string& technology) {
   if (!options.recordPath) return nullptr;
   const auto tellEnd = [&queue, &server](const std::string& why) {
     tell(why);
@@ -49,6 +52,7 @@ std::unique_ptr<Recorder> makeRecorder(const Options& options, MainQueue& queue,
   };
   return std::make_unique<Recorder>(Recorder::Setup{.path = *options.recordPath,
                                                     .existing = options.existingRecording,
+                                                    .technology = technology,
                                                     .now = [] { return SystemClock().now(); },
                                                     .uptime = timeSinceBoot,
                                                     .ended = tellEnd});
@@ -67,9 +71,19 @@ std::unique_ptr<MessageSource> makeSource(const Options& options) {
   return std::make_unique<ReplaySource>(*options.replayPath, options.speed, atEnd);
 }
 
+// What viewers are told. Opens the capture, if any, for what it says. Throws CaptureError.
+std::string technologyOf(const Options& options) {
+  if (options.simulatedTechnology) return *options.simulatedTechnology;
+  const auto named = openCapture(*options.replayPath)->technology();
+  if (options.replayTechnology) return *options.replayTechnology;
+  const auto known = simulatedTechnologies();
+  const bool isKnown = named && std::ranges::find(known, *named) != std::ranges::end(known);
+  return isKnown ? *named : std::string(technology::kalviLTE);
+}
+
 int serve(int& argumentCount, char** arguments, const Options& options) {
   // A capture that cannot be replayed at all is told now, not when the first viewer comes.
-  if (options.replayPath) CaptureReader{*options.replayPath};
+  const std::string technology = technologyOf(options);
 
   raiseDescriptorLimit(mostFiles);
   HostApplication application(argumentCount, arguments);
@@ -79,7 +93,6 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   SocketPorts ports(folder);
   EventLoopQueue queue;
   std::unique_ptr<Recorder> recorder;
-  const std::string technology = options.simulatedTechnology.value_or(options.replayTechnology);
   TelephonyServer server({.ports = ports,
                           .queue = queue,
                           .uptime = uptime,
@@ -92,7 +105,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
                           .tell = tell});
   const TelephonyListener listener(
       folder, [&](std::string_view viewerPortName) { return server.createLogChannel(viewerPortName); });
-  recorder = makeRecorder(options, queue, server);
+  recorder = makeRecorder(options, queue, server, technology);
   tell("serving " + technology + " in " + folder.string() + "; now start varnel" +
        (options.runtimeFolder ? " --runtime-dir " + *options.runtimeFolder : ""));
   const int status = application.run();

@@ -1,5 +1,5 @@
-#include "host/Capture.h"
 #include "host/CaptureWriter.h"
+#include "host/captures/Capture.h"
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
@@ -80,24 +80,26 @@ using Record = std::pair<Time, Bytes>;
 struct Reading {
   std::vector<Record> records;
   std::optional<std::string> error;
+  std::vector<std::string> told;
 };
 
-class Capture : public testing::Test {
+class PcapFiles : public testing::Test {
  protected:
-  Capture() {
+  PcapFiles() {
     std::string name = (std::filesystem::temp_directory_path() / "varnel-capture-XXXXXX").string();
     _folder = ::mkdtemp(name.data());
   }
-  ~Capture() override { std::filesystem::remove_all(_folder); }
+  ~PcapFiles() override { std::filesystem::remove_all(_folder); }
 
   std::string path(const std::string& name = "test.pcap") const { return (_folder / name).string(); }
 
   static Reading read(const std::string& file) {
     Reading reading;
     try {
-      CaptureReader reader(file);
+      const auto capture =
+          openCapture(file, {.tell = [&](const std::string& line) { reading.told.push_back(line); }});
       CaptureRecord record;
-      while (reader.next(record))
+      while (capture->next(record))
         reading.records.emplace_back(record.time, Bytes(record.message.begin(), record.message.end()));
     } catch (const CaptureError& error) {
       reading.error = error.what();
@@ -122,14 +124,14 @@ void expectOneLineAboutTheFile(const Reading& reading, const std::string& file) 
   EXPECT_THAT(*reading.error, Not(HasSubstr("\n")));
 }
 
-TEST_F(Capture, MicrosecondsInLittleEndian) {
+TEST_F(PcapFiles, MicrosecondsInLittleEndian) {
   const Reading reading =
       readBytes(FileBytes().pcapHeader(microsecondMagic).pcapRecord(1700000000, 250000, {1, 2, 3}).bytes);
   EXPECT_FALSE(reading.error);
   EXPECT_EQ(reading.records, (std::vector<Record>{{{1700000000, 250000000}, {1, 2, 3}}}));
 }
 
-TEST_F(Capture, NanosecondsInBigEndian) {
+TEST_F(PcapFiles, NanosecondsInBigEndian) {
   const Reading reading = readBytes(FileBytes(FileBytes::Order::Big)
                                         .pcapHeader(nanosecondMagic)
                                         .pcapRecord(1700000000, 123456789, {9})
@@ -139,7 +141,7 @@ TEST_F(Capture, NanosecondsInBigEndian) {
   EXPECT_EQ(reading.records, (std::vector<Record>{{{1700000000, 123456789}, {9}}, {{1700000001, 0}, {}}}));
 }
 
-TEST_F(Capture, NextGenerationFilesInBothByteOrders) {
+TEST_F(PcapFiles, NextGenerationFilesInBothByteOrders) {
   for (const auto order : {FileBytes::Order::Little, FileBytes::Order::Big}) {
     // 1,700,000,000.5 s in nanoseconds
     const Reading reading = readBytes(FileBytes(order)
@@ -152,13 +154,13 @@ TEST_F(Capture, NextGenerationFilesInBothByteOrders) {
   }
 }
 
-TEST_F(Capture, ACaptureWithoutRecordsIsFine) {
+TEST_F(PcapFiles, ACaptureWithoutRecordsIsFine) {
   const Reading reading = readBytes(FileBytes().pcapHeader(microsecondMagic).bytes);
   EXPECT_FALSE(reading.error);
   EXPECT_TRUE(reading.records.empty());
 }
 
-TEST_F(Capture, ASubSecondPartOfMoreThanASecondIsCarried) {
+TEST_F(PcapFiles, ASubSecondPartOfMoreThanASecondIsCarried) {
   const Reading reading = readBytes(FileBytes()
                                         .pcapHeader(microsecondMagic)
                                         .pcapRecord(100, 1500000, {1})
@@ -172,16 +174,16 @@ TEST_F(Capture, ASubSecondPartOfMoreThanASecondIsCarried) {
   EXPECT_LT(reading.records[2].first.nanoseconds, 1000000000);
 }
 
-TEST_F(Capture, AnotherLinkTypeIsAnError) {
+TEST_F(PcapFiles, AnotherLinkTypeIsAnError) {
   const Reading reading = readBytes(FileBytes().pcapHeader(microsecondMagic, 1).bytes);
   expectOneLineAboutTheFile(reading, path());
   EXPECT_THAT(*reading.error,
-              EndsWith(" has link type 1 (EN10MB), but captures of the log channel have link type "
-                       "147 (USER0)"));
+              EndsWith(" holds Ethernet frames (link type 1), but captures of the log channel have link type "
+                       "147 (USER0); capture what the modem's diagnostic port sends"));
   expectOneLineAboutTheFile(readBytes(FileBytes().pcapngHeader().pcapngInterface(1).bytes), path());
 }
 
-TEST_F(Capture, EveryTruncationIsAnErrorThatKeepsWhatCameBefore) {
+TEST_F(PcapFiles, EveryTruncationIsAnErrorThatKeepsWhatCameBefore) {
   const Bytes whole = FileBytes()
                           .pcapHeader(microsecondMagic)    // 24 bytes
                           .pcapRecord(1, 0, {1, 2, 3})     // up to 43
@@ -199,7 +201,7 @@ TEST_F(Capture, EveryTruncationIsAnErrorThatKeepsWhatCameBefore) {
   }
 }
 
-TEST_F(Capture, EveryTruncationOfANextGenerationFileIsAnError) {
+TEST_F(PcapFiles, EveryTruncationOfANextGenerationFileIsAnError) {
   const Bytes whole = FileBytes()
                           .pcapngHeader()                 // 28 bytes
                           .pcapngInterface(147)           // up to 60
@@ -218,7 +220,7 @@ TEST_F(Capture, EveryTruncationOfANextGenerationFileIsAnError) {
   }
 }
 
-TEST_F(Capture, ARecordThatWasCutShortIsAnError) {
+TEST_F(PcapFiles, ARecordThatWasCutShortIsAnError) {
   const Reading reading = readBytes(FileBytes()
                                         .pcapHeader(microsecondMagic)
                                         .pcapRecord(1, 0, {1})
@@ -235,8 +237,8 @@ TEST_F(Capture, ARecordThatWasCutShortIsAnError) {
                        "snapshot length"));
 }
 
-TEST_F(Capture, ARecordMayBeLongerThanTheFilesSnapshotLength) {
-  const Bytes large(1'100'000, 0x5A);
+TEST_F(PcapFiles, ARecordMayBeLongerThanTheFilesSnapshotLength) {
+  const Bytes large(1'048'576, 0x5A);
   for (const auto order : {FileBytes::Order::Little, FileBytes::Order::Big}) {
     const Reading reading =
         readBytes(FileBytes(order).pcapHeader(microsecondMagic, 147, 65535).pcapRecord(1, 0, large).bytes);
@@ -246,7 +248,48 @@ TEST_F(Capture, ARecordMayBeLongerThanTheFilesSnapshotLength) {
   }
 }
 
-TEST_F(Capture, ForeignFilesAreErrors) {
+TEST_F(PcapFiles, ARecordOfMoreThanAMebibyteIsLeftOutAndTold) {
+  const Bytes tooLarge(1'048'577, 0x5A);
+  for (const auto order : {FileBytes::Order::Little, FileBytes::Order::Big}) {
+    const Reading reading = readBytes(FileBytes(order)
+                                          .pcapHeader(microsecondMagic)
+                                          .pcapRecord(1, 0, {1})
+                                          .pcapRecord(2, 0, tooLarge)
+                                          .pcapRecord(3, 0, {3})
+                                          .bytes);
+    EXPECT_FALSE(reading.error) << *reading.error;
+    EXPECT_EQ(reading.records, (std::vector<Record>{{{1, 0}, {1}}, {{3, 0}, {3}}}));
+    EXPECT_EQ(reading.told, (std::vector<std::string>{
+                                path() + ", record 2 is left out: its 1048577 bytes are more than a message "
+                                         "may have, 1 MiB"}));
+  }
+}
+
+TEST_F(PcapFiles, SecondsAreUnsigned) {
+  const Reading reading =
+      readBytes(FileBytes().pcapHeader(microsecondMagic).pcapRecord(0xFFFFFFFF, 0, {1}).bytes);
+  EXPECT_EQ(reading.records, (std::vector<Record>{{{4294967295, 0}, {1}}}));
+}
+
+TEST_F(PcapFiles, MessagesOfTheAirInterfaceAreCalledSo) {
+  // Ethernet, IPv4 and UDP to port 4729.
+  Bytes packet(60);
+  packet[12] = 0x08;
+  packet[14] = 0x45;
+  packet[23] = 17;
+  packet[36] = 0x12;
+  packet[37] = 0x79;
+  const Reading reading =
+      readBytes(FileBytes().pcapHeader(microsecondMagic, 1).pcapRecord(1, 0, packet).bytes);
+  ASSERT_TRUE(reading.error);
+  EXPECT_EQ(*reading.error,
+            path() +
+                " holds messages of the air interface, sent over a network (link type 1), but "
+                "captures of the log channel have link type 147 (USER0); capture what the "
+                "modem's diagnostic port sends");
+}
+
+TEST_F(PcapFiles, ForeignFilesAreErrors) {
   expectOneLineAboutTheFile(readBytes({}), path());
   expectOneLineAboutTheFile(readBytes(Bytes(100, 'a')), path());
   expectOneLineAboutTheFile(read(path("missing.pcap")), path("missing.pcap"));
@@ -255,7 +298,7 @@ TEST_F(Capture, ForeignFilesAreErrors) {
                             std::filesystem::temp_directory_path().string());
 }
 
-TEST_F(Capture, ADashIsStandardInput) {
+TEST_F(PcapFiles, ADashIsStandardInput) {
   readBytes(FileBytes().pcapHeader(microsecondMagic).pcapRecord(7, 8, {9}).bytes);
   const int kept = ::dup(STDIN_FILENO);
   const int file = ::open(path().c_str(), O_RDONLY);
@@ -268,8 +311,8 @@ TEST_F(Capture, ADashIsStandardInput) {
   EXPECT_EQ(reading.records, (std::vector<Record>{{{7, 8000}, {9}}}));
 }
 
-TEST_F(Capture, WhatIsWrittenIsReadBack) {
-  const Bytes large(1'100'000, 0x5A);
+TEST_F(PcapFiles, WhatIsWrittenIsReadBack) {
+  const Bytes large(1'048'576, 0x5A);
   {
     CaptureWriter writer(path());
     writer.write({1700000000, 999999999}, Bytes{1, 2, 3});
@@ -285,7 +328,7 @@ TEST_F(Capture, WhatIsWrittenIsReadBack) {
                   {{1700000000, 999999999}, {1, 2, 3}}, {{1700000001, 0}, {}}, {{1700000001, 1}, large}}));
 }
 
-TEST_F(Capture, TheWriterWritesNanosecondsAndTheLinkType) {
+TEST_F(PcapFiles, TheWriterWritesNanosecondsAndTheLinkType) {
   CaptureWriter(path()).write({1, 2}, Bytes{3});
   std::ifstream file(path(), std::ios::binary);
   const std::string header(std::istreambuf_iterator<char>(file), {});
@@ -294,7 +337,13 @@ TEST_F(Capture, TheWriterWritesNanosecondsAndTheLinkType) {
   EXPECT_EQ(header.substr(20, 4), std::string("\x93\x00\x00\x00", 4));
 }
 
-TEST_F(Capture, AFileThatCannotBeWrittenIsAnError) {
+TEST_F(PcapFiles, TheWriterNamesTheTechnologyInPcapng) {
+  CaptureWriter(path(), ExistingRecording::Refused, "kalvi-lte").write({1, 2}, Bytes{3});
+  EXPECT_EQ(openCapture(path())->technology(), "kalvi-lte");
+  EXPECT_EQ(read(path()).records, (std::vector<Record>{{{1, 2}, {3}}}));
+}
+
+TEST_F(PcapFiles, AFileThatCannotBeWrittenIsAnError) {
   EXPECT_THROW(CaptureWriter(path("no/such/folder.pcap")), std::runtime_error);
   EXPECT_THROW(CaptureWriter("/dev/full").write({1, 2}, Bytes{3}), std::runtime_error);
 }

@@ -12,8 +12,8 @@
 #include "app/VarnelApp.h"
 #include "base/Log.h"
 #include "base/PropertyList.h"
-#include "host/Capture.h"
 #include "host/CaptureWriter.h"
+#include "host/captures/Capture.h"
 #include "programs/varnel/HostServices.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/EventLoop.h"
@@ -74,9 +74,9 @@ class WindowEndToEnd : public testing::Test {
   }
   std::vector<fs::path> snapshots() const { return {fs::directory_iterator(_logs), {}}; }
   std::vector<Bytes> sentMessages() const {
-    CaptureReader record(_record);
+    const auto record = openCapture(_record);
     std::vector<Bytes> messages;
-    for (CaptureRecord sent; record.next(sent);)
+    for (CaptureRecord sent; record->next(sent);)
       messages.emplace_back(sent.message.begin(), sent.message.end());
     return messages;
   }

@@ -45,12 +45,12 @@ class ProgressBarTest : public ::testing::Test {
   // Reads that many records with a bar. What was on the screen, at last and before the bar went.
   std::string shown(int records, std::chrono::milliseconds delay = 0ms,
                     ProgressBar::Output output = ProgressBar::Output::LeavesTerminalAlone) {
-    CaptureReader capture(folder.file("capture"));
+    const auto capture = openCapture(folder.file("capture"));
     setLogSink(&log, 3);
     {
-      ProgressBar bar(capture, output, log, 3, delay);
+      ProgressBar bar(*capture, output, log, 3, delay);
       CaptureRecord record;
-      for (int i = 0; i < records && capture.next(record); ++i) bar.recordRead();
+      for (int i = 0; i < records && capture->next(record); ++i) bar.recordRead();
       if (withLogLine) logError("a line");
     }
     EXPECT_EQ(logSink(), &log) << "the log is back in its place";

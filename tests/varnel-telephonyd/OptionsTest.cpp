@@ -41,7 +41,7 @@ TEST(TelephonydOptions, AReplayAndItsDefaults) {
   const Reading reading = read({"--replay", "walk.pcap"});
   EXPECT_EQ(reading.error, "");
   EXPECT_EQ(reading.options().replayPath, "walk.pcap");
-  EXPECT_EQ(reading.options().replayTechnology, "kalvi-lte");
+  EXPECT_FALSE(reading.options().replayTechnology);
   EXPECT_EQ(reading.options().speed, 1);
   EXPECT_FALSE(reading.options().loops);
   EXPECT_EQ(reading.options().logLevel, 3);

@@ -7,7 +7,7 @@
 #include <utility>
 #include <vector>
 
-#include "host/Capture.h"
+#include "host/captures/Capture.h"
 #include "tests/support/FileSizeLimit.h"
 #include "tests/support/Process.h"
 
@@ -28,8 +28,8 @@ class RecorderTest : public testing::Test {
   }
   std::vector<std::pair<Time, Bytes>> recorded() const {
     std::vector<std::pair<Time, Bytes>> records;
-    CaptureReader reader(path);
-    for (CaptureRecord record; reader.next(record);)
+    const auto reader = openCapture(path);
+    for (CaptureRecord record; reader->next(record);)
       records.emplace_back(record.time, Bytes(record.message.begin(), record.message.end()));
     return records;
   }

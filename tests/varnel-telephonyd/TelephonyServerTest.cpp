@@ -6,9 +6,8 @@
 #include <string>
 #include <vector>
 
-#include "host/Capture.h"
-#include "host/StreamReport.h"
 #include "host/CaptureWriter.h"
+#include "host/StreamReport.h"
 #include "programs/varnel-telephonyd/ReplaySource.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "tests/support/FakeQueue.h"

@@ -1,0 +1,44 @@
+#include "host/captures/ByteWindow.h"
+
+#include <algorithm>
+#include <cstring>
+
+namespace varnel {
+
+namespace {
+
+// Large enough that a read costs little beside what is done with its bytes, small enough for the cache.
+constexpr std::size_t smallest = 1 << 18;
+constexpr std::size_t leastRoom = smallest / 4;
+
+}  // namespace
+
+bool ByteWindow::more() {
+  if (_isAtEnd) return false;
+  makeRoom();
+  const std::size_t count = _source->read(std::span(_bytes).subspan(_end));
+  _end += count;
+  _isAtEnd = count == 0;
+  return !_isAtEnd;
+}
+
+bool ByteWindow::skip(std::uint64_t count) {
+  for (;;) {
+    const std::size_t now = static_cast<std::size_t>(std::min<std::uint64_t>(count, _end - _begin));
+    drop(now);
+    count -= now;
+    if (count == 0) return true;
+    if (!more()) return false;
+  }
+}
+
+void ByteWindow::makeRoom() {
+  if (_bytes.empty()) _bytes.resize(smallest);
+  if (_bytes.size() - _end >= leastRoom) return;
+  std::memmove(_bytes.data() + headroom, _bytes.data() + _begin, _end - _begin);
+  _end -= _begin - headroom;
+  _begin = headroom;
+  if (_bytes.size() - _end < leastRoom) _bytes.resize(_bytes.size() * 2);
+}
+
+}  // namespace varnel

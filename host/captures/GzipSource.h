@@ -1,0 +1,33 @@
+#pragma once
+
+#include <zlib.h>
+
+#include <string>
+
+#include "host/captures/ByteWindow.h"
+
+namespace varnel {
+
+/// What gzip has packed, be it in several pieces. Where the packed bytes are cut off the source ends after
+/// all that could be unpacked; damaged ones throw CaptureError.
+class GzipSource final : public ByteSource {
+ public:
+  GzipSource(ByteWindow packed, std::string name);
+  GzipSource(const GzipSource&) = delete;
+  GzipSource& operator=(const GzipSource&) = delete;
+  ~GzipSource() override;
+
+  std::size_t read(std::span<std::uint8_t> room) override;
+  std::uint64_t bytesRead() const override { return _packed.bytesRead(); }
+  std::optional<std::uint64_t> fileSize() const override { return _packed.fileSize(); }
+
+ private:
+  bool beginsNextPiece();
+
+  ByteWindow _packed;
+  std::string _name;
+  z_stream _stream{};
+  bool _isAtEnd = false;
+};
+
+}  // namespace varnel

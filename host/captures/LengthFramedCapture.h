@@ -1,0 +1,29 @@
+#pragma once
+
+#include <optional>
+#include <span>
+
+#include "host/captures/Capture.h"
+
+namespace varnel {
+
+/// The stream of a diagnostic port whose frames tell their length and need no escapes: 7E 01, the length (2),
+/// the contents, 7E.
+class LengthFramedCapture final : public Capture {
+ public:
+  explicit LengthFramedCapture(CaptureInput input) : Capture(std::move(input)) {}
+  bool next(CaptureRecord& record) override;
+
+ private:
+  std::optional<std::span<std::uint8_t>> nextContents();
+  void passOver();
+};
+
+/// Looks at the start of such a stream: the size of the frame that begins there, 0 when none does, nothing
+/// when there are too few bytes to say so.
+std::optional<std::size_t> lengthFrameAt(ByteView bytes);
+
+/// What stands around a frame's contents.
+inline constexpr std::size_t lengthFrameHeader = 4, lengthFrameTrailer = 1;
+
+}  // namespace varnel

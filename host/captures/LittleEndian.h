@@ -1,0 +1,27 @@
+#pragma once
+
+#include <bit>
+#include <cstdint>
+#include <cstring>
+
+#include "base/Bytes.h"
+
+namespace varnel {
+
+static_assert(std::endian::native == std::endian::little, "numbers are loaded and stored as they are");
+
+/// The little-endian number at an offset, which lies within the bytes.
+template <class Number>
+Number loadLittleEndian(ByteView bytes, std::size_t offset) {
+  Number number{};
+  std::memcpy(&number, bytes.data() + offset, sizeof number);
+  return number;
+}
+
+template <class Number>
+void appendLittleEndian(Bytes& bytes, Number number) {
+  const auto* const first = reinterpret_cast<const std::uint8_t*>(&number);
+  bytes.insert(bytes.end(), first, first + sizeof number);
+}
+
+}  // namespace varnel
