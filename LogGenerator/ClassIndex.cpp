@@ -38,6 +38,18 @@ Base* ClassIndex::getClass(std::string_view sectionName) const {
   return found == classDict.end() ? nullptr : found->second;
 }
 
+std::vector<CodeSections> ClassIndex::codeSections() const {
+  std::vector<CodeSections> list;
+  for (const std::uint32_t code : codeDictionary.codes()) {
+    CodeSections& entry = list.emplace_back(code);
+    for (const Base* decoder : getSubscribers(code)) {
+      const std::string_view name = decoder->getSectionName();
+      if (std::ranges::find(entry.sections, name) == entry.sections.end()) entry.sections.emplace_back(name);
+    }
+  }
+  return list;
+}
+
 void ClassIndex::listNumberFormats(NumberFormats& formats) const {
   for (const auto& [sectionName, decoder] : classDict) {
     SectionFormats section(formats, sectionName);

@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "LogGenerator/Base.h"
+#include "LogGenerator/CodeSections.h"
 #include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
@@ -32,6 +33,7 @@ class CodeDictionary {
   const Subscription* subscription(std::uint32_t code) const;
   /// Empty for a code that nobody wants.
   std::span<Base* const> subscribers(std::uint32_t code) const;
+  std::span<const std::uint32_t> codes() const { return _codes; }
   /// The codes as decimal texts.
   std::vector<std::string> keys() const;
 
@@ -59,6 +61,8 @@ class ClassIndex {
   std::span<Base* const> getSubscribers(std::uint32_t code) const { return codeDictionary.subscribers(code); }
   /// Every subscribed code as decimal text.
   std::vector<std::string> getAllLogCodes() const { return codeDictionary.keys(); }
+  /// Every subscribed code with the sections of its subscribers, each once.
+  std::vector<CodeSections> codeSections() const;
   /// How the sections of all decoders write numbers.
   void listNumberFormats(NumberFormats& formats) const;
   /// A debugging aid: logs what kind of object the class dictionary is.

@@ -90,6 +90,10 @@ NumberFormats KLVLogGenerator2::numberFormats() const {
   return formats;
 }
 
+std::vector<CodeSections> KLVLogGenerator2::codeSections() const {
+  return cIndex ? cIndex->codeSections() : std::vector<CodeSections>();
+}
+
 Value KLVLogGenerator2::getDisplayFromState(Dictionary& state) {
   if (const Value& display = state.get(stateKey::display); !display.isAbsent()) return display;
   Value displayTemplate = state.get(stateKey::displayTemplate);

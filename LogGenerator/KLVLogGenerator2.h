@@ -23,6 +23,7 @@ class KLVLogGenerator2 : public KLVLogGenerator {
   NumberFormats numberFormats() const override;
   std::optional<std::string> missingTemplate() const override;
   bool changesDisplayOf(const Dictionary& state) const override;
+  std::vector<CodeSections> codeSections() const override;
 
  protected:
   /// Takes ownership of both. A generator without a template resource has neither: it decodes nothing.

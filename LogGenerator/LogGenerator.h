@@ -7,6 +7,7 @@
 #include <string_view>
 #include <vector>
 
+#include "LogGenerator/CodeSections.h"
 #include "LogGenerator/MessageFate.h"
 #include "LogGenerator/NumberFormats.h"
 #include "LogGenerator/Services.h"
@@ -56,6 +57,9 @@ class LogGenerator {
   /// How the display writes its numbers; for those who want them without their units. Without packets, as
   /// here, nothing is known of units.
   virtual NumberFormats numberFormats() const { return {}; }
+  /// What the packets of each log code feed, in the order of the start command; for those who name packets.
+  /// Without packets, as here, nothing.
+  virtual std::vector<CodeSections> codeSections() const { return {}; }
   /// How many messages the binary log lacks because their interval had brought too much already. They were
   /// decoded like all others. Always 0 without a binary log, as here.
   virtual std::uint64_t messagesLeftOutOfLog() const { return 0; }

@@ -1,6 +1,7 @@
 #include "LogGenerator/C2K/C2KLogGenerator.h"
 
 #include <algorithm>
+#include <span>
 
 #include "LogGenerator/C2K/DisplayVariables.h"
 #include "LogGenerator/C2K/PacketDecoders.h"
@@ -26,19 +27,27 @@ struct PacketKind {
   Length rule;
   std::uint32_t length;  // of the whole packet
   void (*decode)(const Packet& packet, c2k::State& state, c2k::Lookup& lookup);
+  std::span<const c2k::Variable> published;
 };
 
 // In the order in which the start command asks for them.
 constexpr PacketKind packetKinds[] = {
-    {0x108A, Length::Minimum, c2k::fingerC2ISize, c2k::decodeFingerC2I},
-    {0x1183, Length::Exact, c2k::evdoStatusSize, c2k::decodeEVDOStatus},
-    {0x1192, Length::Minimum, c2k::flDataRateSize, c2k::decodeFLDataRate},
-    {0x12B6, Length::Minimum, c2k::evdoActiveSetSize, c2k::decodeEVDOActiveSet},
-    {0x119C, Length::Minimum, c2k::subpacketsSize, c2k::decode1xStatus},
-    {0x119D, Length::Minimum, c2k::subpacketsSize, c2k::decode1xTrafficFER},
-    {0x127E, Length::Minimum, c2k::rlDataRateSize, c2k::decodeRLDataRate},
-    {0x134F, Length::Minimum, c2k::systemInfoSize, c2k::decodeSystemInfo},
+    {0x108A, Length::Minimum, c2k::fingerC2ISize, c2k::decodeFingerC2I, c2k::fingerC2IVariables},
+    {0x1183, Length::Exact, c2k::evdoStatusSize, c2k::decodeEVDOStatus, c2k::evdoStatusVariables},
+    {0x1192, Length::Minimum, c2k::flDataRateSize, c2k::decodeFLDataRate, c2k::flDataRateVariables},
+    {0x12B6, Length::Minimum, c2k::evdoActiveSetSize, c2k::decodeEVDOActiveSet, c2k::evdoActiveSetVariables},
+    {0x119C, Length::Minimum, c2k::subpacketsSize, c2k::decode1xStatus, c2k::oneXStatusVariables},
+    {0x119D, Length::Minimum, c2k::subpacketsSize, c2k::decode1xTrafficFER, c2k::oneXTrafficFERVariables},
+    {0x127E, Length::Minimum, c2k::rlDataRateSize, c2k::decodeRLDataRate, c2k::rlDataRateVariables},
+    {0x134F, Length::Minimum, c2k::systemInfoSize, c2k::decodeSystemInfo, c2k::systemInfoVariables},
 };
+
+// Each variable is published by some packet.
+static_assert(std::ranges::all_of(c2k::variableNames, [](std::string_view name) {
+  return std::ranges::any_of(packetKinds, [&](const PacketKind& kind) {
+    return std::ranges::find(kind.published, name, &c2k::Variable::name) != kind.published.end();
+  });
+}));
 
 bool hasRightLength(const PacketKind& kind, const Packet& packet) {
   const auto length = static_cast<std::uint32_t>(packet.size());
@@ -70,6 +79,15 @@ void addFormats(std::string_view section, const Dictionary& rows, const Variable
       if (known.variable.name() == *variable) formats.add(section, name, known.format);
     }
   }
+}
+
+// Whether a template has a row for one of the variables.
+bool showsAny(const Dictionary& rows, std::span<const c2k::Variable> variables) {
+  return std::ranges::any_of(rows, [&](const Dictionary::Entry& row) {
+    if (const Dictionary* const inner = row.value.dictionary()) return showsAny(*inner, variables);
+    const std::string* const name = row.value.string();
+    return name && std::ranges::find(variables, *name, &c2k::Variable::name) != variables.end();
+  });
 }
 
 }  // namespace
@@ -168,6 +186,20 @@ NumberFormats C2KLogGenerator::numberFormats() const {
   const Value displayTemplate = services().resources.propertyList(templateName);
   if (const Dictionary* const rows = displayTemplate.dictionary()) addFormats({}, *rows, variables, formats);
   return formats;
+}
+
+std::vector<CodeSections> C2KLogGenerator::codeSections() const {
+  std::vector<CodeSections> list;
+  const Value displayTemplate = services().resources.propertyList(templateName);
+  for (const PacketKind& kind : packetKinds) {
+    CodeSections& entry = list.emplace_back(kind.logCode);
+    if (!displayTemplate.dictionary()) continue;
+    for (const auto& [key, section] : *displayTemplate.dictionary()) {
+      if (section.dictionary() && showsAny(*section.dictionary(), kind.published))
+        entry.sections.emplace_back(displayNameOfSortedKey(key));
+    }
+  }
+  return list;
 }
 
 // Any log type will do, as in decoding.

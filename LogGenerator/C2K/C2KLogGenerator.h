@@ -21,6 +21,8 @@ class C2KLogGenerator final : public KLVLogGenerator {
   NumberFormats numberFormats() const override;
   std::optional<std::string> missingTemplate() const override;
   bool changesDisplayOf(const Dictionary& state) const override;
+  /// The sections are those of the template that show a variable which the packet's decoder publishes.
+  std::vector<CodeSections> codeSections() const override;
 
   /// Fills the display, a dictionary, with the shape of the template, and the lookup with an array for each
   /// variable: a placement {"key": the row, "dict": the dictionary of the display that holds the row} for

@@ -21,6 +21,21 @@ inline constexpr std::uint32_t systemInfoSize = 171;
 inline constexpr std::uint32_t flDataRateSize = 241;
 inline constexpr std::uint32_t rlDataRateSize = 1750;
 
+/// The variables that each decoder publishes.
+inline constexpr Variable evdoStatusVariables[] = {
+    "kChannel", "k1xEVDODeviceState", "kBandClass",    "kRxAGC0", "kRxAGC1",
+    "kTxAGC",   "kServingPNOffset",   "kSessionState", "kUATI24", "kColorCode"};
+inline constexpr Variable evdoActiveSetVariables[] = {"kActiveSetPilots"};
+inline constexpr Variable fingerC2IVariables[] = {"kFingerC2I"};
+inline constexpr Variable oneXStatusVariables[] = {
+    "k1xDeviceState", "k1xRx0BandClass", "k1xRx0ChanNum", "k1xRxAGC0",        "k1xRx1BandClass",
+    "k1xRx1ChanNum",  "k1xRxAGC1",       "k1xTxAGC",      "k1xActiveSetInfo", "k1xTrafficFER"};
+inline constexpr Variable oneXTrafficFERVariables[] = {"k1xTrafficFER"};
+inline constexpr Variable systemInfoVariables[] = {"k1xRoamingHome", "kSystemId", "kNetworkId",
+                                                   "kPacketZoneId",  "kBaseId",   "kProtocolRevision"};
+inline constexpr Variable flDataRateVariables[] = {"kFLDataRate"};
+inline constexpr Variable rlDataRateVariables[] = {"kRLDataRate"};
+
 /// How the decoders of each file write numbers that have a unit or other texts around them; those of a
 /// variable that shows pilots hold for each of its pilots.
 void listEVDOFormats(std::vector<VariableFormat>& formats);
