@@ -41,7 +41,7 @@ Base* ClassIndex::getClass(std::string_view sectionName) const {
 std::vector<CodeSections> ClassIndex::codeSections() const {
   std::vector<CodeSections> list;
   for (const std::uint32_t code : codeDictionary.codes()) {
-    CodeSections& entry = list.emplace_back(code);
+    CodeSections& entry = list.emplace_back(CodeSections{code, {}});
     for (const Base* decoder : getSubscribers(code)) {
       const std::string_view name = decoder->getSectionName();
       if (std::ranges::find(entry.sections, name) == entry.sections.end()) entry.sections.emplace_back(name);

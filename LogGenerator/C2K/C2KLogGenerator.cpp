@@ -192,7 +192,7 @@ std::vector<CodeSections> C2KLogGenerator::codeSections() const {
   std::vector<CodeSections> list;
   const Value displayTemplate = services().resources.propertyList(templateName);
   for (const PacketKind& kind : packetKinds) {
-    CodeSections& entry = list.emplace_back(kind.logCode);
+    CodeSections& entry = list.emplace_back(CodeSections{kind.logCode, {}});
     if (!displayTemplate.dictionary()) continue;
     for (const auto& [key, section] : *displayTemplate.dictionary()) {
       if (section.dictionary() && showsAny(*section.dictionary(), kind.published))

@@ -9,6 +9,7 @@
 
 #include "host/CaptureWriter.h"
 #include "tests/support/Process.h"
+#include "tests/support/Tool.h"
 
 // What `cmake --install` makes of this build, in a folder that was not known when it was built.
 
@@ -20,15 +21,6 @@ using testing::HasSubstr;
 
 const std::string applicationID = "org.varnel.Varnel";
 const std::vector<std::string> programs = {"varnel", "varnel-decode", "varnel-telephonyd"};
-
-// A program that must be on this machine, by the folders where Debian keeps them.
-std::string tool(const std::string& name) {
-  for (const char* folder : {"/usr/bin/", "/usr/local/bin/"}) {
-    if (fs::exists(folder + name)) return folder + name;
-  }
-  ADD_FAILURE() << name << " is missing; ./dev setup installs it";
-  return "/bin/false";
-}
 
 void expectSuccess(const std::string& program, const std::vector<std::string>& arguments) {
   Process process(program, arguments);
@@ -99,6 +91,11 @@ TEST_F(Installation, TheDesktopFileNamesAProgramAndAnIconThatAreThere) {
   EXPECT_TRUE(fs::exists(installed("bin/varnel")));
   EXPECT_THAT(entry, HasSubstr("\nIcon=" + applicationID + "\n"));
   EXPECT_TRUE(fs::exists(installed("share/icons/hicolor/scalable/apps/" + applicationID + ".svg")));
+}
+
+TEST_F(Installation, TheDissectorIsThereWithItsTableOfLogCodes) {
+  EXPECT_THAT(contentsOf(installed("share/varnel/wireshark/varnel.lua")),
+              HasSubstr("[0xB17F] = {{\"LTE\", \"Serving Cell Measurements\"}}"));
 }
 
 TEST_F(Installation, ManualPagesHaveNoWarnings) {
