@@ -1,6 +1,7 @@
 #include "LogGenerator/NumberFormats.h"
 
 #include <algorithm>
+#include <optional>
 
 namespace varnel {
 
@@ -38,47 +39,93 @@ std::string_view numberBetween(std::string_view before, std::string_view after, 
   return isPlainNumber(text) ? text : std::string_view();
 }
 
+// What follows a name at the beginning of a path; nothing when the path begins with another name.
+std::optional<std::string_view> behindName(std::string_view path, std::string_view name) {
+  if (!path.starts_with(name)) return std::nullopt;
+  path.remove_prefix(name.size());
+  if (path.empty() || path.front() == '/' || path.front() == '[') return path;
+  return std::nullopt;
+}
+
+// The path from its next name on; empty when there is none.
+std::string_view fromNextName(std::string_view path) {
+  const std::size_t slash = path.find('/');
+  return slash == std::string_view::npos ? std::string_view() : path.substr(slash + 1);
+}
+
 }  // namespace
 
-std::string_view NumberFormats::Surroundings::unit() const {
+std::string_view EntryFormats::Surroundings::unit() const {
   std::string_view text = after.substr(std::min(after.find_first_not_of(' '), after.size()));
   return text.substr(0, text.find(" ("));  // a remark stands behind the unit
+}
+
+std::string_view EntryFormats::unit() const {
+  if (!_formats) return {};
+  const std::string_view unit = _formats->front().unit();
+  const bool areAlike = std::ranges::all_of(
+      *_formats, [&](const Surroundings& surroundings) { return surroundings.unit() == unit; });
+  return areAlike ? unit : std::string_view();
+}
+
+std::string_view EntryFormats::number(std::string_view value) const {
+  if (_formats) {
+    for (const Surroundings& surroundings : *_formats) {
+      const std::string_view number = numberBetween(surroundings.before, surroundings.after, value);
+      if (!number.empty()) return number;
+    }
+  }
+  return numberBetween({}, {}, value);
 }
 
 void NumberFormats::add(std::string_view section, std::string_view entry, const Format& format) {
   const bool showsTexts =
       format.kind == Format::Kind::Choice || !format.choices.empty() || !format.entries.empty();
   if (showsTexts || format.isHexadecimal) return;
-  _entries[{std::string(section), std::string(entry)}].push_back({format.before, format.after});
+  _sections[std::string(section)][std::string(entry)].push_back({format.before, format.after});
 }
 
-const std::vector<NumberFormats::Surroundings>* NumberFormats::find(std::span<const std::string> path) const {
+void NumberFormats::add(const NumberFormats& others) {
+  for (const auto& [section, entries] : others._sections) {
+    for (const auto& [entry, formats] : entries) {
+      auto& known = _sections[section][entry];
+      known.insert(known.end(), formats.begin(), formats.end());
+    }
+  }
+}
+
+EntryPlace NumberFormats::at(std::span<const std::string> path) const {
   for (std::size_t section = 0; section < path.size(); ++section) {
+    const auto entries = _sections.find(path[section]);
+    if (entries == _sections.end()) continue;
     for (std::size_t entry = section + 1; entry < path.size(); ++entry) {
-      const auto found = _entries.find({path[section], path[entry]});
-      if (found != _entries.end()) return &found->second;
+      const auto found = entries->second.find(path[entry]);
+      if (found != entries->second.end()) return {EntryFormats(found->second), entry + 1};
     }
   }
-  return nullptr;
+  return {};
 }
 
-std::string_view NumberFormats::unit(std::span<const std::string> path) const {
-  const auto* const formats = find(path);
-  if (!formats) return {};
-  const std::string_view unit = formats->front().unit();
-  const bool areAlike = std::ranges::all_of(
-      *formats, [&](const Surroundings& surroundings) { return surroundings.unit() == unit; });
-  return areAlike ? unit : std::string_view();
-}
-
-std::string_view NumberFormats::number(std::span<const std::string> path, std::string_view value) const {
-  if (const auto* const formats = find(path)) {
-    for (const Surroundings& surroundings : *formats) {
-      const std::string_view number = numberBetween(surroundings.before, surroundings.after, value);
-      if (!number.empty()) return number;
+EntryFormats NumberFormats::underSection(const Section& entries, std::string_view path) {
+  for (path = fromNextName(path); !path.empty(); path = fromNextName(path)) {
+    for (const auto& [name, formats] : entries) {
+      if (behindName(path, name)) return EntryFormats(formats);
     }
   }
-  return numberBetween({}, {}, value);
+  return {};
+}
+
+EntryFormats NumberFormats::under(std::string_view path) const {
+  if (path.starts_with('/')) path.remove_prefix(1);
+  for (; !path.empty(); path = fromNextName(path)) {
+    for (const auto& [name, entries] : _sections) {
+      const auto rest = behindName(path, name);
+      if (!rest) continue;
+      const EntryFormats found = underSection(entries, *rest);
+      if (found.areKnown()) return found;
+    }
+  }
+  return {};
 }
 
 }  // namespace varnel

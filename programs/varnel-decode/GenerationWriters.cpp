@@ -38,32 +38,69 @@ std::string treePath(std::string_view path) {
 }
 
 void EveryDisplay::take(const Generation& generation) {
+  const auto members = membersOf(generation.display);
+  if (!members) return;
   std::string line = "{";
   if (_captureName) line += "\"Capture\":" + jsonString(*_captureName) + ',';
-  line += "\"Time\":" + timeAsJson(generation) + ",\"Display\":";
-  writeOutput(_output, line + treeAsJson(generation.display) + "}\n");
+  line += "\"Time\":" + timeAsJson(generation) + ',';
+  writeOutput(_output, line + *members + "}\n");
 }
 
-std::string csvHeader(const std::vector<std::string>& paths, TableColumns columns) {
+std::optional<std::string> EveryDisplay::membersOf(const Value& display) {
+  if (_style.valuesAs == ValuesAs::Texts && _style.displays == Displays::All)
+    return "\"Display\":" + treeAsJson(display);
+  DisplayJson shown = displayJson(display, _style.valuesAs, _formats);
+  if (_style.displays == Displays::All) return wholeMembers(shown);
+  if (!_before) return wholeMembers(_before.emplace(std::move(shown)));
+  const auto change = mergePatch(_before->display, shown.display);
+  const auto changeOfUnits = mergePatch(_before->units, shown.units);
+  if (!change && !changeOfUnits) return std::nullopt;
+  _before = std::move(shown);
+  return "\"Display\":" + (change ? change->text() : "{}") +
+         (changeOfUnits ? ",\"Units\":" + changeOfUnits->text() : std::string());
+}
+
+std::string EveryDisplay::wholeMembers(const DisplayJson& display) const {
+  std::string members = "\"Display\":" + display.display.text();
+  if (_style.valuesAs == ValuesAs::Numbers) members += ",\"Units\":" + display.units.text();
+  return members;
+}
+
+std::string csvHeader(const std::vector<std::string>& paths, TableColumns columns,
+                      const NumberFormats& formats) {
   std::string line = columns == TableColumns::CaptureTimeAndValues ? "Capture,Time" : "Time";
-  for (const std::string& path : paths) line += ',' + csvField(treePath(path).substr(1));
+  for (const std::string& path : paths) {
+    const std::string_view unit = formats.under(path).unit();
+    const std::string title = treePath(path).substr(1);
+    line += ',' + csvField(unit.empty() ? title : title + " [" + std::string(unit) + ']');
+  }
   return line + '\n';
 }
 
 ValueTable::ValueTable(std::FILE* output, const std::vector<std::string>& paths,
-                       std::optional<std::string> captureName)
-    : _output(output), _captureName(std::move(captureName)) {
-  std::ranges::transform(paths, std::back_inserter(_paths), treePath);
+                       std::optional<std::string> captureName, WritingStyle style,
+                       const NumberFormats& formats)
+    : _output(output), _captureName(std::move(captureName)), _style(style) {
+  for (const std::string& path : paths) _columns.push_back({treePath(path), formats.under(path)});
 }
 
 void ValueTable::take(const Generation& generation) {
+  std::string values;
+  for (const Column& column : _columns) values += ',' + csvField(valueIn(column, generation.display));
+  if (_style.displays == Displays::Changed && _before == values) return;
   std::string line = _captureName ? csvField(*_captureName) + ',' : std::string();
   if (generation.dating == Dating::Known) line += timestamp(generation.time);
-  for (const std::string& path : _paths) {
-    line += ',';
-    if (const auto value = leafValueUnderPath(generation.display, path)) line += csvField(*value);
-  }
-  writeOutput(_output, line + '\n');
+  writeOutput(_output, line + values + '\n');
+  _before = std::move(values);
+}
+
+std::string_view ValueTable::valueIn(const Column& column, const Value& display) const {
+  const auto value = leafValueUnderPath(display, column.path);
+  if (!value) return {};
+  if (_style.valuesAs == ValuesAs::Texts) return *value;
+  if (isAbsent(*value)) return {};
+  const std::string_view number = column.formats.number(*value);
+  return number.empty() ? *value : number;
 }
 
 void SeenPaths::take(const Generation& generation) {

@@ -26,6 +26,7 @@
 #include "programs/varnel-decode/ProgressBar.h"
 #include "programs/varnel-decode/SnapshotFile.h"
 #include "programs/varnel-decode/StandardOutput.h"
+#include "programs/varnel-decode/TechnologyFormats.h"
 #include "programs/varnel-decode/TechnologyGuess.h"
 #include "programs/varnel-decode/Timestamps.h"
 
@@ -54,10 +55,6 @@ class InputDecoding {
         _isFirst(index == 0),
         _seen(watchedPaths(options)) {
     if (options.captures.size() > 1) _captureName = _path;
-    if (options.output == Output::EveryDisplay)
-      _streamed = std::make_unique<EveryDisplay>(stdout, _captureName);
-    if (options.output == Output::ValueTable)
-      _streamed = std::make_unique<ValueTable>(stdout, options.tablePaths, _captureName);
     if (options.plot) _recorder.emplace(options.plot->paths);
   }
 
@@ -69,7 +66,7 @@ class InputDecoding {
       isSnapshot = SnapshotFile::isPropertyList(*bytes);
     });
     if (!isOpen) return generalError;
-    if (isSnapshot) return showSnapshot(*bytes);
+    if (isSnapshot) return showSnapshot(*bytes, services);
     std::unique_ptr<Capture> capture;
     if (!succeeds([&] { capture = openCapture({std::move(*bytes), _name, tell}); })) return generalError;
     return decodeCapture(*capture, services);
@@ -80,6 +77,15 @@ class InputDecoding {
     std::vector<std::string> paths = options.tablePaths;
     if (options.plot) paths.insert(paths.end(), options.plot->paths.begin(), options.plot->paths.end());
     return paths;
+  }
+
+  void startStream(const std::optional<std::string>& technology, const DecodingServices& services) {
+    _formats = formatsFor(_options, technology, services);
+    if (_options.output == Output::EveryDisplay)
+      _streamed = std::make_unique<EveryDisplay>(stdout, _captureName, _options.style, _formats);
+    if (_options.output == Output::ValueTable)
+      _streamed =
+          std::make_unique<ValueTable>(stdout, _options.tablePaths, _captureName, _options.style, _formats);
   }
 
   // What the user says overrules what the capture says.
@@ -95,6 +101,7 @@ class InputDecoding {
     const auto technology = technologyOf(capture, _options, services.technologies);
     if (!technology)
       return mistake("--technology is needed to decode " + _name + ", a capture that names none").code;
+    startStream(technology, services);
     const int status = decodeCaptureOf(*technology, capture, services);
     tellGuess(*technology, services);
     return status;
@@ -165,7 +172,8 @@ class InputDecoding {
     tell(_guess.sentence(_name, technology, services.technologies, services.services));
   }
 
-  int showSnapshot(ByteWindow& bytes) {
+  int showSnapshot(ByteWindow& bytes, const DecodingServices& services) {
+    startStream(_options.technology, services);
     if (countsMessages())
       return mistake("--stats counts the messages of captures, but " + _name + " is a snapshot").code;
     if (_options.snapshotPath)
@@ -301,6 +309,7 @@ class InputDecoding {
   const std::string _name;  // as errors and headings tell it
   const bool _isFirst;
   std::optional<std::string> _captureName;    // in the output; absent when there is but one
+  NumberFormats _formats;                     // of what is streamed
   std::unique_ptr<GenerationSink> _streamed;  // to standard output
   std::optional<PlotRecorder> _recorder;
   SeenPaths _seen;
@@ -313,6 +322,12 @@ class InputDecoding {
 };
 
 }  // namespace
+
+NumberFormats formatsFor(const Options& options, const std::optional<std::string>& technology,
+                         const DecodingServices& services) {
+  if (options.style.valuesAs == ValuesAs::Texts) return {};
+  return numberFormatsOf(technology, services.technologies, services.services);
+}
 
 int decodeInput(const Options& options, std::size_t index, const DecodingServices& services) {
   return InputDecoding(options, index).run(services);

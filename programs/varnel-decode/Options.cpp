@@ -39,6 +39,8 @@ struct Wishes {
   std::string format;
   bool isEvery = false;
   bool isFollowing = false;
+  bool isNumbers = false;
+  bool isChanges = false;
   bool isStatistics = false;
   std::vector<std::string> plot;
 };
@@ -83,6 +85,11 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
                                "write the values under these paths as CSV, a row for each display")
                     ->type_name("PATH")
                     ->excludes(every);
+  app.add_flag("--numbers", wishes.isNumbers,
+               "with --every and --csv: write plain numbers, and their units apart");
+  app.add_flag(
+      "--changes", wishes.isChanges,
+      "with --every and --csv: write displays that differ from the one before, as JSON what differs");
   app.add_flag("--stats", wishes.isStatistics,
                "count the messages of each log code: received, decoded, too short, too long, unknown")
       ->excludes(every)
@@ -101,6 +108,10 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
   if (wishes.isEvery && !format.empty() && format != "json") return "--every writes --format json only";
   if (!options.tablePaths.empty() && !format.empty())
     return "--csv is a format of its own; leave out --format";
+  if (const bool isStream = wishes.isEvery || !options.tablePaths.empty(); !isStream) {
+    if (wishes.isNumbers) return "--numbers goes with --every or --csv";
+    if (wishes.isChanges) return "--changes goes with --every or --csv";
+  }
   if (wishes.isStatistics && !format.empty() && format != "text" && format != "json")
     return "--stats writes --format text or json only";
   if (std::ranges::any_of(options.captures, &std::string::empty)) return "the name of a capture is empty";
@@ -148,6 +159,8 @@ void fulfil(Options& options, const Wishes& wishes) {
   const std::string format = wishes.format.empty() ? "text" : wishes.format;
   options.output = outputFor(options, wishes);
   if (wishes.isFollowing) options.atEnd = AtEndOfFile::WaitForMore;
+  if (wishes.isNumbers) options.style.valuesAs = ValuesAs::Numbers;
+  if (wishes.isChanges) options.style.displays = Displays::Changed;
   options.writeDisplay = writerNamed(format);
   const bool isForReading = (options.output == Output::Display && (format == "text" || format == "paths")) ||
                             options.output == Output::StatisticsTable;

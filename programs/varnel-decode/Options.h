@@ -8,6 +8,7 @@
 
 #include "base/Log.h"
 #include "host/captures/ByteSource.h"
+#include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/TreeWriters.h"
 
 namespace varnel {
@@ -33,6 +34,7 @@ struct Options {
   Output output = Output::Display;
   DisplayWriter writeDisplay = displayAsText;
   std::vector<std::string> tablePaths;  ///< the columns of a value table
+  WritingStyle style;                   ///< of every display and of a value table
   /// The highest priority number that goes to standard error; -1 for none. The decoders' own remarks, such as
   /// that one of several decoders of a log code does not know it, are of no use beside counts.
   int logLevel = logErrorPriority - 1;

@@ -36,6 +36,12 @@ std::vector<std::string> technologiesWithGenerator(const Services& services) {
   return names;
 }
 
+std::string headerOf(const Options& options, const DecodingServices& services) {
+  const auto columns =
+      options.captures.size() > 1 ? TableColumns::CaptureTimeAndValues : TableColumns::TimeAndValues;
+  return csvHeader(options.tablePaths, columns, formatsFor(options, options.technology, services));
+}
+
 int decodeAll(const Options& options, const DecodingServices& services) {
   if (options.technology && !succeeds([] { static_cast<void>(readableResourceFolder()); }))
     return generalError;
@@ -43,9 +49,7 @@ int decodeAll(const Options& options, const DecodingServices& services) {
   const auto decodeOne = [&](std::size_t index) { return decodeInput(options, index, services); };
   const bool isPassedOn = succeeds([&] {
     const bool areSeveral = options.captures.size() > 1;
-    if (options.output == Output::ValueTable)
-      writeOutput(stdout, csvHeader(options.tablePaths, areSeveral ? TableColumns::CaptureTimeAndValues
-                                                                   : TableColumns::TimeAndValues));
+    if (options.output == Output::ValueTable) writeOutput(stdout, headerOf(options, services));
     status = areSeveral ? runJobs(options.captures, options.jobs, decodeOne) : decodeOne(0);
   });
   return isPassedOn ? status : generalError;

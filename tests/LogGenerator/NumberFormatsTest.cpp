@@ -44,6 +44,36 @@ TEST(NumberFormats, AnEntryOfARecordIsFoundBelowItsSectionAndGroup) {
   EXPECT_EQ(formats.unit(Path{"1x", "Active Set", "84"}), "dB") << "a pilot of a list of pilots";
 }
 
+TEST(NumberFormats, APathAsUsersWriteItLeadsToItsEntry) {
+  NumberFormats formats;
+  formats.add("Neighbors", "RSRP", real("%4.2f dBm"));
+  formats.add("1x", "Active Set", real("%+.2f dB"));
+  formats.add("A/B", "C/D", real("%.0f sec"));
+  for (const char* path : {"Neighbors/0/RSRP", "/Neighbors/RSRP", "LTE/Neighbors/7/RSRP",
+                           "Neighbors[ID=16]/RSRP", "/Neighbors[Name=a/b][ID=16]/RSRP"})
+    EXPECT_EQ(formats.under(path).unit(), "dBm") << path;
+  EXPECT_EQ(formats.under("1x/Active Set/84").unit(), "dB");
+  EXPECT_EQ(formats.under("1x/Active Set[84=x]").unit(), "dB");
+  EXPECT_EQ(formats.under("/A/B/C/D").unit(), "sec");
+  EXPECT_EQ(formats.under("Neighbors[ID=16]/RSRP").number("-1.00 dBm"), "-1.00");
+  for (const char* path : {"Neighbors/RSRPs", "Neighbor/RSRP", "RSRP", "RSRP/Neighbors", "", "/", "//",
+                           "Neighbors[", "Neighbors/"})
+    EXPECT_EQ(formats.under(path).unit(), "") << path;
+}
+
+TEST(NumberFormats, OfSeveralTechnologiesAnEntryHasTheUnitThatAllShow) {
+  NumberFormats one, other;
+  one.add("Cell", "RSRP", real("%4.2f dBm"));
+  one.add("Cell", "Level", real("%4.2f dBm"));
+  other.add("Cell", "RSRP", real("%.0f dBm"));
+  other.add("Cell", "Level", integer("%d dB"));
+  other.add("Set", "Power", integer("%d dB"));
+  one.add(other);
+  EXPECT_EQ(one.unit(Path{"Cell", "RSRP"}), "dBm");
+  EXPECT_EQ(one.unit(Path{"Cell", "Level"}), "");
+  EXPECT_EQ(one.unit(Path{"Set", "Power"}), "dB");
+}
+
 TEST(NumberFormats, AnEntryWithTwoUnitsHasNone) {
   NumberFormats formats;
   formats.add("UMTS Set", "RSCP", integer("%d dB"));

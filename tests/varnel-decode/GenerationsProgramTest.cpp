@@ -94,6 +94,86 @@ TEST_F(DecodeGenerations, CsvTakesCapturesBeforeItOrBehindADoubleDash) {
   EXPECT_EQ(run({"--technology", "kalvi-lte", "--csv", antennasPath, "--", path}).output, expected);
 }
 
+// The serving cell's average RSRP: a quarter of the steps above -140 dBm, which stand from bit 1 of byte 22
+// on.
+std::string averageRsrp(int steps) {
+  std::string payload(33 - 13, '\0');
+  payload[22 - 13] = static_cast<char>(steps << 1 & 0xFF);
+  payload[23 - 13] = static_cast<char>(steps >> 7);
+  return packet(1, 0xB17F, payload);
+}
+
+// -93.25 dBm, the same again, -93.00 dBm.
+std::string threeMeasurements() {
+  return pcapHeader() + pcapRecord(afternoon, 0, averageRsrp(187)) +
+         pcapRecord(afternoon + 2, 0, averageRsrp(187)) + pcapRecord(afternoon + 4, 0, averageRsrp(188));
+}
+
+TEST_F(DecodeGenerations, NumbersOfCsvArePlainAndTheHeaderHasTheUnit) {
+  const Result result =
+      decode(threeMeasurements(), {"--numbers", "--csv", "Serving Cell Measurements/Average RSRP",
+                                   "Serving Cell Info/Num Tx Antennas", "--"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_EQ(result.output,
+            "Time,Serving Cell Measurements/Average RSRP [dBm],Serving Cell Info/Num Tx Antennas\n"
+            "2024-03-01T14:05:11.000Z,-93.25,\n"
+            "2024-03-01T14:05:13.000Z,-93.25,\n"
+            "2024-03-01T14:05:13.000Z,-93.00,\n");
+}
+
+TEST_F(DecodeGenerations, ASelectedRecordHasTheUnitOfItsList) {
+  const Result result =
+      decode(threeMeasurements(),
+             {"--numbers", "--csv", "Neighbor Cells List[Physical Cell ID=16]/Measured RSRP", "--"});
+  EXPECT_THAT(result.output,
+              StartsWith("Time,Neighbor Cells List[Physical Cell ID=16]/Measured RSRP [dBm]\n"));
+}
+
+TEST_F(DecodeGenerations, NumbersOfJsonHaveTheirUnitsApart) {
+  const Result result = decode(threeMeasurements(), {"--numbers", "--every"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  ASSERT_EQ(linesOf(result.output), 3u);
+  EXPECT_THAT(result.output, HasSubstr("\"Average RSRP\":-93.25,"));
+  EXPECT_THAT(result.output, HasSubstr("\"Average RSRP\":-93.00,"));
+  EXPECT_THAT(result.output,
+              HasSubstr("\"Units\":{\"Serving Cell Measurements\":{\"Measured RSRP\":\"dBm\","));
+}
+
+TEST_F(DecodeGenerations, ChangesLeaveOutWhatIsAsItWas) {
+  const Result table = decode(threeMeasurements(), {"--changes", "--numbers", "--csv",
+                                                    "Serving Cell Measurements/Average RSRP", "--"});
+  EXPECT_EQ(table.output,
+            "Time,Serving Cell Measurements/Average RSRP [dBm]\n"
+            "2024-03-01T14:05:11.000Z,-93.25\n"
+            "2024-03-01T14:05:13.000Z,-93.00\n");
+  const Result json = decode(threeMeasurements(), {"--changes", "--numbers", "--every"});
+  ASSERT_EQ(linesOf(json.output), 2u) << json.output;
+  EXPECT_EQ(json.output.substr(json.output.find('\n') + 1),
+            "{\"Time\":\"2024-03-01T14:05:13.000Z\",\"Display\":{\"Serving Cell Measurements\":"
+            "{\"Average RSRP\":-93.00}}}\n");
+}
+
+TEST_F(DecodeGenerations, ChangesBeginAnewWithEachCapture) {
+  const std::string one = write("one", threeMeasurements()), other = write("other", threeMeasurements());
+  const Result result = run({"--technology", "kalvi-lte", "--jobs", "2", "--every", "--changes", one, other});
+  EXPECT_EQ(result.status, 0) << result.error;
+  ASSERT_EQ(linesOf(result.output), 4u) << result.output;
+  const std::string start = "{\"Capture\":\"" + other + "\",\"Time\":\"2024-03-01T14:05:1";
+  EXPECT_THAT(result.output, HasSubstr(start + "1.000Z\",\"Display\":{\"Serving Cell Info\":{"));
+  EXPECT_THAT(result.output, HasSubstr(start + "3.000Z\",\"Display\":{\"Serving Cell Measurements\":"
+                                               "{\"Average RSRP\":\"-93.00 dBm\"}}}\n"));
+}
+
+TEST_F(DecodeGenerations, NumbersAndChangesNeedSomethingToWriteThemIn) {
+  for (const char* option : {"--numbers", "--changes"}) {
+    for (const char* other : {"--format=json", "--stats"}) {
+      const Result result = decode(threeMeasurements(), {option, other});
+      EXPECT_EQ(result.status, 2);
+      EXPECT_THAT(result.error, HasSubstr(std::string(option) + " goes with --every or --csv"));
+    }
+  }
+}
+
 // Ten rounds of a hundred records in 9.9 s each, every one dated an hour before the last.
 std::string setBackAgainAndAgain() {
   std::string capture = pcapHeader();

@@ -42,6 +42,20 @@ class DecodeSnapshot : public DecodeProgram {
   }
 };
 
+TEST_F(DecodeSnapshot, UnitsAreThoseThatNoTechnologyContradictsOrThatOfTheOneNamed) {
+  std::string items = displayItem("2024-03-01 14:05:11 +0000", "-85.25 dBm");
+  items.replace(items.find("<key>Cell</"), 11, "<key>Serving Cell Measurements</");
+  items.replace(items.find("Level"), 5, "Average RSRP");
+  const std::string path = "Serving Cell Measurements/Average RSRP";
+  const std::string expected = "Time," + path + " [dBm]\n2024-03-01T14:05:11.000Z,-85.25\n";
+  EXPECT_EQ(show(snapshot(items), {"--numbers", "--csv", path, "--"}).output, expected);
+  EXPECT_EQ(show(snapshot(items), {"--technology", "kalvi-lte", "--numbers", "--csv", path, "--"}).output,
+            expected);
+  EXPECT_EQ(show(snapshot(items), {"--technology", "ifx-gsm", "--numbers", "--csv", path, "--"}).output,
+            "Time," + path + "\n2024-03-01T14:05:11.000Z,-85.25 dBm\n")
+      << "whose displays have no such entry";
+}
+
 TEST_F(DecodeSnapshot, ShowsTheStoredDisplaysWithoutRawBytes) {
   const Result result = show(snapshot(twoDisplays() + binaryLog));
   EXPECT_EQ(result.status, 0) << result.error;

@@ -1,0 +1,15 @@
+#include "programs/varnel-decode/TechnologyFormats.h"
+
+#include "LogGenerator/LogGenerator.h"
+
+namespace varnel {
+
+NumberFormats numberFormatsOf(const std::optional<std::string>& technology,
+                              const std::vector<std::string>& technologies, const Services& services) {
+  NumberFormats formats;
+  for (const std::string& name : technology ? std::vector{*technology} : technologies)
+    formats.add(LogGenerator::generatorFromTechnology(name, services)->numberFormats());
+  return formats;
+}
+
+}  // namespace varnel

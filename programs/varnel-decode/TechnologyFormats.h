@@ -1,0 +1,17 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "LogGenerator/NumberFormats.h"
+#include "LogGenerator/Services.h"
+
+namespace varnel {
+
+/// How displays of a technology write their numbers. Where it is not known, as that of a snapshot, all
+/// formats of all technologies: an entry that two of them show in different units has none then.
+NumberFormats numberFormatsOf(const std::optional<std::string>& technology,
+                              const std::vector<std::string>& technologies, const Services& services);
+
+}  // namespace varnel
