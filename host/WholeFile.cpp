@@ -9,8 +9,7 @@
 #include <string>
 
 #include "base/PropertyList.h"
-#include "host/FileBeside.h"
-#include "host/OutputStream.h"
+#include "host/OutputFile.h"
 
 namespace varnel {
 
@@ -73,22 +72,32 @@ std::optional<Bytes> readWholeFile(const std::filesystem::path& path) {
   return bytes;
 }
 
-std::error_code writeWholeFile(const std::filesystem::path& path, ByteView bytes, ReplacedMode mode) {
-  const Predecessor predecessor = predecessorAt(path);
+std::error_code WholeFileWriter::open() {
+  const Predecessor predecessor = predecessorAt(_path);
   if (predecessor.failure) return predecessor.failure;
-  FileBeside file(path);
-  if (const auto failure = file.make()) return failure;
-  if (const auto failure = writeAll(file.descriptor(), bytes)) return failure;
-  const bool keepsMode = mode == ReplacedMode::Kept && predecessor.mode != ownerAlone;
-  if (keepsMode && ::fchmod(file.descriptor(), predecessor.mode) != 0) return lastSystemError();
-  if (const auto failure = synchronise(file.descriptor())) return failure;
-  return file.takePlace();
+  _oldMode = predecessor.mode;
+  return _file.make();
+}
+
+std::error_code WholeFileWriter::finish() {
+  const bool keepsMode = _mode == ReplacedMode::Kept && _oldMode != ownerAlone;
+  if (keepsMode && ::fchmod(_file.descriptor(), _oldMode) != 0) return lastSystemError();
+  if (const auto failure = synchronise(_file.descriptor())) return failure;
+  return _file.takePlace();
+}
+
+std::error_code writeWholeFile(const std::filesystem::path& path, ByteView bytes, ReplacedMode mode) {
+  WholeFileWriter file(path, mode);
+  if (const auto failure = file.open()) return failure;
+  if (const auto failure = file.write(bytes)) return failure;
+  return file.finish();
 }
 
 std::error_code writeOutputFile(const std::filesystem::path& path, ByteView bytes) {
-  if (!isStream(path)) return writeWholeFile(path, bytes);
-  const FileDescriptor stream = openStream(path);
-  return stream.isOpen() ? writeAll(stream.number(), bytes) : lastSystemError();
+  OutputFile file(path);
+  if (const auto failure = file.open()) return failure;
+  if (const auto failure = file.write(bytes)) return failure;
+  return file.finish();
 }
 
 std::error_code isLinkError() { return errorOf(NameError::IsLink); }

@@ -1,10 +1,15 @@
 #pragma once
 
+#include <sys/types.h>
+
 #include <filesystem>
 #include <optional>
 #include <system_error>
+#include <utility>
 
 #include "base/Bytes.h"
+#include "host/FileBeside.h"
+#include "host/OutputStream.h"
 
 namespace varnel {
 
@@ -24,6 +29,25 @@ enum class ReplacedMode {
 /// and a file that may not be written. The error's message is a phrase for users.
 std::error_code writeWholeFile(const std::filesystem::path& path, ByteView bytes,
                                ReplacedMode mode = ReplacedMode::OwnerAlone);
+
+/// The same, written piece by piece.
+class WholeFileWriter final {
+ public:
+  explicit WholeFileWriter(std::filesystem::path path, ReplacedMode mode = ReplacedMode::OwnerAlone)
+      : _path(path), _mode(mode), _file(std::move(path)) {}
+
+  /// To be called first; the others only when it is no error.
+  std::error_code open();
+  std::error_code write(ByteView bytes) { return writeAll(_file.descriptor(), bytes); }
+  /// Has the file take its place. Without it the old one stays.
+  std::error_code finish();
+
+ private:
+  const std::filesystem::path _path;
+  const ReplacedMode _mode;
+  mode_t _oldMode = 0;
+  FileBeside _file;
+};
 
 /// Writes what the user has named for output. A pipe, a terminal and the like (`isStream`) get the bytes as
 /// they come, anything else as a whole file.

@@ -24,8 +24,10 @@
 #include "programs/varnel-decode/Printable.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/ProgressBar.h"
+#include "programs/varnel-decode/RecordOutputs.h"
 #include "programs/varnel-decode/SnapshotFile.h"
 #include "programs/varnel-decode/StandardOutput.h"
+#include "programs/varnel-decode/Subscriptions.h"
 #include "programs/varnel-decode/TechnologyFormats.h"
 #include "programs/varnel-decode/TechnologyGuess.h"
 #include "programs/varnel-decode/Timestamps.h"
@@ -53,7 +55,9 @@ class InputDecoding {
         _path(options.captures[index]),
         _name(captureName(_path)),
         _isFirst(index == 0),
-        _seen(watchedPaths(options)) {
+        _seen(watchedPaths(options)),
+        _subscriptions(options.subscription),
+        _outputs(options) {
     if (options.captures.size() > 1) _captureName = _path;
     if (options.plot) _recorder.emplace(options.plot->paths);
   }
@@ -98,6 +102,7 @@ class InputDecoding {
   }
 
   int decodeCapture(Capture& capture, const DecodingServices& services) {
+    if (isConvertingAlone()) return convert(capture);
     const auto technology = technologyOf(capture, _options, services.technologies);
     if (!technology)
       return mistake("--technology is needed to decode " + _name + ", a capture that names none").code;
@@ -108,12 +113,15 @@ class InputDecoding {
   }
 
   int decodeCaptureOf(const std::string& technology, Capture& capture, const DecodingServices& services) {
+    _outputs.open();
     HostLog log({.standardErrorLevel = _options.logLevel, .systemLog = HostLog::SystemLog::Unused});
     const auto generator = LogGenerator::generatorFromTechnology(technology, services.services);
     OfflineDecoder decoder(*generator, services.clock, isSaving() ? RawBytes::Kept : RawBytes::NotKept);
 
     bool isDone = succeeds([&] { read(capture, *generator, decoder, log, services.templates); });
     if (services.templates.missing()) return failWithout(*services.templates.missing());
+    _statistics.setCapture(_subscriptions.counts(), capture.leftOut());
+    isDone &= finishOutputs();
     if (isDone && !isPointless()) isDone = succeeds([&] { requireRecords(decoder); });
     tellClockSteps(decoder.clockSteps());
     const Value display = decoder.finish();
@@ -137,9 +145,41 @@ class InputDecoding {
     return generalError;
   }
 
+  // When there are some, tells what users should know of those that were not decoded.
   void requireRecords(const OfflineDecoder& decoder) const {
+    const auto remark = _subscriptions.remark(_name);
     if (!decoder.hasStarted())
-      throw std::runtime_error(_name + " has no records, so there is nothing to show");
+      throw std::runtime_error(remark.value_or(_name + " has no records, so there is nothing to show"));
+    if (remark) tell(*remark);
+  }
+
+  // Whether nobody wants to see what the records say.
+  bool isConvertingAlone() const {
+    return !_outputs.areNone() && _options.output == Output::Display &&
+           _options.writeDisplay == displayAsNothing && !_recorder && !isSaving();
+  }
+
+  int convert(Capture& capture) {
+    _outputs.open();
+    CaptureRecord record;
+    bool isDone = succeeds([&] {
+      while (capture.next(record)) pass(record);
+      if (_subscriptions.counts().empty())
+        throw std::runtime_error(_name + " has no records, so there is nothing to write");
+    });
+    isDone &= finishOutputs();
+    return isDone ? 0 : generalError;
+  }
+
+  // Without records earlier files stay.
+  bool finishOutputs() { return _subscriptions.counts().empty() || _outputs.finish(_name); }
+
+  // Counts the record and writes it to the outputs. Whether it is to be decoded.
+  bool pass(const CaptureRecord& record) {
+    const bool isChosen = _subscriptions.take(record);
+    // What nobody has chosen is kept where nothing is mixed up by it.
+    if (isChosen || !_options.subscription) _outputs.write(record);
+    return isChosen;
   }
 
   void read(Capture& capture, const LogGenerator& generator, OfflineDecoder& decoder, HostLog& log,
@@ -153,6 +193,7 @@ class InputDecoding {
     CaptureRecord record;
     while (!isPointless() && !templates.missing() && capture.next(record)) {
       progress.recordRead();
+      if (!pass(record)) continue;
       if (isCounting || !_guess.isAnyKnown()) count(record.message, generator.fateOf(record.message));
       if (const auto generation = decoder.fireTicks(record.time)) report(*generation);
       _elapsed.record(record.time);
@@ -176,6 +217,12 @@ class InputDecoding {
     startStream(_options.technology, services);
     if (countsMessages())
       return mistake("--stats counts the messages of captures, but " + _name + " is a snapshot").code;
+    if (!_outputs.areNone())
+      return mistake("--records, --pcap and --framed write the records of captures, but " + _name +
+                     " is a snapshot")
+          .code;
+    if (_options.subscription)
+      return mistake("--sim chooses among the records of captures, but " + _name + " is a snapshot").code;
     if (_options.snapshotPath)
       return mistake("--snapshot saves what was decoded of a capture, but " + _name + " is a snapshot").code;
     std::optional<SnapshotFile> snapshot;
@@ -204,7 +251,7 @@ class InputDecoding {
   }
 
   // Whether nobody would see what else the capture holds.
-  bool isPointless() const { return _isOutputBroken && !_recorder && !isSaving(); }
+  bool isPointless() const { return _isOutputBroken && !_recorder && !isSaving() && _outputs.areNone(); }
 
   bool isSaving() const { return _options.snapshotPath || _options.binaryLogPath; }
 
@@ -313,6 +360,8 @@ class InputDecoding {
   std::unique_ptr<GenerationSink> _streamed;  // to standard output
   std::optional<PlotRecorder> _recorder;
   SeenPaths _seen;
+  Subscriptions _subscriptions;
+  RecordOutputs _outputs;
   MessageStatistics _statistics;
   TechnologyGuess _guess;
   ElapsedTime _elapsed;

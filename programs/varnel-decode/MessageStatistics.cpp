@@ -7,6 +7,31 @@
 
 namespace varnel {
 
+namespace {
+
+// What is left out, by the names that users read. Bytes come last, for they are no frames.
+struct LeftOutKind {
+  const char* name;
+  std::uint64_t LeftOut::*count;
+};
+constexpr LeftOutKind frameKinds[] = {
+    {"Bad checksum", &LeftOut::badChecksum},
+    {"Torn", &LeftOut::torn},
+    {"Other commands", &LeftOut::otherCommands},
+    {"Encrypted", &LeftOut::encrypted},
+    {"Broken", &LeftOut::broken},
+    {"Too long", &LeftOut::tooLong},
+};
+constexpr LeftOutKind noise{"Noise bytes", &LeftOut::noiseBytes};
+
+std::string countLine(const std::string& name, std::uint64_t count) {
+  char line[64];
+  std::snprintf(line, sizeof line, "%-14s  %8" PRIu64 "\n", name.c_str(), count);
+  return line;
+}
+
+}  // namespace
+
 using Outcome = MessageFate::Outcome;
 
 void MessageStatistics::Counts::add(Outcome outcome) {
@@ -61,7 +86,37 @@ std::string MessageStatistics::tableLine(const std::string& name, const Counts& 
 std::string MessageStatistics::asTable() const {
   std::string table = "Log code        Received      Decoded    Too short     Too long      Unknown\n";
   for (const auto& [kind, counts] : _counts) table += tableLine(kind.name(), counts);
-  return table + tableLine("Total", _total);
+  return table + tableLine("Total", _total) + frameLines() + subscriptionLines();
+}
+
+void MessageStatistics::setCapture(const Subscriptions::Counts& records, const LeftOut& leftOut) {
+  _records = records;
+  _leftOut = leftOut;
+}
+
+std::uint64_t MessageStatistics::recordCount() const {
+  std::uint64_t sum = 0;
+  for (const auto& [subscription, count] : _records) sum += count;
+  return sum;
+}
+
+std::string MessageStatistics::frameLines() const {
+  if (_leftOut == LeftOut{}) return {};
+  std::string lines = '\n' + countLine("Frames", recordCount() + _leftOut.frames());
+  lines += countLine("Records", recordCount());
+  for (const LeftOutKind& kind : frameKinds)
+    if (_leftOut.*kind.count > 0) lines += countLine(kind.name, _leftOut.*kind.count);
+  if (_leftOut.noiseBytes > 0) lines += countLine(noise.name, _leftOut.noiseBytes);
+  return lines;
+}
+
+std::string MessageStatistics::subscriptionLines() const {
+  const bool isAnyNamed = !_records.empty() && _records.rbegin()->first.has_value();
+  if (!isAnyNamed) return {};
+  std::string lines = "\n";
+  for (const auto& [subscription, count] : _records)
+    lines += countLine(subscriptionName(subscription), count);
+  return lines;
 }
 
 std::string MessageStatistics::jsonMembers(const Counts& counts) {
@@ -83,7 +138,29 @@ std::string MessageStatistics::asJson(const std::optional<std::string>& captureN
             ",\"Log Code\":" + (kind.hasNoLogCode ? "null" : std::to_string(kind.number)) + ',' +
             jsonMembers(counts) + '}';
   }
-  return json + "],\"Total\":{" + jsonMembers(_total) + "}}\n";
+  return json + "]," + framesAsJson() + ',' + subscriptionsAsJson() + ",\"Total\":{" + jsonMembers(_total) +
+         "}}\n";
+}
+
+std::string MessageStatistics::framesAsJson() const {
+  const std::uint64_t records = recordCount();
+  std::string json = "\"Frames\":{\"Received\":" + std::to_string(records + _leftOut.frames()) +
+                     ",\"Records\":" + std::to_string(records);
+  for (const LeftOutKind& kind : frameKinds)
+    json += ',' + jsonString(kind.name) + ':' + std::to_string(_leftOut.*kind.count);
+  return json + "},\"Noise Bytes\":" + std::to_string(_leftOut.noiseBytes);
+}
+
+std::string MessageStatistics::subscriptionsAsJson() const {
+  std::string json = "\"SIM\":[";
+  std::string_view separator;
+  for (const auto& [subscription, count] : _records) {
+    json += separator;
+    separator = ",";
+    json += "{\"Number\":" + (subscription ? std::to_string(*subscription) : "null") +
+            ",\"Records\":" + std::to_string(count) + '}';
+  }
+  return json + ']';
 }
 
 }  // namespace varnel

@@ -6,6 +6,8 @@
 #include <string>
 
 #include "LogGenerator/MessageFate.h"
+#include "host/captures/CaptureRecord.h"
+#include "programs/varnel-decode/Subscriptions.h"
 
 namespace varnel {
 
@@ -13,11 +15,15 @@ namespace varnel {
 class MessageStatistics {
  public:
   void add(const MessageFate& fate);
+  /// What the capture held beside these messages.
+  void setCapture(const Subscriptions::Counts& records, const LeftOut& leftOut);
 
-  /// A line for each log code, in their order, then those of messages without one, then the sums.
+  /// A line for each log code, in their order, then those of messages without one, then the sums. Where
+  /// frames of the capture were left out, the sum of all frames follows, and a line for the records and each
+  /// kind that was left out; where records name a SIM card, a line for each.
   std::string asTable() const;
-  /// The same as one line of JSON: {"Messages": […], "Total": {…}}. With a capture's name it comes first, as
-  /// "Capture".
+  /// The same as one line of JSON: {"Messages": […], "Frames": {…}, "SIM": […], "Total": {…}}. With a
+  /// capture's name it comes first, as "Capture".
   std::string asJson(const std::optional<std::string>& captureName) const;
 
  private:
@@ -39,9 +45,16 @@ class MessageStatistics {
 
   static std::string tableLine(const std::string& name, const Counts& counts);
   static std::string jsonMembers(const Counts& counts);
+  std::uint64_t recordCount() const;
+  std::string frameLines() const;
+  std::string subscriptionLines() const;
+  std::string framesAsJson() const;
+  std::string subscriptionsAsJson() const;
 
   std::map<Kind, Counts> _counts;
   Counts _total;
+  Subscriptions::Counts _records;
+  LeftOut _leftOut;
 };
 
 }  // namespace varnel

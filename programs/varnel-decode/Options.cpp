@@ -6,6 +6,7 @@
 #include <limits>
 #include <span>
 #include <system_error>
+#include <utility>
 
 #include "programs/varnel-decode/ProgramError.h"
 
@@ -39,6 +40,7 @@ struct Wishes {
   std::string format;
   bool isEvery = false;
   bool isFollowing = false;
+  std::optional<unsigned> subscription;
   bool isNumbers = false;
   bool isChanges = false;
   bool isStatistics = false;
@@ -68,6 +70,10 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
       ->check(CLI::Range(-1, std::numeric_limits<int>::max()).description(""))
       ->type_name("N")
       ->capture_default_str();
+  app.add_option("--sim", wishes.subscription,
+                 "take the records of that SIM card, as the modem counts them, and those that name none")
+      ->check(CLI::Range(1U, 255U).description(""))
+      ->type_name("N");
   app.add_flag("--follow", wishes.isFollowing, "wait for more where the file ends, until interrupted");
   app.add_option("CAPTURE", options.captures,
                  "what a diagnostic port sends, log records, pcap of link type USER0, or a snapshot; - is "
@@ -100,6 +106,28 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
   app.add_option("--snapshot", options.snapshotPath, "also write a snapshot file")->type_name("FILE");
   app.add_option("--dlf", options.binaryLogPath, "also write the binary log of the last displays")
       ->type_name("FILE");
+  app.add_option("--records", options.recordsPath, "also write the records of log type 1 end to end")
+      ->type_name("FILE");
+  app.add_option("--pcap", options.pcapPath, "also write the records as pcap of link type USER0")
+      ->type_name("FILE");
+  app.add_option("--framed", options.framedPath,
+                 "also write the records of log type 1 as a diagnostic port sends them")
+      ->type_name("FILE");
+}
+
+// The options that name a file to write, and what they name.
+std::vector<std::pair<std::string, std::string>> namedOutputs(const Options& options, const Wishes& wishes) {
+  std::vector<std::pair<std::string, std::string>> outputs;
+  const auto add = [&](const char* option, const std::optional<std::string>& path) {
+    if (path) outputs.emplace_back(option, *path);
+  };
+  add("--snapshot", options.snapshotPath);
+  add("--dlf", options.binaryLogPath);
+  add("--records", options.recordsPath);
+  add("--pcap", options.pcapPath);
+  add("--framed", options.framedPath);
+  if (!wishes.plot.empty()) add("--plot", wishes.plot.front());
+  return outputs;
 }
 
 // What is wrong with options that are fine one by one; nothing when they go together.
@@ -115,16 +143,16 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
   if (wishes.isStatistics && !format.empty() && format != "text" && format != "json")
     return "--stats writes --format text or json only";
   if (std::ranges::any_of(options.captures, &std::string::empty)) return "the name of a capture is empty";
-  if (options.snapshotPath == "") return "--snapshot: the name of the file is empty";
-  if (options.binaryLogPath == "") return "--dlf: the name of the file is empty";
-  if (!wishes.plot.empty() && wishes.plot.front().empty()) return "--plot: the name of the file is empty";
+  const auto outputs = namedOutputs(options, wishes);
+  for (const auto& [option, path] : outputs)
+    if (path.empty()) return option + ": the name of the file is empty";
   if (wishes.isFollowing && !wishes.isEvery && options.tablePaths.empty())
     return "--follow needs --every or --csv, for all else is written at the end";
   if (options.captures.size() < 2) return std::nullopt;
   if (wishes.isFollowing) return "--follow takes one capture at a time";
   if (format == "plist") return "--format plist takes one capture at a time";
-  if (options.snapshotPath || options.binaryLogPath || !wishes.plot.empty())
-    return "--snapshot, --dlf and --plot take one capture at a time, for each would overwrite the one before";
+  if (!outputs.empty())
+    return outputs.front().first + " takes one capture at a time, for each would overwrite the one before";
   if (std::ranges::count(options.captures, "-") > 1) return "standard input can be read only once";
   return std::nullopt;
 }
@@ -158,6 +186,7 @@ Output outputFor(const Options& options, const Wishes& wishes) {
 void fulfil(Options& options, const Wishes& wishes) {
   const std::string format = wishes.format.empty() ? "text" : wishes.format;
   options.output = outputFor(options, wishes);
+  if (wishes.subscription) options.subscription = static_cast<std::uint8_t>(*wishes.subscription);
   if (wishes.isFollowing) options.atEnd = AtEndOfFile::WaitForMore;
   if (wishes.isNumbers) options.style.valuesAs = ValuesAs::Numbers;
   if (wishes.isChanges) options.style.displays = Displays::Changed;

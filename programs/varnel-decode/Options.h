@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -40,11 +41,15 @@ struct Options {
   int logLevel = logErrorPriority - 1;
   std::optional<std::string> snapshotPath;   ///< where to write a snapshot file
   std::optional<std::string> binaryLogPath;  ///< where to write the binary log
+  std::optional<std::string> recordsPath;    ///< where to write the records as a record stream
+  std::optional<std::string> pcapPath;       ///< as pcap
+  std::optional<std::string> framedPath;     ///< as a framed stream
   std::optional<PlotWish> plot;
-  AtEndOfFile atEnd = AtEndOfFile::Stop;  ///< what happens where a capture ends
-  unsigned jobs = 1;                      ///< how many captures are decoded at the same time
-  bool namesEachCapture = false;          ///< text of several captures: a line before each says which it is
-  std::vector<std::string> captures;      ///< captures and snapshots, at least one; "-" is standard input
+  std::optional<std::uint8_t> subscription;  ///< whose records alone are taken; absent for whichever is first
+  AtEndOfFile atEnd = AtEndOfFile::Stop;     ///< what happens where a capture ends
+  unsigned jobs = 1;                         ///< how many captures are decoded at the same time
+  bool namesEachCapture = false;      ///< text of several captures: a line before each says which it is
+  std::vector<std::string> captures;  ///< captures and snapshots, at least one; "-" is standard input
 };
 
 /// The status to end with when the command line leaves nothing to do: 0 after help, 2 after a mistake.

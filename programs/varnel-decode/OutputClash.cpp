@@ -39,6 +39,9 @@ std::vector<NamedFile> outputsOf(const Options& options) {
     outputs.push_back({"standard output", FileIdentity::ofDescriptor(STDOUT_FILENO)});
   if (options.snapshotPath) add("--snapshot", *options.snapshotPath);
   if (options.binaryLogPath) add("--dlf", *options.binaryLogPath);
+  if (options.recordsPath) add("--records", *options.recordsPath);
+  if (options.pcapPath) add("--pcap", *options.pcapPath);
+  if (options.framedPath) add("--framed", *options.framedPath);
   if (options.plot) add("--plot", options.plot->file);
   return outputs;
 }

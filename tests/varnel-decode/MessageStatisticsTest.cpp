@@ -37,23 +37,55 @@ TEST(MessageStatistics, WithoutMessagesThereAreOnlyTheSums) {
   EXPECT_EQ(MessageStatistics().asTable(),
             "Log code        Received      Decoded    Too short     Too long      Unknown\n"
             "Total                  0            0            0            0            0\n");
-  EXPECT_EQ(MessageStatistics().asJson({}),
-            "{\"Messages\":[],\"Total\":"
-            "{\"Received\":0,\"Decoded\":0,\"Too Short\":0,\"Too Long\":0,\"Unknown\":0}}\n");
+  EXPECT_EQ(
+      MessageStatistics().asJson({}),
+      "{\"Messages\":[],\"Frames\":{\"Received\":0,\"Records\":0,\"Bad checksum\":0,\"Torn\":0,\"Other "
+      "commands\":0,\"Encrypted\":0,\"Broken\":0,\"Too long\":0},\"Noise Bytes\":0,\"SIM\":[],\"Total\":"
+      "{\"Received\":0,\"Decoded\":0,\"Too Short\":0,\"Too Long\":0,\"Unknown\":0}}\n");
 }
 
 TEST(MessageStatistics, JsonHasTheSameNumbersAndTheCaptureWhenItIsNamed) {
   MessageStatistics statistics;
   statistics.add({Decoded, 0xB17F});
   statistics.add({TooShort});
+  LeftOut leftOut;
+  leftOut.torn = 2;
+  leftOut.encrypted = 3;
+  leftOut.noiseBytes = 70;
+  statistics.setCapture({{std::nullopt, 1}, {std::uint8_t{1}, 4}}, leftOut);
   EXPECT_EQ(statistics.asJson("a \"b\".pcap"),
             R"({"Capture":"a \"b\".pcap","Messages":[)"
             R"({"Name":"0xB17F","Log Code":45439,)"
             R"("Received":1,"Decoded":1,"Too Short":0,"Too Long":0,"Unknown":0},)"
             R"({"Name":"no header","Log Code":null,)"
             R"("Received":1,"Decoded":0,"Too Short":1,"Too Long":0,"Unknown":0}],)"
+            R"("Frames":{"Received":10,"Records":5,"Bad checksum":0,"Torn":2,"Other commands":0,)"
+            R"("Encrypted":3,"Broken":0,"Too long":0},"Noise Bytes":70,)"
+            R"("SIM":[{"Number":null,"Records":1},{"Number":1,"Records":4}],)"
             R"("Total":{"Received":2,"Decoded":1,"Too Short":1,"Too Long":0,"Unknown":0}})"
             "\n");
+}
+
+TEST(MessageStatistics, FramesAreTheRecordsAndWhatWasLeftOut) {
+  MessageStatistics statistics;
+  LeftOut leftOut;
+  leftOut.badChecksum = 1;
+  leftOut.otherCommands = 20;
+  leftOut.noiseBytes = 70;
+  statistics.setCapture({{std::nullopt, 1}, {std::uint8_t{1}, 4}, {std::uint8_t{2}, 3}}, leftOut);
+  EXPECT_EQ(statistics.asTable(),
+            "Log code        Received      Decoded    Too short     Too long      Unknown\n"
+            "Total                  0            0            0            0            0\n"
+            "\n"
+            "Frames                29\n"
+            "Records                8\n"
+            "Bad checksum           1\n"
+            "Other commands        20\n"
+            "Noise bytes           70\n"
+            "\n"
+            "No SIM                 1\n"
+            "SIM 1                  4\n"
+            "SIM 2                  3\n");
 }
 
 TEST(MessageStatistics, ObjectsAreCountedAsSuch) {

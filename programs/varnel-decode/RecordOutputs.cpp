@@ -1,0 +1,56 @@
+#include "programs/varnel-decode/RecordOutputs.h"
+
+#include "host/captures/PcapEncoders.h"
+#include "host/captures/StreamEncoders.h"
+#include "programs/varnel-decode/ProgramError.h"
+
+namespace varnel {
+
+RecordOutputs::RecordOutputs(const Options& options) {
+  add(options.recordsPath, std::make_unique<RecordStreamWriter>());
+  add(options.pcapPath, std::make_unique<PcapWriter>());
+  add(options.framedPath, std::make_unique<FramedWriter>());
+}
+
+void RecordOutputs::add(const std::optional<std::string>& path, std::unique_ptr<CaptureEncoder> encoder) {
+  if (path) _targets.push_back({*path, std::move(encoder), std::make_unique<OutputFile>(*path)});
+}
+
+void RecordOutputs::open() {
+  for (Target& target : _targets) {
+    check(target, target.file->open());
+    write(target, target.encoder->beginning());
+  }
+}
+
+void RecordOutputs::write(const CaptureRecord& record) {
+  for (Target& target : _targets)
+    if (target.file) write(target, target.encoder->encode(record));
+}
+
+void RecordOutputs::write(Target& target, ByteView bytes) {
+  if (target.file && !bytes.empty()) check(target, target.file->write(bytes));
+}
+
+// Whoever reads a pipe may leave, of which nothing is said.
+void RecordOutputs::check(Target& target, std::error_code failure) {
+  if (!failure) return;
+  target.file.reset();
+  if (failure != std::errc::broken_pipe) tell("cannot write " + target.path + ": " + failure.message());
+}
+
+bool RecordOutputs::finish(const std::string& captureName) {
+  bool isDone = true;
+  for (Target& target : _targets) {
+    if (target.file) check(target, target.file->finish());
+    isDone &= target.file != nullptr;
+    const std::uint64_t leftOut = target.encoder->leftOut();
+    if (target.file && leftOut > 0)
+      tell(std::to_string(leftOut) + (leftOut == 1 ? " message of " : " messages of ") + captureName +
+           " did not come from a modem as log records (of log type 1), so " + target.path + " is without " +
+           (leftOut == 1 ? "it" : "them"));
+  }
+  return isDone;
+}
+
+}  // namespace varnel

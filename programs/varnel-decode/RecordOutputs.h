@@ -1,0 +1,43 @@
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "host/OutputFile.h"
+#include "host/captures/CaptureEncoder.h"
+#include "programs/varnel-decode/Options.h"
+
+namespace varnel {
+
+/// The files that get the records of a capture as they are, each in a form of its own. One that fails gets no
+/// more, which is told; the others go on.
+class RecordOutputs {
+ public:
+  /// Those that the options name.
+  explicit RecordOutputs(const Options& options);
+
+  bool areNone() const { return _targets.empty(); }
+
+  /// Opens the files. They take their places when `finish` is called.
+  void open();
+  void write(const CaptureRecord& record);
+  /// Has the files take their places, and tells how many records of the capture have none there. False when
+  /// one has failed.
+  bool finish(const std::string& captureName);
+
+ private:
+  struct Target {
+    std::string path;
+    std::unique_ptr<CaptureEncoder> encoder;
+    std::unique_ptr<OutputFile> file;  // null once it has failed
+  };
+
+  void add(const std::optional<std::string>& path, std::unique_ptr<CaptureEncoder> encoder);
+  static void write(Target& target, ByteView bytes);
+  static void check(Target& target, std::error_code failure);
+
+  std::vector<Target> _targets;
+};
+
+}  // namespace varnel
