@@ -148,6 +148,8 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
     if (path.empty()) return option + ": the name of the file is empty";
   if (wishes.isFollowing && !wishes.isEvery && options.tablePaths.empty())
     return "--follow needs --every or --csv, for all else is written at the end";
+  if (wishes.isFollowing && !outputs.empty())
+    return "--follow has no end, at which " + outputs.front().first + " is written; leave one of them out";
   if (options.captures.size() < 2) return std::nullopt;
   if (wishes.isFollowing) return "--follow takes one capture at a time";
   if (format == "plist") return "--format plist takes one capture at a time";
