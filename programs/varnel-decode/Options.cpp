@@ -33,6 +33,8 @@ constexpr const char* examples =
     "  varnel-decode --technology kalvi-lte walk.pcap --csv 'Serving Cell Measurements/Average RSRP'\n"
     "  varnel-decode --technology kalvi-lte --stats --format json walk.pcap\n"
     "  varnel-decode --technology kalvi-lte --jobs 4 --format json monday.pcap tuesday.pcap\n"
+    "  ssh device cat PORT | varnel-decode --technology kalvi-lte --every --numbers --changes -\n"
+    "  varnel-decode --format none --pcap walk.pcap walk.bin\n"
     "  varnel-decode --dlf walk.dlf --format none VarnelSnapshot-1709301914.varnel\n";
 
 // The command line as it was typed, before it is known whether it makes sense.
