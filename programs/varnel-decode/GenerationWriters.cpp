@@ -13,7 +13,7 @@ namespace varnel {
 namespace {
 
 std::string csvField(std::string_view value) {
-  const std::string text = printable(value, "\t\r\n");
+  std::string text = printable(value, "\t\r\n");
   if (text.find_first_of(",\"\r\n") == std::string::npos) return text;
   std::string quoted = "\"";
   for (const char character : text) {

@@ -276,9 +276,11 @@ class InputDecoding {
   // Values that are no numbers, such as states, have no place in a picture.
   void tellUnplottedPaths() const {
     if (!_recorder) return;
-    for (const auto& [path, value] : _recorder->unplotted())
-      tell("no value of " + _name + " under '" + path + "' begins with a number (one is '" + value +
-           "'), so no line shows it");
+    for (const auto& [path, value] : _recorder->unplotted()) {
+      std::string line = "no value of " + _name;
+      line.append(" under '").append(path).append("' begins with a number (one is '").append(value);
+      tell(line + "'), so no line shows it");
+    }
   }
 
   bool drawPicture() const {
