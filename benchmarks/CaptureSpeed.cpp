@@ -1,0 +1,247 @@
+#include <unistd.h>
+
+#include <algorithm>
+#include <array>
+#include <cstdio>
+#include <cstring>
+#include <ctime>
+#include <filesystem>
+#include <fstream>
+#include <functional>
+#include <limits>
+#include <ostream>
+#include <random>
+#include <string>
+#include <vector>
+
+#include "LogGenerator/LogGenerator.h"
+#include "host/FileResources.h"
+#include "host/SystemClock.h"
+#include "host/captures/Capture.h"
+#include "host/captures/FramedCapture.h"
+#include "host/captures/ModemTime.h"
+#include "host/captures/PcapEncoders.h"
+#include "host/captures/StreamEncoders.h"
+#include "platform/TelephonyService.h"
+#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+
+// What captures take to be read, a line a way: the least that framing takes, framing alone, and whole
+// captures read and decoded, framed and as pcap, all beside a copy of the same bytes. Of the captures of real
+// modems one record in 29 has a log code that the decoders know, and so has the first one here; of the second
+// each has.
+
+namespace varnel {
+namespace {
+
+constexpr std::size_t records = 470'870;
+constexpr int turns = 7;
+
+struct Files {
+  std::string framed, pcap;
+};
+
+void write(std::ofstream& file, ByteView bytes) {
+  file.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
+}
+
+// Packets of a simulated modem.
+std::vector<Bytes> knownMessages() {
+  constexpr std::size_t different = 5000, longest = 100;
+  const auto modem = simulatedModem(technology::kalviLTE, 1);
+  std::vector<Bytes> messages;
+  while (messages.size() < different) {
+    Bytes message = modem->next().bytes;
+    if (message.front() == 1 && message.size() <= longest) messages.push_back(std::move(message));
+  }
+  return messages;
+}
+
+// Packets of a log code that no decoder knows, of up to 77 bytes, at random.
+std::vector<Bytes> unknownMessages() {
+  constexpr std::size_t different = 5000, smallest = 25, sizes = 53;
+  std::mt19937 random(1);
+  std::vector<Bytes> messages(different);
+  for (Bytes& message : messages) {
+    message.resize(smallest + random() % sizes);
+    for (std::uint8_t& byte : message) byte = static_cast<std::uint8_t>(random());
+    message[0] = 1;
+    message[3] = 0xC0;
+    message[4] = 0xB0;
+  }
+  return messages;
+}
+
+// A message each millisecond, of which each so many-th is known.
+void makeFiles(const Files& files, std::size_t everySoMany) {
+  const std::vector<Bytes> known = knownMessages(), unknown = unknownMessages();
+  std::ofstream framed(files.framed, std::ios::binary), pcap(files.pcap, std::ios::binary);
+  FramedWriter frames;
+  PcapWriter packets;
+  write(pcap, packets.beginning());
+  for (std::size_t i = 0; i < records; ++i) {
+    const Time time{1'709'301'909 + static_cast<std::int64_t>(i / 1000),
+                    static_cast<std::int32_t>(i % 1000 * 1'000'000)};
+    const std::size_t number = i / everySoMany;
+    const Bytes& message = i % everySoMany == 0 ? known[number % known.size()] : unknown[i % unknown.size()];
+    const CaptureRecord record{time, Dating::Known, message, {}};
+    write(framed, frames.encode(record));
+    write(pcap, packets.encode(record));
+  }
+}
+
+Bytes contentsOf(const std::string& path) {
+  std::ifstream file(path, std::ios::binary);
+  Bytes bytes(std::filesystem::file_size(path));
+  file.read(reinterpret_cast<char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
+  return bytes;
+}
+
+// A checksum by tables of eight bytes, as most programs have it.
+class EightByteChecksum {
+ public:
+  EightByteChecksum() {
+    for (unsigned byte = 0; byte < 256; ++byte) {
+      unsigned rest = byte;
+      for (int bit = 0; bit < 8; ++bit) rest = rest & 1 ? rest >> 1 ^ 0x8408 : rest >> 1;
+      _tables[0][byte] = static_cast<std::uint16_t>(rest);
+    }
+    for (std::size_t n = 1; n < _tables.size(); ++n)
+      for (unsigned byte = 0; byte < 256; ++byte)
+        _tables[n][byte] =
+            static_cast<std::uint16_t>(_tables[n - 1][byte] >> 8 ^ _tables[0][_tables[n - 1][byte] & 0xFF]);
+  }
+
+  bool isRight(ByteView frame) const {
+    std::uint32_t rest = 0xFFFF;
+    std::size_t i = 0;
+    for (; frame.size() - i >= 8; i += 8) {
+      std::uint64_t eight;
+      std::memcpy(&eight, frame.data() + i, sizeof eight);
+      eight ^= rest;
+      rest = _tables[7][eight & 0xFF] ^ _tables[6][eight >> 8 & 0xFF] ^ _tables[5][eight >> 16 & 0xFF] ^
+             _tables[4][eight >> 24 & 0xFF] ^ _tables[3][eight >> 32 & 0xFF] ^
+             _tables[2][eight >> 40 & 0xFF] ^ _tables[1][eight >> 48 & 0xFF] ^ _tables[0][eight >> 56];
+    }
+    for (; i < frame.size(); ++i) rest = rest >> 8 ^ _tables[0][(rest ^ frame[i]) & 0xFF];
+    return rest == 0xF0B8;
+  }
+
+ private:
+  std::array<std::array<std::uint16_t, 256>, 8> _tables{};
+};
+
+// Finds the frames, takes their escapes out, checks them and counts their log codes: no less will do.
+std::size_t floorOf(ByteView bytes) {
+  static const EightByteChecksum checksum;
+  static std::array<std::uint32_t, 65536> counts;
+  std::array<std::uint8_t, 1 << 17> room;
+  std::size_t found = 0;
+  const std::uint8_t* at = bytes.data();
+  const std::uint8_t* const end = at + bytes.size();
+  while (const void* stop = std::memchr(at, 0x7E, static_cast<std::size_t>(end - at))) {
+    const auto size = static_cast<std::size_t>(static_cast<const std::uint8_t*>(stop) - at);
+    std::memcpy(room.data(), at, size);
+    const auto frame = unescaped(std::span(room).first(size));
+    at += size + 1;
+    if (frame.size() < 18 || !checksum.isRight(frame)) continue;
+    ++counts[frame[6] | frame[7] << 8];
+    ++found;
+  }
+  return found;
+}
+
+std::size_t frameAlone(const std::string& path) {
+  LeftOut leftOut;
+  ByteWindow bytes(openFile(path, AtEndOfFile::Stop));
+  FrameScanner frames(bytes, leftOut);
+  std::size_t found = 0;
+  while (frames.next()) ++found;
+  return found;
+}
+
+std::size_t readAll(const std::string& path) {
+  const auto capture = openCapture(path);
+  std::size_t found = 0;
+  for (CaptureRecord record; capture->next(record);) ++found;
+  return found;
+}
+
+std::size_t decodeAll(const std::string& path) {
+  const FileResources resources{resourceFolder()};
+  const SystemClock clock;
+  const ApplicationInfo application;
+  std::ostream nowhere(nullptr);
+  const auto generator =
+      LogGenerator::generatorFromTechnology(technology::kalviLTE, {resources, clock, application, nowhere});
+  generator->keepNoRawBytes();
+  Dictionary state;
+  const auto capture = openCapture(path);
+  std::size_t found = 0;
+  for (CaptureRecord record; capture->next(record); ++found)
+    generator->updateState_withData(state, record.message);
+  return found;
+}
+
+// Of the processor, which others may keep busy meanwhile.
+double secondsUsed() {
+  timespec used{};
+  ::clock_gettime(CLOCK_PROCESS_CPUTIME_ID, &used);
+  return static_cast<double>(used.tv_sec) + static_cast<double>(used.tv_nsec) * 1e-9;
+}
+
+struct Way {
+  const char* name;
+  std::function<std::size_t()> run;
+  double best = std::numeric_limits<double>::infinity();
+};
+
+// By turns, so that what slows one down for a while slows down the others as well.
+void race(std::vector<Way>& ways) {
+  for (int turn = 0; turn < turns; ++turn) {
+    for (Way& way : ways) {
+      const double start = secondsUsed();
+      if (way.run() == 0) std::fprintf(stderr, "%s: nothing was found\n", way.name);
+      way.best = std::min(way.best, secondsUsed() - start);
+    }
+  }
+}
+
+void measure(const char* mix, std::size_t everySoMany) {
+  const auto folder = std::filesystem::temp_directory_path();
+  const std::string name = "varnel-speed-" + std::to_string(::getpid());
+  const Files files{folder / (name + ".framed"), folder / (name + ".pcap")};
+  makeFiles(files, everySoMany);
+  const Bytes framed = contentsOf(files.framed);
+  Bytes copy(framed.size());
+  std::vector<Way> ways{
+      {"floor", [&] { return floorOf(framed); }},
+      {"memcpy",
+       [&] {
+         std::memcpy(copy.data(), framed.data(), framed.size());
+         return std::size_t{1} + copy[framed.size() / 2];
+       }},
+      {"framing alone", [&] { return frameAlone(files.framed); }},
+      {"framed, read", [&] { return readAll(files.framed); }},
+      {"framed, decoded", [&] { return decodeAll(files.framed); }},
+      {"pcap, read", [&] { return readAll(files.pcap); }},
+      {"pcap, decoded", [&] { return decodeAll(files.pcap); }},
+  };
+  race(ways);
+  std::filesystem::remove(files.framed);
+  std::filesystem::remove(files.pcap);
+  const auto size = static_cast<double>(framed.size());
+  std::printf("%zu records, %.1f MB framed, %s\n%-18s %8s %8s %9s\n", records, size / 1e6, mix, "way", "ms",
+              "MB/s", "x floor");
+  for (const Way& way : ways)
+    std::printf("%-18s %8.1f %8.0f %9.2f\n", way.name, way.best * 1e3, size / way.best / 1e6,
+                way.best / ways.front().best);
+}
+
+}  // namespace
+}  // namespace varnel
+
+int main() {
+  varnel::measure("one in 29 of a log code that the decoders know", 29);
+  varnel::measure("each of a log code that the decoders know", 1);
+  return 0;
+}
