@@ -16,8 +16,10 @@ constexpr std::uint16_t residue = 0xF0B8;
 using Table = std::array<std::uint16_t, 256>;
 
 // tables[n][b]: what the byte b does to the checksum when n more bytes follow it.
-constexpr std::array<Table, 8> makeTables() {
-  std::array<Table, 8> tables{};
+constexpr std::size_t stride = 16;
+
+constexpr std::array<Table, stride> makeTables() {
+  std::array<Table, stride> tables{};
   for (unsigned byte = 0; byte < 256; ++byte) {
     unsigned rest = byte;
     for (int bit = 0; bit < 8; ++bit) rest = rest & 1 ? rest >> 1 ^ polynomial : rest >> 1;
@@ -32,16 +34,43 @@ constexpr std::array<Table, 8> makeTables() {
   return tables;
 }
 
-constexpr std::array<Table, 8> tables = makeTables();
+constexpr std::array<Table, stride> tables = makeTables();
+
+// What four and eight bytes do to the checksum when that many more follow them.
+template <std::size_t following>
+std::uint32_t effectOfFour(std::uint32_t bytes) {
+  return tables[following + 3][bytes & 0xFF] ^ tables[following + 2][bytes >> 8 & 0xFF] ^
+         tables[following + 1][bytes >> 16 & 0xFF] ^ tables[following][bytes >> 24];
+}
+
+template <std::size_t following>
+std::uint32_t effectOfEight(std::uint64_t bytes) {
+  return effectOfFour<following + 4>(static_cast<std::uint32_t>(bytes)) ^
+         effectOfFour<following>(static_cast<std::uint32_t>(bytes >> 32));
+}
+
+// What is in the register already does the same as the first two of so many bytes. What the bytes do by
+// themselves need not wait for it.
+template <std::size_t count>
+std::uint32_t effectOfRest(std::uint32_t rest) {
+  return tables[count - 1][rest & 0xFF] ^ tables[count - 2][rest >> 8];
+}
 
 std::uint16_t registerAfter(ByteView bytes) {
   std::uint32_t rest = start;
   std::size_t i = 0;
-  for (; bytes.size() - i >= 8; i += 8) {
-    const std::uint64_t eight = loadLittleEndian<std::uint64_t>(bytes, i) ^ rest;
-    rest = tables[7][eight & 0xFF] ^ tables[6][eight >> 8 & 0xFF] ^ tables[5][eight >> 16 & 0xFF] ^
-           tables[4][eight >> 24 & 0xFF] ^ tables[3][eight >> 32 & 0xFF] ^ tables[2][eight >> 40 & 0xFF] ^
-           tables[1][eight >> 48 & 0xFF] ^ tables[0][eight >> 56];
+  for (; bytes.size() - i >= 16; i += 16) {
+    const std::uint32_t effect = effectOfEight<8>(loadLittleEndian<std::uint64_t>(bytes, i)) ^
+                                 effectOfEight<0>(loadLittleEndian<std::uint64_t>(bytes, i + 8));
+    rest = effect ^ effectOfRest<16>(rest);
+  }
+  if (bytes.size() - i >= 8) {
+    rest = effectOfEight<0>(loadLittleEndian<std::uint64_t>(bytes, i)) ^ effectOfRest<8>(rest);
+    i += 8;
+  }
+  if (bytes.size() - i >= 4) {
+    rest = effectOfFour<0>(loadLittleEndian<std::uint32_t>(bytes, i)) ^ effectOfRest<4>(rest);
+    i += 4;
   }
   for (; i < bytes.size(); ++i) rest = rest >> 8 ^ tables[0][(rest ^ bytes[i]) & 0xFF];
   return static_cast<std::uint16_t>(rest);
