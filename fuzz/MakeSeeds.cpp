@@ -1,7 +1,11 @@
+#include <zlib.h>
+
+#include <algorithm>
 #include <cstdio>
 #include <exception>
 #include <filesystem>
 #include <fstream>
+#include <initializer_list>
 #include <map>
 #include <memory>
 #include <string>
@@ -13,9 +17,9 @@
 #include "base/PropertyList.h"
 #include "fuzz/FuzzHost.h"
 #include "fuzz/InputSteps.h"
-#include "host/CaptureWriter.h"
 #include "host/PortFrame.h"
-#include "host/WholeFile.h"
+#include "host/captures/PcapEncoders.h"
+#include "host/captures/StreamEncoders.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
 
@@ -124,22 +128,111 @@ void makeGeneratorSeeds(SeedFolder& folder, std::string_view technology) {
   }
 }
 
+Bytes bytesOf(CaptureEncoder& encoder, const std::vector<SimulatedMessage>& messages) {
+  constexpr std::size_t most = 12, longest = 400;
+  const ByteView beginning = encoder.beginning();
+  Bytes bytes(beginning.begin(), beginning.end());
+  std::uint8_t second = 0;
+  for (const SimulatedMessage& message : messages) {
+    if (message.bytes.size() > longest) continue;
+    const auto subscription = static_cast<std::uint8_t>(1 + second % 2);
+    const ByteView more =
+        encoder.encode({{1'709'301'909 + ++second, 500}, Dating::Known, message.bytes, subscription});
+    bytes.insert(bytes.end(), more.begin(), more.end());
+    if (second == most) break;
+  }
+  return bytes;
+}
+
+Bytes joined(std::initializer_list<ByteView> parts) {
+  Bytes whole;
+  for (const ByteView part : parts) whole.insert(whole.end(), part.begin(), part.end());
+  return whole;
+}
+
+// Each record in a frame that tells its length in place of a checksum.
+Bytes lengthFramed(ByteView records) {
+  Bytes frames;
+  while (records.size() >= 2) {
+    const ByteView record = records.first(records[0] | std::size_t{records[1]} << 8);
+    const std::size_t size = record.size() + 4;
+    const Bytes header{0x7E,
+                       0x01,
+                       static_cast<std::uint8_t>(size),
+                       static_cast<std::uint8_t>(size >> 8),
+                       0x10,
+                       0x00,
+                       record[0],
+                       record[1]};
+    frames = joined({frames, header, record, Bytes{0x7E}});
+    records = records.subspan(record.size());
+  }
+  return frames;
+}
+
+// What stands before the frames of a phone's own log file; the flag tells whether they have checksums.
+Bytes logFileHeader(std::uint8_t flag) { return {10, 0, 0, 0, 1, flag, 0, 0, 0, 0}; }
+
+// The version report, then an interval that has lost its first byte.
+Bytes binaryLog(ByteView records) {
+  constexpr std::string_view name = "EXECUTABLE_NAME";
+  constexpr std::ptrdiff_t nameOffset = 23;
+  Bytes bytes(161);
+  std::copy(name.begin(), name.end(), bytes.begin() + nameOffset);
+  bytes[0] = 161;
+  bytes[2] = 0xFD;
+  bytes[3] = 0x1F;
+  bytes[12] = bytes[14] = 1;
+  bool isFirst = true;
+  while (records.size() >= 2) {
+    const ByteView record = records.first(records[0] | std::size_t{records[1]} << 8);
+    if (!isFirst) bytes.push_back(1);
+    bytes = joined({bytes, record});
+    isFirst = false;
+    records = records.subspan(record.size());
+  }
+  return bytes;
+}
+
+Bytes packed(const Bytes& bytes) {
+  constexpr int gzipFormat = 16 + MAX_WBITS, memoryLevel = 8;
+  z_stream stream{};
+  if (::deflateInit2(&stream, Z_BEST_COMPRESSION, Z_DEFLATED, gzipFormat, memoryLevel, Z_DEFAULT_STRATEGY) !=
+      Z_OK)
+    throw std::runtime_error("cannot pack");
+  Bytes input = bytes, result(::deflateBound(&stream, bytes.size()));
+  stream.next_in = input.data();
+  stream.avail_in = static_cast<uInt>(input.size());
+  stream.next_out = result.data();
+  stream.avail_out = static_cast<uInt>(result.size());
+  const int status = ::deflate(&stream, Z_FINISH);
+  result.resize(stream.total_out);
+  ::deflateEnd(&stream);
+  if (status != Z_STREAM_END) throw std::runtime_error("cannot pack");
+  return result;
+}
+
+// A capture of every kind.
 void makeCaptureSeeds(SeedFolder& folder) {
-  const fs::path path = fs::temp_directory_path() / "varnel-seed.pcap";
   for (const Technology& technology : technologies) {
     const auto messages = walk(technology.identifier, 1);
-    {
-      CaptureWriter writer(path, ExistingRecording::Replaced);
-      std::int64_t second = 0;
-      for (const SimulatedMessage& message : messages) {
-        if (message.bytes.size() > 400) continue;
-        writer.write({++second, 500}, message.bytes);
-        if (second == 12) break;
-      }
-    }
-    folder.add("pcap", readWholeFile(path).value());
+    PcapWriter pcap;
+    PcapngWriter pcapng{std::string(technology.identifier)};
+    folder.add("pcap", bytesOf(pcap, messages));
+    folder.add("pcapng", bytesOf(pcapng, messages));
+    if (technology.identifier == technology::ifxGSM) continue;  // whose messages are no log records
+    FramedWriter framed;
+    RecordStreamWriter records;
+    const Bytes frames = bytesOf(framed, messages), stream = bytesOf(records, messages);
+    const Bytes lengthFrames = lengthFramed(stream);
+    folder.add("framed", frames);
+    folder.add("records", stream);
+    folder.add("length-framed", lengthFrames);
+    folder.add("log-file", joined({logFileHeader(1), frames}));
+    folder.add("log-file", joined({logFileHeader(0), lengthFrames}));
+    folder.add("binary-log", binaryLog(stream));
+    folder.add("gzip", packed(frames));
   }
-  fs::remove(path);
   // pcapng: section header, interface of link type 147 with nanoseconds, one packet of four bytes.
   constexpr std::uint8_t pcapng[] = {
       0x0A, 0x0D, 0x0D, 0x0A, 28, 0, 0, 0, 0x4D, 0x3C, 0x2B, 0x1A, 1,  0, 0, 0, 0xFF, 0xFF, 0xFF, 0xFF,

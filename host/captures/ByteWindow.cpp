@@ -7,9 +7,9 @@ namespace varnel {
 
 namespace {
 
-// Large enough that a read costs little beside what is done with its bytes, small enough for the cache.
-constexpr std::size_t smallest = 1 << 18;
-constexpr std::size_t leastRoom = smallest / 4;
+// Large enough that a read costs little beside what is done with its bytes, small enough for the cache. Small
+// captures are done before it comes to that.
+constexpr std::size_t usual = 1 << 18, first = 1 << 14;
 
 }  // namespace
 
@@ -33,7 +33,8 @@ bool ByteWindow::skip(std::uint64_t count) {
 }
 
 void ByteWindow::makeRoom() {
-  if (_bytes.empty()) _bytes.resize(smallest);
+  const std::size_t size = bytesRead() < first ? first : usual, leastRoom = size / 4;
+  if (_bytes.size() < size) _bytes.resize(size);
   if (_bytes.size() - _end >= leastRoom) return;
   std::memmove(_bytes.data() + headroom, _bytes.data() + _begin, _end - _begin);
   _end -= _begin - headroom;

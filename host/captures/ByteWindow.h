@@ -46,7 +46,7 @@ class ByteWindow {
   void makeRoom();
 
   std::unique_ptr<ByteSource> _source;
-  std::vector<std::uint8_t> _bytes;
+  std::vector<std::uint8_t> _bytes = std::vector<std::uint8_t>(headroom);
   std::size_t _begin = headroom, _end = headroom;
   bool _isAtEnd = false;
 };

@@ -95,9 +95,11 @@ bool hasLengthFrame(ByteView bytes) {
 }
 
 bool isSoundSegment(ByteView segment) {
+  constexpr std::size_t smallest = 3;
+  if (segment.size() < smallest) return false;
   Bytes copy(segment.begin(), segment.end());
   const auto frame = unescaped(copy);
-  return frame.size() > 2 && isSound(frame);
+  return frame.size() >= smallest && isSound(frame);
 }
 
 // Whether the bytes begin with a whole and sound frame, which may begin with the end of another.

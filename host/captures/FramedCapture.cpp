@@ -18,6 +18,7 @@ constexpr std::size_t smallestSegment = checksumSize + 1;
 constexpr std::size_t longestSegment = 2 * (longestContents + checksumSize);
 
 std::uint8_t* find(std::uint8_t wanted, std::uint8_t* begin, const std::uint8_t* end) {
+  if (begin == end) return nullptr;  // where there may be no bytes at all to look at
   return static_cast<std::uint8_t*>(std::memchr(begin, wanted, static_cast<std::size_t>(end - begin)));
 }
 
