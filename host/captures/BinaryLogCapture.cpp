@@ -4,6 +4,7 @@
 #include <array>
 #include <string_view>
 
+#include "host/Subscription.h"
 #include "host/captures/LittleEndian.h"
 #include "host/captures/LogFrame.h"
 #include "host/captures/ModemTime.h"
@@ -145,7 +146,7 @@ void BinaryLogCapture::take(std::size_t recordOffset, std::size_t end, CaptureRe
     std::uint8_t* const first = bare.data() - 3;
     first[0] = prefixMark;
     record.message = {first, bare.size() + 3};
-    if (first[1] != 0) record.subscription = first[1];
+    record.subscription = subscriptionOf(record.message);
   }
   if (time < leastModemTime)
     record.time = {modemEpoch.seconds + static_cast<std::int64_t>(time / 1000),

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "host/Subscription.h"
 #include "host/captures/LittleEndian.h"
 
 namespace varnel {
@@ -13,7 +14,6 @@ constexpr std::size_t headerSize = 24, linkTypeOffset = 20, recordHeaderSize = 1
 // The upper bits tell of checksums.
 constexpr std::uint32_t linkTypeBits = 0xFFFF;
 constexpr std::int64_t nanosecondsPerSecond = 1'000'000'000;
-constexpr std::uint8_t prefixMark = 0x81;
 
 bool isMagic(std::uint32_t number) { return number == microsecondMagic || number == nanosecondMagic; }
 
@@ -81,8 +81,7 @@ std::string foreignLinkType(const std::string& name, std::uint32_t linkType, Byt
 
 void setMessage(CaptureRecord& record, ByteView message) {
   record.message = message;
-  record.subscription.reset();
-  if (message.size() >= 2 && message[0] == prefixMark && message[1] != 0) record.subscription = message[1];
+  record.subscription = subscriptionOf(message);
 }
 
 std::string tooLongLine(const std::string& name, std::uint64_t number, std::uint64_t size) {

@@ -50,6 +50,12 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
       ->type_name("X")
       ->capture_default_str();
   app.add_flag("--loop", options.loops, "start the capture over at its end")->needs(replay);
+  app.add_option("--sim", options.subscription,
+                 "of a capture with several SIM cards: replay the messages of this one's modem; the first "
+                 "that is met unless given")
+      ->needs(replay)
+      ->check(CLI::Range(1U, 255U).description(""))
+      ->type_name("N");
   auto* record =
       app.add_option("--record", options.recordPath,
                      "write what is sent to viewers to a capture that can be replayed and decoded; a file "

@@ -20,6 +20,7 @@ struct Options {
   std::optional<std::string> replayTechnology;
   double speed = 1;
   bool loops = false;
+  std::optional<unsigned> subscription;  ///< 1 to 255; absent: the first that the capture has
 
   std::optional<std::string> recordPath;  ///< absent: nothing is recorded
   ExistingRecording existingRecording = ExistingRecording::Refused;

@@ -8,11 +8,19 @@
 
 namespace varnel {
 
+ReplaySource::ReplaySource(std::string path, double speed, AtEnd atEnd,
+                           std::optional<std::uint8_t> subscription)
+    : _path(std::move(path)),
+      _speed(speed),
+      _atEnd(atEnd),
+      _subscriptions(subscription, _path, [](const std::string& line) { logError("%s", line); }) {}
+
 std::optional<StreamMessage> ReplaySource::next() {
   CaptureRecord record;
   try {
     if (!readRecord(record)) {
       _endNote = "the replay of " + _path + " has ended";
+      if (!_last && _subscriptions.leftOut() > 0) _endNote += ": all its messages are of other subscriptions";
       return std::nullopt;
     }
   } catch (const CaptureError& error) {
@@ -30,14 +38,21 @@ std::string ReplaySource::nameOfLast() const {
 
 bool ReplaySource::readRecord(CaptureRecord& record) {
   if (!_capture) _capture = open();
-  ++_recordsRead;
-  if (_capture->next(record)) return true;
+  if (readTaken(record)) return true;
   if (_atEnd == AtEnd::Stop || !_last) return false;
   _capture = open();
-  _recordsRead = 1;
-  if (!_capture->next(record)) return false;
+  _recordsRead = 0;
+  if (!readTaken(record)) return false;
   const auto pause = std::min(playingTime(std::chrono::seconds(1)), longestWait);
   _last = _origin = {record.time, _last->at + pause};
+  return true;
+}
+
+bool ReplaySource::readTaken(CaptureRecord& record) {
+  do {
+    ++_recordsRead;
+    if (!_capture->next(record)) return false;
+  } while (!_subscriptions.takes(record.subscription));
   return true;
 }
 

@@ -1,11 +1,13 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <memory>
 #include <optional>
 #include <string>
 
 #include "base/Time.h"
+#include "host/Subscription.h"
 #include "host/captures/Capture.h"
 #include "programs/varnel-telephonyd/MessageSource.h"
 
@@ -21,11 +23,12 @@ class ReplaySource final : public MessageSource {
   static constexpr std::chrono::milliseconds longestWait{5000};
 
   /// The capture is played that many times as fast. When it starts over, the first message follows the last
-  /// one after a second of the capture's time.
-  ReplaySource(std::string path, double speed, AtEnd atEnd)
-      : _path(std::move(path)), _speed(speed), _atEnd(atEnd) {}
+  /// one after a second of the capture's time. Of several subscriptions one is played: the one that is named,
+  /// else the first.
+  ReplaySource(std::string path, double speed, AtEnd atEnd, std::optional<std::uint8_t> subscription = {});
 
-  /// A fault of the capture is logged and ends the stream. So is, once, that a wait was shortened.
+  /// A fault of the capture is logged and ends the stream. So is, once, that a wait was shortened, and that
+  /// there are other subscriptions than the one that is played.
   std::optional<StreamMessage> next() override;
   std::string nameOfLast() const override;
   std::string endNote() const override { return _endNote; }
@@ -38,6 +41,7 @@ class ReplaySource final : public MessageSource {
   };
 
   bool readRecord(CaptureRecord& record);
+  bool readTaken(CaptureRecord& record);
   Moment following(Time time);
   void tellShortening(Time time);
   std::chrono::milliseconds playingTime(std::chrono::nanoseconds duration) const;
@@ -46,6 +50,7 @@ class ReplaySource final : public MessageSource {
   const std::string _path;
   const double _speed;
   const AtEnd _atEnd;
+  SubscriptionFilter _subscriptions;
   std::unique_ptr<Capture> _capture;  // open while it is being played
   std::size_t _recordsRead = 0;       // of this round
   std::optional<Moment> _last;        // absent before the first record

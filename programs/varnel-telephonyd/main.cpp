@@ -68,7 +68,7 @@ std::unique_ptr<MessageSource> makeSource(const Options& options) {
     return std::make_unique<SimulationSource>(simulatedModem(*options.simulatedTechnology, options.seed));
   }
   const auto atEnd = options.loops ? ReplaySource::AtEnd::StartOver : ReplaySource::AtEnd::Stop;
-  return std::make_unique<ReplaySource>(*options.replayPath, options.speed, atEnd);
+  return std::make_unique<ReplaySource>(*options.replayPath, options.speed, atEnd, options.subscription);
 }
 
 // What viewers are told. Opens the capture, if any, for what it says. Throws CaptureError.

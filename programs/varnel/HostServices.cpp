@@ -14,12 +14,15 @@ HostServices::HostServices(const Options& options, const ApplicationInfo& applic
       _resources(readableResourceFolder()),
       _files(options.deviceRoot),
       _preferences(options.deviceRoot),
-      _application(application) {}
+      _application(application) {
+  if (options.subscription)
+    _portsOfSubscription.emplace(_ports, static_cast<std::uint8_t>(*options.subscription));
+}
 
 ModelServices HostServices::model(std::ostream& standardOutput) {
-  return {
-      _ports, _telephony, _queue, {_resources, _clock, _application, standardOutput}, writeXmlPropertyList,
-      &_link};
+  MessagePorts& ports = _portsOfSubscription ? static_cast<MessagePorts&>(*_portsOfSubscription) : _ports;
+  return {ports, _telephony, _queue, {_resources, _clock, _application, standardOutput}, writeXmlPropertyList,
+          &_link};
 }
 
 }  // namespace varnel

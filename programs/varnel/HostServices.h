@@ -1,6 +1,7 @@
 #pragma once
 
 #include <iostream>
+#include <optional>
 
 #include "host/EventLoopQueue.h"
 #include "host/FilePreferences.h"
@@ -10,6 +11,7 @@
 #include "host/RootedFiles.h"
 #include "host/SocketPorts.h"
 #include "host/SocketTelephonyService.h"
+#include "host/SubscriptionPorts.h"
 #include "host/SystemClock.h"
 #include "model/VarnelModel.h"
 #include "programs/varnel/Options.h"
@@ -33,6 +35,7 @@ class HostServices final {
   std::filesystem::path _folder;
   LinkMonitor _link;
   SocketPorts _ports;
+  std::optional<SubscriptionPorts> _portsOfSubscription;  // where one is asked for
   SocketTelephonyService _telephony;
   EventLoopQueue _queue;
   FileResources _resources;

@@ -36,6 +36,11 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       ->check(CLI::Range(-1, std::numeric_limits<int>::max()).description(""))
       ->type_name("N")
       ->capture_default_str();
+  parser
+      .add_option("--sim", options.subscription,
+                  "of a phone with several SIM cards: show what this one's modem sends, 1 or 2 as a rule")
+      ->check(CLI::Range(1U, 255U).description(""))
+      ->type_name("N");
   parser.add_option("--updates", options.updates, "end after that many refreshes")
       ->check(CLI::Range(1U, std::numeric_limits<unsigned>::max()).description(""))
       ->type_name("N");

@@ -17,6 +17,7 @@ struct Options {
   std::optional<std::string> runtimeFolder;
   int logLevel = -1;  ///< the highest priority number that goes to standard error; -1 for none
   std::optional<unsigned> updates;
+  std::optional<unsigned> subscription;  ///< 1 to 255; absent: all
 };
 
 /// Has the parser of the command line fill the options, which outlive it.

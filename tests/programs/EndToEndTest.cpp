@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <fstream>
 #include <memory>
 #include <regex>
 
@@ -90,6 +91,39 @@ TEST_F(EndToEnd, ALivingTreeAppears) {
   EXPECT_THAT(output, HasSubstr("  Physical Cell ID"));
   EXPECT_THAT(output, HasSubstr("PDP Context Info\n"));
   EXPECT_THAT(output, testing::ContainsRegex("EF-ICCID +[0-9]"));
+}
+
+// A packet of the modem: log type, record length, code, timestamp, payload.
+std::string packetOf(const std::string& prefix, std::uint16_t code, const std::string& payload) {
+  const auto size = static_cast<char>(12 + payload.size());
+  return prefix + '\x01' + size + '\0' + static_cast<char>(code & 0xFF) + static_cast<char>(code >> 8) +
+         std::string(8, '\0') + payload;
+}
+
+TEST_F(EndToEnd, OfSeveralSimCardsAViewerShowsTheOneThatItIsAskedFor) {
+  // Antennas of the second card, then a measurement that names none.
+  const std::string antennas = packetOf("\x81\x02", 0xB0C1, std::string("\0\0\0\0\0\0\0\x04\0", 9)),
+                    measurement = packetOf("", 0xB17F, std::string(20, '\0'));
+  const std::string capture = _device.file("two.pcap");
+  std::ofstream file(capture, std::ios::binary);
+  file << std::string("\x4D\x3C\xB2\xA1\x02\0\x04\0\0\0\0\0\0\0\0\0\0\0\x04\0\x93\0\0\0", 24);
+  for (const std::string& message : {antennas, measurement}) {
+    const std::string size{static_cast<char>(message.size()), '\0', '\0', '\0'};
+    file << std::string(8, '\0') << size << size << message;
+  }
+  file.close();
+  const auto shown = [&](const char* card) {
+    const Process telephony(VARNEL_TELEPHONYD_PROGRAM,
+                            {"--replay", capture, "--runtime-dir", _runtime.path()});
+    const auto varnel = viewer({"--sim", card, "--updates", "1"});
+    EXPECT_TRUE(varnel->waitForEnd());
+    return varnel->output();
+  };
+  const std::string second = shown("2"), first = shown("1");
+  EXPECT_THAT(second, testing::ContainsRegex("Num Tx Antennas +4\n"));
+  EXPECT_THAT(second, HasSubstr("Average RSRP"));
+  EXPECT_THAT(first, Not(testing::ContainsRegex("Num Tx Antennas +4\n")));
+  EXPECT_THAT(first, HasSubstr("Average RSRP"));
 }
 
 TEST_F(EndToEnd, AKilledServerIsNoticedAndSoIsItsReturn) {

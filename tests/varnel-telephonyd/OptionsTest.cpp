@@ -57,6 +57,11 @@ TEST(TelephonydOptions, AReplayMayBeFasterAndStartOver) {
   EXPECT_EQ(reading.options().existingRecording, ExistingRecording::Refused);
 }
 
+TEST(TelephonydOptions, AReplayMayBeOfOneSubscription) {
+  EXPECT_EQ(read({"--replay", "walk.pcap", "--sim", "2"}).options().subscription, 2u);
+  EXPECT_EQ(read({"--replay", "walk.pcap"}).options().subscription, std::nullopt);
+}
+
 TEST(TelephonydOptions, ARecordingMayReplaceAnEarlierOneWhereThatIsSaid) {
   const Reading reading = read({"--simulate", "kalvi-lte", "--record", "a", "--overwrite"});
   EXPECT_EQ(reading.error, "");
@@ -73,6 +78,9 @@ TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
       {"--replay", "walk.pcap", "--seed", "2"},
       {"--replay", "walk.pcap", "--speed", "0"},
       {"--replay", "walk.pcap", "--speed", "nan"},
+      {"--replay", "walk.pcap", "--sim", "0"},
+      {"--replay", "walk.pcap", "--sim", "256"},
+      {"--simulate", "kalvi-lte", "--sim", "1"},
       {"--replay", "-"},
       {"--replay", "/etc/passwd", "--record", "/etc/../etc/passwd"},
       {"--replay", "/etc/no-such-file", "--record", "/etc/../etc/no-such-file"},

@@ -121,6 +121,39 @@ TEST_F(Replay, ADamagedCaptureEndsAtTheFault) {
   EXPECT_EQ(play({path(), 1, AtEnd::Stop}), (Messages{{0ms, {1}}}));
 }
 
+TEST_F(Replay, OfTwoSubscriptionsTheFirstIsPlayedAndALineSaysSo) {
+  const Bytes ofFirst{0x81, 1, 1, 13}, ofSecond{0x81, 2, 1, 13}, ofNone{1, 13};
+  write({{{1000, 0}, ofNone}, {{1001, 0}, ofSecond}, {{1002, 0}, ofFirst}, {{1003, 0}, ofSecond}});
+  RecordingLog log;
+  EXPECT_EQ(play({path(), 1, AtEnd::Stop}), (Messages{{0ms, ofNone}, {1s, ofSecond}, {3s, ofSecond}}));
+  EXPECT_EQ(log.takeTexts(),
+            (std::vector<std::string>{"<3>" + path() +
+                                      " has messages of subscriptions 2 and 1; those of 2 are taken, and "
+                                      "--sim 1 takes the others"}));
+}
+
+TEST_F(Replay, OneSubscriptionIsPlayedWhereItIsNamedAndRecordsKeepTheirNumbers) {
+  const Bytes ofFirst{0x81, 1, 1, 13}, ofSecond{0x81, 2, 1, 13}, ofNone{1, 13};
+  write({{{1000, 0}, ofSecond}, {{1002, 0}, ofFirst}, {{1003, 0}, ofNone}});
+  RecordingLog log;
+  EXPECT_EQ(play({path(), 1, AtEnd::StartOver, 1}, 3),
+            (Messages{{0ms, ofFirst}, {1s, ofNone}, {2s, ofFirst}}));
+  EXPECT_TRUE(log.lines().empty());
+  ReplaySource source(path(), 1, AtEnd::StartOver, 1);
+  for (const char* number : {"2", "3", "2"}) {
+    source.next();
+    EXPECT_EQ(source.nameOfLast(), std::string("Record ") + number + " of " + path());
+  }
+}
+
+TEST_F(Replay, ASubscriptionThatTheCaptureHasNotEndsIt) {
+  write({{{1000, 0}, {0x81, 2, 1, 13}}});
+  ReplaySource source(path(), 1, AtEnd::StartOver, 1);
+  EXPECT_FALSE(source.next());
+  EXPECT_EQ(source.endNote(),
+            "the replay of " + path() + " has ended: all its messages are of other subscriptions");
+}
+
 TEST_F(Replay, ACaptureThatIsGoneHasNoMessages) { EXPECT_TRUE(play({path(), 1, AtEnd::Stop}).empty()); }
 
 TEST_F(Replay, TellsHowItHasEnded) {
