@@ -1,7 +1,6 @@
 #pragma once
 
 #include <cstdint>
-#include <functional>
 #include <optional>
 #include <string>
 
@@ -14,30 +13,26 @@ namespace varnel {
 std::optional<std::uint8_t> subscriptionOf(ByteView message);
 
 /// Takes the messages of one subscription out of a stream that may have several, which the displays of one
-/// modem would mix. What names no subscription belongs to each.
+/// modem would mix: of the wanted one, or else of the first that is met. What names none is of the whole
+/// phone and always taken.
 class SubscriptionFilter {
  public:
-  using Tell = std::function<void(const std::string& line)>;
-
-  /// Unless one is wanted, the first that is met is taken; of the next other one `tell` gets a line, once,
-  /// which calls the stream by that name.
-  SubscriptionFilter(std::optional<std::uint8_t> wanted, std::string stream, Tell tell);
+  explicit SubscriptionFilter(std::optional<std::uint8_t> wanted) : _taken(wanted) {}
 
   bool takes(std::optional<std::uint8_t> subscription) {
-    return !subscription || subscription == _taken || takesNamed(*subscription);
+    if (!subscription) return true;
+    if (!_taken) _taken = subscription;
+    return subscription == _taken;
   }
 
-  /// How many messages were of other subscriptions so far.
-  std::uint64_t leftOut() const { return _leftOut; }
+  /// Absent as long as none was wanted and none met.
+  std::optional<std::uint8_t> taken() const { return _taken; }
 
  private:
-  bool takesNamed(std::uint8_t subscription);
-
-  bool _isTelling;
   std::optional<std::uint8_t> _taken;
-  std::string _stream;
-  Tell _tell;
-  std::uint64_t _leftOut = 0;
 };
+
+/// How users are told of a subscription, or of none.
+std::string subscriptionName(std::optional<std::uint8_t> subscription);
 
 }  // namespace varnel

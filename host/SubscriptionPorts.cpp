@@ -6,7 +6,7 @@ namespace varnel {
 
 MessagePorts::LocalPortCreation SubscriptionPorts::createLocalPort(std::string_view name,
                                                                    LocalPort::MessageHandler handler) {
-  const auto takeOne = [filter = SubscriptionFilter(_subscription, {}, {}), handler = std::move(handler)](
+  const auto takeOne = [filter = SubscriptionFilter(_subscription), handler = std::move(handler)](
                            std::int32_t identifier, ByteView data) mutable -> std::optional<Bytes> {
     if (!filter.takes(subscriptionOf(data))) return std::nullopt;
     return handler(identifier, data);

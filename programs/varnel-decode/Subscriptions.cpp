@@ -15,21 +15,15 @@ std::string joined(const std::vector<std::string>& names) {
 
 }  // namespace
 
-std::string subscriptionName(std::optional<std::uint8_t> subscription) {
-  return subscription ? "SIM " + std::to_string(*subscription) : "No SIM";
-}
-
 bool Subscriptions::take(const CaptureRecord& record) {
   ++_counts[record.subscription];
-  if (!record.subscription) return true;
-  if (!_chosen) _chosen = record.subscription;
-  return record.subscription == _chosen;
+  return _filter.takes(record.subscription);
 }
 
 std::vector<std::string> Subscriptions::others() const {
   std::vector<std::string> names;
   for (const auto& [subscription, count] : _counts)
-    if (subscription && subscription != _chosen) names.push_back(subscriptionName(subscription));
+    if (subscription && subscription != _filter.taken()) names.push_back(subscriptionName(subscription));
   return names;
 }
 
@@ -39,8 +33,8 @@ std::optional<std::string> Subscriptions::remark(const std::string& captureName)
     return captureName + " has no records of " + subscriptionName(_wanted) +
            (names.empty() ? ", and names no other SIM" : "; it has those of " + joined(names));
   if (_wanted || names.empty()) return std::nullopt;
-  return captureName + " has records of " + subscriptionName(_chosen) + ", which are decoded, and of " +
-         joined(names) + ", which are not; choose by --sim";
+  return captureName + " has records of " + subscriptionName(_filter.taken()) +
+         ", which are decoded, and of " + joined(names) + ", which are not; choose by --sim";
 }
 
 }  // namespace varnel

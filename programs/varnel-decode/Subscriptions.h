@@ -6,18 +6,18 @@
 #include <string>
 #include <vector>
 
+#include "host/Subscription.h"
 #include "host/captures/CaptureRecord.h"
 
 namespace varnel {
 
-/// Counts the records of each subscription, and chooses those of one: the wanted one, or else the first that
-/// is met. Records that name none are of the whole phone and always chosen.
+/// Counts the records of each subscription, and chooses those of one as `SubscriptionFilter` does.
 class Subscriptions {
  public:
   /// Absent stands for a record that names none; it comes first.
   using Counts = std::map<std::optional<std::uint8_t>, std::uint64_t>;
 
-  explicit Subscriptions(std::optional<std::uint8_t> wanted) : _wanted(wanted), _chosen(wanted) {}
+  explicit Subscriptions(std::optional<std::uint8_t> wanted) : _wanted(wanted), _filter(wanted) {}
 
   /// Counts the record. Whether it is one of those chosen.
   bool take(const CaptureRecord& record);
@@ -32,11 +32,8 @@ class Subscriptions {
   std::vector<std::string> others() const;
 
   const std::optional<std::uint8_t> _wanted;
-  std::optional<std::uint8_t> _chosen;
+  SubscriptionFilter _filter;
   Counts _counts;
 };
-
-/// How users are told of a subscription, or of none.
-std::string subscriptionName(std::optional<std::uint8_t> subscription);
 
 }  // namespace varnel

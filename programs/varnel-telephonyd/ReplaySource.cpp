@@ -13,14 +13,16 @@ ReplaySource::ReplaySource(std::string path, double speed, AtEnd atEnd,
     : _path(std::move(path)),
       _speed(speed),
       _atEnd(atEnd),
-      _subscriptions(subscription, _path, [](const std::string& line) { logError("%s", line); }) {}
+      _subscriptions(subscription),
+      _tellsOthers(!subscription) {}
 
 std::optional<StreamMessage> ReplaySource::next() {
   CaptureRecord record;
   try {
     if (!readRecord(record)) {
       _endNote = "the replay of " + _path + " has ended";
-      if (!_last && _subscriptions.leftOut() > 0) _endNote += ": all its messages are of other subscriptions";
+      if (!_last && _hasOthers)
+        _endNote += ": it has no records of " + subscriptionName(_subscriptions.taken());
       return std::nullopt;
     }
   } catch (const CaptureError& error) {
@@ -49,11 +51,19 @@ bool ReplaySource::readRecord(CaptureRecord& record) {
 }
 
 bool ReplaySource::readTaken(CaptureRecord& record) {
-  do {
+  for (;;) {
     ++_recordsRead;
     if (!_capture->next(record)) return false;
-  } while (!_subscriptions.takes(record.subscription));
-  return true;
+    if (_subscriptions.takes(record.subscription)) return true;
+    noteOther(*record.subscription);
+  }
+}
+
+void ReplaySource::noteOther(std::uint8_t subscription) {
+  _hasOthers = true;
+  if (!std::exchange(_tellsOthers, false)) return;
+  logError("%s has records of %s, which are replayed, and of %s, which are not; choose by --sim", _path,
+           subscriptionName(_subscriptions.taken()), subscriptionName(subscription));
 }
 
 // Distances are measured from an origin: those from record to record would add up their roundings.

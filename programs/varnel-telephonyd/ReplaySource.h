@@ -42,6 +42,7 @@ class ReplaySource final : public MessageSource {
 
   bool readRecord(CaptureRecord& record);
   bool readTaken(CaptureRecord& record);
+  void noteOther(std::uint8_t subscription);
   Moment following(Time time);
   void tellShortening(Time time);
   std::chrono::milliseconds playingTime(std::chrono::nanoseconds duration) const;
@@ -51,6 +52,8 @@ class ReplaySource final : public MessageSource {
   const double _speed;
   const AtEnd _atEnd;
   SubscriptionFilter _subscriptions;
+  bool _tellsOthers;  // than the one that is played, once
+  bool _hasOthers = false;
   std::unique_ptr<Capture> _capture;  // open while it is being played
   std::size_t _recordsRead = 0;       // of this round
   std::optional<Moment> _last;        // absent before the first record

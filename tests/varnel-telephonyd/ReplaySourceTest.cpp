@@ -128,8 +128,8 @@ TEST_F(Replay, OfTwoSubscriptionsTheFirstIsPlayedAndALineSaysSo) {
   EXPECT_EQ(play({path(), 1, AtEnd::Stop}), (Messages{{0ms, ofNone}, {1s, ofSecond}, {3s, ofSecond}}));
   EXPECT_EQ(log.takeTexts(),
             (std::vector<std::string>{"<3>" + path() +
-                                      " has messages of subscriptions 2 and 1; those of 2 are taken, and "
-                                      "--sim 1 takes the others"}));
+                                      " has records of SIM 2, which are replayed, and of SIM 1, which are "
+                                      "not; choose by --sim"}));
 }
 
 TEST_F(Replay, OneSubscriptionIsPlayedWhereItIsNamedAndRecordsKeepTheirNumbers) {
@@ -150,8 +150,7 @@ TEST_F(Replay, ASubscriptionThatTheCaptureHasNotEndsIt) {
   write({{{1000, 0}, {0x81, 2, 1, 13}}});
   ReplaySource source(path(), 1, AtEnd::StartOver, 1);
   EXPECT_FALSE(source.next());
-  EXPECT_EQ(source.endNote(),
-            "the replay of " + path() + " has ended: all its messages are of other subscriptions");
+  EXPECT_EQ(source.endNote(), "the replay of " + path() + " has ended: it has no records of SIM 1");
 }
 
 TEST_F(Replay, ACaptureThatIsGoneHasNoMessages) { EXPECT_TRUE(play({path(), 1, AtEnd::Stop}).empty()); }
