@@ -21,6 +21,7 @@
 #include "model/VarnelModelNode.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/PlotRecorder.h"
+#include "programs/varnel-decode/Printable.h"
 #include "programs/varnel-decode/SnapshotFile.h"
 
 using namespace varnel;
@@ -114,7 +115,8 @@ void checkValueTable(const std::vector<Generation>& generations, const std::vect
       const auto node = nodes.find(path);
       const std::string* value = node == nodes.end() ? nullptr : node->second->value();
       const std::string field = takeField(table, &path == &paths.back() ? '\n' : ',');
-      require(field == (value ? *value : ""), "a table holds the values under its paths");
+      require(field == (value ? printable(*value, "\t\r\n") : ""),
+              "a table holds the values under its paths");
     }
   }
   require(table.empty(), "a table has a row a display");

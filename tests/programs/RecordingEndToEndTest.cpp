@@ -16,7 +16,8 @@ using testing::HasSubstr;
 
 namespace fs = std::filesystem;
 
-constexpr const char* headerOfCaptures = "\x4D\x3C\xB2\xA1";
+// The block type of a section header, with which every pcapng file begins.
+constexpr const char* headerOfCaptures = "\x0A\x0D\x0D\x0A";
 
 // Real servers that record, and real viewers that visit them.
 class RecordingEndToEnd : public testing::Test {
