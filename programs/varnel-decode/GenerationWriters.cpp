@@ -23,12 +23,16 @@ std::string csvField(std::string_view value) {
   return quoted + '"';
 }
 
+std::string seconds(std::chrono::nanoseconds duration) {
+  char text[32];
+  std::snprintf(text, sizeof text, "%.3f", std::chrono::duration<double>(duration).count());
+  return text;
+}
+
 // Without a date there is none to show, but how long it took to come there.
 std::string timeAsJson(const Generation& generation) {
   if (generation.dating == Dating::Known) return jsonString(timestamp(generation.time));
-  char elapsed[32];
-  std::snprintf(elapsed, sizeof elapsed, "%.3f", std::chrono::duration<double>(generation.elapsed).count());
-  return std::string("null,\"Elapsed\":") + elapsed;
+  return "null,\"Elapsed\":" + seconds(generation.elapsed);
 }
 
 }  // namespace
@@ -86,7 +90,7 @@ ValueTable::ValueTable(std::FILE* output, const std::vector<std::string>& paths,
 
 void ValueTable::take(const Generation& generation) {
   std::string values;
-  for (const Column& column : _columns) values += ',' + csvField(valueIn(column, generation.display));
+  for (const Column& column : _columns) values += ',' + csvField(valueIn(column, generation));
   if (_style.displays == Displays::Changed && _before == values) return;
   std::string line = _captureName ? csvField(*_captureName) + ',' : std::string();
   if (generation.dating == Dating::Known) line += timestamp(generation.time);
@@ -94,18 +98,19 @@ void ValueTable::take(const Generation& generation) {
   _before = std::move(values);
 }
 
-std::string_view ValueTable::valueIn(const Column& column, const Value& display) const {
-  const auto value = leafValueUnderPath(display, column.path);
-  if (!value) return {};
-  if (_style.valuesAs == ValuesAs::Texts) return *value;
+std::string ValueTable::valueIn(const Column& column, const Generation& generation) const {
+  const auto value = leafValueUnderPath(generation.display, column.path);
+  if (!value) return column.path == elapsedPath ? seconds(generation.elapsed) : std::string();
+  if (_style.valuesAs == ValuesAs::Texts) return std::string(*value);
   if (isAbsent(*value)) return {};
   const std::string_view number = column.formats.number(*value);
-  return number.empty() ? *value : number;
+  return std::string(number.empty() ? *value : number);
 }
 
 void SeenPaths::take(const Generation& generation) {
   std::erase_if(_unseen, [&](const std::string& path) {
-    return leafValueUnderPath(generation.display, treePath(path)).has_value();
+    return treePath(path) == elapsedPath ||
+           leafValueUnderPath(generation.display, treePath(path)).has_value();
   });
   if (!_unseen.empty()) _shown.take(generation.display);
 }

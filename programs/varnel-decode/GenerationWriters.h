@@ -59,6 +59,9 @@ class EveryDisplay final : public GenerationSink {
   std::optional<DisplayJson> _before;  // what was shown last, when changes alone are written
 };
 
+/// The path of a table's column that tells the seconds since the first record.
+inline constexpr std::string_view elapsedPath = "/Elapsed";
+
 /// The columns of a table of values; the name of the capture is the first when there are several.
 enum class TableColumns { TimeAndValues, CaptureTimeAndValues };
 
@@ -67,7 +70,8 @@ std::string csvHeader(const std::vector<std::string>& paths, TableColumns column
                       const NumberFormats& formats);
 
 /// One line of comma-separated values (quoted as RFC 4180 has it, ended by a newline) a generation: its time,
-/// then the value under each path. A value that is absent is an empty field. Control characters are escapes
+/// then the value under each path; of the path Elapsed the seconds since the first record, where no display
+/// has a value of that name. A value that is absent is an empty field. Control characters are escapes
 /// (`\u001B`) but for tabs and line ends.
 class ValueTable final : public GenerationSink {
  public:
@@ -81,7 +85,7 @@ class ValueTable final : public GenerationSink {
     std::string path;
     EntryFormats formats;
   };
-  std::string_view valueIn(const Column& column, const Value& display) const;
+  std::string valueIn(const Column& column, const Generation& generation) const;
 
   std::FILE* _output;
   std::vector<Column> _columns;

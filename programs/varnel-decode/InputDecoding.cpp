@@ -228,7 +228,10 @@ class InputDecoding {
     std::optional<SnapshotFile> snapshot;
     if (!succeeds([&] { snapshot.emplace(bytes, _name); })) return generalError;
     bool isDone = !wantsGenerations() || succeeds([&] {
-      for (const Generation& generation : snapshot->generations()) report(generation);
+      for (const Generation& generation : snapshot->generations()) {
+        _elapsed.record(generation.time);
+        report(generation);
+      }
     });
     isDone &= writeBinaryLog(snapshot->items());
     isDone &= drawPicture();
@@ -243,6 +246,7 @@ class InputDecoding {
     generation.dating = _dating;
     generation.elapsed = _elapsed.at(generation.time);
     _isAnyShown = true;
+    _hasEmptyTimes |= _options.output == Output::ValueTable && _dating == Dating::Unknown;
     if (wantsGenerations()) _seen.take(generation);
     if (_recorder) _recorder->take(generation);
     if (!_streamed || succeeds([&] { _streamed->take(generation); })) return;
@@ -283,8 +287,18 @@ class InputDecoding {
     }
   }
 
+  void tellEmptyTimes() const {
+    if (!_hasEmptyTimes || isPointless()) return;
+    const bool isElapsedShown = std::ranges::any_of(
+        _options.tablePaths, [](const std::string& path) { return treePath(path) == elapsedPath; });
+    if (!isElapsedShown)
+      tell("the modem of " + _name +
+           " knew no date, so rows have no time; the path Elapsed gives the seconds since the first record");
+  }
+
   bool drawPicture() const {
     tellUnseenPaths();
+    tellEmptyTimes();
     tellUnplottedPaths();
     return !_recorder || succeeds([&] {
       if (_recorder->isEmpty())
@@ -369,6 +383,7 @@ class InputDecoding {
   ElapsedTime _elapsed;
   Dating _dating = Dating::Known;  // of the last record
   bool _isAnyShown = false;
+  bool _hasEmptyTimes = false;  // in a table
   bool _isOutputBroken = false;
 };
 

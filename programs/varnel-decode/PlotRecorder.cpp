@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <charconv>
+#include <chrono>
 #include <clocale>
 #include <cmath>
 #include <filesystem>
@@ -47,7 +48,7 @@ std::optional<Measurement> hexadecimalIn(std::string_view digits) {
   return Measurement{static_cast<double>(number), unitIn({rest, end})};
 }
 
-double secondsOf(Time time) {
+double secondsSinceEpoch(Time time) {
   const double seconds = static_cast<double>(time.seconds) + time.nanoseconds * 1e-9;
   return std::clamp(seconds, earliest, latest);
 }
@@ -188,8 +189,19 @@ PlotRecorder::PlotRecorder(const std::vector<std::string>& paths) {
     _series.push_back({.path = treePath(path), .unit = {}, .otherText = {}, .line = {}});
 }
 
+double PlotRecorder::secondsOf(const Generation& generation) {
+  const double elapsed = std::chrono::duration<double>(generation.elapsed).count();
+  const bool isDated = generation.dating == Dating::Known;
+  if (!_times) {
+    _times = isDated ? PlotTimes::SinceEpoch : PlotTimes::SinceFirstRecord;
+    if (isDated) _first = secondsSinceEpoch(generation.time) - elapsed;
+  }
+  const bool isOnClock = isDated && *_times == PlotTimes::SinceEpoch;
+  return isOnClock ? secondsSinceEpoch(generation.time) : _first + elapsed;
+}
+
 void PlotRecorder::take(const Generation& generation) {
-  const double seconds = secondsOf(generation.time);
+  const double seconds = secondsOf(generation);
   for (Series& series : _series) {
     const auto text = leafValueUnderPath(generation.display, series.path);
     const auto measurement = text ? measurementIn(*text) : std::nullopt;
@@ -220,7 +232,9 @@ Plot PlotRecorder::plot(const std::string& title) const {
   for (const Series& series : _series)
     if (!series.line.isEmpty()) labels.push_back(std::string_view(series.path).substr(1));
   const std::string_view section = commonSection(labels);
-  Plot plot{shortened(title + (section.empty() ? "" : ": " + std::string(section))), {}};
+  Plot plot{shortened(title + (section.empty() ? "" : ": " + std::string(section))),
+            {},
+            _times.value_or(PlotTimes::SinceEpoch)};
   for (const Series& series : _series) {
     if (series.line.isEmpty()) continue;
     std::string label = series.path.substr(1 + section.size());

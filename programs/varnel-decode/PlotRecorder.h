@@ -62,7 +62,9 @@ class PlotRecorder final : public GenerationSink {
   void take(const Generation& generation) override;
 
   bool isEmpty() const;
-  /// The picture of all that had numbers. What the labels have in common stands in the title.
+  /// The picture of all that had numbers. Its times are seconds since the first record where that one had no
+  /// date; later ones without a date stand where the time that has passed puts them. What the labels have in
+  /// common stands in the title.
   Plot plot(const std::string& title) const;
 
   /// A path that had values, none of which begins with a number.
@@ -78,7 +80,11 @@ class PlotRecorder final : public GenerationSink {
     std::optional<std::string> otherText;  // the first value that is no number
     PlotLine line;
   };
+  double secondsOf(const Generation& generation);
+
   std::vector<Series> _series;
+  std::optional<PlotTimes> _times;  // by the first display
+  double _first = 0;                // where the elapsed time began
 };
 
 /// The plot as an SVG picture, drawn by the module that comes with the program. Throws std::runtime_error

@@ -174,6 +174,54 @@ TEST_F(DecodeGenerations, NumbersAndChangesNeedSomethingToWriteThemIn) {
   }
 }
 
+// A log record without anything around it, so long after the start of a modem that knows no date.
+std::string undatedAntennas(std::uint64_t seconds, char count) {
+  return littleEndian(21, 2) + littleEndian(0xB0C1, 2) + littleEndian(seconds * 800 << 16, 8) +
+         std::string(7, '\0') + count + '\0';
+}
+
+// At 100, 101 and 105 seconds, so a tick at 102.
+std::string threeUndatedRecords() {
+  return undatedAntennas(100, 2) + undatedAntennas(101, 4) + undatedAntennas(105, 8);
+}
+
+TEST_F(DecodeGenerations, WhereTheDateIsUnknownJsonHasTheTimeThatHasPassed) {
+  const Result result = decode(threeUndatedRecords(), {"--every"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  ASSERT_EQ(linesOf(result.output), 2u) << result.output;
+  EXPECT_THAT(result.output, StartsWith("{\"Time\":null,\"Elapsed\":2.000,\"Display\":{"));
+  EXPECT_THAT(result.output.substr(result.output.find('\n') + 1),
+              StartsWith("{\"Time\":null,\"Elapsed\":5.000,\"Display\":{"));
+}
+
+TEST_F(DecodeGenerations, ElapsedIsAPathOfCsvWithAndWithoutADate) {
+  const std::vector<std::string> table{"--csv", "Elapsed", "Serving Cell Info/Num Tx Antennas", "--"};
+  const std::string header = "Time,Elapsed,Serving Cell Info/Num Tx Antennas\n";
+  const Result undated = decode(threeUndatedRecords(), table);
+  EXPECT_EQ(undated.output, header + ",2.000,4\n,5.000,8\n");
+  EXPECT_EQ(undated.error, "");
+  EXPECT_EQ(decode(threeRecords(), table).output,
+            header + "2024-03-01T14:05:11.500Z,2.000,4\n2024-03-01T14:05:14.000Z,4.500,8\n");
+}
+
+TEST_F(DecodeGenerations, ATableWithoutTimesSaysHowToGetThoseThatHavePassed) {
+  const Result result = decode(threeUndatedRecords(), {"--csv", "Serving Cell Info/Num Tx Antennas", "--"});
+  EXPECT_EQ(result.output, "Time,Serving Cell Info/Num Tx Antennas\n,4\n,8\n");
+  EXPECT_EQ(result.error, "varnel-decode: the modem of " + folder.file("capture") +
+                              " knew no date, so rows have no time; the path Elapsed gives the seconds since "
+                              "the first record\n");
+}
+
+TEST_F(DecodeGenerations, APictureOfUndatedRecordsCountsSeconds) {
+  const std::string picture = folder.file("picture.svg");
+  const Result result = decode(threeUndatedRecords(), {"--format", "none", "--plot", picture,
+                                                       "Serving Cell Info/Num Tx Antennas", "--"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  const std::string svg = contentsOf(picture);
+  EXPECT_THAT(svg, HasSubstr("seconds since the first record"));
+  EXPECT_THAT(svg, testing::Not(HasSubstr("1980")));
+}
+
 // Ten rounds of a hundred records in 9.9 s each, every one dated an hour before the last.
 std::string setBackAgainAndAgain() {
   std::string capture = pcapHeader();

@@ -124,11 +124,12 @@ class ChartMaker {
     axis->setLabelsPosition(QCategoryAxis::AxisLabelsPositionOnValue);
     axis->setRange(range.lowest, range.highest);
     axis->setStartValue(range.lowest);
-    for (const TimeTick& tick : timeTicks(range.lowest, range.highest))
+    for (const TimeTick& tick : timeTicks(range.lowest, range.highest, plot.times))
       axis->append(tick.label, tick.milliseconds);
-    axis->setTitleText(days(range) + (hasBands
-                                          ? QStringLiteral("; bands: lowest to highest, lines: their mean")
-                                          : QString()));
+    const QString times =
+        plot.times == PlotTimes::SinceEpoch ? days(range) : QStringLiteral("seconds since the first record");
+    axis->setTitleText(
+        times + (hasBands ? QStringLiteral("; bands: lowest to highest, lines: their mean") : QString()));
     _chart.addAxis(axis, Qt::AlignBottom);
     _timeAxis = axis;
   }

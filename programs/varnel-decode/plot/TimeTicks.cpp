@@ -40,12 +40,15 @@ QDateTime utc(double milliseconds) {
 
 }  // namespace
 
-std::vector<TimeTick> timeTicks(double first, double last) {
+std::vector<TimeTick> timeTicks(double first, double last, PlotTimes times) {
   const double step = stepFor(last - first);
   const QString format = formatFor(step, utc(first).date() == utc(last).date());
   std::vector<TimeTick> ticks;
-  for (double number = std::ceil(first / step); number * step <= last; ++number)
-    ticks.push_back({number * step, utc(number * step).toString(format)});
+  for (double number = std::ceil(first / step); number * step <= last; ++number) {
+    const double moment = number * step;
+    const bool hasDate = times == PlotTimes::SinceEpoch;
+    ticks.push_back({moment, hasDate ? utc(moment).toString(format) : QString::number(moment / second)});
+  }
   return ticks;
 }
 

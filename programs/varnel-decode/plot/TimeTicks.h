@@ -3,16 +3,18 @@
 #include <QString>
 #include <vector>
 
+#include "programs/varnel-decode/plot/Plot.h"
+
 namespace varnel {
 
 /// A moment of the time axis that has a label.
 struct TimeTick {
-  double milliseconds;  ///< since 1970
-  QString label;        ///< of UTC
+  double milliseconds;  ///< since 1970, or since the first record
+  QString label;        ///< of UTC, or seconds
 };
 
 /// Round moments between two others, in milliseconds since 1970: multiples of 1, 2 or 5 seconds and so on up
 /// to years, eight at most.
-std::vector<TimeTick> timeTicks(double first, double last);
+std::vector<TimeTick> timeTicks(double first, double last, PlotTimes times);
 
 }  // namespace varnel

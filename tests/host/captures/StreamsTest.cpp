@@ -4,6 +4,7 @@
 
 #include <thread>
 
+#include "host/captures/PcapEncoders.h"
 #include "tests/host/captures/CaptureFiles.h"
 
 namespace varnel {
@@ -291,6 +292,43 @@ TEST_F(Streams, TenThousandMutantsAreReadToTheirEnd) {
     }
     // No byte becomes part of two records; a framed one gains at most its log type and prefix.
     ASSERT_LE(size, bytes.size() + 3 * reading.records.size()) << i;
+    ASSERT_THAT(reading.error.value_or("memory"), testing::AllOf(HasSubstr("memory"), Not(HasSubstr("\n"))));
+  }
+}
+
+// The bytes with one to four of them changed.
+template <class Random>
+Bytes mutantOf(Bytes bytes, Random& random) {
+  for (std::uint64_t count = 1 + (random() >> 33) % 4; count > 0; --count)
+    bytes[(random() >> 33) % bytes.size()] = static_cast<std::uint8_t>(random() >> 40);
+  return bytes;
+}
+
+Bytes sixRecordsBy(CaptureEncoder& encoder) {
+  const ByteView beginning = encoder.beginning();
+  Bytes bytes(beginning.begin(), beginning.end());
+  for (int i = 0; i < 6; ++i) {
+    const ByteView more = encoder.encode({datedTime, Dating::Known, datedRecord.message, {}});
+    bytes.insert(bytes.end(), more.begin(), more.end());
+  }
+  return bytes;
+}
+
+TEST_F(Streams, TenThousandMutantsOfPcapAndGzipAreReadToTheirEnd) {
+  std::uint64_t state = 20240302;
+  auto random = [&] { return state = state * 6364136223846793005 + 1442695040888963407; };
+  PcapWriter pcap;
+  PcapngWriter pcapng("kalvi-lte");
+  const Bytes originals[] = {sixRecordsBy(pcap), sixRecordsBy(pcapng),
+                             packed(joined({datedFrame, undatedFrame, datedFrame}))};
+  EXPECT_EQ(readMemory(originals[0]).records.size(), 6u);
+  EXPECT_EQ(readMemory(originals[1]).records.size(), 6u);
+  EXPECT_EQ(readMemory(originals[2]).records.size(), 3u);
+  for (std::size_t i = 0; i < 10'000; ++i) {
+    const Bytes bytes = mutantOf(originals[i % 3], random);
+    const CaptureReading reading = readMemory(bytes);
+    ASSERT_LE(reading.records.size(), 6u) << i;
+    for (const KeptRecord& record : reading.records) ASSERT_LT(record.message.size(), 1000u) << i;
     ASSERT_THAT(reading.error.value_or("memory"), testing::AllOf(HasSubstr("memory"), Not(HasSubstr("\n"))));
   }
 }
