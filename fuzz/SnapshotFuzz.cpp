@@ -88,9 +88,10 @@ void addLeafPaths(std::vector<std::string>& paths, const VarnelModelNode& node, 
     addLeafPaths(paths, *child, childPath(path, child->displayName()));
 }
 
-void checkEveryDisplay(const std::vector<Generation>& generations) {
+void checkEveryDisplay(const std::vector<Generation>& generations, ValuesAs valuesAs) {
   Output output;
-  EveryDisplay sink(output.file(), std::nullopt);
+  const NumberFormats formats;
+  EveryDisplay sink(output.file(), std::nullopt, {valuesAs, Displays::All}, formats);
   for (const Generation& generation : generations) sink.take(generation);
   std::string_view lines = output.text();
   for (std::size_t count = generations.size(); count > 0; --count) {
@@ -104,7 +105,8 @@ void checkEveryDisplay(const std::vector<Generation>& generations) {
 
 void checkValueTable(const std::vector<Generation>& generations, const std::vector<std::string>& paths) {
   Output output;
-  ValueTable sink(output.file(), paths, std::nullopt);
+  const NumberFormats formats;
+  ValueTable sink(output.file(), paths, std::nullopt, {}, formats);
   for (const Generation& generation : generations) sink.take(generation);
   std::string_view table = output.text();
   for (const Generation& generation : generations) {
@@ -157,7 +159,8 @@ void checkGenerations(const SnapshotFile& snapshot) {
   PathDictionary nodes;
   const Value& display = generations.front().display;
   addLeafPaths(paths, *VarnelModelNode::makeTreeFromObject_withPathDictionary(display, nodes), "/");
-  checkEveryDisplay(generations);
+  for (const ValuesAs valuesAs : {ValuesAs::Texts, ValuesAs::Numbers})
+    checkEveryDisplay(generations, valuesAs);
   if (paths.empty()) return;
   checkValueTable(generations, paths);
   checkPlot(generations, paths);
