@@ -18,10 +18,10 @@
 #include "fuzz/MemoryFile.h"
 #include "fuzz/MessageRules.h"
 #include "fuzz/Require.h"
+#include "host/Printable.h"
 #include "model/VarnelModelNode.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/PlotRecorder.h"
-#include "programs/varnel-decode/Printable.h"
 #include "programs/varnel-decode/SnapshotFile.h"
 
 using namespace varnel;

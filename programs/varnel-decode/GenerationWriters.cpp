@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
+#include "host/Printable.h"
 #include "model/VarnelModelNode.h"
-#include "programs/varnel-decode/Printable.h"
 #include "programs/varnel-decode/StandardOutput.h"
 #include "programs/varnel-decode/Timestamps.h"
 #include "programs/varnel-decode/TreeWriters.h"

@@ -13,6 +13,7 @@ namespace {
 constexpr std::size_t largestSize = 4 << 20;
 constexpr std::size_t longestPath = 1000;  // that is worth the time
 constexpr std::size_t mostSuggestions = 3;
+constexpr std::size_t shortestPart = 3;  // of a name that is looked for in longer ones
 
 // How many characters have to be put in, left out or replaced.
 std::size_t editDistance(std::string_view from, std::string_view to) {
@@ -48,14 +49,31 @@ struct Suggestion {
   std::string_view path;
 };
 
-std::optional<Suggestion> suggestion(std::string_view wanted, std::string_view path) {
-  if (path.size() > wanted.size() && path.starts_with(wanted) && path[wanted.size()] == '/')
-    return Suggestion{0, path};
+// The distance, when it is at most a third of what is wanted.
+std::optional<std::size_t> nearbyDistance(std::string_view wanted, std::string_view path) {
   const std::size_t furthest = wanted.size() / 3;
   if (path.size() > wanted.size() + furthest || wanted.size() > path.size() + furthest) return std::nullopt;
   const std::size_t distance = editDistance(wanted, path);
   if (distance > furthest) return std::nullopt;
-  return Suggestion{distance, path};
+  return distance;
+}
+
+std::string_view parentOf(std::string_view path) { return path.substr(0, path.rfind('/') + 1); }
+
+// "RSRP" for "Average RSRP": whoever knows but a part of a name is not far from it.
+bool namesPartOf(std::string_view wanted, std::string_view path) {
+  const std::string_view part = wanted.substr(parentOf(wanted).size());
+  return part.size() >= shortestPart &&
+         path.substr(parentOf(path).size()).find(part) != std::string_view::npos;
+}
+
+std::optional<Suggestion> suggestion(std::string_view wanted, std::string_view path) {
+  if (path.size() > wanted.size() && path.starts_with(wanted) && path[wanted.size()] == '/')
+    return Suggestion{0, path};
+  const auto distance = namesPartOf(wanted, path) ? nearbyDistance(parentOf(wanted), parentOf(path))
+                                                  : nearbyDistance(wanted, path);
+  if (!distance) return std::nullopt;
+  return Suggestion{*distance, path};
 }
 
 }  // namespace

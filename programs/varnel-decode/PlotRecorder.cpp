@@ -12,8 +12,8 @@
 #include <utility>
 
 #include "base/ClockStep.h"
+#include "host/Printable.h"
 #include "model/VarnelModelNode.h"
-#include "programs/varnel-decode/Printable.h"
 #include "programs/varnel-decode/plot/ChartModule.h"
 
 namespace varnel {

@@ -4,7 +4,7 @@
 #include <stdexcept>
 #include <system_error>
 
-#include "programs/varnel-decode/Printable.h"
+#include "host/Printable.h"
 
 namespace varnel {
 

@@ -7,8 +7,8 @@
 
 #include "app/TreeText.h"
 #include "base/PropertyList.h"
+#include "host/Printable.h"
 #include "model/VarnelModelNode.h"
-#include "programs/varnel-decode/Printable.h"
 
 namespace varnel {
 

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "host/FileIdentity.h"
+#include "host/Printable.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
 
@@ -93,7 +94,7 @@ std::optional<std::string> conflict(const Options& options) {
 }
 
 ExitStatus mistake(const std::string& text) {
-  std::cerr << programName << ": " << text << "; see " << programName << " --help\n";
+  std::cerr << programName << ": " << printable(text) << "; see " << programName << " --help\n";
   return {usageError};
 }
 

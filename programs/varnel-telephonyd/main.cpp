@@ -8,6 +8,7 @@
 #include "host/EventLoopQueue.h"
 #include "host/HostApplication.h"
 #include "host/HostLog.h"
+#include "host/Printable.h"
 #include "host/ProgramStart.h"
 #include "host/RuntimeFolder.h"
 #include "host/SignalWatcher.h"
@@ -32,11 +33,13 @@ constexpr int generalError = 1;
 // 64 connections, 16 channels with half a dozen files each, and plenty to spare.
 constexpr std::size_t mostFiles = 1024;
 
-// On standard error, since a recording may go to standard output.
-void tell(const std::string& sentence) { std::fprintf(stderr, "%s: %s\n", programName, sentence.c_str()); }
+// On standard error, since a recording may go to standard output. Names of files must not steer the terminal.
+void tell(const std::string& sentence) {
+  std::fprintf(stderr, "%s: %s\n", programName, printable(sentence).c_str());
+}
 
 int fail(const std::runtime_error& error) {
-  std::fprintf(stderr, "%s: %s\n", programName, error.what());
+  tell(error.what());
   return generalError;
 }
 

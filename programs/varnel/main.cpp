@@ -2,6 +2,7 @@
 #include <iostream>
 
 #include "host/BuildInfo.h"
+#include "host/Printable.h"
 #include "host/ProgramStart.h"
 #include "host/TerminateHandler.h"
 #include "programs/varnel/Options.h"
@@ -30,14 +31,14 @@ int run(int argumentCount, char** arguments) {
   } catch (const CLI::Success& wish) {  // help or version
     return parser.exit(wish);
   } catch (const CLI::ParseError& error) {
-    std::cerr << programName << ": " << error.what() << "; see " << programName << " --help\n";
+    std::cerr << programName << ": " << printable(error.what()) << "; see " << programName << " --help\n";
     return usageError;
   }
   try {
     const auto view = wantsWindow(options) ? viewInWindow : viewAsText;
     return view(argumentCount, arguments, options, application);
   } catch (const std::runtime_error& error) {
-    std::cerr << programName << ": " << error.what() << '\n';
+    std::cerr << programName << ": " << printable(error.what()) << '\n';
     return generalError;
   }
 }

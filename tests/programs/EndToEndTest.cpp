@@ -357,5 +357,15 @@ TEST_F(EndToEnd, AWrongOptionIsOneLineAndStatusTwo) {
   EXPECT_EQ(occurrences(varnel->error(), "\n"), 1u) << varnel->error();
 }
 
+TEST_F(EndToEnd, NamesOfFilesDoNotSteerTheTerminal) {
+  const std::string name = "no\x1b[31m.pcap";
+  const std::vector<std::string> arguments{"--runtime-dir", _runtime.path(), "--replay", name};
+  Process telephony(VARNEL_TELEPHONYD_PROGRAM, arguments);
+  ASSERT_TRUE(telephony.waitForEnd());
+  EXPECT_EQ(telephony.exitStatus(), 1);
+  EXPECT_THAT(telephony.error(), HasSubstr("no\\u001B[31m.pcap"));
+  EXPECT_EQ(telephony.error().find('\x1b'), std::string::npos);
+}
+
 }  // namespace
 }  // namespace varnel

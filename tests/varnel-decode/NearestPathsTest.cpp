@@ -26,6 +26,13 @@ TEST(NearestPaths, AreThoseOfTheFewestEdits) {
   EXPECT_THAT(paths.to(std::string(100'000, 'x')), IsEmpty());
 }
 
+TEST(NearestPaths, APartOfANameLeadsToTheNamesThatHaveIt) {
+  NearestPaths paths;
+  paths.take(section({{"Measurements", section({{"P_Max", "1"}, {"Average RSRP", "2"}, {"Band", "3"}})}}));
+  EXPECT_THAT(paths.to("Measurments/RSRP"), ElementsAre("Measurements/Average RSRP"));
+  EXPECT_THAT(paths.to("Elsewhere/RSRP"), IsEmpty());
+}
+
 TEST(NearestPaths, ASectionLeadsToItsValues) {
   NearestPaths paths;
   paths.take(section({{"Cell", section({{"A rather long name", "1"}, {"B", section({})}})}, {"Call", "2"}}));

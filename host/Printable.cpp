@@ -1,4 +1,4 @@
-#include "programs/varnel-decode/Printable.h"
+#include "host/Printable.h"
 
 #include <cstdio>
 
