@@ -28,7 +28,8 @@ TEST(NearestPaths, AreThoseOfTheFewestEdits) {
 
 TEST(NearestPaths, APartOfANameLeadsToTheNamesThatHaveIt) {
   NearestPaths paths;
-  paths.take(section({{"Measurements", section({{"P_Max", "1"}, {"Average RSRP", "2"}, {"Band", "3"}})}}));
+  paths.take(section(
+      {{"Measurements", section({{"Paging Cycle", "1"}, {"Average RSRP", "2"}, {"Frequency Band", "3"}})}}));
   EXPECT_THAT(paths.to("Measurments/RSRP"), ElementsAre("Measurements/Average RSRP"));
   EXPECT_THAT(paths.to("Elsewhere/RSRP"), IsEmpty());
 }
