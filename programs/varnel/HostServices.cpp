@@ -20,9 +20,14 @@ HostServices::HostServices(const Options& options, const ApplicationInfo& applic
 }
 
 ModelServices HostServices::model(std::ostream& standardOutput) {
-  MessagePorts& ports = _portsOfSubscription ? static_cast<MessagePorts&>(*_portsOfSubscription) : _ports;
-  return {ports, _telephony, _queue, {_resources, _clock, _application, standardOutput}, writeXmlPropertyList,
-          &_link};
+  return {
+      ports(), _telephony, _queue, {_resources, _clock, _application, standardOutput}, writeXmlPropertyList,
+      &_link};
+}
+
+MessagePorts& HostServices::ports() {
+  if (_portsOfSubscription) return *_portsOfSubscription;
+  return _ports;
 }
 
 }  // namespace varnel

@@ -31,6 +31,9 @@ class HostServices final {
   Preferences& preferences() { return _preferences; }
 
  private:
+  // All of them, or those of the subscription that is asked for.
+  MessagePorts& ports();
+
   HostLog _log;
   std::filesystem::path _folder;
   LinkMonitor _link;
