@@ -56,7 +56,7 @@ TEST_F(RememberedSizeTest, ADamagedFileIsIgnored) {
   for (const char* text : {"", "480", "480 ", "480 655", "480 655\n480 655\n", "480x655\n", " 480 655\n",
                            "480  655\n", "wide high\n", "480 655 \n", "4.8 6.5\n"})
     EXPECT_EQ(sizeAfter(text), std::nullopt) << text;
-  EXPECT_EQ(sizeAfter(std::string("480\0655\n", 8)), std::nullopt);
+  EXPECT_EQ(sizeAfter("480" + std::string(1, '\0') + "655\n"), std::nullopt);
   EXPECT_EQ(sizeAfter(std::string(100000, '4')), std::nullopt);
 }
 
