@@ -117,7 +117,7 @@ bool PcapCapture::next(CaptureRecord& record) {
       throw CaptureError(place() + "only " + std::to_string(size) + " of " + std::to_string(sizeOnTheWay) +
                          " bytes were captured; capture again without a snapshot length");
     const std::int64_t nanoseconds = std::int64_t{number(4)} * _nanosecondsPerUnit;
-    // Kept: what is said to be a part of a second may be more than one.
+    // The file's part of a second may be more than a second.
     record.time = {std::int64_t{number(0)} + nanoseconds / nanosecondsPerSecond,
                    static_cast<std::int32_t>(nanoseconds % nanosecondsPerSecond)};
     record.dating = Dating::Known;
