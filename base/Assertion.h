@@ -6,8 +6,8 @@
 
 namespace varnel {
 
-/// Something that the program relies on turned out to be otherwise. Nobody catches it: the program ends, and
-/// what it says then names file, line and description.
+/// Something that the program relies on is not true. No code catches it: the program ends, and its last
+/// message names file, line, and description.
 class AssertionFailure : public std::logic_error {
  public:
   AssertionFailure(std::string file, int line, std::string description)

@@ -6,10 +6,10 @@
 
 namespace varnel {
 
-/// Bytes that somebody owns.
+/// Bytes with an owner.
 using Bytes = std::vector<std::uint8_t>;
 
-/// Bytes that somebody else owns, for the length of a call.
+/// Bytes that somebody else owns. Valid for the length of a call.
 using ByteView = std::span<const std::uint8_t>;
 
 }  // namespace varnel

@@ -4,15 +4,15 @@
 
 namespace varnel {
 
-/// How the clock that dated two records, one after the other in a capture, was going between them.
+/// What happened to a capture's clock between two records that follow each other.
 enum class ClockStep {
-  None,        ///< on, by a day at most
-  Overtaking,  ///< back by 10 s at most: nobody set it, the records overtook each other
-  Back,        ///< back by more
-  Ahead,       ///< on by more than a day
+  None,        ///< it went forward by at most a day
+  Overtaking,  ///< it went back by at most 10 s: nobody set it, one record overtook the other
+  Back,        ///< it went back by more than 10 s
+  Ahead,       ///< it went forward by more than a day
 };
 
-/// The moments may be any. After an overtaking the earlier record's is the one to compare the next with.
+/// Takes any two moments. After an `Overtaking`, compare the next record with the earlier of the two records.
 ClockStep clockStep(Time earlierRecord, Time laterRecord);
 
 }  // namespace varnel

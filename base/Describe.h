@@ -6,8 +6,9 @@
 
 namespace varnel {
 
-/// A value on one line, for the log: texts in quotes, dictionaries as {State = "Cell DCH"; } with every entry
-/// in its order, arrays as ("1", "2"), numbers in decimal, data as its length; the absent value as (null).
+/// A value on one line, for the log. Texts are in quotes, dictionaries look like {State = "Cell DCH"; } with
+/// their entries in order, arrays like ("1", "2"). Numbers are decimal, data is its length, and the absent
+/// value is (null).
 std::string describe(const Value& value);
 
 }  // namespace varnel

@@ -13,7 +13,7 @@ namespace {
 
 class Replacement {
  public:
-  // Nesting may be without end, and one container may stand in many places.
+  // Containers may contain themselves, and one container may be in many places.
   Value of(const Value& value, std::size_t depth = 0) {
     if (depth > fileLimits.depth || ++_nodes > fileLimits.expandedNodes) return {};
     if (const std::string* text = value.string())
@@ -52,7 +52,7 @@ class Replacement {
     return isSame ? value : Value(replaced);
   }
 
-  // Whether it has come through as it was.
+  // Whether nothing was replaced.
   static bool isSameValue(const Value& replaced, const Value& original) {
     if (original.array()) return replaced.array() == original.array();
     if (original.dictionary()) return replaced.dictionary() == original.dictionary();

@@ -4,10 +4,10 @@
 
 namespace varnel {
 
-/// A value whose texts and keys an XML property list can hold: what it cannot of them is U+FFFD. Containers
-/// in which nothing has to be replaced are those of the value, which stays as it is. Keys that would become
-/// the same get the number of their entry behind them. The absent value comes of what is larger than a file
-/// may be.
+/// The value with texts and keys that an XML property list can hold: U+FFFD replaces each character that it
+/// cannot hold. The given value does not change. The result shares each container in which nothing had to be
+/// replaced. When two keys would become the same, the number of its entry is added to the later one. Yields
+/// the absent value when the value is larger than a file may be.
 Value fitForXml(const Value& value);
 
 }  // namespace varnel

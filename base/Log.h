@@ -14,8 +14,8 @@ enum LogPriority : int {
   logErrorPriority = 3,
   logWarningPriority = 4,
   logNoticePriority = 5,
-  /// Kept: no priority of syslog(3). The two failures of the binary-log export carry it, and it is passed on
-  /// raw.
+  /// Kept: no priority of syslog(3). The two failures of the binary-log export have it; it is passed on
+  /// unchanged.
   logExportFailurePriority = 16,
 };
 
@@ -23,23 +23,23 @@ enum LogPriority : int {
 class LogSink {
  public:
   virtual ~LogSink() = default;
-  /// Takes one line; a newline that ends the text belongs to the text.
+  /// Takes one line. A newline at the end belongs to the text.
   virtual void write(int priority, std::string_view text) = 0;
 };
 
-/// Sends lines of that priority number and lower to the sink; all others are not even formatted. A null sink
-/// takes nothing. The sink must outlive its use.
+/// Sends lines of this priority number and lower to the sink. Other lines are not even formatted. A null sink
+/// takes nothing. The caller keeps the sink alive until another one is set.
 void setLogSink(LogSink* sink, int highestPriority);
-/// The sink that is set, null when there is none.
+/// The sink in use; null when there is none.
 LogSink* logSink();
-/// Changes how far the present sink's interest goes. May be called from any thread.
+/// Changes the highest priority number that the sink gets. May be called from any thread.
 void setHighestLogPriority(int highestPriority);
 
 namespace logging {
 
 inline std::atomic<int> highestPriorityTaken{-1};
 
-/// One argument of a log line, whatever its type.
+/// One argument of a log line, of any type.
 struct Argument {
   enum class Kind { Signed, Unsigned, Real, Pointer, Text } kind;
   union {
@@ -58,7 +58,7 @@ struct Argument {
   Argument(const T& string) : kind(Kind::Text), whole(0), text(string) {}
 };
 
-/// A format with one conversion an argument (%d %u %x %ld %lf %p %s), checked when it is compiled.
+/// A format with one conversion per argument (%d %u %x %ld %lf %p %s). The compiler checks it.
 template <class... Arguments>
 struct Format {
   template <std::size_t N>
@@ -100,13 +100,13 @@ void write(int priority, std::string_view format, std::initializer_list<Argument
 
 }  // namespace logging
 
-/// True when somebody takes lines of that priority.
+/// True when the sink takes lines of this priority.
 inline bool logTakes(int priority) {
   return priority <= logging::highestPriorityTaken.load(std::memory_order_relaxed);
 }
 
-/// Writes a line to the system log. A line that nobody takes costs one comparison. A null pointer prints as
-/// 0x0.
+/// Writes a line to the system log. A line that the sink does not take costs one comparison. A null pointer
+/// prints as 0x0.
 template <class... Arguments>
 void logLine(int priority, logging::Format<std::type_identity_t<Arguments>...> format,
              const Arguments&... arguments) {

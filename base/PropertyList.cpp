@@ -21,15 +21,15 @@ struct FreeNode {
 };
 using Node = std::unique_ptr<void, FreeNode>;
 
-// Memory that the library hands over.
+// Frees memory that the library allocated.
 struct Free {
   void operator()(void* memory) const { std::free(memory); }
 };
 
 Value readNode(plist_t node, Encoding encoding);
 
-// The texts of a binary list have been looked at before it was parsed. Those of an XML list may have got
-// anything from their entities.
+// The guard has checked the texts of a binary list before the parser saw them. A text of an XML list can get
+// any character from an entity.
 bool isFit(std::string_view text, Encoding encoding) {
   return encoding == Encoding::Binary || canHold(encoding, text);
 }
@@ -41,8 +41,8 @@ Value readText(plist_t node, Encoding encoding) {
   return isFit(view, encoding) ? Value(view) : Value();
 }
 
-// Of a date in the second before 2001 or in that after it, which the library tells alike. What it writes of a
-// date has the sign: a header, a marker, and the seconds as a real number, high byte first.
+// The library reports the second before 2001 and the second after it alike. The sign is only in the bytes
+// that it writes of a date: a header, a marker, and the seconds as a real number, high byte first.
 bool isBefore2001(plist_t date) {
   constexpr std::uint32_t signOffset = std::string_view("bplist00\x33").size();
   char* bytes = nullptr;
@@ -55,9 +55,9 @@ bool isBefore2001(plist_t date) {
 Value readDate(plist_t node) {
   Date date;
   plist_get_date_val(node, &date.seconds, &date.microseconds);
-  // What is out of range comes as the least number and microseconds without a meaning.
+  // The library reports a date out of range as the least number, with meaningless microseconds.
   if (date.seconds == std::numeric_limits<std::int32_t>::min()) return Value::ofDate({date.seconds, 0});
-  // The library cuts towards 2001 and gives microseconds without their sign.
+  // The library cuts toward 2001 and gives microseconds without their sign.
   if (date.microseconds > 0 && (date.seconds < 0 || (date.seconds == 0 && isBefore2001(node))))
     return Value::ofDate({date.seconds - 1, 1000000 - date.microseconds});
   return Value::ofDate(date);
@@ -103,7 +103,7 @@ Value readDictionary(plist_t node, Encoding encoding) {
   }
 }
 
-// The absent value when the node has no value that we know.
+// The absent value for a node of an unsupported kind.
 Value readNode(plist_t node, Encoding encoding) {
   switch (plist_get_node_type(node)) {
     case PLIST_STRING:
@@ -136,7 +136,7 @@ Value readNode(plist_t node, Encoding encoding) {
   }
 }
 
-/// Finds out whether a value has a form in an encoding, before anything is built.
+/// Checks whether an encoding can hold a value, before any node is built.
 class WriteCheck {
  public:
   explicit WriteCheck(Encoding encoding) : _encoding(encoding) {}
@@ -181,7 +181,7 @@ class WriteCheck {
   Allowance _bytes{fileLimits.expandedBytes};
 };
 
-// The caller, or the node it is put into, owns the node.
+// The caller owns the node until it puts it into another one.
 plist_t makeNode(const Value& value) {
   switch (value.kind()) {
     case Value::Kind::Absent:
@@ -215,7 +215,7 @@ plist_t makeNode(const Value& value) {
   return nullptr;
 }
 
-// The library writes a carriage return as it is, and readers of XML would take it for a newline.
+// The library does not escape a carriage return, and readers of XML would turn it into a newline.
 Bytes withCarriageReturnsEscaped(std::string_view xml) {
   constexpr std::string_view escaped = "&#13;";
   Bytes result;

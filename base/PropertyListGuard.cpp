@@ -15,8 +15,8 @@ namespace {
 
 constexpr std::string_view binaryMagic = "bplist00";
 
-/// Walks over the markup of an XML list. It is stricter than the parser where the parser's reading could be
-/// another one: each token must end at its first terminator, whatever stands in quotes.
+/// Walks over the markup of an XML list. Where the parser could read it differently, this walk is stricter:
+/// each token must end at its first terminator, even inside quotes.
 class XmlScan {
  public:
   XmlScan(ByteView bytes, const PropertyListLimits& limits)
@@ -28,7 +28,7 @@ class XmlScan {
         _pathBytes(limits.pathBytes) {}
 
   bool passes() {
-    // The parser takes U+0000 for the end of a name or a text.
+    // The parser takes U+0000 as the end of a name or a text.
     if (_rest.find('\0') != std::string_view::npos) return false;
     while (passText()) {
       if (_rest.empty()) return _containers.empty();
@@ -38,7 +38,7 @@ class XmlScan {
   }
 
  private:
-  // Each entity makes the parser move what follows it in its text.
+  // For each entity the parser moves the rest of the text.
   bool passText() {
     const std::string_view text = _rest.substr(0, _rest.find('<'));
     _rest.remove_prefix(text.size());
@@ -89,20 +89,21 @@ class XmlScan {
     return true;
   }
 
-  // Adds the difference of two squares.
+  // Adds the difference between the squares of the old and the new number of keys.
   bool passKey() {
     _keyText = _rest.data();
     return _containers.empty() || _keyPairs.take(2 * _containers.back().keyCount++ + 1);
   }
 
-  // A key ends with the next tag. Its entities and sections count as they are written, which is longer.
+  // A key ends with the next tag. Its entities and sections count as written, which is longer than their
+  // text.
   void endKey() {
     const auto length = static_cast<std::size_t>(_rest.data() - *_keyText);
     if (!_containers.empty()) _containers.back().key = length;
     _keyText.reset();
   }
 
-  // Of the path of a value that stands here.
+  // The length of the path of a value at this place.
   std::size_t pathHere() const {
     return _containers.empty() ? 0 : _containers.back().path + _containers.back().key + 1;
   }
@@ -113,7 +114,7 @@ class XmlScan {
     return true;
   }
 
-  // What stands before the terminator; both are taken.
+  // Takes the terminator and all before it; yields what was before it.
   std::optional<std::string_view> takeUntil(std::string_view terminator) {
     const std::size_t length = _rest.find(terminator);
     if (length == std::string_view::npos) return std::nullopt;
@@ -122,27 +123,29 @@ class XmlScan {
     return taken;
   }
 
-  // The parser passes over terminators in quotes. Here no token ends within quotes, so both see the same end.
+  // The parser ignores terminators inside quotes. This walk refuses a token that ends inside quotes, so both
+  // see the same end.
   static bool passUnquoted(std::optional<std::string_view> token) {
     return token && std::count(token->begin(), token->end(), '"') % 2 == 0 &&
            token->find('<') == std::string_view::npos;
   }
 
   struct Container {
-    std::size_t path;          // the length of its own
+    std::size_t path;          // the length of its own path
     std::size_t keyCount = 0;  // so far
-    std::size_t key = 0;       // the length of the last one, at least
+    std::size_t key = 0;       // the length of the last one, or less
   };
 
   std::string_view _rest;
   std::size_t _depth;
   Allowance _nodes, _keyPairs, _entityMoves, _pathBytes;
   std::vector<Container> _containers;   // those that are open
-  std::optional<const char*> _keyText;  // where it begins, within a key
+  std::optional<const char*> _keyText;  // inside a key: where its text begins
 };
 
-/// Walks over the objects of a binary list as the parser will: from the root along every reference, as often
-/// as an object is referred to. The allowances end the walk, so a cycle needs no mark: it runs out of depth.
+/// Walks over the objects of a binary list as the parser does: from the root along every reference, so it
+/// visits an object as often as others refer to it. The limits end the walk. A cycle ends when it exceeds the
+/// depth.
 class BinaryWalk {
  public:
   BinaryWalk(ByteView bytes, const PropertyListLimits& limits)
@@ -179,7 +182,7 @@ class BinaryWalk {
   // Where a value stands.
   struct Place {
     std::size_t depth = 0;  // the containers around it
-    std::size_t path = 0;   // the length of its path, at least
+    std::size_t path = 0;   // the length of its path, or less
 
     Place below(std::size_t key) const { return {depth + 1, path + key + 1}; }
   };
@@ -225,13 +228,13 @@ class BinaryWalk {
     return true;
   }
 
-  // All keys stand before all values.
+  // A dictionary has all its keys first, then all its values.
   bool passDictionary(std::size_t content, std::uint64_t size, Place place) {
     if (size > contentLeft(content) / _referenceSize / 2 || !_keyPairs.take(size * size)) return false;
     for (std::size_t i = 0; i < size; ++i) {
       const auto key = objectAt(reference(content, i));
       if (!key || (key->kind != 0x5 && key->kind != 0x6) || !passObject(*key, place)) return false;
-      // A unit of UTF-16 is three bytes of UTF-8 at most.
+      // A unit of UTF-16 is at most three bytes of UTF-8.
       const std::size_t length = key->kind == 0x6 ? 3 * key->size : key->size;
       if (!passValue(reference(content, size + i), place.below(length))) return false;
     }
@@ -247,7 +250,7 @@ class BinaryWalk {
     return object.kind >= 0x4 && object.size == 15 ? withLongSize(object) : object;
   }
 
-  // A size of 15 and more stands behind the marker as an integer object.
+  // A size of 15 or more follows the marker as an integer object.
   std::optional<Object> withLongSize(const Object& object) const {
     if (!holds(object.content, 1)) return std::nullopt;
     const unsigned marker = _bytes[object.content];
@@ -276,7 +279,7 @@ class BinaryWalk {
     return number(content + position * _referenceSize, _referenceSize);
   }
 
-  // An unsigned big-endian number. Nearly all have a byte or two.
+  // An unsigned big-endian number. Nearly all have one or two bytes.
   std::uint64_t number(std::size_t offset, std::size_t width) const {
     const std::uint8_t* bytes = _bytes.data() + offset;
     if (width == 1) return bytes[0];
@@ -297,7 +300,7 @@ class BinaryWalk {
   std::uint64_t _objectCount = 0;
 };
 
-// Writers share equal texts, so those expand; no writer shares containers.
+// Writers share equal texts, so texts expand. No writer shares containers.
 PropertyListLimits limitsForSize(PropertyListLimits limits, std::size_t size) {
   if (limits.expansion == PropertyListLimits::Expansion::Allowed) return limits;
   constexpr std::size_t nodesPerByte = 1, bytesPerByte = 64, pathBytesPerByte = 1024;

@@ -7,11 +7,11 @@
 
 namespace varnel {
 
-/// What is left of a limited amount.
+/// The rest of a limited amount.
 class Allowance {
  public:
   explicit Allowance(std::size_t amount) : _left(amount) {}
-  /// False, and nothing taken, when less than that is left.
+  /// False, without taking anything, when less than the amount is left.
   bool take(std::size_t amount) {
     if (amount > _left) return false;
     _left -= amount;
@@ -25,9 +25,8 @@ class Allowance {
 /// True for bytes that begin as a binary property list does.
 bool isBinaryPropertyList(ByteView bytes);
 
-/// True when the bytes are within the limits and hold nothing that the parser must not see. What else is
-/// wrong with them is left to the parser. Takes time in proportion to the bytes and the expanded nodes and
-/// bytes.
+/// True when the bytes are within the limits and hold nothing that the parser must not see. The parser finds
+/// all other errors. Takes time in proportion to the bytes, the expanded nodes, and the expanded bytes.
 bool isSafeToParse(ByteView bytes, const PropertyListLimits& limits);
 
 }  // namespace varnel

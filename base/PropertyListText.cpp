@@ -7,7 +7,7 @@ namespace varnel {
 
 namespace {
 
-// Takes the first character of the text; 0 when it is no UTF-8.
+// Takes the first character of the text; 0 when the text does not begin with valid UTF-8.
 char32_t takeCharacter(std::string_view& text) {
   const auto first = static_cast<unsigned char>(text[0]);
   const std::size_t length = first < 0x80 ? 1 : first < 0xE0 ? 2 : first < 0xF0 ? 3 : 4;
@@ -30,7 +30,7 @@ bool isPlain(char character) {
   return code >= 0x20 && code < 0x80;
 }
 
-// Whether the text begins with eight characters that are plain.
+// Whether the text begins with eight plain ASCII characters.
 bool beginsPlain(std::string_view text) {
   constexpr std::uint64_t highBits = 0x8080808080808080;
   constexpr std::uint64_t blanks = 0x2020202020202020;
@@ -69,7 +69,7 @@ std::string replacedWhereUnfit(Encoding encoding, std::string_view text) {
   while (!text.empty()) {
     const std::string_view before = text;
     const char32_t character = takeCharacter(text);
-    if (text.size() == before.size()) text.remove_prefix(1);  // no UTF-8
+    if (text.size() == before.size()) text.remove_prefix(1);  // not UTF-8
     if (isFit(encoding, character))
       replaced += before.substr(0, before.size() - text.size());
     else

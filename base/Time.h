@@ -16,24 +16,24 @@ struct Time {
                           const Time&) = default;  // NOLINT(modernize-use-nullptr): no pointer here
 };
 
-/// How long after the one moment the other is, negative when it is before. What nanoseconds cannot tell (292
-/// years and more) comes out as the longest time that they can.
+/// The time from the start to the end; negative when the end is earlier. A time that 64 bits of nanoseconds
+/// cannot hold (292 years and more) becomes the longest one that they can.
 std::chrono::nanoseconds durationBetween(Time start, Time end);
 
-/// How far a local clock stands from UTC.
+/// The difference between a local clock and UTC.
 struct TimeZone {
-  std::int32_t offsetSeconds = 0;  ///< local time less UTC, daylight time included
+  std::int32_t offsetSeconds = 0;  ///< local time minus UTC, daylight saving time included
   bool daylight = false;           ///< daylight saving time is in force
 };
 
-/// A moment broken down on the calendar of a zone.
+/// A moment as calendar date and time of day in a time zone.
 struct CalendarTime {
   std::int64_t year;
   unsigned month, day, hour, minute, second;
 };
 CalendarTime calendarTime(Time time, TimeZone zone = {});
 
-/// The default textual form of a moment: YYYY-MM-DD hh:mm:ss +0000, always in UTC.
+/// The default text of a moment: YYYY-MM-DD hh:mm:ss +0000, always in UTC.
 std::string dateDescription(Time time);
 
 }  // namespace varnel
