@@ -54,17 +54,20 @@ inline constexpr PropertyListLimits fileLimits{
 /// - for bytes that are no property list, or that break a limit;
 /// - for a list with a UID or a set;
 /// - for a text that the encoding cannot hold: U+0000 and bad UTF-8 or UTF-16, in XML also U+FFFE, U+FFFF,
-///   and control characters other than tab, newline, and carriage return. An integer of 2^63 or more becomes
-///   negative, with the same 64 bits. A date that does not fit into 32 bits of seconds becomes the earliest
-///   date that does. The process's LC_NUMERIC must be "C".
+///   and control characters other than tab, newline, and carriage return.
+///
+/// An integer of 2^63 or more becomes negative, with the same 64 bits. A date that does not fit into 32 bits
+/// of seconds becomes the earliest date that does. The process's LC_NUMERIC must be "C".
 std::optional<Value> readPropertyList(ByteView bytes, const PropertyListLimits& limits = messageLimits);
 
 /// Writes a property list and keeps the order of its keys. Yields nothing
 /// - for the absent value;
 /// - for a text that the encoding cannot hold, as in reading;
 /// - for containers nested deeper than in files, or containing themselves;
-/// - for more than files may hold. XML keeps whole seconds of dates and writes the real -0 as 0. A binary
-///   date can change by a microsecond. All other values are kept. The process's LC_NUMERIC must be "C".
+/// - for more than files may hold.
+///
+/// XML keeps whole seconds of dates and writes the real -0 as 0. A binary date can change by a microsecond.
+/// All other values are kept. The process's LC_NUMERIC must be "C".
 std::optional<Bytes> writeXmlPropertyList(const Value& value);
 std::optional<Bytes> writeBinaryPropertyList(const Value& value);
 
