@@ -5,9 +5,9 @@
 
 namespace varnel {
 
-/// What the application says of itself.
+/// What the application says about itself.
 struct ApplicationInfo {
-  std::optional<std::string> version;  ///< absent when the build knows none
+  std::optional<std::string> version;  ///< absent when the build has no version
   std::string buildDate;               ///< the compiler's date and time, "Nov  2 2022 18:26:06"
 };
 

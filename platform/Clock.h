@@ -9,7 +9,7 @@ class Clock {
  public:
   virtual ~Clock() = default;
   virtual Time now() const = 0;
-  /// The local zone as it is in force at that moment.
+  /// The rules of the local zone at that moment.
   virtual TimeZone zoneAt(Time time) const = 0;
 };
 

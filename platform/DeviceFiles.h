@@ -6,11 +6,11 @@
 
 namespace varnel {
 
-/// How the writing of a file went.
+/// The result of writing a file.
 struct FileWriting {
-  std::string place;         ///< the file, by the name that users of the host find it under
-  std::string failure;       ///< why there is no new file, as a phrase; empty when there is one
-  bool hasReplaced = false;  ///< a file that had the name is gone
+  std::string place;         ///< the file, by the name under which users of the host find it
+  std::string failure;       ///< why there is no new file, as a phrase; empty on success
+  bool hasReplaced = false;  ///< an earlier file of this name is gone
 
   bool isDone() const { return failure.empty(); }
 };
@@ -21,7 +21,7 @@ class DeviceFiles {
   virtual ~DeviceFiles() = default;
   /// True when a file or a folder stands at the path.
   virtual bool exists(const std::string& path) const = 0;
-  /// Writes an XML property list, which takes the place of a file that is there. No folder is made.
+  /// Writes an XML property list and replaces an existing file. Makes no folder.
   virtual FileWriting writePropertyList(const Value& list, const std::string& path) = 0;
 };
 

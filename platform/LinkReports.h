@@ -5,24 +5,24 @@
 
 namespace varnel {
 
-/// What the host knows of the link to the telephony service that a user should be told.
+/// What the host knows about the link to the telephony service, and a user should know.
 struct LinkReport {
-  /// One sentence: why the last attempt to connect failed, where it looked, and what to type. Empty after one
-  /// that went well, and before the first.
+  /// One sentence: why the last attempt to connect failed, where it looked, and what to type. Empty before
+  /// the first attempt and after a successful one.
   std::string trouble;
-  /// Where viewer and server meet, by the name that users have for it. Empty when there is no such name.
+  /// Where viewer and server meet, by the name that users know. Empty when there is no such name.
   std::string place;
-  /// One sentence that the server said last about where its messages come from, as that a replay has ended.
-  /// Empty when it said none since the link was opened.
+  /// The server's last sentence about where its messages come from, for example that a replay has ended.
+  /// Empty when it has sent none since the link was opened.
   std::string serverNote;
-  /// Messages since the link was opened that the server could not pass on because this viewer read too
+  /// How many messages the server could not deliver since the link was opened, because this viewer reads too
   /// slowly.
   std::uint64_t droppedByServer = 0;
-  /// Messages since the link was opened that are longer than the channel takes.
+  /// How many messages since the link was opened are longer than the channel allows.
   std::uint64_t tooLongForChannel = 0;
 };
 
-/// Tells how the link does. Whoever shows it asks again whenever something may have changed.
+/// Reports on the link. The caller asks again whenever something may have changed.
 class LinkReports {
  public:
   virtual ~LinkReports() = default;

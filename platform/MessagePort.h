@@ -11,31 +11,31 @@
 
 namespace varnel {
 
-/// The receiving end of a named message port. Destroying it gives the name free without calling the
+/// The receiving end of a named message port. The destructor frees the name and does not call the
 /// invalidation handler.
 class LocalPort {
  public:
-  /// Takes one message and returns the reply, if there is one. Called on the main queue. An exception that
-  /// leaves it ends the program.
+  /// Takes one message and returns the reply, if there is one. The port calls it on the main queue. An
+  /// exception that leaves it ends the program.
   using MessageHandler = std::function<std::optional<Bytes>(std::int32_t identifier, ByteView data)>;
   using InvalidationHandler = std::function<void()>;
 
   virtual ~LocalPort() = default;
-  /// Messages are delivered from this call on.
+  /// The port delivers messages from this call on.
   virtual void deliverOnMainQueue() = 0;
-  /// An empty handler removes the one that is set.
+  /// An empty handler removes the handler that is set.
   virtual void setInvalidationHandler(InvalidationHandler handler) = 0;
-  /// Ends the port and then calls the invalidation handler, which may destroy the port. The peer's going away
-  /// does the same. A port that has ended stays so: a second call does nothing.
+  /// Ends the port and then calls the invalidation handler, which may destroy the port. The same happens when
+  /// the peer goes away. A second call does nothing.
   virtual void invalidate() = 0;
 };
 
-/// The sending end of a port of another process.
+/// The sending end of another process's port.
 class RemotePort {
  public:
   struct SendResult {
-    std::int32_t status = 0;     ///< 0 when the message went out; else one of the codes below
-    std::optional<Bytes> reply;  ///< absent when none was asked for or none came
+    std::int32_t status = 0;     ///< 0 when the message was sent; else one of the codes below
+    std::optional<Bytes> reply;  ///< absent when no reply was asked for, or none came
   };
   static constexpr std::int32_t sendTimeout = -1;
   static constexpr std::int32_t receiveTimeout = -2;
@@ -45,19 +45,19 @@ class RemotePort {
 
   virtual ~RemotePort() = default;
   /// Sends one message. With a reply time-out it waits that long for the reply, and nothing else is delivered
-  /// meanwhile; without one it asks for no reply.
+  /// meanwhile. Without a reply time-out it asks for no reply.
   virtual SendResult sendRequest(std::int32_t identifier, ByteView data, std::chrono::milliseconds timeout,
                                  std::optional<std::chrono::milliseconds> replyTimeout) = 0;
   virtual bool isValid() const = 0;
   virtual void invalidate() = 0;
 };
 
-/// Makes ports by name.
+/// Makes ports with given names.
 class MessagePorts {
  public:
   struct LocalPortCreation {
     std::unique_ptr<LocalPort> port;  ///< null when the port could not be made
-    bool alreadyExists = false;       ///< a port of that name lives already
+    bool alreadyExists = false;       ///< there is already a port of that name
   };
 
   virtual ~MessagePorts() = default;

@@ -12,10 +12,10 @@ namespace varnel {
 class Resources {
  public:
   virtual ~Resources() = default;
-  /// The property list of that name (without the extension "plist"), wherever below the resource folder it
-  /// lies; absent when there is none or it cannot be read.
+  /// The property list of this name (without the extension "plist"), anywhere below the resource folder.
+  /// Absent when there is none, or when it cannot be read.
   virtual Value propertyList(std::string_view name) const = 0;
-  /// Every property-list resource as its path below the resource folder ("LTE.plist"), in name order.
+  /// The path of every property-list resource below the resource folder ("LTE.plist"), sorted by name.
   virtual std::vector<std::string> propertyListPaths() const = 0;
 };
 

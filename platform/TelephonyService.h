@@ -9,7 +9,7 @@
 
 namespace varnel {
 
-/// The identifiers under which the telephony service publishes its modem technologies.
+/// The names of modem technologies that the telephony service uses.
 namespace technology {
 inline constexpr std::string_view ifxGSM = "ifx-gsm";
 inline constexpr std::string_view kalviGSMUMTS = "kalvi-gsm-umts";
@@ -44,7 +44,7 @@ inline constexpr std::string_view serving = "Serving";
 inline constexpr std::string_view neighbor = "Neighbor";
 }  // namespace cellMonitor
 
-/// An open connection to the telephony service; destroying it closes it.
+/// An open connection to the telephony service. The destructor closes it.
 class TelephonyConnection {
  public:
   struct LogChannel {
@@ -53,16 +53,16 @@ class TelephonyConnection {
   };
 
   virtual ~TelephonyConnection() = default;
-  /// Asks for a network-monitor log channel that delivers to the local port of that name.
+  /// Asks for a network-monitor log channel that delivers to the local port of this name.
   virtual LogChannel createLogChannel(std::string_view localPortName) = 0;
 };
 
-/// The telephony server of the host.
+/// The host's telephony server.
 class TelephonyService {
  public:
   virtual ~TelephonyService() = default;
   /// Opens a connection with the access rights "spi" and "internal"; null when the service cannot be reached.
-  /// The handler is called for every notification that arrives while the connection is open.
+  /// The connection calls the handler for every notification that arrives while it is open.
   virtual std::unique_ptr<TelephonyConnection> connect(std::function<void()> notificationHandler) = 0;
 };
 

@@ -2,7 +2,8 @@
 
 namespace varnel {
 
-/// Whether a change is shown happening. It has happened either way when the call that asks for it returns.
+/// Whether the user sees the change in motion. Either way it is complete when the call that asks for it
+/// returns.
 enum class Animation { None, Animated };
 
 }  // namespace varnel

@@ -7,7 +7,7 @@ namespace varnel {
 struct Font {
   enum class Weight { Regular, Bold };
 
-  std::string family{};  ///< the system's own when empty; the nearest one there is when the host lacks it
+  std::string family{};  ///< empty for the system's own; the nearest one when the host lacks it
   double size = 0;       ///< logical pixels
   Weight weight = Weight::Regular;
 

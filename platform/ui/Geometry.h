@@ -2,7 +2,7 @@
 
 namespace varnel {
 
-/// Lengths are logical pixels; x grows to the right, y downward.
+/// Lengths are logical pixels. x grows to the right, y grows downward.
 struct Size {
   double width = 0;
   double height = 0;

@@ -8,15 +8,16 @@
 
 namespace varnel {
 
-/// One line of plain text, left-aligned and centred vertically in its frame. It never takes the row's clicks.
+/// One line of plain text, left-aligned and vertically centered in its frame. Clicks go through it to the
+/// row.
 class Label {
  public:
   virtual ~Label() = default;
   virtual void setFont(const Font& font) = 0;
-  /// The text is shown character by character as it is: no mark-up, no mnemonics.
+  /// Every character of the text is shown as it is: there is no markup and there are no mnemonics.
   virtual void setText(std::string_view text) = 0;
   virtual std::string text() const = 0;
-  /// Where it stands in what holds it.
+  /// The frame in the coordinates of the parent.
   virtual void setFrame(const Rect& frame) = 0;
 };
 

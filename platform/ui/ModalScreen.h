@@ -10,20 +10,20 @@
 
 namespace varnel {
 
-/// A screen that covers the others and takes all input, made from a layout.
+/// A screen that covers the others and takes all input. A layout describes it.
 class ModalScreen {
  public:
-  /// Called with the name of the operation that a button or the background stands for.
+  /// Called with the name of the operation of a button or of the background.
   using Actions = std::function<void(std::string_view action)>;
 
   virtual ~ModalScreen() = default;
   virtual void setFrame(const Rect& frame) = 0;
-  /// The element of that outlet, which lives as long as the screen; null when the layout has none.
+  /// The element of this outlet; null when the layout has none. It lives as long as the screen.
   virtual TableView* table(std::string_view outlet) = 0;
   virtual TextField* textField(std::string_view outlet) = 0;
 };
 
-/// Who runs a modal screen.
+/// Controls a modal screen.
 class ModalController {
  public:
   virtual ~ModalController() = default;
@@ -32,7 +32,7 @@ class ModalController {
   /// Called once, before the screen first appears.
   virtual void viewDidLoad() {}
   virtual void viewWillAppear(Animation) {}
-  /// A host that runs short of memory calls them; the second when it has dropped the screen.
+  /// A host that is short of memory calls both. It calls the second one after it has dropped the screen.
   virtual void didReceiveMemoryWarning() {}
   virtual void viewDidUnload() {}
 };

@@ -14,25 +14,25 @@ struct ScreenElement {
     Button,
     TextField,  ///< as wide as the row allows
     Table,      ///< as wide and as high as the screen allows
-    Space,      ///< takes the room that the others of its row leave
+    Space,      ///< takes the room that the other elements of its row leave
   };
 
   Kind kind = Kind::Space;
-  std::string outlet{};  ///< the name by which the screen's controller finds a field or a table
-  std::string title{};   ///< the text on a button; what an empty field shows
+  std::string outlet{};  ///< the name under which the screen's controller finds a text field or a table
+  std::string title{};   ///< the text on a button, or the text that an empty text field shows
   std::string action{};  ///< the operation that a button calls
 
   friend bool operator==(const ScreenElement&, const ScreenElement&) = default;
 };
 
-/// How a screen is laid out: rows from top to bottom, the elements of each from left to right.
+/// The layout of a screen: rows from top to bottom, and the elements of each from left to right.
 struct ScreenLayout {
   std::vector<std::vector<ScreenElement>> rows{};
   double margin = 0;               ///< around the rows, logical pixels
   double spacing = 0;              ///< between rows and between elements, logical pixels
-  std::string backgroundAction{};  ///< the operation called where the user touches no element
+  std::string backgroundAction{};  ///< the operation that runs when the user touches no element
 
-  /// The layout that an interface resource holds (docs/formats.md); nothing when it is no such resource.
+  /// The layout in an interface resource (docs/formats.md); nothing when the value is no such resource.
   static std::optional<ScreenLayout> fromResource(const Value& resource);
 };
 

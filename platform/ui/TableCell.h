@@ -11,7 +11,7 @@
 
 namespace varnel {
 
-/// What the host builds into a cell by itself.
+/// What the host puts into a cell.
 enum class CellStyle {
   Default,        ///< one text
   NameAndDetail,  ///< a name on the left, a detail on the right
@@ -20,31 +20,31 @@ enum class CellStyle {
 /// The mark at a row's right edge.
 enum class CellAccessory {
   None,
-  DisclosureIndicator,  ///< the row leads on
+  DisclosureIndicator,  ///< the row leads to another pane
   Checkmark,
 };
 
-/// The part of a cell that is on the screen. A table makes it.
+/// The visible part of a cell. A table makes it.
 class CellView {
  public:
   virtual ~CellView() = default;
-  /// The host's own layout: afterwards the content area has the size that it has in a row of the table as
-  /// wide as the table is now.
+  /// Does the host's own layout. Afterwards the content area has the size that it has in a row of the table's
+  /// current width.
   virtual void layOut() = 0;
-  /// The content area in its own coordinates: the row, less the room of the accessory.
+  /// The content area in its own coordinates: the row without the room of the accessory.
   virtual Rect contentBounds() const = 0;
 
-  /// New parts of the content area, which live as long as the view.
+  /// Adds parts to the content area. They live as long as the view.
   virtual Label& addLabel() = 0;
   virtual ScrollContainer& addScrollContainer() = 0;
 
   virtual void setAccessory(CellAccessory accessory) = 0;
-  /// The built-in text of the style, and its font. Long texts are cut.
+  /// The style's built-in text and its font. A long text is cut.
   virtual void setText(std::string_view text) = 0;
   virtual void setTextFont(const Font& font) = 0;
 };
 
-/// A cell: its view, and what its maker keeps beside it.
+/// A cell: its view, and what its maker keeps with it.
 class TableCell {
  public:
   TableCell(std::unique_ptr<CellView> cellView, std::string_view reuseIdentifier)
@@ -54,7 +54,7 @@ class TableCell {
   virtual ~TableCell() = default;
 
   CellView& cellView() const { return *_cellView; }
-  /// Under which name the table hands it out again.
+  /// The name under which the table hands it out again.
   const std::string& reuseIdentifier() const { return _reuseIdentifier; }
   /// The table calls it when the width of a cell in use has changed.
   virtual void layOutAgain() {}

@@ -11,19 +11,19 @@ class TextField;
 class TextFieldDelegate {
  public:
   virtual ~TextFieldDelegate() = default;
-  /// The user has pressed the return key. True when the field is to do what it does by itself then.
+  /// The user has pressed the return key. Returns true when the field is to do its default action.
   virtual bool textFieldShouldReturn(TextField& field) = 0;
 };
 
-/// One line that the user may edit.
+/// One line of text that the user may edit.
 class TextField {
  public:
   virtual ~TextField() = default;
-  /// Null takes the delegate off.
+  /// Null removes the delegate.
   virtual void setDelegate(TextFieldDelegate* delegate) = 0;
-  /// Empty when nothing was typed; absent only where a host knows a field without a text.
+  /// Empty when the user has typed nothing; absent only on a host with fields that can lack a text.
   virtual std::optional<std::string> text() const = 0;
-  /// Gives the keyboard away and hides it where it is on the screen.
+  /// Gives up the keyboard focus, and hides an on-screen keyboard.
   virtual void resignFirstResponder() = 0;
 };
 

@@ -7,11 +7,11 @@
 
 namespace varnel {
 
-/// How much room texts take.
+/// Measures texts.
 class TextMetrics {
  public:
   virtual ~TextMetrics() = default;
-  /// The room of the text on a single line. A label of that size and font shows it whole.
+  /// The size of the text on a single line. A label of this size and font shows the whole text.
   virtual Size sizeOfText(std::string_view text, const Font& font) const = 0;
 };
 

@@ -8,13 +8,13 @@
 
 namespace varnel {
 
-/// A small grey wheel that turns while something goes on. It is hidden, and takes no room, while it stands
-/// still.
+/// A small gray wheel that turns while something is going on. When it stands still, it is hidden and takes no
+/// room.
 struct ActivityIndicator {
   bool isAnimating = false;
 };
 
-/// Dark text without a background, as large as the text. Plain text, as with `Label`.
+/// Dark plain text without a background, as large as the text needs.
 struct ToolbarLabel {
   std::string text{};
   Font font{};
@@ -23,12 +23,12 @@ struct ToolbarLabel {
 /// Takes the room that the other items leave.
 struct FlexibleSpace {};
 
-/// A button of a kind that the host knows how to name or draw.
+/// A button of a kind that the host can name or draw.
 struct BarButton {
   enum class SystemItem { Save };
 
   SystemItem item = SystemItem::Save;
-  /// Called when it is pressed. It may set other items.
+  /// Called when the user presses the button. It may set other items.
   std::function<void()> action{};
 };
 

@@ -19,29 +19,28 @@ struct Alert {
   std::string buttonTitle;
 };
 
-/// The host's user interface: it makes whatever is on the screen. What one user interface has made is only
-/// ever given to others that it has made. Everything happens on the main queue's thread; nothing it calls
-/// waits for the user. It outlives what it makes.
+/// The host's user interface. It makes everything on the screen. Objects from one user interface are only
+/// passed to objects from the same one. Everything happens on the main queue's thread, and no call waits for
+/// the user. It outlives all that it makes.
 class UserInterface {
  public:
   virtual ~UserInterface() = default;
 
-  /// The main screen: all of a phone's, and on a desktop the size that the window is to have at first, at
-  /// (0, 0): the desktop decides where it stands.
+  /// The main screen: on a phone the whole screen, on a desktop a rectangle at (0, 0) with the first size of
+  /// the window. The desktop decides where the window is.
   virtual Rect screenBounds() const = 0;
-  /// The part of it that is the application's: less the status bar; on a desktop the window's area as it is
-  /// now.
+  /// The application's part of it: on a phone without the status bar, on a desktop the current area of the
+  /// window.
   virtual Rect applicationFrame() const = 0;
   virtual const TextMetrics& textMetrics() const = 0;
 
-  /// Not visible yet.
+  /// Makes a window that is not visible yet.
   virtual std::unique_ptr<Window> makeWindow(const Rect& frame) = 0;
   virtual std::unique_ptr<TablePane> makeTablePane() = 0;
   virtual std::unique_ptr<NavigationStack> makeNavigationStack(std::shared_ptr<PaneController> root) = 0;
   virtual std::unique_ptr<ModalScreen> makeModalScreen(const ScreenLayout& layout,
                                                        ModalScreen::Actions actions) = 0;
-  /// Shows an alert above everything else, where it stays until the user closes it: it outlives a modal
-  /// screen below it.
+  /// Shows an alert above everything else until the user closes it. It outlives a modal screen below it.
   virtual void showAlert(const Alert& alert) = 0;
 };
 

@@ -6,17 +6,18 @@
 
 namespace varnel {
 
-/// The application's window. Destroying it takes it off the screen.
+/// The application's window. The destructor removes it from the screen.
 class Window {
  public:
   virtual ~Window() = default;
-  /// What the window shows, in its whole area. The stack stays its owner's: either may go first.
+  /// Shows the stack in the whole window. The caller owns the stack; stack and window may be destroyed in any
+  /// order.
   virtual void setRoot(NavigationStack& stack) = 0;
-  /// Shows the window, which gets the keyboard; the stack's top pane appears.
+  /// Shows the window and gives it the keyboard focus. The stack's top pane appears.
   virtual void makeKeyAndVisible() = 0;
-  /// What the desktop calls the window; plain text.
+  /// The window's name on the desktop, as plain text.
   virtual void setTitle(std::string_view title) = 0;
-  /// Takes the window off the screen.
+  /// Removes the window from the screen.
   virtual void hide() = 0;
 };
 
