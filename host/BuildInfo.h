@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// What this build says of itself.
+/// What this build says about itself.
 ApplicationInfo applicationInfo();
 
 }  // namespace varnel

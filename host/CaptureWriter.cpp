@@ -21,7 +21,7 @@ CaptureWriter::CaptureWriter(const std::string& path, ExistingRecording existing
 
 void CaptureWriter::write(Time time, ByteView message) {
   Bytes bytes;
-  // Both at once: there is no file without a record.
+  // The header and the first record go out in one call: there is no file without a record.
   if (!_hasHeader) append(bytes, _encoder->beginning());
   append(bytes, _encoder->encode({.time = time, .message = message}));
   _file.append(bytes);

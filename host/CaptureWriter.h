@@ -11,9 +11,9 @@
 
 namespace varnel {
 
-/// Writes messages to a capture of link type USER0 (147) with nanoseconds, a `RecordingFile`: pcapng where a
-/// technology is named, which is then in it, else pcap. What was written is in the file when the call
-/// returns.
+/// Writes messages to a capture of link type USER0 (147) with nanoseconds. The file is a `RecordingFile`:
+/// pcapng when a technology is given, which the file then names, else pcap. What was written is in the file
+/// when the call returns.
 class CaptureWriter {
  public:
   /// "-" is standard output. Throws as `RecordingFile` does.
@@ -21,7 +21,7 @@ class CaptureWriter {
                          const std::optional<std::string>& technology = {});
 
   /// Throws std::runtime_error when the message cannot be written; what was written before is in the file.
-  /// Of pcap seconds are kept as 32 bits.
+  /// pcap keeps 32 bits of the seconds.
   void write(Time time, ByteView message);
 
  private:

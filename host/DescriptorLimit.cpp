@@ -10,7 +10,7 @@ void raiseDescriptorLimit(std::size_t files) {
   rlimit limit{};
   if (::getrlimit(RLIMIT_NOFILE, &limit) != 0 || limit.rlim_cur >= files) return;
   limit.rlim_cur = std::min<rlim_t>(files, limit.rlim_max);
-  // Who has fewer turns peers away sooner: sockets keep a descriptor for that.
+  // With a lower limit the program only refuses peers sooner: sockets keep a spare descriptor for that.
   static_cast<void>(::setrlimit(RLIMIT_NOFILE, &limit));
 }
 

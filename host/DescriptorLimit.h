@@ -4,8 +4,8 @@
 
 namespace varnel {
 
-/// Lets this process have that many files open at a time, or as many of them as the system allows; what it
-/// may have already stays.
+/// Lets this process have this many open files, or as many of them as the system allows. A higher limit
+/// stays.
 void raiseDescriptorLimit(std::size_t files);
 
 }  // namespace varnel

@@ -9,12 +9,12 @@ namespace varnel {
 
 namespace {
 
-// The event loop would go on after an exception, on some paths: it must not get there.
+// On some paths the event loop would go on after an exception, so no exception may reach it.
 auto endingWithExceptions(MainQueue::Task task) {
   return [task = std::move(task)]() noexcept { task(); };
 }
 
-// What the toolkit's timer can hold, which is 24.8 days at most.
+// The longest delay that the toolkit's timer can hold is 24.8 days.
 std::chrono::milliseconds clamped(std::chrono::milliseconds delay) {
   constexpr std::chrono::milliseconds longest(std::numeric_limits<int>::max());
   return std::clamp(delay, std::chrono::milliseconds(0), longest);
@@ -24,7 +24,7 @@ class EventLoopTimer final : public RepeatingTimer {
  public:
   EventLoopTimer(std::chrono::milliseconds interval, MainQueue::Task task) {
     _timer.setTimerType(Qt::PreciseTimer);
-    // The connection keeps the task alive while it runs, also when the task destroys the timer.
+    // The connection keeps the task alive while it runs, even when the task destroys the timer.
     _timer.callOnTimeout(&_timer, endingWithExceptions(std::move(task)));
     _timer.start(clamped(interval));
   }

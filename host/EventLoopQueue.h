@@ -7,8 +7,8 @@
 namespace varnel {
 
 /// The main queue on the event loop of the program's QCoreApplication. An exception that leaves a task ends
-/// the program. Tasks that have not run when the queue is destroyed never do. Delays and intervals of more
-/// than 24.8 days, which the toolkit's timer cannot hold, are as long as that.
+/// the program. When the queue is destroyed, tasks that have not run never run. Delays and intervals longer
+/// than 24.8 days, which the toolkit's timer cannot hold, become 24.8 days.
 class EventLoopQueue final : public MainQueue {
  public:
   void async(Task task) override;
@@ -16,7 +16,7 @@ class EventLoopQueue final : public MainQueue {
   std::unique_ptr<RepeatingTimer> repeating(std::chrono::milliseconds interval, Task task) override;
 
  private:
-  QObject _context;  // to whom the waiting tasks belong
+  QObject _context;  // owner of the waiting tasks
 };
 
 }  // namespace varnel

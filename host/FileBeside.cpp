@@ -25,7 +25,7 @@ FileBeside::~FileBeside() {
 std::error_code FileBeside::make() {
   constexpr int flags = O_WRONLY | O_APPEND | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC;
   const std::string name = ".varnel-" + std::to_string(::getpid()) + '-';
-  // What killed processes left behind stays: nobody knows whether its owner is really gone.
+  // Files that killed processes left behind stay: nobody knows whether their owner has really ended.
   constexpr int mostAttempts = 1000;
   for (int attempt = 0; attempt < mostAttempts; ++attempt) {
     const std::filesystem::path path = folderOf(_target) / (name + std::to_string(attempt));
@@ -48,7 +48,7 @@ std::error_code FileBeside::takePlace() {
 
 void synchroniseFolder(const std::filesystem::path& folder) {
   const FileDescriptor descriptor(::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
-  // The file is whole and in its place; a failure would only say that a power cut may still undo that.
+  // The file is whole and in its place. A failure would only mean that a power cut can still undo that.
   if (descriptor.isOpen()) ::fsync(descriptor.number());
 }
 

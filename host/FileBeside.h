@@ -9,8 +9,8 @@
 
 namespace varnel {
 
-/// A new file in the folder of another one, whose place it takes once it is whole. It is for its owner alone
-/// (mode 0600), and removed when it goes without having taken the place.
+/// A new file in the folder of another one, which it replaces once it is whole. Only its owner may read it
+/// (mode 0600). The destructor removes it when it has not taken the other's place.
 class FileBeside final {
  public:
   explicit FileBeside(std::filesystem::path target) : _target(std::move(target)) {}
@@ -18,12 +18,12 @@ class FileBeside final {
   FileBeside& operator=(const FileBeside&) = delete;
   ~FileBeside();
 
-  /// Makes the file, which every write goes to the end of.
+  /// Makes the file. Every write goes to its end.
   std::error_code make();
   int descriptor() const { return _file.number(); }
-  /// Gives it the name of the target, and whatever had the name is gone. A link is not followed.
+  /// Renames the file to the target and so replaces an existing one. Follows no link.
   std::error_code takePlace();
-  /// Leaves the open file to the caller.
+  /// Hands the open file to the caller.
   FileDescriptor release() { return std::move(_file); }
 
  private:
@@ -32,7 +32,7 @@ class FileBeside final {
   FileDescriptor _file;
 };
 
-/// Sees to it that the names in the folder are on the disk, where the folder can be read.
+/// Makes sure that the names in the folder are on the disk, if the folder can be read.
 void synchroniseFolder(const std::filesystem::path& folder);
 
 }  // namespace varnel

@@ -6,10 +6,10 @@
 
 namespace varnel {
 
-/// An open file of the process, closed with this object.
+/// An open file of the process. The destructor closes it.
 class FileDescriptor final {
  public:
-  /// None is -1.
+  /// -1 stands for no file.
   explicit FileDescriptor(int number = -1) : _number(number) {}
   FileDescriptor(FileDescriptor&& other) noexcept : _number(other.release()) {}
   FileDescriptor& operator=(FileDescriptor&& other) noexcept {
@@ -22,7 +22,7 @@ class FileDescriptor final {
 
   bool isOpen() const { return _number >= 0; }
   int number() const { return _number; }
-  /// Leaves the file to the caller.
+  /// Hands the file to the caller.
   int release() { return std::exchange(_number, -1); }
 
  private:

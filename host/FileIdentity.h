@@ -8,14 +8,14 @@
 
 namespace varnel {
 
-/// Which regular file a name or an open file stands for, so that two can be held against each other.
+/// The regular file that a name or an open file stands for, so that two can be compared.
 class FileIdentity {
  public:
-  /// Links are followed. A file that is not there yet is known by its folder and its name.
+  /// Links are followed. A file that does not exist yet is known by its folder and its name.
   static FileIdentity ofPath(const std::filesystem::path& path);
   static FileIdentity ofDescriptor(int descriptor);
 
-  /// Whether both are one file. Never true of what is no regular file: several may write to one pipe.
+  /// Whether both are one file. False for anything but regular files: several programs may write to one pipe.
   bool isSameFileAs(const FileIdentity& other) const;
 
  private:
@@ -25,8 +25,8 @@ class FileIdentity {
     bool operator==(const Node&) const = default;
   };
 
-  std::optional<Node> _node;  // of the file, or of the folder that it would be made in
-  std::string _newName;       // in that folder; empty for a file that is there
+  std::optional<Node> _node;  // the file's, or that of the folder in which it would be made
+  std::string _newName;       // in that folder; empty for an existing file
 };
 
 }  // namespace varnel

@@ -19,7 +19,7 @@ constexpr const char* busObject = "/com/orvane/Preferences";
 constexpr const char* busInterface = "com.orvane.Preferences";
 constexpr const char* changedSignal = "Changed";
 
-// The list that is there, an empty one when there is no file; nothing when there is something else.
+// The existing list, or an empty one when there is no file; nothing when the file holds something else.
 std::optional<Value> listAt(const fs::path& path) {
   std::error_code failure;
   if (fs::status(path, failure).type() == fs::file_type::not_found) return Value::ofDictionary();
@@ -28,7 +28,7 @@ std::optional<Value> listAt(const fs::path& path) {
   return list && list->dictionary() ? list : std::nullopt;
 }
 
-// What went wrong; nothing when the list is on disk.
+// What went wrong; nothing when the list is on the disk.
 std::optional<std::string> writeList(const fs::path& path, const Value& list) {
   const auto bytes = writeXmlPropertyList(list);
   if (!bytes) return "it has no property-list form";

@@ -34,7 +34,7 @@ Value FileResources::propertyList(std::string_view name) const {
   return readPropertyList(*bytes, fileLimits).value_or(Value());
 }
 
-// One that lies in the folder itself comes before those below.
+// A file in the folder itself comes before files in the folders below.
 fs::path FileResources::fileOf(std::string_view name) const {
   const std::string file = std::string(name) + std::string(extension);
   if (isFile(_folder / file)) return _folder / file;

@@ -6,7 +6,7 @@
 
 namespace varnel {
 
-/// Property-list resources as files "*.plist" of a folder and the folders below it.
+/// Property-list resources: the files "*.plist" in a folder and in the folders below it.
 class FileResources final : public Resources {
  public:
   explicit FileResources(std::filesystem::path folder) : _folder(std::move(folder)) {}
@@ -20,13 +20,13 @@ class FileResources final : public Resources {
   std::filesystem::path _folder;
 };
 
-/// Where the application's resources are: the folder that $VARNEL_RESOURCES names; else, for a program that
-/// runs from the build tree, the source tree's; else those of the installation that the program is part of.
-/// An empty $VARNEL_RESOURCES names none.
+/// The folder of the application's resources: the one that $VARNEL_RESOURCES names; else, for a program that
+/// runs from the build tree, the folder in the source tree; else the folder of the installation to which the
+/// program belongs. An empty $VARNEL_RESOURCES names no folder.
 std::filesystem::path resourceFolder();
 
-/// The same for programs, which show nothing without it. Throws std::runtime_error, with what to do about it,
-/// when the folder is missing or cannot be read.
+/// The same for programs that show nothing without resources. Throws std::runtime_error, which says what to
+/// do, when the folder is missing or cannot be read.
 std::filesystem::path readableResourceFolder();
 
 }  // namespace varnel

@@ -12,7 +12,7 @@ HostApplication::HostApplication(int& argumentCount, char** arguments)
 int HostApplication::run() { return QCoreApplication::exec(); }
 
 void HostApplication::end(int exitStatus) {
-  // Queued: an end that is asked for before the event loop runs counts as well.
+  // The call is queued, so an end that is requested before the event loop runs counts too.
   QMetaObject::invokeMethod(
       &_application, [exitStatus] { QCoreApplication::exit(exitStatus); }, Qt::QueuedConnection);
 }

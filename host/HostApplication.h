@@ -4,15 +4,15 @@
 
 namespace varnel {
 
-/// The program's event loop. Numbers keep the form that they have in C, whatever the user's locale.
+/// The program's event loop. Numbers keep their form in C, in every locale.
 class HostApplication final {
  public:
-  /// The arguments are those of main and must outlive the object.
+  /// The arguments of main, which must outlive the object.
   HostApplication(int& argumentCount, char** arguments);
 
   /// Runs the event loop until `end` is called; returns the exit status given there.
   int run();
-  /// Has the event loop return as soon as it has the turn.
+  /// Makes the event loop return as soon as it gets control.
   void end(int exitStatus);
 
  private:

@@ -13,7 +13,7 @@ namespace {
 constexpr int noLevel = -1;
 constexpr int everyLevel = std::numeric_limits<int>::max();
 
-// In one call, so that lines of several processes on one terminal stay whole.
+// One call writes the whole line, so that lines of several processes on one terminal do not mix.
 void writeStandardError(int priority, std::string_view text) {
   std::string line = '<' + std::to_string(priority) + '>';
   line += text;
@@ -42,7 +42,7 @@ HostLog::HostLog(Options options) : _standardErrorLevel(options.standardErrorLev
 }
 
 HostLog::~HostLog() {
-  _systemLog.reset();  // first: its thread changes what priorities are taken
+  _systemLog.reset();  // first: its thread changes which priorities are taken
   setLogSink(nullptr, noLevel);
 }
 

@@ -11,9 +11,9 @@
 
 namespace varnel {
 
-/// The log of a program: every line goes to syslog(3), the important ones also to standard error, as
-/// `<P>text`, in order and before the call returns. It is the log's sink from its construction to its
-/// destruction. While nobody listens to the system log, lines that standard error does not want are not even
+/// The log of a program. Every line goes to syslog(3). Important lines also go to standard error as
+/// `<P>text`, in order and before the call returns. It is the log's sink from construction to destruction.
+/// While no process listens to the system log, lines that standard error does not take are not even
 /// formatted.
 class HostLog final : public LogSink {
  public:
@@ -21,25 +21,25 @@ class HostLog final : public LogSink {
 
   struct Options {
     std::string programName{};
-    /// Lines of that priority number and lower go to standard error; -1 for none.
+    /// Lines of this priority number and lower go to standard error; -1 for none.
     int standardErrorLevel = -1;
     SystemLog systemLog = SystemLog::Used;
-    /// Where the system log's listener has its socket.
+    /// The socket of the system log's listener.
     std::filesystem::path systemLogSocket = "/dev/log";
-    /// How often the listener is looked for.
+    /// How often the queue looks for the listener.
     std::chrono::milliseconds probeInterval = std::chrono::seconds(5);
-    /// What takes the place of syslog(3), on a thread of its own.
+    /// Replaces syslog(3). Runs on a separate thread.
     std::function<void(int priority, const std::string& text)> writeSystemLog{};
   };
 
   explicit HostLog(Options options);
   HostLog(const HostLog&) = delete;
   HostLog& operator=(const HostLog&) = delete;
-  /// Waits half a second at most for syslog(3) to take what is left.
+  /// Waits at most half a second for syslog(3) to take the rest.
   ~HostLog() override;
 
   void write(int priority, std::string_view text) override;
-  /// Waits until syslog(3) has taken every line, half a second at most.
+  /// Waits until syslog(3) has taken every line, at most half a second.
   void giveTime();
 
  private:

@@ -8,7 +8,7 @@ namespace varnel {
 
 namespace {
 
-// Whoever reads from a terminal in its background, or changes its mode, is stopped.
+// The system stops a process in the background of a terminal that reads from it or changes its mode.
 bool hasTheTerminal() { return ::tcgetpgrp(STDIN_FILENO) == ::getpgrp(); }
 
 }  // namespace

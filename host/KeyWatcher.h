@@ -8,19 +8,19 @@
 
 namespace varnel {
 
-/// Turns keys that are typed at the terminal into calls from the event loop, each at once and without being
-/// shown. Does nothing where standard input is no terminal, or is one in whose background the program was
-/// started.
+/// Calls the handler from the event loop for each key that is typed at the terminal. The terminal does not
+/// show the key. Does nothing when standard input is no terminal, or when the program was started in the
+/// background of its terminal.
 class KeyWatcher final {
  public:
   /// An exception that leaves the handler ends the program.
   explicit KeyWatcher(std::function<void(char key)> handler);
   KeyWatcher(const KeyWatcher&) = delete;
   KeyWatcher& operator=(const KeyWatcher&) = delete;
-  /// Leaves the terminal as it was.
+  /// Restores the terminal's mode.
   ~KeyWatcher();
 
-  /// False where no key will ever come.
+  /// False when no key can ever come.
   bool isWatching() const { return _notifier != nullptr; }
 
  private:

@@ -20,7 +20,7 @@ constexpr std::string_view useOwnServer =
     "start varnel-telephonyd as this user, and both programs with a --runtime-dir of their own";
 constexpr std::string_view endOthers = "end one of the programs that are connected to it";
 
-// What a user can do about a reason, which a code stands for. "%" is the folder.
+// A reason with its code, and what a user can do about it. "%" stands for the folder.
 struct Cause {
   std::int64_t code;
   std::string_view what, whatToDo;

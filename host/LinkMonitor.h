@@ -9,26 +9,27 @@
 
 namespace varnel {
 
-/// Gathers what the ports and the telephony service of a runtime folder learn of the link.
+/// Collects what the ports and the telephony service of a runtime folder learn about the link.
 class LinkMonitor final : public LinkReports {
  public:
   explicit LinkMonitor(std::filesystem::path runtimeFolder) : _folder(std::move(runtimeFolder)) {}
 
   LinkReport linkReport() const override;
 
-  /// Another process has the name of this viewer's port.
+  /// Another process has a port with the name of this viewer's port.
   void portNameIsTaken();
-  /// A port or a connection could not be made for that reason, one sentence.
+  /// A port or a connection could not be made. The reason is one sentence.
   void failed(std::string_view reason);
-  /// The server could not be connected to; the error is the system's, EPERM for a server that is not trusted.
+  /// The connection to the server failed. The error is the system's, or EPERM for a server that is not
+  /// trusted.
   void serverIsOutOfReach(int systemError);
-  /// The server refused a log channel, or did not answer, with that error of the protocol.
+  /// The server refused a log channel with this error of the protocol, or did not answer.
   void channelWasRefused(std::int64_t error);
   /// The server did not answer a command.
   void commandWentUnanswered();
-  /// The server takes commands. What was told of an earlier link is forgotten.
+  /// The server takes commands. Forgets what was reported about an earlier link.
   void linkIsOpen() { _report = {}; }
-  /// The server tells about its stream; what is no report is passed over.
+  /// Takes the server's report about its stream. Ignores bytes that are no report.
   void takeStreamReport(ByteView bytes);
 
  private:

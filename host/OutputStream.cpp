@@ -21,8 +21,8 @@ std::optional<int> numberIn(const std::string& text) {
   return failure == std::errc() && end == text.data() + text.size() ? std::optional(number) : std::nullopt;
 }
 
-// The open file that the path names by way of /proc, as /dev/stdout does. It is written where it stands:
-// opened anew, it would be written from its start.
+// The open file that the path names through /proc, as /dev/stdout does. It is written at its current
+// position; if it were opened again, writing would begin at its start.
 std::optional<int> ownDescriptor(fs::path path) {
   constexpr int mostLinks = 8;
   const fs::path descriptors = "/proc/" + std::to_string(::getpid()) + "/fd";

@@ -8,18 +8,18 @@
 
 namespace varnel {
 
-/// The error that the last system call has left.
+/// The error of the last system call.
 std::error_code lastSystemError();
 
-/// Writes all of the bytes to an open file, or as many as it takes before the error.
+/// Writes all bytes to an open file, or as many as it takes before an error.
 std::error_code writeAll(int descriptor, ByteView bytes);
 
-/// Whether the path names what takes bytes as they come: a pipe, a terminal or another device, or, by a name
-/// like /dev/stdout, a file that this process has open.
+/// Whether the path names something that takes bytes as they come: a pipe, a terminal, another device, or, by
+/// a name like /dev/stdout, a file that this process has open.
 bool isStream(const std::filesystem::path& path);
 
-/// Opens such a thing for writing; a pipe is waited for until somebody reads it. Not open, with the error
-/// left to `lastSystemError`, when that fails.
+/// Opens it for writing. For a pipe, waits until somebody reads it. On failure the result is not open, and
+/// `lastSystemError` has the error.
 FileDescriptor openStream(const std::filesystem::path& path);
 
 }  // namespace varnel

@@ -15,10 +15,10 @@ struct StandardFile {
   int flags;
 };
 
-// What is opened gets the lowest number that is free.
+// The system gives an opened file the lowest free number.
 constexpr StandardFile standardFiles[] = {
     {STDIN_FILENO, O_RDONLY},
-    // Data that is lost must not look as if it were written.
+    // Opened for reading only: a write must fail, so that lost data does not look written.
     {STDOUT_FILENO, O_RDONLY},
     {STDERR_FILENO, O_WRONLY},
 };
@@ -29,7 +29,7 @@ bool isOpen(int descriptor) { return ::fcntl(descriptor, F_GETFD) >= 0; }
 
 void startProgram() {
   for (const auto& [descriptor, flags] : standardFiles) {
-    // Without /dev/null nobody could be told anything either.
+    // Without /dev/null there is no way to report anything.
     if (!isOpen(descriptor) && ::open("/dev/null", flags) != descriptor) std::_Exit(EXIT_FAILURE);
   }
   std::signal(SIGXFSZ, SIG_IGN);

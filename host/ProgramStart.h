@@ -2,10 +2,10 @@
 
 namespace varnel {
 
-/// What every program does before anything else. Standard input, output or error that came closed is opened
-/// on /dev/null, for the next file that is opened would take its place; writing to a standard output that
-/// came closed stays an error. A file that grows too long is an error of whoever writes it, not the end by a
-/// signal.
+/// Every program calls this first. If standard input, output, or error is closed, opens it on /dev/null,
+/// since otherwise the next opened file would get its number. Writing to a standard output that was closed
+/// stays an error. A file that grows too long becomes an error of the write call, not a signal that ends the
+/// program.
 void startProgram();
 
 }  // namespace varnel

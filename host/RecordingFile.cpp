@@ -19,7 +19,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-// A file system that knows no locks is recorded to all the same.
+// On a file system without locks the recording goes on without one.
 bool isLockedElsewhere(int file) { return ::flock(file, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK; }
 
 std::error_code whyFolderTakesNoFile(const fs::path& path) {
@@ -67,7 +67,7 @@ void RecordingFile::append(ByteView record) {
   if (!_file.isOpen()) {
     _existing.isOpen() ? replaceExisting(record) : make(record);
   } else if (const auto failure = writeAll(_file.number(), record)) {
-    // A part of a record would be taken for damage.
+    // Readers would take a part of a record for damage.
     if (!_isStream && ::ftruncate(_file.number(), _size) != 0) fail(lastSystemError());
     fail(failure);
   }
@@ -78,7 +78,7 @@ void RecordingFile::make(ByteView record) {
   constexpr int flags = O_WRONLY | O_APPEND | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC;
   FileDescriptor file(::open(_path.c_str(), flags, 0600));
   if (!file.isOpen()) fail(lastSystemError());
-  static_cast<void>(isLockedElsewhere(file.number()));  // which takes the lock: nobody else knows the file
+  static_cast<void>(isLockedElsewhere(file.number()));  // takes the lock; no other process knows the file yet
   if (const auto failure = writeAll(file.number(), record)) {
     ::unlink(_path.c_str());
     fail(failure);
@@ -97,7 +97,7 @@ void RecordingFile::replaceExisting(ByteView record) {
   _existing = FileDescriptor();
 }
 
-// Much may have happened to the file since the program was started.
+// Much can have happened to the file since the program was started.
 bool RecordingFile::isExistingInPlace() const {
   struct stat named {
   }, open{};

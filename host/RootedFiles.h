@@ -6,14 +6,14 @@
 
 namespace varnel {
 
-/// The device's file system as a folder of this machine: the root is put before the device's absolute paths.
+/// The device's file system in a folder of this machine: its root is put before the device's absolute paths.
 class RootedFiles final : public DeviceFiles {
  public:
   explicit RootedFiles(std::filesystem::path root) : _root(std::move(root)) {}
 
   bool exists(const std::string& path) const override;
-  /// The file is whole or not there, and for its owner alone (mode 0600). What XML cannot hold of a text is
-  /// U+FFFD in it.
+  /// The file appears only when it is whole, and only its owner may read it (mode 0600). Characters that XML
+  /// cannot hold become U+FFFD.
   FileWriting writePropertyList(const Value& list, const std::string& path) override;
 
  private:

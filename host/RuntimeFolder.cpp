@@ -18,7 +18,7 @@ namespace fs = std::filesystem;
   throw std::runtime_error("the runtime folder " + path.string() + " " + reason);
 }
 
-// Others may write where the temporary folder is, so a link there may be anybody's.
+// Other users may write to the temporary folder, so a link there can be anybody's.
 enum class Links { Followed, Refused };
 
 fs::path usableFolder(const fs::path& path, Links links) {

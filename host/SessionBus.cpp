@@ -12,8 +12,8 @@ namespace {
 
 constexpr int replyTimeout = 500;  // milliseconds
 
-// A bus connection of Qt's own would wait much longer for a bus that does not answer, also when the program
-// ends. So this one goes to the bus as to any peer, and introduces itself.
+// A bus connection of Qt would wait much longer for a bus that does not answer, even when the program ends.
+// So this class connects to the bus as to any peer, and sends the first message itself.
 class BusConnection {
  public:
   explicit BusConnection(const std::string& address)
@@ -64,7 +64,7 @@ std::optional<std::string> sendBusSignal(const std::string& address, const BusSi
                                                     QString::fromStdString(signal.name));
   message.setArguments(signal.arguments);
   if (!bus.send(message)) return bus.lastError();
-  return bus.ask("GetId");  // answered once the bus has taken what was sent before
+  return bus.ask("GetId");  // the bus answers after it has taken all that was sent before
 }
 
 }  // namespace varnel

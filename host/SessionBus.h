@@ -6,11 +6,11 @@
 
 namespace varnel {
 
-/// The address of the user's D-Bus session bus: what $DBUS_SESSION_BUS_ADDRESS says, else the socket "bus" in
+/// The address of the user's D-Bus session bus: $DBUS_SESSION_BUS_ADDRESS, else the socket "bus" in
 /// $XDG_RUNTIME_DIR; nothing when there is none.
 std::optional<std::string> sessionBusAddress();
 
-/// A signal as D-Bus has them.
+/// A D-Bus signal.
 struct BusSignal {
   std::string objectPath;
   std::string interface;
@@ -18,8 +18,8 @@ struct BusSignal {
   QVariantList arguments;
 };
 
-/// Sends a signal to everybody on the bus of that address. It has got there when the call returns nothing;
-/// else the call returns what went wrong. A bus that does not answer costs half a second.
+/// Sends a signal to everybody on the bus with this address. Returns nothing when the bus has taken the
+/// signal, else what went wrong. A bus that does not answer costs half a second.
 std::optional<std::string> sendBusSignal(const std::string& address, const BusSignal& signal);
 
 }  // namespace varnel

@@ -8,12 +8,12 @@
 
 namespace varnel {
 
-/// Turns signals into calls from the event loop. As long as it lives they do nothing else. A hang-up stays
-/// ignored where the program was started to ignore it, as nohup(1) does.
+/// Calls the handler from the event loop for each signal. While this object lives, the signals have no other
+/// effect. If the program was started with hang-ups ignored, as by nohup(1), they stay ignored.
 class SignalWatcher final {
  public:
   /// An exception that leaves the handler ends the program. Throws std::system_error when the system lacks
-  /// what it takes. Other threads must not take signals.
+  /// resources. Other threads must not take signals.
   SignalWatcher(std::initializer_list<int> signals, std::function<void(int signal)> handler);
   SignalWatcher(const SignalWatcher&) = delete;
   SignalWatcher& operator=(const SignalWatcher&) = delete;

@@ -16,9 +16,9 @@ namespace varnel {
 
 namespace {
 
-// Room for the final zero and for one more byte.
+// Leaves room for the final zero and for one more byte.
 constexpr std::size_t longestPath = sizeof(sockaddr_un::sun_path) - 2;
-// Bytes that have arrived and wait to be taken, and bytes that wait to be sent, at most.
+// The most bytes that may wait to be taken, and the most that may wait to be sent.
 constexpr qint64 readBufferSize = 1 << 20;
 constexpr qint64 sendBufferSize = 4 << 20;
 
@@ -57,10 +57,10 @@ SocketConnection::SocketConnection(FileDescriptor socket, std::shared_ptr<const 
                                    std::chrono::milliseconds frameTime)
     : _place(std::move(place)), _socket(std::make_unique<QLocalSocket>()) {
   _socket->setSocketDescriptor(socket.release());
-  // Without a bound a flood would fill the memory while its reader is busy.
+  // Without a limit a flood would fill the memory while its reader is busy.
   _socket->setReadBufferSize(readBufferSize);
-  // Queued: a handler that destroys the socket must not do so from within the socket's own doings, and a wait
-  // for this socket must not have its frames handled elsewhere.
+  // The call is queued for two reasons: a handler that destroys the socket must not do so inside the socket's
+  // own code, and a wait for this socket must not have its frames handled elsewhere.
   const auto handleActivity = [this] { callActivityHandler(); };
   QObject::connect(_socket.get(), &QLocalSocket::readyRead, _socket.get(), handleActivity,
                    Qt::QueuedConnection);
@@ -106,7 +106,7 @@ void SocketConnection::wake() {
 }
 
 void SocketConnection::callActivityHandler() noexcept {
-  const auto handler = _activityHandler;  // which may destroy this connection
+  const auto handler = _activityHandler;  // a copy: the handler may destroy this connection
   if (handler) handler();
 }
 
@@ -120,7 +120,7 @@ std::optional<Frame> SocketConnection::nextFrame() {
     if (_reader.isFaulty()) _socket->abort();
     if (!isOpen() && _socket->bytesAvailable() == 0) return std::nullopt;
     if (feedReader()) continue;
-    // What came while this program was held up counts.
+    // What came while this program was held up still counts.
     if (_isOverdue && _socket->waitForReadyRead(0)) continue;
     watchFrameTime();
     return std::nullopt;

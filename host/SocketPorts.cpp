@@ -38,12 +38,12 @@ class SocketLocalPort final : public LocalPort {
   void invalidate() override {
     if (_delivery->hasEnded) return;
     end();
-    // The last deed: the handler may destroy this port.
+    // This must be last: the handler may destroy this port.
     if (const auto handler = std::exchange(_invalidationHandler, nullptr)) handler();
   }
 
  private:
-  // What outlives the port while a message is being handled: its handler may destroy the port.
+  // What outlives the port while a message is handled: the message's handler may destroy the port.
   struct Delivery {
     MessageHandler handler;
     bool hasBegun = false;
@@ -93,7 +93,7 @@ class SocketLocalPort final : public LocalPort {
 
   std::shared_ptr<Delivery> _delivery;
   InvalidationHandler _invalidationHandler;
-  std::shared_ptr<SocketConnection> _peer;  // null until somebody has connected
+  std::shared_ptr<SocketConnection> _peer;  // null until a process has connected
   std::unique_ptr<SocketServer> _server;    // null once the port has ended
 };
 
@@ -101,7 +101,7 @@ class SocketRemotePort final : public RemotePort {
  public:
   SocketRemotePort(std::unique_ptr<SocketConnection> connection, LinkMonitor* monitor)
       : _connection(std::move(connection)), _monitor(monitor) {
-    // Nobody waits: replies that come now are late.
+    // Nobody waits for these replies: they are late.
     _connection->setActivityHandler([this] {
       while (takeFrame()) {
       }
@@ -142,7 +142,8 @@ class SocketRemotePort final : public RemotePort {
     return {statusOr(receiveTimeout), std::nullopt};
   }
 
-  // Replies come in the order of their requests. When this one makes their count zero it is the newest's.
+  // Replies come in the order of their requests. So the reply that makes the count zero is that of the newest
+  // request.
   std::optional<Frame> takeFrame() {
     const auto frame = _connection->nextFrame();
     if (frame && isAnswer(*frame) && _awaitedReplies > 0) --_awaitedReplies;
@@ -153,17 +154,17 @@ class SocketRemotePort final : public RemotePort {
     return frame.mark == FrameMark::Reply || frame.mark == FrameMark::NoReply;
   }
 
-  // Why a wait ended: time was up, or the connection was.
+  // Why a wait ended: the time was up, or the connection had ended.
   std::int32_t statusOr(std::int32_t timeoutStatus) const {
     return _connection->isOpen() ? timeoutStatus : becameInvalid;
   }
 
   std::unique_ptr<SocketConnection> _connection;  // null once the port was invalidated
   LinkMonitor* _monitor;
-  std::uint64_t _awaitedReplies = 0;  // requests that no answer has come for
+  std::uint64_t _awaitedReplies = 0;  // requests without an answer so far
 };
 
-// The handler gets these messages too, whose identifier it does not know.
+// The handler gets reports too, and ignores their identifier.
 LocalPort::MessageHandler showingReports(LinkMonitor& monitor, LocalPort::MessageHandler handler) {
   return [&monitor, handler = std::move(handler)](std::int32_t identifier, ByteView data) {
     if (identifier == telephonyProtocol::streamReportIdentifier) monitor.takeStreamReport(data);

@@ -20,7 +20,7 @@ namespace fs = std::filesystem;
 using namespace std::chrono_literals;
 
 constexpr int connectionQueue = 128;
-// Then everybody else gets a turn.
+// After this many the server lets the rest of the program run.
 constexpr int connectionsAtATime = 64;
 constexpr std::chrono::milliseconds refusalLineInterval = 10s;
 constexpr std::chrono::milliseconds descriptorWait = 100ms;
@@ -49,7 +49,7 @@ FileDescriptor localSocket() {
   return FileDescriptor(::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
 }
 
-// Whether a process listens there, of whichever user and however busy.
+// Whether a process listens there, of any user, even when it is busy.
 bool isServed(const fs::path& path) {
   const FileDescriptor socket = localSocket();
   const sockaddr_un address = socketAddress(path);
@@ -67,7 +67,8 @@ SocketServer::NameLock::NameLock(const fs::path& socketPath)
 }
 
 void SocketServer::NameLock::lock() {
-  // The file goes with its owner: what was opened may be another one than what is there once it is locked.
+  // The owner removes the file when it ends. So the file that was opened can differ from the file that is
+  // there once the lock is held.
   while (true) {
     FileDescriptor file(::open(_path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW, 0600));
     if (!file.isOpen()) fail("cannot open " + _path.string(), errno);
@@ -102,7 +103,7 @@ SocketServer::SocketServer(const fs::path& path, ConnectionHandler handler, cons
       _lock(path),
       _spare(spareDescriptor()),
       _places(std::make_shared<const int>(0)) {
-  // A cleaner may have taken a live server's lock file away.
+  // A program that cleans up may have removed a live server's lock file.
   if (isServed(path)) nameIsTaken(path);
   listen();
   _look.callOnTimeout([this] { keepName(); });
@@ -114,11 +115,11 @@ SocketServer::~SocketServer() {
 }
 
 void SocketServer::listen() {
-  // Whatever is there now is a dead process's: the lock is ours.
+  // The lock is ours, so whatever is there now belongs to a dead process.
   ::unlink(_path.c_str());
   FileDescriptor socket = localSocket();
   const sockaddr_un address = socketAddress(_path);
-  // The socket's mode is its file's, less the umask: nobody else ever sees an open one.
+  // The socket's file gets the socket's mode without the umask, so no other user ever sees it open.
   if (!socket.isOpen() || ::fchmod(socket.number(), 0600) != 0 ||
       ::bind(socket.number(), reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0 ||
       ::listen(socket.number(), connectionQueue) != 0)
@@ -151,7 +152,7 @@ void SocketServer::acceptConnections() noexcept {
   }
 }
 
-// False when there is nobody left to accept, or no means to.
+// False when no connection is waiting, or when there is no descriptor for it.
 bool SocketServer::acceptOne() {
   FileDescriptor socket(::accept4(_listening.number(), nullptr, nullptr, SOCK_CLOEXEC | SOCK_NONBLOCK));
   if (!socket.isOpen()) {
@@ -169,8 +170,8 @@ bool SocketServer::acceptOne() {
   return true;
 }
 
-// There is no descriptor left: the spare one serves to turn away who waits, lest the socket wake this program
-// for ever.
+// There is no descriptor left. Accepts and refuses the next connection with the spare one; otherwise it would
+// wake this program again and again.
 void SocketServer::refuseOne() {
   _spare = FileDescriptor();
   FileDescriptor socket(::accept4(_listening.number(), nullptr, nullptr, SOCK_CLOEXEC | SOCK_NONBLOCK));

@@ -19,22 +19,22 @@
 
 namespace varnel {
 
-/// Why a socket could not be made: a live process has its name.
+/// A socket could not be made because a live process has its name.
 class SocketNameTaken : public std::runtime_error {
  public:
   using std::runtime_error::runtime_error;
 };
 
-/// What a named socket allows its peers.
+/// The limits for the peers of a named socket.
 struct SocketLimits {
-  std::size_t connections = 64;  ///< open at a time
+  std::size_t connections = 64;  ///< open at the same time
   std::chrono::milliseconds frameTime = longestFrameTime;
-  /// How often the socket and its lock are looked at and kept fresh, so that no cleaner takes them for
+  /// How often the server checks and touches the socket and its lock, so that no program removes them as
   /// leftovers.
   std::chrono::milliseconds lookInterval = std::chrono::minutes(1);
 };
 
-/// Which file a name or a descriptor stands for.
+/// The file that a name or a descriptor stands for.
 struct SocketFile {
   dev_t device = 0;
   ino_t inode = 0;
@@ -42,24 +42,25 @@ struct SocketFile {
   bool operator==(const SocketFile&) const = default;
 };
 
-/// The end of a named local socket that others connect to. A socket that a dead process left behind is taken
-/// over. Peers of other users are turned away, and so is whoever comes when there is no room, after the bytes
-/// of the refusal. Socket and lock are made anew when somebody has removed them.
+/// The listening end of a named local socket. It replaces a socket that a dead process left behind. It
+/// refuses peers of other users. When there is no room, it sends the bytes of the refusal and closes the
+/// connection. When somebody has removed the socket or the lock, it makes them again.
 class SocketServer final {
  public:
   using ConnectionHandler = std::function<void(std::unique_ptr<SocketConnection>)>;
 
-  /// Listens at once; the event loop hands each connection to the handler. Throws SocketNameTaken, and
+  /// Listens at once; the event loop passes each connection to the handler. Throws SocketNameTaken, and
   /// std::runtime_error when the socket cannot be made for another reason.
   SocketServer(const std::filesystem::path& path, ConnectionHandler handler, const SocketLimits& limits = {},
                Bytes refusal = {});
   SocketServer(const SocketServer&) = delete;
   SocketServer& operator=(const SocketServer&) = delete;
-  /// Takes socket and lock away.
+  /// Removes the socket and the lock.
   ~SocketServer();
 
  private:
-  // The right to a name: a lock on a file beside the socket, which ends with the process however that ends.
+  // The right to a name: a lock on a file beside the socket. It ends with the process, however the process
+  // ends.
   class NameLock {
    public:
     explicit NameLock(const std::filesystem::path& socketPath);
@@ -67,7 +68,7 @@ class SocketServer final {
     NameLock& operator=(const NameLock&) = delete;
     ~NameLock();
 
-    // Makes the file fresh, or anew when it has gone. Throws as the constructor does.
+    // Touches the file, or makes it again when it has gone. Throws like the constructor.
     void keep();
 
    private:
@@ -90,13 +91,13 @@ class SocketServer final {
   const ConnectionHandler _handler;
   const SocketLimits _limits;
   const Bytes _refusal;
-  NameLock _lock;         // held until the socket is gone
-  FileDescriptor _spare;  // given up for a moment to turn somebody away when there are no others
+  NameLock _lock;         // held until the socket is removed
+  FileDescriptor _spare;  // closed for a moment to refuse a peer when no other descriptor is free
   FileDescriptor _listening;
   std::optional<SocketFile> _socketFile;
   std::unique_ptr<QSocketNotifier> _notifier;
   QTimer _look;
-  std::shared_ptr<const int> _places;  // each connection holds one more reference
+  std::shared_ptr<const int> _places;  // each connection holds one reference more
   QElapsedTimer _sinceRefusalWasTold;
 };
 

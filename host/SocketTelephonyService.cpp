@@ -49,7 +49,7 @@ class SocketTelephonyConnection final : public TelephonyConnection {
   }
 
   LogChannel createLogChannel(std::string_view localPortName) override {
-    LinkMonitor* const monitor = _monitor;  // as this object may go meanwhile
+    LinkMonitor* const monitor = _monitor;  // a copy: this object may be destroyed meanwhile
     LogChannel channel = askForLogChannel(localPortName);
     if (channel.error != 0 && monitor) monitor->channelWasRefused(channel.error);
     return channel;
@@ -57,7 +57,7 @@ class SocketTelephonyConnection final : public TelephonyConnection {
 
  private:
   LogChannel askForLogChannel(std::string_view localPortName) {
-    // Held here, since the notification handler may destroy this object.
+    // A copy: the notification handler may destroy this object.
     const auto connection = _connection;
     const auto handler = _notificationHandler;
     const QDeadlineTimer deadline(_replyTimeout);

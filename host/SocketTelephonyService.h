@@ -9,18 +9,18 @@ namespace varnel {
 
 class LinkMonitor;
 
-/// The telephony server of a runtime folder, reached over its local socket.
+/// The telephony server of a runtime folder, over its local socket.
 class SocketTelephonyService final : public TelephonyService {
  public:
-  /// The folder's path is absolute. A request waits that long for its reply. The monitor, which is told why
-  /// attempts fail, may be null; else it outlives the service and its connections.
+  /// The folder's path is absolute. A request waits `replyTimeout` for its reply. The monitor is told why
+  /// attempts fail. It may be null, else it must outlive the service and its connections.
   explicit SocketTelephonyService(std::filesystem::path runtimeFolder,
                                   std::chrono::milliseconds replyTimeout = std::chrono::seconds(1),
                                   LinkMonitor* monitor = nullptr)
       : _folder(std::move(runtimeFolder)), _replyTimeout(replyTimeout), _monitor(monitor) {}
 
-  /// The handler is called by the event loop, and by a request that waits for its reply. It may destroy the
-  /// connection. An exception that leaves it ends the program.
+  /// The event loop calls the handler, and so does a request that waits for its reply. The handler may
+  /// destroy the connection. An exception that leaves it ends the program.
   std::unique_ptr<TelephonyConnection> connect(std::function<void()> notificationHandler) override;
 
  private:

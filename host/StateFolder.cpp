@@ -8,7 +8,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-// XDG Base Directory Specification: relative paths count as not set.
+// XDG Base Directory Specification: a relative path counts as not set.
 std::optional<fs::path> absoluteFolder(const char* variable) {
   const char* const path = std::getenv(variable);
   return path && fs::path(path).is_absolute() ? std::optional<fs::path>(path) : std::nullopt;

@@ -8,19 +8,19 @@
 
 namespace varnel {
 
-/// What the telephony server tells a viewer about the stream, on the viewer's port beside the messages. The
-/// numbers count from the start of the log channel on.
+/// What the telephony server tells a viewer about the stream, over the viewer's port. The numbers count from
+/// the start of the log channel.
 struct StreamReport {
   std::string note;           ///< one sentence about where the messages come from; empty when there is none
-  std::uint64_t dropped = 0;  ///< messages that the viewer had no room for
-  std::uint64_t tooLong = 0;  ///< messages that are longer than the channel takes
+  std::uint64_t dropped = 0;  ///< messages for which the viewer had no room
+  std::uint64_t tooLong = 0;  ///< messages that are longer than the channel allows
 
   bool operator==(const StreamReport&) const = default;
 };
 
-/// The report as a property list; a note that no property list can hold is left out.
+/// The report as a property list. Leaves out a note that no property list can hold.
 Bytes writeStreamReport(const StreamReport& report);
-/// Nothing for bytes that are no report. What is missing in one is empty or 0.
+/// Nothing for bytes that are no report. A missing note is empty, a missing number is 0.
 std::optional<StreamReport> readStreamReport(ByteView bytes);
 
 }  // namespace varnel

@@ -8,13 +8,13 @@
 
 namespace varnel {
 
-/// Which SIM card's modem a message of the log channel is of, by the byte behind its leading 0x81; absent
-/// where there is none, or it is 0.
+/// The subscription of a message of the log channel, from the byte after a leading 0x81. Absent when there is
+/// none, or when it is 0.
 std::optional<std::uint8_t> subscriptionOf(ByteView message);
 
-/// Takes the messages of one subscription out of a stream that may have several, which the displays of one
-/// modem would mix: of the wanted one, or else of the first that is met. What names none is of the whole
-/// phone and always taken.
+/// Takes the messages of one subscription from a stream that may have several. The displays of one modem
+/// would mix them. Takes the wanted subscription, or else the first one that is met. A message without a
+/// subscription belongs to the whole phone and is always taken.
 class SubscriptionFilter {
  public:
   explicit SubscriptionFilter(std::optional<std::uint8_t> wanted) : _taken(wanted) {}
@@ -25,14 +25,14 @@ class SubscriptionFilter {
     return subscription == _taken;
   }
 
-  /// Absent as long as none was wanted and none met.
+  /// Absent while none was wanted and none was met.
   std::optional<std::uint8_t> taken() const { return _taken; }
 
  private:
   std::optional<std::uint8_t> _taken;
 };
 
-/// How users are told of a subscription, or of none.
+/// How messages to users name a subscription, or none.
 std::string subscriptionName(std::optional<std::uint8_t> subscription);
 
 }  // namespace varnel

@@ -7,10 +7,10 @@
 
 namespace varnel {
 
-/// Message ports whose local ones get the messages of one subscription alone, and those that name none.
+/// Message ports whose local ports get only the messages of one subscription, and those without one.
 class SubscriptionPorts final : public MessagePorts {
  public:
-  /// The ports outlive this object.
+  /// The ports must outlive this object.
   SubscriptionPorts(MessagePorts& ports, std::uint8_t subscription)
       : _ports(ports), _subscription(subscription) {}
 

@@ -11,7 +11,7 @@ Time SystemClock::now() const {
 }
 
 TimeZone SystemClock::zoneAt(Time time) const {
-  ::tzset();  // localtime_r alone need not see that the zone was changed
+  ::tzset();  // localtime_r alone may miss a change of the zone
   tm local{};
   if (!::localtime_r(&time.seconds, &local)) return {};
   return {static_cast<std::int32_t>(local.tm_gmtoff), local.tm_isdst > 0};

@@ -9,12 +9,12 @@ namespace varnel {
 /// The machine's clock and time zone.
 class SystemClock final : public Clock {
  public:
-  /// To the nanosecond.
+  /// The time to the nanosecond.
   Time now() const override;
   TimeZone zoneAt(Time time) const override;
 };
 
-/// The time since the machine was started. It never steps, and goes on while the machine sleeps.
+/// The time since the machine was started. It never jumps, and it goes on while the machine sleeps.
 std::chrono::nanoseconds timeSinceBoot();
 
 }  // namespace varnel

@@ -45,7 +45,7 @@ bool somebodyListens(const std::filesystem::path& path) {
   return isHeard;
 }
 
-// Signals belong to the main thread.
+// The main thread takes all signals.
 std::thread threadWithoutSignals(std::function<void()> body) {
   sigset_t all, before;
   ::sigfillset(&all);
@@ -62,7 +62,7 @@ struct SystemLogQueue::Shared {
 
   const Options options;
   std::thread thread;
-  std::mutex mutex;  // guards everything below
+  std::mutex mutex;  // guards all members below
   std::condition_variable changed;
   std::condition_variable drained;
   std::vector<Line> waiting;
@@ -80,7 +80,7 @@ struct SystemLogQueue::Shared {
     ::syslog(priority, "%s", text.c_str());
   }
 
-  // Writes what waits now, without the lock.
+  // Writes what is waiting, without holding the lock.
   void writeWaiting(std::unique_lock<std::mutex>& lock) {
     const auto lines = std::exchange(waiting, {});
     const std::size_t lostLines = std::exchange(lost, 0);
@@ -149,7 +149,7 @@ void SystemLogQueue::run(const std::shared_ptr<Shared>& shared) {
     s.probe();
     nextProbe = Clock::now() + s.options.probeInterval;
   }
-  // Only this thread uses syslog(3), so this cannot wait for a call that is stuck.
+  // Only this thread uses syslog(3), so this call cannot wait for another one that is stuck.
   ::closelog();
   s.hasEnded = true;
   s.drained.notify_all();

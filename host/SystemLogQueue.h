@@ -9,39 +9,39 @@
 
 namespace varnel {
 
-/// The way to syslog(3), which blocks for good when its listener stops reading: a bounded queue and a thread
-/// of its own. Lines that do not fit are counted, and their number is written when there is room again.
+/// A bounded queue and a thread for syslog(3), which blocks forever when its listener stops reading. Lines
+/// that do not fit are counted, and a line tells their number when there is room again.
 class SystemLogQueue final {
  public:
   struct Options {
     std::string programName{};
-    /// Where the system log's listener has its socket.
+    /// The socket of the system log's listener.
     std::filesystem::path listener = "/dev/log";
-    /// How often the listener is looked for.
+    /// How often the thread looks for the listener.
     std::chrono::milliseconds probeInterval = std::chrono::seconds(5);
-    /// What writes a line, syslog(3) when empty. Called on the thread.
+    /// Writes a line on the thread; syslog(3) when empty.
     std::function<void(int priority, const std::string& text)> write{};
-    /// Told whether somebody listens: when the queue is made, and on the thread after each look until the
-    /// queue is destroyed.
+    /// Learns whether a process listens: when the queue is made, and then on the thread after each look,
+    /// until the queue is destroyed.
     std::function<void(bool isHeard)> onProbe{};
   };
 
   explicit SystemLogQueue(Options options);
   SystemLogQueue(const SystemLogQueue&) = delete;
   SystemLogQueue& operator=(const SystemLogQueue&) = delete;
-  /// Gives the thread half a second for what waits; a thread that is stuck is left behind.
+  /// Waits half a second for the thread to write what is waiting. Leaves a thread behind that is stuck.
   ~SystemLogQueue();
 
-  /// Queues a line while somebody listens. Never blocks.
+  /// Queues a line if a process listens. Never blocks.
   void add(int priority, std::string_view text);
-  /// Waits until every line is written, half a second at most.
+  /// Waits until every line is written, at most half a second.
   void drain();
 
  private:
   struct Shared;
   static void run(const std::shared_ptr<Shared>& shared);
 
-  std::shared_ptr<Shared> _shared;  // with the thread, which may outlive this object
+  std::shared_ptr<Shared> _shared;  // shared with the thread, which may outlive this object
 };
 
 }  // namespace varnel

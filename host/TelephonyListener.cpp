@@ -26,7 +26,7 @@ std::optional<Bytes> replyOf(const TelephonyConnection::LogChannel& channel) {
   return writeXmlPropertyList(reply);
 }
 
-// What a client reads whom there is no room for, as if it had asked.
+// The reply that a client gets when there is no room for it, as if it had asked.
 Bytes refusal() {
   Bytes bytes;
   const auto reply = replyOf({protocol::tooManyConnections, std::nullopt});

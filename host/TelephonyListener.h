@@ -12,16 +12,16 @@
 
 namespace varnel {
 
-/// The server's side of the telephony service: takes connections, checks requests and notifies clients. Every
-/// new connection is greeted with one notification.
+/// The server's side of the telephony service. It takes connections, checks requests, and notifies clients.
+/// Every new connection gets one notification at once.
 class TelephonyListener final {
  public:
-  /// Makes the log channel that delivers to the client's local port of that name. An exception that leaves it
+  /// Makes the log channel that delivers to the client's local port of this name. An exception that leaves it
   /// ends the program.
   using LogChannelMaker = std::function<TelephonyConnection::LogChannel(std::string_view localPortName)>;
 
   /// Listens at once; everything happens on the event loop. The folder's path is absolute. Throws
-  /// std::runtime_error when another server runs in that folder or the socket cannot be made.
+  /// std::runtime_error when another server runs in this folder, or when the socket cannot be made.
   TelephonyListener(const std::filesystem::path& runtimeFolder, LogChannelMaker makeLogChannel,
                     const SocketLimits& limits = {});
   TelephonyListener(const TelephonyListener&) = delete;

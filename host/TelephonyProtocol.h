@@ -3,11 +3,11 @@
 #include <cstdint>
 #include <string_view>
 
-/// What goes over a connection to the telephony service. A request and its reply are dictionaries as property
-/// lists, one a frame:
-///   {"Command": "CreateLogChannel", "PortName": local port of the client, "Rights": ["spi", "internal"]}
-///   {"Error": integer, "PortName": port on which the service takes commands; absent when there is none}
-/// A connection that the service has no room for gets a reply before it asks, and ends.
+/// The messages between the telephony service and its clients. A request and its reply are dictionaries,
+/// written as property lists, one per frame: {"Command": "CreateLogChannel", "PortName": local port of the
+/// client, "Rights": ["spi", "internal"]} {"Error": integer, "PortName": port on which the service takes
+/// commands; absent when there is none} When the service has no room for a connection, it sends a reply
+/// without a request and closes the connection.
 namespace varnel::telephonyProtocol {
 
 inline constexpr std::string_view socketName = "com.orvane.TelephonyServer";
@@ -21,7 +21,7 @@ inline constexpr std::string_view createLogChannel = "CreateLogChannel";
 inline constexpr std::string_view spiRight = "spi";
 inline constexpr std::string_view internalRight = "internal";
 
-/// The identifier under which the viewer's port is told about the stream; messages of the stream have 0.
+/// The message identifier of reports about the stream. Messages of the stream itself have 0.
 ///   {"Note": text, "Dropped": integer, "TooLong": integer}
 inline constexpr std::int32_t streamReportIdentifier = 1;
 inline constexpr std::string_view noteKey = "Note";
@@ -32,14 +32,14 @@ inline constexpr std::string_view tooLongKey = "TooLong";
 inline constexpr std::int64_t malformedRequest = 1;
 inline constexpr std::int64_t unknownCommand = 2;
 inline constexpr std::int64_t missingRights = 3;
-/// Errors that the client's side finds: no reply in time, or one that cannot be understood.
+/// Errors that the client finds: no reply in time, or a reply that cannot be understood.
 inline constexpr std::int64_t noReply = 4;
 inline constexpr std::int64_t malformedReply = 5;
-/// Errors of the service again.
+/// More errors of the service.
 inline constexpr std::int64_t viewerPortMissing = 6;  ///< no port of that name answers
 inline constexpr std::int64_t commandPortNotMade = 7;
 inline constexpr std::int64_t tooManyChannels = 8;
-inline constexpr std::int64_t portOfTheService = 9;  ///< the name is one of the service's own
+inline constexpr std::int64_t portOfTheService = 9;  ///< the name belongs to one of the service's own ports
 inline constexpr std::int64_t tooManyConnections = 10;
 
 }  // namespace varnel::telephonyProtocol

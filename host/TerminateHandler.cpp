@@ -11,7 +11,7 @@ namespace varnel {
 
 namespace {
 
-// A terminate handler takes no arguments, so the name waits here.
+// A terminate handler takes no arguments, so the name is kept here.
 std::string& nameOfProgram() {
   static std::string name;
   return name;

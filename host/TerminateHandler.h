@@ -4,8 +4,8 @@
 
 namespace varnel {
 
-/// From now on a program that ends by an exception says so on standard error, in one line, gives pending log
-/// lines a moment to get out, and aborts.
+/// Sets the terminate handler. When an exception ends the program, the handler says so on standard error in
+/// one line, waits a moment for pending log lines, and aborts.
 void installTerminateHandler(std::string programName);
 
 }  // namespace varnel

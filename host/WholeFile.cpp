@@ -17,7 +17,7 @@ namespace {
 
 enum class NameError { IsLink = 1, IsNoFile };
 
-// What the system's own errors have no words for.
+// Errors for which the system has no code.
 class NameErrors final : public std::error_category {
  public:
   const char* name() const noexcept override { return "file name"; }
@@ -35,9 +35,9 @@ std::error_code errorOf(NameError error) {
 
 constexpr mode_t ownerAlone = 0600;
 
-// What the new file has to know of what stands at its place.
+// What the new file needs to know about the file that it replaces.
 struct Predecessor {
-  std::error_code failure;  // why it must stay
+  std::error_code failure;  // why the old file must stay
   mode_t mode = ownerAlone;
 };
 
@@ -48,13 +48,13 @@ Predecessor predecessorAt(const std::filesystem::path& path) {
   if (S_ISLNK(status.st_mode)) return {.failure = errorOf(NameError::IsLink)};
   if (S_ISDIR(status.st_mode)) return {.failure = std::make_error_code(std::errc::is_a_directory)};
   if (!S_ISREG(status.st_mode)) return {.failure = errorOf(NameError::IsNoFile)};
-  // A new file would take the place of one that is protected against writing, too.
+  // Renaming would replace even a file that is protected against writing.
   if (::faccessat(AT_FDCWD, path.c_str(), W_OK, AT_EACCESS) != 0) return {.failure = lastSystemError()};
   return {.failure = {}, .mode = status.st_mode & static_cast<mode_t>(ALLPERMS)};
 }
 
 std::error_code synchronise(int descriptor) {
-  // Some file systems have no way to do that.
+  // Some file systems cannot do that.
   if (::fsync(descriptor) == 0 || errno == EINVAL || errno == ENOSYS) return {};
   return lastSystemError();
 }

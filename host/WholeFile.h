@@ -13,20 +13,20 @@
 
 namespace varnel {
 
-/// The bytes of a file; nothing when there is no regular file, it cannot be read, or it is larger than
-/// property-list files may be.
+/// The bytes of a file. Nothing when it is no regular file, cannot be read, or is larger than property-list
+/// files may be.
 std::optional<Bytes> readWholeFile(const std::filesystem::path& path);
 
-/// The mode of a file that takes the place of another one. Where there was none, it is its owner's alone.
+/// The mode of a file that replaces another one. Without an earlier file, the mode is 0600.
 enum class ReplacedMode {
   OwnerAlone,  ///< 0600
   Kept,
 };
 
-/// Writes a file so that it is whole or not there: it is written beside, and takes the place of the old file,
-/// which stays as it is after a failure, once it is on the disk. No folder is made. Nothing is written
-/// through a symbolic link: a link that has the name is an error, and so is whatever else is no regular file,
-/// and a file that may not be written. The error's message is a phrase for users.
+/// Writes a file so that it appears only when it is whole: it writes beside the target, and replaces the old
+/// file once the new one is on the disk. After a failure the old file is unchanged. Makes no folder. It is an
+/// error if the name belongs to a symbolic link, to anything else than a regular file, or to a file that may
+/// not be written. The error's message is a phrase for users.
 std::error_code writeWholeFile(const std::filesystem::path& path, ByteView bytes,
                                ReplacedMode mode = ReplacedMode::OwnerAlone);
 
@@ -36,10 +36,10 @@ class WholeFileWriter final {
   explicit WholeFileWriter(std::filesystem::path path, ReplacedMode mode = ReplacedMode::OwnerAlone)
       : _path(path), _mode(mode), _file(std::move(path)) {}
 
-  /// To be called first; the others only when it is no error.
+  /// Call this first, and the other functions only when it returns no error.
   std::error_code open();
   std::error_code write(ByteView bytes) { return writeAll(_file.descriptor(), bytes); }
-  /// Has the file take its place. Without it the old one stays.
+  /// Replaces the old file. Without this call the old file stays.
   std::error_code finish();
 
  private:
@@ -49,11 +49,11 @@ class WholeFileWriter final {
   FileBeside _file;
 };
 
-/// Writes what the user has named for output. A pipe, a terminal and the like (`isStream`) get the bytes as
-/// they come, anything else as a whole file.
+/// Writes an output that the user has named. A pipe, a terminal, and the like (`isStream`) get the bytes as
+/// they come. Any other output is written as a whole file.
 std::error_code writeOutputFile(const std::filesystem::path& path, ByteView bytes);
 
-/// The error of a name that is a symbolic link.
+/// The error for a name that is a symbolic link.
 std::error_code isLinkError();
 
 }  // namespace varnel
