@@ -5,11 +5,10 @@
 
 namespace varnel {
 
-/// Counts refreshes for somebody who waits for so many of them.
+/// Counts refreshes for a caller that waits for a number of them.
 class AwaitedUpdates {
  public:
-  /// Calls the task, once, when that many more refreshes have been counted. A later call takes the place of
-  /// an earlier one.
+  /// Calls the task once, after this many more refreshes. A later call replaces an earlier one.
   void await(unsigned count, std::function<void()> task) {
     _left = count;
     _task = std::move(task);

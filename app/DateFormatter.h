@@ -7,9 +7,9 @@
 
 namespace varnel {
 
-/// Writes moments by a pattern. Runs of y, M, d, H, m and s stand for year, month, day, hour (of 24), minute
-/// and second, with zeros in front to the length of the run; what is between apostrophes, and every other
-/// character, is itself. (Unicode TS 35, as far as viewers need it.)
+/// Writes moments by a pattern. Runs of y, M, d, H, m, and s stand for year, month, day, hour (0 to 23),
+/// minute, and second, with leading zeros up to the length of the run. Text between apostrophes, and every
+/// other character, stands for itself. (A subset of Unicode TS 35.)
 class DateFormatter {
  public:
   explicit DateFormatter(std::string_view pattern) : _pattern(pattern) {}

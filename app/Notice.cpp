@@ -6,10 +6,10 @@ namespace varnel {
 
 namespace {
 
-// Paths of runtime folders and files fit; what a strange server says need not.
+// Paths of runtime folders and files fit. A text from a strange server may not.
 constexpr std::size_t longestLine = 500;
 
-// Without half a character of UTF-8 at its end.
+// Does not leave half a character of UTF-8 at the end.
 std::string_view cut(std::string_view text) {
   if (text.size() <= longestLine) return text;
   std::size_t length = longestLine;

@@ -6,26 +6,26 @@
 
 namespace varnel {
 
-/// What a viewer tells its user beside the status: at most one line a matter, the most urgent first.
+/// What a viewer tells its user beside the status: at most one line per matter, the most urgent first.
 class Notice {
  public:
-  /// In the order in which their lines stand.
+  /// In the order of their lines.
   enum class Matter {
-    Saving,           ///< what became of the snapshot that the user wanted
+    Saving,           ///< what happened to the snapshot that the user wanted
     Link,             ///< why nothing arrives
     MissingTemplate,  ///< why nothing can be shown
-    StandingDisplay,  ///< that what arrives is not shown any more
-    Source,           ///< what the server says of where its messages come from
+    StandingDisplay,  ///< that new messages are not shown any more
+    Source,           ///< what the server says about where its messages come from
     DroppedByServer,
     TooLong,
     LeftOutOfLog,
     NotDecoded,
   };
 
-  /// Sets the matter's line; an empty one takes it away. Control characters become escapes, and what is much
-  /// too long for a line is cut. False when nothing has changed.
+  /// Sets the line of a matter. An empty line removes it. Control characters become escapes, and a line that
+  /// is much too long is cut. False when nothing has changed.
   bool set(Matter matter, std::string_view line);
-  /// Takes every line away.
+  /// Removes every line.
   void clear() { _lines.clear(); }
   /// The lines with a newline between them; empty when there are none.
   std::string text() const;

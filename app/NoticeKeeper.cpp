@@ -12,7 +12,7 @@ namespace {
 using namespace std::chrono_literals;
 using Matter = Notice::Matter;
 
-// Most links are there at once; whoever waits longer wants to know for what.
+// Most links open at once. A user who waits longer wants to know why.
 constexpr std::chrono::milliseconds patience = 3s;
 constexpr std::chrono::milliseconds timeToReadOfSaving = 30s;
 constexpr std::string_view momentPattern = "yyyy-MM-dd 'at' HH:mm:ss";
@@ -28,7 +28,7 @@ std::string knownTechnologies() {
   return names;
 }
 
-// What is to be told of so many messages; nothing of none.
+// A line that tells the count; nothing for a count of 0.
 std::string countLine(std::string_view which, std::uint64_t count) {
   return count == 0 ? std::string() : std::string(which) + ": " + std::to_string(count);
 }
@@ -96,7 +96,7 @@ std::string NoticeKeeper::linkLine(const LinkReport& report) const {
          ", but nothing has arrived yet";
 }
 
-// The host knows best, but of what the server answers.
+// The host's reason comes before the model's, except when the server has named an unknown technology.
 std::string NoticeKeeper::failureLine(const LinkReport& report) const {
   const std::string server = "The telephony server" + (report.place.empty() ? "" : " in " + report.place);
   if (_model->streamFailure() == StreamFailure::UnknownTechnology) {

@@ -10,30 +10,32 @@
 
 namespace varnel {
 
-/// Keeps the notice of a viewer true: it asks the model and the host what there is to tell, and takes away
-/// what is over.
+/// Keeps the viewer's notice true. It asks the model and the host what there is to tell, and removes what is
+/// over.
 class NoticeKeeper {
  public:
-  /// The way to start over is what the user does for it, as in "press R". The observer is called when the
-  /// notice has become another one by itself or by an operation that says so. What the services stand for
-  /// outlives the keeper.
+  /// `wayToStartOver` is what the user has to do, such as "press R". The observer is called when the notice
+  /// has changed by itself, or by an operation whose comment says so. The objects in `services` must outlive
+  /// the keeper.
   NoticeKeeper(const ModelServices& services, std::string wayToStartOver, std::function<void()> observer);
 
-  /// That model is about to connect: what there was to tell is over. It stays until `end` or the next call.
+  /// This model is about to connect: clears the notice. The model must live until `end` or the next call.
   void begin(const VarnelModel& model);
-  /// There is no model any more, and nothing to tell.
+  /// There is no model any more. Clears the notice.
   void end();
-  /// Asks again. The caller shows what comes of it, not the observer. False when the notice is as before.
+  /// Asks model and host again. The caller, not the observer, shows the change. False when the notice is as
+  /// before.
   bool update();
 
-  /// A snapshot was written, or was not. Calls the observer.
+  /// A snapshot was written, or could not be written. Calls the observer.
   void snapshotWasWritten(const FileWriting& writing);
-  /// A snapshot was wanted on a device that allows none. Calls the observer.
+  /// The user wanted a snapshot on a device that allows none. Calls the observer.
   void snapshotIsNotAllowed();
-  /// A snapshot is about to be described and written. Calls the observer when it will be an empty one.
+  /// A snapshot is about to be described and written. Calls the observer when the snapshot is going to be
+  /// empty.
   void snapshotIsWanted();
 
-  /// Its lines with a newline between them; empty when there is nothing to tell.
+  /// The lines with a newline between them; empty when there is nothing to tell.
   std::string text() const { return _notice.text(); }
 
  private:
@@ -51,8 +53,8 @@ class NoticeKeeper {
   Notice _notice;
   const VarnelModel* _model = nullptr;
   bool _wasConnected = false;
-  std::unique_ptr<RepeatingTimer> _patience;     // while it is too early to tell why nothing arrives
-  std::unique_ptr<RepeatingTimer> _endOfSaving;  // while a snapshot is told of
+  std::unique_ptr<RepeatingTimer> _patience;     // set while it is too early to say why nothing arrives
+  std::unique_ptr<RepeatingTimer> _endOfSaving;  // set while the notice tells about a snapshot
 };
 
 }  // namespace varnel

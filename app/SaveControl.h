@@ -4,17 +4,17 @@
 
 namespace varnel {
 
-/// What panes and the save screen may ask of the application.
+/// What panes and the save screen may ask the application to do.
 class SaveControl {
  public:
   virtual ~SaveControl() = default;
-  /// True on the devices on which snapshots may be saved.
+  /// True on devices that allow snapshots.
   virtual bool allowSaveButton() const = 0;
-  /// Opens the save screen, unless it is open.
+  /// Opens the save screen if it is not open.
   virtual void showSaveView() = 0;
-  /// Has the main queue close the save screen, once whoever asks for it has returned.
+  /// Closes the save screen from the main queue, after the caller has returned.
   virtual void closeSaveViewLater() = 0;
-  /// The save screen has written a snapshot, or could not.
+  /// The save screen has written a snapshot, or could not write it.
   virtual void snapshotWasWritten(const FileWriting& writing) = 0;
 };
 

@@ -10,21 +10,21 @@
 
 namespace varnel {
 
-/// Present on the devices on which snapshots may be saved.
+/// A file that exists on devices that allow snapshots.
 inline constexpr std::string_view internalDeviceMarker =
     "/OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 
-/// The contents of a snapshot file: a dictionary of "Timestamp", "Data" and "Description". Without save
-/// contents "Data" is an empty array; without a description there is no "Description".
+/// The contents of a snapshot file: a dictionary with "Timestamp", "Data", and "Description". Without save
+/// contents "Data" is an empty array. Without a description there is no "Description".
 Value snapshotContents(Time created, const Value& saveContents,
                        const std::optional<std::string>& description);
 
-/// Writes the snapshot file of that moment into the device's folder of diagnostic logs; one of the same
-/// second takes its place. A failure is also a line in the log.
+/// Writes the snapshot file of this moment into the device's folder of diagnostic logs, and replaces a file
+/// of the same second. A failure also writes a log line.
 FileWriting writeSnapshot(DeviceFiles& files, const Clock& clock, const Value& contents);
 
-/// Writes these save contents at once with an empty description, where the device allows snapshots; elsewhere
-/// a line in the log says why not, and nothing is returned.
+/// Writes these save contents at once with an empty description, if the device allows snapshots. Otherwise
+/// returns nothing, and a log line says why.
 std::optional<FileWriting> saveSnapshotWithoutDescription(DeviceFiles& files, const Clock& clock,
                                                           const Value& saveContents);
 

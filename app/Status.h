@@ -4,10 +4,10 @@
 
 namespace varnel {
 
-/// What viewers say of their link while there is none.
+/// The status while there is no link.
 inline constexpr std::string_view notConnectedStatus = "Connecting...";
 
-/// What they say of it otherwise: when the display was last brought up to date, in local time.
+/// The status with a link: when the display was last updated, in local time.
 inline constexpr std::string_view updateStatusPattern = "'Updated' yyyy-MM-dd 'at' HH:mm:ss";
 
 }  // namespace varnel

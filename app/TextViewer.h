@@ -12,39 +12,39 @@
 
 namespace varnel {
 
-/// What the text viewer shows at a time.
+/// One page of the text viewer.
 struct TextPage {
   std::string status{};
   std::string notice{};  ///< lines with a newline between them; empty when there is nothing to tell
   std::string tree{};    ///< lines that each end in a newline
 
-  /// The status line, each line of the notice behind "Notice: ", and the tree.
+  /// The status line, then each line of the notice after "Notice: ", then the tree.
   std::string text() const;
   friend bool operator==(const TextPage&, const TextPage&) = default;
 };
 
-/// What the text viewer shows itself on.
+/// Where the text viewer shows its pages.
 class TextOutput {
  public:
   virtual ~TextOutput() = default;
-  /// Each page takes the place of the one before it.
+  /// Each page replaces the one before.
   virtual void show(const TextPage& page) = 0;
 };
 
-/// The viewer without a window: on every refresh, and whenever status or notice change, it writes the status
-/// line, the notice and the whole tree.
+/// The viewer without a window. On every refresh, and whenever the status or the notice changes, it writes
+/// the status line, the notice, and the whole tree.
 class TextViewer final : public VarnelModelObserver {
  public:
-  /// Shows the first status and has the model connect once the main queue runs. The way to start over is what
-  /// users do for it, as in "press R".
+  /// Shows the first status. The model connects once the main queue runs. `wayToStartOver` is what users have
+  /// to do, such as "press R".
   TextViewer(const ModelServices& services, DeviceFiles& files, TextOutput& output,
              std::string wayToStartOver);
 
-  /// Calls the task, once, when that many refreshes have been shown.
+  /// Calls the task once, after this many refreshes were shown.
   void afterUpdates(unsigned count, std::function<void()> task);
-  /// Replaces the model by a new one with an empty state.
+  /// Replaces the model with a new one that has an empty state.
   void startOver();
-  /// Saves a snapshot with an empty description, where the device allows it.
+  /// Saves a snapshot with an empty description, if the device allows it.
   void save();
 
   void updateViewControllerFromModel() override;
@@ -59,11 +59,11 @@ class TextViewer final : public VarnelModelObserver {
   ModelServices _services;
   DeviceFiles& _files;
   TextOutput& _output;
-  TextPage _page;   // as it is shown next
-  TextPage _shown;  // as it was shown last
+  TextPage _page;   // the page to show next
+  TextPage _shown;  // the page shown last
   NoticeKeeper _notices;
   std::unique_ptr<VarnelModel> _model;
-  std::optional<std::string> _updateMessage;  // of the last refresh
+  std::optional<std::string> _updateMessage;  // the status after the last refresh
   AwaitedUpdates _awaitedUpdates;
 };
 

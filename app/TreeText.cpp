@@ -10,10 +10,10 @@ namespace {
 
 constexpr std::size_t indentWidth = 2;
 constexpr std::size_t columnGap = 2;
-// A longer name does not push the values of its siblings aside.
+// A longer name does not move the values of its siblings to the right.
 constexpr std::size_t widestColumn = 80;
 
-// In characters of UTF-8: every byte but the continuations.
+// The number of characters in UTF-8: all bytes except continuation bytes.
 std::size_t lengthOf(std::string_view text) {
   return static_cast<std::size_t>(std::ranges::count_if(text, [](char c) { return (c & 0xC0) != 0x80; }));
 }

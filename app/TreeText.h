@@ -6,9 +6,9 @@
 
 namespace varnel {
 
-/// The tree below its root as indented lines, each leaf's value beside its name and the values of siblings
-/// aligned. A root that is itself a leaf is its value alone. Control characters are shown as escapes, so that
-/// no value can steer a terminal.
+/// The tree below its root as indented lines. Each leaf has its value beside its name, and the values of
+/// siblings are aligned. A root that is a leaf is only its value. Control characters are written as escapes,
+/// so that no value can control a terminal.
 std::string treeAsText(const VarnelModelNode& root);
 
 }  // namespace varnel

@@ -9,7 +9,7 @@ namespace varnel {
 
 namespace {
 
-// Kept: without the dots that every later status of that kind has.
+// Kept: no dots, unlike every later status of this kind.
 constexpr std::string_view firstStatus = "Connecting";
 
 constexpr std::string_view applicationName = "Varnel";
@@ -18,7 +18,7 @@ constexpr std::string_view titleSeparator = " — ";
 constexpr std::string_view homeScreenDomain = "com.orvane.dockhall";
 constexpr std::string_view signalStrengthKey = "DHShowGSMRSSI";
 
-// Every pane on the stack is one of these: nobody else pushes any.
+// Every pane on the stack is of this class: only this file pushes panes.
 VarnelPaneController& varnelPane(PaneController& controller) {
   return static_cast<VarnelPaneController&>(controller);
 }
@@ -61,7 +61,7 @@ void VarnelApp::startOver() {
   closeSaveView();
   setUpdateMessage(std::string(notConnectedStatus));
   _notices.end();
-  _model.reset();  // one model at a time has the channel
+  _model.reset();  // only one model at a time can have the log channel
   _model = std::make_unique<VarnelModel>(_host.model, *this);
   _notices.begin(*_model);
   const auto root = _navController->controllers().front();
@@ -126,7 +126,7 @@ void VarnelApp::showNotice() {
 void VarnelApp::showWindowTitle() {
   if (!_window || !_model) return;
   std::string title;
-  // The root pane is no section.
+  // The root pane shows no section.
   if (_navController->controllers().size() > 1) title.append(topPane().title()).append(titleSeparator);
   if (!_model->technology().empty()) title.append(_model->technology()).append(titleSeparator);
   _window->setTitle(title.append(applicationName));
@@ -138,7 +138,7 @@ void VarnelApp::reloadPanes() {
     VarnelPaneController& pane = varnelPane(*panes[i]);
     const auto node = i == 0 ? _model->topLevelNodes() : _model->nodeAtPath(pane.path());
     if (i > 0 && !node) {
-      // Kept: this pane and those above it go as they are; only the panes below show the new tree.
+      // Kept: this pane and those above it leave without showing the new tree. Only the panes below show it.
       _navController->popTo(*panes[i - 1], Animation::Animated);
       return;
     }

@@ -22,13 +22,13 @@ namespace varnel {
 /// It may be launched again after it was ended.
 class VarnelApp final : public VarnelModelObserver, public NavigationStackDelegate, public SaveControl {
  public:
-  /// What the application may ask of its host. Everything outlives it.
+  /// What the application needs from its host. Every object in it must outlive the application.
   struct Host {
     ModelServices model;
     DeviceFiles& files;
     Preferences& preferences;
     UserInterface& userInterface;
-    /// What users do to start over, as notices tell them.
+    /// What users do to start over, as the notice tells them.
     std::string wayToStartOver = "press Ctrl+R";
   };
 
@@ -37,42 +37,42 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   VarnelApp& operator=(const VarnelApp&) = delete;
   ~VarnelApp() override;
 
-  /// Shows the window and has the main queue make the first attempt to connect.
+  /// Shows the window. The main queue makes the first attempt to connect.
   void applicationDidFinishLaunching();
-  /// Puts the shared preference back, takes the window off the screen and closes the link.
+  /// Resets the shared preference, removes the window from the screen, and closes the link.
   void applicationWillTerminate();
-  /// Replaces the model by a new one with an empty state, and goes back to the root pane. Nothing happens
-  /// before launch and after the end.
+  /// Replaces the model with a new one that has an empty state, and goes back to the root pane. Does nothing
+  /// before the launch and after the end.
   void startOver();
-  /// Saves a snapshot with an empty description at once, where the device allows it.
+  /// Saves a snapshot with an empty description at once, if the device allows it.
   void save();
-  /// Calls the task, once, when that many refreshes have been shown.
+  /// Calls the task once, after this many refreshes were shown.
   void afterUpdates(unsigned count, std::function<void()> task);
 
-  /// Looks whether the device allows snapshots.
+  /// Checks whether the device allows snapshots.
   void getSaveButtonPref();
   void updateViewControllerFromModel() override;
   void linkWasLost() override;
   void linkWasOpened() override;
   void linkWasLookedAt() override;
-  /// Shows the present status in that pane.
+  /// Shows the current status in this pane.
   void updateStatusForViewController(VarnelPaneController& pane);
   void navigationController_willShowViewController_animated(NavigationStack& stack,
                                                             PaneController& controller,
                                                             Animation animation) override;
   void showSaveView() override;
-  /// Closes the save screen, if it is open.
+  /// Closes the save screen if it is open.
   void closeSaveView();
   void closeSaveViewLater() override;
   void snapshotWasWritten(const FileWriting& writing) override { _notices.snapshotWasWritten(writing); }
 
-  /// Null before launch and after the end.
+  /// Null before the launch and after the end.
   Window* window() const { return _window.get(); }
   void setWindow(std::unique_ptr<Window> window) { _window = std::move(window); }
-  /// Null while no save screen is shown.
+  /// Null while there is no save screen.
   const std::shared_ptr<VarnelSaveViewController>& saveViewController() const { return _saveViewController; }
   void setSaveViewController(std::shared_ptr<VarnelSaveViewController> controller);
-  /// The status while connected; absent before launch and after the end.
+  /// The status while connected; absent before the launch and after the end.
   const std::optional<std::string>& updateMessage() const { return _updateMessage; }
   void setUpdateMessage(std::optional<std::string> message) { _updateMessage = std::move(message); }
   bool allowSaveButton() const override { return _allowSaveButton; }

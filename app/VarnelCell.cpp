@@ -50,14 +50,14 @@ void VarnelCell::setLayout() {
   _lastLayout = &VarnelCell::setLayout;
   const Rect content = layOutBase();
   const Size keySize = placeKey(content);
-  if (!_view) return;  // a name-only cell, used again for a leaf
+  if (!_view) return;  // a cell with a name only, used again for a leaf
 
   const Size valueSize = measured(_value);
   const double need = keySize.width + keyInset + gapBeforeValue + valueSize.width;
   const double behindKey = content.x + keyInset + keySize.width + gapBeforeValue;
   const double valueX = need < content.width ? content.width - valueSize.width : behindKey;
   _value->setFrame(centred(valueX, valueSize, content.height));
-  // Kept: the scrolled content is wider than what it holds.
+  // Kept: the scrolled content is wider than key and value need.
   const double contentWidth =
       need > content.width ? content.width + keySize.width + valueSize.width : content.width;
   _view->setContentSize({contentWidth, containerHeight});
@@ -73,7 +73,7 @@ Rect VarnelCell::layOutBase() {
   return cellView().contentBounds();
 }
 
-// Kept: the value is measured in bold as well, though it is drawn in regular.
+// Kept: the value too is measured in bold, though it is drawn in regular.
 Size VarnelCell::measured(const Label* label) const { return _metrics.sizeOfText(label->text(), keyFont); }
 
 Size VarnelCell::placeKey(const Rect& content) {

@@ -8,28 +8,28 @@
 
 namespace varnel {
 
-/// The row of a pane: a name alone, or a name and a value that scroll sideways together when the row is too
-/// short for them.
+/// A row of a pane: a name only, or a name and a value. When the row is too short for name and value, both
+/// scroll sideways together.
 class VarnelCell final : public TableCell {
  public:
-  /// The name-only cell: the key stands in the cell itself.
+  /// The cell with a name only. The key is the built-in text of the cell.
   static std::unique_ptr<VarnelCell> initWithStyleKey_reuseIdentifier(TableView& table,
                                                                       const TextMetrics& metrics,
                                                                       CellStyle style,
                                                                       std::string_view reuseIdentifier);
-  /// The name-and-value cell: key and value stand in a scroll container.
+  /// The cell with a name and a value. Key and value are in a scroll container.
   static std::unique_ptr<VarnelCell> initWithStyle_reuseIdentifier(TableView& table,
                                                                    const TextMetrics& metrics,
                                                                    CellStyle style,
                                                                    std::string_view reuseIdentifier);
 
   Label& key() const { return *_key; }
-  /// Null in a name-only cell.
+  /// Null in a cell with a name only.
   Label* value() const { return _value; }
 
-  /// Lays out a row of a name alone.
+  /// Lays out a row with a name only.
   void setLayoutKey();
-  /// Lays out a row of a name and a value: the value at the right edge when there is room, else behind the
+  /// Lays out a row with a name and a value. The value is at the right edge if there is room, else after the
   /// name.
   void setLayout();
   /// Repeats the last layout.

@@ -6,8 +6,8 @@ namespace varnel {
 
 namespace {
 
-// Kept: one identifier for both kinds of cell, so a cell that is used again may be of the other kind and show
-// what its labels can.
+// Kept: both kinds of cell have one identifier. So a row can get a cell of the other kind, and then shows
+// only what the labels of that cell can show.
 constexpr std::string_view cellIdentifier = "VarnelPaneControllerCell";
 constexpr std::string_view titleWithoutNode = "Varnel";
 constexpr double statusFontSize = 14;
@@ -31,7 +31,7 @@ void VarnelPaneController::viewWillAppear(Animation animation) {
   createToolbarItems();
 }
 
-// Kept: what a pane does by itself when it disappears is left out.
+// Kept: the default action of a pane that disappears is missing here.
 void VarnelPaneController::viewWillDisappear(Animation) { _pane->resignFirstResponder(); }
 
 void VarnelPaneController::setStatus_isLoading(std::optional<std::string_view> status, bool isLoading) {
@@ -65,7 +65,7 @@ std::size_t VarnelPaneController::tableView_numberOfRowsInSection(TableView&, st
 std::unique_ptr<TableCell> VarnelPaneController::tableView_cellForRowAtIndexPath(TableView& table,
                                                                                  const IndexPath& path) {
   const Node child = childAt(path);
-  // Every cell of this table was made below.
+  // This class made every cell of the table.
   std::unique_ptr<VarnelCell> reused(
       static_cast<VarnelCell*>(table.dequeueReusableCell(cellIdentifier).release()));
   return child->childNodes() ? innerNodeCell(table, std::move(reused), *child)

@@ -12,25 +12,26 @@
 
 namespace varnel {
 
-/// A pane that lists the children of one node of the display tree. An inner node's row leads to a pane of its
-/// own; a leaf's row shows its value.
+/// A pane that lists the children of one node of the display tree. The row of an inner node leads to another
+/// pane; the row of a leaf shows its value.
 class VarnelPaneController final : public PaneController, public TableViewDelegate {
  public:
   using Node = std::shared_ptr<const VarnelModelNode>;
 
-  /// A pane on the node of that path; the node is null while there is no tree. User interface and save
-  /// control outlive the pane.
+  /// A pane for the node with this path. The node is null while there is no tree. User interface and save
+  /// control must outlive the pane.
   VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node, std::string path);
 
   /// The node's path in the tree, "/" for the root.
   const std::string& path() const { return _keyPath; }
-  /// What its title bar says: the name of the node, "Varnel" without one.
+  /// The text of the title bar: the name of the node, or "Varnel" without a node.
   std::string_view title() const;
-  /// Shows the status, none as an empty text, and whether something is awaited.
+  /// Shows the status, or none if it is an empty text, and whether the viewer waits for the link.
   void setStatus_isLoading(std::optional<std::string_view> status, bool isLoading);
-  /// Shows another node, or none.
+  /// Shows another node, or no node.
   void reloadWithNode(Node node);
-  /// Builds the toolbar anew. Its label is sized once, so every change of the status takes a new toolbar.
+  /// Builds the toolbar again. Its label gets its size only once, so every change of the status needs a new
+  /// toolbar.
   void createToolbarItems();
 
   TablePane& pane() override { return *_pane; }

@@ -34,8 +34,8 @@ std::shared_ptr<VarnelSaveViewController> VarnelSaveViewController::initWithSave
   return controller;
 }
 
-// The entries share their sections with the live display, so a copy that is to stay needs sections of its
-// own.
+// The entries share their sections with the live display. The copy must not change with it, so it needs its
+// own sections.
 VarnelSaveViewController::VarnelSaveViewController(const Host& host, const Value& saveHistory)
     : _host(host), _saveHistory(saveHistory.deepCopy()), _timeStamp(host.clock.now()) {}
 
@@ -101,7 +101,7 @@ std::unique_ptr<TableCell> VarnelSaveViewController::tableView_cellForRowAtIndex
   if (!cell) cell = std::make_unique<TableCell>(table.makeCellView(CellStyle::Default), cellIdentifier);
   cell->cellView().setText(descriptionOf(_saveHistory.array()->at(path.row)));
   cell->cellView().setTextFont(Font::named("Helvetica", cellFontSize));
-  // Every entry is saved: there is nothing to choose.
+  // All entries are saved; the user cannot choose.
   cell->cellView().setAccessory(CellAccessory::Checkmark);
   return cell;
 }

@@ -11,12 +11,13 @@
 
 namespace varnel {
 
-/// The screen that saves a snapshot: it lists what will be saved, takes a description and writes the file.
+/// The screen that saves a snapshot. It lists what is going to be saved, takes a description, and writes the
+/// file.
 class VarnelSaveViewController final : public ModalController,
                                        public TableViewDelegate,
                                        public TextFieldDelegate {
  public:
-  /// What the screen may ask of its host. Everything outlives the screen.
+  /// What the screen needs from its host. Every object in it must outlive the screen.
   struct Host {
     UserInterface& userInterface;
     const Resources& resources;
@@ -25,22 +26,22 @@ class VarnelSaveViewController final : public ModalController,
     SaveControl& saveControl;
   };
 
-  /// A screen for these save contents, as they are now: what changes later is not saved. Null, with a line in
-  /// the log, when the interface resource cannot be read.
+  /// Makes a screen for the save contents as they are now; later changes are not saved. Null when the
+  /// interface resource cannot be read; a log line then says so.
   static std::shared_ptr<VarnelSaveViewController> initWithSaveHistory(const Host& host,
                                                                        const Value& saveHistory);
 
-  /// The outlets; null where the interface resource has none.
+  /// The outlets; null for those that the interface resource does not have.
   TableView* saveContentTable() const { return _saveContentTable; }
   void setSaveContentTable(TableView* table) { _saveContentTable = table; }
   TextField* saveDescription() const { return _saveDescription; }
   void setSaveDescription(TextField* field) { _saveDescription = field; }
 
-  /// Writes the snapshot file, says so when that fails, and has the screen closed either way.
+  /// Writes the snapshot file, reports a failure, and closes the screen in both cases.
   void savePressed();
-  /// Has the screen closed.
+  /// Closes the screen.
   void cancelPressed();
-  /// Hides the keyboard.
+  /// Hides the on-screen keyboard.
   void backgroundTouched();
 
   ModalScreen& screen() override { return *_screen; }

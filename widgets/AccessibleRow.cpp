@@ -6,7 +6,7 @@ namespace varnel {
 
 namespace {
 
-// A row stands on its table's viewport.
+// The parent of a row is its table's viewport.
 TableWidget& tableOf(const RowWidget& row) {
   return static_cast<TableWidget&>(*row.parentWidget()->parentWidget());
 }

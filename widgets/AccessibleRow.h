@@ -6,8 +6,8 @@
 
 namespace varnel {
 
-/// A row for screen readers: an item of a list, named "name: value", that can be pressed. Where the row is
-/// too short for its text, that is its description as well.
+/// A row for screen readers: an item of a list, named "name: value", which can be pressed. When the row is
+/// too short for its text, the text is also its description.
 class AccessibleRow final : public QAccessibleWidget {
  public:
   explicit AccessibleRow(RowWidget& row);

@@ -6,7 +6,7 @@
 
 namespace varnel {
 
-/// A table for screen readers: a list whose items are the rows on the screen, top first.
+/// A table for screen readers: a list whose items are the rows on the screen, from top to bottom.
 class AccessibleTable final : public QAccessibleWidget {
  public:
   explicit AccessibleTable(TableWidget& table);
@@ -19,7 +19,7 @@ class AccessibleTable final : public QAccessibleWidget {
   TableWidget& table() const;
 };
 
-/// Has screen readers told of windows, tables and rows. It is enough to call it once a program.
+/// Makes windows, tables, and rows known to screen readers. One call per program is enough.
 void describeTablesToScreenReaders();
 
 }  // namespace varnel

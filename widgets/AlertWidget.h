@@ -8,11 +8,11 @@
 
 namespace varnel {
 
-/// A message above everything else in the window, which stays until the user closes it: with its button,
-/// Return, Space or Escape. It keeps the keyboard meanwhile, and deletes itself afterwards.
+/// A message above everything else in the window. It stays until the user closes it with its button, Return,
+/// Space, or Escape. It keeps the keyboard focus meanwhile, and deletes itself afterwards.
 class AlertWidget final : public QWidget {
  public:
-  /// `closed` is called when the user has closed it.
+  /// Calls `closed` when the user has closed it.
   AlertWidget(const Alert& alert, QWidget& window, std::function<void()> closed);
 
   TextButton& button() { return *_button; }

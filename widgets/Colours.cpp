@@ -7,7 +7,7 @@ namespace varnel {
 
 namespace {
 
-// The least contrast at which small text reads well (WCAG 2.1, level AA).
+// The lowest contrast at which small text is easy to read (WCAG 2.1, level AA).
 constexpr double readable = 4.5;
 
 double linear(double channel) {

@@ -5,23 +5,23 @@
 
 namespace varnel {
 
-/// Colours that the desktop's palette has no role for, made from those that it has, so that they follow it
-/// from light to dark.
+/// Colors for which the desktop's palette has no role. They are made from colors of the palette, so that they
+/// follow its light or dark scheme.
 
-/// Part of the way from one colour to another: 0 is the first, 1 the second.
+/// A color between two others: a share of 0 is the first, 1 the second.
 QColor blend(const QColor& from, const QColor& to, double share);
-/// Between 1, the same lightness, and 21, black on white (WCAG 2.1, contrast ratio).
+/// From 1, the same lightness, to 21, black on white (WCAG 2.1, contrast ratio).
 double contrast(const QColor& one, const QColor& other);
 
 /// Lines between rows and along bars.
 QColor separatorColour(const QPalette& palette);
 /// Scroll bars within rows.
 QColor barColour(const QPalette& palette);
-/// Marks that stand back behind the text.
+/// Marks that are less prominent than text.
 QColor markColour(const QPalette& palette);
-/// The ground of the selected row, on which the text keeps its colour.
+/// The ground of the selected row. The text on it keeps its color.
 QColor selectionColour(const QPalette& palette);
-/// What can be pressed: the desktop's highlight colour, made readable on that ground.
+/// Things that can be pressed: the desktop's highlight color, made readable on this ground.
 QColor accentColour(const QPalette& palette, const QColor& ground);
 
 }  // namespace varnel

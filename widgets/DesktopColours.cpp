@@ -23,14 +23,14 @@ QDBusMessage busMethod(const QString& name) {
   return QDBusMessage::createMethodCall(bus, QStringLiteral("/org/freedesktop/DBus"), bus, name);
 }
 
-// The number within a variant, which may be within others.
+// The number inside a variant, which may be inside other variants.
 DesktopColours::Scheme schemeIn(QVariant value) {
   while (value.metaType() == QMetaType::fromType<QDBusVariant>())
     value = value.value<QDBusVariant>().variant();
   return static_cast<DesktopColours::Scheme>(value.toUInt());
 }
 
-// The palette's other colours come from these by the style's own rules.
+// The style derives the palette's other colors from these.
 QPalette darkPalette() {
   QPalette palette(QColor(48, 48, 48), QColor(36, 36, 36));
   palette.setColor(QPalette::Base, QColor(24, 24, 24));
@@ -41,8 +41,8 @@ QPalette darkPalette() {
 
 }  // namespace
 
-// A bus connection of the toolkit's own would wait for the bus. So this one goes to the bus as to any peer,
-// and introduces itself.
+// A bus connection of the toolkit would wait for the bus. So this class connects to the bus as to any peer,
+// and sends the first message itself.
 DesktopColours::DesktopColours(const std::string& busAddress)
     : _bus(QDBusConnection::connectToPeer(QString::fromStdString(busAddress), connectionName)) {
   if (_bus.isConnected()) introduceItself();
@@ -87,7 +87,7 @@ void DesktopColours::settingChanged(const QString& group, const QString& key, co
 }
 
 void DesktopColours::apply(Scheme scheme) {
-  // Back to the toolkit's own, which may be dark already.
+  // Restores the toolkit's own palette, which may be dark already.
   QApplication::setPalette(QPalette());
   constexpr int halfLight = 128;
   const bool isDark = QApplication::palette().color(QPalette::Window).lightness() < halfLight;

@@ -7,22 +7,22 @@
 
 namespace varnel {
 
-/// Follows the desktop from light to dark where the toolkit does not by itself: asks the desktop's settings
+/// Follows the desktop's light or dark scheme where the toolkit does not. It asks the desktop's settings
 /// portal (org.freedesktop.portal.Settings, "color-scheme") and listens to its changes. Without a portal the
-/// colours stay the toolkit's own.
+/// toolkit's colors stay.
 class DesktopColours final : public QObject {
   Q_OBJECT
 
  public:
-  /// What the portal says, in its numbers.
+  /// The portal's answer, with the portal's numbers.
   enum class Scheme : unsigned { NoPreference = 0, Dark = 1, Light = 2 };
 
-  /// Asks on the bus of that address, the user's session bus. It waits for nobody: a bus that does not answer
-  /// leaves the colours as they are.
+  /// Asks on the bus with this address, the user's session bus. It does not wait: a bus that does not answer
+  /// leaves the colors as they are.
   explicit DesktopColours(const std::string& busAddress);
   ~DesktopColours() override;
 
-  /// Colours the application for that scheme.
+  /// Gives the application the colors of this scheme.
   static void apply(Scheme scheme);
 
  private:

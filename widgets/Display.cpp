@@ -61,7 +61,7 @@ bool connectsToHost(const std::string& host, int port) {
   return false;
 }
 
-// The number in "HOST:NUMBER" or "HOST:NUMBER.SCREEN"; nothing when the name has another form.
+// The number in "HOST:NUMBER" or "HOST:NUMBER.SCREEN"; nothing for a name of another form.
 std::optional<int> numberOfX11Display(std::string_view name) {
   const std::size_t colon = name.rfind(':');
   if (colon == std::string_view::npos) return std::nullopt;

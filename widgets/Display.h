@@ -4,11 +4,11 @@
 
 namespace varnel {
 
-/// True when windows can probably be opened: the toolkit is told of a platform (QT_QPA_PLATFORM), or the
-/// Wayland or X11 server that the environment names takes connections.
+/// True when windows can probably be opened: QT_QPA_PLATFORM names a platform, or the Wayland or X11 server
+/// in the environment accepts connections.
 bool displayIsThere();
 
-/// What the environment says of the display, such as "DISPLAY=:0"; empty when it says nothing.
+/// The environment variable that names the display, such as "DISPLAY=:0"; empty when there is none.
 std::string wantedDisplay();
 
 }  // namespace varnel

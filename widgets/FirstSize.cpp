@@ -5,11 +5,12 @@ namespace varnel {
 namespace {
 
 constexpr int widestPhone = 640;
-// On a desktop the window is at first about as large as a phone's screen.
+// On a desktop the first window is about as large as a phone's screen.
 constexpr QSize preferredSize(480, 800);
-// Of the room that there is; a window that nobody has made larger leaves some of the desktop to be seen.
+// The share of the available room. If the user has not made the window larger, a part of the desktop stays
+// visible.
 constexpr double largestShare = 0.9;
-// The title bar and the borders, which only become known when the window is there.
+// The title bar and the borders, whose size is only known when the window exists.
 constexpr QSize largestFrame(16, 48);
 
 }  // namespace

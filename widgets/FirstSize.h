@@ -5,14 +5,14 @@
 
 namespace varnel {
 
-/// Windows are no smaller, in either direction.
+/// Neither side of a window is smaller.
 inline constexpr int smallestWindowSide = 240;
 
-/// True for the room of a screen that is hardly larger than a phone's: a window takes it whole.
+/// True for a screen that is hardly larger than a phone's: the window fills it.
 bool isTakenWhole(const QSize& available);
 
-/// The size that a window gets at first on a desktop with that much room. It leaves room for a frame.
-/// @param last the size that it had last, if that is known
+/// The first size of a window on a desktop with this much room. It leaves room for a frame.
+/// @param last the last size of the window, if it is known
 QSize firstSize(const QSize& available, const std::optional<QSize>& last);
 
 }  // namespace varnel

@@ -4,11 +4,11 @@
 
 namespace varnel {
 
-/// Which way Tab goes.
+/// The direction of the Tab key.
 enum class FocusDirection { Next, Previous };
 
-/// Gives the keyboard to the next widget inside that one which takes it, round and round. False when there is
-/// none.
+/// Gives the keyboard focus to the next widget inside `root` that takes it, and after the last one to the
+/// first. False when there is none.
 bool cycleFocusWithin(QWidget& root, FocusDirection direction);
 
 }  // namespace varnel

@@ -9,7 +9,7 @@ namespace varnel {
 
 Size FontMetrics::sizeOfText(std::string_view text, const Font& font) const {
   const QFontMetricsF metrics(qtFont(font));
-  // Whole pixels: a label that is a fraction too narrow would be cut.
+  // Whole pixels: a label that is too narrow by a fraction would be cut.
   return {std::ceil(metrics.horizontalAdvance(singleLine(text))), std::ceil(metrics.height())};
 }
 

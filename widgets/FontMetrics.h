@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// How much room texts take in the fonts that they are drawn with.
+/// Measures texts in the fonts in which they are drawn.
 class FontMetrics final : public TextMetrics {
  public:
   Size sizeOfText(std::string_view text, const Font& font) const override;

@@ -44,7 +44,7 @@ void HeaderWidget::showBackButton(const QString& parentTitle) {
   if (_leadsBack && parentTitle == _back.text()) return;
   _leadsBack = true;
   _back.setText(parentTitle);
-  _back.setShortcut({});  // an ampersand of the title is no mnemonic
+  _back.setShortcut({});  // an ampersand in the title is no mnemonic
   _back.setAccessibleName(QStringLiteral("Back to ") + parentTitle);
   _back.show();
   arrange();
@@ -65,7 +65,7 @@ void HeaderWidget::arrange() {
   }
 }
 
-// False when the title does not fit; it stands where it would be cut least then.
+// False when the title does not fit. Then it is placed where the least of it is cut.
 bool HeaderWidget::arrangeWith(BackButton backButton, double titleSize) {
   int backWidth = 0;
   if (backButton == BackButton::Whole) backWidth = _back.sizeHint().width();
@@ -84,7 +84,7 @@ void HeaderWidget::showAsMuchAsFits(const QFont& font) {
   _title.setToolTip(fitting == _wholeTitle ? QString() : plainTooltip(_wholeTitle));
 }
 
-// In the middle of the bar, or as near to it as the way back allows.
+// In the middle of the bar, or as near to it as the back button allows.
 QRect HeaderWidget::titleRoom(int backWidth, int titleWidth) const {
   const int left = backWidth > 0 ? backWidth : inset;
   const int width = std::min(titleWidth, this->width() - left - inset);

@@ -8,17 +8,17 @@
 
 namespace varnel {
 
-/// The bar above a pane: its title in the middle, and on the left the way back, named after the pane that it
-/// leads to. Where both do not fit, the title's letters get smaller, then the way back is the arrowhead
-/// alone, then the title is cut at its end and stands whole in its tooltip.
+/// The bar above a pane. Its title is in the middle. The back button on the left has the title of the pane to
+/// which it leads. When both do not fit, first the title gets smaller letters, then the back button loses its
+/// text, then the title is cut at its end. Its tooltip then shows all of it.
 class HeaderWidget final : public QWidget {
  public:
   explicit HeaderWidget(QWidget* parent = nullptr);
 
   void setTitle(const QString& title);
-  /// Whole, also where there is no room for all of it.
+  /// The whole title, even when there is no room for all of it.
   QString title() const { return _wholeTitle; }
-  /// Shows the way back to the pane of that title.
+  /// Shows the back button, which leads to the pane with this title.
   void showBackButton(const QString& parentTitle);
   /// Called when the user wants to go back.
   void setBackAction(std::function<void()> action) { _backAction = std::move(action); }

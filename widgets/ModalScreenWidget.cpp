@@ -21,7 +21,7 @@ auto widgetNamed(const Widgets& widgets, std::string_view outlet) {
   return found == widgets.end() ? nullptr : found->second;
 }
 
-// What the button is called that answers to the key; empty when none does.
+// The title of the button that answers to the key; empty when there is none.
 std::string_view titleForKey(const QKeyEvent& event) {
   if (event.matches(QKeySequence::Save)) return "Save";
   if (event.matches(QKeySequence::Cancel) || event.key() == Qt::Key_Back) return "Cancel";
@@ -114,7 +114,7 @@ void ModalScreenWidget::takeKeyboard() {
 }
 
 void ModalScreenWidget::keyPressEvent(QKeyEvent* event) {
-  // Whatever it is, it is not for the panes below.
+  // No key goes to the panes below.
   event->accept();
   const auto found = _actionsOfButtons.find(titleForKey(*event));
   if (found != _actionsOfButtons.end()) perform(std::string(found->second));

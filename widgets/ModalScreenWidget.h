@@ -13,9 +13,9 @@
 
 namespace varnel {
 
-/// A screen over the panes, made from a layout. Rows are no wider than reads well.
+/// A screen over the panes, made from a layout. Its rows are limited to a width that is easy to read.
 ///
-/// Buttons that are named after what a standard key does answer to it: "Save" to Ctrl+S, "Cancel" to Escape.
+/// A button whose title names a standard action answers to its key: "Save" to Ctrl+S, "Cancel" to Escape.
 class ModalScreenWidget final : public QWidget, public ModalScreen {
  public:
   ModalScreenWidget(const ScreenLayout& layout, Actions actions);
@@ -24,13 +24,13 @@ class ModalScreenWidget final : public QWidget, public ModalScreen {
   TableView* table(std::string_view outlet) override;
   TextField* textField(std::string_view outlet) override;
 
-  /// Comes over that widget, hidden yet.
+  /// Places the screen over this widget, hidden for now.
   void enter(QWidget& below);
-  /// Goes from it and calls no action any more.
+  /// Removes the screen from that widget. Its actions are not called any more.
   void leave();
-  /// What it tells above its rows.
+  /// The notice above its rows.
   NoticeWidget& notice() { return _notice; }
-  /// Gives the keyboard to the first field, else to the screen itself.
+  /// Gives the keyboard focus to the first text field, else to the screen itself.
   void takeKeyboard();
 
  protected:
@@ -49,7 +49,7 @@ class ModalScreenWidget final : public QWidget, public ModalScreen {
   std::string _backgroundAction;
   std::map<std::string, TableWidget*, std::less<>> _tables;           // by outlet
   std::map<std::string, TextFieldWidget*, std::less<>> _fields;       // by outlet
-  std::map<std::string, std::string, std::less<>> _actionsOfButtons;  // by the button's title
+  std::map<std::string, std::string, std::less<>> _actionsOfButtons;  // by the title of the button
 };
 
 }  // namespace varnel

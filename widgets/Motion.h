@@ -6,10 +6,10 @@
 
 namespace varnel {
 
-/// Whether a change of that widget is to be seen happening: only where the caller wants it, the user can see
-/// it, and the desktop has not turned animations off.
+/// Whether to animate a change of the widget: only if the caller wants it, the user can see the widget, and
+/// the desktop has not switched animations off.
 bool isShownHappening(const QWidget& widget, Animation animation);
-/// Whether the desktop wants things to move.
+/// Whether the desktop has animations switched on.
 bool desktopWantsMotion();
 
 }  // namespace varnel

@@ -7,18 +7,18 @@
 
 namespace varnel {
 
-/// The mouse's left button held down on a row of a table. Moved sideways, it drags along a row that can be
-/// scrolled. Let go without that, it chooses the row.
+/// The mouse's left button held down on a row of a table. A sideways movement drags a row that can be
+/// scrolled. Releasing the button without such a movement chooses the row.
 class MousePress final {
  public:
-  /// Positions are the viewport's.
+  /// Positions are in the viewport's coordinates.
   MousePress(const RowWidget& row, const QPointF& position)
       : _row(row.row()), _position(position), _sidewaysPosition(row.sidewaysPosition()) {}
 
-  /// Which of the table's rows it is on.
+  /// The index of the row in the table.
   std::size_t row() const { return _row; }
   bool isDrag() const { return _isDrag; }
-  /// Called with the widget that the row has by now.
+  /// `row` is the widget that currently shows the row.
   void moveTo(const QPointF& position, RowWidget& row);
 
  private:

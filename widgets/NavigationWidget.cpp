@@ -12,7 +12,7 @@ namespace varnel {
 
 namespace {
 
-// Panes and screens of this stack were made by the user interface that made the stack.
+// The user interface that made this stack made its panes and screens too.
 PaneWidget& paneOf(PaneController& controller) { return static_cast<PaneWidget&>(controller.pane()); }
 ModalScreenWidget& screenOf(ModalController& controller) {
   return static_cast<ModalScreenWidget&>(controller.screen());
@@ -40,7 +40,7 @@ NavigationWidget::NavigationWidget(std::shared_ptr<PaneController> root) {
 }
 
 NavigationWidget::~NavigationWidget() {
-  // Their widgets are not this one's to delete.
+  // Their widgets do not belong to this one.
   if (_modal) screenOf(*_modal).leave();
   for (const auto& controller : _controllers) release(*controller);
 }
@@ -163,7 +163,8 @@ void NavigationWidget::dismiss(Animation animation) {
   takeKeyboard();
 }
 
-// A button of what is leaving may be what brought this about: it goes when the event loop has the turn.
+// A button of the leaving object may have caused this call. So the object is released later, by the event
+// loop.
 void NavigationWidget::releaseLater(std::shared_ptr<void> leaving) {
   QTimer::singleShot(0, this, [leaving = std::move(leaving)] {});
 }

@@ -14,10 +14,10 @@
 
 namespace varnel {
 
-/// Panes one above the other. What it is asked for happens at once; an animation is a picture of it above.
+/// Panes on top of each other. Every change happens at once; an animation is a picture above it.
 ///
-/// Escape, Left, Backspace, the desktop's key for going back and the mouse's button for it go back. Ctrl+S
-/// presses the top pane's Save button.
+/// Escape, Left, Backspace, and the desktop's key and mouse button for going back go back. Ctrl+S presses the
+/// Save button of the top pane.
 class NavigationWidget final : public QWidget, public NavigationStack {
  public:
   explicit NavigationWidget(std::shared_ptr<PaneController> root);
@@ -33,12 +33,12 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   void present(std::shared_ptr<ModalController> controller, Animation animation) override;
   void dismiss(Animation animation) override;
 
-  /// The window becomes visible: the top pane appears, which the delegate is not told of.
+  /// The window becomes visible, and the top pane appears. The delegate is not told.
   void appear();
-  /// Gives the keyboard to what is on top.
+  /// Gives the keyboard focus to what is on top.
   void takeKeyboard();
   PaneWidget& topPane() const;
-  /// Null while none is presented.
+  /// Null while no screen is presented.
   ModalScreenWidget* modalScreen() const;
 
  protected:

@@ -16,10 +16,10 @@ namespace {
 constexpr double textSize = 13;
 constexpr int sideInset = 10;
 constexpr int upperInset = 6;
-// How much of the desktop's highlight colour is in the ground.
+// The share of the desktop's highlight color in the ground.
 constexpr double highlightShare = 0.15;
 
-// The text in lines of that width at most; paths are broken anywhere.
+// The text in lines of at most this width. Paths may be broken anywhere.
 std::unique_ptr<QTextLayout> layOut(const QString& text, int width) {
   QString broken = text;
   broken.replace(u'\n', QChar::LineSeparator);

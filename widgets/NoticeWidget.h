@@ -6,13 +6,13 @@
 
 namespace varnel {
 
-/// What there is to tell, over as many lines as it takes, on a ground of its own. It is hidden, and takes no
-/// room, while there is nothing. Screen readers are told of each change.
+/// The notice, over as many lines as it needs, on a ground of its own. It is hidden, and takes no room, while
+/// there is nothing to tell. Screen readers learn of each change.
 class NoticeWidget final : public QWidget {
  public:
   explicit NoticeWidget(QWidget* parent = nullptr);
 
-  /// Plain text, its lines with a newline between them.
+  /// Plain text with a newline between its lines.
   void setText(std::string_view text);
   const QString& text() const { return _text; }
 

@@ -10,10 +10,10 @@
 
 namespace varnel {
 
-/// A label that a row paints. The row paints itself anew only when something on the label has changed.
+/// A label that a row paints. The row repaints only when something on the label has changed.
 class PaintedLabel final : public Label {
  public:
-  /// The row outlives the label.
+  /// The row must outlive the label.
   explicit PaintedLabel(QWidget& row) : _row(row) {}
 
   void setFont(const Font& font) override;
@@ -23,9 +23,10 @@ class PaintedLabel final : public Label {
 
   const QRectF& frame() const { return _frame; }
   const QString& shownText() const { return _shownText; }
-  /// Where its letters end, which may be before its frame does; where they begin when it has none.
+  /// Where its letters end, which may be before the end of its frame. Without letters, where they would
+  /// begin.
   double endOfText() const;
-  /// Paints the text in the painter's pen.
+  /// Paints the text with the painter's pen.
   void paint(QPainter& painter) const;
 
  private:

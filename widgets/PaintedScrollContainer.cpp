@@ -10,15 +10,15 @@ namespace varnel {
 namespace {
 
 constexpr double barThickness = 2;
-constexpr double barInset = 10;  // at its ends
+constexpr double barInset = 10;  // at both ends
 constexpr double barBottom = 4;  // between the bar and the container's edge
 constexpr double shortestBar = 24;
 
-// Where texts go on past an edge.
+// For a text that goes on past an edge.
 constexpr double fadeWidth = 14;
 constexpr double dotsWidth = 24;
 constexpr double dotRadius = 1.5;
-constexpr double firstDot = 6;  // from the edge to its middle, and from one dot's to the next one's
+constexpr double firstDot = 6;  // from the edge to its middle, and from there to the middle of the next dot
 constexpr int dots = 3;
 
 }  // namespace
@@ -88,7 +88,7 @@ void PaintedScrollContainer::paintMore(QPainter& painter, Edge edge, const Colou
   painter.save();
   painter.setRenderHint(QPainter::Antialiasing);
   painter.setPen(Qt::NoPen);
-  // From here on x is the distance from the edge.
+  // From here on, x is the distance from the edge.
   painter.translate(edge == Edge::Left ? _frame.x : _frame.x + _frame.width, _frame.y);
   if (edge == Edge::Right) painter.scale(-1, 1);
   QLinearGradient fade(dotsWidth, 0, dotsWidth + fadeWidth, 0);

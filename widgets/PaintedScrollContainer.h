@@ -10,18 +10,17 @@
 
 namespace varnel {
 
-/// A part of a row that scrolls sideways. The row paints it; the table tells it where fingers, wheels and
-/// keys move it.
+/// A part of a row that scrolls sideways. The row paints it. The table scrolls it by touch, wheel, and keys.
 class PaintedScrollContainer final : public ScrollContainer {
  public:
-  /// What is painted beside the texts.
+  /// The colors around the texts.
   struct Colours {
-    QColor ground;  ///< what the row is painted on
+    QColor ground;  ///< the background of the row
     QColor bar;
     QColor mark;
   };
 
-  /// The row outlives the container.
+  /// The row must outlive the container.
   explicit PaintedScrollContainer(QWidget& row) : _row(row) {}
 
   Label& addLabel() override;
@@ -29,17 +28,17 @@ class PaintedScrollContainer final : public ScrollContainer {
   void setContentSize(const Size& size) override;
 
   const std::vector<std::unique_ptr<PaintedLabel>>& labels() const { return _labels; }
-  /// How far to the right labels reach.
+  /// How far the labels reach to the right.
   double endOfLabels() const;
   /// How far it can be scrolled; 0 when its content fits.
   double range() const;
   double position() const { return _position; }
-  /// Scrolls to the nearest position that there is.
+  /// Scrolls to the nearest possible position.
   void scrollTo(double position);
-  /// False when all of its texts can be seen at once.
+  /// False when all of its texts are visible at the same time.
   bool hasMoreThanFits() const;
-  /// Paints labels in the painter's pen, and while there is something to scroll a thin bar below them. Where
-  /// texts go on past an edge, they fade out there before three dots.
+  /// Paints the labels with the painter's pen. If it can be scrolled, also paints a thin bar below them.
+  /// Texts that go on past an edge fade out there before three dots.
   void paint(QPainter& painter, const Colours& colours) const;
 
  private:

@@ -12,7 +12,7 @@
 
 namespace varnel {
 
-/// What a navigation stack shows at a time: title bar, notice, table, toolbar.
+/// One pane of a navigation stack: title bar, notice, table, and toolbar.
 class PaneWidget final : public QWidget, public TablePane {
  public:
   PaneWidget();
@@ -26,9 +26,9 @@ class PaneWidget final : public QWidget, public TablePane {
   HeaderWidget& header() { return _header; }
   ToolbarWidget& toolbar() { return _toolbar; }
   NoticeWidget& notice() { return _notice; }
-  /// Called when the title has changed.
+  /// The observer is called when the title has changed.
   void setTitleObserver(std::function<void()> observer) { _titleObserver = std::move(observer); }
-  /// Calls nobody from now on.
+  /// Makes no more calls from now on.
   void fallSilent();
 
  private:

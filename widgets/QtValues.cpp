@@ -17,7 +17,8 @@ QString singleLine(std::string_view text) {
 }
 
 QString plainTooltip(const QString& text) {
-  // Lines are wrapped at blanks alone. What has none for long may be wrapped there as well.
+  // The toolkit wraps lines only at blanks. After this many characters without one, a line may be wrapped
+  // too.
   constexpr qsizetype longestWord = 40;
   constexpr QChar zeroWidthSpace(0x200B);
   QString wrappable;

@@ -11,12 +11,12 @@
 
 namespace varnel {
 
-/// The text as it is shown on one line: what would break or bend the line (line ends, tabs, other control
-/// characters) is a blank. Bytes that are no UTF-8 become replacement characters.
+/// The text as it is shown on one line. Line ends, tabs, and other control characters become blanks. Bytes
+/// that are not UTF-8 become replacement characters.
 QString singleLine(std::string_view text);
 std::string utf8(const QString& text);
 
-/// A tooltip that shows the text character by character as it is, in as many lines as it needs.
+/// A tooltip that shows every character of the text as it is, in as many lines as needed.
 QString plainTooltip(const QString& text);
 
 QFont qtFont(const Font& font);

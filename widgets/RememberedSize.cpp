@@ -17,9 +17,10 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr const char* fileName = "window-size";
-constexpr int largestSide = 32767;  // of a window in X11
+constexpr int largestSide = 32767;  // the largest window side in X11
 
-// Takes the number off the front of the text; nothing when it does not begin with that of a window's side.
+// Takes a number from the front of the text; nothing when the text does not begin with a possible side of a
+// window.
 std::optional<int> takeSide(std::string_view& text) {
   int side = 0;
   const auto [end, failure] = std::from_chars(text.data(), text.data() + text.size(), side);
@@ -40,7 +41,7 @@ void makeFolder(const fs::path& folder, std::error_code& failure) {
   if (fs::create_directories(folder, failure)) fs::permissions(folder, fs::perms::owner_all, failure);
 }
 
-// What went wrong; nothing when the text is on disk.
+// What went wrong; nothing when the text is on the disk.
 std::optional<std::string> write(const fs::path& file, const std::string& text) {
   std::error_code failure;
   makeFolder(file.parent_path(), failure);

@@ -6,16 +6,15 @@
 
 namespace varnel {
 
-/// The size that the window had at the end of the last run, kept in a file of its own ("480 800", logical
-/// pixels).
+/// The size that the window had at the end of the last run, in its own file ("480 800", logical pixels).
 class RememberedSize final {
  public:
-  /// The folder is made when something is kept. Without one nothing is remembered.
+  /// The folder is made when a size is kept. Without a folder nothing is remembered.
   explicit RememberedSize(std::optional<std::filesystem::path> folder = std::nullopt);
 
-  /// Nothing when none is kept, or when what is there is no window's size.
+  /// Nothing when no size is kept, or when the file holds no possible size of a window.
   std::optional<QSize> size() const;
-  /// Keeps that size in place of the former. A failure is logged.
+  /// Replaces the kept size. A failure writes a log line.
   void keep(const QSize& size) const;
 
  private:

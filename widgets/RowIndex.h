@@ -7,14 +7,15 @@
 
 namespace varnel {
 
-/// How many rows the sections of a table have, and where a row stands when all are counted through.
+/// The number of rows in each section of a table, and the place of a row when the rows of all sections are
+/// counted.
 class RowIndex {
  public:
   RowIndex() = default;
   explicit RowIndex(std::vector<std::size_t> rowsOfSections);
 
   std::size_t rows() const { return _rows; }
-  /// The row is less than `rows`.
+  /// `row` must be less than `rows`.
   IndexPath pathOf(std::size_t row) const;
 
   friend bool operator==(const RowIndex&, const RowIndex&) = default;

@@ -28,7 +28,7 @@ void stroke(QPainter& painter, const QColor& colour, const QPainterPath& path) {
   painter.restore();
 }
 
-// Both marks are drawn around the middle of the room that they have.
+// Both marks are drawn around the middle of their room.
 QPainterPath disclosureIndicator(const QPointF& middle) {
   QPainterPath path(middle + QPointF(-3, -6));
   path.lineTo(middle + QPointF(3, 0));
@@ -48,7 +48,7 @@ QPainterPath checkmark(const QPointF& middle) {
 RowWidget::RowWidget(CellStyle style, QWidget& parent) : QWidget(&parent), _labels(*this) {
   setAttribute(Qt::WA_TransparentForMouseEvents);
   setAttribute(Qt::WA_OpaquePaintEvent);
-  // The built-in name of that style is heavier than a plain text.
+  // The built-in name of this style is heavier than plain text.
   setTextFont(style == CellStyle::NameAndDetail ? Font::boldSystem(builtInTextSize)
                                                 : Font::system(builtInTextSize));
 }

@@ -11,11 +11,11 @@
 
 namespace varnel {
 
-/// A row of a table: a cell's part on the screen. It paints all that stands on it, so that a row costs one
-/// widget, and leaves mouse and touch to the table.
+/// A row of a table: the visible part of a cell. It paints everything on it, so that a row costs only one
+/// widget. The table handles mouse and touch.
 class RowWidget final : public QWidget, public CellView {
  public:
-  /// How the row stands out among the others.
+  /// How the row differs from other rows.
   struct Emphasis {
     bool isSelected = false;
     bool hasFocusFrame = false;
@@ -23,7 +23,7 @@ class RowWidget final : public QWidget, public CellView {
     friend bool operator==(const Emphasis&, const Emphasis&) = default;
   };
 
-  /// The parent is a table's viewport, as wide as the rows are.
+  /// The parent is the viewport of a table, which is as wide as its rows.
   RowWidget(CellStyle style, QWidget& parent);
 
   void layOut() override;
@@ -34,25 +34,26 @@ class RowWidget final : public QWidget, public CellView {
   void setText(std::string_view text) override;
   void setTextFont(const Font& font) override;
 
-  /// Which of the table's rows it shows.
+  /// The index of the row in the table.
   std::size_t row() const { return _row; }
-  /// A row that comes to show another than it did begins at its left end.
+  /// When the index changes, the row scrolls back to its left end.
   void setRow(std::size_t row);
   void setEmphasis(const Emphasis& emphasis);
   const Emphasis& emphasis() const { return _emphasis; }
-  /// To be called when the cell has been laid out: labels that reach past the content area can be scrolled.
+  /// Call this after the cell was laid out: labels that reach past the content area can be scrolled.
   void fitLabels();
-  /// What a screen reader reads: "name: value".
+  /// The text for a screen reader: "name: value".
   QString description() const;
-  /// What the row is called: the first of its texts.
+  /// The first of the row's texts.
   QString name() const;
-  /// True when a part of its text cannot be seen where the row begins, so that it has to be scrolled, or is
-  /// cut.
+  /// True when a part of its text is not visible while the row is at its left end. That text has to be
+  /// scrolled, or is cut.
   bool reachesPastItsEdge() const;
-  /// Shows all of a text that the row is too short for, beside the mouse; takes away any tooltip otherwise.
+  /// If the row is too short for a text, shows all of the text in a tooltip beside the mouse; else hides the
+  /// tooltip.
   void showTooltip(const QPoint& globalPosition) const;
 
-  /// How far it can be scrolled sideways; 0 when everything fits.
+  /// How far the row can be scrolled sideways; 0 when everything fits.
   double sidewaysRange() const;
   double sidewaysPosition() const;
   void scrollSidewaysTo(double position);

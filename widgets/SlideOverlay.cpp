@@ -7,7 +7,7 @@ namespace varnel {
 namespace {
 
 constexpr int duration_ms = 180;
-// How much of the upper picture's way the lower one goes.
+// How far the lower picture moves, as a share of the upper one's way.
 constexpr double lowerShare = 0.3;
 
 bool bringsNewOneAbove(SlideOverlay::Movement movement) {
@@ -30,7 +30,7 @@ SlideOverlay::SlideOverlay(const QPixmap& former, const QPixmap& next, Movement 
   setGeometry(parent.rect());
   connect(&_animation, &QVariantAnimation::valueChanged, this, [this] { update(); });
   connect(&_animation, &QVariantAnimation::finished, this, &QObject::deleteLater);
-  // From where the upper picture stands at first to where it ends, as shares of the way.
+  // Where the upper picture starts and where it ends, as shares of its way.
   _animation.setStartValue(bringsNewOneAbove(movement) ? 1.0 : 0.0);
   _animation.setEndValue(bringsNewOneAbove(movement) ? 0.0 : 1.0);
   _animation.setEasingCurve(QEasingCurve::OutCubic);

@@ -6,18 +6,18 @@
 
 namespace varnel {
 
-/// One picture making way for another, above what is already there. It takes no input, and deletes itself
-/// when the movement is over.
+/// An animation of two pictures, of which one replaces the other, above the real content. It takes no input,
+/// and deletes itself at the end.
 class SlideOverlay final : public QWidget {
  public:
   enum class Movement {
-    Forth,  ///< the new one comes in from the right
-    Back,   ///< the old one leaves to the right
-    Rise,   ///< the new one comes up from below
-    Sink,   ///< the old one goes down
+    Forth,  ///< the new picture comes in from the right
+    Back,   ///< the old picture leaves to the right
+    Rise,   ///< the new picture comes up from below
+    Sink,   ///< the old picture goes down
   };
 
-  /// As large as the parent.
+  /// It covers the whole parent.
   SlideOverlay(const QPixmap& former, const QPixmap& next, Movement movement, QWidget& parent);
 
  protected:

@@ -11,8 +11,8 @@ namespace {
 
 constexpr int side = 20;
 constexpr int spokes = 12;
-constexpr std::chrono::milliseconds fastStep(83);  // a turn a second
-// Whoever waits longer is told why, and the wheel need not wake the machine so often.
+constexpr std::chrono::milliseconds fastStep(83);  // one turn per second
+// After this, the notice says why it takes so long, and the wheel need not wake the machine so often.
 constexpr int stepsAtFullSpeed = 3 * spokes;
 constexpr std::chrono::milliseconds slowStep(500);
 
@@ -40,7 +40,7 @@ void SpinnerWidget::paintEvent(QPaintEvent*) {
   painter.rotate(360.0 / spokes * _step);
   QColor colour = palette().color(QPalette::WindowText);
   for (int spoke = 0; spoke < spokes; ++spoke) {
-    // The foremost spoke is the darkest of the greys.
+    // The foremost spoke is the darkest gray.
     colour.setAlphaF(0.15F + 0.5F * static_cast<float>(spoke) / (spokes - 1));
     painter.setPen(QPen(colour, 2, Qt::SolidLine, Qt::RoundCap));
     painter.rotate(360.0 / spokes);

@@ -6,14 +6,14 @@
 
 namespace varnel {
 
-/// A small grey wheel that turns while it is on: for three seconds once a second, then two pictures a second.
-/// Hidden while it is off.
+/// A small gray wheel that turns while it is on: one turn per second for three seconds, then two pictures per
+/// second. It is hidden while it is off.
 class SpinnerWidget final : public QWidget {
  public:
   explicit SpinnerWidget(QWidget* parent = nullptr);
   void setAnimating(bool isAnimating);
   QSize sizeHint() const override;
-  /// How long each picture stands.
+  /// How long each picture is shown.
   std::chrono::milliseconds timeOfPicture() const;
 
  protected:
@@ -26,7 +26,7 @@ class SpinnerWidget final : public QWidget {
   void turn();
 
   QBasicTimer _timer;
-  int _step = 0;  // since it was shown
+  int _step = 0;  // since the wheel was shown
 };
 
 }  // namespace varnel

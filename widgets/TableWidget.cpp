@@ -15,12 +15,12 @@ namespace varnel {
 namespace {
 
 constexpr int rowHeight = static_cast<int>(tableRowHeight);
-constexpr double sidewaysStep = 60;  // of a key, logical pixels
+constexpr double sidewaysStep = 60;  // of an arrow key, logical pixels
 
-// Every cell's view was made by `makeCellView`.
+// `makeCellView` made the view of every cell.
 RowWidget& rowOf(const TableCell& cell) { return static_cast<RowWidget&>(cell.cellView()); }
 
-// How far a wheel has turned sideways, in logical pixels; 0 when it has turned up or down.
+// How far the wheel has turned sideways, in logical pixels; 0 when it has turned up or down.
 double sidewaysMovement(const QWheelEvent& event) {
   const QPoint turned = event.pixelDelta().isNull() ? event.angleDelta() / 2 : event.pixelDelta();
   if (std::abs(turned.x()) > std::abs(turned.y())) return turned.x();
@@ -67,8 +67,8 @@ void TableWidget::load() {
   if (rows == Rows::Changed) forgetCells();
   updateScrollRange();
   updateVisibleRows();
-  // Cells that no row has come back to go. Kept for later, they would come before the rows' own at the next
-  // reload.
+  // Drops the cells that no row has taken back. If they were kept, they would come before the rows' own cells
+  // at the next reload.
   _reloaded = CellPool();
   if (rows == Rows::Same && haveOtherNames(formerNames)) {
     rows = Rows::Changed;
@@ -80,7 +80,7 @@ void TableWidget::load() {
   showEmphasis();
 }
 
-// What the user does with a row goes on in its new cell.
+// Gives new cells the sideways positions of the old ones, and tells screen readers about the current row.
 void TableWidget::settleNewCells(const std::map<QString, double>& sidewaysPositions) {
   for (RowWidget* row : visibleRows()) {
     const auto found = sidewaysPositions.find(row->name());
@@ -100,7 +100,7 @@ std::map<std::size_t, QString> TableWidget::namesOfVisibleRows() const {
   return names;
 }
 
-// Of the rows that have been scrolled sideways.
+// The positions of the rows that have been scrolled sideways.
 std::map<QString, double> TableWidget::sidewaysPositionsByName() const {
   std::map<QString, double> positions;
   for (const RowWidget* row : visibleRows()) {
@@ -176,7 +176,7 @@ void TableWidget::putAwayRowsOutside(std::size_t begin, std::size_t end) {
   }
 }
 
-// They stay on the screen, where most rows come back to them.
+// The widgets stay on the screen, since most rows take them back.
 void TableWidget::putAwayAllRows() {
   for (auto& [row, cell] : _visible) _reloaded.put(std::move(cell));
   _visible.clear();
@@ -261,7 +261,7 @@ void TableWidget::showTooltip(const QHelpEvent& event) {
 void TableWidget::keyPressEvent(QKeyEvent* event) {
   _keysAreUsed = true;
   if (event->modifiers().testFlag(Qt::ShiftModifier) && scrollCurrentRowSideways(event->key())) return;
-  // Others, with their meaning for scroll bars, are for whom the table stands in.
+  // The widget around the table handles keys with other modifiers.
   if ((event->modifiers() & ~Qt::KeypadModifier) != Qt::NoModifier) return event->ignore();
   switch (event->key()) {
     case Qt::Key_Return:
@@ -291,8 +291,8 @@ std::optional<std::size_t> TableWidget::rowThatKeyLeadsTo(int key) const {
   return key == Qt::Key_Up ? *_current - std::min<std::size_t>(*_current, 1) : std::min(last, *_current + 1);
 }
 
-// The whole table moves by a page, and the current row with it: it keeps its place on the screen. Where the
-// table is at its end, the row still goes there.
+// The whole table moves by a page. The current row moves too and keeps its place on the screen, unless the
+// table reaches its end.
 void TableWidget::turnPage(int key) {
   if (_rows.rows() == 0) return;
   const std::size_t last = _rows.rows() - 1;
@@ -345,7 +345,7 @@ void TableWidget::makeCurrent(std::size_t row) {
   tellOfFocusOn(row);
 }
 
-// Screen readers read that row out.
+// Screen readers then read the row aloud.
 void TableWidget::tellOfFocusOn(std::size_t row) const {
   RowWidget* widget = visibleRow(row);
   if (!widget || !hasFocus()) return;

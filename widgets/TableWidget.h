@@ -15,13 +15,14 @@
 
 namespace varnel {
 
-/// A table that has widgets for its visible rows only.
+/// A table that has widgets only for its visible rows.
 ///
-/// A reload hands each row its own cell, as long as there are the same rows: as many, and the visible ones of
-/// the same names. When there are others, every cell is made anew.
+/// A reload gives each row its own cell back, as long as the rows stay the same: the same number, and the
+/// same names of the visible ones. Otherwise it makes every cell again.
 ///
-/// One row is the current one: arrow keys go on from it. It is selected as well until it is deselected.
-/// Choosing a row (click, tap, Return, Enter, Space, Right) makes it the current one and tells the delegate.
+/// One row is the current row, from which the arrow keys go on. It is also selected until it is deselected.
+/// Choosing a row (by a click, a tap, Return, Enter, Space, or Right) makes it the current row and tells the
+/// delegate.
 class TableWidget final : public QAbstractScrollArea, public TableView {
  public:
   explicit TableWidget(QWidget* parent = nullptr);
@@ -34,10 +35,10 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   void deselectRow(const IndexPath& path, Animation animation) override;
   void sizeToFit() override;
 
-  /// Keeps what it shows, but calls nobody from now on.
+  /// Keeps what it shows, but makes no more calls.
   void fallSilent() { _delegate = nullptr; }
 
-  /// The rows on the screen, top first.
+  /// The rows on the screen, from top to bottom.
   std::vector<RowWidget*> visibleRows() const;
   void chooseRow(std::size_t row);
 
@@ -96,7 +97,7 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   CellPool _pool;
   std::optional<std::size_t> _current;
   bool _currentIsSelected = false;
-  bool _keysAreUsed = false;  // rather than mouse or finger: the current row gets a frame
+  bool _keysAreUsed = false;  // keys were used last, not mouse or touch: the current row gets a frame
   std::optional<MousePress> _press;
   TouchScrolling _touch;
 };

@@ -59,7 +59,7 @@ void TextButton::paintMark(QPainter& painter) const {
 
 void TextButton::keyPressEvent(QKeyEvent* event) {
   if (event->key() == Qt::Key_Return || event->key() == Qt::Key_Enter) return click();
-  // Arrow keys would wander to other buttons; they have a meaning of their own here.
+  // By default, arrow keys would move to other buttons. Here they have another meaning.
   if (event->key() == Qt::Key_Space) return QAbstractButton::keyPressEvent(event);
   event->ignore();
 }

@@ -4,17 +4,17 @@
 
 namespace varnel {
 
-/// A button that is a text in the accent colour, large enough for a finger.
+/// A button that is a text in the accent color, large enough for a finger.
 class TextButton final : public QAbstractButton {
  public:
   enum class Mark {
     None,
-    Back,  ///< an arrowhead before the text
+    Back,  ///< with an arrowhead before the text
   };
 
   explicit TextButton(Mark mark = Mark::None, QWidget* parent = nullptr);
   QSize sizeHint() const override;
-  /// Only wide enough for its mark; the text is cut where there is no more room.
+  /// Wide enough for its mark only. The text is cut when there is no more room.
   QSize minimumSizeHint() const override;
 
  protected:

@@ -25,7 +25,7 @@ TextFieldWidget::TextFieldWidget(const QString& title) {
 std::optional<std::string> TextFieldWidget::text() const { return utf8(QLineEdit::text()); }
 
 void TextFieldWidget::resignFirstResponder() {
-  // The screen around it goes on hearing the keys.
+  // The screen around the field keeps getting keys.
   if (hasFocus()) parentWidget()->setFocus(Qt::OtherFocusReason);
 }
 

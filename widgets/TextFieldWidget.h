@@ -9,7 +9,7 @@ namespace varnel {
 /// A line that the user may edit.
 class TextFieldWidget final : public QLineEdit, public TextField {
  public:
-  /// The title shows while nothing is typed.
+  /// The title is shown while the field is empty.
   explicit TextFieldWidget(const QString& title);
 
   void setDelegate(TextFieldDelegate* delegate) override { _delegate = delegate; }

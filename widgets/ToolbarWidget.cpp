@@ -20,7 +20,7 @@ constexpr int inset = 10;
 QLabel* makeLabel() {
   auto* label = new QLabel;
   label->setTextFormat(Qt::PlainText);
-  // A window that is narrower than the text may be.
+  // Lets the window be narrower than the text.
   label->setMinimumWidth(1);
   return label;
 }
@@ -68,7 +68,7 @@ ToolbarWidget::ToolbarWidget(QWidget* parent) : QWidget(parent), _row(this) {
 
 void ToolbarWidget::setItems(std::vector<ToolbarItem> items) {
   const bool isSame = hasSameKinds(items);
-  // Kept until the end: the action that runs may be one of those that go.
+  // Keeps the old items until the end: the running action may belong to one of them.
   const auto former = std::exchange(_items, std::move(items));
   if (!isSame) rebuild(_items);
   for (std::size_t index = 0; index < _items.size(); ++index) showItem(index);

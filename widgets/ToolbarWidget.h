@@ -9,13 +9,13 @@
 
 namespace varnel {
 
-/// The bar below a pane. Items of the same kinds as before change the widgets that are there.
+/// The bar below a pane. New items of the same kinds reuse the widgets.
 class ToolbarWidget final : public QWidget {
  public:
   explicit ToolbarWidget(QWidget* parent = nullptr);
 
   void setItems(std::vector<ToolbarItem> items);
-  /// Does what the button of that kind does; false when there is none.
+  /// Does what the button of this kind does; false when there is no such button.
   bool press(BarButton::SystemItem item);
   /// Calls no action from now on.
   void fallSilent();
@@ -31,7 +31,7 @@ class ToolbarWidget final : public QWidget {
 
   QHBoxLayout _row;
   std::vector<ToolbarItem> _items;
-  std::vector<QWidget*> _widgets;  // one an item; null for spaces
+  std::vector<QWidget*> _widgets;  // one per item; null for spaces
 };
 
 }  // namespace varnel

@@ -12,11 +12,11 @@ namespace varnel {
 
 namespace {
 
-// A finger that moves mostly along one axis moves along that one only.
+// A finger that moves mostly along one axis scrolls only along that axis.
 constexpr double axisLock = 0.75;
 
-// The scroller hears of the finger from here: the gesture recogniser that the toolkit would set up for each
-// table is never freed.
+// Passes touches to the scroller directly. The toolkit would set up a gesture recognizer per table, and never
+// free it.
 void tell(QWidget& viewport, QScroller::Input input, const QTouchEvent& event) {
   if (event.points().isEmpty()) return;
   const auto time_ms = static_cast<qint64>(event.timestamp());
@@ -84,7 +84,7 @@ void TouchScrolling::scroll(QScrollEvent& event) {
 }
 
 void TouchScrolling::begin(QTouchEvent& event) {
-  // Accepted: no mouse is made of it.
+  // Accepted, so that the toolkit makes no mouse event from it.
   event.accept();
   const bool stopsMovement = QScroller::scroller(_area.viewport())->state() == QScroller::Scrolling;
   _tapBegan.reset();

@@ -14,16 +14,16 @@ class QTouchEvent;
 
 namespace varnel {
 
-/// A finger on a table: up and down it moves the table, sideways the row that it is on, and a tap chooses a
+/// A finger on a table. Up and down it moves the table; sideways it moves the row below it; a tap chooses a
 /// row.
 class TouchScrolling final {
  public:
   using RowAt = std::function<RowWidget*(const QPoint& position)>;
   using Tapped = std::function<void(const QPoint& position)>;
 
-  /// The area outlives the object. Positions are the viewport's.
+  /// The area must outlive this object. Positions are in the viewport's coordinates.
   TouchScrolling(QAbstractScrollArea& area, RowAt rowAt, Tapped tapped);
-  /// Takes an event of the viewport; false when the event is none of touch.
+  /// Handles an event of the viewport; false when it is no touch event.
   bool take(QEvent& event);
 
  private:
@@ -35,8 +35,8 @@ class TouchScrolling final {
   QAbstractScrollArea& _area;
   RowAt _rowAt;
   Tapped _tapped;
-  QPointer<RowWidget> _row;          // under the finger
-  std::optional<QPointF> _tapBegan;  // while it may still become a tap
+  QPointer<RowWidget> _row;          // the row under the finger
+  std::optional<QPointF> _tapBegan;  // set while the touch may still become a tap
 };
 
 }  // namespace varnel

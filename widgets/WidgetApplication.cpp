@@ -17,7 +17,7 @@ namespace varnel {
 
 namespace {
 
-// While the application object is made. Without it the toolkit would say several lines and abort.
+// Used while the application object is made. Without it the toolkit would write several lines and abort.
 void endInsteadOfAborting(QtMsgType type, const QMessageLogContext&, const QString&) {
   if (type != QtFatalMsg) return;
   std::cerr << program_invocation_short_name << ": cannot open a window on " << wantedDisplay()
@@ -32,7 +32,7 @@ std::unique_ptr<QApplication> makeApplication(int& argumentCount, char** argumen
   if (!displayIsThere())
     throw std::runtime_error("cannot reach " + wantedDisplay() + "; --ui text needs no display");
   const QtMessageHandler formerHandler = qInstallMessageHandler(endInsteadOfAborting);
-  // The toolkit's threads are to leave signals to this one.
+  // The toolkit's threads must leave signals to this thread.
   sigset_t everySignal;
   sigset_t formerMask;
   ::sigfillset(&everySignal);
@@ -51,7 +51,7 @@ WidgetApplication::WidgetApplication(int& argumentCount, char** arguments)
   QApplication::setQuitOnLastWindowClosed(false);
   if (const auto bus = sessionBusAddress()) _colours = std::make_unique<DesktopColours>(*bus);
   QApplication::setApplicationDisplayName(QStringLiteral("Varnel"));
-  // By its identity a desktop finds the menu entry and the icon that were installed.
+  // The desktop finds the installed menu entry and icon by this identity.
   const QString applicationID = QStringLiteral("org.varnel.Varnel");
   QGuiApplication::setDesktopFileName(applicationID);
   QApplication::setWindowIcon(QIcon::fromTheme(applicationID));
@@ -60,7 +60,7 @@ WidgetApplication::WidgetApplication(int& argumentCount, char** arguments)
 int WidgetApplication::run() { return QApplication::exec(); }
 
 void WidgetApplication::end(int exitStatus) {
-  // Queued: an end that is asked for before the event loop runs counts as well.
+  // The call is queued, so an end that is requested before the event loop runs counts too.
   QMetaObject::invokeMethod(
       _application.get(), [exitStatus] { QApplication::exit(exitStatus); }, Qt::QueuedConnection);
 }

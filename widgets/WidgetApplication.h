@@ -7,18 +7,18 @@
 
 namespace varnel {
 
-/// The event loop of a program with windows. Numbers keep the form that they have in C, whatever the user's
-/// locale. The program goes on when its last window is closed.
+/// The event loop of a program with windows. Numbers keep their form in C, in every locale. The program goes
+/// on when its last window is closed.
 class WidgetApplication final {
  public:
-  /// The arguments are those of main and must outlive the object. Throws std::runtime_error when there is no
-  /// display. When the display that is there cannot be used, the program ends with one line on standard error
-  /// and exit status 1: the toolkit leaves no other way.
+  /// The arguments of main, which must outlive the object. Throws std::runtime_error when there is no
+  /// display. If the toolkit cannot use the display, the program ends with one line on standard error and
+  /// exit status 1: the toolkit allows nothing else.
   WidgetApplication(int& argumentCount, char** arguments);
 
   /// Runs the event loop until `end` is called; returns the exit status given there.
   int run();
-  /// Has the event loop return as soon as it has the turn.
+  /// Makes the event loop return as soon as it gets control.
   void end(int exitStatus);
 
  private:

@@ -14,7 +14,7 @@ namespace varnel {
 
 namespace {
 
-// A desktop may be without any screen for a while.
+// A desktop can be without any screen for a while.
 constexpr QRect roomWithoutAScreen(0, 0, 800, 900);
 
 QRect availableRoom() {
@@ -70,7 +70,7 @@ void WidgetUserInterface::showAlert(const Alert& alert) {
     logError("There is no window for an alert: %s", alert.message);
     return;
   }
-  // The window deletes it, unless the user closes it before.
+  // The window deletes it, unless the user closes it first.
   new AlertWidget(alert, *_window, [window = _window] {
     if (window) window->takeKeyboard();
   });

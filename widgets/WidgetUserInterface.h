@@ -12,7 +12,7 @@ namespace varnel {
 /// The user interface on Qt 6 Widgets. It needs a `WidgetApplication`.
 class WidgetUserInterface final : public UserInterface {
  public:
-  /// The wishes are those of every window that it makes.
+  /// The wishes apply to every window that it makes.
   explicit WidgetUserInterface(WindowWidget::Wishes wishes, RememberedSize lastSize = RememberedSize());
 
   Rect screenBounds() const override;
@@ -31,7 +31,7 @@ class WidgetUserInterface final : public UserInterface {
   WindowWidget::Wishes _wishes;
   RememberedSize _lastSize;
   FontMetrics _textMetrics;
-  QPointer<WindowWidget> _window;  // the one made last
+  QPointer<WindowWidget> _window;  // the newest window
 };
 
 }  // namespace varnel

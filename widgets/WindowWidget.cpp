@@ -63,12 +63,12 @@ void WindowWidget::resizeEvent(QResizeEvent* event) {
 
 void WindowWidget::keyPressEvent(QKeyEvent* event) {
   if (isControlAnd(Qt::Key_R, *event) && _wishes.startOver) return _wishes.startOver();
-  // Not every desktop has a key for quitting of its own.
+  // Not every desktop has its own key for quitting.
   if (event->matches(QKeySequence::Quit) || isControlAnd(Qt::Key_Q, *event)) {
     close();
     return;
   }
-  // A key that nobody had the keyboard for: from now on somebody has.
+  // No widget had the keyboard focus for this key. From now on one has it.
   if (!focusWidget()) takeKeyboard();
   event->ignore();
 }

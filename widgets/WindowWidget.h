@@ -13,13 +13,13 @@ namespace varnel {
 /// The application's window. Ctrl+R starts over, Ctrl+Q closes the window.
 class WindowWidget final : public QWidget, public Window {
  public:
-  /// What the user may want of the application itself.
+  /// What the user may want from the application itself.
   struct Wishes {
     std::function<void()> close{};
     std::function<void()> startOver{};
   };
 
-  /// As large as the frame. Where it stands, the desktop decides.
+  /// As large as the frame. The desktop decides where it is.
   WindowWidget(const Rect& frame, Wishes wishes);
   ~WindowWidget() override;
 
@@ -28,12 +28,12 @@ class WindowWidget final : public QWidget, public Window {
   void setTitle(std::string_view title) override;
   void hide() override { QWidget::hide(); }
 
-  /// Called when the window is taken off the screen, with the size that it has while it is neither maximized
-  /// nor full-screen.
+  /// The observer is called when the window is removed from the screen. It gets the size that the window has
+  /// when it is neither maximized nor full-screen.
   void setLeavingObserver(std::function<void(const QSize&)> observer) {
     _leavingObserver = std::move(observer);
   }
-  /// Gives the keyboard to what is on top.
+  /// Gives the keyboard focus to what is on top.
   void takeKeyboard();
 
  protected:
