@@ -7,11 +7,17 @@
 
 namespace varnel {
 
-/// A program that must be on this machine, by the folders where Debian keeps them. The test fails without it.
-inline std::string tool(const std::string& name) {
+/// Where Debian keeps a program; empty when it is not on this machine.
+inline std::string installedTool(const std::string& name) {
   for (const char* folder : {"/usr/bin/", "/usr/local/bin/"}) {
     if (std::filesystem::exists(folder + name)) return folder + name;
   }
+  return {};
+}
+
+/// A program that must be on this machine. The test fails without it.
+inline std::string tool(const std::string& name) {
+  if (const std::string path = installedTool(name); !path.empty()) return path;
   ADD_FAILURE() << name << " is missing; ./dev setup installs it";
   return "/bin/false";
 }
