@@ -4,8 +4,8 @@
 
 namespace varnel {
 
-/// The clock of a capture: it shows the moment that is being played back, and 1970 before the first one. Its
-/// zone is UTC, without daylight time.
+/// The clock of a capture. It shows the moment that is being played back, and 1970 before the first record.
+/// Its zone is UTC, without daylight saving time.
 class CaptureClock final : public Clock {
  public:
   Time now() const override { return _now; }

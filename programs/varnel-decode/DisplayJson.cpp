@@ -17,7 +17,7 @@ class DisplayReader {
  public:
   DisplayReader(ValuesAs valuesAs, const NumberFormats& formats) : _valuesAs(valuesAs), _formats(formats) {}
 
-  // Nothing for what is absent.
+  // Nothing for a value that is absent.
   std::optional<JsonValue> read(const VarnelModelNode& node) {
     const auto* tree = dynamic_cast<const VarnelModelTreeNode*>(&node);
     if (!tree) return readLeaf(*node.value());
@@ -47,7 +47,7 @@ class DisplayReader {
     return object;
   }
 
-  // What is absent keeps its place.
+  // An absent value keeps its place in the list.
   JsonValue readList(const VarnelModelTreeNode& list) {
     std::string json;
     for (const auto& child : *list.childNodes()) {
@@ -81,8 +81,8 @@ class DisplayReader {
 
   const ValuesAs _valuesAs;
   const NumberFormats& _formats;
-  std::vector<std::string> _path;  // names from the display to where the reader is
-  std::vector<Naming> _namings;    // whence each has its name
+  std::vector<std::string> _path;  // names from the display down to the current value
+  std::vector<Naming> _namings;    // where each name on the path comes from
   JsonValue _units = JsonValue::ofObject();
 };
 

@@ -7,18 +7,18 @@
 
 namespace varnel {
 
-/// How much time has passed in a capture, by its own clock. What the clock is set by has not passed.
+/// How much time has passed in a capture by its own clock, without the jumps of a clock that was set.
 class ElapsedTime {
  public:
-  /// The next record was captured then.
+  /// The time of the next record.
   void record(Time time);
 
-  /// How long after the first record a moment is that comes no earlier than the last one; 0 before any
+  /// The time from the first record to this moment, which must not be before the last record. 0 before any
   /// record.
   std::chrono::nanoseconds at(Time time) const;
 
  private:
-  std::optional<Time> _origin;  // where the clock was set last
+  std::optional<Time> _origin;  // the first record, or the one at which the clock was set last
   Time _last;
   std::chrono::nanoseconds _beforeOrigin{0};
 };

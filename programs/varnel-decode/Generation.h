@@ -8,14 +8,13 @@
 
 namespace varnel {
 
-/// One display that was generated, and when. The display is live: what it shows changes with the next
-/// message.
+/// One display that was generated, and its time. The display is live: the next message changes what it shows.
 struct Generation {
   Time time;
   Value display;
-  /// Where the date is unknown the time means nothing to a user, who gets `elapsed` in its place.
+  /// Where the date is unknown, `time` means nothing to a user, who gets `elapsed` instead.
   Dating dating = Dating::Known;
-  std::chrono::nanoseconds elapsed{0};  ///< since the first record, without what the clock was set by
+  std::chrono::nanoseconds elapsed{0};  ///< since the first record, without the jumps of a clock that was set
 };
 
 }  // namespace varnel

@@ -29,7 +29,7 @@ std::string seconds(std::chrono::nanoseconds duration) {
   return text;
 }
 
-// Without a date there is none to show, but how long it took to come there.
+// Without a date, the time is null, and the elapsed seconds follow.
 std::string timeAsJson(const Generation& generation) {
   if (generation.dating == Dating::Known) return jsonString(timestamp(generation.time));
   return "null,\"Elapsed\":" + seconds(generation.elapsed);

@@ -13,36 +13,36 @@
 
 namespace varnel {
 
-/// What becomes of the generations of a capture or snapshot, one after the other.
+/// Takes the generations of a capture or of a snapshot, one after the other.
 class GenerationSink {
  public:
   virtual ~GenerationSink() = default;
-  /// Throws std::runtime_error, after which there is no use in going on.
+  /// Throws std::runtime_error when the program should not go on.
   virtual void take(const Generation& generation) = 0;
 };
 
-/// The path of a node as users write it ("Section/Label") as the tree keeps it ("/Section/Label").
+/// Turns the path of a node as users write it ("Section/Label") into the path in the tree ("/Section/Label").
 std::string treePath(std::string_view path);
 
-/// Which displays are written.
+/// The displays that are written.
 enum class Displays {
   All,
   Changed,  ///< those that differ from the one before
 };
 
-/// How displays are written one after the other.
+/// The form of consecutive displays.
 struct WritingStyle {
   ValuesAs valuesAs = ValuesAs::Texts;
   Displays displays = Displays::All;
 };
 
-/// One line of JSON a generation: {"Time": …, "Display": …}; without a date {"Time": null, "Elapsed": …, …}.
-/// With a capture's name it comes first, as "Capture"; with numbers "Units" comes last. Of changed displays
-/// the first line is whole; from then on "Display" and "Units" are merge patches, and "Units" is left out
-/// where none differ.
+/// One line of JSON per generation: {"Time": …, "Display": …}; without a date {"Time": null, "Elapsed": …,
+/// …}. With a capture's name, "Capture" comes first. With numbers, "Units" comes last. If only changed
+/// displays are written, the first line is whole; in later lines "Display" and "Units" are merge patches, and
+/// "Units" is left out when no unit differs.
 class EveryDisplay final : public GenerationSink {
  public:
-  /// The formats say which numbers there are, and have to outlive the sink.
+  /// The formats decide what is a number. They must outlive the sink.
   EveryDisplay(std::FILE* output, std::optional<std::string> captureName, WritingStyle style,
                const NumberFormats& formats)
       : _output(output), _captureName(std::move(captureName)), _style(style), _formats(formats) {}
@@ -56,26 +56,26 @@ class EveryDisplay final : public GenerationSink {
   std::optional<std::string> _captureName;
   const WritingStyle _style;
   const NumberFormats& _formats;
-  std::optional<DisplayJson> _before;  // what was shown last, when changes alone are written
+  std::optional<DisplayJson> _before;  // the last display, when only changes are written
 };
 
-/// The path of a table's column that tells the seconds since the first record.
+/// The path of a table column with the seconds since the first record.
 inline constexpr std::string_view elapsedPath = "/Elapsed";
 
-/// The columns of a table of values; the name of the capture is the first when there are several.
+/// The columns of a table of values. With several captures the first column is the capture's name.
 enum class TableColumns { TimeAndValues, CaptureTimeAndValues };
 
-/// The header line of the table. Paths whose values have a unit by these formats tell it in brackets.
+/// The header line of the table. A path whose values have a unit is followed by that unit in brackets.
 std::string csvHeader(const std::vector<std::string>& paths, TableColumns columns,
                       const NumberFormats& formats);
 
-/// One line of comma-separated values (quoted as RFC 4180 has it, ended by a newline) a generation: its time,
-/// then the value under each path; of the path Elapsed the seconds since the first record, where no display
-/// has a value of that name. A value that is absent is an empty field. Control characters are escapes
-/// (`\u001B`) but for tabs and line ends.
+/// One line of comma-separated values per generation, quoted according to RFC 4180 and ended by a newline:
+/// its time, then the value under each path. The path Elapsed gives the seconds since the first record, if no
+/// display has a value of that name. A value that is absent is an empty field. Control characters other than
+/// tab and line end are written like `\u001B`.
 class ValueTable final : public GenerationSink {
  public:
-  /// The formats say which numbers there are, and have to outlive the sink.
+  /// The formats decide what is a number. They must outlive the sink.
   ValueTable(std::FILE* output, const std::vector<std::string>& paths, std::optional<std::string> captureName,
              WritingStyle style, const NumberFormats& formats);
   void take(const Generation& generation) override;
@@ -100,9 +100,9 @@ class SeenPaths final : public GenerationSink {
   explicit SeenPaths(std::vector<std::string> paths) : _unseen(std::move(paths)) {}
   void take(const Generation& generation) override;
 
-  /// Those that no display has had, as they were given.
+  /// The paths that had a value in no display, as they were given.
   const std::vector<std::string>& unseen() const { return _unseen; }
-  /// Those that displays have had and that an unseen one may mean.
+  /// Paths that displays have, and that an unseen path may mean.
   std::vector<std::string> nearestTo(std::string_view path) const { return _shown.to(path); }
 
  private:

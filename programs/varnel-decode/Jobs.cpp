@@ -22,7 +22,7 @@ namespace varnel {
 namespace {
 
 constexpr int generalError = 1;
-// Outputs that wait for their turn are files that are open.
+// Outputs that wait for their turn are open files.
 constexpr std::size_t mostWaiting = 300;
 
 struct CloseFile {
@@ -34,7 +34,7 @@ using File = std::unique_ptr<std::FILE, CloseFile>;
   throw std::system_error(errno, std::generic_category(), what);
 }
 
-// A file that nobody else sees and that is gone when it is closed, so that outputs of any length take no
+// A file that no other process sees and that disappears when it is closed. So outputs of any length take no
 // memory.
 File temporaryFile() {
   File file(std::tmpfile());
@@ -66,7 +66,7 @@ class JobQueue {
       : _names(names), _mostAtATime(mostAtATime), _work(work) {}
   JobQueue(const JobQueue&) = delete;
   JobQueue& operator=(const JobQueue&) = delete;
-  // After a failure nobody wants what still runs.
+  // After a failure the other processes are not needed any more.
   ~JobQueue() {
     for (const Job& job : _jobs) {
       if (job.process < 0 || job.waitStatus) continue;
@@ -91,7 +91,7 @@ class JobQueue {
   void start(std::size_t piece) {
     _jobs.push_back(Job{.piece = piece});
     Job& job = _jobs.back();
-    // What waits in the buffers would be written by both.
+    // Otherwise both processes would write what waits in the buffers.
     std::fflush(nullptr);
     const pid_t parent = ::getpid();
     job.process = ::fork();
@@ -122,7 +122,7 @@ class JobQueue {
     --_running;
   }
 
-  // Passes on what the job wrote. Its exit status.
+  // Writes the output of the job. Returns its exit status.
   int finish(const Job& job) const {
     copy(job.output.get(), stdout, "standard output");
     copy(job.error.get(), stderr, "standard error");
@@ -135,7 +135,7 @@ class JobQueue {
   const std::vector<std::string>& _names;
   const std::size_t _mostAtATime;
   const std::function<int(std::size_t)>& _work;
-  std::deque<Job> _jobs;  // those that run and those whose output waits, in order
+  std::deque<Job> _jobs;  // jobs that run, and jobs whose output waits, in order
   std::size_t _next = 0;
   std::size_t _running = 0;
 };

@@ -9,7 +9,7 @@ namespace varnel {
 
 namespace {
 
-// What is left out, by the names that users read. Bytes come last, for they are no frames.
+// What was left out, under the names for users. Bytes come last, since they are no frames.
 struct LeftOutKind {
   const char* name;
   std::uint64_t LeftOut::*count;

@@ -11,19 +11,19 @@
 
 namespace varnel {
 
-/// Counts messages by their log code and by what becomes of them. Each message is counted once.
+/// Counts messages by log code and by what becomes of them. Each message is counted once.
 class MessageStatistics {
  public:
   void add(const MessageFate& fate);
-  /// What the capture held beside these messages.
+  /// What else the capture held besides these messages.
   void setCapture(const Subscriptions::Counts& records, const LeftOut& leftOut);
 
-  /// A line for each log code, in their order, then those of messages without one, then the sums. Where
-  /// frames of the capture were left out, the sum of all frames follows, and a line for the records and each
-  /// kind that was left out; where records name a SIM card, a line for each.
+  /// One line per log code in ascending order, then the lines of messages without one, then the sums. If
+  /// frames of the capture were left out, the sum of all frames follows, then one line for the records and
+  /// one per kind of left-out frame. If records name a SIM card, one line per SIM card follows.
   std::string asTable() const;
   /// The same as one line of JSON: {"Messages": […], "Frames": {…}, "SIM": […], "Total": {…}}. With a
-  /// capture's name it comes first, as "Capture".
+  /// capture's name, "Capture" comes first.
   std::string asJson(const std::optional<std::string>& captureName) const;
 
  private:
@@ -33,7 +33,7 @@ class MessageStatistics {
     void add(MessageFate::Outcome outcome);
   };
 
-  // A log code; for messages without one, which follow, what becomes of them.
+  // A log code. For messages without a log code, which come after the others, what becomes of them.
   struct Kind {
     bool hasNoLogCode;
     std::uint32_t number;

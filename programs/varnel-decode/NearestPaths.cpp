@@ -11,11 +11,11 @@ namespace varnel {
 namespace {
 
 constexpr std::size_t largestSize = 4 << 20;
-constexpr std::size_t longestPath = 1000;  // that is worth the time
+constexpr std::size_t longestPath = 1000;  // longer paths would take too long
 constexpr std::size_t mostSuggestions = 3;
-constexpr std::size_t shortestPart = 3;  // of a name that is looked for in longer ones
+constexpr std::size_t shortestPart = 3;  // a shorter part of a name is not looked for in longer names
 
-// How many characters have to be put in, left out or replaced.
+// How many characters have to be inserted, removed, or replaced.
 std::size_t editDistance(std::string_view from, std::string_view to) {
   std::vector<std::size_t> row(to.size() + 1);
   std::iota(row.begin(), row.end(), std::size_t{0});
@@ -30,7 +30,7 @@ std::size_t editDistance(std::string_view from, std::string_view to) {
   return row.back();
 }
 
-// A selection stands for the number of a row.
+// Replaces each selection by the number of a record.
 std::string withRowNumbers(std::string_view path) {
   std::string text;
   while (!path.empty()) {
@@ -49,7 +49,7 @@ struct Suggestion {
   std::string_view path;
 };
 
-// The distance, when it is at most a third of what is wanted.
+// The distance, if it is at most a third of the length of the wanted path.
 std::optional<std::size_t> nearbyDistance(std::string_view wanted, std::string_view path) {
   const std::size_t furthest = wanted.size() / 3;
   if (path.size() > wanted.size() + furthest || wanted.size() > path.size() + furthest) return std::nullopt;
@@ -60,7 +60,7 @@ std::optional<std::size_t> nearbyDistance(std::string_view wanted, std::string_v
 
 std::string_view parentOf(std::string_view path) { return path.substr(0, path.rfind('/') + 1); }
 
-// "RSRP" for "Average RSRP": whoever knows but a part of a name is not far from it.
+// "RSRP" is near "Average RSRP": a user may know only a part of a name.
 bool namesPartOf(std::string_view wanted, std::string_view path) {
   const std::string_view part = wanted.substr(parentOf(wanted).size());
   return part.size() >= shortestPart &&

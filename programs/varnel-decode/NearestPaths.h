@@ -10,15 +10,15 @@
 
 namespace varnel {
 
-/// The paths of the values that displays have had, to name those that a mistyped one may mean. Paths of
-/// hostile captures that are more than a few megabytes long altogether are not kept.
+/// The paths of all values that displays have had. It finds those that a mistyped path may mean. When a
+/// hostile capture has more than a few megabytes of paths, the rest is not kept.
 class NearestPaths {
  public:
   void take(const Value& display);
 
-  /// Those that one gets from the path by the fewest edits, or by going on from a section; at most three, the
-  /// nearest first. None where more than a third of the path would have to change. As users write them,
-  /// without the first slash.
+  /// The paths that need the fewest edits, and those below the given path if it names a section: at most
+  /// three, the nearest first. None if more than a third of the path would have to change. In the form that
+  /// users write, without the first slash.
   std::vector<std::string> to(std::string_view path) const;
 
  private:

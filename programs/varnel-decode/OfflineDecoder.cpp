@@ -11,7 +11,7 @@ namespace {
 
 constexpr std::uint64_t tickSeconds = 2;
 
-// Captures may hold any time there is. Unsigned seconds wrap, so differences and sums come out right.
+// Captures may hold any time. Unsigned seconds wrap, so differences and sums are right.
 std::uint64_t ticksBetween(Time start, Time end) {
   if (end <= start) return 0;
   const std::uint64_t seconds =
@@ -19,7 +19,7 @@ std::uint64_t ticksBetween(Time start, Time end) {
   return (end.nanoseconds < start.nanoseconds ? seconds - 1 : seconds) / tickSeconds;
 }
 
-// The last ticks before the end of time are all at its last second.
+// The last ticks before the end of time are all at the last second.
 Time tickTime(Time start, std::uint64_t tick) {
   constexpr std::int64_t last = std::numeric_limits<std::int64_t>::max();
   const auto first = static_cast<std::uint64_t>(start.seconds);
@@ -40,7 +40,7 @@ void OfflineDecoder::deliver(Time time, ByteView message) noexcept {
   _generator.updateState_withData(_state, message);
 }
 
-// There is always something to show: the last tick fired before the last message arrived.
+// This always finds something to show: the last tick fired before the last message arrived.
 Value OfflineDecoder::finish() { return _generator.generateLogUsingState(_state); }
 
 std::optional<Generation> OfflineDecoder::fireTicks(Time now) {

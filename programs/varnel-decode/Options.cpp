@@ -37,7 +37,7 @@ constexpr const char* examples =
     "  varnel-decode --format none --pcap walk.pcap walk.bin\n"
     "  varnel-decode --dlf walk.dlf --format none VarnelSnapshot-1709301914.varnel\n";
 
-// The command line as it was typed, before it is known whether it makes sense.
+// The command line as it was typed, before the program checks whether it makes sense.
 struct Wishes {
   std::string format;
   bool isEvery = false;
@@ -117,7 +117,7 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
       ->type_name("FILE");
 }
 
-// The options that name a file to write, and what they name.
+// The options that name an output file, with the names.
 std::vector<std::pair<std::string, std::string>> namedOutputs(const Options& options, const Wishes& wishes) {
   std::vector<std::pair<std::string, std::string>> outputs;
   const auto add = [&](const char* option, const std::optional<std::string>& path) {
@@ -132,7 +132,7 @@ std::vector<std::pair<std::string, std::string>> namedOutputs(const Options& opt
   return outputs;
 }
 
-// What is wrong with options that are fine one by one; nothing when they go together.
+// What is wrong with the combination of valid options; nothing when they go together.
 std::optional<std::string> conflict(const Options& options, const Wishes& wishes) {
   const std::string& format = wishes.format;
   if (wishes.isEvery && !format.empty() && format != "json") return "--every writes --format json only";
@@ -161,8 +161,8 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
   return std::nullopt;
 }
 
-// A file among the paths of an option, which takes all that follows it but the last. A path that happens to
-// be the name of a file as well can be written with a slash before it.
+// An existing file among the paths of an option that takes all arguments but the last. A path that is also
+// the name of a file can be written with a slash before it.
 std::optional<std::string> fileTakenForPath(std::string_view option, std::span<const std::string> paths) {
   const auto isFile = [](const std::string& path) {
     std::error_code failure;

@@ -16,7 +16,7 @@ namespace varnel {
 
 /// What goes to standard output.
 enum class Output {
-  Display,          ///< the last display; of a snapshot all that are stored
+  Display,          ///< the last display; of a snapshot all displays in it
   EveryDisplay,     ///< a line of JSON for each display
   ValueTable,       ///< comma-separated values, a line for each display
   StatisticsTable,  ///< what became of the messages

@@ -7,9 +7,9 @@
 
 namespace varnel {
 
-/// What is wrong with the files that the options name: an output that would take the place of an input or of
-/// another output, whatever names they have. Standard output is one of them where it is a file. Nothing when
-/// all of them are different.
+/// What is wrong with the files that the options name: an output that would replace an input or another
+/// output, under any name. Standard output counts as an output if it is a file. Nothing when all files are
+/// different.
 std::optional<std::string> outputClash(const Options& options);
 
 }  // namespace varnel

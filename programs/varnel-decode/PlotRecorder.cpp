@@ -22,7 +22,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-// The years 1 to 9999: others no axis can show.
+// The years 1 to 9999. An axis can show no other years.
 constexpr double earliest = -62135596800, latest = 253402300799;
 
 bool isDigit(char character) { return character >= '0' && character <= '9'; }
@@ -53,7 +53,7 @@ double secondsSinceEpoch(Time time) {
   return std::clamp(seconds, earliest, latest);
 }
 
-// A text that a picture can hold: longer ones are cut, which takes no character of UTF-8 apart.
+// A text for the picture. A longer text is cut, but never inside a character of UTF-8.
 std::string shortened(std::string_view text) {
   constexpr std::size_t mostCharacters = 200;
   std::size_t characters = 0, size = 0;
@@ -61,18 +61,18 @@ std::string shortened(std::string_view text) {
     const bool isContinuation = (static_cast<unsigned char>(text[size]) & 0xC0) == 0x80;
     if (!isContinuation && ++characters > mostCharacters) break;
   }
-  // A text of continuations alone has no characters.
+  // A text of continuation bytes only would have no characters.
   size = std::min(size, 4 * mostCharacters);
   return printable(text.substr(0, size)) + (size < text.size() ? "…" : "");
 }
 
-// The path of the section or list that all of several paths lead through; empty for one alone.
+// The path of the section or list that all of several paths have in common; empty for a single path.
 std::string_view commonSection(const std::vector<std::string_view>& paths) {
   if (paths.size() < 2) return {};
   std::string_view common = paths.front();
   for (const std::string_view path : paths)
     common = common.substr(0, std::ranges::mismatch(common, path).in1 - common.begin());
-  // Not in the middle of a name or of what selects a row.
+  // A cut inside a name or inside a selection is not allowed.
   std::size_t end = 0, open = 0;
   for (std::size_t i = 0; i < common.size(); ++i) {
     if (open == 0 && (common[i] == '/' || common[i] == '[')) end = i;
@@ -105,7 +105,7 @@ std::optional<Measurement> measurementIn(std::string_view text) {
   text.remove_prefix(std::min(text.find_first_not_of(' '), text.size()));
   if (text.starts_with("0x") || text.starts_with("0X")) return hexadecimalIn(text.substr(2));
   if (text.starts_with('+') && text.size() > 1 && text[1] != '-') text.remove_prefix(1);
-  // Or else "inf" and "nan" would be numbers.
+  // Without this check, "inf" and "nan" would be numbers.
   const std::size_t first = text.starts_with('-') ? 1 : 0;
   if (first >= text.size() || (!isDigit(text[first]) && text[first] != '.')) return std::nullopt;
   double number = 0;
@@ -176,7 +176,7 @@ void PlotLine::halve() {
 std::vector<PlotPoint> PlotLine::points() const {
   std::vector<PlotPoint> points;
   for (const Column& column : _columns) {
-    // The sum of equal values need not be a multiple of them.
+    // Because of rounding, the mean of equal values can differ from them.
     const double mean =
         std::clamp(column.sum / static_cast<double>(column.count), column.lowest, column.highest);
     points.push_back({column.start, column.until, column.lowest, mean, column.highest, column.startsNewLine});
@@ -254,9 +254,9 @@ std::string drawPlot(const Plot& plot) {
   if (!draw) throw std::runtime_error(path.string() + " is none of this program's modules");
   std::string svg;
   draw(plot, svg);
-  // The toolkit takes the user's locale; property lists need their own.
+  // The toolkit sets the user's locale; property lists need "C".
   std::setlocale(LC_NUMERIC, "C");
-  return svg;  // the module stays: what it has loaded cannot be unloaded
+  return svg;  // the module stays loaded: its libraries cannot be unloaded
 }
 
 }  // namespace varnel

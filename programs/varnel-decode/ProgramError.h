@@ -7,12 +7,13 @@ namespace varnel {
 
 inline constexpr const char* programName = "varnel-decode";
 
-/// Writes one line to standard error, the program's name before it. Control characters, as names of files may
-/// hold them, are shown as escapes.
+/// Writes one line to standard error, after the program's name. Control characters, which names of files can
+/// hold, are written as escapes.
 void tell(std::string_view text);
 
-/// Does a part of the work. A std::runtime_error is told on standard error, and whatever comes next can still
-/// be done; false then. That whoever reads the output has left is not told: `| head` is no mistake.
+/// Does a part of the work. If it throws std::runtime_error, writes the error to standard error and returns
+/// false; the rest of the work can still be done. If only the reader of the output has left, as with `|
+/// head`, nothing is written.
 bool succeeds(const std::function<void()>& part);
 
 }  // namespace varnel

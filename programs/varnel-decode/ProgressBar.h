@@ -9,22 +9,22 @@
 
 namespace varnel {
 
-/// How far a capture has been read, on standard error: only on a terminal, only for a file, and only once it
-/// has taken a while. It is gone when the object goes. While it shows it is the log's sink, so that lines of
-/// the log do not run into it.
+/// Shows on standard error how far a capture has been read: only on a terminal, only for a file, and only
+/// after a while. It disappears with the object. While it is visible, it is the log's sink, so that log lines
+/// do not run into it.
 class ProgressBar final : public LogSink {
  public:
   enum class Output { LeavesTerminalAlone, GoesToTerminalAlongside };
 
-  /// Draws nothing beside lines that go to the same terminal. The log takes the lines of that priority number
-  /// and lower, and outlives the bar.
+  /// Draws nothing when the output goes to the same terminal. The log takes the lines of this priority number
+  /// and lower. It must outlive the bar.
   ProgressBar(const Capture& capture, Output output, LogSink& log, int logLevel,
               std::chrono::milliseconds delay = std::chrono::milliseconds(500));
   ProgressBar(const ProgressBar&) = delete;
   ProgressBar& operator=(const ProgressBar&) = delete;
   ~ProgressBar() override;
 
-  /// To be called once a record; looks at the clock now and then.
+  /// Call this once per record. It looks at the clock from time to time.
   void recordRead() {
     if (_size && ++_recordsUnseen >= recordsBetweenLooks) look();
   }
@@ -42,7 +42,7 @@ class ProgressBar final : public LogSink {
   const Capture& _capture;
   LogSink& _log;
   const int _logLevel;
-  std::optional<std::uint64_t> _size;  // absent when no bar is to be drawn
+  std::optional<std::uint64_t> _size;  // absent when no bar is drawn
   Clock::time_point _nextDrawing;
   unsigned _recordsUnseen = 0;
   bool _isDrawn = false;

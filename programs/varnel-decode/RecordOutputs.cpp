@@ -32,7 +32,7 @@ void RecordOutputs::write(Target& target, ByteView bytes) {
   if (target.file && !bytes.empty()) check(target, target.file->write(bytes));
 }
 
-// Whoever reads a pipe may leave, of which nothing is said.
+// The reader of a pipe may leave; this is not reported.
 void RecordOutputs::check(Target& target, std::error_code failure) {
   if (!failure) return;
   target.file.reset();

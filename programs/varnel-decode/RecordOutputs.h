@@ -10,20 +10,20 @@
 
 namespace varnel {
 
-/// The files that get the records of a capture as they are, each in a form of its own. One that fails gets no
-/// more, which is told; the others go on.
+/// The files that get the records of a capture as they are, each in its own form. A file that fails is
+/// reported and gets no more records; the others go on.
 class RecordOutputs {
  public:
-  /// Those that the options name.
+  /// The outputs that the options name.
   explicit RecordOutputs(const Options& options);
 
   bool areNone() const { return _targets.empty(); }
 
-  /// Opens the files. They take their places when `finish` is called.
+  /// Opens the files. They appear when `finish` is called.
   void open();
   void write(const CaptureRecord& record);
-  /// Has the files take their places, and tells how many records of the capture have none there. False when
-  /// one has failed.
+  /// Completes the files, and reports how many records of the capture they cannot hold. False when one of
+  /// them has failed.
   bool finish(const std::string& captureName);
 
  private:

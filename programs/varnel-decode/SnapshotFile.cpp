@@ -21,7 +21,7 @@ constexpr std::string_view dateKey = "Date";
 constexpr std::string_view descriptionKey = "Description";
 constexpr std::string_view timestampKey = "Timestamp";
 
-// A little more than a property list may be long, so that a longer one is refused.
+// One byte more than a property list may have, so that a longer one is refused.
 Bytes contentsOf(ByteWindow& bytes) {
   bytes.holds(fileLimits.size + 1);
   const auto contents = bytes.unread();
@@ -32,7 +32,7 @@ Value itemAsShown(const Value& item) {
   const Dictionary* entries = item.dictionary();
   if (!entries) return item;
   Value shown = Value::ofDictionary();
-  // When it was, then what.
+  // The date, then the description.
   for (const std::string_view key : {dateKey, descriptionKey})
     shown.dictionary()->set(key, entries->get(key));
   for (const auto& [key, value] : *entries) {
@@ -48,7 +48,7 @@ std::optional<Time> timeIn(const Dictionary& entries, std::string_view key) {
 
 }  // namespace
 
-// A record of 60 bytes begins with '<', and so may a frame; but letters follow it only in XML.
+// A record of 60 bytes begins with '<', and a frame can. But only in XML letters follow.
 bool SnapshotFile::isPropertyList(ByteWindow& bytes) {
   constexpr std::string_view binary = "bplist";
   if (!bytes.holds(2)) return bytes.holds(1) && bytes.unread()[0] == '<';

@@ -10,25 +10,25 @@
 
 namespace varnel {
 
-/// A snapshot as the viewer saves it.
+/// A snapshot that the viewer has saved.
 class SnapshotFile {
  public:
-  /// True when the bytes begin like a property list, and not like a capture. None of them is dropped. Throws
+  /// True when the bytes begin like a property list and not like a capture. Drops no bytes. Throws
   /// CaptureError.
   static bool isPropertyList(ByteWindow& bytes);
 
-  /// Reads them all; the name is that of errors. Throws std::runtime_error for what is no snapshot.
+  /// Reads all bytes. The name is for errors. Throws std::runtime_error when they are no snapshot.
   SnapshotFile(ByteWindow& bytes, std::string name);
 
-  /// The snapshot as it is shown: its dictionary without raw messages and binary log.
+  /// The snapshot as the program shows it: its dictionary without raw messages and binary log.
   Value shown() const;
-  /// The displays in it, oldest first, each at its own date, or without one at that of the snapshot. Throws
-  /// std::runtime_error when neither is one.
+  /// The displays in it, the oldest first. The time of each is its own date, or the snapshot's date if it has
+  /// none. Throws std::runtime_error when neither is a date.
   std::vector<Generation> generations() const;
   const Value& items() const;
 
  private:
-  std::string _name;  // of the file, as errors tell it
+  std::string _name;  // of the file, for errors
   Value _contents;    // a dictionary with an array "Data"
 };
 

@@ -5,8 +5,8 @@
 
 namespace varnel {
 
-/// Writes to an output and flushes it, so that whoever reads along sees it at once and nothing is lost when
-/// the program ends. Throws std::system_error.
+/// Writes to an output and flushes it, so that a reader sees the text at once and nothing is lost when the
+/// program ends. Throws std::system_error.
 void writeOutput(std::FILE* output, std::string_view text);
 
 }  // namespace varnel

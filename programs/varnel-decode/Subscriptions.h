@@ -11,21 +11,21 @@
 
 namespace varnel {
 
-/// Counts the records of each subscription, and chooses those of one as `SubscriptionFilter` does.
+/// Counts the records of each subscription, and chooses one subscription like `SubscriptionFilter`.
 class Subscriptions {
  public:
-  /// Absent stands for a record that names none; it comes first.
+  /// The absent key stands for records that name none; it comes first.
   using Counts = std::map<std::optional<std::uint8_t>, std::uint64_t>;
 
   explicit Subscriptions(std::optional<std::uint8_t> wanted) : _wanted(wanted), _filter(wanted) {}
 
-  /// Counts the record. Whether it is one of those chosen.
+  /// Counts the record. Returns whether it is chosen.
   bool take(const CaptureRecord& record);
 
   const Counts& counts() const { return _counts; }
 
-  /// What users should know of the choice, a sentence: that there are others, or that there is none of the
-  /// wanted one. Nothing when all records were chosen.
+  /// One sentence for users about the choice: that there are other subscriptions, or that the wanted one does
+  /// not occur. Nothing when all records were chosen.
   std::optional<std::string> remark(const std::string& captureName) const;
 
  private:

@@ -51,7 +51,7 @@ void TechnologyGuess::take(ByteView message, const MessageFate& fate) {
   }
 }
 
-// A generator of objects has no log codes to ask for: what counts there is whether messages are objects.
+// A generator of object messages knows no log codes. There it counts whether the messages are objects.
 std::uint64_t TechnologyGuess::knownTo(const std::string& technology, const Services& services) const {
   const bool takesObjects = technology == technology::ifxGSM;
   const auto generator = LogGenerator::generatorFromTechnology(technology, services);

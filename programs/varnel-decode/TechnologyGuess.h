@@ -13,26 +13,26 @@
 
 namespace varnel {
 
-/// Finds out what a capture is of when the technology that the user named knows none of its messages.
+/// Guesses the technology of a capture when the one that the user named knows none of its messages.
 class TechnologyGuess {
  public:
-  /// Takes a message and what becomes of it. A message of a known log code, whatever its length, is known;
-  /// those that do not come from the modem tell nothing.
+  /// Takes a message and what becomes of it. A message with a known log code is known, whatever its length.
+  /// Messages that do not come from the modem are ignored.
   void take(ByteView message, const MessageFate& fate);
 
-  /// Whether a modem's message was known, after which there is no use in taking more.
+  /// Whether a modem's message was known. After that there is no need to take more.
   bool isAnyKnown() const { return _isAnyKnown; }
-  /// Whether there were such messages, none of which was known.
+  /// Whether there were messages of a modem, and none of them was known.
   bool isNeeded() const { return _count > 0 && !_isAnyKnown; }
 
-  /// A sentence that names the log codes and the technologies which know most of the messages. All
-  /// technologies are tried out, so nobody should listen to the log.
+  /// One sentence that names the log codes, and the technologies that know most of the messages. It tries all
+  /// technologies, so the log should have no sink.
   std::string sentence(const std::string& captureName, const std::string& technology,
                        const std::vector<std::string>& technologies, const Services& services) const;
 
  private:
   struct Example {
-    Bytes message;  // the first of its log code
+    Bytes message;  // the first message with its log code
     std::uint64_t count = 0;
   };
 
@@ -41,7 +41,7 @@ class TechnologyGuess {
                                      const Services& services) const;
   std::string logCodes() const;
 
-  std::map<std::optional<std::uint32_t>, Example> _examples;  // by log code, absent where there is none
+  std::map<std::optional<std::uint32_t>, Example> _examples;  // by log code; absent for messages without one
   std::uint64_t _count = 0;
   bool _isAnyKnown = false;
 };

@@ -7,8 +7,8 @@
 
 namespace varnel {
 
-/// Resources that remember which of them was asked for in vain: without its display template a technology
-/// shows nothing.
+/// Resources that remember which of them was requested but is missing. Without its display template a
+/// technology shows nothing.
 class TemplateWatch final : public Resources {
  public:
   explicit TemplateWatch(const Resources& resources) : _resources(resources) {}
@@ -20,7 +20,7 @@ class TemplateWatch final : public Resources {
   }
   std::vector<std::string> propertyListPaths() const override { return _resources.propertyListPaths(); }
 
-  /// The first that was missing or unreadable; absent while all were there.
+  /// The first one that was missing or unreadable; absent while there was none.
   const std::optional<std::string>& missing() const { return _missing; }
 
  private:

@@ -39,7 +39,7 @@ std::optional<Time> timeOfDescription(std::string_view text) {
   if (year < 0 || month < 0 || day < 0 || !date.ok()) return std::nullopt;
   const std::int64_t days = std::chrono::sys_days(date).time_since_epoch().count();
   const Time time{((days * 24 + hour) * 60 + minute) * 60 + second, 0};
-  // Whatever stands between the numbers, and numbers past their bounds, would come out otherwise.
+  // A text with other separators, or with numbers out of range, would differ from this one.
   if (dateDescription(time) != text) return std::nullopt;
   return time;
 }

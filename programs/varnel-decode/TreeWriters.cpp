@@ -51,7 +51,7 @@ void appendPaths(std::string& lines, const VarnelModelNode& node, const std::str
     appendPaths(lines, *child, childPath(path, child->displayName()));
 }
 
-// By hand, since no JSON library holds an object with the same name twice.
+// Written by hand, since no JSON library holds an object with the same name twice.
 void appendJson(std::string& json, const VarnelModelNode& node) {
   const auto* tree = dynamic_cast<const VarnelModelTreeNode*>(&node);
   if (!tree) {
@@ -85,7 +85,7 @@ std::string displayAsPaths(const Value& display) {
 
 std::string jsonString(const std::string& text) {
   using Json = nlohmann::json;
-  // The library escapes all control characters but DEL and those of C1.
+  // The library escapes all control characters except DEL and C1.
   return printable(Json(text).dump(-1, ' ', false, Json::error_handler_t::replace));
 }
 

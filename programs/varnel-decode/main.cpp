@@ -26,7 +26,7 @@ namespace {
 
 constexpr int generalError = 1;
 
-// Nobody listens to the log yet, so trying the technologies out is silent.
+// The log has no sink yet, so trying the technologies writes nothing.
 std::vector<std::string> technologiesWithGenerator(const Services& services) {
   std::vector<std::string> names;
   for (const auto name : {technology::ifxGSM, technology::kalviGSMUMTS, technology::kalviCDMA,
@@ -59,7 +59,7 @@ int run(int argumentCount, char** arguments) {
   const FileResources resources(resourceFolder());
   const ApplicationInfo application = applicationInfo();
   CaptureClock clock;
-  // The lines that generators write to standard output would spoil the data there.
+  // Generators write some lines to standard output. They would spoil the data there.
   std::ostream nowhere(nullptr);
   const TemplateWatch templates(resources);
   const Services services{templates, clock, application, nowhere};
@@ -80,7 +80,7 @@ int run(int argumentCount, char** arguments) {
 int main(int argumentCount, char** arguments) {
   varnel::startProgram();
   varnel::installTerminateHandler(varnel::programName);
-  // Whoever reads the output may leave early: that is a failed write, not the end by a signal.
+  // When the reader of the output leaves early, this is a failed write, not a signal that ends the program.
   std::signal(SIGPIPE, SIG_IGN);
   return varnel::run(argumentCount, arguments);
 }

@@ -13,7 +13,7 @@ constexpr std::string_view modemCodesKey = "SetKalviLogCodes", serverCodesKey = 
 
 bool isText(const Value& value, std::string_view text) { return value.string() && *value.string() == text; }
 
-// Fills in the codes of an entry that is there; false when it is no list of integers.
+// Reads the codes of a list that is present; false when it is no list of integers.
 bool readCodes(const Value& list, std::optional<CodeFilter::Codes>& codes) {
   if (list.isAbsent()) return true;
   if (!list.array()) return false;

@@ -11,14 +11,14 @@ namespace varnel {
 
 /// {"GetTechnology": "GetTechnology"}
 struct TechnologyRequest {};
-/// {"SetState": "Streaming", "SetKalviLogCodes": [codes], "SetTkExtraCodes": [codes]}, either list or both of
-/// which may be missing.
+/// {"SetState": "Streaming", "SetKalviLogCodes": [codes], "SetTkExtraCodes": [codes]}. Either list may be
+/// missing, or both.
 struct StartRequest {
   CodeFilter filter;
 };
 using ChannelCommand = std::variant<TechnologyRequest, StartRequest>;
 
-/// Reads a viewer's command, an XML or binary property list; nothing when it is not one of the above.
+/// Reads a viewer's command, an XML or binary property list; nothing when it is neither of these two.
 std::optional<ChannelCommand> readChannelCommand(ByteView data);
 
 /// The reply to a request for the technology.

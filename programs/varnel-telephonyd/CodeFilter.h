@@ -8,14 +8,14 @@
 
 namespace varnel {
 
-/// The log codes that a viewer has asked for, by log type. A list that is absent asks for nothing, but
-/// without any list everything is asked for.
+/// The log codes that a viewer has asked for, by log type. An absent list asks for nothing. If both lists are
+/// absent, the viewer asks for all messages.
 struct CodeFilter {
   using Codes = std::set<std::int64_t>;
   std::optional<Codes> modemCodes;   ///< of packets of log type 1
   std::optional<Codes> serverCodes;  ///< of the telephony server's own messages, log type 0xFF
 
-  /// Whether the message is wanted. What bears no log code is not for the filter to judge: it is.
+  /// Whether the viewer has asked for the message. True for a message without a log code.
   bool takes(ByteView message) const;
 };
 

@@ -5,22 +5,22 @@
 
 namespace varnel {
 
-/// What became of the messages of a stream. Each that is due counts as received, and once its fate is known
-/// as one of the rest.
+/// What became of the messages of a stream. Each message that is due counts as received. Once its fate is
+/// known, it also counts as one of the others.
 struct MessageCounts {
   std::uint64_t received = 0;
   std::uint64_t delivered = 0;    ///< given to the viewer's socket
-  std::uint64_t dropped = 0;      ///< the viewer had no room for them, or had gone
-  std::uint64_t tooLong = 0;      ///< refused: longer than the channel takes
-  std::uint64_t notAskedFor = 0;  ///< refused: of codes that the viewer has not asked for
+  std::uint64_t dropped = 0;      ///< the viewer had no room for it, or had gone
+  std::uint64_t tooLong = 0;      ///< refused: longer than the channel allows
+  std::uint64_t notAskedFor = 0;  ///< refused: the viewer has not asked for its log code
 
   std::uint64_t refused() const { return tooLong + notAskedFor; }
   MessageCounts& operator+=(const MessageCounts& other);
   bool operator==(const MessageCounts&) const = default;
 };
 
-/// The counts as part of a line, as "messages: 7 received, 4 delivered, 1 dropped, 2 refused (1 too long for
-/// the channel, 1 not asked for)".
+/// The counts as part of a line, such as "messages: 7 received, 4 delivered, 1 dropped, 2 refused (1 too long
+/// for the channel, 1 not asked for)".
 std::string inWords(const MessageCounts& counts);
 
 }  // namespace varnel

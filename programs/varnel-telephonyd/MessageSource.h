@@ -14,20 +14,20 @@ struct StreamMessage {
   Bytes bytes;
 };
 
-/// The messages of a log channel, from the start of its stream on.
+/// The messages of a log channel, from the start of its stream.
 class MessageSource {
  public:
   virtual ~MessageSource() = default;
   /// The next message, no earlier than the one before; nothing when the stream has ended.
   virtual std::optional<StreamMessage> next() = 0;
-  /// What log lines call the message that came last, as "Record 17 of walk.pcap".
+  /// The name of the last message for log lines, such as "Record 17 of walk.pcap".
   virtual std::string nameOfLast() const { return "A message"; }
 
-  /// What becomes of messages whose receiver has no room when they are due.
+  /// What happens to a message when its receiver has no room at the time when it is due.
   enum class Lateness { Waits, IsDropped };
-  /// A stream that is not of this moment waits.
+  /// A stream that is not live waits.
   virtual Lateness lateness() const { return Lateness::Waits; }
-  /// One sentence for the user about a stream that has ended; empty when there is nothing to tell.
+  /// One sentence for the user about the end of the stream; empty when there is nothing to tell.
   virtual std::string endNote() const { return {}; }
 };
 

@@ -80,12 +80,12 @@ FileIdentity identityOfRecording(const std::string& path) {
   return path == "-" ? FileIdentity::ofDescriptor(STDOUT_FILENO) : FileIdentity::ofPath(path);
 }
 
-// What is wrong with options that are fine one by one; nothing when they go together.
+// What is wrong with the combination of valid options; nothing when they go together.
 std::optional<std::string> conflict(const Options& options) {
   if (!options.simulatedTechnology && !options.replayPath) return "one of --simulate and --replay is needed";
   if (!options.replayPath) return std::nullopt;
   if (*options.replayPath == "-") return "--replay needs a file, for it is read once for every viewer";
-  const bool isPlayable = options.speed >= slowest && options.speed <= fastest;  // which no NaN is
+  const bool isPlayable = options.speed >= slowest && options.speed <= fastest;  // false for NaN
   if (!isPlayable) return "--speed must lie between 0.001 and 1000000";
   if (options.recordPath &&
       identityOfRecording(*options.recordPath).isSameFileAs(FileIdentity::ofPath(*options.replayPath)))

@@ -10,17 +10,17 @@
 
 namespace varnel {
 
-/// What the program is asked to do. Either `simulatedTechnology` or `replayPath` is there.
+/// What the program is asked to do. Either `simulatedTechnology` or `replayPath` is set.
 struct Options {
   std::optional<std::string> simulatedTechnology;
   std::uint64_t seed = 1;
 
   std::optional<std::string> replayPath;
-  /// What viewers are told; absent: what the capture says.
+  /// The technology that viewers are told; absent: the one that the capture names.
   std::optional<std::string> replayTechnology;
   double speed = 1;
   bool loops = false;
-  std::optional<unsigned> subscription;  ///< 1 to 255; absent: the first that the capture has
+  std::optional<unsigned> subscription;  ///< 1 to 255; absent: the first one in the capture
 
   std::optional<std::string> recordPath;  ///< absent: nothing is recorded
   ExistingRecording existingRecording = ExistingRecording::Refused;
@@ -33,7 +33,7 @@ struct ExitStatus {
   int code;
 };
 
-/// Reads the command line. Help and version go to standard output, a mistake is one line on standard error.
+/// Reads the command line. Help and version go to standard output; a mistake is one line on standard error.
 std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
                                               const std::string& version);
 

@@ -11,25 +11,25 @@
 
 namespace varnel {
 
-/// Records what is sent to viewers, until that fails: the sending goes on.
+/// Records what is sent to viewers. If recording fails, it ends, and sending goes on.
 class Recorder {
  public:
   struct Setup {
     std::string path;  ///< "-" is standard output
     ExistingRecording existing = ExistingRecording::Refused;
-    std::optional<std::string> technology{};  ///< what the recording says that it is of; absent: nothing
+    std::optional<std::string> technology{};  ///< the technology that the recording names; absent: none
     std::function<Time()> now;
-    /// The time since any one moment; it never steps.
+    /// The time since some fixed moment. It never jumps.
     std::function<std::chrono::nanoseconds()> uptime;
-    /// Called once, when the recording ends before the recorder does, with one sentence that says why.
+    /// Called once with one sentence that says why, when the recording ends before the recorder does.
     std::function<void(const std::string& why)> ended;
   };
 
-  /// Throws std::runtime_error when there can be no such recording.
+  /// Throws std::runtime_error when this recording cannot be made.
   explicit Recorder(Setup setup);
 
-  /// Records a message. Its time is that of the first message and what has passed since: a clock that is set
-  /// meanwhile does not show.
+  /// Records a message. Its time is the time of the first message plus the time that has passed since. So a
+  /// clock that is set meanwhile does not show.
   void record(ByteView message);
 
  private:

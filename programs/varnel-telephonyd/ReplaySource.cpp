@@ -66,7 +66,7 @@ void ReplaySource::noteOther(std::uint8_t subscription) {
            subscriptionName(_subscriptions.taken()), subscriptionName(subscription));
 }
 
-// Distances are measured from an origin: those from record to record would add up their roundings.
+// Distances are measured from an origin. Distances from record to record would add up their rounding errors.
 ReplaySource::Moment ReplaySource::following(Time time) {
   if (!_last) return _origin = {time, std::chrono::milliseconds(0)};
   switch (clockStep(_last->time, time)) {

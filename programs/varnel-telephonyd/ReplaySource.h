@@ -13,22 +13,22 @@
 
 namespace varnel {
 
-/// Plays a capture back: its messages in their order and at their distances in time. None lets one wait for
-/// more than five seconds. A message that is dated before its predecessor comes together with that one; when
-/// its clock was set back, those that follow keep their distances to it.
+/// Plays a capture back: its messages in their order and with their distances in time. No wait is longer than
+/// five seconds. A message dated before its predecessor comes together with it. When the capture's clock was
+/// set back, the messages after that keep their distances.
 class ReplaySource final : public MessageSource {
  public:
   enum class AtEnd { Stop, StartOver };
 
   static constexpr std::chrono::milliseconds longestWait{5000};
 
-  /// The capture is played that many times as fast. When it starts over, the first message follows the last
-  /// one after a second of the capture's time. Of several subscriptions one is played: the one that is named,
-  /// else the first.
+  /// Plays the capture `speed` times as fast. When it starts over, the first message comes one second of the
+  /// capture's time after the last one. If there are several subscriptions, only one is played: the given
+  /// one, else the first.
   ReplaySource(std::string path, double speed, AtEnd atEnd, std::optional<std::uint8_t> subscription = {});
 
-  /// A fault of the capture is logged and ends the stream. So is, once, that a wait was shortened, and that
-  /// there are other subscriptions than the one that is played.
+  /// A fault of the capture writes a log line and ends the stream. A log line also tells, once, that a wait
+  /// was shortened, and once, that there are other subscriptions.
   std::optional<StreamMessage> next() override;
   std::string nameOfLast() const override;
   std::string endNote() const override { return _endNote; }
@@ -52,14 +52,14 @@ class ReplaySource final : public MessageSource {
   const double _speed;
   const AtEnd _atEnd;
   SubscriptionFilter _subscriptions;
-  bool _tellsOthers;  // than the one that is played, once
+  bool _tellsOthers;  // whether other subscriptions still have to be reported
   bool _hasOthers = false;
-  std::unique_ptr<Capture> _capture;  // open while it is being played
-  std::size_t _recordsRead = 0;       // of this round
+  std::unique_ptr<Capture> _capture;  // open while it is played
+  std::size_t _recordsRead = 0;       // in this round
   std::optional<Moment> _last;        // absent before the first record
-  Moment _origin{};                   // from which the distances are measured
+  Moment _origin{};                   // from here the distances are measured
   bool _hasToldShortening = false;
-  std::string _endNote;  // empty until the end
+  std::string _endNote;  // empty before the end
 };
 
 }  // namespace varnel

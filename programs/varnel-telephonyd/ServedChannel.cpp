@@ -13,14 +13,14 @@ namespace {
 
 using namespace std::chrono_literals;
 
-// Then everybody else gets a turn.
+// After this many, other channels get a turn.
 constexpr int messagesAtATime = 64;
 constexpr std::chrono::milliseconds retryInterval = 20ms;
 constexpr std::chrono::milliseconds patience = 5s;
-// A capture that is played over and over must not fill the log.
+// A capture that is played again and again must not fill the log.
 constexpr std::uint64_t mostNamedAsTooLong = 10;
 constexpr std::chrono::milliseconds commandPatience = 10s;
-// What is shown is of this moment, or is not shown.
+// A live message is shown within this time or not at all.
 constexpr std::chrono::milliseconds longestDelay = 1s;
 
 }  // namespace
@@ -57,7 +57,7 @@ void ServedChannel::reportToViewer() {
   report.dropped = _counts.dropped;
   report.tooLong = _counts.tooLong;
   if (report == _sentReport) return;
-  // Without room it goes with a later look.
+  // If there is no room, the report is sent at a later check.
   const auto sent = _viewer->sendRequest(telephonyProtocol::streamReportIdentifier, writeStreamReport(report),
                                          0ms, std::nullopt);
   if (sent.status == 0) _sentReport = std::move(report);
@@ -75,7 +75,7 @@ std::optional<Bytes> ServedChannel::takeCommand(ByteView data) {
   return std::nullopt;
 }
 
-// A stream that runs already goes on, with other codes.
+// If the stream already runs, it goes on with the new codes.
 void ServedChannel::start(CodeFilter filter) {
   _filter = std::move(filter);
   if (_source) return;
@@ -146,7 +146,7 @@ ServedChannel::Delivery ServedChannel::waitForRoom() {
   return Delivery::Done;
 }
 
-// The transport would take the connection of a message that is too long for broken.
+// The transport would take a message that is too long for a broken connection.
 ServedChannel::Delivery ServedChannel::refuseLength(std::size_t length) {
   if (++_counts.tooLong <= mostNamedAsTooLong)
     logError("%s is left out: it has %ld bytes, and the channel takes %ld", _source->nameOfLast(), length,
@@ -157,7 +157,7 @@ ServedChannel::Delivery ServedChannel::refuseLength(std::size_t length) {
 void ServedChannel::end() {
   if (_next && _isReceived) ++_counts.dropped;
   _next.reset();
-  // The last deed: it may release this channel.
+  // This must be last: it may release this channel.
   if (const auto ended = std::exchange(_ended, nullptr)) ended();
 }
 

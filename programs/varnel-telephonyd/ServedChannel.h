@@ -16,42 +16,42 @@
 
 namespace varnel {
 
-/// What every log channel is served from.
+/// What every log channel needs.
 struct ChannelHost {
   MessagePorts& ports;
   MainQueue& queue;
-  /// The time since any one moment; it never goes back.
+  /// The time since some fixed moment. It never goes back.
   std::function<std::chrono::milliseconds()> uptime;
-  /// What viewers are told that the modem is.
+  /// The technology that viewers are told.
   std::string technology;
-  /// Makes the messages of one channel, from the start of its stream on.
+  /// Makes the messages of one channel, from the start of its stream.
   std::function<std::unique_ptr<MessageSource>()> makeSource;
-  /// Sees every message that was sent.
+  /// Gets every message that was sent.
   std::function<void(ByteView message)> messageSent;
   /// Tells the server's user one sentence.
   std::function<void(const std::string& sentence)> tell;
 };
 
-/// The server's side of one log channel: it takes the viewer's commands on a port of its own and sends the
-/// stream, at its pace, to the viewer's port. A viewer that has no room is given time, which costs it
-/// messages of a source that does not wait; sending never waits.
+/// The server's side of one log channel. It takes the viewer's commands on its own port, and sends the stream
+/// at the stream's pace to the viewer's port. Sending never waits. When a viewer has no room, it gets time;
+/// meanwhile messages of a source that does not wait are lost.
 class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
  public:
-  /// The viewer's port is owned from now on. The host outlives the channel.
+  /// Takes ownership of the viewer's port. The host must outlive the channel.
   ServedChannel(const ChannelHost& host, std::unique_ptr<RemotePort> viewer)
       : _host(host), _viewer(std::move(viewer)) {}
 
-  /// Takes commands on a new port of that name, and calls the handler once when the viewer has gone away, has
-  /// taken nothing for too long or has given no command for ten seconds; the handler may release the channel.
-  /// False, with nothing begun, when the port cannot be made.
+  /// Takes commands on a new port with this name. Calls the handler once when the viewer has gone away, has
+  /// taken nothing for too long, or has given no command for ten seconds. The handler may release the
+  /// channel. Returns false, without having begun, when the port cannot be made.
   bool open(const std::string& commandPortName, std::function<void()> ended);
 
-  /// Looks whether the viewer is still there, and reports to it what is new.
+  /// Checks whether the viewer is still there, and sends it a report if something is new.
   void checkViewer();
-  /// Ends the channel, as if the viewer had gone away.
+  /// Ends the channel as if the viewer had gone away.
   void end();
 
-  /// Lets the viewer know that sentence with the next report.
+  /// Sends this sentence to the viewer with the next report.
   void note(const std::string& sentence) { _report.note = sentence; }
   const MessageCounts& counts() const { return _counts; }
 
@@ -83,7 +83,7 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   bool _hasCommand = false;  // true once a command was understood
   bool _isReceived = false;  // true once the next message was due, and counted
   MessageCounts _counts;
-  StreamReport _report;  // but for the numbers
+  StreamReport _report;  // without the numbers
   StreamReport _sentReport;
 };
 

@@ -8,7 +8,7 @@
 
 namespace varnel {
 
-/// What a simulated modem sends.
+/// The messages of a simulated modem.
 class SimulationSource final : public MessageSource {
  public:
   explicit SimulationSource(std::unique_ptr<SimulatedModem> modem) : _modem(std::move(modem)) {}

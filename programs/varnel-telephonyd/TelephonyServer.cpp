@@ -11,7 +11,7 @@ namespace {
 
 namespace protocol = telephonyProtocol;
 
-// Begins with the name of the service's socket, as every port of its own does.
+// Begins with the name of the service's socket, like every port of the service.
 constexpr std::string_view commandPortPrefix = "com.orvane.TelephonyServer.LogChannel.";
 constexpr std::chrono::milliseconds viewerCheckInterval = std::chrono::seconds(1);
 constexpr std::chrono::milliseconds lossesInterval = std::chrono::seconds(10);
@@ -80,7 +80,7 @@ MessageCounts TelephonyServer::counts() const {
 }
 
 void TelephonyServer::checkViewers() {
-  const auto channels = _channels;  // for a check may end its channel
+  const auto channels = _channels;  // a copy: a check may end its channel
   for (const auto& [number, channel] : channels) channel->checkViewer();
   tellLosses();
 }

@@ -12,24 +12,24 @@
 
 namespace varnel {
 
-/// Makes log channels and serves them until their viewers go away. Every channel has a stream of its own.
+/// Makes log channels and serves them until their viewers go away. Every channel has its own stream.
 class TelephonyServer {
  public:
   explicit TelephonyServer(ChannelHost host);
   TelephonyServer(const TelephonyServer&) = delete;
   TelephonyServer& operator=(const TelephonyServer&) = delete;
 
-  /// Makes a channel that delivers to the viewer's port of that name and takes commands on a new port. There
-  /// are 16 channels at most; the ports of the telephony service itself are refused.
+  /// Makes a channel that delivers to the viewer's port with this name, and takes commands on a new port.
+  /// There are at most 16 channels. Refuses the names of the telephony service's own ports.
   TelephonyConnection::LogChannel createLogChannel(std::string_view viewerPortName);
 
-  /// Lets every viewer know that sentence, those that come later too.
+  /// Sends this sentence to every viewer, also to those that come later.
   void note(const std::string& sentence);
   /// Ends every channel.
   void end();
 
   std::size_t channels() const { return _channels.size(); }
-  /// Of all channels, those included that have ended.
+  /// The sums over all channels, including those that have ended.
   MessageCounts counts() const;
 
  private:
@@ -39,12 +39,12 @@ class TelephonyServer {
   void tellLosses();
 
   const ChannelHost _host;
-  std::map<unsigned, std::shared_ptr<ServedChannel>> _channels;  // by the number in their port's name
+  std::map<unsigned, std::shared_ptr<ServedChannel>> _channels;  // by the number in the name of their port
   MessageCounts _endedCounts;                                    // of channels that have ended
   std::string _note;
   std::uint64_t _toldLosses = 0;
   std::chrono::milliseconds _lossesToldAt{0};
-  // A viewer may go away without a word while nothing is sent to it.
+  // A viewer can go away silently while nothing is sent to it.
   std::unique_ptr<RepeatingTimer> _viewerCheck;
 };
 

@@ -30,10 +30,11 @@ namespace {
 
 constexpr const char* programName = "varnel-telephonyd";
 constexpr int generalError = 1;
-// 64 connections, 16 channels with half a dozen files each, and plenty to spare.
+// Enough for 64 connections and 16 channels with half a dozen files each.
 constexpr std::size_t mostFiles = 1024;
 
-// On standard error, since a recording may go to standard output. Names of files must not steer the terminal.
+// Writes to standard error, since a recording may go to standard output. Names of files must not control the
+// terminal.
 void tell(const std::string& sentence) {
   std::fprintf(stderr, "%s: %s\n", programName, printable(sentence).c_str());
 }
@@ -43,14 +44,14 @@ int fail(const std::runtime_error& error) {
   return generalError;
 }
 
-// The recording that is asked for; none when that is so. Whoever serves the folder makes it: another server
-// there has its own.
+// The recorder, if a recording is asked for. Only the process that serves the folder makes it: another server
+// there has its own recording.
 std::unique_ptr<Recorder> makeRecorder(const Options& options, MainQueue& queue, TelephonyServer& server,
                                        const std::string& technology) {
   if (!options.recordPath) return nullptr;
   const auto tellEnd = [&queue, &server](const std::string& why) {
     tell(why);
-    // A channel is sending just now.
+    // Deferred: a channel is sending now.
     queue.after(std::chrono::milliseconds(0), [&server, why] { server.note(why); });
   };
   return std::make_unique<Recorder>(Recorder::Setup{.path = *options.recordPath,
@@ -74,7 +75,7 @@ std::unique_ptr<MessageSource> makeSource(const Options& options) {
   return std::make_unique<ReplaySource>(*options.replayPath, options.speed, atEnd, options.subscription);
 }
 
-// What viewers are told. Opens the capture, if any, for what it says. Throws CaptureError.
+// The technology that viewers are told. Opens the capture, if there is one, to ask it. Throws CaptureError.
 std::string technologyOf(const Options& options) {
   if (options.simulatedTechnology) return *options.simulatedTechnology;
   const auto named = openCapture(*options.replayPath)->technology();
@@ -85,7 +86,7 @@ std::string technologyOf(const Options& options) {
 }
 
 int serve(int& argumentCount, char** arguments, const Options& options) {
-  // A capture that cannot be replayed at all is told now, not when the first viewer comes.
+  // A capture that cannot be replayed is reported now, not when the first viewer comes.
   const std::string technology = technologyOf(options);
 
   raiseDescriptorLimit(mostFiles);
@@ -134,7 +135,7 @@ int run(int argumentCount, char** arguments) {
 int main(int argumentCount, char** arguments) {
   varnel::startProgram();
   varnel::installTerminateHandler(varnel::programName);
-  // Who no longer reads what this program tells does not end its service.
+  // The server goes on when nobody reads its standard error any more.
   std::signal(SIGPIPE, SIG_IGN);
   return varnel::run(argumentCount, arguments);
 }

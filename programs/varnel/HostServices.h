@@ -18,27 +18,27 @@
 
 namespace varnel {
 
-/// What either way of showing the display needs of the host. It needs an event loop.
+/// What both viewers, window and text, need from the host. It needs an event loop.
 class HostServices final {
  public:
-  /// The application information outlives it. Throws std::runtime_error when the runtime folder cannot be
+  /// The application information must outlive it. Throws std::runtime_error when the runtime folder cannot be
   /// used or the resources cannot be read.
   HostServices(const Options& options, const ApplicationInfo& application);
 
-  /// What generators have to say on standard output goes to that stream, which outlives the models.
+  /// Lines of generators for standard output go to this stream, which must outlive the models.
   ModelServices model(std::ostream& standardOutput = std::cout);
   DeviceFiles& files() { return _files; }
   Preferences& preferences() { return _preferences; }
 
  private:
-  // All of them, or those of the subscription that is asked for.
+  // All ports, or only those of the subscription that the user asked for.
   MessagePorts& ports();
 
   HostLog _log;
   std::filesystem::path _folder;
   LinkMonitor _link;
   SocketPorts _ports;
-  std::optional<SubscriptionPorts> _portsOfSubscription;  // where one is asked for
+  std::optional<SubscriptionPorts> _portsOfSubscription;  // set when the user asked for one
   SocketTelephonyService _telephony;
   EventLoopQueue _queue;
   FileResources _resources;

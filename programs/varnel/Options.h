@@ -20,7 +20,7 @@ struct Options {
   std::optional<unsigned> subscription;  ///< 1 to 255; absent: all
 };
 
-/// Has the parser of the command line fill the options, which outlive it.
+/// Declares the options to the parser of the command line, which fills them. They must outlive the parser.
 void declare(CLI::App& parser, Options& options, const ApplicationInfo& application);
 
 }  // namespace varnel

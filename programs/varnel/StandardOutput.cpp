@@ -22,7 +22,7 @@ constexpr std::string_view clearBelow = "\x1b[J";
 
 constexpr std::size_t mostWaiting = 4096;
 
-// Waits where standard output does not take more at once. 0, or the system's error.
+// Waits when standard output takes no more at once. Returns 0, or the system's error.
 int writeAll(std::string_view text) {
   while (!text.empty()) {
     const ssize_t written = ::write(STDOUT_FILENO, text.data(), text.size());
@@ -48,7 +48,7 @@ bool readerHasLeft() {
   return ::poll(&output, 1, 0) == 1 && (output.revents & (POLLERR | POLLHUP)) != 0;
 }
 
-// The line's first characters, as many as there are columns; UTF-8 sequences stay whole.
+// The first characters of the line, as many as there are columns. UTF-8 sequences stay whole.
 std::string_view cut(std::string_view line, std::size_t columns) {
   std::size_t characters = 0;
   for (std::size_t i = 0; i < line.size(); ++i) {
@@ -57,8 +57,7 @@ std::string_view cut(std::string_view line, std::size_t columns) {
   return line;
 }
 
-// The text with each of its lines broken into as many as it takes; whoever is told something is to read all
-// of it.
+// The text with each of its lines broken to the width, since users must be able to read all of it.
 std::string wrapped(std::string_view text, std::size_t columns) {
   std::string lines;
   while (!text.empty()) {
@@ -123,13 +122,13 @@ StandardOutput::~StandardOutput() {
 void StandardOutput::setEndHandler(std::function<void(int error)> handler) {
   _endHandler = std::move(handler);
   if (!isPipe(STDOUT_FILENO)) return;
-  // Nothing is ever read here: what wakes the notifier is that nobody reads the other end any more.
+  // Nothing is ever read here. The notifier wakes when nobody reads the other end any more.
   _reader = std::make_unique<QSocketNotifier>(STDOUT_FILENO, QSocketNotifier::Read);
   QObject::connect(_reader.get(), &QSocketNotifier::activated, _reader.get(), [this] {
     if (readerHasLeft()) {
       end(0);
     } else {
-      _reader->setEnabled(false);  // a socket with something to read, which would wake it again and again
+      _reader->setEnabled(false);  // a socket with unread bytes would wake it again and again
     }
   });
 }
@@ -156,7 +155,7 @@ void StandardOutput::show(const TextPage& page) {
   winsize size{};
   const bool hasSize = ::ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_row > 1 && size.ws_col > 0;
   std::string text;
-  // A terminal gets the lines as well; the page that follows at once takes their place.
+  // A terminal gets the lines too; the page that follows at once replaces them.
   if (_isTerminal && (!_hasShown || !lines.empty())) text += clearScreen;
   text += lines;
   text += _isTerminal && hasSize ? fitted(page, size.ws_row, size.ws_col) : page.text();

@@ -12,8 +12,8 @@
 
 namespace varnel {
 
-/// Pages on standard output: one after the other, or, on a terminal, each in the place of the one before, cut
-/// to what the terminal can show. Lines that others have to say there stand between two pages.
+/// Pages on standard output. On a terminal each page replaces the one before, and is cut to what the terminal
+/// can show; elsewhere the pages follow each other. Lines from elsewhere come between two pages.
 class StandardOutput final : public TextOutput {
  public:
   StandardOutput();
@@ -21,15 +21,14 @@ class StandardOutput final : public TextOutput {
   StandardOutput& operator=(const StandardOutput&) = delete;
   ~StandardOutput() override;
 
-  /// What is written there goes to standard output by whole lines, between two pages.
+  /// Text written to this stream goes to standard output in whole lines, between two pages.
   std::ostream& lines() { return _lineStream; }
-  /// Watches standard output, which needs an event loop. The handler is called from there, once, when nobody
-  /// reads standard output any more or it cannot be written to: with 0 for a reader who has left, else with
-  /// the system's error.
+  /// Watches standard output. This needs an event loop, which calls the handler once: with 0 when nobody
+  /// reads standard output any more, or with the system's error when it cannot be written to.
   void setEndHandler(std::function<void(int error)> handler);
 
   void show(const TextPage& page) override;
-  /// Shows the last page again, as fits the terminal as it is now. Nothing happens elsewhere.
+  /// Shows the last page again in the terminal's current size. Does nothing elsewhere.
   void showAgain();
   bool isTerminal() const { return _isTerminal; }
 
@@ -52,8 +51,8 @@ class StandardOutput final : public TextOutput {
 
   const bool _isTerminal;
   bool _hasShown = false;
-  TextPage _page;        // shown last
-  std::string _waiting;  // lines for the time between two pages
+  TextPage _page;        // the page shown last
+  std::string _waiting;  // lines that wait for the time between two pages
   LineBuffer _lineBuffer{*this};
   std::ostream _lineStream{&_lineBuffer};
   std::function<void(int)> _endHandler;

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// Shows the display as text on standard output until the program is told to end; returns its exit status.
+/// Shows the display as text on standard output until the program is asked to end. Returns the exit status.
 int viewAsText(int& argumentCount, char** arguments, const Options& options,
                const ApplicationInfo& application);
 

@@ -50,7 +50,7 @@ int run(int argumentCount, char** arguments) {
 int main(int argumentCount, char** arguments) {
   varnel::startProgram();
   varnel::installTerminateHandler(varnel::programName);
-  // Whoever reads the output may leave early: that is a failed write, not the end by a signal.
+  // When the reader of the output leaves early, this is a failed write, not a signal that ends the program.
   std::signal(SIGPIPE, SIG_IGN);
   return varnel::run(argumentCount, arguments);
 }

@@ -32,17 +32,17 @@ namespace {
 
 constexpr double pictureWidth = 1200, pictureHeight = 600;  // points of an SVG viewer's screen
 constexpr double leastChartHeight = 440;                    // a picture with a longer legend is higher
-constexpr int resolution = 96;                              // a point each
+constexpr int resolution = 96;                              // one point each
 constexpr int valueTicks = 6;
 constexpr double dotSize = 5;
 constexpr double lineWidth = 1.6;
 constexpr int bandOpacity = 60;  // of 255
 
-// Told apart also by those who do not see all colors.
+// People who do not see all colors can tell these apart too.
 constexpr std::array<QRgb, 8> colors = {0x0072B2, 0xD55E00, 0x009E73, 0xCC79A7,
                                         0x56B4E9, 0xE69F00, 0x000000, 0x8C6D31};
 
-// More lines than there are colors are told apart by their dashes.
+// When there are more lines than colors, dashes tell them apart.
 constexpr std::array<Qt::PenStyle, 3> styles = {Qt::SolidLine, Qt::DashLine, Qt::DotLine};
 
 QPen penOf(std::size_t series) {
@@ -52,7 +52,7 @@ QPen penOf(std::size_t series) {
 
 double milliseconds(double seconds) { return seconds * 1000; }
 
-// Without the two characters that XML cannot hold; others that it cannot have been replaced before.
+// Without U+FFFE and U+FFFF, which XML cannot hold. Other such characters were replaced before.
 QString text(const std::string& bytes) {
   QString text = QString::fromStdString(bytes);
   for (QChar& character : text)
@@ -72,7 +72,7 @@ struct Range {
 
 bool isBand(const PlotPoint& point) { return point.lowest < point.highest; }
 
-// A value that holds until the next is a step.
+// A value holds until the next one, so the line is made of steps.
 QLineSeries* steps(std::span<const PlotPoint> points, double PlotPoint::*value, QObject* owner) {
   QList<QPointF> corners;
   for (const PlotPoint& point : points) {
@@ -84,7 +84,7 @@ QLineSeries* steps(std::span<const PlotPoint> points, double PlotPoint::*value, 
   return line;
 }
 
-// Axes, and which series goes with which: one time axis, and a value axis for each unit.
+// The axes and their series: one time axis, and one value axis per unit.
 class ChartMaker {
  public:
   ChartMaker(QChart& chart, const Plot& plot) : _chart(chart) {
@@ -97,7 +97,7 @@ class ChartMaker {
     for (const PlotSeries& series : plot.series) addValueAxis(series, plot);
     for (std::size_t i = 0; i < plot.series.size(); ++i) addBands(plot.series[i], penOf(i).color());
     for (std::size_t i = 0; i < plot.series.size(); ++i) addLines(plot.series[i], penOf(i));
-    // Round numbers beside the lines, once the axes know what they show.
+    // Rounds the numbers of an axis, once it is known what the axis shows.
     for (const auto& [unit, axis] : _valueAxes) axis->applyNiceNumbers();
   }
 
@@ -165,7 +165,7 @@ class ChartMaker {
     _valueAxes.emplace(series.unit, axis);
   }
 
-  // The chart knows no gaps: each unbroken line is a series of its own.
+  // The chart knows no gaps, so each unbroken line is a series.
   static std::vector<std::span<const PlotPoint>> unbroken(const PlotSeries& series) {
     const std::span points(series.points);
     std::vector<std::span<const PlotPoint>> parts;
@@ -218,7 +218,7 @@ class ChartMaker {
     series.attachAxis(_valueAxes.at(unit));
   }
 
-  // Where there are several axes, the unit tells which one is meant.
+  // If there are several axes, the unit tells which one belongs to the path.
   std::string legendOf(const PlotSeries& series) const {
     const bool isUnitNeeded = _valueAxes.size() > 1 && !series.unit.empty();
     return isUnitNeeded ? series.label + " (" + series.unit + ")" : series.label;
@@ -229,7 +229,7 @@ class ChartMaker {
   std::map<std::string, QValueAxis*> _valueAxes;
 };
 
-// What the toolkit has to say of its surroundings (no desktop, no display) is of no use here.
+// Messages of the toolkit about a missing desktop or display do not matter here.
 void ignoreRemarks(QtMsgType type, const QMessageLogContext& /*context*/, const QString& remark) {
   if (type == QtFatalMsg) std::fprintf(stderr, "varnel-decode: %s\n", qPrintable(remark));
 }
@@ -255,7 +255,7 @@ QByteArray draw(const Plot& plot) {
   generator.setSize(size);
   generator.setViewBox(QRect(QPoint(), size));
   generator.setResolution(resolution);
-  generator.setTitle(text(plot.title).toHtmlEscaped());  // which it writes as it is
+  generator.setTitle(text(plot.title).toHtmlEscaped());  // the generator does not escape the title
   QPainter painter(&generator);
   painter.setRenderHint(QPainter::Antialiasing);
   scene.render(&painter, scene.sceneRect(), scene.sceneRect());

@@ -4,9 +4,9 @@
 
 #include "programs/varnel-decode/plot/Plot.h"
 
-/// The one entry of the module that draws pictures, which is a library of its own that the program loads when
-/// it needs it: no other use of the program pays for what drawing takes.
+/// The one function of the module that draws pictures. The module is a separate library, which the program
+/// loads only when it draws, so that no other use pays for it.
 extern "C" {
-/// Draws the plot as SVG, without a display; at most once in the life of a process.
+/// Draws the plot as SVG. Needs no display. Call it at most once per process.
 void varnelDrawPlot(const varnel::Plot& plot, std::string& svg);
 }

@@ -7,13 +7,13 @@
 
 namespace varnel {
 
-/// Which line stands for what.
+/// The name and the look of a line.
 struct LegendEntry {
   QString text;
   QPen pen;
 };
 
-/// The entries in as many rows as they need at that width, from the item's origin on; a text that is wider is
+/// The entries in as many rows as they need at this width, from the item's origin. A text that is too wide is
 /// shortened in its middle. The chart library's own legend has one row and hides what does not fit.
 class Legend final : public QGraphicsItemGroup {
  public:

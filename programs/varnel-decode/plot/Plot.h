@@ -5,12 +5,12 @@
 
 namespace varnel {
 
-/// What was shown for a while: one value, or several that follow each other within a column of the picture.
+/// One value that was shown for a while, or several that follow each other within one column of the picture.
 struct PlotPoint {
   double seconds;  ///< since 1970-01-01 00:00:00 UTC, or since the first record
-  double until;    ///< when the last of its values was no longer shown
+  double until;    ///< when the last of its values ended
   double lowest, mean, highest;
-  bool startsNewLine;  ///< no line leads here from the point before
+  bool startsNewLine;  ///< no line connects it with the point before
 
   friend bool operator==(const PlotPoint&, const PlotPoint&) = default;
 };
@@ -22,10 +22,10 @@ struct PlotSeries {
   std::vector<PlotPoint> points;
 };
 
-/// What its times are counted from.
+/// The origin of the times.
 enum class PlotTimes { SinceEpoch, SinceFirstRecord };
 
-/// What a picture shows.
+/// The contents of a picture.
 struct Plot {
   std::string title;
   std::vector<PlotSeries> series;

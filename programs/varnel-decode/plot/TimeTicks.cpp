@@ -10,7 +10,7 @@ namespace {
 constexpr double mostTicks = 8;
 constexpr double second = 1000, minute = 60 * second, hour = 60 * minute, day = 24 * hour;
 
-// Hours and days in steps that fill a day.
+// The steps of hours and days divide a day evenly.
 constexpr double steps[] = {
     0.1 * second, 0.2 * second, 0.5 * second, second,     2 * second, 5 * second,  10 * second,
     20 * second,  30 * second,  minute,       2 * minute, 5 * minute, 10 * minute, 20 * minute,
