@@ -7,8 +7,8 @@
 namespace varnel {
 namespace {
 
-// A message's way through the generator: framing, dispatch, decoding, and the raw bytes kept for the binary
-// log.
+// The way of a message through the generator: framing, dispatch, decoding, and keeping the raw bytes for the
+// binary log.
 void decode(benchmark::State& state, const PacketCase& packetCase) {
   constexpr int messagesPerDisplay = 256;
   DecodingLoop loop(packetCase);

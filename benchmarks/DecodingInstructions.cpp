@@ -5,8 +5,8 @@
 
 #include "DecodingLoop.h"
 
-// Without arguments: the names of the cases. With a name and a number: decodes that message that often, for
-// whoever counts the instructions.
+// Without arguments: writes the names of the cases. With a name and a number: decodes that message this many
+// times, for a program that counts instructions.
 int main(int argumentCount, char** arguments) {
   using namespace varnel;
   if (argumentCount < 3) {

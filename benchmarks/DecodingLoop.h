@@ -10,7 +10,7 @@
 
 namespace varnel {
 
-/// A generator with its real template that takes the message of a case again and again.
+/// A generator with its real template that decodes the message of a case again and again.
 class DecodingLoop {
  public:
   explicit DecodingLoop(const PacketCase& packetCase)
@@ -24,7 +24,7 @@ class DecodingLoop {
     if (_advance) _advance(_message);
     _generator->updateState_withData(_state, _message);
   }
-  /// Takes the raw bytes away that the generator keeps until the next display.
+  /// Removes the raw bytes that the generator keeps until the next display.
   void display() { _generator->generateLogUsingState(_state); }
 
  private:

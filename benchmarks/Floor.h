@@ -10,19 +10,21 @@
 
 namespace varnel {
 
-/// What the decoding of a message costs at the least: its bytes are read, a property list in it is parsed by
-/// the library, and the texts that the generator shows for it are written anew into one buffer on the stack,
-/// numbers as numbers, without any dictionary.
+/// The least that the decoding of a message can cost. It reads the message's bytes, lets the library parse a
+/// property list in it, and writes the texts that the generator shows for it into one buffer on the stack. It
+/// formats numbers, and uses no dictionary.
 class Floor {
  public:
-  /// Learns the message: which texts it makes are those that `takeTexts` finds after the generator had it.
+  /// Adds a message. The texts that it makes are those that `takeTexts` finds after the generator has decoded
+  /// it.
   void learn(ByteView message, bool isObject, const std::vector<std::string>& texts);
-  /// Does the least for the message of that number. The result depends on all that was read and written.
+  /// Does the least for the message with this index. The result depends on all bytes that were read and
+  /// written.
   std::uint64_t run(std::size_t message) const;
   std::size_t size() const { return _messages.size(); }
 
  private:
-  // One text: what stands around its number, if it has one.
+  // One text: what is around its number, if it has one.
   struct Text {
     enum class Kind { Plain, Integer, Real } kind = Kind::Plain;
     std::string before{}, after{};
@@ -32,7 +34,7 @@ class Floor {
   };
   struct Message {
     Bytes bytes;
-    std::size_t listOffset;  // where its property list begins; its size when it has none
+    std::size_t listOffset;  // where its property list begins; its size if it has none
     std::vector<Text> texts;
   };
 
@@ -42,7 +44,8 @@ class Floor {
   std::vector<Message> _messages;
 };
 
-/// Empties the lists of a display and marks its texts, so that the next message's own can be told.
+/// Empties the lists of a display and marks its texts, so that `takeTexts` can tell which ones the next
+/// message sets.
 void markTexts(const Value& display);
 /// The texts of a display that were set since they were marked.
 std::vector<std::string> takeTexts(const Value& display);

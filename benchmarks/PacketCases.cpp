@@ -10,7 +10,7 @@ namespace varnel {
 
 namespace {
 
-// A modem packet with bytes of every size in its payload.
+// A modem packet whose payload has small and large bytes.
 Bytes packet(std::uint16_t logCode, std::size_t size) {
   Bytes bytes(size);
   for (std::size_t i = 0; i < size; ++i) bytes[i] = static_cast<std::uint8_t>(i * 37 + 11);
@@ -26,7 +26,7 @@ Bytes lteServingCellMeasurement() { return packet(0xB17F, 33); }
 
 Bytes lteNeighborsOf8Cells() {
   Bytes bytes = packet(0xB180, 21 + 8 * 20);
-  bytes[19] = 0xC0;  // the number of cells less one is 7: two bits here,
+  bytes[19] = 0xC0;  // the number of cells minus one is 7: two bits here,
   bytes[20] = 0x01;  // three there
   return bytes;
 }
@@ -81,7 +81,7 @@ Bytes c2k1xStatusOf6Pilots() {
   const std::size_t activeSet = 17 + 8 + 16;
   bytes[activeSet + 7] = 10;  // exponent
   bytes[activeSet + 8] = 6;
-  bytes[activeSet + 9] = 0;  // no extensions: a pilot takes 12 bytes
+  bytes[activeSet + 9] = 0;  // no extensions: a pilot has 12 bytes
   return bytes;
 }
 
@@ -92,7 +92,7 @@ void raise(Bytes& bytes, std::size_t offset, std::uint32_t difference) {
   std::memcpy(bytes.data() + offset, &number, sizeof number);
 }
 
-// Each packet has the next sequence value and some more packets on its first counter.
+// Each packet has the next sequence value, and a higher first counter.
 Bytes c2kForwardLink() { return packet(0x1192, 241); }
 void advanceForwardLink(Bytes& bytes) {
   raise(bytes, 13, 1);

@@ -7,13 +7,13 @@
 
 namespace varnel {
 
-/// A message whose decoding is measured, and the technology that decodes it.
+/// A message whose decoding is measured, and its technology.
 struct PacketCase {
   std::string_view name;
   std::string_view technology;
   Bytes (*message)();
-  /// Turns a message into the one that follows it, for decoders that compare the two; null where all are
-  /// alike.
+  /// Turns a message into the next one, for decoders that compare two messages. Null when all messages are
+  /// the same.
   void (*advance)(Bytes& message) = nullptr;
 };
 

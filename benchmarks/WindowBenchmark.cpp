@@ -25,7 +25,7 @@ class NoSaving : public SaveControl {
   void snapshotWasWritten(const FileWriting&) override {}
 };
 
-// A pane of so many leaves whose values hold that number.
+// A pane with this many leaves, whose values contain the number.
 std::shared_ptr<const VarnelModelNode> nodeOf(std::size_t rows, unsigned number) {
   VarnelModelNode::Children children;
   for (std::size_t row = 0; row < rows; ++row) {
@@ -36,7 +36,7 @@ std::shared_ptr<const VarnelModelNode> nodeOf(std::size_t rows, unsigned number)
                                                VarnelModelTreeNode::Origin::Dictionary);
 }
 
-// A window with the root pane, shown.
+// A visible window with the root pane.
 struct Shown {
   Shown(std::size_t rows, const Rect& frame) {
     root->setStatus_isLoading("Updated 2024-03-01 at 14:05:09", false);
@@ -55,7 +55,7 @@ struct Shown {
   std::unique_ptr<Window> window;
 };
 
-// Paints what waits to be painted.
+// Paints what is waiting to be painted.
 void paint(QWidget& window) {
   QCoreApplication::processEvents();
   QCoreApplication::sendPostedEvents(nullptr, QEvent::UpdateRequest);
@@ -64,7 +64,7 @@ void paint(QWidget& window) {
 
 QWidget& widgetOf(Window& window) { return static_cast<WindowWidget&>(window); }
 
-// Every value of 60 visible rows changes, until the last of them is painted.
+// The time from changing every value of 60 visible rows until all are painted.
 void refreshOf60ChangedRows(benchmark::State& state) {
   Shown shown(rowCount, {0, 0, 480, 60 * 50 + 96});
   paint(widgetOf(*shown.window));
@@ -76,7 +76,7 @@ void refreshOf60ChangedRows(benchmark::State& state) {
 }
 BENCHMARK(refreshOf60ChangedRows)->Unit(benchmark::kMillisecond);
 
-// The same rows with the same values again.
+// The same with unchanged values.
 void refreshOf60UnchangedRows(benchmark::State& state) {
   Shown shown(rowCount, {0, 0, 480, 60 * 50 + 96});
   paint(widgetOf(*shown.window));
@@ -96,7 +96,7 @@ void firstPaintedPane(benchmark::State& state) {
 }
 BENCHMARK(firstPaintedPane)->Unit(benchmark::kMillisecond);
 
-// What the first painted pane is measured by: the toolkit's own window with one empty table.
+// The comparison for the first painted pane: the toolkit's own window with one empty table.
 void emptyWindowWithOneTable(benchmark::State& state) {
   for (auto _ : state) {
     QWidget window;

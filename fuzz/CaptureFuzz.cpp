@@ -26,7 +26,7 @@ struct Record {
 
 bool isOneLine(const std::string& text) { return !text.empty() && text.find('\n') == std::string::npos; }
 
-// The records before the first that is damaged.
+// The records before the first damaged one.
 std::vector<Record> recordsOf(const std::string& path) {
   std::vector<Record> records;
   try {
@@ -43,7 +43,7 @@ std::vector<Record> recordsOf(const std::string& path) {
   return records;
 }
 
-// The bytes, and how many of the records are in them.
+// The bytes, and how many of the records they hold.
 struct Encoded {
   Bytes bytes;
   std::size_t records;
@@ -62,7 +62,7 @@ Encoded encoded(CaptureEncoder& encoder, const std::vector<Record>& records) {
 void checkPcap(std::vector<Record> records, MemoryFile& copy) {
   PcapWriter writer;
   copy.set(encoded(writer, records).bytes);
-  // A capture keeps 32 bits of the seconds, and those of pcap have a date.
+  // A capture keeps 32 bits of the seconds, and records of pcap have a date.
   for (Record& record : records) {
     record.time.seconds = static_cast<std::uint32_t>(record.time.seconds);
     record.dating = Dating::Known;
@@ -73,7 +73,7 @@ void checkPcap(std::vector<Record> records, MemoryFile& copy) {
 void checkFrames(const std::vector<Record>& records, MemoryFile& copy) {
   FramedWriter first, second;
   const Encoded frames = encoded(first, records);
-  // The first frame is looked for in the first 64 KiB.
+  // The reader searches the first 64 KiB for the first frame.
   constexpr std::size_t longest = 16'000;
   for (const Record& record : records) {
     if (record.message.size() > longest) return;
@@ -86,7 +86,8 @@ void checkFrames(const std::vector<Record>& records, MemoryFile& copy) {
 
 }  // namespace
 
-// The input is a whole capture of any kind. What could be read of it can be written, and then reads the same.
+// The input is a whole capture of any kind. The records that were read can be written, and read again without
+// a change.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   static MemoryFile file;
   static MemoryFile copy;

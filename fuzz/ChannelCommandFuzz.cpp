@@ -11,7 +11,8 @@ using namespace varnel;
 
 namespace {
 
-// Every message of that log type and code that is long enough to bear one, with and without the prefix.
+// Whether the filter takes every message of this log type and code that is long enough to have a code, with
+// and without the prefix.
 bool takes(const CodeFilter& filter, std::uint8_t logType, std::int64_t code) {
   Bytes packet(13);
   packet[0] = logType;
@@ -33,8 +34,8 @@ void checkFilter(const CodeFilter& filter, std::uint8_t logType,
 
 }  // namespace
 
-// The input is a command as a viewer might send it to the telephony server. A command is a dictionary, and
-// its filter takes what it names.
+// The input is a command from a viewer to the telephony server. A command is a dictionary, and its filter
+// takes the codes that it names.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   const auto command = readChannelCommand({data, size});
   if (!command) return 0;

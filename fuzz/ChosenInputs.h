@@ -14,9 +14,9 @@ inline constexpr bool choosesEveryInput = false;
 inline constexpr bool choosesEveryInput = true;
 #endif
 
-/// Whether an input is one of those that get a check which takes long: one in so many, and without a fuzzer
-/// every one. Its own bytes tell, so it is the same each time, and none that is made of a chosen one inherits
-/// it.
+/// Whether an input gets a check that takes long: one input in `oneInSoMany`, and without a fuzzer every
+/// input. The bytes of the input decide, so the answer is the same each time, and an input made from a chosen
+/// one is not chosen for that reason.
 inline bool isChosen(ByteView input, std::size_t oneInSoMany) {
   const std::string_view bytes(reinterpret_cast<const char*>(input.data()), input.size());
   return choosesEveryInput || std::hash<std::string_view>()(bytes) % oneInSoMany == 0;

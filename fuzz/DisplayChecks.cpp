@@ -15,7 +15,7 @@ namespace varnel {
 
 namespace {
 
-// Of nodes that share a path the last one is the one that it leads to.
+// If nodes share a path, the path leads to the last one.
 void checkNode(const VarnelModelNode& node, const std::string& path, const PathDictionary& paths) {
   const auto found = paths.find(path);
   require(found != paths.end(), "every node is recorded under its path");
@@ -27,7 +27,7 @@ void checkNode(const VarnelModelNode& node, const std::string& path, const PathD
     checkNode(*child, childPath(path, child->displayName()), paths);
 }
 
-// As far as it is worth the time.
+// Checks as many leaves as are worth the time.
 void checkLeaves(const Value& display, const PathDictionary& paths) {
   constexpr std::size_t mostPaths = 64;
   std::size_t count = 0;

@@ -44,7 +44,7 @@ class StandingClock final : public Clock {
   TimeZone zoneAt(Time /*time*/) const override { return {3600, false}; }
 };
 
-/// Has every line of the log formatted.
+/// A sink that makes the log format every line.
 class FormattedLog final : public LogSink {
  public:
   FormattedLog() { setLogSink(this, logExportFailurePriority); }
@@ -54,7 +54,7 @@ class FormattedLog final : public LogSink {
   void write(int /*priority*/, std::string_view /*text*/) override {}
 };
 
-/// What every generator under test may ask of its host.
+/// The host of every generator under test.
 struct FuzzHost {
   FormattedLog log;
   ShippedResources shipped;

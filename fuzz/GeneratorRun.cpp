@@ -24,13 +24,13 @@ namespace varnel {
 namespace {
 
 constexpr std::size_t largestHistory = 5;
-// More in one input tell nothing new and take long. Displays outnumber the history.
+// More per input would find nothing new and take long. There are more displays than the history holds.
 constexpr std::size_t mostDisplays = 7, mostSaves = 3, mostReconnections = 2;
 
 bool hasOneEntry(const Value& value) { return value.dictionary() && value.dictionary()->size() == 1; }
 
-// Whether what an object message shows is made of texts and containers, no dictionary of one entry among
-// those that stand within another container.
+// Whether the display of an object message consists of texts and containers, and no dictionary with one entry
+// is inside another container.
 bool isCollapsed(const Value& object) {
   const auto isFine = [](const Value& child) { return !hasOneEntry(child) && isCollapsed(child); };
   if (object.string()) return true;
@@ -45,7 +45,7 @@ void checkSnapshot(const Value& snapshot) {
           "XML refuses only texts that it cannot hold");
 }
 
-/// A generator with its state, and beside it what must come out of the two.
+/// A generator with its state, and the results that both must have.
 class GeneratorRun {
  public:
   GeneratorRun(std::string_view technology, const Services& services)
@@ -65,7 +65,7 @@ class GeneratorRun {
     return true;
   }
 
-  /// The display.
+  /// Returns the display.
   Value generate() {
     Value display = _generator->generateLogUsingState(_state);
     require(_hasDisplay == !display.isAbsent() || isCDMA(), "there is a display once it has been built");
@@ -82,7 +82,7 @@ class GeneratorRun {
     return display;
   }
 
-  /// What would be saved.
+  /// Returns what would be saved.
   Value save() {
     Value contents = _generator->getSaveContentsFromState(_state);
     const Array* items = contents.array();
@@ -92,7 +92,7 @@ class GeneratorRun {
     return contents;
   }
 
-  /// A new generator takes over the state; messages that no display has shown yet are lost.
+  /// A new generator takes over the state. Messages that no display has shown yet are lost.
   void reconnect() {
     _generator = LogGenerator::generatorFromTechnology(_technology, _services);
     _interval.clear();
@@ -141,11 +141,11 @@ class GeneratorRun {
   std::unique_ptr<LogGenerator> _generator;
   Dictionary _state;
   bool _hasDisplay = false;
-  Bytes _interval;               // of the binary log, since the last display
-  std::deque<Bytes> _intervals;  // of the displays in the history
+  Bytes _interval;               // raw messages since the last display
+  std::deque<Bytes> _intervals;  // raw messages of the displays in the history
 };
 
-// Takes many times as long as all the rest, so few inputs are looked at that closely.
+// Takes many times as long as everything else, so only few inputs get these checks.
 void inspect(GeneratorRun& run, ByteView input, Time now) {
   constexpr std::size_t inputsPerTree = 256, inputsPerWriting = 1024;
   const Value display = run.generate();

@@ -6,10 +6,10 @@
 
 namespace varnel {
 
-/// Plays an input (fuzz/InputSteps.h) to the generator of a technology with its shipped template, as the
-/// model would: updates, displays with their trees, save contents, and new generators over the old state.
-/// Aborts when anything is not as it must be. The two exceptions that end the program end the input, and only
-/// a message that requires them may bring them about.
+/// Runs an input (fuzz/InputSteps.h) on the generator of a technology with its shipped template, as the model
+/// would: updates, displays with their trees, save contents, and new generators on the old state. Aborts when
+/// a result is wrong. The two exceptions that end the program end the input. Only a message that requires one
+/// of them may raise it.
 int fuzzGenerator(std::string_view technology, ByteView input);
 
 }  // namespace varnel

@@ -9,11 +9,11 @@
 
 namespace varnel {
 
-/// What happens behind a message; several may.
+/// What follows a message. Several of these may follow.
 enum AfterMessage : std::uint8_t { Generate = 1, Save = 2, Reconnect = 4 };
 
-/// One step of a generator's input: what happens behind the message (1 byte), the message's length (2,
-/// little-endian), the message.
+/// One step of a generator's input: what follows the message (1 byte), the message's length (2,
+/// little-endian), and the message.
 struct InputStep {
   std::uint8_t after;
   ByteView message;

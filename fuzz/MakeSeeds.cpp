@@ -29,7 +29,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-// As ./dev lets the fuzzer make them: of few messages, of whole files.
+// The same limits as in `longest_input` of ./dev.
 constexpr std::size_t largestPlay = 768, largestFile = 4096;
 constexpr std::uint64_t walks = 6;
 constexpr int messagesOfAWalk = 1500;
@@ -45,7 +45,7 @@ constexpr Technology technologies[] = {
     {technology::kalviUTRAN2, "UTRANFuzz"},
 };
 
-// The seeds of one target, numbered by kind.
+// The seeds of one target, numbered per kind.
 class SeedFolder {
  public:
   SeedFolder(const fs::path& root, const char* target, std::size_t largest = largestFile)
@@ -76,15 +76,15 @@ std::vector<SimulatedMessage> walk(std::string_view technology, std::uint64_t se
   return messages;
 }
 
-// What a message is filed under: its log type and code, and whether it has a prefix.
+// The kind of a message: its log type and code, and whether it has a prefix.
 unsigned kindOf(ByteView message) {
   const bool hasPrefix = message[0] == 0x81;
   if (hasPrefix) message = message.subspan(2);
   return unsigned{hasPrefix} << 24U | unsigned{message[0]} << 16U | message[3] | unsigned{message[4]} << 8U;
 }
 
-// A property list, alone or behind the header of a packet, in the shorter one of its encodings; anything else
-// as it is.
+// A property list, alone or after the header of a packet, in its shorter encoding. Any other message
+// unchanged.
 Bytes compact(const Bytes& message) {
   constexpr std::size_t headerSize = 13;
   const std::size_t start = message[0] == 0xFF ? headerSize : 0;
@@ -96,7 +96,7 @@ Bytes compact(const Bytes& message) {
   return shorter;
 }
 
-// As many of the messages as an input holds, the picture looked at and saved now and then.
+// As many of the messages as fit into an input, with displays and saves now and then.
 Bytes inputOf(const std::vector<SimulatedMessage>& messages, std::size_t first, std::size_t largest) {
   Bytes input;
   int steps = 0;
@@ -150,7 +150,7 @@ Bytes joined(std::initializer_list<ByteView> parts) {
   return whole;
 }
 
-// Each record in a frame that tells its length in place of a checksum.
+// Each record in a frame with a length instead of a checksum.
 Bytes lengthFramed(ByteView records) {
   Bytes frames;
   while (records.size() >= 2) {
@@ -170,7 +170,7 @@ Bytes lengthFramed(ByteView records) {
   return frames;
 }
 
-// What stands before the frames of a phone's own log file; the flag tells whether they have checksums.
+// The bytes before the frames of a phone's own log file. The flag says whether the frames have checksums.
 Bytes logFileHeader(std::uint8_t flag) { return {10, 0, 0, 0, 1, flag, 0, 0, 0, 0}; }
 
 // The version report, then an interval that has lost its first byte.
@@ -220,7 +220,7 @@ void makeCaptureSeeds(SeedFolder& folder) {
     PcapngWriter pcapng{std::string(technology.identifier)};
     folder.add("pcap", bytesOf(pcap, messages));
     folder.add("pcapng", bytesOf(pcapng, messages));
-    if (technology.identifier == technology::ifxGSM) continue;  // whose messages are no log records
+    if (technology.identifier == technology::ifxGSM) continue;  // its messages are no log records
     FramedWriter framed;
     RecordStreamWriter records;
     const Bytes frames = bytesOf(framed, messages), stream = bytesOf(records, messages);
@@ -272,7 +272,7 @@ void makeCommandSeeds(SeedFolder& folder, FuzzHost& host) {
   }
 }
 
-// One value of each kind, and what is hard to write.
+// One value of each kind, and values that are hard to write.
 Value oneOfEachKind() {
   Value list = Value::ofDictionary();
   Dictionary& entries = *list.dictionary();
@@ -306,7 +306,7 @@ void makeResourceSeeds(SeedFolder& folder, const ShippedResources& shipped) {
   for (const std::string& path : shipped.propertyListPaths()) {
     const Value list = shipped.propertyList(path.substr(0, path.rfind('.')));
     addInBothEncodings(folder, "shipped", list);
-    // Those that are larger than an input: their sections one by one.
+    // Lists that are larger than an input: their sections one by one.
     for (const auto& [key, value] : *list.dictionary()) {
       Value part = Value::ofDictionary();
       part.dictionary()->set(key, value);
@@ -328,7 +328,7 @@ Value snapshotOf(std::string_view technology, const Services& services) {
   return snapshotContents(services.clock.now(), generator->getSaveContentsFromState(state), "by the lake");
 }
 
-// Two displays with what is hard to show, one of them without a date, and a binary log.
+// Two displays with contents that are hard to show, one of them without a date, and a binary log.
 Value smallSnapshot() {
   Value list = oneOfEachKind();
   Dictionary& entries = *list.dictionary();
@@ -385,8 +385,8 @@ void makeSeeds(const fs::path& root) {
 
 }  // namespace varnel
 
-// Fills a folder with seeds, one folder a target below it. The simulated modems send what is in them; it is
-// the same each time.
+// Fills a folder with seeds, one folder per target below it. The seeds come from the simulated modems, and
+// are the same each time.
 int main(int argumentCount, char** arguments) {
   if (argumentCount != 2) {
     std::fprintf(stderr, "usage: %s FOLDER\n", arguments[0]);

@@ -10,7 +10,7 @@
 
 namespace varnel {
 
-/// A file that stands in memory alone, for what is read by its path.
+/// A file in memory, for code that reads a file by its path.
 class MemoryFile {
  public:
   MemoryFile() : _descriptor(memfd_create("input", MFD_CLOEXEC)) {
@@ -22,7 +22,7 @@ class MemoryFile {
 
   std::string path() const { return "/proc/self/fd/" + std::to_string(_descriptor); }
 
-  /// Replaces what is in it.
+  /// Replaces the contents.
   void set(ByteView bytes) {
     require(ftruncate(_descriptor, 0) == 0 && lseek(_descriptor, 0, SEEK_SET) == 0,
             "memory file can be emptied");

@@ -16,7 +16,7 @@ namespace {
 constexpr std::size_t headerSize = 13;
 constexpr std::uint16_t cdmaLogCodes[] = {0x108A, 0x1183, 0x1192, 0x12B6, 0x119C, 0x119D, 0x127E, 0x134F};
 
-// The packet of a message that is long enough to be one: the message without its prefix.
+// The packet in a message that is long enough to hold one: the message without its prefix.
 ByteView packetOf(ByteView message) { return message[0] == 0x81 ? message.subspan(2) : message; }
 
 unsigned logCodeOf(ByteView packet) { return packet[3] | packet[4] << 8U; }
@@ -27,7 +27,7 @@ bool hasDisplayForm(const Value& object) {
     return std::ranges::all_of(*entries, [](const auto& entry) { return hasDisplayForm(entry.value); });
   const Array* elements = object.array();
   if (!elements) return false;
-  // The first element is never looked at.
+  // The generator ignores the first element.
   return elements->empty() || std::all_of(elements->begin() + 1, elements->end(), hasDisplayForm);
 }
 

@@ -8,7 +8,7 @@
 
 namespace varnel {
 
-/// What a message must bring about, found out without the generators.
+/// What a message must cause. This is found out without the generators.
 enum class Outcome {
   Accepted,
   UnreadableSimFiles,  ///< LogCode_0xFF0000::UnknownDataException
@@ -17,14 +17,14 @@ enum class Outcome {
 };
 Outcome requiredOutcome(std::string_view technology, ByteView message);
 
-/// The bytes of an accepted message that belong into the binary log.
+/// The bytes of an accepted message that belong in the binary log.
 ByteView loggedBytes(std::string_view technology, ByteView message);
 
-/// Whether bytes are a property list within the limits that stands for so much that working on it takes long.
-/// Such inputs would keep a fuzzer from all others; what they cost is tested where the limits are.
+/// Whether the bytes are a property list within the limits that stands for so many values that working on it
+/// takes long. Such inputs would take time from all others. The tests of the limits cover them.
 bool isLaborious(ByteView bytes, const PropertyListLimits& limits);
 
-/// Whether a value holds a text that XML cannot.
+/// Whether a value holds a text that XML cannot hold.
 bool holdsTextStrangeToXml(const Value& value);
 
 }  // namespace varnel

@@ -7,8 +7,8 @@
 
 using namespace varnel;
 
-// The bytes arrive in pieces whose lengths come from the first byte; the frames in them must be the same as
-// when they arrive at once.
+// The bytes arrive in pieces whose lengths come from the first byte. The frames in them must be the same as
+// when all bytes arrive at once.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   if (size == 0) return 0;
   const ByteView stream(data + 1, size - 1);

@@ -20,8 +20,8 @@ namespace fs = std::filesystem;
 constexpr const char* domain = "com.orvane.dockhall";
 constexpr const char* key = "DHShowGSMRSSI";
 
-// A device's files, for as long as the process runs. They stand in memory where that is a folder: a disk
-// would take most of the time.
+// A device's files, for as long as the process runs. They are in memory if /dev/shm exists: with a disk,
+// most of the time would go into writing.
 class Device {
  public:
   Device() {
@@ -50,8 +50,8 @@ class Device {
 
 }  // namespace
 
-// The input is the preferences file of the home-screen application as it is found. It gets its entry and
-// keeps all others when it is a dictionary that has an XML form; else it stays as it is.
+// The input is the preferences file of the home-screen application. If it is a dictionary that has an XML
+// form, it gets its entry and keeps all others. Otherwise it does not change.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   static const Device device;
   std::ofstream(device.list(), std::ios::binary)

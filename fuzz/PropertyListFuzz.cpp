@@ -23,7 +23,7 @@ std::int64_t microsecondsOf(const Date& date) {
   return std::int64_t{date.seconds} * 1'000'000 + date.microseconds;
 }
 
-// Dates may come back a microsecond off.
+// Dates may change by a microsecond.
 bool isSame(const Value& left, const Value& right) {
   if (left.kind() != right.kind()) return false;
   switch (left.kind()) {
@@ -32,7 +32,7 @@ bool isSame(const Value& left, const Value& right) {
     case Value::Kind::Integer:
       return left.integer() == right.integer();
     case Value::Kind::Real:
-      // Bit for bit: what is no number is not equal to itself.
+      // Bit for bit, since a NaN is not equal to itself.
       return std::bit_cast<std::uint64_t>(*left.real()) == std::bit_cast<std::uint64_t>(*right.real());
     case Value::Kind::Boolean:
       return left.boolean() == right.boolean();
@@ -52,8 +52,8 @@ bool isSame(const Value& left, const Value& right) {
 
 }  // namespace
 
-// The input is one property list as it arrives. What could be read can be written in its own encoding and in
-// every other one that holds its texts, and what was written can be read again.
+// The input is one property list. A list that was read can be written in its own encoding, and in every other
+// encoding that holds its texts. The result can be read again.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   const auto list = readPropertyList({data, size});
   if (!list) return 0;

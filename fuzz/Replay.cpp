@@ -13,7 +13,8 @@ namespace {
 
 namespace fs = std::filesystem;
 
-// True when the file could be read. The name is told first: where an input ends the process, it stands last.
+// True when the file was read. The name is written first, so it is the last line when an input ends the
+// process.
 bool replay(const fs::path& path) {
   const auto bytes = varnel::readWholeFile(path);
   if (!bytes) {
@@ -22,7 +23,7 @@ bool replay(const fs::path& path) {
   }
   std::printf("%s\n", path.c_str());
   std::fflush(stdout);
-  // Exactly as large as the input, so that the sanitizers see the end.
+  // Exactly as large as the input, so that the sanitizers notice reads past its end.
   const std::vector<std::uint8_t> input(bytes->begin(), bytes->end());
   LLVMFuzzerTestOneInput(input.data(), input.size());
   return true;

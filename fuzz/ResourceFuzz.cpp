@@ -38,7 +38,7 @@ Bytes packet(std::uint16_t logCode, std::size_t size) {
 
 enum class Writing { Checked, Unchecked };
 
-// Decodes into whatever the template has where a section is expected.
+// Decodes packets into whatever the template has in place of sections.
 void checkTemplate(std::string_view technology, const Services& services, const std::vector<Bytes>& packets,
                    Writing writing) {
   const auto generator = LogGenerator::generatorFromTechnology(technology, services);

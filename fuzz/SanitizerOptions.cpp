@@ -1,8 +1,8 @@
-// What the sanitizers of a fuzz target do unless the environment tells otherwise. Most of the time went into
-// remembering who had allocated what, and into memory that no cache held any more. So ASan tells of a use
-// after free while no more than 64 KiB have been freed since; the corpora run under its defaults in the
-// tests. What it keeps of large blocks it clears in place, for the kernel takes longer to give it new pages.
-// ASAN_OPTIONS=malloc_context_size=30 tells more of a finding.
+// Options of the sanitizers in fuzz targets, unless the environment sets others. Most of the time went into
+// remembering who had allocated what, and into memory that was no longer in the cache. So ASan finds a use
+// after free only while at most 64 KiB have been freed since then. The tests run the corpora with its default
+// options. ASan clears large blocks in place, since new pages from the kernel take longer.
+// ASAN_OPTIONS=malloc_context_size=30 tells more about a finding.
 extern "C" const char* __asan_default_options() {
   return "malloc_context_size=1:max_malloc_fill_size=0"
          ":quarantine_size_mb=0:thread_local_quarantine_size_kb=64:clear_shadow_mmap_threshold=1073741824";

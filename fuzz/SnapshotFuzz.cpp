@@ -40,7 +40,7 @@ bool isStoredDisplay(const Value& item) { return item.dictionary() && item.dicti
 
 bool isBinaryLog(const Value& item) { return item.dictionary() && item.dictionary()->get("DLF").data(); }
 
-// What one of the program's writers puts out, as a text.
+// The output of one of the program's writers, as a text.
 class Output {
  public:
   Output() : _file(open_memstream(&_text, &_size)) { require(_file, "there is a stream in memory"); }
@@ -60,7 +60,7 @@ class Output {
   std::FILE* _file;
 };
 
-// Takes one field of a table and the character that ends it, a comma or a newline.
+// Takes one field of the CSV text and the character that ends it, a comma or a newline.
 std::string takeField(std::string_view& table, char end) {
   std::string field;
   const bool isQuoted = table.starts_with('"');
@@ -188,8 +188,8 @@ void checkBinaryLog(const SnapshotFile& snapshot) {
 
 }  // namespace
 
-// The input is a snapshot that the user names. It is one or the other: told from captures by how it begins,
-// and refused with one line, or shown in every format that there is.
+// The input is a snapshot that the user names. It is told from captures by how it begins, and is either
+// refused with one line or shown in every format.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   static MemoryFile file;
   const ByteView bytes(data, size);

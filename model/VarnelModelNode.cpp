@@ -18,13 +18,13 @@ constexpr std::string_view unknownValue = "(unknown)";
 using Node = std::shared_ptr<const VarnelModelNode>;
 using Children = VarnelModelNode::Children;
 
-// A row of a dictionary as the tree shows it.
+// An entry of a dictionary as a child in the tree.
 struct Row {
   std::string_view name;
   const Value* value;
 };
 
-// The rows of a dictionary in the tree's order.
+// The entries of a dictionary in the tree's order.
 std::vector<Row> rowsOf(const Dictionary& entries) {
   std::vector<const Dictionary::Entry*> inOrder;
   inOrder.reserve(entries.size());
@@ -89,14 +89,14 @@ class TreeBuilder {
   PathDictionary& _paths;
 };
 
-// The text of what is shown as a leaf; nothing for what has rows.
+// The text of an object that the tree shows as a leaf; nothing for an object with children.
 std::optional<std::string_view> leafText(const Value& object) {
   if (object.dictionary() || object.array()) return std::nullopt;
   const std::string* text = object.string();
   return text ? std::string_view(*text) : unknownValue;
 }
 
-// The first row, in the tree's order, of which the function says yes; null when there is none.
+// The first entry, in the tree's order, for which the predicate is true; null when there is none.
 template <class Predicate>
 const Value* firstRow(const Value& object, const Predicate& isWanted) {
   if (const Dictionary* entries = object.dictionary()) {
@@ -110,16 +110,16 @@ const Value* firstRow(const Value& object, const Predicate& isWanted) {
   return nullptr;
 }
 
-// Finds what the tree would have under a path. A node is recorded after all below it, and of two with the
-// same path the later one counts: so the walk begins with the node itself and goes on with its last child. It
-// enters nothing but what may lead to the path.
+// Finds what the tree would have under a path. The tree records a node after all nodes below it, and of two
+// nodes with the same path the later one counts. So the search checks the node itself first, and then its
+// children from the last to the first. It enters only containers that may lead to the path.
 class ObjectFinder {
  public:
   enum class Brackets { BelongToNames, MaySelect };
 
   ObjectFinder(std::string_view path, Brackets brackets) : _path(path), _brackets(brackets) {}
 
-  // The first so many characters of the path are the object's own. Null when nothing has the path.
+  // The object's own path is the first `length` characters. Null when nothing has the path.
   const Value* findFrom(const Value& object, std::size_t length) {
     if (length == _path.size()) return &object;
     if (const Selection selection = select(object, length); selection.record)
@@ -138,10 +138,10 @@ class ObjectFinder {
  private:
   struct Selection {
     const Value* record;
-    std::size_t length;  // of the path up to the end of what selects the record
+    std::size_t length;  // of the path up to the end of the selections
   };
 
-  // The first record that has all the rows which stand in brackets at this place of the path.
+  // The first record that meets all selections at this place of the path.
   Selection select(const Value& list, std::size_t length) {
     if (_brackets != Brackets::MaySelect || length == _path.size() || _path[length] != '[')
       return {nullptr, length};
@@ -156,8 +156,9 @@ class ObjectFinder {
     return {record, end};
   }
 
-  // The same place when the record lacks one of the rows. What stands in the brackets is held against the
-  // record's rows, not taken apart: names and values may hold any character.
+  // The end of the selections; `length` itself when the record does not meet one of them. The function
+  // compares the text in the brackets with the record's entries instead of parsing it: names and values may
+  // hold any character.
   std::size_t endOfBrackets(const Value& record, std::size_t length) const {
     std::size_t end = length;
     while (end < _path.size() && _path[end] == '[') {
@@ -179,7 +180,8 @@ class ObjectFinder {
     return true;
   }
 
-  // Rows of one name that share what is below them would have it searched over and over.
+  // Entries of the same name can share what is below them. Without this, the shared part would be searched
+  // again and again.
   template <class Container>
   const Value* findIn(const Container& container, std::size_t length) {
     const std::pair<const void*, std::size_t> search(&container, length);

@@ -13,10 +13,10 @@ namespace varnel {
 
 class VarnelModelNode;
 
-/// Path → the node last built under it. It shares every node with the tree.
+/// Path → the last node that was built under it. It shares every node with the tree.
 using PathDictionary = std::unordered_map<std::string, std::shared_ptr<const VarnelModelNode>>;
 
-/// A node of the display tree. Nothing in a tree changes once it is built.
+/// A node of the display tree. A tree does not change after it was built.
 class VarnelModelNode {
  public:
   using Children = std::vector<std::shared_ptr<const VarnelModelNode>>;
@@ -30,8 +30,8 @@ class VarnelModelNode {
   /// The text of a leaf; null for an inner node.
   virtual const std::string* value() const { return nullptr; }
 
-  /// Builds the tree of a display object, which may be absent: its root is named "Varnel" and has the path
-  /// "/". Every node is recorded in the path dictionary; of two with the same path the later one.
+  /// Builds the tree of a display object, which may be absent. The root is named "Varnel" and has the path
+  /// "/". Records every node in the path dictionary; of two nodes with the same path, the later one.
   static std::shared_ptr<const VarnelModelNode> makeTreeFromObject_withPathDictionary(const Value& object,
                                                                                       PathDictionary& paths);
 
@@ -66,15 +66,16 @@ class VarnelModelTreeNode final : public VarnelModelNode {
   Origin _origin;
 };
 
-/// The value of the leaf that the display object's tree would have under the path, found without building the
-/// tree; nothing when that is an inner node or nothing has the path. Valid until the object changes.
+/// The value of the leaf that the display object's tree would have under the path. It builds no tree. Nothing
+/// when the path leads to an inner node or nowhere. Valid until the object changes.
 ///
-/// Where no node has the path as it stands, `[name=value]` behind a list's path selects the first of its
-/// records that has a leaf of that name and value: "/Cells[ID=16]/RSRP". Several in a row select the first
-/// record that has all of them.
+/// Where no node has exactly this path, `[name=value]` after the path of a list selects the first record that
+/// has a leaf with this name and value: "/Cells[ID=16]/RSRP". Several selections one after the other select
+/// the first record that meets all of them.
 std::optional<std::string_view> leafValueUnderPath(const Value& object, std::string_view path);
 
-/// The path of a child: the parent's, a "/" unless it ends in one, and the name as it is. Names may hold "/".
+/// The path of a child: the parent's path, a "/" unless it ends in one, and the name unchanged. Names may
+/// hold "/".
 std::string childPath(std::string_view parentPath, std::string_view name);
 
 }  // namespace varnel

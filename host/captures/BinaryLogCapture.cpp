@@ -15,15 +15,15 @@ namespace {
 
 constexpr std::uint8_t prefixMark = 0x81, packetLogType = 1, serverLogType = 0xFF;
 constexpr std::uint16_t reportCode = 0x1FFD;
-// The upper four bits of a modem's log codes say which part of it they are of, and are never 0.
+// The upper four bits of a modem's log code name a part of the modem and are never 0.
 constexpr std::uint16_t firstModemCode = 0x1000;
 constexpr std::size_t codeOffset = 2, timeOffset = 4;
 
-// A server counts milliseconds, so it would take 49 days to get here; a modem 82 s from its start.
+// A server's count of milliseconds would take 49 days to get here, a modem's time 82 s from its start.
 constexpr std::uint64_t leastModemTime = std::uint64_t{1} << 32;
 // The year 2100.
 constexpr std::uint64_t endOfTime = std::uint64_t{0x02C2} << 48;
-// An hour of a modem's time, and more of a server's.
+// An hour in a modem's time, and more in a server's.
 constexpr std::uint64_t near = std::uint64_t{3600} * 800 << 16;
 
 constexpr int lookAhead = 3;  // records
@@ -31,11 +31,11 @@ constexpr std::size_t longestMessage = 3 + 0xFFFF;
 
 bool isLogType(std::uint8_t byte) { return byte == packetLogType || byte == serverLogType; }
 
-// A place where a record may begin, counted from where the last one ended.
+// A place where a record may begin, relative to the end of the last one.
 struct Candidate {
   std::size_t recordOffset = 0;
   std::size_t end = 0;
-  int likelihood = 0;  // 2 for a time that is one, 1 for a log type in its place
+  int likelihood = 0;  // 2 for a plausible time, 1 for a log type in its place
 };
 
 struct Candidates {
@@ -52,7 +52,8 @@ void add(Candidates& candidates, ByteView bytes, std::size_t recordOffset, int l
   candidates.list[candidates.count++] = {recordOffset, recordOffset + length, likelihood + (hasTime ? 2 : 0)};
 }
 
-// A message has its log type, or its prefix and that; the first of an interval has lost the first of these.
+// A message begins with its log type, or with a prefix and its log type. The first message of an interval has
+// lost its first byte.
 Candidates candidatesAt(ByteView bytes) {
   Candidates candidates;
   if (bytes.size() < smallestRecord) return candidates;
@@ -63,7 +64,7 @@ Candidates candidatesAt(ByteView bytes) {
   return candidates;
 }
 
-// How well what follows fits, record by record. The end fits best.
+// How well the following records fit. The end of the log fits best.
 int likelihoodOf(ByteView bytes, int records) {
   if (records == 0) return 0;
   if (bytes.empty()) return 3 * records;
@@ -102,7 +103,8 @@ bool BinaryLogCapture::next(CaptureRecord& record) {
     const Candidates candidates = candidatesAt(unread);
     for (std::size_t i = 0; i < candidates.count; ++i) {
       const Candidate& candidate = candidates.list[i];
-      // Behind what is no record a byte before a log type is more likely part of that than of a prefix.
+      // After bytes that are no record, a byte before a log type is more likely one of them than a part of a
+      // prefix.
       if (_position == Position::Searching && candidate.recordOffset == 2) continue;
       const int rest = likelihoodOf(unread.subspan(candidate.end), lookAhead);
       const bool hasTime = candidate.likelihood >= 2;

@@ -7,9 +7,8 @@
 namespace varnel {
 
 /// The binary log that viewers of this system save: a version report, then the messages of each display's
-/// interval. An interval has lost its first byte; its later messages have kept their log type and what stands
-/// before it. Records are found by their lengths and by what follows them; whatever else the log holds is
-/// counted.
+/// interval. An interval has lost its first byte. Its later messages have kept their log type and their
+/// prefix. The class finds records by their lengths and by what follows them. All other bytes are counted.
 class BinaryLogCapture final : public Capture {
  public:
   explicit BinaryLogCapture(CaptureInput input) : Capture(std::move(input)) {}
@@ -23,13 +22,13 @@ class BinaryLogCapture final : public Capture {
 
   bool _hasReport = true;
   Position _position = Position::BehindRecord;
-  std::optional<std::uint64_t> _lastTime;  // as the last record's header has it
+  std::optional<std::uint64_t> _lastTime;  // from the header of the last record
 };
 
-/// The length of the version report, with which such a log begins.
+/// The length of the version report at the beginning of such a log.
 inline constexpr std::size_t versionReportSize = 161;
 
-/// Whether that is what the bytes begin with; not when there are too few to say so.
+/// Whether the bytes begin with a version report; false when there are too few bytes.
 bool beginsWithVersionReport(ByteView bytes);
 
 }  // namespace varnel

@@ -40,7 +40,7 @@ class FileSource final : public ByteSource {
         return static_cast<std::size_t>(count);
       }
       if (count == 0 && !mayGrow()) return 0;
-      // A terminal whose other side has gone away says so once it is read.
+      // A terminal whose other side has gone reports this error when it is read.
       if (count < 0 && errno == EIO && ::isatty(_file)) return 0;
       if (count < 0 && errno != EINTR && errno != EAGAIN)
         throw CaptureError("cannot read " + _name + ": " + lastSystemError());
@@ -63,7 +63,7 @@ class FileSource final : public ByteSource {
   }
   bool mayGrow() const { return _atEnd == AtEndOfFile::WaitForMore && hasMode(S_IFREG); }
 
-  // A file is always ready to be read, be it at its end: only the clock helps.
+  // A file can always be read, even at its end. So only waiting for a while helps.
   void waitForMore(bool isAtEndOfFile) const {
     pollfd file{.fd = isAtEndOfFile ? -1 : _file, .events = POLLIN, .revents = 0};
     ::poll(&file, 1, isAtEndOfFile ? pause_ms : -1);

@@ -7,8 +7,8 @@ namespace varnel {
 
 namespace {
 
-// Large enough that a read costs little beside what is done with its bytes, small enough for the cache. Small
-// captures are done before it comes to that.
+// Large enough that a read costs little compared with the work on its bytes, and small enough for the cache.
+// A small capture ends before its size matters.
 constexpr std::size_t usual = 1 << 18, first = 1 << 14;
 
 }  // namespace

@@ -10,25 +10,25 @@
 
 namespace varnel {
 
-/// The unread bytes of a source in one piece, which grows on demand. Whoever asks for more says how much he
-/// wants at the most, so memory stays as small as the largest thing that is looked at whole.
+/// The unread bytes of a source in one piece, which grows on demand. The caller says how many bytes it needs
+/// at most, so memory stays as small as the largest thing that is looked at as a whole.
 class ByteWindow {
  public:
-  /// So many bytes before the unread ones belong to the reader, who may put there what is to stand before.
+  /// The reader may write this many bytes before the unread bytes, to put something in front of them.
   static constexpr std::size_t headroom = 4;
 
   explicit ByteWindow(std::unique_ptr<ByteSource> source) : _source(std::move(source)) {}
 
-  /// The reader may write to them: they are his alone. Valid until more are read.
+  /// The reader may change the bytes. Valid until more are read.
   std::span<std::uint8_t> unread() { return {_bytes.data() + _begin, _end - _begin}; }
 
-  /// Those bytes have been read. They stay valid until more are.
+  /// Marks the bytes as read. They stay valid until more are read.
   void drop(std::size_t count) { _begin += count; }
 
-  /// Reads what there is next, once; false at the end. Throws CaptureError.
+  /// Reads once from the source; false at the end. Throws CaptureError.
   bool more();
 
-  /// Reads until that many are unread; false when there are fewer. Throws CaptureError.
+  /// Reads until this many bytes are unread; false when there are fewer. Throws CaptureError.
   bool holds(std::size_t count) {
     while (_end - _begin < count) {
       if (!more()) return false;
@@ -36,7 +36,8 @@ class ByteWindow {
     return true;
   }
 
-  /// Drops that many, which need not be there yet; false when the end comes before. Throws CaptureError.
+  /// Drops this many bytes, also those that have not been read yet; false when the end comes first. Throws
+  /// CaptureError.
   bool skip(std::uint64_t count);
 
   std::uint64_t bytesRead() const { return _source->bytesRead(); }

@@ -7,7 +7,7 @@
 
 namespace varnel {
 
-/// Makes the bytes of a capture, for whoever puts them somewhere: the beginning once, then each record's.
+/// Makes the bytes of a capture, which the caller writes: the beginning once, then the bytes of each record.
 class CaptureEncoder {
  public:
   CaptureEncoder() = default;
@@ -15,11 +15,11 @@ class CaptureEncoder {
   CaptureEncoder& operator=(const CaptureEncoder&) = delete;
   virtual ~CaptureEncoder() = default;
 
-  /// What stands before the first record; may be empty.
+  /// The bytes before the first record; may be empty.
   virtual ByteView beginning() { return {}; }
 
-  /// The bytes of a record, valid until the next call; empty for a message that has no place in such a
-  /// capture, which is then counted.
+  /// The bytes of a record, valid until the next call. Empty for a message that this form cannot hold; it is
+  /// counted.
   virtual ByteView encode(const CaptureRecord& record) = 0;
 
   /// How many messages were left out so far.
@@ -35,10 +35,10 @@ class CaptureEncoder {
   std::uint64_t _leftOut = 0;
 };
 
-/// Appends the log record in a message of log type 1: without what stands before it, its length its own, its
-/// time the modem's. A time in its header that a modem did not put there, such as a server's count of
-/// milliseconds, gives way to the record's. False, with nothing appended, for other messages and for those
-/// that are longer than a record can be.
+/// Appends the log record in a message of log type 1, without what is before it. The record gets its own
+/// length and the modem's time. If the time in its header is not a modem's, such as a server's count of
+/// milliseconds, the capture's time of the record replaces it. Returns false, without appending anything, for
+/// other messages and for messages that are longer than a record can be.
 bool appendLogRecord(Bytes& bytes, const CaptureRecord& record);
 
 }  // namespace varnel

@@ -8,7 +8,7 @@
 
 namespace varnel {
 
-/// What captures are made of.
+/// The kinds of captures.
 enum class CaptureKind {
   Pcap,
   Pcapng,
@@ -16,27 +16,27 @@ enum class CaptureKind {
   FramedStream,
   LengthFramedStream,
   RecordStream,
-  BinaryLog,  ///< records as a viewer of this system saves them
+  BinaryLog,  ///< log records as a viewer of this system saves them
 };
 
 struct Recognition {
   enum class Verdict { Known, Unknown, NeedsMore };
   Verdict verdict = Verdict::Unknown;
   CaptureKind kind{};
-  std::size_t headerSize = 0;  ///< of what stands before the first frame
+  std::size_t headerSize = 0;  ///< bytes before the first frame
 };
 
-/// Whether the bytes are all that there is.
+/// Whether more bytes follow.
 enum class Beginning { OfMore, Whole };
 
-/// Tells what begins with these bytes.
+/// Finds the kind of a capture that begins with these bytes.
 Recognition recognise(ByteView bytes, Beginning beginning);
 
-/// So many bytes and no more are looked at for a sound frame.
+/// At most this many bytes are searched for a sound frame.
 inline constexpr std::size_t longestSearch = std::size_t{1} << 16;
 
-/// What a file holds that is no capture, and what would help, as the rest of a sentence that begins with the
-/// file's name.
+/// What a file that is no capture holds, and what would help. The text is the rest of a sentence that begins
+/// with the name of the file.
 std::string whatElseItIs(ByteView bytes);
 
 }  // namespace varnel

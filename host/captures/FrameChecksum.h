@@ -10,7 +10,7 @@ namespace varnel {
 /// V.41, as X.25 uses it). Of "123456789" it is 0x906E.
 std::uint16_t frameChecksum(ByteView contents);
 
-/// Whether the frame, its two bytes of checksum at the end, is sound.
+/// Whether the frame, with its two bytes of checksum at the end, is sound.
 bool isSound(ByteView frame);
 
 }  // namespace varnel

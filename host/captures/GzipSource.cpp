@@ -48,7 +48,7 @@ std::size_t GzipSource::read(std::span<std::uint8_t> room) {
   return 0;
 }
 
-// What follows a piece and is none is passed over, as gzip does.
+// Like gzip, ignores bytes after a piece that are no piece.
 bool GzipSource::beginsNextPiece() {
   if (!_packed.holds(2)) return false;
   const auto packed = _packed.unread();

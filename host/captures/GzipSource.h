@@ -8,8 +8,8 @@
 
 namespace varnel {
 
-/// What gzip has packed, be it in several pieces. Where the packed bytes are cut off the source ends after
-/// all that could be unpacked; damaged ones throw CaptureError.
+/// Bytes that gzip has packed, in one or several pieces. When the packed bytes are cut off, the source ends
+/// after all that it could unpack. Damaged bytes throw CaptureError.
 class GzipSource final : public ByteSource {
  public:
   GzipSource(ByteWindow packed, std::string name);

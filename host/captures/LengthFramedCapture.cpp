@@ -42,14 +42,14 @@ std::optional<std::span<std::uint8_t>> LengthFramedCapture::nextContents() {
     }
     if (!size && bytes().more()) continue;
     if (bytes().unread().empty()) return std::nullopt;
-    // A frame that breaks off counts once, however many bytes it takes to find the next.
+    // A torn frame counts once, however many bytes come before the next frame.
     if (!isTorn) ++count().torn;
     isTorn = true;
     passOver();
   }
 }
 
-// To where the next frame may begin.
+// Skips to where the next frame may begin.
 void LengthFramedCapture::passOver() {
   const auto unread = bytes().unread().subspan(1);
   const auto next = std::ranges::find(unread, mark);

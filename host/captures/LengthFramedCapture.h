@@ -7,8 +7,8 @@
 
 namespace varnel {
 
-/// The stream of a diagnostic port whose frames tell their length and need no escapes: 7E 01, the length (2),
-/// the contents, 7E.
+/// The stream of a diagnostic port whose frames have a length and no escapes: 7E 01, the length (2), the
+/// contents, 7E.
 class LengthFramedCapture final : public Capture {
  public:
   explicit LengthFramedCapture(CaptureInput input) : Capture(std::move(input)) {}
@@ -19,11 +19,10 @@ class LengthFramedCapture final : public Capture {
   void passOver();
 };
 
-/// Looks at the start of such a stream: the size of the frame that begins there, 0 when none does, nothing
-/// when there are too few bytes to say so.
+/// The size of the frame that begins here; 0 when none does; nothing when there are too few bytes to decide.
 std::optional<std::size_t> lengthFrameAt(ByteView bytes);
 
-/// What stands around a frame's contents.
+/// The bytes around a frame's contents.
 inline constexpr std::size_t lengthFrameHeader = 4, lengthFrameTrailer = 1;
 
 }  // namespace varnel

@@ -10,7 +10,7 @@ namespace varnel {
 
 static_assert(std::endian::native == std::endian::little, "numbers are loaded and stored as they are");
 
-/// The little-endian number at an offset, which lies within the bytes.
+/// The little-endian number at an offset. It must lie within the bytes.
 template <class Number>
 Number loadLittleEndian(ByteView bytes, std::size_t offset) {
   Number number{};

@@ -14,7 +14,8 @@ constexpr std::size_t subscriptionOffset = 4;
 constexpr std::uint8_t packetLogType = 1;
 constexpr std::uint8_t prefixMark = 0x81;
 
-// A byte tells them on the log channel, where 0 is none. Larger ones stand for "any" and the like.
+// The log channel has one byte for the subscription, where 0 is none. Larger numbers stand for "any" and the
+// like.
 std::optional<std::uint8_t> subscriptionNumber(std::uint32_t number) {
   if (number == 0 || number > 0xFF) return std::nullopt;
   return static_cast<std::uint8_t>(number);
@@ -28,7 +29,7 @@ std::optional<std::uint8_t> unwrap(std::span<std::uint8_t>& contents) {
   return subscription;
 }
 
-// Of the two lengths the record's own counts; nothing when it is longer than the frame.
+// Of the two lengths, the record's own counts. Nothing when the record is longer than the frame.
 std::span<std::uint8_t> recordIn(std::span<std::uint8_t> contents) {
   if (contents.size() < logFrameHeader + smallestRecord) return {};
   const auto length = loadLittleEndian<std::uint16_t>(contents, logFrameHeader);

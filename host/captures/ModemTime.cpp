@@ -18,7 +18,7 @@ static_assert(modemEpoch.seconds == 315'964'800);
 
 Time timeOf(ModemTime time) {
   const std::uint64_t units = time.raw >> 16, parts = time.raw & 0xFFFF;
-  // The parts may be more than a unit, in what no modem sent.
+  // In bytes that no modem has sent, the parts can be more than a unit.
   const std::uint64_t nanoseconds = units % unitsPerSecond * nanosecondsPerUnit +
                                     (parts * nanosecondsPerUnit + partsPerUnit / 2) / partsPerUnit;
   const std::uint64_t seconds = units / unitsPerSecond + nanoseconds / nanosecondsPerSecond;

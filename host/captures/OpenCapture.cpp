@@ -16,7 +16,7 @@ namespace {
 
 using Verdict = Recognition::Verdict;
 
-// Reads no further than it takes to tell.
+// Reads only as far as it needs to decide.
 Recognition recogniseStart(ByteWindow& bytes) {
   for (;;) {
     const Recognition found = recognise(bytes.unread(), Beginning::OfMore);

@@ -11,7 +11,7 @@ namespace {
 
 constexpr std::uint32_t microsecondMagic = 0xA1B2C3D4, nanosecondMagic = 0xA1B23C4D;
 constexpr std::size_t headerSize = 24, linkTypeOffset = 20, recordHeaderSize = 16;
-// The upper bits tell of checksums.
+// The upper bits describe checksums.
 constexpr std::uint32_t linkTypeBits = 0xFFFF;
 constexpr std::int64_t nanosecondsPerSecond = 1'000'000'000;
 
@@ -22,7 +22,7 @@ struct LinkType {
   const char* holds;
 };
 
-// The numbers that are registered for pcap; those that people who look at phones come across.
+// Registered link types of pcap that people who look at phones may meet.
 constexpr LinkType linkTypes[] = {
     {1, "Ethernet frames"},
     {12, "IP packets"},
@@ -47,7 +47,7 @@ std::uint32_t bigEndian16(ByteView bytes, std::size_t offset) {
   return std::uint32_t{bytes[offset]} << 8 | bytes[offset + 1];
 }
 
-// Messages of the air interface travel in UDP over IPv4, to a port of their own.
+// Messages of the air interface travel in UDP over IPv4, to a known port.
 bool holdsAirInterfaceMessages(ByteView bytes) {
   constexpr std::uint8_t version4 = 0x45, udp = 17;
   constexpr std::uint32_t port = 4729;

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// pcap of link type USER0: each record is one message. The record's own stamp is its time.
+/// pcap of link type USER0. Each record is one message, and its time stamp is the message's time.
 class PcapCapture final : public Capture {
  public:
   /// The link type of captures of the log channel.
@@ -28,10 +28,10 @@ class PcapCapture final : public Capture {
 /// Whether a pcap file begins with these four bytes.
 bool isPcapMagic(ByteView bytes);
 
-/// The sentence for a capture of another link type, some of whose bytes may say more.
+/// The sentence for a capture of another link type. Some of its bytes may tell more about it.
 std::string foreignLinkType(const std::string& name, std::uint32_t linkType, ByteView someBytes);
 
-/// Completes a record of pcap: the message's prefix tells its subscription.
+/// Completes a record of pcap. The message's prefix tells its subscription.
 void setMessage(CaptureRecord& record, ByteView message);
 
 /// The line for a record that is too long.

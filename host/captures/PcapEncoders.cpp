@@ -30,7 +30,7 @@ void putOption(Bytes& bytes, std::uint16_t kind, ByteView value) {
   pad(bytes);
 }
 
-// The size stands at the beginning and the end of a block.
+// A block has its size at the beginning and at the end.
 void putBlock(Bytes& bytes, std::uint32_t type, const Bytes& body) {
   const auto size = static_cast<std::uint32_t>(body.size() + 12);
   put(bytes, type, size);

@@ -6,8 +6,7 @@
 
 namespace varnel {
 
-/// pcap of link type USER0 with nanoseconds, each message a record. Of a time its seconds are kept as 32
-/// bits.
+/// pcap of link type USER0 with nanoseconds. Each message is a record. pcap keeps 32 bits of the seconds.
 class PcapWriter final : public CaptureEncoder {
  public:
   ByteView beginning() override;
@@ -17,13 +16,13 @@ class PcapWriter final : public CaptureEncoder {
   Bytes _bytes;
 };
 
-/// pcapng of link type USER0 with nanoseconds, each message a packet; the description of its interface is the
-/// technology.
+/// pcapng of link type USER0 with nanoseconds. Each message is a packet. The description of its interface is
+/// the technology.
 class PcapngWriter final : public CaptureEncoder {
  public:
   explicit PcapngWriter(std::string technology) : _technology(std::move(technology)) {}
   ByteView beginning() override;
-  /// Times before 1970 and after 2554 become those.
+  /// A time before 1970 becomes 1970, and a time after 2554 becomes the last one that fits.
   ByteView encode(const CaptureRecord& record) override;
 
  private:

@@ -20,7 +20,7 @@ constexpr std::uint16_t end = 0, description = 3, resolution = 9, timeOffset = 1
 
 constexpr std::uint32_t byteOrderMagic = 0x1A2B3C4D;
 constexpr std::size_t blockHeader = 8, blockTrailer = 4;
-// Of a block that describes something: what is longer describes nothing that is needed.
+// The longest block with a description that is read. Longer ones hold nothing that is needed.
 constexpr std::size_t longestDescription = 1 << 16;
 constexpr std::size_t mostInterfaces = 4096;
 constexpr std::uint8_t isPowerOfTwo = 0x80;
@@ -28,8 +28,8 @@ constexpr std::uint64_t nanosecondsPerSecond = 1'000'000'000;
 
 std::size_t padded(std::size_t size) { return (size + 3) / 4 * 4; }
 
-// Parts of a second in nanoseconds; they are fewer than there are in a second, which are a power of ten or
-// two.
+// Parts of a second in nanoseconds. There are fewer parts than `partsPerSecond`, which is a power of ten or
+// of two.
 std::uint64_t nanosecondsOf(std::uint64_t parts, std::uint64_t partsPerSecond) {
   if (partsPerSecond % nanosecondsPerSecond == 0) return parts / (partsPerSecond / nanosecondsPerSecond);
   constexpr std::uint64_t finest = std::uint64_t{1} << 32;
@@ -83,7 +83,8 @@ bool PcapngCapture::next(CaptureRecord& record) {
   return false;
 }
 
-// The header of the next block, which is unread yet; nothing at the end. A section's is taken care of.
+// The header of the next block, which is still unread; nothing at the end. Handles the header of a section
+// itself.
 std::optional<PcapngCapture::Block> PcapngCapture::nextBlock() {
   if (!bytes().holds(blockHeader)) {
     if (bytes().unread().empty()) return std::nullopt;
@@ -164,7 +165,7 @@ bool PcapngCapture::takePacket(const Block& block, CaptureRecord& record) {
   if (packet->time) _lastTime = *packet->time;
   record.time = _lastTime;
   record.dating = packet->time ? Dating::Known : Dating::Unknown;
-  // What follows the message is rarely more than four bytes, but may be anything.
+  // After the message there are rarely more than four bytes, but there can be any number.
   if (block.size - whole > longestDescription) failAsDamaged();
   if (!bytes().holds(block.size)) failAsCutOff();
   if (u32(block.size - blockTrailer) != block.size) failAsDamaged();
@@ -173,7 +174,7 @@ bool PcapngCapture::takePacket(const Block& block, CaptureRecord& record) {
   return true;
 }
 
-// Where the message of a packet's block lies; nothing when the block contradicts itself.
+// The place of the message in a packet's block; nothing when the block contradicts itself.
 std::optional<PcapngCapture::PacketPlace> PcapngCapture::packetIn(const Block& block) {
   const bool isSimple = block.type == blockType::simplePacket;
   const std::size_t offset = isSimple ? 12 : 28;
@@ -208,7 +209,7 @@ Time PcapngCapture::timeAt(const Interface& interface, std::size_t offset) {
           static_cast<std::int32_t>(nanosecondsOf(parts % partsPerSecond, partsPerSecond))};
 }
 
-// Passes over the block, whose size stands at its end once more.
+// Skips the block, which has its size again at its end.
 void PcapngCapture::passOver(const Block& block) {
   if (!bytes().skip(block.size - blockTrailer) || !bytes().holds(blockTrailer)) failAsCutOff();
   if (u32(0) != block.size) failAsDamaged();

@@ -6,8 +6,9 @@
 
 namespace varnel {
 
-/// pcapng whose first interface has link type USER0: each of its packets is one message, with its own stamp.
-/// The interface's description may name the technology. Packets of other interfaces, if any, are left out.
+/// pcapng whose first interface has link type USER0. Each packet of this interface is one message with its
+/// own time stamp. The interface's description may name the technology. Packets of other interfaces are left
+/// out.
 class PcapngCapture final : public Capture {
  public:
   /// Throws CaptureError for another link type, and for a file without an interface.
@@ -19,7 +20,7 @@ class PcapngCapture final : public Capture {
   struct Interface {
     std::uint32_t linkType = 0;
     std::uint32_t snapshotLength = 0;  // 0: none
-    std::uint8_t resolution = 6;       // a power of ten, with the highest bit of two
+    std::uint8_t resolution = 6;       // a power of ten, or a power of two if the highest bit is set
     std::int64_t offset_s = 0;
     std::string description{};
   };

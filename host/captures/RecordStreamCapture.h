@@ -4,8 +4,8 @@
 
 namespace varnel {
 
-/// Log records end to end: length (2), code (2), time (8), payload. Nothing marks where one begins, so the
-/// first whose length cannot be ends the capture; what follows is counted as noise.
+/// Log records end to end: length (2), code (2), time (8), payload. Nothing marks where a record begins. So a
+/// record with an impossible length ends the capture, and the rest is counted as noise.
 class RecordStreamCapture final : public Capture {
  public:
   explicit RecordStreamCapture(CaptureInput input) : Capture(std::move(input)) {}

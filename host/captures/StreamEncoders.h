@@ -4,8 +4,8 @@
 
 namespace varnel {
 
-/// The framed stream of a diagnostic port, each record in a frame, in the wrapper where it has a
-/// subscription. It has a place for messages of log type 1 alone.
+/// The framed stream of a diagnostic port, one frame per record. A record with a subscription is in a
+/// wrapper. Holds only messages of log type 1.
 class FramedWriter final : public CaptureEncoder {
  public:
   ByteView encode(const CaptureRecord& record) override;
@@ -14,7 +14,7 @@ class FramedWriter final : public CaptureEncoder {
   Bytes _contents, _frame;
 };
 
-/// Log records end to end. It has a place for messages of log type 1 alone, and none for their subscriptions.
+/// Log records end to end. Holds only messages of log type 1, and not their subscriptions.
 class RecordStreamWriter final : public CaptureEncoder {
  public:
   ByteView encode(const CaptureRecord& record) override;
