@@ -26,9 +26,7 @@ VarnelPaneController& varnelPane(PaneController& controller) {
 }  // namespace
 
 VarnelApp::VarnelApp(const Host& host)
-    : _host(host),
-      _notices(host.model, host.wayToStartOver, [this] { showNotice(); }),
-      _alive(std::make_shared<VarnelApp*>(this)) {}
+    : _host(host), _notices(host.model, host.wayToStartOver, [this] { showNotice(); }) {}
 
 VarnelApp::~VarnelApp() = default;
 
@@ -183,9 +181,7 @@ void VarnelApp::closeSaveView() {
 }
 
 void VarnelApp::closeSaveViewLater() {
-  _host.model.queue.async([weak = std::weak_ptr(_alive)] {
-    if (const auto alive = weak.lock()) (*alive)->closeSaveView();
-  });
+  _host.model.queue.async(_whileAlive([this] { closeSaveView(); }));
 }
 
 void VarnelApp::setSaveViewController(std::shared_ptr<VarnelSaveViewController> controller) {

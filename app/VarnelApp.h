@@ -11,6 +11,7 @@
 #include "app/SaveControl.h"
 #include "app/VarnelPaneController.h"
 #include "app/VarnelSaveViewController.h"
+#include "base/WhileAlive.h"
 #include "model/VarnelModel.h"
 #include "platform/DeviceFiles.h"
 #include "platform/Preferences.h"
@@ -100,7 +101,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   std::shared_ptr<VarnelSaveViewController> _saveViewController;
   std::unique_ptr<NavigationStack> _navController;
   std::unique_ptr<Window> _window;
-  std::shared_ptr<VarnelApp*> _alive;
+  WhileAlive _whileAlive;
 };
 
 }  // namespace varnel

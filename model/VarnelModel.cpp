@@ -22,22 +22,18 @@ constexpr std::size_t longestTechnologyKept = 64;
 }  // namespace
 
 VarnelModel::VarnelModel(const ModelServices& services, VarnelModelObserver& observer)
-    : _services(services), _observer(observer), _alive(std::make_shared<VarnelModel*>(this)) {}
+    : _services(services), _observer(observer) {}
 
 VarnelModel::~VarnelModel() { destroyPorts(); }
-
-MainQueue::Task VarnelModel::whileAlive(void (VarnelModel::*operation)()) {
-  return [weak = std::weak_ptr(_alive), operation] {
-    if (const auto alive = weak.lock()) ((*alive)->*operation)();
-  };
-}
 
 void VarnelModel::restartMonitor() {
   destroyPorts();
   startMonitor();
 }
 
-void VarnelModel::restartMonitorLater() { _services.queue.async(whileAlive(&VarnelModel::restartMonitor)); }
+void VarnelModel::restartMonitorLater() {
+  _services.queue.async(_whileAlive([this] { restartMonitor(); }));
+}
 
 void VarnelModel::startMonitor() {
   if (_displayUpdateTimer) return;
@@ -72,13 +68,13 @@ StreamFailure VarnelModel::failureToStart() {
     return StreamFailure::Command;
   }
   logError("Starting the display update timer");
-  _displayUpdateTimer = _services.queue.repeating(refreshInterval, whileAlive(&VarnelModel::refresh));
+  _displayUpdateTimer = _services.queue.repeating(refreshInterval, _whileAlive([this] { refresh(); }));
   return StreamFailure::None;
 }
 
 void VarnelModel::retryLater() {
   destroyPorts();
-  _services.queue.after(retryDelay, whileAlive(&VarnelModel::startMonitor));
+  _services.queue.after(retryDelay, _whileAlive([this] { startMonitor(); }));
 }
 
 bool VarnelModel::createPorts() {
@@ -99,7 +95,7 @@ bool VarnelModel::createPorts() {
   _recvPort->deliverOnMainQueue();
   _recvPort->setInvalidationHandler([this, port = _recvPort.get()] { localPortWasInvalidated(port); });
 
-  auto connection = _services.telephony.connect(whileAlive(&VarnelModel::refresh));
+  auto connection = _services.telephony.connect(_whileAlive([this] { refresh(); }));
   if (!connection) {
     logError("Could not create TKServerConnection");
     return false;
@@ -194,7 +190,7 @@ void VarnelModel::refresh() {
   _updated = false;
   _nodes.reset();
   _nodesByPath.reset();
-  _services.queue.async(whileAlive(&VarnelModel::updateObserver));
+  _services.queue.async(_whileAlive([this] { _observer.updateViewControllerFromModel(); }));
 }
 
 // The port, and with it the handler that calls this, goes in between.
@@ -203,8 +199,6 @@ void VarnelModel::localPortWasInvalidated(const LocalPort* port) {
   restartMonitor();
   _observer.linkWasLost();
 }
-
-void VarnelModel::updateObserver() { _observer.updateViewControllerFromModel(); }
 
 void VarnelModel::updateWithData(ByteView data) {
   if (_logGenerator) _logGenerator->updateState_withData(_state, data);

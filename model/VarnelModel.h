@@ -8,6 +8,7 @@
 #include <string_view>
 
 #include "LogGenerator/LogGenerator.h"
+#include "base/WhileAlive.h"
 #include "model/VarnelModelNode.h"
 #include "platform/LinkReports.h"
 #include "platform/MainQueue.h"
@@ -116,11 +117,8 @@ class VarnelModel {
   StreamFailure failureToStart();
   void noteWhetherDisplayStands();
   void retryLater();
-  void updateObserver();
   void localPortWasInvalidated(const LocalPort* port);
   RemotePort::SendResult send(ByteView command, std::optional<std::chrono::milliseconds> replyTimeout);
-  /// A task that does nothing once the model is gone.
-  MainQueue::Task whileAlive(void (VarnelModel::*operation)());
 
   ModelServices _services;
   VarnelModelObserver& _observer;
@@ -138,7 +136,7 @@ class VarnelModel {
   std::shared_ptr<const VarnelModelNode> _nodes;
   std::optional<PathDictionary> _nodesByPath;
 
-  std::shared_ptr<VarnelModel*> _alive;
+  WhileAlive _whileAlive;
 };
 
 }  // namespace varnel
