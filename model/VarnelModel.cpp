@@ -19,6 +19,22 @@ constexpr std::chrono::milliseconds retryDelay = 5s;
 // Those that are known are shorter; a strange server may name anything.
 constexpr std::size_t longestTechnologyKept = 64;
 
+// Logs why there is none.
+std::optional<Value> technologyIn(ByteView reply) {
+  const auto list = readPropertyList(reply);
+  const Dictionary* answers = list ? list->dictionary() : nullptr;
+  if (!answers) {
+    logError(" ***** Could not parse reply to GetTechnology; cannot configure");
+    return std::nullopt;
+  }
+  const Value& technology = answers->get(getTechnologyKey);
+  if (technology.isAbsent()) {
+    logError(" ***** Reply to GetTechnology had no answer; cannot configure");
+    return std::nullopt;
+  }
+  return technology;
+}
+
 }  // namespace
 
 VarnelModel::VarnelModel(const ModelServices& services, VarnelModelObserver& observer)
@@ -78,6 +94,15 @@ void VarnelModel::retryLater() {
 }
 
 bool VarnelModel::createPorts() {
+  if (!createLocalPort()) return false;
+  const auto portName = createLogChannel();
+  if (!portName || !createRemotePort(*portName)) return false;
+  logError(" ***** Created ports (send=%p, recv=%p)", static_cast<const void*>(_sendPort.get()),
+           static_cast<const void*>(_recvPort.get()));
+  return true;
+}
+
+bool VarnelModel::createLocalPort() {
   auto created = _services.ports.createLocalPort(
       logChannelName, [this](std::int32_t identifier, ByteView data) noexcept -> std::optional<Bytes> {
         if (identifier == logMessageIdentifier) updateWithData(data);
@@ -94,30 +119,32 @@ bool VarnelModel::createPorts() {
   }
   _recvPort->deliverOnMainQueue();
   _recvPort->setInvalidationHandler([this, port = _recvPort.get()] { localPortWasInvalidated(port); });
+  return true;
+}
 
+std::optional<std::string> VarnelModel::createLogChannel() {
   auto connection = _services.telephony.connect(_whileAlive([this] { refresh(); }));
   if (!connection) {
     logError("Could not create TKServerConnection");
-    return false;
+    return std::nullopt;
   }
   const auto channel = connection->createLogChannel(logChannelName);
   connection.reset();
   if (channel.error != 0) {
     logError("_TKServerConnectionNetworkMonitorCreateLogChannel returns error: %ld!", channel.error);
-    return false;
+    return std::nullopt;
   }
   if (!channel.portName || channel.portName->empty()) {
     logError("Could not create a log channel (TK returned null port)!");
-    return false;
+    return std::nullopt;
   }
-  _sendPort = _services.ports.createRemotePort(*channel.portName);
-  if (!_sendPort) {
-    logError("Could not create the remote port!");
-    return false;
-  }
-  logError(" ***** Created ports (send=%p, recv=%p)", static_cast<const void*>(_sendPort.get()),
-           static_cast<const void*>(_recvPort.get()));
-  return true;
+  return channel.portName;
+}
+
+bool VarnelModel::createRemotePort(const std::string& name) {
+  _sendPort = _services.ports.createRemotePort(name);
+  if (!_sendPort) logError("Could not create the remote port!");
+  return _sendPort != nullptr;
 }
 
 void VarnelModel::destroyPorts() {
@@ -140,37 +167,32 @@ RemotePort::SendResult VarnelModel::send(ByteView command,
 }
 
 void VarnelModel::configureGenerator() {
+  const auto technology = askForTechnology();
+  if (!technology) return;
+  _logGenerator = LogGenerator::generatorFromTechnology(*technology, _services.generator);
+  logError("Got log generated: %p", static_cast<const void*>(_logGenerator.get()));
+  _technology = technology->string() ? technology->string()->substr(0, longestTechnologyKept) : std::string();
+  noteWhetherDisplayStands();
+}
+
+std::optional<Value> VarnelModel::askForTechnology() {
   Value request = Value::ofDictionary();
   request.dictionary()->set(getTechnologyKey, getTechnologyKey);
   const auto command = _services.writePropertyList(request);
   if (!command) {
     logError(" Could not generate GetTechnology command; cannot configure");
-    return;
+    return std::nullopt;
   }
   const auto sent = send(*command, replyTimeout);
   if (sent.status != 0) {
     logError(" ***** Could not send the GetTechnology command (got error=%d)", sent.status);
-    return;
+    return std::nullopt;
   }
   if (!sent.reply) {
     logError(" ***** No response to GetTechnology; cannot configure");
-    return;
+    return std::nullopt;
   }
-  const auto reply = readPropertyList(*sent.reply);
-  const Dictionary* answers = reply ? reply->dictionary() : nullptr;
-  if (!answers) {
-    logError(" ***** Could not parse reply to GetTechnology; cannot configure");
-    return;
-  }
-  const Value& technology = answers->get(getTechnologyKey);
-  if (technology.isAbsent()) {
-    logError(" ***** Reply to GetTechnology had no answer; cannot configure");
-    return;
-  }
-  _logGenerator = LogGenerator::generatorFromTechnology(technology, _services.generator);
-  logError("Got log generated: %p", static_cast<const void*>(_logGenerator.get()));
-  _technology = technology.string() ? technology.string()->substr(0, longestTechnologyKept) : std::string();
-  noteWhetherDisplayStands();
+  return technologyIn(*sent.reply);
 }
 
 // The state outlives the generators, and a display in it may be out of reach of a new one.

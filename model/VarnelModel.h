@@ -111,8 +111,14 @@ class VarnelModel {
 
  private:
   bool createPorts();
+  bool createLocalPort();
+  /// The name of the port that takes the channel's commands; nothing after a failure, which is logged.
+  std::optional<std::string> createLogChannel();
+  bool createRemotePort(const std::string& name);
   void destroyPorts();
   void configureGenerator();
+  /// Nothing when there is no answer, which is logged.
+  std::optional<Value> askForTechnology();
   bool startStream();
   StreamFailure failureToStart();
   void noteWhetherDisplayStands();
