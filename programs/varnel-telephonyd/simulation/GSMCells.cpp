@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
+
 namespace varnel::simulation {
 
 namespace {
@@ -50,7 +52,7 @@ int firstHoppingChannel(const Cell& cell) { return 60 + static_cast<int>(cell.id
 
 Bytes gsmConnectionState(const Situation& situation, const GSMConnection& connection) {
   constexpr std::size_t size = 17;
-  return situation.packet(connectionStateCode, size)
+  return PacketWriter(connectionStateCode, situation.now, size)
       .u8(13, static_cast<std::int64_t>(connection.state()))
       .u8(14, connection.state() == GSMConnection::State::Transfer ? 1 : 0)
       .u8(15, 0)
@@ -61,7 +63,7 @@ Bytes gsmConnectionState(const Situation& situation, const GSMConnection& connec
 Bytes gsmServingCell(const Situation& situation) {
   constexpr std::size_t size = 26;
   const Cell& cell = situation.serving;
-  return situation.packet(servingCellCode, size)
+  return PacketWriter(servingCellCode, situation.now, size)
       .u16(13, cell.channel)
       .u16(15, cell.code)
       .u16(17, cell.identity)
@@ -75,7 +77,7 @@ Bytes gsmMeasurements(const Situation& situation, const GSMConnection& connectio
   const bool isTransferring = connection.state() == GSMConnection::State::Transfer;
   const bool isTransferringData = isTransferring && !connection.isSpeaking();
 
-  PacketWriter packet = situation.packet(measurementsCode, headSize + recordSize * cells.size());
+  PacketWriter packet(measurementsCode, situation.now, headSize);
   packet.u8(15, receiveLevel(level_cdbm));
   if (connection.isSpeaking()) {
     const std::int64_t quality = receiveQuality(level_cdbm);
@@ -86,13 +88,11 @@ Bytes gsmMeasurements(const Situation& situation, const GSMConnection& connectio
   }
   // A phone that transfers data shall not change cells lightly.
   packet.u8(26, isTransferringData).u8(28, std::ssize(cells));
-  std::size_t record = headSize;
-  for (const auto& [cell, neighbourLevel_cdbm] : cells) {
-    packet.u16(record, cell->channel)
-        .u8(record + 2, receiveLevel(neighbourLevel_cdbm))
-        .u32(record + 3, pathLossCriterion_db(neighbourLevel_cdbm));
-    record += recordSize;
-  }
+  for (const auto& [cell, neighbourLevel_cdbm] : cells)
+    packet.record(recordSize)
+        .u16(0, cell->channel)
+        .u8(2, receiveLevel(neighbourLevel_cdbm))
+        .u32(3, pathLossCriterion_db(neighbourLevel_cdbm));
   return packet.finish();
 }
 
@@ -101,38 +101,34 @@ Bytes gsmNeighbourIdentities(const Situation& situation) {
   auto cells = neighbours(situation);
   std::erase_if(cells,
                 [](const ReceivedCell& received) { return received.level_cdbm < weakestIdentified_cdbm; });
-  PacketWriter packet = situation.packet(neighbourIdentitiesCode, headSize + recordSize * cells.size());
+  PacketWriter packet(neighbourIdentitiesCode, situation.now, headSize);
   packet.u8(14, std::ssize(cells));
-  std::size_t record = headSize;
-  for (const ReceivedCell& received : cells) {
-    packet.u16(record, received.cell->channel).u8(record + 2, received.cell->code);
-    record += recordSize;
-  }
+  for (const ReceivedCell& received : cells)
+    packet.record(recordSize).u16(0, received.cell->channel).u8(2, received.cell->code);
   return packet.finish();
 }
 
 Bytes gsmMobileAllocation(const Situation& situation) {
   constexpr std::size_t headSize = 15, entrySize = 2;
   constexpr int sequences = 64;
-  PacketWriter packet = situation.packet(mobileAllocationCode, headSize + entrySize * hoppingChannels);
+  PacketWriter packet(mobileAllocationCode, situation.now, headSize);
   packet.u8(13, situation.serving.identity % sequences).u8(14, hoppingChannels);
   for (int i = 0; i < hoppingChannels; ++i)
-    packet.u16(headSize + entrySize * static_cast<std::size_t>(i),
-               firstHoppingChannel(situation.serving) + hoppingStep * i);
+    packet.record(entrySize).u16(0, firstHoppingChannel(situation.serving) + hoppingStep * i);
   return packet.finish();
 }
 
 Bytes gsmDedicatedChannel(const Situation& situation, Random& random) {
   constexpr std::size_t size = 17;
   const std::int64_t hop = random.between(0, hoppingChannels - 1);
-  return situation.packet(dedicatedChannelCode, size)
+  return PacketWriter(dedicatedChannelCode, situation.now, size)
       .u16(13, firstHoppingChannel(situation.serving) + hoppingStep * hop)
       .finish();
 }
 
 Bytes gsmDiscontinuousTransmission(const Situation& situation, Random& random) {
   constexpr std::size_t size = 20;
-  return situation.packet(discontinuousTransmissionCode, size).u8(19, random.oneIn(2)).finish();
+  return PacketWriter(discontinuousTransmissionCode, situation.now, size).u8(19, random.oneIn(2)).finish();
 }
 
 }  // namespace varnel::simulation

@@ -4,6 +4,7 @@
 #include "programs/varnel-telephonyd/simulation/GPRSBroadcast.h"
 #include "programs/varnel-telephonyd/simulation/GSMCells.h"
 #include "programs/varnel-telephonyd/simulation/NetworkIdentity.h"
+#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
 #include "programs/varnel-telephonyd/simulation/UMTSCells.h"
 
 namespace varnel::simulation {
@@ -146,14 +147,14 @@ void GSMUMTSModem::sendUMTSServingCell() { send(umtsServingCell(situation())); }
 
 void GSMUMTSModem::sendUMTSState() {
   constexpr std::size_t size = 14;
-  send(situation().packet(umtsStateCode, size).u8(13, static_cast<std::int64_t>(_umts.state())).finish());
+  send(PacketWriter(umtsStateCode, now(), size).u8(13, static_cast<std::int64_t>(_umts.state())).finish());
 }
 
 // A connection is ciphered from its first dedicated channel to its end.
 void GSMUMTSModem::sendCiphering() {
   constexpr std::size_t size = 19;
   const bool isCiphered = _umts.state() != UMTSState::Disconnected && _umts.state() != UMTSState::Connecting;
-  send(situation().packet(cipheringCode, size).u8(13, isCiphered).finish());
+  send(PacketWriter(cipheringCode, now(), size).u8(13, isCiphered).finish());
 }
 
 void GSMUMTSModem::sendUMTSCells() { send(umtsCellSets(situation(), _umts.state(), _random)); }

@@ -21,7 +21,7 @@ std::int64_t wholeDecibels(std::int64_t level_cdbm) {
 
 Bytes hrpdStatusPacket(std::chrono::milliseconds now, const HRPDStatus& status) {
   constexpr std::size_t size = 50;
-  return PacketWriter(PacketWriter::LogType::Modem, statusCode, now, size)
+  return PacketWriter(statusCode, now, size)
       .bits(13, 0, 11, status.channel)
       .bits(14, 3, 5, status.bandClass)
       .u8(15, wholeDecibels(status.level_cdbm))
@@ -37,67 +37,55 @@ Bytes hrpdStatusPacket(std::chrono::milliseconds now, const HRPDStatus& status) 
 
 Bytes hrpdActiveSetPacket(std::chrono::milliseconds now, const std::vector<ReceivedPilot>& pilots) {
   constexpr std::size_t headSize = 25, recordSize = 12;
-  PacketWriter packet(PacketWriter::LogType::Modem, activeSetCode, now,
-                      headSize + recordSize * pilots.size());
+  PacketWriter packet(activeSetCode, now, headSize);
   packet
       .u8(13, 1)  // version
       .u8(15, std::ssize(pilots));
-  std::size_t record = headSize;
   for (const ReceivedPilot& pilot : pilots) {
     const std::int64_t strength = pilot.strength * strengthUnits / ReceivedPilot::whole;
-    packet.u16(record, pilot.cell->code).u16(record + 2, std::max<std::int64_t>(strength, 1));
-    record += recordSize;
+    packet.record(recordSize).u16(0, pilot.cell->code).u16(2, std::max<std::int64_t>(strength, 1));
   }
   return packet.finish();
 }
 
 Bytes hrpdFingersPacket(std::chrono::milliseconds now, const std::vector<Finger>& fingers) {
   constexpr std::size_t headSize = 23, recordSize = 14;
-  PacketWriter packet(PacketWriter::LogType::Modem, fingersCode, now, headSize + recordSize * fingers.size());
+  PacketWriter packet(fingersCode, now, headSize);
   packet
       .u8(13, 1)  // version
       .u8(22, std::ssize(fingers));
-  std::size_t record = headSize;
-  for (const Finger& finger : fingers) {
-    packet.u16(record, finger.cell ? finger.cell->code : noPilot)
-        .bits(record + 6, 0, 16, finger.carrierToInterference);
-    record += recordSize;
-  }
+  for (const Finger& finger : fingers)
+    packet.record(recordSize)
+        .u16(0, finger.cell ? finger.cell->code : noPilot)
+        .bits(6, 0, 16, finger.carrierToInterference);
   return packet.finish();
 }
 
 Bytes hrpdForwardPacket(std::chrono::milliseconds now, std::uint32_t second, const ForwardPackets& packets) {
   constexpr std::size_t headSize = 17, counterSize = 4;
-  PacketWriter packet(PacketWriter::LogType::Modem, forwardCode, now,
-                      headSize + counterSize * ForwardPackets::kinds);
+  PacketWriter packet(forwardCode, now, headSize);
   packet.u32(13, second);
-  std::size_t counter = headSize;
-  for (const std::uint32_t count : packets.counts()) {
-    packet.u32(counter, count);
-    counter += counterSize;
-  }
+  for (const std::uint32_t count : packets.counts()) packet.record(counterSize).u32(0, count);
   return packet.finish();
 }
 
 Bytes hrpdReversePacket(std::chrono::milliseconds now, std::uint32_t second, const ReversePackets& packets) {
   constexpr std::size_t size = 1750, headSize = 18;
-  constexpr std::size_t activeSetBlock = 576, modeBlock = 288, sizeBlock = 24, counterSize = 4;
-  PacketWriter packet(PacketWriter::LogType::Modem, reverseCode, now, size);
+  constexpr std::size_t counterSize = 4, unusedSize = 8;
+  PacketWriter packet(reverseCode, now, headSize);
   packet
       .u8(13, 1)  // version
       .u32(14, second);
   for (std::size_t pilots = 0; pilots < ReversePackets::activeSetSizes; ++pilots) {
     for (std::size_t mode = 0; mode < ReversePackets::modes; ++mode) {
       for (std::size_t index = 0; index < ReversePackets::sizes; ++index) {
-        std::size_t counter = headSize + activeSetBlock * pilots + modeBlock * mode + sizeBlock * index;
-        for (const std::uint32_t count : packets.counts(pilots, mode, index)) {
-          packet.u32(counter, count);
-          counter += counterSize;
-        }
+        for (const std::uint32_t count : packets.counts(pilots, mode, index))
+          packet.record(counterSize).u32(0, count);
+        packet.record(unusedSize);
       }
     }
   }
-  return packet.finish();
+  return packet.padTo(size).finish();
 }
 
 }  // namespace varnel::simulation

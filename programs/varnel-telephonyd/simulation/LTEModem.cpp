@@ -107,7 +107,7 @@ void LTEModem::servingCellChanged(const Cell& previous) {
 void LTEModem::sendServingCell() {
   constexpr std::size_t size = 38;
   const Cell& cell = servingCell();
-  send(PacketWriter(PacketWriter::LogType::Modem, servingCellCode, now(), size)
+  send(PacketWriter(servingCellCode, now(), size)
            .u8(13, 3)  // version
            .u16(14, cell.code)
            .u16(16, cell.channel)
@@ -127,7 +127,7 @@ void LTEModem::sendServingCell() {
 void LTEModem::sendAntennas() {
   constexpr std::size_t size = 22;
   const Cell& cell = servingCell();
-  send(PacketWriter(PacketWriter::LogType::Modem, antennasCode, now(), size)
+  send(PacketWriter(antennasCode, now(), size)
            .u8(13, 2)  // version
            .u16(14, cell.code)
            .u16(16, cell.channel)
@@ -145,7 +145,7 @@ void LTEModem::sendServingMeasurement() {
   const LTEMeasurement& serving = measurementOf(cell, carrier);
   const std::int64_t left_db = aboveMinimum_db(serving.averageRSRP_cdbm);
   const std::int64_t rules = left_db > otherSearch_db ? lteRules : lteRules | otherTechnologiesRule;
-  send(PacketWriter(PacketWriter::LogType::Modem, servingMeasurementCode, now(), size)
+  send(PacketWriter(servingMeasurementCode, now(), size)
            .u8(13, 4)  // version
            .u16(17, cell.channel)
            .bits(19, 0, 9, cell.code)
@@ -189,27 +189,25 @@ bool LTEModem::sendNeighboursOn(int channel) {
   if (cells.empty()) return false;
   cells.resize(std::min(cells.size(), mostCells));
 
-  PacketWriter packet(PacketWriter::LogType::Modem, neighboursCode, now(),
-                      headSize + recordSize * cells.size());
+  PacketWriter packet(neighboursCode, now(), headSize);
   packet
       .u8(13, 3)  // version
       .u16(17, channel)
       .bits(19, 0, 6, minimumLevel(minimumLevel_dbm))
       .bits(19, 6, 5, std::ssize(cells) - 1);
-  std::size_t record = headSize;
   for (const LTEMeasurement& measurement : cells) {
     const CellTiming timing(*measurement.cell);
-    packet.bits(record, 0, 9, measurement.cell->code)
-        .bits(record + 1, 1, 8, rssi.steps(measurement.rssi_cdbm))
-        .bits(record + 2, 1, 9, neighbourRSRP.steps(measurement.measuredRSRP_cdbm))
-        .bits(record + 4, 0, 9, neighbourRSRP.steps(measurement.averageRSRP_cdbm))
-        .bits(record + 5, 1, 7, rsrq.steps(measurement.measuredRSRQ_cdb))
-        .bits(record + 6, 0, 7, rsrq.steps(measurement.averageRSRQ_cdb))
-        .bits(record + 6, 7, 7, power(aboveMinimum_db(measurement.averageRSRP_cdbm)))
-        .u16(record + 8, timing.frequency() + _random.between(0, 20))
-        .bits(record + 12, 0, 11, timing.frame())
-        .bits(record + 13, 3, 19, timing.sample() + _random.between(0, 3));
-    record += recordSize;
+    packet.record(recordSize)
+        .bits(0, 0, 9, measurement.cell->code)
+        .bits(1, 1, 8, rssi.steps(measurement.rssi_cdbm))
+        .bits(2, 1, 9, neighbourRSRP.steps(measurement.measuredRSRP_cdbm))
+        .bits(4, 0, 9, neighbourRSRP.steps(measurement.averageRSRP_cdbm))
+        .bits(5, 1, 7, rsrq.steps(measurement.measuredRSRQ_cdb))
+        .bits(6, 0, 7, rsrq.steps(measurement.averageRSRQ_cdb))
+        .bits(6, 7, 7, power(aboveMinimum_db(measurement.averageRSRP_cdbm)))
+        .u16(8, timing.frequency() + _random.between(0, 20))
+        .bits(12, 0, 11, timing.frame())
+        .bits(13, 3, 19, timing.sample() + _random.between(0, 3));
   }
   send(packet.finish());
   return true;
@@ -229,8 +227,7 @@ void LTEModem::sendConnectedMeasurement() {
       detected.push_back(measurement);
   }
 
-  const std::size_t size = headSize + neighbourSize * neighbours.size() + detectedSize * detected.size();
-  PacketWriter packet(PacketWriter::LogType::Modem, connectedMeasurementCode, now(), size);
+  PacketWriter packet(connectedMeasurementCode, now(), headSize);
   packet
       .u8(13, 3)  // version
       .u16(17, cell.channel)
@@ -240,17 +237,12 @@ void LTEModem::sendConnectedMeasurement() {
       .bits(25, 0, 16, connectedRSRQ.steps(serving.averageRSRQ_cdb))
       .u8(27, std::ssize(neighbours))
       .u8(28, std::ssize(detected));
-  std::size_t record = headSize;
-  for (const LTEMeasurement& neighbour : neighbours) {
-    packet.u16(record, neighbour.cell->code)
-        .bits(record + 2, 0, 16, rsrp.steps(neighbour.averageRSRP_cdbm))
-        .bits(record + 4, 0, 16, connectedRSRQ.steps(neighbour.averageRSRQ_cdb));
-    record += neighbourSize;
-  }
-  for (const LTEMeasurement& found : detected) {
-    packet.u16(record, found.cell->code);
-    record += detectedSize;
-  }
+  for (const LTEMeasurement& neighbour : neighbours)
+    packet.record(neighbourSize)
+        .u16(0, neighbour.cell->code)
+        .bits(2, 0, 16, rsrp.steps(neighbour.averageRSRP_cdbm))
+        .bits(4, 0, 16, connectedRSRQ.steps(neighbour.averageRSRQ_cdb));
+  for (const LTEMeasurement& found : detected) packet.record(detectedSize).u16(0, found.cell->code);
   send(packet.finish());
 }
 
@@ -268,35 +260,35 @@ void LTEModem::considerReselection() {
 // One candidate a report: records begin every 4 bytes, so the channel and the cell of one would have to be
 // the priority and the technology of the next.
 void LTEModem::sendReselectionCandidate(const Cell& serving, const Cell& candidate) {
-  constexpr std::size_t record = 21, part = record + 4;
-  constexpr std::size_t size = part + 4, sizeOfCDMA = part + 8;
+  constexpr std::size_t headSize = 21, recordSize = 8, recordSizeOfCDMA = 12;
   enum Technology { LTE, UTRAN, GERAN, CDMA1xRTT, CDMAHRPD };
   const bool isCDMA = candidate.access == Access::CDMA1xRTT || candidate.access == Access::HRPD;
-  PacketWriter packet(PacketWriter::LogType::Modem, candidatesCode, now(), isCDMA ? sizeOfCDMA : size);
+  PacketWriter packet(candidatesCode, now(), headSize);
   packet
       .u8(13, 1)  // version
       .u16(15, serving.channel)
       .u16(17, serving.code)
       .u16(19, 1)  // candidate
-      .u16(record, priority(candidate));
+      .record(isCDMA ? recordSizeOfCDMA : recordSize)
+      .u16(0, priority(candidate));
   switch (candidate.access) {
     case Access::LTE:
-      packet.u16(record + 2, LTE).u16(part, candidate.channel).bits(part + 2, 7, 9, candidate.code);
+      packet.u16(2, LTE).u16(4, candidate.channel).bits(6, 7, 9, candidate.code);
       break;
     case Access::UMTS:
     case Access::UTRAN:
-      packet.u16(record + 2, UTRAN).u16(part, candidate.channel).u16(part + 2, candidate.code);
+      packet.u16(2, UTRAN).u16(4, candidate.channel).u16(6, candidate.code);
       break;
     case Access::GSM:
       // LTE has the number 8 for the band of 900 MHz.
-      packet.u16(record + 2, GERAN).u16(part, candidate.channel).u8(part + 2, 8).u8(part + 3, candidate.code);
+      packet.u16(2, GERAN).u16(4, candidate.channel).u8(6, 8).u8(7, candidate.code);
       break;
     case Access::CDMA1xRTT:
     case Access::HRPD:
-      packet.u16(record + 2, candidate.access == Access::HRPD ? CDMAHRPD : CDMA1xRTT)
-          .u8(part, candidate.band)
-          .u16(part + 4, candidate.channel)
-          .u16(part + 6, candidate.code);
+      packet.u16(2, candidate.access == Access::HRPD ? CDMAHRPD : CDMA1xRTT)
+          .u8(4, candidate.band)
+          .u16(8, candidate.channel)
+          .u16(10, candidate.code);
       break;
   }
   send(packet.finish());

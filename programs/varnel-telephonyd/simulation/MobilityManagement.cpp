@@ -1,5 +1,7 @@
 #include "programs/varnel-telephonyd/simulation/MobilityManagement.h"
 
+#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
+
 namespace varnel::simulation {
 
 namespace {
@@ -125,7 +127,7 @@ bool MobilityManagement::isSearching() const {
 
 Bytes MobilityManagement::circuitState(const Situation& situation) const {
   constexpr std::size_t size = 16;
-  return situation.packet(circuitStateCode, size)
+  return PacketWriter(circuitStateCode, situation.now, size)
       .u8(13, _condition.circuitState)
       .u8(14, _condition.circuitSubstate)
       .u8(15, _condition.locationUpdateStatus)
@@ -134,7 +136,7 @@ Bytes MobilityManagement::circuitState(const Situation& situation) const {
 
 Bytes MobilityManagement::packetState(const Situation& situation) const {
   constexpr std::size_t size = 16;
-  return situation.packet(packetStateCode, size)
+  return PacketWriter(packetStateCode, situation.now, size)
       .u8(13, _condition.packetState)
       .u8(14, _condition.packetSubstate)
       .u8(15, _condition.packetUpdateStatus)
@@ -143,7 +145,7 @@ Bytes MobilityManagement::packetState(const Situation& situation) const {
 
 Bytes MobilityManagement::registrationState(const Situation& situation) const {
   constexpr std::size_t size = 16;
-  return situation.packet(registrationCode, size)
+  return PacketWriter(registrationCode, situation.now, size)
       .u8(13, _condition.registrationState)
       .u8(14, Automatic)
       .finish();

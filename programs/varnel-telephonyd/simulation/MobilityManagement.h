@@ -2,6 +2,7 @@
 
 #include <span>
 
+#include "base/Bytes.h"
 #include "programs/varnel-telephonyd/simulation/Situation.h"
 
 namespace varnel::simulation {

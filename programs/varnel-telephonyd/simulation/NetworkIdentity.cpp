@@ -3,6 +3,8 @@
 #include <array>
 #include <span>
 
+#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
+
 namespace varnel::simulation {
 
 namespace {
@@ -32,7 +34,7 @@ Bytes servingNetwork(const Situation& situation, Service service) {
   const Cell& cell = situation.serving;
   const int country = cell.network.countryCode;
   const auto [first, second, third] = codedDigits(cell.network);
-  return situation.packet(servingNetworkCode, size)
+  return PacketWriter(servingNetworkCode, situation.now, size)
       .u8(13, cell.access == Access::GSM ? pagesApart : pagesForBoth)  // the operating mode
       .u8(14, static_cast<std::int64_t>(service))
       .u8(15, digit(country, 1) << 4 | digit(country, 2))
@@ -53,8 +55,7 @@ Bytes equivalentNetworks(const Situation& situation, bool isRegistered) {
   if (isRegistered && situation.serving.network == partnerNetwork) networks = equalsOfPartner;
 
   const std::size_t lastOnes = networks.empty() ? 0 : networkSize - stride;
-  PacketWriter packet =
-      situation.packet(equivalentNetworksCode, headSize + stride * networks.size() + lastOnes);
+  PacketWriter packet(equivalentNetworksCode, situation.now, headSize + stride * networks.size() + lastOnes);
   packet.u8(16, std::ssize(networks));
   std::size_t record = headSize;
   for (const Network& network : networks) {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "base/Bytes.h"
 #include "programs/varnel-telephonyd/simulation/Situation.h"
 
 namespace varnel::simulation {

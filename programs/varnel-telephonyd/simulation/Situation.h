@@ -1,6 +1,7 @@
 #pragma once
 
-#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
+#include <chrono>
+
 #include "programs/varnel-telephonyd/simulation/Walk.h"
 
 namespace varnel::simulation {
@@ -10,11 +11,6 @@ struct Situation {
   std::chrono::milliseconds now;
   const Walk& walk;
   const Cell& serving;
-
-  /// A packet of that many bytes, written now.
-  PacketWriter packet(std::uint16_t code, std::size_t size) const {
-    return PacketWriter(PacketWriter::LogType::Modem, code, now, size);
-  }
 };
 
 }  // namespace varnel::simulation

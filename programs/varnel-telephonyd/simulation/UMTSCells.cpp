@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
 #include "programs/varnel-telephonyd/simulation/UMTSCarrier.h"
 
 namespace varnel::simulation {
@@ -41,7 +42,7 @@ std::int64_t signalReading(std::int64_t rssi_cdbm) {
 Bytes umtsServingCell(const Situation& situation) {
   constexpr std::size_t size = 29;
   const Cell& cell = situation.serving;
-  return situation.packet(servingCellCode, size)
+  return PacketWriter(servingCellCode, situation.now, size)
       .u32(13, uplinkUARFCN(cell.channel))
       .u32(17, cell.channel)
       .u32(21, cell.identity)
@@ -52,10 +53,9 @@ Bytes umtsServingCell(const Situation& situation) {
 Bytes umtsCellSets(const Situation& situation, UTRANConnection::State state, Random& random) {
   constexpr std::size_t headSize = 16, cellSize = 15, energiesSize = 44;
   const auto cells = heardCells(situation);
-  PacketWriter packet = situation.packet(cellSetsCode, headSize + (cellSize + energiesSize) * cells.size());
+  PacketWriter packet(cellSetsCode, situation.now, headSize);
   packet.u16(13, signalReading(umtsRSSI_cdbm(situation.walk))).u8(15, std::ssize(cells));
 
-  std::size_t record = headSize, energies = headSize + cellSize * cells.size();
   int othersLeft = state == UTRANConnection::State::CellDCH ? mostActive - 1 : 0;
   for (const auto& [cell, level_cdbm] : cells) {
     CellSet set = CellSet::Detected;
@@ -64,15 +64,15 @@ Bytes umtsCellSets(const Situation& situation, UTRANConnection::State state, Ran
       set = CellSet::Active;
     else if (situation.walk.distance_cm(*cell, situation.serving) <= listedDistance_cm)
       set = CellSet::Monitored;
-    packet.bits(record + 7, 0, 13, cell->code).bits(record + 8, 5, 3, static_cast<std::int64_t>(set));
-    record += cellSize;
-
+    packet.record(cellSize).bits(7, 0, 13, cell->code).bits(8, 5, 3, static_cast<std::int64_t>(set));
+  }
+  for (const ReceivedCell& received : cells) {
+    packet.record(energiesSize);
     // Of the three searches behind one another the first ones may miss the cell.
-    const std::int64_t energy = umtsEnergy(umtsEcN0_cdb(situation.walk, *cell));
+    const std::int64_t energy = umtsEnergy(umtsEcN0_cdb(situation.walk, *received.cell));
     const std::int64_t firstFound = random.oneIn(5) ? random.between(1, 2) : 0;
     for (std::int64_t search = firstFound; search < 3; ++search)
-      packet.u32(energies + 32 + 4 * static_cast<std::size_t>(search), energy);
-    energies += energiesSize;
+      packet.u32(32 + 4 * static_cast<std::size_t>(search), energy);
   }
   return packet.finish();
 }
@@ -83,18 +83,17 @@ Bytes umtsRanking(const Situation& situation) {
   auto cells = heardCells(situation);
   cells.resize(std::min(cells.size(), mostRanked));
 
-  PacketWriter packet = situation.packet(rankingCode, headSize + recordSize * cells.size());
+  PacketWriter packet(rankingCode, situation.now, headSize);
   packet.u8(13, std::ssize(cells)).u8(14, 0);
-  std::size_t record = headSize;
   for (const auto& [cell, level_cdbm] : cells) {
     const std::int64_t rscp_dbm = level_cdbm / 100;
-    packet.u16(record, cell->channel)
-        .u16(record + 2, cell->code)
-        .u8(record + 4, rscp_dbm - rscpZero_dbm)
-        .u16(record + 5, rscp_dbm)
-        .u8(record + 7, umtsEcN0_cdb(situation.walk, *cell) / 50)  // in steps of half a decibel
-        .u16(record + 8, cell == &situation.serving ? rscp_dbm + hysteresis_db : rscp_dbm);
-    record += recordSize;
+    packet.record(recordSize)
+        .u16(0, cell->channel)
+        .u16(2, cell->code)
+        .u8(4, rscp_dbm - rscpZero_dbm)
+        .u16(5, rscp_dbm)
+        .u8(7, umtsEcN0_cdb(situation.walk, *cell) / 50)  // in steps of half a decibel
+        .u16(8, cell == &situation.serving ? rscp_dbm + hysteresis_db : rscp_dbm);
   }
   return packet.finish();
 }
@@ -104,16 +103,15 @@ Bytes gsmRanking(const Situation& situation) {
   auto cells = situation.walk.cells(Access::GSM);
   std::erase_if(cells, [](const ReceivedCell& received) { return received.level_cdbm < weakestGSM_cdbm; });
 
-  PacketWriter packet = situation.packet(rankingCode, headSize + recordSize * cells.size());
+  PacketWriter packet(rankingCode, situation.now, headSize);
   packet.u8(13, 0).u8(14, std::ssize(cells));
-  std::size_t record = headSize;
   for (const auto& [cell, level_cdbm] : cells) {
     const std::int64_t rssi_dbm = level_cdbm / 100;
-    packet.u16(record, cell->channel)
-        .u16(record + 2, cell->code)
-        .u8(record + 4, rssi_dbm)
-        .u16(record + 5, rssi_dbm - offsetOfGSM_db);
-    record += recordSize;
+    packet.record(recordSize)
+        .u16(0, cell->channel)
+        .u16(2, cell->code)
+        .u8(4, rssi_dbm)
+        .u16(5, rssi_dbm - offsetOfGSM_db);
   }
   return packet.finish();
 }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "base/Bytes.h"
 #include "programs/varnel-telephonyd/simulation/Random.h"
 #include "programs/varnel-telephonyd/simulation/Situation.h"
 #include "programs/varnel-telephonyd/simulation/UTRANConnection.h"

@@ -39,12 +39,12 @@ Bytes UMTSChannels::transmitPower(const Situation& situation) {
   constexpr std::size_t headSize = 16, recordSize = 14;
   // In tenths of a decibel; -18.8 dBm would be 0, which says that nothing was sent.
   constexpr std::int64_t zero_cdbm = -18'80;
-  PacketWriter packet = situation.packet(transmitPowerCode, headSize + recordSize * samples);
+  PacketWriter packet(transmitPowerCode, situation.now, headSize);
   packet.u8(14, samples);
   for (std::size_t i = 0; i < samples; ++i) {
     const bool isSending = i == 0 || !_sendsInBursts || _random.oneIn(3);
     const std::int64_t power = (power_cdbm(situation) - zero_cdbm) / 10;
-    packet.u16(headSize + recordSize * i + 4, !isSending ? 0 : power == 0 ? 1 : power);
+    packet.record(recordSize).u16(4, !isSending ? 0 : power == 0 ? 1 : power);
   }
   return packet.finish();
 }
@@ -61,13 +61,11 @@ Bytes UMTSChannels::blockErrors(const Situation& situation) {
   constexpr std::size_t headSize = 16, recordSize = 9;
   const std::int64_t elapsed_ms = (situation.now - _counted).count();
   _counted = situation.now;
-  PacketWriter packet = situation.packet(blockErrorsCode, headSize + recordSize * _channels.size());
+  PacketWriter packet(blockErrorsCode, situation.now, headSize);
   packet.u8(13, std::ssize(_channels)).u16(14, windowSize);
-  std::size_t record = headSize;
   for (TransportChannel& channel : _channels) {
     receive(channel, elapsed_ms, leastWrong_permille + 4 * missing_db(situation));
-    packet.u8(record, channel.identity).u32(record + 1, channel.received).u32(record + 5, channel.wrong);
-    record += recordSize;
+    packet.record(recordSize).u8(0, channel.identity).u32(1, channel.received).u32(5, channel.wrong);
   }
   return packet.finish();
 }
@@ -89,31 +87,25 @@ Bytes UMTSChannels::highSpeed(const Situation& situation) {
   _highSpeedTold = situation.now;
 
   const bool isDual = _carriers == 2;
-  const std::size_t secondCarrier = headSize + secondCarrierMove * processes;
-  PacketWriter packet = situation.packet(
-      highSpeedCode, isDual ? secondCarrier + processSize * processes : headSize + processSize * processes);
+  PacketWriter packet(highSpeedCode, situation.now, headSize);
   packet
       .u8(13, 2)  // version
       .bits(14, 0, 10, subframes)
       .bits(15, 2, 2, isDual ? dualCarrier : singleCarrier)
       .u8(16, processes)
       .u8(17, isDual ? processes : 0);
-  putProcesses(packet, headSize, subframes);
-  if (isDual) putProcesses(packet, secondCarrier, subframes);
+  putProcesses(packet, subframes);
+  if (isDual) putProcesses(packet.padTo(headSize + secondCarrierMove * processes), subframes);
   return packet.finish();
 }
 
-void UMTSChannels::putProcesses(PacketWriter& packet, std::size_t record, std::int64_t subframes) {
+void UMTSChannels::putProcesses(PacketWriter& packet, std::int64_t subframes) {
   constexpr std::int64_t smallestBlock_bits = 2404, largestBlock_bits = 14'411;
   const std::int64_t block_bits = _random.between(smallestBlock_bits, largestBlock_bits);
   for (int process = 0; process < processes; ++process) {
     const std::int64_t sent = subframes / processes * _random.between(30, 95) / 100;
     const std::int64_t wrong = sent * _random.between(4, 16) / 100;
-    packet.u8(record, process)
-        .u32(record + 1, wrong * block_bits)
-        .u16(record + 5, sent)
-        .u16(record + 7, wrong);
-    record += processSize;
+    packet.record(processSize).u8(0, process).u32(1, wrong * block_bits).u16(5, sent).u16(7, wrong);
   }
 }
 

@@ -2,6 +2,8 @@
 
 #include <vector>
 
+#include "base/Bytes.h"
+#include "programs/varnel-telephonyd/simulation/PacketWriter.h"
 #include "programs/varnel-telephonyd/simulation/Random.h"
 #include "programs/varnel-telephonyd/simulation/Situation.h"
 #include "programs/varnel-telephonyd/simulation/UTRANConnection.h"
@@ -33,7 +35,7 @@ class UMTSChannels {
 
   std::int64_t power_cdbm(const Situation& situation);
   void receive(TransportChannel& channel, std::int64_t elapsed_ms, std::int64_t wrong_permille);
-  void putProcesses(PacketWriter& packet, std::size_t record, std::int64_t subframes);
+  void putProcesses(PacketWriter& packet, std::int64_t subframes);
 
   Random _random;
   bool _sendsInBursts = false;

@@ -80,7 +80,7 @@ void UTRANModem::stateChanged() {
 
 void UTRANModem::sendState() {
   constexpr std::size_t size = 15;
-  send(PacketWriter(PacketWriter::LogType::Modem, stateCode, now(), size)
+  send(PacketWriter(stateCode, now(), size)
            .u8(13, 1)  // version
            .u8(14, static_cast<std::int64_t>(_connection.state()))
            .finish());
@@ -89,7 +89,7 @@ void UTRANModem::sendState() {
 void UTRANModem::sendServingCell() {
   constexpr std::size_t size = 26;
   const Cell& cell = servingCell();
-  send(PacketWriter(PacketWriter::LogType::Modem, servingCellCode, now(), size)
+  send(PacketWriter(servingCellCode, now(), size)
            .u8(13, 1)                // version
            .u8(14, 0)                // no restrictions
            .u8(15, cell.area % 256)  // a registration area for each location area
@@ -106,20 +106,17 @@ void UTRANModem::sendNeighbours() {
   auto cells = walk().cells(Access::UTRAN);
   std::erase_if(cells, [this](const ReceivedCell& received) { return !isHeard(received); });
 
-  PacketWriter packet(PacketWriter::LogType::Modem, neighboursCode, now(),
-                      headSize + recordSize * cells.size());
+  PacketWriter packet(neighboursCode, now(), headSize);
   packet
       .u8(13, 1)  // version
       .bits(16, 1, 7, std::ssize(cells));
-  std::size_t record = headSize;
-  for (const auto& [cell, level_cdbm] : cells) {
-    packet.bits(record, 0, 14, cell->channel)
-        .bits(record + 1, 6, 7, cell->code)
-        .bits(record + 2, 5, 8, (level_cdbm + 140'00) / 50)  // in steps of half a decibel
-        .bits(record + 3, 5, 2, static_cast<std::int64_t>(setOf(*cell)))
-        .bits(record + 3, 7, 1, cell->channel == servingCell().channel);
-    record += recordSize;
-  }
+  for (const auto& [cell, level_cdbm] : cells)
+    packet.record(recordSize)
+        .bits(0, 0, 14, cell->channel)
+        .bits(1, 6, 7, cell->code)
+        .bits(2, 5, 8, (level_cdbm + 140'00) / 50)  // in steps of half a decibel
+        .bits(3, 5, 2, static_cast<std::int64_t>(setOf(*cell)))
+        .bits(3, 7, 1, cell->channel == servingCell().channel);
   send(packet.finish());
 }
 
@@ -142,22 +139,20 @@ void UTRANModem::sendGSMNeighbours() {
   auto cells = walk().cells(Access::GSM);
   std::erase_if(cells, [](const ReceivedCell& received) { return received.level_cdbm < weakestGSM_cdbm; });
 
-  PacketWriter packet(PacketWriter::LogType::Modem, gsmNeighboursCode, now(),
-                      headSize + recordSize * cells.size());
+  PacketWriter packet(gsmNeighboursCode, now(), headSize);
   packet
       .u8(13, 1)  // version
       .u8(16, std::ssize(cells));
-  std::size_t record = headSize;
   for (const auto& [cell, level_cdbm] : cells) {
     const bool isIdentified = level_cdbm >= weakestIdentified_cdbm;
-    packet.bits(record, 0, 14, cell->identity)
-        .bits(record + 1, 6, 1, 0)  // the band is not that of 1900 MHz
-        .bits(record + 1, 7, 1, isIdentified)
-        .u8(record + 2, isIdentified ? cell->code / 8 : 0)
-        .u8(record + 3, isIdentified ? cell->code % 8 : 0)
-        .u16(record + 4, cell->channel)
-        .u16(record + 6, level_cdbm / 100);
-    record += recordSize;
+    packet.record(recordSize)
+        .bits(0, 0, 14, cell->identity)
+        .bits(1, 6, 1, 0)  // the band is not that of 1900 MHz
+        .bits(1, 7, 1, isIdentified)
+        .u8(2, isIdentified ? cell->code / 8 : 0)
+        .u8(3, isIdentified ? cell->code % 8 : 0)
+        .u16(4, cell->channel)
+        .u16(6, level_cdbm / 100);
   }
   send(packet.finish());
 }
@@ -177,27 +172,21 @@ void UTRANModem::sendChannels() {
     composites = commonComposites;
   }
 
-  const std::size_t firstComposite = compositesStart + compositesMove * channels.size();
-  PacketWriter packet(PacketWriter::LogType::Modem, channelsCode, now(),
-                      firstComposite + compositeSize * composites.size());
+  PacketWriter packet(channelsCode, now(), headSize);
   packet
       .u8(13, 1)  // version
       .bits(14, 6, 6, std::ssize(channels))
       .bits(15, 4, 4, std::ssize(composites));
   const std::int64_t missing_db = (targetSIR_cdb - signalToInterference_cdb()) / 100;
-  std::size_t record = headSize;
-  for (const TransportChannel& channel : channels) {
-    packet.u8(record, channel.identity)
-        .u8(record + 1,
-            std::clamp<std::int64_t>(channel.target + 2 * missing_db + _random.noise(2), 0, mostErrors));
-    record += channelSize;
-  }
-  record = firstComposite;
+  for (const TransportChannel& channel : channels)
+    packet.record(channelSize)
+        .u8(0, channel.identity)
+        .u8(1, std::clamp<std::int64_t>(channel.target + 2 * missing_db + _random.noise(2), 0, mostErrors));
+  packet.padTo(compositesStart + compositesMove * channels.size());
   for (const Composite& composite : composites) {
-    packet.u8(record, composite.identity).u8(record + 1, composite.timeslot);
+    packet.record(compositeSize).u8(0, composite.identity).u8(1, composite.timeslot);
     for (std::size_t code = 0; code < codesOfComposite; ++code)
-      packet.u8(record + 2 + code, ratio(signalToInterference_cdb()));
-    record += compositeSize;
+      packet.u8(2 + code, ratio(signalToInterference_cdb()));
   }
   send(packet.finish());
 }
