@@ -23,7 +23,7 @@
 #include "host/captures/PcapEncoders.h"
 #include "host/captures/StreamEncoders.h"
 #include "platform/TelephonyService.h"
-#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 // What captures take to be read, a line a way: the least that framing takes, framing alone, and whole
 // captures read and decoded, framed and as pcap, all beside a copy of the same bytes. Of the captures of real

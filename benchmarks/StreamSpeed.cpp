@@ -16,7 +16,7 @@
 #include "host/FileResources.h"
 #include "host/SystemClock.h"
 #include "platform/TelephonyService.h"
-#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "tests/support/AllocationCounter.h"
 
 // Without arguments: the technologies, then the ways, a line each. With a technology and a way: what a

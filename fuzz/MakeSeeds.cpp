@@ -21,7 +21,7 @@
 #include "host/captures/PcapEncoders.h"
 #include "host/captures/StreamEncoders.h"
 #include "platform/TelephonyService.h"
-#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 namespace varnel {
 

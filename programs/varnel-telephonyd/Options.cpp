@@ -10,7 +10,7 @@
 #include "host/FileIdentity.h"
 #include "host/Printable.h"
 #include "platform/TelephonyService.h"
-#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 namespace varnel {
 

@@ -23,6 +23,7 @@
 #include "programs/varnel-telephonyd/ReplaySource.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "programs/varnel-telephonyd/TelephonyServer.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 namespace varnel {
 

@@ -8,6 +8,7 @@
 #include <set>
 #include <vector>
 
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "tests/support/SimulatedMessages.h"
 
 namespace varnel {

@@ -9,6 +9,7 @@
 #include <string>
 #include <vector>
 
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "tests/support/SimulatedMessages.h"
 
 namespace varnel {

@@ -7,7 +7,7 @@
 
 #include "base/Dictionary.h"
 #include "base/PropertyList.h"
-#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 namespace varnel {
 

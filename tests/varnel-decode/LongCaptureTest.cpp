@@ -6,7 +6,7 @@
 #include <string_view>
 #include <vector>
 
-#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "tests/varnel-decode/DecodeProgram.h"
 
 // What a capture takes does not depend on how long it is: neither the memory nor the time for a message.

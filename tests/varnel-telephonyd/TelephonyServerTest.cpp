@@ -10,6 +10,7 @@
 #include "host/StreamReport.h"
 #include "programs/varnel-telephonyd/ReplaySource.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "tests/support/FakeQueue.h"
 #include "tests/support/MemoryPorts.h"
 #include "tests/support/RecordingLog.h"

@@ -2,9 +2,7 @@
 
 #include <chrono>
 #include <cstdint>
-#include <memory>
 #include <string_view>
-#include <vector>
 
 #include "base/Bytes.h"
 
@@ -26,11 +24,5 @@ class SimulatedModem {
   /// The next message, no earlier than the one before.
   virtual SimulatedMessage next() = 0;
 };
-
-/// A new modem of the technology, at the start of its stream; null for a technology that is not simulated.
-std::unique_ptr<SimulatedModem> simulatedModem(std::string_view technology, std::uint64_t seed);
-
-/// Every technology that is simulated.
-std::vector<std::string_view> simulatedTechnologies();
 
 }  // namespace varnel

@@ -1,4 +1,4 @@
-#include "programs/varnel-telephonyd/simulation/SimulatedModem.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/CDMAModem.h"
