@@ -19,13 +19,13 @@ using Lines = std::vector<std::string>;
 constexpr const char* folders[] = {"app", "base", "host", "platform", "programs", "widgets"};
 
 constexpr std::string_view mark = "Kept:";
-constexpr std::size_t linesAbove = 3;  // in which a mark is looked for
+constexpr std::size_t linesAbove = 3;  // above a misspelling, in which its mark may be
 
 enum class Place { Text, Declaration };
 
 struct Misspelling {
   std::string_view wording;
-  Place place;  // in a string literal, or in the code around it
+  Place place;  // inside a string literal, or in the code around it
 };
 
 const std::vector<Misspelling> misspellings = {
@@ -46,7 +46,7 @@ const std::vector<Misspelling> misspellings = {
 
 struct LineParts {
   std::string code;
-  std::string texts;  // what stands in the line's string literals, quotes included
+  std::string texts;  // the line's string literals, with their quotes
   std::string comment;
 };
 
@@ -76,14 +76,14 @@ bool isComment(const std::string& line) {
   return !isBlank(line) && line.compare(indentation(line), 2, "//") == 0;
 }
 
-// Whether the line, or one of the few above it up to a blank one, has the mark.
+// Whether the mark is in the line, or in one of the few lines above it. A blank line ends the search.
 bool isMarkedNearby(const Lines& lines, std::size_t at) {
   for (std::size_t i = 0; i <= linesAbove && i <= at && !isBlank(lines[at - i]); ++i)
     if (isMarked(lines[at - i])) return true;
   return false;
 }
 
-// Whether the declaration in whose braces the line stands has the mark in the comment right above it.
+// Whether the mark is in the comment directly above the declaration whose braces enclose the line.
 bool isInMarkedDeclaration(const Lines& lines, std::size_t at) {
   std::size_t opener = at;
   if (indentation(lines[at]) > 0)
@@ -112,7 +112,7 @@ std::vector<std::string> unmarkedMisspellings(const Lines& lines) {
   return found;
 }
 
-// How many rows the document's tables have for each file.
+// The number of rows for each file in the document's tables.
 std::map<std::string, int> listedOddities(const Lines& document) {
   std::map<std::string, int> listed;
   for (const std::string& line : document) {

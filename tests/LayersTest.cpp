@@ -14,8 +14,8 @@ namespace fs = std::filesystem;
 
 struct Layer {
   std::string folder;
-  std::vector<std::string> mayInclude;  // folders of the layers whose headers it may take
-  bool isCore;                          // knows the standard library only
+  std::vector<std::string> mayInclude;  // folders of the layers whose headers it may include
+  bool isCore;                          // may use only the standard library
 };
 
 // Longer folders first: a file belongs to the first layer that its path begins with.
@@ -50,7 +50,7 @@ bool isStandardHeader(const std::string& header) {
   return std::ranges::all_of(header, [](char c) { return (c >= 'a' && c <= 'z') || c == '_'; });
 }
 
-// What stands between the quotes or brackets of an #include, with the opening one; empty for any other line.
+// The file name in an #include, with the opening quote or bracket; empty for any other line.
 std::string includedFile(const std::string& line) {
   constexpr std::string_view directive = "#include ";
   if (!line.starts_with(directive)) return {};
@@ -58,7 +58,7 @@ std::string includedFile(const std::string& line) {
   return line.substr(directive.size(), end - directive.size());
 }
 
-// What is wrong with one line of a file of the layer; nothing when it is fine.
+// What is wrong with a line of a file in the layer; nothing when it is fine.
 std::optional<std::string> fault(const Layer& layer, const std::string& line) {
   const std::string included = includedFile(line);
   if (included.empty()) return std::nullopt;

@@ -1,4 +1,4 @@
-# Folders of the package are for everybody, as its files are, whatever the umask of who packs: CMake makes folders by it,
-# also where it is told permissions for them.
+# Everybody may enter the folders of the package, with any umask of the user who makes the package. CMake makes folders
+# with the umask, even if they have given permissions.
 file(CHMOD_RECURSE ${CPACK_TEMPORARY_DIRECTORY} DIRECTORY_PERMISSIONS
      OWNER_READ OWNER_WRITE OWNER_EXECUTE GROUP_READ GROUP_EXECUTE WORLD_READ WORLD_EXECUTE)

@@ -21,7 +21,7 @@ using namespace std::chrono_literals;
 constexpr std::string_view channel = "com.orvane.BasebandStateReport.LogChannel";
 constexpr const char* noServer = "No server is in /run/varnel; type varnel-telephonyd";
 
-// A model whose observer asks the keeper whenever it is called, as viewers do.
+// A model whose observer asks the keeper after every call, like a viewer.
 class NoticeKeeperTest : public testing::Test, public VarnelModelObserver {
  protected:
   NoticeKeeperTest() {
@@ -61,7 +61,7 @@ class NoticeKeeperTest : public testing::Test, public VarnelModelObserver {
     link.report = {};
     queue.advance(5s);
   }
-  // Lets a message arrive and the display timer notice it.
+  // Delivers a message and lets the display timer notice it.
   void receive(const Bytes& message) {
     ports.deliver(channel, 0, message);
     queue.advance(2s);

@@ -14,7 +14,7 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-// 2024-03-01 14:05:09 UTC and nearly a second.
+// Nearly a second after 2024-03-01 14:05:09 UTC.
 constexpr Time friday{1709301909, 999999999};
 
 Value saveContents() {

@@ -28,7 +28,7 @@ using testing::StartsWith;
 constexpr std::string_view channel = "com.orvane.BasebandStateReport.LogChannel";
 constexpr const char* marker = "/OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 
-// The number of transmit antennas as an LTE modem reports it: log code 0xB0C1, the number in byte 20.
+// A report of an LTE modem about its transmit antennas: log code 0xB0C1 with the number in byte 20.
 Bytes antennas(std::uint8_t number) { return PacketBuilder(0xB0C1, 22).u8(20, number).bytes(); }
 
 class RecordedPages final : public TextOutput {
@@ -50,7 +50,7 @@ class TextViewerTest : public testing::Test {
     };
   }
 
-  // Lets a message arrive and the display timer notice it.
+  // Delivers a message and lets the display timer notice it.
   void show(std::uint8_t number) {
     ports.deliver(channel, 0, antennas(number));
     queue.advance(2s);
@@ -221,7 +221,7 @@ TEST_F(TextViewerTest, SavesASnapshotWithAnEmptyDescriptionOnAnInternalDevice) {
   ASSERT_TRUE(data);
   ASSERT_THAT(*data, SizeIs(2));
   EXPECT_EQ(*data->front().dictionary()->get("Description").string(), "Snapshot (2024-03-01 12:05:09 +0000)");
-  // The report's 161 bytes and the packet's 22 but for the first.
+  // The 161 bytes of the report, and the 22 bytes of the packet without the first.
   EXPECT_EQ(*data->back().dictionary()->get("Description").string(), "DLF binary (182 bytes)");
 }
 

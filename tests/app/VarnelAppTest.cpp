@@ -29,7 +29,7 @@ constexpr const char* marker = "/OrvaneInternal/Library/PreferenceBundles/Carrie
 constexpr const char* connecting = "[wheel] [Connecting...] [space]";
 constexpr const char* updated = "[hidden wheel] [Updated 2024-03-01 at 14:05:09] [space]";
 
-// The packet-data contexts as the telephony server reports them: so many of them.
+// This many packet-data contexts, as the telephony server reports them.
 Bytes contexts(std::size_t count) {
   const Value list = Value::ofArray();
   for (std::size_t i = 0; i < count; ++i)
@@ -61,13 +61,13 @@ class VarnelAppTest : public testing::Test {
   }
 
   void launch() { app.applicationDidFinishLaunching(); }
-  // Launched and connected, and so many contexts have been shown.
+  // Launches and connects the application and shows this many contexts.
   void launchWith(std::size_t count) {
     launch();
     queue.run();
     receive(count);
   }
-  // Lets a message arrive and the display timer notice it.
+  // Delivers a message and lets the display timer notice it.
   void receive(std::size_t count) {
     ports.deliver(channel, 0, contexts(count));
     queue.advance(2s);
@@ -80,7 +80,7 @@ class VarnelAppTest : public testing::Test {
   RecordingPane& pane() const { return stack().pane(); }
   const std::string& title() const { return static_cast<RecordingWindow&>(*app.window()).title; }
   std::string path() const { return static_cast<VarnelPaneController&>(*stack().topController()).path(); }
-  // The root pane's first row, and of the pane that it opens the row of that number.
+  // Opens the first row of the root pane, and the row with this number in the pane below it.
   void openContext(std::size_t row) {
     pane().table().select(0);
     pane().table().select(row);

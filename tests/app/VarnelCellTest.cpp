@@ -8,7 +8,7 @@ namespace varnel {
 
 namespace {
 
-// A content area of 300 by 50; bold letters are 10 by 20, regular ones 7 by 16.
+// The content area is 300 by 50. Bold letters are 10 by 20, regular ones 7 by 16.
 class VarnelCellTest : public testing::Test {
  protected:
   std::unique_ptr<VarnelCell> nameOnly() {
@@ -114,7 +114,7 @@ TEST_F(VarnelCellTest, AWiderValueStands50BehindTheNameAndTheRowScrolls) {
 TEST_F(VarnelCellTest, TheValueIsMeasuredInBoldThoughItIsDrawnInRegular) {
   const auto cell = nameAndValue("A", "12345678");
   cell->setLayout();
-  // In regular it would be 56 by 16.
+  // In the regular font it would be 56 by 16.
   EXPECT_EQ(label(*cell->value()).frame, (Rect{220, 15, 80, 20}));
 }
 

@@ -18,7 +18,7 @@ VarnelPaneController::Node tree(const Value& display) {
   return VarnelModelNode::makeTreeFromObject_withPathDictionary(display, paths);
 }
 
-// An inner node, a leaf and an inner node without children.
+// An inner node, a leaf, and an inner node without children.
 Value display() {
   return dictionaryOf({{"Serving Cell", dictionaryOf({{"RSSI", "-71 dBm"}, {"Band", "7"}})},
                        {"State", "Idle"},
@@ -27,7 +27,7 @@ Value display() {
 
 class VarnelPaneControllerTest : public testing::Test {
  protected:
-  // The pane at the bottom of a stack that is on the screen.
+  // Shows the pane at the bottom of a stack on the screen.
   void show(VarnelPaneController::Node node, const std::string& path = "/") {
     controller = std::make_shared<VarnelPaneController>(userInterface, saveControl, std::move(node), path);
     stack = userInterface.makeNavigationStack(controller);

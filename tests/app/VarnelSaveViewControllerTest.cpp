@@ -29,7 +29,7 @@ constexpr const char* failedToWrite =
     "<3>Unable to write snapshot to /var/mobile/Library/Logs/CrashReporter/VarnelSnapshot-1709301909.varnel";
 constexpr const char* alert = "alert File Error: Unable to write file to disk [Close]";
 
-// The screen as it ships, on a device in a folder of its own. It opens at 14:05:07, and is used at 14:05:09.
+// The shipped screen on a device with its own folder. It opens at 14:05:07 and is used at 14:05:09.
 class SaveScreen : public testing::Test {
  protected:
   SaveScreen() {
@@ -254,7 +254,7 @@ TEST_F(SaveScreen, AMissingFolderIsLoggedAndAlertedAndStillCloses) {
 
 TEST_F(SaveScreen, AReadOnlyFolderIsLoggedAndAlertedAndStillCloses) {
   if (::geteuid() == 0) {
-    // Root may write to every folder but to those of the kernel.
+    // Root may write to every folder except those of the kernel.
     fs::remove(folder());
     fs::create_symlink("/proc/self/fdinfo", folder());
   } else {

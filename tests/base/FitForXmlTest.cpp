@@ -42,7 +42,7 @@ TEST(FitForXml, TheValueItselfIsNotTouched) {
   const Value replaced = fitForXml(list);
   EXPECT_EQ(*replaced.array()->at(0).dictionary()->get("APN").string(), "a\uFFFD");
   EXPECT_EQ(*row.dictionary()->get("APN").string(), "a\x02");
-  // What needs no replacement is shared.
+  // Parts that need no replacement are shared.
   EXPECT_EQ(replaced.array()->at(1).dictionary(), list.array()->at(1).dictionary());
 }
 

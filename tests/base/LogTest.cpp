@@ -31,7 +31,7 @@ class Log : public testing::Test, protected LogSink {
   std::vector<std::pair<int, std::string>> _lines;
 };
 
-// Counts how often somebody turns it into text.
+// Counts how often it is turned into text.
 class Counting {
  public:
   explicit Counting(int& count) : _count(count) {}

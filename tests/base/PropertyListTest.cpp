@@ -19,7 +19,7 @@ using namespace std::string_literals;
 
 namespace {
 
-// Far more than any test needs; tests lower the one limit they are about.
+// Far more than any test needs. A test lowers the limit that it is about.
 constexpr PropertyListLimits wide = fileLimits;
 
 ByteView view(std::string_view text) {
@@ -49,7 +49,7 @@ std::string bigEndian(std::uint64_t number, std::size_t width) {
   return result;
 }
 
-// The figures at the end of a binary list, right unless a test spoils them.
+// The numbers at the end of a binary list. They are right unless a test changes them.
 struct Trailer {
   std::uint8_t offsetSize = 3, referenceSize = 1;
   std::uint64_t objectCount = 0, root = 0, table = 0;
@@ -67,7 +67,7 @@ struct BinaryList {
   std::string bytes() const { return objectsAndTable + trailerBytes(trailer); }
 };
 
-// A binary list of the given objects, the first one the root.
+// A binary list of the given objects. The first one is the root.
 BinaryList binaryList(const std::vector<std::string>& objects) {
   BinaryList list{"bplist00", {}};
   std::string table;
@@ -146,7 +146,7 @@ Value dictionary(std::initializer_list<Dictionary::Entry> entries) {
   return result;
 }
 
-// So many arrays, each but the innermost holding the next.
+// This many arrays, each of which holds the next one.
 Value nestedArrays(std::size_t levels) {
   Value value = Value::ofArray();
   for (std::size_t level = 1; level < levels; ++level) value = Value::ofArray({value});
@@ -166,15 +166,15 @@ std::string nestedBinaryArrays(std::size_t levels) {
   return list.bytes();
 }
 
-// The processor's time: how long other work keeps it away does not count.
+// Uses the processor's time, so that other work on the machine does not count.
 std::clock_t timeToRead(std::string_view bytes) {
   const std::clock_t start = std::clock();
   read(bytes);
   return std::clock() - start;
 }
 
-// Whether it takes no longer than a few ordinary messages of the greatest size, on this machine as it is now:
-// one of twenty readings does.
+// Whether reading takes no longer than reading a few ordinary messages of the largest size on this machine
+// now. One of twenty readings must do so.
 bool isReadQuickly(std::string_view bytes) {
   constexpr int fewMessages = 8;
   static const std::string ordinary =
@@ -501,12 +501,12 @@ TEST(PropertyListLimit, BytesCountAsOftenAsTheyAreReferredTo) {
   EXPECT_FALSE(read(binary({"\x64\x00w\x00x\x00y\x00z"s}), limits));
 }
 
-// Arrays in arrays, each holding the next one twelve times: 248,832 values at the fifth level.
+// Nested arrays that each hold the next one twelve times: 248,832 values at the fifth level.
 std::string nodeBomb(std::string_view padding = {}) {
   std::vector<std::string> objects;
   for (char next = 1; next <= 5; ++next) objects.push_back("\xAC" + std::string(12, next));
   objects.emplace_back("\x09");
-  objects.emplace_back(padding);  // which nothing refers to
+  objects.emplace_back(padding);  // nothing refers to it
   return binary(objects);
 }
 
@@ -652,7 +652,7 @@ TEST(PropertyListLimit, FloodsTakeNoTime) {
   }
 }
 
-// Seeds of both encodings, spoilt at random: none may crash, hang or leak.
+// Lists in both encodings, changed at random. None may crash, hang, or leak.
 TEST(PropertyListReading, TenThousandMutatedListsDoNoHarm) {
   Value cells = Value::ofArray();
   for (int i = 0; i < 16; ++i) {
@@ -743,7 +743,7 @@ TEST(PropertyListWriting, DatesKeepTheirSeconds) {
   EXPECT_EQ(throughBinary(Value::ofDate({5, 250000})), "date(5,250000)");
 }
 
-// Seconds as a real number do not hold every microsecond, and what is left over is cut off towards 2001.
+// A real number of seconds cannot hold every microsecond. The library cuts the rest off toward 2001.
 TEST(PropertyListWriting, BinaryDatesComeBackWithinAMicrosecond) {
   EXPECT_EQ(throughBinary(Value::ofDate({5, 3})), "date(5,3)");
   EXPECT_EQ(throughBinary(Value::ofDate({5, 4})), "date(5,3)");
@@ -767,7 +767,7 @@ TEST(PropertyListWriting, TextsComeBackAsTheyWere) {
   }
 }
 
-// A reader of XML takes a bare carriage return for a newline.
+// A reader of XML takes a bare carriage return as a newline.
 TEST(PropertyListWriting, CarriageReturnsAreWrittenAsReferences) {
   EXPECT_NE(asText(writeXmlPropertyList("a\r\nb\r")).find("<string>a&#13;\nb&#13;</string>"),
             std::string::npos);

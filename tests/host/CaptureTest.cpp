@@ -316,7 +316,7 @@ TEST_F(PcapFiles, WhatIsWrittenIsReadBack) {
   {
     CaptureWriter writer(path());
     writer.write({1700000000, 999999999}, Bytes{1, 2, 3});
-    // It is there at once.
+    // The record is available at once.
     EXPECT_EQ(read(path()).records.size(), 1u);
     writer.write({1700000001, 0}, {});
     writer.write({1700000001, 1}, large);

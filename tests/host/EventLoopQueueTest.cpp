@@ -86,8 +86,8 @@ TEST(EventLoopQueue, KeepsAnIntervalOfTwoSecondsToTheMillisecond) {
   EventLoopQueue queue;
   std::vector<std::unique_ptr<RepeatingTimer>> timers;
   int ran = 0;
-  // Timers that keep it roughly are put together: most come late, which a busy machine's do too, but some too
-  // early.
+  // The toolkit groups timers that need not be exact. Most of these come late, as on a busy machine; some
+  // come too early.
   for (int i = 0; i < 20; ++i) {
     timers.push_back(queue.repeating(2000ms, [&, isFirst = true, start = Clock::now()]() mutable {
       if (!std::exchange(isFirst, false)) return;

@@ -148,7 +148,7 @@ TEST_F(FilePreferencesTest, APipeInPlaceOfTheFileHoldsNothingUp) {
   EXPECT_EQ(log.takeTexts().size(), 1u);
 }
 
-// A bus of the test's own, and somebody who listens on it.
+// A private bus, and a listener on it.
 class PreferencesBus : public FilePreferencesTest {
  protected:
   void SetUp() override {
@@ -159,13 +159,13 @@ class PreferencesBus : public FilePreferencesTest {
 
   std::string address() const { return bus.address(); }
 
-  // Somebody hears all that is said on the bus.
+  // Starts a listener that hears everything on the bus.
   bool startListening() {
     if (!bus.start()) return false;
     listener = std::make_unique<Process>(
         "/usr/bin/env", std::vector<std::string>{"dbus-monitor", "--address", address(),
                                                  "type='signal',interface='com.orvane.Preferences'"});
-    // Its own name is the first that it hears.
+    // The listener first hears its own name.
     return eventually([&] { return listener->output().find("NameAcquired") != std::string::npos; });
   }
   std::size_t heard() const {
@@ -245,7 +245,7 @@ TEST_F(PreferencesBus, ABusThatDoesNotAnswerHoldsNothingUp) {
 
   const auto begin = std::chrono::steady_clock::now();
   preferences.notifyChanged(domain, key);
-  // A call that is left to itself waits for 25 s.
+  // Without its own time-out, a call would wait for 25 s.
   EXPECT_LT(std::chrono::steady_clock::now() - begin, 20s);
   EXPECT_EQ(log.takeTexts().size(), 1u);
   ::close(listening);

@@ -20,7 +20,7 @@ namespace {
 
 using namespace std::chrono_literals;
 
-// What a viewer does, step by step, in a folder that is as a test makes it.
+// Does what a viewer does, step by step, in a folder that the test prepares.
 class Link : public testing::Test {
  protected:
   std::unique_ptr<LocalPort> makeViewerPort() { return _ports.createLocalPort("viewer", ignore).port; }
@@ -89,7 +89,7 @@ TEST_F(Link, TellsOfAServerThatHangs) {
                                 " does not answer; end varnel-telephonyd and start it again"));
 }
 
-// A queue of connections that nobody takes is full: whoever connects is neither served nor made to wait.
+// The queue of connections that nobody accepts is full. Another client is neither served nor made to wait.
 TEST_F(Link, TellsOfAServerThatTakesNoConnections) {
   const RawSocket silent = RawSocket::listeningAt(serverPath());
   std::vector<std::unique_ptr<SocketConnection>> waiting;

@@ -74,7 +74,7 @@ TEST_F(RootedFilesTest, NoFolderIsMade) {
 }
 
 TEST(RootedFilesOfTheWholeMachine, AFolderThatTakesNoFilesIsAnError) {
-  // Nobody, not even root, makes a file there.
+  // Nobody, not even root, can make a file there.
   EXPECT_FALSE(RootedFiles("/proc").writePropertyList(Value::ofDictionary(), "/a.varnel").isDone());
 }
 

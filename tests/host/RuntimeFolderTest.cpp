@@ -22,7 +22,7 @@ unsigned modeOf(const std::filesystem::path& path) {
   return status.st_mode & 07777;
 }
 
-// Why the folder is refused; empty when it is not.
+// Why the folder is refused; empty when it is accepted.
 std::string refusal(const std::optional<std::string>& option) {
   try {
     runtimeFolder(option);
@@ -96,7 +96,7 @@ TEST_F(RuntimeFolder, MustBeAFolder) {
   EXPECT_THAT(refusal(_folder.file("file")), HasSubstr("is no folder"));
 }
 
-// Root alone can give its own folder away. To everybody else the root folder is another user's.
+// Only root can give its own folder away. For every other user, the root folder belongs to another user.
 TEST_F(RuntimeFolder, MustBelongToTheUser) {
   std::optional<std::string> another = "/";
   if (::geteuid() == 0) {

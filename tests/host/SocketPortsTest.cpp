@@ -47,7 +47,7 @@ class LastLine final : public LogSink {
 
 class SocketPortsTest : public testing::Test {
  protected:
-  // A local port that keeps what it gets, as "IDENTIFIER:TEXT".
+  // A local port that keeps what it receives, as "IDENTIFIER:TEXT".
   std::unique_ptr<LocalPort> recordingPort() {
     auto port = _ports
                     .createLocalPort(_name,
@@ -62,7 +62,7 @@ class SocketPortsTest : public testing::Test {
     return port;
   }
 
-  // A peer that answers every request with what the function returns.
+  // A peer that answers every request with the result of the function.
   std::unique_ptr<PeerThread> answeringPeer(LocalPort::MessageHandler handler) {
     return std::make_unique<PeerThread>([this, handler = std::move(handler)] {
       std::shared_ptr<LocalPort> port = _ports.createLocalPort(_name, handler).port;
@@ -156,7 +156,7 @@ TEST_F(SocketPortsTest, ARequestGetsItsReply) {
 TEST_F(SocketPortsTest, ARequestWithoutReplyLearnsSoAtOnce) {
   const auto peer = answeringPeer([](std::int32_t, ByteView) { return std::optional<Bytes>(); });
   const auto remote = _ports.createRemotePort(_name);
-  // Who waited for a reply would meet a timeout.
+  // A wait for the reply would end with a timeout.
   const auto result = remote->sendRequest(0, bytesOf("ask"), 1s, 1min);
   EXPECT_EQ(result.status, 0);
   EXPECT_FALSE(result.reply);
@@ -178,7 +178,7 @@ TEST_F(SocketPortsTest, ForeignFramesDoNotProlongTheWait) {
   std::atomic<bool> isEnding = false;
   std::atomic<bool> hasStopped = false;
   std::thread flood([&] {
-    // For a minute: a request that frames prolong ends after it.
+    // For a minute. A request that other frames prolong would end after it.
     const auto end = Clock::now() + 1min;
     while (!isEnding && Clock::now() < end && peer.send(frameBytes(0, FrameMark::Notification, "news")))
       std::this_thread::sleep_for(5ms);
@@ -301,7 +301,7 @@ TEST_F(SocketPortsTest, AnEndedPortGivesItsNameFree) {
   EXPECT_TRUE(_ports.createLocalPort(_name, {}).port);
 }
 
-// A process that holds the port and is killed: its socket stays behind.
+// A process that held the port was killed, and its socket is still there.
 TEST_F(SocketPortsTest, ADeadProcessesSocketIsTakenOver) {
   int ready[2];
   ASSERT_EQ(::pipe(ready), 0);
@@ -361,7 +361,7 @@ TEST_F(SocketPortsTest, APeersGoingWaitsForDelivery) {
   EXPECT_THAT(_messages, ElementsAre("0:early"));
 }
 
-// More than the buffers hold, so that the end of the stream is still to be read when delivery begins.
+// More than the buffers hold, so that the end of the stream is still unread when delivery begins.
 TEST_F(SocketPortsTest, NothingOfALargeBatchIsLostWhenItsSenderGoes) {
   std::size_t received = 0;
   const auto local = _ports
@@ -420,7 +420,7 @@ TEST(SocketTrust, IsInTheSameUserAndInRootAlone) {
   EXPECT_FALSE(isTrusted(1000, 0));
 }
 
-// Root's peer becomes another user. Anybody else's cannot, and is served.
+// If the test runs as root, the peer becomes another user. Otherwise it cannot, and is served.
 TEST_F(SocketPortsTest, PeersAreServedUnlessTheyAreOfAnotherUser) {
   const bool isRoot = ::geteuid() == 0;
   const auto local = recordingPort();

@@ -40,7 +40,7 @@ class SocketServerTest : public testing::Test {
     });
     _connections.push_back(std::move(connection));
   }
-  // What a client whom the server turns away reads.
+  // What a refused client reads.
   Bytes refusal() {
     const RawSocket client = RawSocket::connectedTo(path());
     EXPECT_TRUE(runUntil([&] { return client.waits(0ms); }));
@@ -60,7 +60,7 @@ class SocketServerTest : public testing::Test {
   TemporaryFolder _folder;
   std::vector<std::shared_ptr<SocketConnection>> _connections;
   int _frames = 0;
-  std::function<void()> _onceRead;  // done when some bytes were read, before anything else happens
+  std::function<void()> _onceRead;  // runs once after some bytes were read, before anything else happens
 };
 
 TEST_F(SocketServerTest, TakesSixtyFourConnectionsAndTurnsAwayTheNextOne) {
@@ -99,7 +99,7 @@ TEST_F(SocketServerTest, WithoutADescriptorItTurnsAwayAndServesAgainLater) {
     do {
       others.emplace_back(::open("/dev/null", O_RDONLY | O_CLOEXEC));
     } while (others.back().isOpen());
-    others.resize(others.size() - 2);  // which makes room for the client's
+    others.resize(others.size() - 2);  // makes room for the client
     const RawSocket client = RawSocket::connectedTo(path());
     EXPECT_TRUE(runUntil([&] { return client.waits(0ms); }));
     EXPECT_EQ(client.receive(), (Bytes{'f', 'u', 'l', 'l'}));
@@ -138,7 +138,7 @@ TEST_F(SocketServerTest, AFrameThatComesInPiecesIsTakenAndTheTimeStartsAnewForTh
   EXPECT_EQ(_connections.size(), 1u);
 }
 
-// What came before the time was up counts, also when nobody had looked.
+// Data that came in time counts, even if nobody had looked yet.
 TEST_F(SocketServerTest, AReceiverThatIsHeldUpEndsNobodysConnection) {
   const auto listening = server({.frameTime = 20ms});
   const RawSocket client = RawSocket::connectedTo(path());

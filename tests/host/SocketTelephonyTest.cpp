@@ -61,7 +61,7 @@ class SocketTelephony : public testing::Test {
 
   TemporaryFolder _folder;
   SocketTelephonyService _service{_folder.path(), 1min};
-  // For requests that nobody answers.
+  // For requests that get no answer.
   SocketTelephonyService _impatientService{_folder.path(), 300ms};
   std::string _askedFor;
   int _notifications = 0;
@@ -118,7 +118,7 @@ TEST_F(SocketTelephony, NotificationsComeDuringTheWaitAndFromTheEventLoop) {
   EXPECT_TRUE(runUntil([&] { return _notifications == 3; }));
   listener.notifyAll();
   QCoreApplication::processEvents();  // sends it
-  connection->createLogChannel("x");  // meets it, though nobody answers
+  connection->createLogChannel("x");  // the notification arrives, though nobody answers the request
   EXPECT_EQ(_notifications, 4);
   connection.reset();
   listener.notifyAll();

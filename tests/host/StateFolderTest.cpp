@@ -7,7 +7,7 @@
 namespace varnel {
 namespace {
 
-// Each test of this program may have a process to itself, or share it: the environment is put back.
+// Tests of this program may share a process, so each restores the environment.
 class StateFolderTest : public testing::Test {
  protected:
   StateFolderTest() : _home(valueOf("HOME")), _state(valueOf("XDG_STATE_HOME")) {}

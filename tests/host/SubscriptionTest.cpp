@@ -43,7 +43,7 @@ TEST(SubscriptionFilter, TakesTheFirstUnlessOneIsWanted) {
   EXPECT_EQ(filter.taken(), 2);
 }
 
-// Makes a port whose messages a test brings itself.
+// Makes a port whose messages come from the test.
 class HandedPorts final : public MessagePorts {
  public:
   LocalPortCreation createLocalPort(std::string_view name, LocalPort::MessageHandler handler) override {

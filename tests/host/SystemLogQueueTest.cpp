@@ -18,8 +18,8 @@ using namespace std::chrono_literals;
 using Clock = std::chrono::steady_clock;
 using testing::ElementsAre;
 
-// A system log that writes lines down, and stops reading while it is told to. It is shared with the queue's
-// thread, which may outlive the test.
+// A system log that keeps lines, and stops reading while a test says so. The queue's thread shares it, since
+// the thread may outlive the test.
 class FakeSystemLog : public std::enable_shared_from_this<FakeSystemLog> {
  public:
   std::function<void(int, const std::string&)> writer() {
@@ -117,7 +117,7 @@ TEST_F(SystemLogQueueTest, CountsWhatDoesNotFitAndReportsItInOneLine) {
   _log->stopReading();
   queue.add(3, "stuck");
   _log->waitUntilBusy();
-  // Who waited here for the log would wait for ever.
+  // A program that waited for the log here would wait forever.
   for (int i = 0; i < 5000; ++i) queue.add(3, "waiting");
   _log->readAgain();
   queue.drain();

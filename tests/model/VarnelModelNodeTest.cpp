@@ -295,7 +295,7 @@ TEST(ChildPath, JoinsByASlashUnlessTheParentEndsInOne) {
   EXPECT_EQ(childPath("/", "/"), "//");
 }
 
-// What stands for the absence of a leaf.
+// Stands for the absence of a leaf.
 constexpr std::string_view none = "(none)";
 std::string leafAt(const Value& object, std::string_view path) {
   return std::string(leafValueUnderPath(object, path).value_or(none));
@@ -439,7 +439,7 @@ TEST(LeafValueUnderPath, ANameWithBracketsComesBeforeASelection) {
   EXPECT_EQ(leafAt(object, "/Level [dBm]"), "-3");
 }
 
-// Every path of the tree, and every path that is a character longer or shorter.
+// Checks every path of the tree, and each path with one character more or less.
 void expectLikeTheTree(const Value& object) {
   const Tree tree{object};
   const auto expectLike = [&](const std::string& path) {
@@ -472,15 +472,15 @@ TEST(LeafValueUnderPath, FindsWhatThePathDictionaryHoldsWhateverTheNames) {
   for (int round = 0; round < 2000; ++round) expectLikeTheTree(objectOf(4));
 }
 
-// Whether the thread that runs the task waits for something, as it should or should not: on a busy machine
-// one that is not held up may take long.
+// Whether the thread that runs the task waits for something. `isHeldUp` says whether it should. If it should
+// not, it gets a long time, since the machine may be busy.
 template <class Task>
 bool isStuck(std::future<Task>& task, bool isHeldUp) {
   const auto patience = isHeldUp ? std::chrono::milliseconds(100) : std::chrono::minutes(1);
   return task.wait_for(patience) == std::future_status::timeout;
 }
 
-// A process of its own for what it does to the process-wide lock.
+// Runs in its own process, because it uses the process-wide lock.
 class DisplayTreeArrayLockDeathTest : public testing::Test {
  protected:
   DisplayTreeArrayLockDeathTest() { testing::FLAGS_gtest_death_test_style = "threadsafe"; }

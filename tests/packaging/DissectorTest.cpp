@@ -35,7 +35,7 @@ void appendU32(Bytes& bytes, std::size_t number) {
   for (int shift = 0; shift < 32; shift += 8) bytes.push_back(static_cast<std::uint8_t>(number >> shift));
 }
 
-// A message as a capture holds it, which may be less than was sent.
+// A message in a capture, which may hold only a part of it.
 struct Captured {
   Captured(Bytes message) : bytes(std::move(message)), size(bytes.size()) {}
   Captured(Bytes beginning, std::size_t wholeSize) : bytes(std::move(beginning)), size(wholeSize) {}
@@ -44,7 +44,7 @@ struct Captured {
   std::size_t size;
 };
 
-// A pcap file of link type 147, its records 2 s after 1970 began.
+// A pcap file of link type 147. Its records are dated 2 s after the start of 1970.
 Bytes pcap(const std::vector<Captured>& messages) {
   Bytes file = {0xD4, 0xC3, 0xB2, 0xA1, 2, 0, 4, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0xFF, 0xFF, 0, 0, 147, 0, 0, 0};
   for (const Captured& message : messages) {
@@ -56,7 +56,7 @@ Bytes pcap(const std::vector<Captured>& messages) {
   return file;
 }
 
-// A pcapng file with a section header, an interface of link type 147 and one packet of 16 bytes.
+// A pcapng file with a section header, an interface of link type 147, and one packet of 16 bytes.
 Bytes pcapng(const Bytes& message) {
   Bytes file = {0x0A, 0x0D, 0x0D, 0x0A, 28,   0,    0,    0,    0x4D, 0x3C, 0x2B, 0x1A, 1, 0,
                 0,    0,    0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 28,   0,    0, 0,  //
@@ -69,7 +69,7 @@ Bytes pcapng(const Bytes& message) {
   return file;
 }
 
-// A packet of that log type and code whose length is its own, without a time.
+// A packet of this log type and code with the right length and without a time.
 Bytes packet(std::uint8_t logType, std::uint16_t logCode, const Bytes& payload = {}) {
   const auto length = static_cast<std::uint8_t>(12 + payload.size());
   Bytes bytes = {logType, length, 0, static_cast<std::uint8_t>(logCode),
@@ -83,7 +83,7 @@ Bytes bytesOf(std::string_view text) { return Bytes(text.begin(), text.end()); }
 
 class Dissector : public testing::Test {
  protected:
-  // A line for each message: the fields in their order, tabs between them.
+  // One line per message: the fields in the given order, with tabs between them.
   std::vector<std::string> shown(const std::vector<Captured>& messages,
                                  const std::vector<std::string>& fields) {
     return shownOfFile(pcap(messages), fields);
@@ -106,7 +106,7 @@ class Dissector : public testing::Test {
     return lines;
   }
 
-  // What tshark prints, without anybody's settings.
+  // What tshark prints, without a user's settings.
   std::string run(const Bytes& file, const std::vector<std::string>& arguments) {
     const std::string path = _folder.file("capture");
     std::ofstream(path, std::ios::binary)

@@ -11,7 +11,7 @@
 #include "tests/support/Process.h"
 #include "tests/support/Tool.h"
 
-// What `cmake --install` makes of this build, in a folder that was not known when it was built.
+// What `cmake --install` makes of this build, in a folder that the build did not know.
 
 namespace varnel {
 namespace {
@@ -62,7 +62,7 @@ class Installation : public testing::Test {
 TEST_F(Installation, ProgramsFindTheirResourcesWhereverTheyAre) {
   const TemporaryFolder elsewhere;
   fs::copy(installed("."), elsewhere.file("moved"), fs::copy_options::recursive);
-  // A packet that no decoder knows: the display is the template.
+  // A packet that no decoder knows, so the display is the template.
   const std::string capture = elsewhere.file("one.pcap");
   CaptureWriter(capture).write(Time{}, Bytes{1, 12, 0, 0xFF, 0xEE, 0, 0, 0, 0, 0, 0, 0, 0});
   const std::string display = outputOf(elsewhere.file("moved/bin/varnel-decode"),

@@ -29,7 +29,7 @@ const std::string connecting = "Connecting...\n";
 const std::string lost = "<3> ***** INVALIDATED 0x";
 const std::string noLink = "<3>Could not create the ports necessary\n";
 
-// A real server with a simulated LTE modem and real viewers, in a runtime folder of their own.
+// A real server with a simulated LTE modem, and real viewers, in their own runtime folder.
 class EndToEnd : public testing::Test {
  protected:
   std::unique_ptr<Process> server() {
@@ -44,7 +44,7 @@ class EndToEnd : public testing::Test {
     return std::make_unique<Process>(VARNEL_PROGRAM, arguments, std::vector<std::string>(), terminal);
   }
 
-  // A viewer that is asked for a window, where the environment names no display but that one.
+  // A viewer that shall open a window. The environment names no display but this one.
   std::unique_ptr<Process> window(std::vector<std::string> more, const std::string& display,
                                   const std::string& userInterface = "window",
                                   const std::vector<std::string>& environment = {}) {
@@ -60,12 +60,12 @@ class EndToEnd : public testing::Test {
     whole.insert(whole.end(), environment.begin(), environment.end());
     return std::make_unique<Process>(VARNEL_PROGRAM, arguments, whole);
   }
-  // How often a viewer has logged the line. Without a link it tries every five seconds, and logs each time:
-  // how often it has, depends on who was quicker.
+  // How often a viewer has logged the line. Without a link it tries every five seconds and logs each time, so
+  // the number depends on which program was faster.
   static std::size_t logged(const Process& viewer, const std::string& line) {
     return occurrences(viewer.error(), line);
   }
-  // Waits until it has logged the line more often than before.
+  // Waits until the viewer has logged the line more often than before.
   static testing::AssertionResult logsAgain(const Process& viewer, const std::string& line,
                                             std::size_t before = 0) {
     if (eventually([&] { return logged(viewer, line) > before; })) return testing::AssertionSuccess();
@@ -101,7 +101,7 @@ std::string packetOf(const std::string& prefix, std::uint16_t code, const std::s
 }
 
 TEST_F(EndToEnd, OfSeveralSimCardsAViewerShowsTheOneThatItIsAskedFor) {
-  // Antennas of the second card, then a measurement that names none.
+  // A number of antennas from the second card, then a measurement without a card.
   const std::string antennas = packetOf("\x81\x02", 0xB0C1, std::string("\0\0\0\0\0\0\0\x04\0", 9)),
                     measurement = packetOf("", 0xB17F, std::string(20, '\0'));
   const std::string capture = _device.file("two.pcap");
@@ -230,7 +230,7 @@ TEST_F(EndToEnd, ASnapshotIsSavedOnlyWithTheMarker) {
 
   fs::create_directories(_device.path() / "OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle");
   varnel->signal(SIGUSR2);
-  // Beside it may stand what is still being written.
+  // A file that is still being written can be beside it.
   fs::path snapshot;
   ASSERT_TRUE(eventually([&] {
     for (const auto& entry : fs::directory_iterator(logs)) {

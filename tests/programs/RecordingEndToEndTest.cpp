@@ -19,7 +19,7 @@ namespace fs = std::filesystem;
 // The block type of a section header, with which every pcapng file begins.
 constexpr const char* headerOfCaptures = "\x0A\x0D\x0D\x0A";
 
-// Real servers that record, and real viewers that visit them.
+// Real servers that record, and real viewers that connect to them.
 class RecordingEndToEnd : public testing::Test {
  protected:
   using Texts = std::vector<std::string>;
@@ -28,7 +28,7 @@ class RecordingEndToEnd : public testing::Test {
     more.insert(more.begin(), {"--simulate", "kalvi-lte", "--runtime-dir", runtime.path()});
     return std::make_unique<Process>(VARNEL_TELEPHONYD_PROGRAM, more);
   }
-  // A server by a shell, which does something before.
+  // A server started by a shell that first runs another command.
   std::unique_ptr<Process> serverAfter(const std::string& before, const std::string& after) const {
     return std::make_unique<Process>(
         "/bin/sh",

@@ -41,8 +41,8 @@ std::string textAt(const Value& dictionary, std::string_view key) {
   return found ? *found : "(none)";
 }
 
-// The viewer with its window in this process, on a device that allows snapshots, and a real server in
-// another.
+// The viewer with its window in this process, on a device that allows snapshots, and a real server in another
+// process.
 class WindowEndToEnd : public testing::Test {
  protected:
   WindowEndToEnd() {
@@ -54,18 +54,18 @@ class WindowEndToEnd : public testing::Test {
 
   // Returns when the server can be reached.
   void startServer(Texts source) {
-    fs::remove(_serverSocket);  // that of a server that was killed
+    fs::remove(_serverSocket);  // left by a server that was killed
     source.insert(source.end(), {"--runtime-dir", _runtime.path(), "--record", _record, "--overwrite"});
     _server = std::make_unique<Process>(VARNEL_TELEPHONYD_PROGRAM, source);
     ASSERT_TRUE(eventually([this] { return fs::exists(_serverSocket); }, patience)) << _server->error();
   }
   void simulate(const std::string& seed) { startServer({"--simulate", "kalvi-lte", "--seed", seed}); }
-  // Returns when the viewer has noticed and has given up its port.
+  // Returns when the viewer has noticed it and has closed its port.
   void killServer() {
     _server->signal(SIGKILL);
     ASSERT_TRUE(runUntil([this] { return !fs::exists(_viewerSocket); }, patience));
   }
-  // A capture in which those messages follow each other that many seconds after the first.
+  // A capture of these messages, each the given number of seconds after the first.
   std::string captureOf(const std::vector<std::pair<std::int64_t, Bytes>>& messages) const {
     const std::string path = _runtime.file("capture.pcap");
     CaptureWriter writer(path);
@@ -101,7 +101,7 @@ class WindowEndToEnd : public testing::Test {
     return all;
   }
   bool hasRow(const std::string& description) { return std::ranges::count(rows(), description) > 0; }
-  // Two of them are two seconds apart, and the status tells the second.
+  // Two updates are two seconds apart, and the status shows the seconds.
   bool waitForNextUpdate() {
     return runUntil([this, former = status()] { return isUpdated() && status() != former; }, patience);
   }
@@ -199,7 +199,7 @@ TEST_F(WindowEndToEnd, APaneGoesWithTheContextThatItShows) {
   const Value ims = dictionaryOf({{"APN", "ims"}, {"State", "Active"}});
   const Bytes both = serverMessage(0xFF0002, Value::ofArray({internet, ims}));
   const Bytes one = serverMessage(0xFF0002, Value::ofArray({internet}));
-  // Both for three seconds, then one for three.
+  // Both for three seconds, then only one for three seconds.
   startServer({"--replay", captureOf({{0, both}, {3, one}, {5, one}}), "--loop"});
   launch();
   ASSERT_TRUE(runUntil([this] { return hasRow(contexts); }, patience)) << status();

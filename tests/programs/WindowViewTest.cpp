@@ -18,7 +18,7 @@ namespace {
 using namespace std::chrono_literals;
 using testing::HasSubstr;
 
-// What the user does as soon as there is a window.
+// What the user does as soon as the window is open.
 std::function<void(QWidget& window)> deed;
 
 void awaitWindow() {
@@ -31,7 +31,7 @@ void awaitWindow() {
 }
 Q_COREAPP_STARTUP_FUNCTION(awaitWindow)
 
-// The viewer from its start to its end, without a server, on a screen that nobody sees.
+// Runs the viewer from start to end, without a server, on an invisible screen.
 class WindowViewTest : public testing::Test {
  protected:
   WindowViewTest() {

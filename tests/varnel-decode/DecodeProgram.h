@@ -85,7 +85,7 @@ class DecodeProgram : public ::testing::Test {
     return finish(process);
   }
 
-  // The program by a shell, which redirects what follows.
+  // Runs the program in a shell, which redirects the rest.
   static Result runInShell(const std::string& rest) {
     Process process("/bin/sh", {"-c", "exec " VARNEL_DECODE_PROGRAM " --technology kalvi-lte " + rest});
     return finish(process);

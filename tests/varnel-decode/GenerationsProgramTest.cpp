@@ -5,7 +5,7 @@
 
 #include "tests/varnel-decode/DecodeProgram.h"
 
-// The whole program: displays over time, and what becomes of messages.
+// Runs the whole program: displays over time, and what becomes of messages.
 
 namespace varnel {
 namespace {
@@ -94,8 +94,7 @@ TEST_F(DecodeGenerations, CsvTakesCapturesBeforeItOrBehindADoubleDash) {
   EXPECT_EQ(run({"--technology", "kalvi-lte", "--csv", antennasPath, "--", path}).output, expected);
 }
 
-// The serving cell's average RSRP: a quarter of the steps above -140 dBm, which stand from bit 1 of byte 22
-// on.
+// The serving cell's average RSRP in steps of a quarter above -140 dBm, from bit 1 of byte 22.
 std::string averageRsrp(int steps) {
   std::string payload(33 - 13, '\0');
   payload[22 - 13] = static_cast<char>(steps << 1 & 0xFF);
@@ -103,7 +102,7 @@ std::string averageRsrp(int steps) {
   return packet(1, 0xB17F, payload);
 }
 
-// -93.25 dBm, the same again, -93.00 dBm.
+// -93.25 dBm, the same again, then -93.00 dBm.
 std::string threeMeasurements() {
   return pcapHeader() + pcapRecord(afternoon, 0, averageRsrp(187)) +
          pcapRecord(afternoon + 2, 0, averageRsrp(187)) + pcapRecord(afternoon + 4, 0, averageRsrp(188));
@@ -174,7 +173,7 @@ TEST_F(DecodeGenerations, NumbersAndChangesNeedSomethingToWriteThemIn) {
   }
 }
 
-// A log record without anything around it, so long after the start of a modem that knows no date.
+// A log record without anything around it, from a modem that knows no date, this long after its start.
 std::string undatedAntennas(std::uint64_t seconds, char count) {
   return littleEndian(21, 2) + littleEndian(0xB0C1, 2) + littleEndian(seconds * 800 << 16, 8) +
          std::string(7, '\0') + count + '\0';
@@ -222,7 +221,7 @@ TEST_F(DecodeGenerations, APictureOfUndatedRecordsCountsSeconds) {
   EXPECT_THAT(svg, testing::Not(HasSubstr("1980")));
 }
 
-// Ten rounds of a hundred records in 9.9 s each, every one dated an hour before the last.
+// Ten rounds of a hundred records in 9.9 s. Each round is dated an hour before the last one.
 std::string setBackAgainAndAgain() {
   std::string capture = pcapHeader();
   for (std::uint32_t round = 0; round < 10; ++round) {
@@ -241,7 +240,7 @@ TEST_F(DecodeGenerations, AClockThatGoesBackAnHourEvery100RecordsLosesNoDisplayA
                               {"--log-level", "-1", "--csv", "Serving Cell Info/Num Tx Antennas", "--"}}) {
     const Result result = decode(capture, options);
     EXPECT_EQ(result.status, 0) << result.error;
-    // Each round has four on the grid and one at its end.
+    // Each round has four displays at the regular times, and one at its end.
     EXPECT_EQ(linesOf(result.output), options.back() == "--every" ? 50u : 51u);
     EXPECT_EQ(linesOf(result.error), 1u) << result.error;
     EXPECT_THAT(result.error, HasSubstr(told));
@@ -363,7 +362,7 @@ TEST_F(DecodeGenerations, APlotIsAPictureWithLegendUnitAndTime) {
   EXPECT_THAT(svg, HasSubstr("<polyline"));
 }
 
-// A failure that shows the whole picture helps nobody.
+// A failure message should not contain the whole picture.
 bool holds(const std::string& svg, const std::string& text) { return svg.find(text) != std::string::npos; }
 
 TEST_F(DecodeGenerations, EveryLineOfAPlotStandsInTheLegendAndEachAxisHasItsUnit) {

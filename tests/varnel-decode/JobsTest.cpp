@@ -15,7 +15,7 @@ namespace {
 using namespace std::chrono_literals;
 using ::testing::HasSubstr;
 
-// What the pieces leave in a folder tells how many of them have run at the same time.
+// The files that the jobs leave in a folder tell how many of them ran at the same time.
 class JobsTest : public ::testing::Test {
  protected:
   static std::vector<std::string> names(std::size_t count) {
@@ -35,7 +35,7 @@ TEST_F(JobsTest, OutputsComeInOrderWhicheverPieceIsDoneFirst) {
   const int status = runJobs(names(4), 4, [this](std::size_t piece) {
     std::printf("begin %zu\n", piece);
     std::fflush(stdout);
-    // The last is done first: each of the others waits for the one behind it.
+    // The last one ends first: each of the others waits for the next one.
     const auto mark = [this](std::size_t which) { return folder.file(std::to_string(which)); };
     if (piece < 3 && !eventually([&] { return std::filesystem::exists(mark(piece + 1)); })) return 1;
     std::ofstream(mark(piece)).flush();
@@ -56,7 +56,7 @@ TEST_F(JobsTest, AsManyRunAtTheSameTimeAsAllowedAndNoMore) {
     runJobs(names(9), most, [&](std::size_t piece) {
       const std::string mark = folder.file(std::to_string(piece));
       std::ofstream(mark).flush();
-      // Nobody ends before as many have begun as there may be, so the last of these sees them all.
+      // No job ends before as many have begun as may run at once. So the last of these sees them all.
       std::printf("%zu ", filesIn(folder));
       std::ofstream(begun.file(std::to_string(piece))).flush();
       const bool haveMetAll = eventually([&] { return filesIn(begun) >= most; });

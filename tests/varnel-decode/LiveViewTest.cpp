@@ -7,7 +7,7 @@
 
 #include "tests/varnel-decode/DecodeProgram.h"
 
-// The whole program on captures that still grow.
+// Runs the whole program on captures that still grow.
 
 namespace varnel {
 namespace {

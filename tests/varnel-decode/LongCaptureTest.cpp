@@ -9,12 +9,12 @@
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "tests/varnel-decode/DecodeProgram.h"
 
-// What a capture takes does not depend on how long it is: neither the memory nor the time for a message.
+// The cost of a capture does not depend on its length: neither the memory nor the time per message.
 
 namespace varnel {
 namespace {
 
-constexpr std::uint32_t shortCapture_s = 20;  // more than the history reaches back
+constexpr std::uint32_t shortCapture_s = 20;  // longer than the history reaches back
 constexpr std::uint32_t longCapture_s = 8 * shortCapture_s;
 constexpr std::size_t bytesASecond = 100'000;
 
@@ -28,8 +28,8 @@ enum class ItsClock { Runs, StandsInThePastSinceTheFirstSecond };
 
 class LongCapture : public DecodeProgram {
  protected:
-  // The first messages of a simulated modem, over and over, close together. Written without any allocation,
-  // for the memory that the test takes would count as that of the program.
+  // The first messages of a simulated modem, again and again, close together. Nothing is allocated, since the
+  // memory of the test would count as memory of the program.
   std::string capture(std::string_view technology, std::uint32_t duration_s, ItsClock clock) const {
     constexpr std::size_t differentMessages = 1000;
     const auto modem = simulatedModem(technology, 1);
@@ -57,7 +57,7 @@ class LongCapture : public DecodeProgram {
 
   static Cost cost(std::vector<std::string> arguments) {
     arguments.insert(arguments.end(), {"--log-level", "-1"});
-    // A sanitizer would keep what was freed for a while.
+    // A sanitizer would keep freed memory for a while.
     Process process(VARNEL_DECODE_PROGRAM, std::move(arguments),
                     {"ASAN_OPTIONS=quarantine_size_mb=1:thread_local_quarantine_size_kb=64"});
     EXPECT_TRUE(process.waitForEnd());
@@ -65,7 +65,7 @@ class LongCapture : public DecodeProgram {
     return {process.peakMemory(), process.processorTime(), process.error()};
   }
 
-  // Both captures are written first, so that the test has as much memory when it starts either.
+  // Writes both captures first, so that the test has the same amount of memory when it starts either program.
   void expectSameCost(std::string_view technology, const std::vector<std::string>& options,
                       ItsClock clock = ItsClock::Runs) const {
     const auto costOf = [&](const std::string& path) {
@@ -80,8 +80,8 @@ class LongCapture : public DecodeProgram {
       EXPECT_EQ(linesOf(each.error), clock == ItsClock::Runs ? 0u : 1u) << each.error;
     // The long one is 14 MB longer.
     EXPECT_LT(longCost.memory, shortCost.memory + 4'000'000);
-    // Eight times as long, and as much again for what else the processor has to do. Whoever shares its caches
-    // takes time, and not always the same; what grows with the square takes more than that each time.
+    // Eight times as long, and twice that for other work of the processor. Work on shared caches costs time
+    // now and then. A cost that grows with the square is higher every time.
     for (int left = 5; left > 0 && longCost.time >= 16 * shortCost.time; --left) {
       shortCost.time = std::min(shortCost.time, costOf(shortPath).time);
       longCost.time = std::min(longCost.time, costOf(longPath).time);

@@ -47,7 +47,7 @@ TEST(MergePatch, WhatBecomesAnotherKindIsReplacedWhole) {
   EXPECT_EQ(patchBetween(R"("x")", R"({"a":1})"), R"({"a":1})");
 }
 
-// An implementation of its own applies them.
+// A different implementation applies the patches.
 TEST(MergePatch, AppliedToTheOneValueGivesTheOther) {
   const char* const values[] = {
       R"({})",

@@ -29,7 +29,7 @@ std::string text(Time time) {
   return std::to_string(time.seconds) + "." + nanoseconds;
 }
 
-// Notes every call with the time that the clock shows; keeps a history, so that its dates can be seen.
+// Notes every call with the time of the clock. It keeps a history, so that tests see the dates.
 class RecordingGenerator final : public LogGenerator {
  public:
   explicit RecordingGenerator(const Services& services) : LogGenerator(services) {}
@@ -231,7 +231,7 @@ TEST_F(OfflineDecoderTest, AClockThatGoesBackAnHourEvery100RecordsLosesNoDisplay
       deliver(time);
     }
   }
-  // Of 9.9 s each: four ticks on the grid, and one when the clock is set.
+  // Each round takes 9.9 s: four regular ticks, and one when the clock is set.
   EXPECT_EQ(generations, rounds * 5 - 1);
   EXPECT_EQ(decoder.clockSteps().count, 49u);
 }

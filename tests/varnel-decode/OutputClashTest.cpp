@@ -12,7 +12,7 @@ using testing::StartsWith;
 
 namespace fs = std::filesystem;
 
-// A capture, its other names, and a program that is to write.
+// A capture under several names, and a program that has to write.
 class OutputClash : public DecodeProgram {
  protected:
   OutputClash() {

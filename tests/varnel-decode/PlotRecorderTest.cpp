@@ -58,7 +58,7 @@ TEST(MeasurementIn, ATextWithoutALeadingNumberIsNone) {
 
 enum class Line { GoesOn, Begins };
 
-// A single value and how long it was shown.
+// A single value that was shown for a while.
 PlotPoint held(double seconds, double until, double value, Line line) {
   return {seconds, until, value, value, value, line == Line::Begins};
 }
@@ -179,7 +179,7 @@ TEST(PlotLine, AClockThatIsSetBackAgainAndAgainKeepsEachValueAtItsTime) {
   const auto points = line.points();
   EXPECT_LE(points.size(), 1000u);
   EXPECT_GE(points.size(), 500u);
-  // Columns of two rounds each: the last peak is that of the earliest times.
+  // Columns of two rounds each. The last peak belongs to the earliest times.
   EXPECT_EQ(points.back().highest, 1999);
   EXPECT_LE(points.back().seconds, 1e9 - 7'196'350 + 7200);
   EXPECT_EQ(std::ranges::count(points, 1999, &PlotPoint::highest), 1);
@@ -218,7 +218,7 @@ TEST(PlotRecorder, EachPathIsASeriesWithTheUnitOfItsFirstNumber) {
   EXPECT_FALSE(recorder.isEmpty());
 }
 
-// A display with a number under each of the paths, which name one section and one value each.
+// A display with a number under each of the paths. Each path names one section and one value.
 Plot plotOf(const std::vector<std::pair<std::string, std::string>>& values) {
   std::vector<std::string> paths;
   Value display = Value::ofDictionary();

@@ -8,7 +8,7 @@
 
 #include "tests/varnel-decode/DecodeProgram.h"
 
-// The whole program, run on captures that are written here byte by byte.
+// Runs the whole program on captures that are written here byte by byte.
 
 namespace varnel {
 
@@ -153,7 +153,7 @@ TEST_F(DecodeProgram, AMissingResourceFolderIsToldAtTheStart) {
 }
 
 TEST_F(DecodeProgram, NothingFromACaptureSteersATerminal) {
-  // ESC, DEL and the one-character CSI of C1.
+  // ESC, DEL, and the one-character CSI of C1.
   const std::string object = list("<dict><key>a\x7F</key><string>b\xC2\x9B\xC3\xA9</string></dict>");
   const std::string path = write("capture", pcapHeader() + pcapRecord(afternoon, 0, object));
   const auto outputAs = [&](std::vector<std::string> options) {
@@ -444,13 +444,13 @@ TEST_F(DecodeProgram, ASnapshotHoldsTheHistoryByTheCapturesClockAndTheBinaryLog)
   EXPECT_EQ(textOf(0, "Date"), "2024-03-01 14:05:11 +0000");
   EXPECT_EQ(textOf(0, "Description"), "Snapshot (2024-03-01 14:05:11 +0000)");
   EXPECT_EQ(textOf(1, "Date"), "2024-03-01 14:05:14 +0000");
-  // The version report's 161 bytes and each interval's 22 less the first.
+  // The 161 bytes of the version report, and the 22 bytes of each interval without the first.
   EXPECT_EQ(textOf(2, "Description"), "DLF binary (203 bytes)");
 
   const Bytes* dlf = (*items)[2].dictionary()->get("DLF").data();
   ASSERT_TRUE(dlf);
   ASSERT_EQ(dlf->size(), 203u);
-  // Seconds, zone and daylight flag.
+  // Seconds, time zone, and daylight saving flag.
   EXPECT_EQ(Bytes(dlf->begin() + 81, dlf->begin() + 89), (Bytes{0x9A, 0xE0, 0xE1, 0x65, 0, 0, 0, 0}));
 }
 

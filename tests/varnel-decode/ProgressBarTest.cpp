@@ -18,13 +18,13 @@ using ::testing::EndsWith;
 using ::testing::HasSubstr;
 using ::testing::StartsWith;
 
-// What is written to the log while the bar shows.
+// Gets the log lines while the bar is visible.
 struct NotingLog final : LogSink {
   void write(int /*priority*/, std::string_view text) override { lines.emplace_back(text); }
   std::vector<std::string> lines;
 };
 
-// Standard error, and on demand standard output, is a terminal as long as the test runs.
+// While the test runs, standard error is a terminal, and on demand standard output too.
 class ProgressBarTest : public ::testing::Test {
  protected:
   ProgressBarTest() {
@@ -42,7 +42,7 @@ class ProgressBarTest : public ::testing::Test {
     setLogSink(nullptr, -1);
   }
 
-  // Reads that many records with a bar. What was on the screen, at last and before the bar went.
+  // Reads this many records with a bar. Returns what was on the screen last, before the bar disappeared.
   std::string shown(int records, std::chrono::milliseconds delay = 0ms,
                     ProgressBar::Output output = ProgressBar::Output::LeavesTerminalAlone) {
     const auto capture = openCapture(folder.file("capture"));
@@ -54,7 +54,7 @@ class ProgressBarTest : public ::testing::Test {
       if (withLogLine) logError("a line");
     }
     EXPECT_EQ(logSink(), &log) << "the log is back in its place";
-    // So that there is an end to read up to.
+    // The text marks the end of what there is to read.
     std::fputs("END", stderr);
     std::string text;
     char part[4096];

@@ -8,7 +8,7 @@
 #include "tests/support/SimulatedMessages.h"
 #include "tests/varnel-decode/DecodeProgram.h"
 
-// The whole program, as a converter of captures.
+// Runs the whole program as a converter of captures.
 
 namespace varnel {
 namespace {
@@ -36,7 +36,7 @@ std::vector<Kept> recordsIn(const std::string& path) {
   return records;
 }
 
-// A minute of a simulated modem as pcap, with messages among them that are no log records.
+// A minute of a simulated modem as pcap, with some messages that are no log records.
 std::string simulatedCapture(std::size_t& records) {
   std::string capture = pcapHeader() + pcapRecord(afternoon, 0, simFiles("<dict/>"));
   records = 0;

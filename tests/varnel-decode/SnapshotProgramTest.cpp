@@ -3,7 +3,7 @@
 
 #include "tests/varnel-decode/DecodeProgram.h"
 
-// The whole program on snapshots that are written here or by itself.
+// Runs the whole program on snapshots that this file or the program itself writes.
 
 namespace varnel {
 namespace {
@@ -140,7 +140,7 @@ TEST_F(DecodeSnapshot, TheBinaryLogOfACaptureIsThatOfItsSnapshot) {
                                {"--format", "none", "--snapshot", saved, "--dlf", direct});
   EXPECT_EQ(result.status, 0) << result.error;
   EXPECT_EQ(run({"--dlf", extracted, saved}).status, 0);
-  // The version report's 161 bytes and the packet's 22 less the first.
+  // The 161 bytes of the version report, and the 22 bytes of the packet without the first.
   const std::string log = contentsOf(direct);
   EXPECT_EQ(log.size(), 182u);
   EXPECT_EQ(log.substr(0, 4), std::string("\xA1\x00\xFD\x1F", 4));

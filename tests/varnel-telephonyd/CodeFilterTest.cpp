@@ -5,7 +5,7 @@
 namespace varnel {
 namespace {
 
-// A header of the type and code, and nothing else.
+// Only the header of this log type and code.
 Bytes packet(std::uint8_t type, std::uint16_t code) {
   Bytes bytes(13);
   bytes[0] = type;
@@ -53,7 +53,7 @@ TEST(CodeFilter, WhatBearsNoCodeIsTaken) {
 
 TEST(CodeFilter, APrefixedMessageMayBeAsShortAsItLikes) {
   const CodeFilter filter{CodeFilter::Codes{0x0405}, CodeFilter::Codes{}};
-  // Thirteen bytes of which the packet has eleven.
+  // Thirteen bytes, of which eleven belong to the packet.
   EXPECT_TRUE(filter.takes(Bytes{0x81, 0, 1, 0, 0, 0x05, 0x04, 0, 0, 0, 0, 0, 0}));
   EXPECT_FALSE(filter.takes(Bytes{0x81, 0, 1, 0, 0, 0x06, 0x04, 0, 0, 0, 0, 0, 0}));
 }

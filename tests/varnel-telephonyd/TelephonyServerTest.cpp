@@ -34,7 +34,7 @@ Bytes startWith(const std::string& modemCodes, const std::string& serverCodes) {
                  modemCodes + "</array><key>SetTkExtraCodes</key><array>" + serverCodes + "</array>");
 }
 
-// Three bytes name the code of a modem packet, the rest of which is 0.
+// A modem packet with this log code. All its other bytes are 0.
 Bytes modemPacket(std::uint8_t code) { return {1, 12, 0, code, 0, 0, 0, 0, 0, 0, 0, 0, 0}; }
 Bytes serverPacket(std::uint8_t code) { return {0xFF, 12, 0, code, 0, 0, 0, 0, 0, 0, 0, 0, 0}; }
 
@@ -66,7 +66,7 @@ class TelephonyServerTest : public testing::Test {
     return made.portName.value_or("");
   }
 
-  // The messages of the stream that were sent since the last call. Reports are kept apart.
+  // The messages of the stream that were sent since the last call, without reports.
   Sent sent() {
     Sent messages;
     for (const auto& request : _ports.requests) {
@@ -83,7 +83,7 @@ class TelephonyServerTest : public testing::Test {
     return messages;
   }
 
-  // Makes the viewer's port take nothing while the test says so.
+  // Makes the viewer's port refuse messages while `hasRoom` is false.
   void takeOnlyWhile(const bool& hasRoom) {
     _ports.answer = [&hasRoom](const MemoryPorts::Request&) {
       return RemotePort::SendResult{hasRoom ? 0 : RemotePort::sendTimeout, std::nullopt};
@@ -454,7 +454,7 @@ TEST_F(TelephonyServerTest, ANoteReachesEveryViewerAndThoseThatComeLater) {
   EXPECT_EQ(_reports.back(), (StreamReport{"the recording has ended", 0, 0}));
 }
 
-// As many messages as come in a tenth of a second, all at once, for a viewer that has room for some.
+// All messages of a tenth of a second at once, for a viewer that has room for some of them.
 TEST_F(TelephonyServerTest, AFloodIsCountedToTheLastMessage) {
   _lateness = MessageSource::Lateness::IsDropped;
   _stream.assign(100'000, {0ms, modemPacket(1)});
@@ -485,7 +485,7 @@ struct SimulatedStream {
   std::size_t fewestMessages;  // in half a minute
 };
 
-// The packets of CDMA2000 are asked for by their codes alone; an object stream has none to ask for.
+// The viewer asks for packets of CDMA2000 by their codes. An object stream has no codes to ask for.
 const SimulatedStream simulatedStreams[] = {
     {"kalvi-lte", startEverything, 30},
     {"kalvi-cdma",
@@ -534,7 +534,7 @@ TEST_P(SimulatedStreamTest, TheViewersCommandStartsAllOfIt) {
   EXPECT_EQ(serve(simulation, [](ByteView) {}), expected);
 }
 
-// A recording of a simulated modem, replayed, is the same stream.
+// A replayed recording of a simulated modem is the same stream.
 TEST_P(SimulatedStreamTest, ARecordingIsReplayedAsItWasSent) {
   std::string folder = (std::filesystem::temp_directory_path() / "varnel-recording-XXXXXX").string();
   ASSERT_NE(::mkdtemp(folder.data()), nullptr);

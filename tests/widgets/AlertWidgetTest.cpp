@@ -22,7 +22,7 @@ class AlertWidgetTest : public testing::Test {
     userInterface.showAlert({title, "Unable to write file to disk", "Close"});
     QCoreApplication::processEvents();
   }
-  // The one shown last; null when there is none.
+  // The newest alert; null when there is none.
   AlertWidget* alert() { return dynamic_cast<AlertWidget*>(widget().children().last()); }
 
   std::vector<std::string> events;

@@ -25,7 +25,7 @@ QPalette palette(const QColor& ground, const QColor& text) {
   return made;
 }
 
-// A pane of 360 × 640 in the palette that the desktop has.
+// A pane of 360 × 640 in the desktop's palette.
 class InPalette : public testing::TestWithParam<std::pair<QColor, QColor>> {
  protected:
   InPalette() {
@@ -43,7 +43,7 @@ class InPalette : public testing::TestWithParam<std::pair<QColor, QColor>> {
   }
   ~InPalette() override { QApplication::setPalette(QPalette()); }
 
-  // The highest contrast to the ground, which is the area's first pixel, that there is in the area.
+  // The highest contrast in the area to the ground, which is the area's first pixel.
   double bestContrast(const QRect& area) const {
     const QColor ground = picture.pixelColor(area.topLeft());
     double best = 0;

@@ -36,7 +36,7 @@ class FakePortal final : public QObject {
 
 namespace {
 
-// How long something may take on a busy machine.
+// The longest time that something may take on a busy machine.
 constexpr int patience_ms = 60'000;
 
 bool isDark() { return QApplication::palette().color(QPalette::Base).lightness() < 60; }
@@ -63,7 +63,7 @@ TEST_F(DesktopColoursTest, DarkAndBackAgain) {
 TEST_F(DesktopColoursTest, FollowsTheDesktopsPortal) {
   PrivateBus bus;
   ASSERT_TRUE(bus.start()) << "dbus-daemon is needed";
-  // The program's one session bus, which nothing else here asks for.
+  // The session bus of the program. Nothing else here uses it.
   ::setenv("DBUS_SESSION_BUS_ADDRESS", bus.address().c_str(), 1);
   const QDBusConnection connection = QDBusConnection::sessionBus();
   ASSERT_TRUE(connection.isConnected());

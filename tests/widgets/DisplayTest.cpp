@@ -13,7 +13,7 @@
 namespace varnel {
 namespace {
 
-// Each test has an environment without displays, and gives back what was there.
+// Each test has an environment without displays, and restores the old one.
 class DisplayTest : public testing::Test {
  protected:
   DisplayTest() {

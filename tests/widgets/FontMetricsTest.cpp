@@ -12,7 +12,7 @@
 namespace varnel {
 namespace {
 
-// The number of dark pixels of a label that is so much larger than its text on the right and below.
+// The number of dark pixels of a label that is larger than its text by this much on the right and below.
 int inkOf(std::string_view text, const Font& font, double more) {
   const Size size = FontMetrics().sizeOfText(text, font);
   QWidget row;

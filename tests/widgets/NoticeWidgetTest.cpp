@@ -87,7 +87,8 @@ TEST_F(NoticeWidgetTest, TheTitleOfTheWindowIsOneLine) {
   EXPECT_EQ(window.windowTitle(), "Serving Cell — kalvi-lte — Varnel");
 }
 
-// Of a screen that nobody sees the wheel's timer has no number, and the test has its turns.
+// On an invisible screen the wheel's timer does not run, and its number is 0. The test sends the timer's
+// events itself.
 TEST(SpinnerWidget, AfterThreeTurnsItShowsTwoPicturesASecond) {
   SpinnerWidget spinner;
   spinner.setAnimating(true);

@@ -83,7 +83,7 @@ TEST_F(RememberedSizeTest, WithoutAFolderNothingIsRemembered) {
   EXPECT_EQ(nowhere.size(), std::nullopt);
 }
 
-// The screen that nobody sees is 800 × 800.
+// The invisible screen is 800 × 800.
 class WindowSizeTest : public RememberedSizeTest {
  protected:
   QSize sizeOfNewWindow() {

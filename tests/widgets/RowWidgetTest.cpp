@@ -18,7 +18,7 @@ class RowWidgetTest : public testing::Test {
     return *table.visibleRows().front();
   }
   enum class Edge { Left, Right };
-  // Whether the three dots that mean "there is more" are painted at that edge, with nothing between them.
+  // Whether the three dots are painted at this edge, with nothing between them.
   static bool hasDots(RowWidget& row, Edge edge) {
     const QImage picture = row.grab().toImage();
     const auto isPainted = [&](int distance) {

@@ -27,7 +27,7 @@ using testing::SizeIs;
 constexpr std::string_view channel = "com.orvane.BasebandStateReport.LogChannel";
 constexpr const char* marker = "/OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 
-// The whole application on real widgets, with a telephony server in the hands of the test.
+// The whole application on real widgets, with a telephony service that the test controls.
 class ScreensTest : public testing::TestWithParam<std::pair<int, int>> {
  protected:
   ScreensTest() {

@@ -36,7 +36,7 @@ class TableWidgetTest : public testing::Test {
     QTest::keyClick(&table, key, modifiers);
   }
   RowWidget& row(std::size_t index) const { return *table.visibleRows().at(index); }
-  // The row with the focus frame; -1 when none has it.
+  // The row with the focus frame; -1 when there is none.
   int current() const {
     for (const RowWidget* each : table.visibleRows()) {
       if (each->emphasis().hasFocusFrame) return static_cast<int>(each->row());
@@ -103,7 +103,7 @@ TEST_F(TableWidgetTest, AReloadRepaintsOnlyWhatHasChanged) {
   showWith(leaves(8));
   PaintCounter counter;
   for (RowWidget* each : table.visibleRows()) counter.watch(*each);
-  // So that no painting of the start is still to come.
+  // After this no repaint of the start is pending.
   for (RowWidget* each : table.visibleRows()) each->update();
   ASSERT_TRUE(QTest::qWaitFor([&] { return counter.painted.size() >= 8; }, patience_ms));
   counter.painted.clear();
@@ -180,7 +180,7 @@ TEST_F(TableWidgetTest, CellsThatWereScrolledAwayBeforeTheRowsChangedAreNotHande
   for (TestRow& each : delegate.rows) each.value.reset();
   delegate.rows.pop_back();
   table.reloadData();
-  table.verticalScrollBar()->setValue(500);  // sections' cells into the pool
+  table.verticalScrollBar()->setValue(500);  // the cells of the sections go into the pool
   table.verticalScrollBar()->setValue(0);
   delegate.rows = leaves(20);
   table.reloadData();
@@ -423,7 +423,7 @@ TEST_F(TableWidgetTest, ARowThatIsTooShortForItsValueTellsAllOfItInATooltip) {
   EXPECT_EQ(tip.toPlainText().remove(QChar(0x200B)).toStdString(),
             "Number: " + std::string(80, 'x') + " <b>&");
   pointAt({100, 25});
-  // The toolkit takes a tooltip away with a delay, its text at once.
+  // The toolkit removes a tooltip after a delay, but its text at once.
   EXPECT_TRUE(runUntil([] { return !QToolTip::isVisible(); }));
 }
 

@@ -16,7 +16,7 @@
 
 namespace varnel {
 
-/// A record that outlives the reading.
+/// A record that stays valid after the next one was read.
 struct KeptRecord {
   Time time;
   Bytes message;
@@ -40,7 +40,7 @@ struct CaptureReading {
   std::vector<std::string> told{};
 };
 
-/// Bytes that stand in memory.
+/// Bytes in memory.
 class MemorySource final : public ByteSource {
  public:
   explicit MemorySource(const Bytes& bytes) : _bytes(bytes) {}
@@ -124,7 +124,7 @@ class CaptureFiles : public testing::Test {
   std::filesystem::path _folder;
 };
 
-/// Bytes worked out by hand: two log records, alone and in what may stand around them.
+/// Bytes worked out by hand: two log records, alone and inside frames and wrappers.
 namespace example {
 
 /// Code 0xB17F at 2024-03-01 14:05:09.500625: units 1,114,669,687,600 of 1.25 ms and 24,576 parts.
@@ -134,7 +134,7 @@ inline const Bytes datedFrame{0x10, 0x00, 0x10, 0x00, 0x10, 0x00, 0x7F, 0xB1, 0x
                               0x5D, 0x87, 0x03, 0x01, 0x7D, 0x5E, 0x7D, 0x5D, 0x05, 0xFF, 0xCF, 0x91, 0x7E};
 /// Code 0xB0C1, two seconds after the modem's start.
 inline const Bytes undated{0x0D, 0x00, 0xC1, 0xB0, 0x00, 0x00, 0x40, 0x06, 0x00, 0x00, 0x00, 0x00, 0x2A};
-/// In the wrapper of the second subscription.
+/// In the wrapper for the second subscription.
 inline const Bytes undatedFrame{0x98, 0x01, 0x00, 0x00, 0x02, 0x00, 0x00, 0x00, 0x10, 0x00,
                                 0x0D, 0x00, 0x0D, 0x00, 0xC1, 0xB0, 0x00, 0x00, 0x40, 0x06,
                                 0x00, 0x00, 0x00, 0x00, 0x2A, 0x83, 0x80, 0x7E};
@@ -142,7 +142,7 @@ inline const Bytes answerFrame{0x00, 0x61, 0x62, 0x63, 0x37, 0xA4, 0x7E};
 inline const Bytes debugFrame{0x92, 0x01, 0x02, 0xC7, 0xC0, 0x7E};
 inline const Bytes encryptedFrame{0x9E, 0x01, 0x02, 0x03, 0xA4, 0xE7, 0x7E};
 
-/// Its record says to be four bytes longer than the frame; its checksum is right.
+/// Its record claims to be four bytes longer than the frame. Its checksum is right.
 inline const Bytes brokenFrame{0x10, 0x00, 0x10, 0x00, 0x14, 0x00, 0x7F, 0xB1, 0x00, 0x60, 0x30, 0xA3, 0x7D,
                                0x5D, 0x87, 0x03, 0x01, 0x7D, 0x5E, 0x7D, 0x5D, 0x05, 0xFF, 0xAD, 0xB9, 0x7E};
 
@@ -152,12 +152,12 @@ inline const Time undatedTime{315964802, 0};
 inline Bytes message(const Bytes& record) { return joined({{0x01}, record}); }
 inline const KeptRecord datedRecord{datedTime, message(dated)};
 inline const KeptRecord undatedRecord{undatedTime, message(undated), Dating::Unknown};
-// In a binary log it would be a server's count of milliseconds: 104,857.6 s.
+// In a binary log, this time would be a server's count of milliseconds: 104,857.6 s.
 inline const Time countedTime{316069657, 600000000};
 inline const KeptRecord undatedRecordOfTwo{undatedTime, joined({{0x81, 0x02, 0x01}, undated}),
                                            Dating::Unknown, 2};
 
-/// A frame that tells its length.
+/// A frame with a length.
 inline Bytes lengthFrame(const Bytes& contents) {
   return joined({{0x7E, 0x01, static_cast<std::uint8_t>(contents.size()),
                   static_cast<std::uint8_t>(contents.size() >> 8)},
@@ -190,7 +190,7 @@ inline std::uint16_t slowChecksum(const Bytes& contents) {
   return static_cast<std::uint16_t>(~rest);
 }
 
-/// A framed stream's frame.
+/// A frame of a framed stream.
 inline Bytes frame(Bytes contents) {
   const std::uint16_t checksum = slowChecksum(contents);
   contents.insert(contents.end(),

@@ -34,7 +34,7 @@ TEST(ModemTime, OfAMomentIsTheNearest) {
   EXPECT_EQ(modemTimeOf({1709301909, 500625000}).raw, 0x0103877DA3306000u);
   EXPECT_EQ(modemTimeOf({1709301909, 500625012}).raw, 0x0103877DA3306000u);
   EXPECT_EQ(modemTimeOf({1709301909, 500625013}).raw, 0x0103877DA3306001u);
-  // Half a part before the next unit it is the next unit.
+  // A time less than half a part before the next unit becomes that unit.
   EXPECT_EQ(modemTimeOf({315964800, 1249999}).raw, 0x10000u);
 }
 

@@ -75,7 +75,7 @@ TEST_F(Streams, TheFirstAndTheLastFrameMayBeTorn) {
 }
 
 TEST_F(Streams, NoneIsLostBehindAFrameThatBreaksOff) {
-  // Another frame begins in it without an end between them: both are one that is not sound.
+  // Another frame begins inside, without a frame end between them. Both together are one unsound frame.
   const CaptureReading reading =
       readBytes(joined({undatedFrame, firstOf(datedFrame, 12), datedFrame, undatedFrame, datedFrame}));
   EXPECT_THAT(reading.records, ElementsAre(undatedRecordOfTwo, undatedRecordOfTwo, datedRecord));
@@ -185,7 +185,7 @@ TEST_F(Streams, InABinaryLogEveryRecordWhoseLengthIsItsOwnIsFound) {
 TEST_F(Streams, GzipMayBeAroundThem) {
   const Bytes plain = joined({datedFrame, undatedFrame});
   EXPECT_THAT(readBytes(packed(plain)).records, ElementsAre(datedRecord, undatedRecordOfTwo));
-  // In two pieces, which break a frame.
+  // Two pieces with a torn frame between them.
   const Bytes first = firstOf(plain, 40), second(plain.begin() + 40, plain.end());
   EXPECT_THAT(readBytes(joined({packed(first), packed(second)})).records,
               ElementsAre(datedRecord, undatedRecordOfTwo));
@@ -265,7 +265,7 @@ TEST_F(Streams, OfEveryTruncationAllWholeRecordsComeOrItIsNoCapture) {
           std::ranges::count_if(golden.ends, [&](std::size_t end) { return end <= length; }));
       EXPECT_EQ(reading.records.size(), whole) << length;
       EXPECT_FALSE(whole > 0 && reading.error) << length << reading.error.value_or("");
-      // What is left of a record is one that is torn.
+      // The rest of a record is a torn record.
       const bool isCutWithin =
           !reading.error && length != golden.begin && !std::ranges::count(golden.ends, length);
       EXPECT_EQ(reading.leftOut.torn + reading.leftOut.broken, isCutWithin ? 1u : 0u) << length;
@@ -290,13 +290,13 @@ TEST_F(Streams, TenThousandMutantsAreReadToTheirEnd) {
       ASSERT_GE(record.message.size(), 13u);
       size += record.message.size();
     }
-    // No byte becomes part of two records; a framed one gains at most its log type and prefix.
+    // No byte is part of two records. A framed record gains at most its log type and its prefix.
     ASSERT_LE(size, bytes.size() + 3 * reading.records.size()) << i;
     ASSERT_THAT(reading.error.value_or("memory"), testing::AllOf(HasSubstr("memory"), Not(HasSubstr("\n"))));
   }
 }
 
-// The bytes with one to four of them changed.
+// The bytes with one to four bytes changed.
 template <class Random>
 Bytes mutantOf(Bytes bytes, Random& random) {
   for (std::uint64_t count = 1 + (random() >> 33) % 4; count > 0; --count)
@@ -340,7 +340,7 @@ TEST_F(Streams, WhatComesFromAPipeComesOutAsSoonAsItIsWhole) {
     ASSERT_EQ(::write(ends[1], bytes.data(), bytes.size()), static_cast<ssize_t>(bytes.size()));
   };
   send(datedFrame);
-  // Would wait for ever if it wanted to see more.
+  // It would wait forever if it needed more bytes.
   const auto capture = openCapture("/dev/fd/" + std::to_string(ends[0]));
   CaptureRecord record;
   ASSERT_TRUE(capture->next(record));
