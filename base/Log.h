@@ -61,8 +61,8 @@ struct Argument {
 /// A format with one conversion per argument (%d %u %x %ld %lf %p %s). The compiler checks it.
 template <class... Arguments>
 struct Format {
-  template <std::size_t N>
-  consteval Format(const char (&literal)[N]) : text(literal, N - 1) {
+  template <std::size_t size>
+  consteval Format(const char (&literal)[size]) : text(literal, size - 1) {
     std::string_view rest = text;
     (takeConversion<std::remove_cvref_t<Arguments>>(rest), ...);
     if (rest.find('%') != std::string_view::npos) throw "the format has more conversions than arguments";

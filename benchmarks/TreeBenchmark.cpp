@@ -18,7 +18,7 @@ Value displayOfLeaves(int sections, int leavesPerSection) {
   return display;
 }
 
-void TreeOf500Leaves(benchmark::State& state) {
+void treeOf500Leaves(benchmark::State& state) {
   const Value display = displayOfLeaves(25, 20);
   for (auto _ : state) {
     PathDictionary paths;
@@ -26,7 +26,7 @@ void TreeOf500Leaves(benchmark::State& state) {
   }
   state.SetItemsProcessed(state.iterations() * 500);
 }
-BENCHMARK(TreeOf500Leaves);
+BENCHMARK(treeOf500Leaves);
 
 }  // namespace
 }  // namespace varnel
