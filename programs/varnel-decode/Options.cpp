@@ -19,14 +19,14 @@ constexpr unsigned mostJobs = 256;
 
 constexpr const char* examples =
     "PATH names a value as --format paths shows it: 'Serving Cell Measurements/Average RSRP'. --csv and "
-    "--plot take all that\n"
-    "follows them but the last; put several captures before them, or after a --. In place of a row's number "
-    "a value may\n"
-    "select the row: 'Neighbor Cells List[Physical Cell ID=16]/Measured RSRP' is the first neighbor that has "
-    "it. The\n"
-    "display templates are read from the folder that the environment variable VARNEL_RESOURCES names; else "
-    "from the\n"
-    "installed one.\n"
+    "--plot take all\n"
+    "arguments that follow them, except the last one; write several captures before them, or after --. "
+    "Instead of the\n"
+    "number of a list's record, a value can select the record: 'Neighbor Cells List[Physical Cell "
+    "ID=16]/Measured RSRP'\n"
+    "is that of the first neighbor with this value. The display templates come from the folder that the "
+    "environment\n"
+    "variable VARNEL_RESOURCES names, else from the installed one.\n"
     "\n"
     "  varnel-decode --technology kalvi-lte walk.pcap\n"
     "  varnel-decode --technology kalvi-lte --every walk.pcap\n"
@@ -63,7 +63,7 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
                   const std::vector<std::string>& technologies) {
   app.add_option("--technology", options.technology, "the modem that was captured; snapshots need none")
       ->check(CLI::IsMember(technologies));
-  app.add_option("--jobs", options.jobs, "decode up to that many captures at the same time")
+  app.add_option("--jobs", options.jobs, "decode up to this many captures at the same time")
       ->check(CLI::Range(1U, mostJobs).description(""))
       ->type_name("N")
       ->capture_default_str();
@@ -73,31 +73,31 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
       ->type_name("N")
       ->capture_default_str();
   app.add_option("--sim", wishes.subscription,
-                 "take the records of that SIM card, as the modem counts them, and those that name none")
+                 "take the records of this SIM card, and those that name no card; modems count from 1")
       ->check(CLI::Range(1U, 255U).description(""))
       ->type_name("N");
-  app.add_flag("--follow", wishes.isFollowing, "wait for more where the file ends, until interrupted");
+  app.add_flag("--follow", wishes.isFollowing, "wait for more at the end of the file, until interrupted");
   app.add_option("CAPTURE", options.captures,
-                 "what a diagnostic port sends, log records, pcap of link type USER0, or a snapshot; - is "
+                 "a stream of a diagnostic port, log records, pcap of link type USER0, or a snapshot; - is "
                  "standard input")
       ->required()
       ->type_name("");
 }
 
 void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
-  app.add_option("--format", wishes.format, "how the display is written; text unless given")
+  app.add_option("--format", wishes.format, "the form of the display; text unless given")
       ->check(CLI::IsMember(formatNames()));
   auto* every = app.add_flag("--every", wishes.isEvery,
                              "write each display, one every 2 s of the capture, as a line of JSON");
   auto* table = app.add_option("--csv", options.tablePaths,
-                               "write the values under these paths as CSV, a row for each display")
+                               "write the values under these paths as CSV, one row per display")
                     ->type_name("PATH")
                     ->excludes(every);
   app.add_flag("--numbers", wishes.isNumbers,
-               "with --every and --csv: write plain numbers, and their units apart");
-  app.add_flag(
-      "--changes", wishes.isChanges,
-      "with --every and --csv: write displays that differ from the one before, as JSON what differs");
+               "with --every and --csv: write plain numbers, and their units separately");
+  app.add_flag("--changes", wishes.isChanges,
+               "with --every and --csv: write only displays that differ from the one before; in JSON only "
+               "what differs");
   app.add_flag("--stats", wishes.isStatistics,
                "count the messages of each log code: received, decoded, too short, too long, unknown")
       ->excludes(every)

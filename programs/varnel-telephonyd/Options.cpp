@@ -37,34 +37,34 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
       ->capture_default_str();
   auto* replay =
       app.add_option("--replay", options.replayPath,
-                     "send the messages of a capture of any kind that varnel-decode reads, in their own "
-                     "time; every viewer gets them from the start")
+                     "send the messages of a capture of any kind that varnel-decode reads, with the pauses "
+                     "between them; every viewer gets them from the start")
           ->excludes(simulate)
           ->type_name("CAPTURE");
   app.add_option("--technology", options.replayTechnology,
-                 "the modem that was captured; unless given what the capture says, else kalvi-lte")
+                 "the modem that was captured; unless given, the one that the capture names, else kalvi-lte")
       ->needs(replay)
       ->check(CLI::IsMember(technologies))
       ->type_name("TECHNOLOGY");
-  app.add_option("--speed", options.speed, "replay that many times as fast")
+  app.add_option("--speed", options.speed, "replay this many times as fast")
       ->needs(replay)
       ->type_name("X")
       ->capture_default_str();
   app.add_flag("--loop", options.loops, "start the capture over at its end")->needs(replay);
   app.add_option("--sim", options.subscription,
-                 "of a capture with several SIM cards: replay the messages of this one's modem; the first "
-                 "that is met unless given")
+                 "replay the messages of this SIM card, and those that name no card; unless given, the first "
+                 "card that a message names")
       ->needs(replay)
       ->check(CLI::Range(1U, 255U).description(""))
       ->type_name("N");
   auto* record =
       app.add_option("--record", options.recordPath,
-                     "write what is sent to viewers to a capture that can be replayed and decoded; a file "
-                     "that is there and not empty is refused")
+                     "write what is sent to viewers to a capture that can be replayed and decoded; refuses a "
+                     "file that exists and is not empty")
           ->type_name("CAPTURE");
   app.add_flag_callback(
          "--overwrite", [&options] { options.existingRecording = ExistingRecording::Replaced; },
-         "have the recording take the place of a file that is there, with its first message")
+         "let the recording replace an existing file, when the first message comes")
       ->needs(record);
   app.add_option("--runtime-dir", options.runtimeFolder,
                  "where viewer and server meet; $XDG_RUNTIME_DIR/varnel unless given")

@@ -19,11 +19,14 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
   parser.set_version_flag("--version",
                           programName + std::string(" ") + application.version.value_or("(none)"));
   parser
-      .add_option("--ui", options.userInterface,
-                  "how the display is shown: window, text, or auto (window where there is a display)")
+      .add_option(
+          "--ui", options.userInterface,
+          "how the display is shown: window, text, or auto (a window if there is a graphical display)")
       ->check(CLI::IsMember({"auto", "window", "text"}))
       ->capture_default_str();
-  parser.add_option("--device-root", options.deviceRoot, "put before the device's absolute paths")
+  parser
+      .add_option("--device-root", options.deviceRoot,
+                  "the folder that stands for the root of the device's file system")
       ->type_name("DIR")
       ->capture_default_str();
   parser
@@ -37,11 +40,12 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       ->type_name("N")
       ->capture_default_str();
   parser
-      .add_option("--sim", options.subscription,
-                  "of a phone with several SIM cards: show what this one's modem sends, 1 or 2 as a rule")
+      .add_option(
+          "--sim", options.subscription,
+          "show the messages of this SIM card, and those that name no card; cards usually count from 1")
       ->check(CLI::Range(1U, 255U).description(""))
       ->type_name("N");
-  parser.add_option("--updates", options.updates, "end after that many refreshes")
+  parser.add_option("--updates", options.updates, "end after this many refreshes")
       ->check(CLI::Range(1U, std::numeric_limits<unsigned>::max()).description(""))
       ->type_name("N");
 }
