@@ -5,9 +5,9 @@
 
 namespace varnel {
 
-/// Makes tasks that others may keep for longer than their owner lives: once the owner is gone they do
-/// nothing. It is the last member of the owner, so that no task runs while the owner is being destroyed.
-/// Owner and tasks stay on one thread.
+/// Makes tasks that can be kept longer than their owner lives. A task does nothing once the owner is gone.
+/// This object must be the last member of the owner, so that no task runs while the owner is being destroyed.
+/// Owner and tasks must stay on one thread.
 class WhileAlive {
  public:
   WhileAlive() = default;

@@ -16,10 +16,10 @@ constexpr std::chrono::milliseconds sendTimeout = 1s;
 constexpr std::chrono::milliseconds replyTimeout = 1s;
 constexpr std::chrono::milliseconds refreshInterval = 2s;
 constexpr std::chrono::milliseconds retryDelay = 5s;
-// Those that are known are shorter; a strange server may name anything.
+// The known names are shorter. A strange server may send anything.
 constexpr std::size_t longestTechnologyKept = 64;
 
-// Logs why there is none.
+// The technology in the reply. Without one logs why and returns nothing.
 std::optional<Value> technologyIn(ByteView reply) {
   const auto list = readPropertyList(reply);
   const Dictionary* answers = list ? list->dictionary() : nullptr;
@@ -149,7 +149,8 @@ bool VarnelModel::createRemotePort(const std::string& name) {
 
 void VarnelModel::destroyPorts() {
   _displayUpdateTimer.reset();
-  // Tearing down must not look like the service's going away, or it would start the monitor again.
+  // Without a handler, the port does not report that the service has gone away, which would restart the
+  // monitor.
   if (_recvPort) {
     _recvPort->setInvalidationHandler({});
     _recvPort->invalidate();
@@ -195,7 +196,7 @@ std::optional<Value> VarnelModel::askForTechnology() {
   return technologyIn(*sent.reply);
 }
 
-// The state outlives the generators, and a display in it may be out of reach of a new one.
+// The state outlives the generators, so it can have a display to which a new generator cannot write.
 void VarnelModel::noteWhetherDisplayStands() {
   if (!_logGenerator) return;
   if (_logGenerator->changesDisplayOf(_state)) {
@@ -215,7 +216,7 @@ void VarnelModel::refresh() {
   _services.queue.async(_whileAlive([this] { _observer.updateViewControllerFromModel(); }));
 }
 
-// The port, and with it the handler that calls this, goes in between.
+// restartMonitor destroys the port and the handler that runs this; touch neither afterwards.
 void VarnelModel::localPortWasInvalidated(const LocalPort* port) {
   logError(" ***** INVALIDATED %p *****", static_cast<const void*>(port));
   restartMonitor();

@@ -17,54 +17,54 @@
 
 namespace varnel {
 
-/// Who shows what the model holds.
+/// Shows what the model holds.
 class VarnelModelObserver {
  public:
   virtual ~VarnelModelObserver() = default;
-  /// New data has arrived: the tree is to be asked for again. Called from the main queue.
+  /// New data has arrived, so the observer should ask for the tree again. Called from the main queue.
   virtual void updateViewControllerFromModel() = 0;
-  /// The link to the telephony service was lost and has been started anew: `isConnected` may say otherwise
-  /// than before, while the tree stays what it is.
+  /// The link to the telephony service was lost, and the model has started it again. `isConnected` may have
+  /// changed; the tree has not.
   virtual void linkWasLost() {}
-  /// The stream has started: `isConnected` says so, while the tree stays what it is until data arrives.
+  /// The stream has started, so `isConnected` is true. The tree does not change until data arrives.
   virtual void linkWasOpened() {}
-  /// The link was looked at and brought no data, or could not be opened: what is to be told of it may be
-  /// another thing than before.
+  /// The model has checked the link, and no data has arrived; or it could not open the link. What there is to
+  /// tell about the link may have changed.
   virtual void linkWasLookedAt() {}
 };
 
-/// A display that no message changes any more, since a new link's generator cannot write to it.
+/// A display that no message changes any more, since the generator of a new link cannot write to it.
 struct StandingDisplay {
-  std::string technology;  ///< whose display it is
+  std::string technology;  ///< the technology of the display
   Time since;              ///< when the new link was opened
 };
 
 /// Why the stream did not start.
 enum class StreamFailure {
-  None,               ///< it did, or was not tried yet
+  None,               ///< the stream did start, or was not tried yet
   Link,               ///< there is no link to the telephony service
-  NoTechnology,       ///< the service does not tell its technology
-  UnknownTechnology,  ///< no generator is there for it
+  NoTechnology,       ///< the service does not tell the technology of its modem
+  UnknownTechnology,  ///< there is no generator for the technology
   Command,            ///< the start command could not be sent
 };
 
-/// What the model may ask of its host. Everything outlives the model.
+/// What the model needs from its host. Every object in it must outlive the model.
 struct ModelServices {
   MessagePorts& ports;
   TelephonyService& telephony;
   MainQueue& queue;
   Services generator;
-  /// Serialises a command; nothing when it cannot.
+  /// Writes a command as a property list; nothing when that is not possible.
   std::function<std::optional<Bytes>(const Value& command)> writePropertyList;
-  /// What the host knows of the link; null when it knows nothing. The model itself does not ask.
+  /// Reports about the link; null when the host has none. The model itself does not use them.
   const LinkReports* linkReports = nullptr;
 };
 
-/// The link to the telephony service and the display tree made of what arrives on it.
+/// The link to the telephony service, and the display tree made of what arrives on it.
 ///
-/// It opens the log channel, asks which modem technology is present, has the matching generator, sends that
-/// one's start command and from then on feeds it every message. Each failure tears the link down; the next
-/// attempt follows five seconds later, without end. Everything happens on the main queue.
+/// The model opens the log channel, asks for the modem technology, makes the generator for it, and sends the
+/// generator's start command. From then on it gives the generator every message. After each failure it closes
+/// the link and tries again five seconds later, without end. Everything happens on the main queue.
 class VarnelModel {
  public:
   VarnelModel(const ModelServices& services, VarnelModelObserver& observer);
@@ -74,37 +74,37 @@ class VarnelModel {
 
   /// True while both ports exist.
   bool isConnected() const { return _recvPort && _sendPort; }
-  /// Tears the link down and starts it anew.
+  /// Closes the link and starts it again.
   void restartMonitor();
-  /// Has the main queue call `restartMonitor` once.
+  /// Calls `restartMonitor` once, from the main queue.
   void restartMonitorLater();
-  /// Opens the link unless the stream runs; retries in five seconds when that fails.
+  /// Opens the link unless the stream runs. Tries again in five seconds when that fails.
   void startMonitor();
-  /// Notices a service that has gone away, and has the observer updated when new data has arrived.
+  /// Notices that the service has gone away. Updates the observer when new data has arrived.
   void refresh();
-  /// Folds one message of the log channel into the state.
+  /// Gives the generator one message of the log channel, which changes the state.
   void updateWithData(ByteView data);
 
-  /// The root of the display tree; null while there is no generator. Builds the tree when none is cached,
-  /// which records a snapshot in the history.
+  /// The root of the display tree; null while there is no generator. If no tree is cached, builds one, and
+  /// adds a snapshot record to the history.
   std::shared_ptr<const VarnelModelNode> topLevelNodes();
-  /// The node of that path; null when there is none.
+  /// The node with this path; null when there is none.
   std::shared_ptr<const VarnelModelNode> nodeAtPath(const std::string& path);
-  /// What the save screen writes: an array of items; absent while there is no generator.
+  /// The items that the save screen writes, as an array; absent while there is no generator.
   Value getSaveContents() const;
-  /// How many messages since the link was opened the binary log lacks because too many came at a time. They
-  /// are shown all the same.
+  /// How many messages the binary log lacks since the link was opened, because too many came at a time. They
+  /// are shown nevertheless.
   std::uint64_t messagesLeftOutOfLog() const;
 
-  /// How the last attempt to start the stream went.
+  /// The result of the last attempt to start the stream.
   StreamFailure streamFailure() const { return _streamFailure; }
-  /// The technology that the service named last, cut to 64 bytes; empty before it has named one.
+  /// The last technology that the service named, cut to 64 bytes; empty before it has named one.
   const std::string& technology() const { return _technology; }
-  /// Absent while what arrives changes the display, and while there is none.
+  /// Absent while messages change the display, and while there is no display.
   const std::optional<StandingDisplay>& standingDisplay() const { return _standingDisplay; }
-  /// True once a display has been made of what arrived.
+  /// True after a display was made from messages.
   bool hasHistory() const;
-  /// The file without which there is no display, when it could not be loaded; absent otherwise.
+  /// The template file, when it could not be loaded and so there is no display; absent otherwise.
   std::optional<std::string> missingTemplate() const;
   /// How many messages since the link was opened no decoder took, because of their log code or length.
   std::uint64_t messagesNotDecoded() const;
@@ -112,12 +112,12 @@ class VarnelModel {
  private:
   bool createPorts();
   bool createLocalPort();
-  /// The name of the port that takes the channel's commands; nothing after a failure, which is logged.
+  /// The name of the port that takes the channel's commands. On failure logs why and returns nothing.
   std::optional<std::string> createLogChannel();
   bool createRemotePort(const std::string& name);
   void destroyPorts();
   void configureGenerator();
-  /// Nothing when there is no answer, which is logged.
+  /// The answer. Without an answer logs why and returns nothing.
   std::optional<Value> askForTechnology();
   bool startStream();
   StreamFailure failureToStart();
@@ -135,7 +135,7 @@ class VarnelModel {
   bool _updated = false;
   StreamFailure _streamFailure = StreamFailure::None;
   std::string _technology;
-  std::string _displayTechnology;  // that of the generator that made the display, or is to make it
+  std::string _displayTechnology;  // of the generator that made the display, or is going to make it
   std::optional<StandingDisplay> _standingDisplay;
   std::unique_ptr<LogGenerator> _logGenerator;
   Dictionary _state;

@@ -4,7 +4,7 @@ namespace varnel::simulation {
 
 namespace {
 
-// The first call comes early, so that a new stream soon has something of everything.
+// The first call comes early, so that a new stream soon has some of everything.
 constexpr std::int64_t firstPages = 4;
 constexpr std::int64_t fewestPages = 4, mostPages = 8;
 

@@ -6,8 +6,8 @@
 
 namespace varnel::simulation {
 
-/// What the 1x half of a CDMA phone does: it finds the network, sleeps and listens to its pages in turn, and
-/// after a number of pages there is a call, behind which it finds the network anew.
+/// What the 1x half of a CDMA phone does. It finds the network, then sleeps and listens to its pages in turn.
+/// After a number of pages there is a call, and then it finds the network again.
 class CDMA1xConnection {
  public:
   /// Numbered as in the modem's packets.
@@ -29,7 +29,7 @@ class CDMA1xConnection {
   bool isIdle() const { return _state == State::Paging || _state == State::SlottedSleep; }
   bool hasPilot() const { return _state >= State::Sync && _state <= State::Traffic; }
 
-  /// Time passes; true when the state is another one from now on.
+  /// Lets time pass. True when the state has changed.
   bool update(std::chrono::milliseconds now);
 
  private:

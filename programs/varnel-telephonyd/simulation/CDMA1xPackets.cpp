@@ -10,7 +10,7 @@ namespace {
 
 constexpr std::uint16_t statusCode = 0x119C, trafficFrameCode = 0x119D, systemCode = 0x134F;
 
-// A container of subpackets: their number, then one behind the other.
+// A container of subpackets: their number, then the subpackets one after the other.
 constexpr std::size_t containerHead = 17;
 enum SubpacketIdentity { SystemState = 1, Radio = 2, ActiveSet = 3, Fingers = 4, TrafficDemodulation = 11 };
 
@@ -20,26 +20,26 @@ PacketWriter container(std::uint16_t code, std::chrono::milliseconds now, int su
       .u8(14, subpackets);
 }
 
-// Begins one, from whose start offsets count. The records behind its head belong to it.
+// Begins a subpacket. Offsets count from its start. The records after its head belong to it.
 PacketWriter& subpacket(PacketWriter& packet, SubpacketIdentity identity, std::size_t headSize,
                         std::size_t recordsSize = 0) {
   return packet.record(headSize).u8(0, identity).u16(2, static_cast<std::int64_t>(headSize + recordsSize));
 }
 
-// Levels are sent in steps of 0.334 dB, 0 being -63.248 dBm.
+// Levels are sent in steps of 0.334 dB. 0 stands for -63.248 dBm.
 std::int64_t gainSteps(std::int64_t level_cdbm) {
   return std::clamp<std::int64_t>((level_cdbm * 10 + 63'248) / 334, -128, 127);
 }
 
-// Energies are sums over that many chips, scaled by a gain and an exponent, and above the noise that such a
-// sum collects: energy = (strength + 1/chips) * 9 * chips^2 * gain / 2^(2 * exponent - 3).
+// An energy is a sum over this many chips, scaled by a gain and an exponent. It includes the noise of such a
+// sum: energy = (strength + 1/chips) * 9 * chips^2 * gain / 2^(2 * exponent - 3).
 constexpr std::int64_t chips = 512, gain = 4, exponent = 5;
 constexpr std::int64_t energyOfWhole = 9 * chips * chips * gain >> (2 * exponent - 3);
 std::int64_t energy(std::int64_t strength) {
   return strength * energyOfWhole / ReceivedPilot::whole + energyOfWhole / chips;
 }
 
-// Each pilot is followed by the energies of its fingers, so many for all; then comes its own.
+// After each pilot come the energies of its fingers, the same number for all, and then its own energy.
 constexpr std::size_t fingersPerPilot = 2;
 constexpr std::size_t activeSetHead = 12, energyOffset = 12 + 4 * fingersPerPilot;
 constexpr std::size_t pilotSize = (6 * fingersPerPilot + 15) & 0xFFC;
@@ -60,7 +60,7 @@ void writeActiveSet(PacketWriter& packet, const CDMA1xStatus& status) {
     packet.record(pilotSize).u16(0, pilot.cell->code).u16(energyOffset, energy(pilot.strength));
 }
 
-// One finger a pilot.
+// One finger per pilot.
 void writeFingers(PacketWriter& packet, const CDMA1xStatus& status) {
   subpacket(packet, Fingers, fingersHead, fingerSize * status.pilots.size()).u8(4, std::ssize(status.pilots));
   for (const ReceivedPilot& pilot : status.pilots)

@@ -9,13 +9,13 @@
 
 namespace varnel::simulation {
 
-/// What the 1x half of a CDMA phone tells of itself. Its second receiver is on the same channel.
+/// What the 1x half of a CDMA phone reports about itself. Its second receiver is on the same channel.
 struct CDMA1xStatus {
   CDMA1xConnection::State state;
   int bandClass, channel;
   std::int64_t level_cdbm, secondLevel_cdbm;
   std::int64_t transmitPower_cdbm;
-  int referencePilot;                 ///< its offset
+  int referencePilot;                 ///< the offset of the pilot
   std::vector<ReceivedPilot> pilots;  ///< the active set
 };
 

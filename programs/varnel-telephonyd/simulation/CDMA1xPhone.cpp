@@ -14,11 +14,11 @@ constexpr PilotSet::Thresholds thresholds{ReceivedPilot::whole * 50 / 1000, Rece
 
 constexpr std::int64_t receiverNoise_cdb = 40, secondReceiverLoss_cdb = 1'50, powerControlNoise_cdb = 80;
 
-// The network sends with as much power as leaves one frame of a hundred erased, as long as it has enough.
+// The network sends with the power at which one frame of a hundred is erased, as long as it has that much.
 constexpr std::int64_t framesPerErasure = 100;
 constexpr std::int64_t neededStrength_cdb = -11'50, fading_cdb = 1'70;
 
-// A network of others that lets the phone in.
+// Another network that accepts the phone.
 constexpr CDMASystem partner{.roamingIndicator = 7,
                              .system = 4157,
                              .network = 3,
@@ -52,7 +52,7 @@ CDMA1xPhone::Changes CDMA1xPhone::step(std::chrono::milliseconds now) {
   return changes;
 }
 
-// Calls are spread over the carriers.
+// Calls are distributed over the carriers.
 void CDMA1xPhone::chooseChannel() {
   const bool isMoved = _connection.state() == State::Traffic && _random.oneIn(2);
   _channel = isMoved ? nextCarrierBelow(_commonChannel) : _commonChannel;

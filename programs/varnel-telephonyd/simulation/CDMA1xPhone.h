@@ -15,15 +15,15 @@ class CDMA1xPhone {
   struct Changes {
     bool state = false, cell = false;
   };
-  /// The walk has gone a step.
+  /// The phone has walked one step.
   Changes step(std::chrono::milliseconds now);
 
   const CDMA1xConnection& connection() const { return _connection; }
 
   CDMA1xStatus status();
-  /// How the next frame of a call arrives: the weaker the active set is in all, the more of them are erased.
+  /// How the next frame of a call arrives. The weaker the whole active set is, the more frames are erased.
   Frame nextFrame();
-  /// The system of the serving cell; two thirds of the town are home.
+  /// The system of the serving cell. Two thirds of the town belong to the home system.
   CDMASystem system() const;
 
  private:
@@ -35,7 +35,7 @@ class CDMA1xPhone {
   CellSelection _selection;
   CDMA1xConnection _connection;
   PilotSet _activeSet;
-  const int _commonChannel;  // where all phones idle
+  const int _commonChannel;  // where all phones are while they idle
   int _channel;
 };
 

@@ -9,10 +9,10 @@ namespace varnel::simulation {
 namespace {
 
 constexpr std::int64_t noise_cdbm = -106'00;  // in 1.23 MHz
-// Even beneath a mast no receiver is perfect: a twentieth of what it gets disturbs the rest.
+// Even below a mast no receiver is perfect: a twentieth of the received power disturbs the rest.
 constexpr std::int64_t imperfection = 20;
 constexpr std::int64_t pilotPartOf1x = 5;  // a fifth of the power
-// 3GPP2 C.S0011, in the band class of 800 MHz.
+// 3GPP2 C.S0011, for the band class of 800 MHz.
 constexpr std::int64_t openLoopSum_cdbm = -73'00;
 
 }  // namespace

@@ -4,7 +4,7 @@
 
 namespace varnel::simulation {
 
-// The braces keep the order in which the parts of the world draw their randomness.
+// Braces fix the order in which the parts of the world draw random numbers.
 CDMAModem::CDMAModem(Random random)
     : ScheduledModem(random.fork()),
       _walk{Town::build(random.fork()), random.fork()},
@@ -24,7 +24,7 @@ CDMAModem::CDMAModem(Random random)
 
 std::string_view CDMAModem::technology() const { return varnel::technology::kalviCDMA; }
 
-// The phone looks for the data network once it has the other one, and a call takes the radio for itself.
+// The phone looks for the data network after it has found the voice network. A call uses the radio alone.
 void CDMAModem::step() {
   _walk.step();
   const auto voice = _voice.step(now());
@@ -45,7 +45,7 @@ void CDMAModem::sendFrame() {
     send(trafficFramePacket(now(), _voice.nextFrame()));
 }
 
-// Before it has read the channels of a cell, the phone knows none.
+// The phone knows no system before it has read the channels of a cell.
 void CDMAModem::sendSystem() {
   const bool isKnown =
       _voice.connection().isIdle() || _voice.connection().state() == CDMA1xConnection::State::Traffic;

@@ -6,9 +6,9 @@
 
 namespace varnel::simulation {
 
-/// A CDMA modem with a 1x half for voice and an HRPD half for data. Both tell how they are when that changes
-/// and every second as long as they are awake; of a call, every frame of 20 ms; of the data, every second how
-/// much there has been; and every few seconds the system that the phone is in.
+/// A CDMA modem with a 1x half for voice and an HRPD half for data. Each half reports its state when it
+/// changes, and every second while it is awake. During a call the modem reports every frame of 20 ms. It
+/// reports the amount of data every second, and the system of the phone every few seconds.
 class CDMAModem final : public ScheduledModem {
  public:
   explicit CDMAModem(std::uint64_t seed) : CDMAModem(Random(seed)) {}

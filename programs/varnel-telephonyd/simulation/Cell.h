@@ -4,7 +4,7 @@
 
 namespace varnel::simulation {
 
-/// A mobile network, named by its country and its own code.
+/// A mobile network: its country code and its network code.
 struct Network {
   int countryCode;
   int networkCode;
@@ -12,21 +12,21 @@ struct Network {
 
   bool operator==(const Network&) const = default;
 };
-/// The network that every simulated modem is at home in: the test network 001/01. It has no GSM cells of its
-/// own; its phones may use those of a partner, and the cells of another one that does not reach the town.
+/// All simulated modems have the test network 001/01 as their home. It has no GSM cells. Its phones may use
+/// the GSM cells of a partner. The cells of the third network do not reach the town.
 inline constexpr Network homeNetwork{1, 1, 2}, partnerNetwork{1, 100, 3}, distantNetwork{1, 101, 3};
 
-/// A radio access technology. UMTS is the frequency-division mode; UTRAN, as the telephony service uses the
-/// name, the time-division mode.
+/// A radio access technology. UMTS is the frequency-division mode. UTRAN is the time-division mode, as in the
+/// names of the telephony service.
 enum class Access { GSM, UMTS, LTE, UTRAN, CDMA1xRTT, HRPD };
 
-/// One cell beside the street that everybody walks along. Levels are in hundredths of a decibel.
+/// One cell beside the street along which people walk. Levels are in hundredths of a decibel.
 struct Cell {
   Access access = Access::LTE;
-  int band = 0;            ///< as the technology numbers its bands; CDMA: the band class
+  int band = 0;            ///< the band number of the technology; CDMA: the band class
   int channel = 0;         ///< ARFCN, downlink UARFCN or EARFCN, CDMA channel number
   int resourceBlocks = 0;  ///< LTE: the bandwidth; else 0
-  int antennas = 1;        ///< that transmit
+  int antennas = 1;        ///< transmit antennas
   int code = 0;            ///< BSIC, scrambling code, physical cell identity or pilot offset
   int area = 0;            ///< location area code or tracking area code
   Network network = homeNetwork;
@@ -34,17 +34,17 @@ struct Cell {
 
   std::int64_t position_cm = 0;  ///< along the street
   std::int64_t setback_cm = 0;   ///< away from the street
-  int direction = 0;             ///< 1: it looks up the street, -1: down, 0: all round
-  std::int64_t power_cdbm = 0;   ///< the level at a distance of one metre
+  int direction = 0;             ///< 1: toward the end of the street, -1: toward its start, 0: all directions
+  std::int64_t power_cdbm = 0;   ///< the level at a distance of one meter
 };
 
-/// The uplink channel that belongs to an LTE downlink channel; the same one where both share a carrier.
+/// The uplink channel of an LTE downlink channel; the same number if both share a carrier.
 constexpr int uplinkEARFCN(int downlink) {
   constexpr int firstTimeDivisionEARFCN = 36000, duplexOffset = 18000;
   return downlink < firstTimeDivisionEARFCN ? downlink + duplexOffset : downlink;
 }
 
-/// The uplink channel that belongs to a UMTS downlink channel of the band of 2100 MHz.
+/// The uplink channel of a UMTS downlink channel in the band of 2100 MHz.
 constexpr int uplinkUARFCN(int downlink) {
   constexpr int duplexOffset = 950;
   return downlink - duplexOffset;

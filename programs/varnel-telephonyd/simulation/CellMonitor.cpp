@@ -73,7 +73,7 @@ class RecordList {
     switch (cell.access) {
       case Access::GSM:
         set(record, cellMonitor::arfcn, cell.channel);
-        // The server tells the levels of GSM in steps of 2 dB.
+        // The server reports levels of GSM in steps of 2 dB.
         set(record, cellMonitor::rssi, level_dbm / 2);
         break;
       case Access::UMTS:

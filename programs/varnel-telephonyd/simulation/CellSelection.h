@@ -4,16 +4,16 @@
 
 namespace varnel::simulation {
 
-/// Chooses the serving cell: a neighbour takes over once it has been clearly stronger for a while.
+/// Chooses the serving cell. A neighbor becomes the serving cell after it was clearly stronger for a while.
 class CellSelection {
  public:
-  /// Starts on the strongest cell of the technology.
+  /// Starts with the strongest cell of the technology.
   CellSelection(const Walk& walk, Access access);
 
-  /// Looks at the levels, once a step of the walk; true when another cell serves from now on.
+  /// Compares the levels. Call it once per step of the walk. True when the serving cell has changed.
   bool update();
 
-  /// Goes over to the strongest cell of a technology.
+  /// Changes to the strongest cell of a technology.
   void changeAccess(Access access);
 
   const Cell& servingCell() const { return *_serving; }
@@ -23,7 +23,7 @@ class CellSelection {
   Access _access;
   const Cell* _serving;
   const Cell* _candidate = nullptr;
-  int _stepsAhead = 0;  // for how long the candidate has been stronger
+  int _stepsAhead = 0;  // how long the candidate has been stronger
 };
 
 }  // namespace varnel::simulation

@@ -8,7 +8,8 @@ namespace {
 
 constexpr std::int64_t lowest_cdbm = -150'00, highest_cdbm = 0;  // -150 dBm is one attowatt
 constexpr std::int64_t decade_cdb = 10'00, step_cdb = 1'00;
-// Ten to the power of 0 dB, 1 dB and so on to 10 dB, in thousandths; between them it is a straight line.
+// Ten to the power of 0 dB, 1 dB, and so on up to 10 dB, in thousandths. Values between them are interpolated
+// linearly.
 constexpr std::int64_t ratios[] = {1000, 1259, 1585, 1995, 2512, 3162, 3981, 5012, 6310, 7943, 10000};
 constexpr std::int64_t ratioUnit = 1000;
 

@@ -42,7 +42,7 @@ Bytes gprsTimers(const Situation& situation) {
 
 Bytes gprsPacketBroadcastChannel(const Situation& situation) {
   constexpr std::size_t size = 34;
-  // No network has built one.
+  // No network has this channel.
   return PacketWriter(packetBroadcastChannelCode, situation.now, size).u8(13, 0).finish();
 }
 

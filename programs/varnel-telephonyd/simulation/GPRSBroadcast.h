@@ -5,18 +5,18 @@
 
 namespace varnel::simulation {
 
-/// The packets in which a GSM modem tells what the serving cell broadcasts about packet data; one cell
-/// differs from another.
+/// The packets with which a GSM modem reports what the serving cell broadcasts about packet data. Cells
+/// differ.
 
-/// Where system information 13 is sent.
+/// The place of system information 13.
 Bytes gprsInformationPosition(const Situation& situation);
-/// Who measures and chooses the cells, packet flow contexts, and which priorities may have access.
+/// Which side measures and chooses the cells, packet flow contexts, and the priorities with access.
 Bytes gprsCellOptions(const Situation& situation);
-/// Timers and the kind of access bursts.
+/// Timers, and the kind of access bursts.
 Bytes gprsTimers(const Situation& situation);
-/// Whether there is a broadcast channel for packet data alone.
+/// Whether there is a separate broadcast channel for packet data.
 Bytes gprsPacketBroadcastChannel(const Situation& situation);
-/// Which messages carry the information, how often it has changed, and the measurement order.
+/// The messages that carry the information, how often it has changed, and the measurement order.
 Bytes gprsSystemInformation(const Situation& situation);
 
 }  // namespace varnel::simulation

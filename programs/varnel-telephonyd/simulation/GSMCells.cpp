@@ -14,10 +14,10 @@ constexpr std::uint16_t connectionStateCode = 0x512C, servingCellCode = 0x5134, 
 
 constexpr std::int64_t weakestNeighbour_cdbm = -106'00, weakestIdentified_cdbm = -95'00;
 constexpr std::size_t mostNeighbours = 6;
-// What the network broadcasts.
+// Broadcast by the network.
 constexpr std::int64_t minimumLevel_cdbm = -102'00, reselectionOffset_db = 4;
 
-// TS 45.008: the level in decibels above -110 dBm, the path loss criterion, and the quality by the error
+// TS 45.008: the level in decibels above -110 dBm, the path loss criterion, and the quality from the error
 // rate.
 std::int64_t receiveLevel(std::int64_t level_cdbm) {
   return std::clamp<std::int64_t>(level_cdbm / 100 + 110, 0, 63);
@@ -30,7 +30,7 @@ std::int64_t receiveQuality(std::int64_t level_cdbm) {
   return std::clamp<std::int64_t>((perfect_cdbm - level_cdbm) / step_cdb, 0, 7);
 }
 
-// The strongest first. Of the cells on one channel only the strongest is heard.
+// The strongest first. Only the strongest cell on a channel is received.
 std::vector<ReceivedCell> neighbours(const Situation& situation) {
   std::vector<ReceivedCell> heard;
   for (const ReceivedCell& received : situation.walk.cells(Access::GSM)) {
@@ -45,7 +45,7 @@ std::vector<ReceivedCell> neighbours(const Situation& situation) {
 }
 
 constexpr int hoppingChannels = 6, hoppingStep = 5;
-// Of those that a cell's calls hop over, beyond the channels on which cells broadcast.
+// The first of the channels over which a cell's calls hop. No cell broadcasts on these.
 int firstHoppingChannel(const Cell& cell) { return 60 + static_cast<int>(cell.identity % 5); }
 
 }  // namespace
@@ -86,7 +86,7 @@ Bytes gsmMeasurements(const Situation& situation, const GSMConnection& connectio
     const std::int64_t criterion_db = std::max<std::int64_t>(pathLossCriterion_db(level_cdbm), 0);
     packet.u32(16, criterion_db).u32(20, criterion_db + reselectionOffset_db);
   }
-  // A phone that transfers data shall not change cells lightly.
+  // A phone that transfers data should rarely change its cell.
   packet.u8(26, isTransferringData).u8(28, std::ssize(cells));
   for (const auto& [cell, neighbourLevel_cdbm] : cells)
     packet.record(recordSize)

@@ -7,18 +7,18 @@
 
 namespace varnel::simulation {
 
-/// The packets in which a GSM modem tells its serving cell, the cells around and the channel of a call.
+/// The packets with which a GSM modem reports its serving cell, the cells around it, and the channel of a
+/// call.
 
 Bytes gsmConnectionState(const Situation& situation, const GSMConnection& connection);
 
 Bytes gsmServingCell(const Situation& situation);
-/// The serving cell, by its selection criteria or, in a call, by its quality; then its neighbours.
+/// The serving cell with its selection criteria, or in a call with its quality; then its neighbors.
 Bytes gsmMeasurements(const Situation& situation, const GSMConnection& connection);
-/// The identity codes of those neighbours that are strong enough for it.
+/// The identity codes of those neighbors that are strong enough.
 Bytes gsmNeighbourIdentities(const Situation& situation);
 
-/// The channels between which a call hops, the one that it has now, and whether it falls silent between
-/// words.
+/// The channels over which a call hops, its current channel, and whether it sends nothing between words.
 Bytes gsmMobileAllocation(const Situation& situation);
 Bytes gsmDedicatedChannel(const Situation& situation, Random& random);
 Bytes gsmDiscontinuousTransmission(const Situation& situation, Random& random);

@@ -6,8 +6,8 @@
 
 namespace varnel::simulation {
 
-/// How a phone is connected with a GSM network: it arrives from UMTS, idles, speaks and transfers data in
-/// turn, and leaves again.
+/// The connection of a phone with a GSM network. The phone arrives from UMTS, idles, makes calls and
+/// transfers data in turn, and leaves again.
 class GSMConnection {
  public:
   /// Numbered as in the modem's packets.
@@ -23,23 +23,23 @@ class GSMConnection {
   };
   enum class Traffic { Voice, Data };
 
-  /// Inactive until the phone arrives.
+  /// The connection is inactive until the phone arrives.
   explicit GSMConnection(Random random) : _random(random) {}
 
   State state() const { return _state; }
-  /// What is transferred, was or will be.
+  /// The current traffic, or else the last or the next one.
   Traffic traffic() const { return _traffic; }
   bool isSpeaking() const { return _state == State::Transfer && _traffic == Traffic::Voice; }
 
-  /// Time passes; true when the state is another one from now on.
+  /// Lets time pass. True when the state has changed.
   bool update(std::chrono::milliseconds now);
 
-  /// The phone changes over from UMTS.
+  /// The phone changes from UMTS to GSM.
   void arrive(std::chrono::milliseconds now) { enter(State::FromUMTS, now); }
-  /// The phone changes over to UMTS; it is there when the state is inactive.
+  /// The phone changes to UMTS. It is there when the state is inactive.
   void leave(std::chrono::milliseconds now) { enter(State::ToUMTS, now); }
-  /// The phone has gone to another cell of GSM. True when the state is another one from now on: while it is
-  /// connected, the network hands it over.
+  /// The phone has another GSM cell. True when the state has changed: a connected phone is handed over by the
+  /// network.
   bool cellChanged(std::chrono::milliseconds now);
 
  private:

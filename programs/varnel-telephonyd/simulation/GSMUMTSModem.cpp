@@ -17,7 +17,7 @@ using GSMState = GSMConnection::State;
 
 constexpr std::uint16_t umtsStateCode = 0x4125, cipheringCode = 0x4157;
 
-// How long the first stay with UMTS lasts at least, and the later ones.
+// The shortest and the longest first stay in UMTS, and the shortest and the longest later stay.
 constexpr std::int64_t shortestFirst_s = 14, longestFirst_s = 18, shortest_s = 16, longest_s = 40;
 
 }  // namespace
@@ -150,7 +150,7 @@ void GSMUMTSModem::sendUMTSState() {
   send(PacketWriter(umtsStateCode, now(), size).u8(13, static_cast<std::int64_t>(_umts.state())).finish());
 }
 
-// A connection is ciphered from its first dedicated channel to its end.
+// A connection is encrypted from its first dedicated channel to its end.
 void GSMUMTSModem::sendCiphering() {
   constexpr std::size_t size = 19;
   const bool isCiphered = _umts.state() != UMTSState::Disconnected && _umts.state() != UMTSState::Connecting;
@@ -159,7 +159,7 @@ void GSMUMTSModem::sendCiphering() {
 
 void GSMUMTSModem::sendUMTSCells() { send(umtsCellSets(situation(), _umts.state(), _random)); }
 
-// On a dedicated channel the network chooses the cells.
+// On a dedicated channel, the network chooses the cells.
 void GSMUMTSModem::sendRanking() {
   if (_umts.state() == UMTSState::CellDCH) return;
   send(_ranksGSM ? gsmRanking(situation()) : umtsRanking(situation()));

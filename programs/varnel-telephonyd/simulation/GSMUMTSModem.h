@@ -9,8 +9,9 @@
 
 namespace varnel::simulation {
 
-/// A modem that uses UMTS and GSM by turns; the GSM network is another one. Of the technology in use it tells
-/// its connection, the serving cell and the cells around; of both how the phone is registered.
+/// A modem that uses UMTS and GSM by turns. The GSM network is a different network. For the technology in
+/// use, the modem reports its connection, the serving cell, and the cells around it. For both, it reports the
+/// registration of the phone.
 class GSMUMTSModem final : public WalkingModem {
  public:
   explicit GSMUMTSModem(std::uint64_t seed) : GSMUMTSModem(Random(seed)) {}
@@ -54,8 +55,8 @@ class GSMUMTSModem final : public WalkingModem {
   UMTSChannels _channels;
   GSMConnection _gsm;
   MobilityManagement _mobility;
-  std::chrono::milliseconds _phaseEnd;  // after which another technology is used
-  bool _ranksGSM = false;               // next
+  std::chrono::milliseconds _phaseEnd;  // then the other technology is used
+  bool _ranksGSM = false;               // whether the next ranking is that of GSM
 };
 
 }  // namespace varnel::simulation

@@ -5,7 +5,7 @@ namespace varnel::simulation {
 bool HRPDConnection::update(std::chrono::milliseconds now, Radio radio) {
   if (radio == Radio::Taken) {
     if (_state == State::Inactive) return false;
-    // What had not been agreed upon is lost.
+    // A session that was not open yet is lost.
     if (_session != Session::Open) _session = Session::Closed;
     enter(State::Inactive, now);
     return true;

@@ -6,11 +6,11 @@
 
 namespace varnel::simulation {
 
-/// What the HRPD (1xEV-DO) half of a CDMA phone does: it finds the network, opens a session, and from then on
-/// rests and transfers data in turn. It lies still while the 1x half needs the radio, with its session open.
+/// What the HRPD (1xEV-DO) half of a CDMA phone does. It finds the network, opens a session, and from then on
+/// idles and transfers data in turn. While the 1x half needs the radio, it stops but keeps its session.
 class HRPDConnection {
  public:
-  /// Both numbered as in the modem's packets.
+  /// State and session are numbered as in the modem's packets.
   enum class State { Inactive, Acquisition, Sync, Idle, Access, Connected };
   enum class Session { Closed, AddressSetup, NegotiationByPhone, NegotiationByNetwork, Open };
 
@@ -23,7 +23,7 @@ class HRPDConnection {
   bool carriesData() const { return _state == State::Connected && _session == Session::Open; }
 
   enum class Radio { Free, Taken };
-  /// Time passes; true when the state or the session is another one from now on.
+  /// Lets time pass. True when the state or the session has changed.
   bool update(std::chrono::milliseconds now, Radio radio);
 
  private:

@@ -11,19 +11,19 @@
 
 namespace varnel::simulation {
 
-/// What the HRPD half of a CDMA phone tells of itself.
+/// What the HRPD half of a CDMA phone reports about itself.
 struct HRPDStatus {
   HRPDConnection::State state;
   HRPDConnection::Session session;
   int bandClass, channel;
   std::int64_t level_cdbm, secondLevel_cdbm;
   std::int64_t transmitPower_cdbm;
-  std::optional<int> servingPilot;  ///< its offset
-  std::int64_t address;             ///< the 24 bits of the UATI that are the phone's own
+  std::optional<int> servingPilot;  ///< the offset of the pilot
+  std::int64_t address;             ///< the 24 bits of the UATI that belong to the phone
   int colorCode;
 };
 
-/// A part of the receiver that follows one path of one pilot, or that has none to follow.
+/// A part of the receiver that follows one path of one pilot, or currently follows none.
 struct Finger {
   const Cell* cell = nullptr;
   std::int64_t carrierToInterference = 0;  ///< in 1/512
@@ -32,7 +32,7 @@ struct Finger {
 Bytes hrpdStatusPacket(std::chrono::milliseconds now, const HRPDStatus& status);
 Bytes hrpdActiveSetPacket(std::chrono::milliseconds now, const std::vector<ReceivedPilot>& pilots);
 Bytes hrpdFingersPacket(std::chrono::milliseconds now, const std::vector<Finger>& fingers);
-/// Counters since the phone was switched on, and for how many seconds they have been counting.
+/// Counters since the phone was switched on, and the number of seconds since then.
 Bytes hrpdForwardPacket(std::chrono::milliseconds now, std::uint32_t second, const ForwardPackets& packets);
 Bytes hrpdReversePacket(std::chrono::milliseconds now, std::uint32_t second, const ReversePackets& packets);
 

@@ -15,12 +15,12 @@ constexpr PilotSet::Thresholds thresholds{ReceivedPilot::whole * 200 / 1000,
                                           ReceivedPilot::whole * 126 / 1000};
 
 constexpr std::int64_t receiverNoise_cdb = 40, secondReceiverLoss_cdb = 1'50, powerControlNoise_cdb = 80;
-// A receiver that is switched off.
+// The level of a receiver that is switched off.
 constexpr std::int64_t noLevel_cdbm = -106'00;
 constexpr std::int64_t highestAddress = (1 << 24) - 1;
 
 constexpr std::size_t fingerCount = 6;
-// Of a pilot's power that comes by one path; every path but the first may be missing.
+// The shares of a pilot's power on its paths. Any path but the first may be missing.
 constexpr std::int64_t pathParts_percent[] = {68, 24, 8};
 constexpr std::int64_t carrierUnits = 512;
 constexpr std::int64_t weakestFinger = 10;  // -17 dB
@@ -54,14 +54,14 @@ HRPDPhone::Changes HRPDPhone::step(std::chrono::milliseconds now, HRPDConnection
   return changes;
 }
 
-// Connections are spread over the carriers.
+// Connections are distributed over the carriers.
 void HRPDPhone::chooseChannel() {
   const int channel = _selection.servingCell().channel;
   const bool isMoved = _connection.carriesData() && _random.oneIn(2);
   _channel = isMoved ? nextCarrierBelow(channel) : channel;
 }
 
-// A session has its address from its beginning, and another one in another area.
+// A session has an address from its start. In another area it gets another address.
 void HRPDPhone::chooseAddress(Session previous, int previousArea) {
   const Session session = _connection.session();
   const bool isBegun = previous == Session::Closed && session != Session::Closed;
@@ -80,7 +80,7 @@ void HRPDPhone::updateActiveSet(const CDMACarrier& carrier) {
     _activeSet.reset(_connection.hasPilot() ? &serving : nullptr);
 }
 
-// The masts have other phones to serve too.
+// The masts also serve other phones.
 void HRPDPhone::transfer(const CDMACarrier& carrier) {
   constexpr std::int64_t slots = ForwardPackets::slotsPerSecond / stepsPerSecond;
   constexpr std::int64_t subframes = ReversePackets::subframesPerSecond / stepsPerSecond;
@@ -118,7 +118,7 @@ std::vector<ReceivedPilot> HRPDPhone::activeSet() const {
   return _activeSet.pilots(receiveCDMACarrier(_walk, access));
 }
 
-// Fingers without a path stay where they are, between those that have one.
+// Fingers without a path keep their places between the others.
 std::vector<Finger> HRPDPhone::fingers() {
   std::vector<Finger> fingers;
   if (_connection.state() == State::Inactive) return fingers;

@@ -16,7 +16,7 @@ class HRPDPhone {
   struct Changes {
     bool state = false, cell = false;
   };
-  /// The walk has gone a step.
+  /// The phone has walked one step.
   Changes step(std::chrono::milliseconds now, HRPDConnection::Radio radio);
 
   HRPDStatus status();

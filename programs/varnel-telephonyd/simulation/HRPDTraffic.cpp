@@ -6,14 +6,14 @@ namespace varnel::simulation {
 
 namespace {
 
-// The largest packet of a rate. Packets are counted by rate and size, and behind the sizes of each rate stand
-// those that were lost.
+// The largest packet of a rate. There is a counter per rate and size. After the sizes of each rate comes the
+// counter of lost packets.
 struct ForwardRate {
-  std::int64_t least;  // ratio of carrier to interference, in 1/512, at which few packets are lost
+  std::int64_t least;  // carrier-to-interference ratio in 1/512; at this ratio few packets are lost
   std::size_t received, lost;
-  std::int64_t slots;  // that a packet takes
+  std::int64_t slots;  // per packet
 };
-// 3GPP2 C.S0024-A, the forward traffic channel of Subtype 2: DRC values by what they demand.
+// 3GPP2 C.S0024-A, forward traffic channel of Subtype 2: DRC values, sorted by the ratio that they need.
 constexpr ForwardRate forwardRates[] = {
     {36, 8, 9, 16},     // 38.4 kbit/s, from -11.5 dB on
     {62, 13, 14, 8},    // 76.8
@@ -30,14 +30,15 @@ constexpr ForwardRate forwardRates[] = {
 constexpr std::int64_t packetsPerLoss = 100;
 
 constexpr std::int64_t packetsPerHaste = 4;
-// A packet of twice the size takes twice the power, and there are about two sizes to a doubling.
+// A packet of twice the size needs twice the power. From a size to the next but one, packets grow to about
+// twice the size.
 constexpr std::int64_t step_db = 3;
 
 }  // namespace
 
 void ForwardPackets::receive(std::int64_t carrierToInterference, std::int64_t slots, Random& random) {
   const auto* rate = std::ranges::upper_bound(forwardRates, carrierToInterference, {}, &ForwardRate::least);
-  if (rate == std::begin(forwardRates)) return;  // too noisy for any
+  if (rate == std::begin(forwardRates)) return;  // too noisy for any rate
   --rate;
   for (; slots >= rate->slots; slots -= rate->slots)
     ++_counts.at(random.oneIn(packetsPerLoss) ? rate->lost : rate->received);
@@ -49,7 +50,7 @@ void ReversePackets::send(const Conditions& conditions, std::int64_t subframes, 
   const std::size_t activeSetSize = std::clamp<std::size_t>(conditions.activePilots, 1, activeSetSizes) - 1;
   while (subframes > 0) {
     const std::size_t mode = random.oneIn(packetsPerHaste) ? 1 : 0;
-    // Haste costs power and is understood early.
+    // In the mode for low latency, a packet gets more power and is received earlier.
     const std::int64_t taken = mode == 1 ? random.between(1, 2) : random.between(2, 4);
     ++_counts.at(activeSetSize).at(mode).at(size).at(static_cast<std::size_t>(taken) - 1);
     subframes -= taken;

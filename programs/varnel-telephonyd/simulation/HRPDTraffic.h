@@ -8,7 +8,7 @@
 namespace varnel::simulation {
 
 /// The packets that an HRPD phone has received since it was switched on, by the rate that it asked for and by
-/// their size, and those that were lost.
+/// their size, and the lost packets.
 class ForwardPackets {
  public:
   static constexpr std::size_t kinds = 56;
@@ -16,7 +16,7 @@ class ForwardPackets {
   /// A time slot takes 1.67 ms.
   static constexpr std::int64_t slotsPerSecond = 600;
 
-  /// That many time slots were for this phone, at this ratio of carrier to interference (in 1/512).
+  /// The phone got this many time slots at this carrier-to-interference ratio (in 1/512).
   void receive(std::int64_t carrierToInterference, std::int64_t slots, Random& random);
 
   const std::array<std::uint32_t, kinds>& counts() const { return _counts; }
@@ -25,7 +25,7 @@ class ForwardPackets {
   std::array<std::uint32_t, kinds> _counts{};
 };
 
-/// The packets that it has sent.
+/// The packets that an HRPD phone has sent.
 class ReversePackets {
  public:
   static constexpr std::size_t activeSetSizes = 3, modes = 2, sizes = 12, terminations = 4;
@@ -35,12 +35,12 @@ class ReversePackets {
 
   struct Conditions {
     std::size_t activePilots;
-    std::int64_t headroom_db;  ///< how much more power the phone could send with
+    std::int64_t headroom_db;  ///< how much more power the phone could use
   };
   void send(const Conditions& conditions, std::int64_t subframes, Random& random);
 
-  /// Of that size, sent to one, two or more masts; in the mode for bulk (0) or for haste (1); by the number
-  /// of subframes after which they were understood, one to four.
+  /// Packets of one size: sent to one, two, or more masts; in the mode for bulk data (0) or for low latency
+  /// (1); by the number of subframes, one to four, after which they were received.
   using ByTermination = std::array<std::uint32_t, terminations>;
   const ByTermination& counts(std::size_t activeSetSize, std::size_t mode, std::size_t size) const {
     return _counts[activeSetSize][mode][size];

@@ -12,7 +12,7 @@ constexpr std::int64_t sixBlocks_cdb = 7'78;
 constexpr std::int64_t bestRSRQ_cdb = -4'00;
 constexpr std::int64_t measurementNoise_cdb = 60;
 
-// By how much the stronger of two powers grows by the weaker one, by the decibels between them.
+// How much the stronger of two powers grows when the weaker one is added, by their difference in decibels.
 constexpr std::int64_t gains_cdb[] = {301, 254, 212, 176, 146, 119, 97, 79, 64, 51,
                                       41,  33,  27,  21,  17,  14,  11, 9,  7,  5};
 

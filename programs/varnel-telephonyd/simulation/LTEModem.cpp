@@ -14,11 +14,11 @@ using namespace std::chrono_literals;
 constexpr std::uint16_t antennasCode = 0xB0C1, servingCellCode = 0xB0C2, connectedMeasurementCode = 0xB179,
                         servingMeasurementCode = 0xB17F, neighboursCode = 0xB180, candidatesCode = 0xB186;
 
-// What the network broadcasts.
+// Broadcast by the network.
 constexpr std::int64_t minimumLevel_dbm = -124, maximumPower_dbm = 23;
 constexpr std::int64_t intraFrequencySearch_db = 58, otherSearch_db = 44;
 
-// Levels are sent in steps above a lowest one.
+// Levels are sent as steps above a lowest level.
 struct Scale {
   std::int64_t lowest_cdb, stepsPerDecibel;
 
@@ -29,15 +29,15 @@ struct Scale {
 constexpr Scale rsrp{-140'00, 4}, rsrq{-30'00, 4}, rssi{-140'00, 2};
 constexpr Scale neighbourRSRP{-140'00, 2}, connectedRSRQ{-20'00, 8};
 
-// Powers and what is left above the minimum are sent in decibels above -30, minimum levels in steps of 2 dB
-// above -140 dBm, search thresholds in steps of 2 dB.
+// Powers, and levels relative to the minimum, are sent in decibels above -30; minimum levels in steps of 2 dB
+// above -140 dBm; search thresholds in steps of 2 dB.
 constexpr std::int64_t power(std::int64_t power_dbm) { return power_dbm + 30; }
 constexpr std::int64_t minimumLevel(std::int64_t level_dbm) { return (level_dbm + 140) / 2; }
 constexpr std::int64_t threshold(std::int64_t threshold_db) { return threshold_db / 2; }
 
 std::int64_t aboveMinimum_db(std::int64_t level_cdbm) { return level_cdbm / 100 - minimumLevel_dbm; }
 
-// How much the network would like the phone to use a technology and its bands, 7 the most.
+// How much the network wants the phone to use a technology and its bands. 7 is the most.
 int priority(const Cell& cell) {
   switch (cell.access) {
     case Access::LTE:
@@ -59,7 +59,7 @@ const LTEMeasurement& measurementOf(const Cell& cell, const std::vector<LTEMeasu
   return *std::ranges::find(carrier, &cell, &LTEMeasurement::cell);
 }
 
-// Every cell keeps a time of its own, and so is off from the others by a part of a frame.
+// Every cell has its own timing, which differs from others by a part of a frame.
 struct CellTiming {
   explicit CellTiming(const Cell& cell) : scattered(cell.identity * 2654435761u) {}
 
@@ -157,7 +157,7 @@ void LTEModem::sendServingMeasurement() {
            .bits(25, 0, 9, rssi.steps(serving.rssi_cdbm))
            .bits(26, 1, 6, minimumLevel(minimumLevel_dbm))
            .bits(26, 7, 7, power(maximumPower_dbm))
-           .bits(27, 6, 6, power(maximumPower_dbm))  // of the phone's own
+           .bits(27, 6, 6, power(maximumPower_dbm))  // the phone's own limit
            .bits(29, 0, 7, power(left_db))
            .bits(29, 7, 6, 0)  // no cycle without coverage
            .bits(30, 5, 6, threshold(intraFrequencySearch_db))
@@ -168,7 +168,7 @@ void LTEModem::sendServingMeasurement() {
   _measurementRules = rules;
 }
 
-// One carrier a report, the next in turn on which the phone hears a neighbour.
+// One carrier per report: the next one on which the phone receives a neighbor.
 void LTEModem::sendNeighbours() {
   std::vector<int> channels;
   for (const ReceivedCell& received : walk().cells(Access::LTE)) {
@@ -232,7 +232,7 @@ void LTEModem::sendConnectedMeasurement() {
       .u8(13, 3)  // version
       .u16(17, cell.channel)
       .u16(19, cell.code)
-      .u16(21, now().count() % 10'240)  // subframe, counted through all frames
+      .u16(21, now().count() % 10'240)  // subframe, counted over all frames
       .bits(23, 0, 16, rsrp.steps(serving.averageRSRP_cdbm))
       .bits(25, 0, 16, connectedRSRQ.steps(serving.averageRSRQ_cdb))
       .u8(27, std::ssize(neighbours))
@@ -246,7 +246,7 @@ void LTEModem::sendConnectedMeasurement() {
   send(packet.finish());
 }
 
-// The strongest cell of each technology in turn: a phone keeps an eye on all of them.
+// The strongest cell of each technology in turn, since a phone watches all of them.
 void LTEModem::considerReselection() {
   constexpr Access technologies[] = {Access::LTE, Access::UMTS, Access::GSM, Access::CDMA1xRTT, Access::HRPD};
   for (const ReceivedCell& received :
@@ -257,8 +257,8 @@ void LTEModem::considerReselection() {
   }
 }
 
-// One candidate a report: records begin every 4 bytes, so the channel and the cell of one would have to be
-// the priority and the technology of the next.
+// One candidate per report. Records begin every 4 bytes, so channel and cell of one candidate would overlap
+// priority and technology of the next.
 void LTEModem::sendReselectionCandidate(const Cell& serving, const Cell& candidate) {
   constexpr std::size_t headSize = 21, recordSize = 8, recordSizeOfCDMA = 12;
   enum Technology { lte, utran, geran, cdma1xRTT, cdmaHRPD };
@@ -280,7 +280,7 @@ void LTEModem::sendReselectionCandidate(const Cell& serving, const Cell& candida
       packet.u16(2, utran).u16(4, candidate.channel).u16(6, candidate.code);
       break;
     case Access::GSM:
-      // LTE has the number 8 for the band of 900 MHz.
+      // LTE uses number 8 for the band of 900 MHz.
       packet.u16(2, geran).u16(4, candidate.channel).u8(6, 8).u8(7, candidate.code);
       break;
     case Access::CDMA1xRTT:

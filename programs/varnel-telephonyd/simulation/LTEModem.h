@@ -5,9 +5,9 @@
 
 namespace varnel::simulation {
 
-/// An LTE modem that idles and is connected in turn. It tells its serving cell when that changes and every
-/// few seconds; while it idles, how strong the cells are and what it might reselect; while it is connected,
-/// the cells of its own carrier.
+/// An LTE modem that idles and is connected by turns. It reports its serving cell when it changes and every
+/// few seconds. While it idles, it reports the levels of the cells and the candidates for reselection. While
+/// it is connected, it reports the cells of its own carrier.
 class LTEModem final : public WalkingModem {
  public:
   explicit LTEModem(std::uint64_t seed) : LTEModem(Random(seed)) {}
@@ -36,8 +36,8 @@ class LTEModem final : public WalkingModem {
   Phase _phase = Phase::Idle;
   std::chrono::milliseconds _phaseEnd;
   std::int64_t _measurementRules = 0;
-  std::size_t _nextCarrier = 0;    // on which neighbours are looked for
-  std::size_t _nextCandidate = 0;  // of the technologies that are considered in turn
+  std::size_t _nextCarrier = 0;    // the carrier for the next report of neighbors
+  std::size_t _nextCandidate = 0;  // index of the technology for the next candidate
 };
 
 }  // namespace varnel::simulation

@@ -8,7 +8,7 @@ namespace {
 
 constexpr std::uint16_t packetStateCode = 0x7130, circuitStateCode = 0x7131, registrationCode = 0x7132;
 
-// TS 24.008, numbered as in the packets.
+// TS 24.008. The numbers are those of the packets.
 enum CircuitState {
   CircuitNull = 0,
   LocationUpdateInitiated = 3,
@@ -108,7 +108,7 @@ void MobilityManagement::callBegan(std::chrono::milliseconds now, Access access)
   if (_isInCall) return;
   _isInCall = true;
   _callAccess = access;
-  // While the phone registers, the call waits for the end of that.
+  // A call waits until the registration has ended.
   if (_procedure.empty()) begin(calling, now);
 }
 

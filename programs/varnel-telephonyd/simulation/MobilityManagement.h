@@ -7,36 +7,36 @@
 
 namespace varnel::simulation {
 
-/// What the phone and the network know of each other, for circuits and for packets: the phone searches a
-/// network when it is switched on, tells when it comes to another area or network, and asks for connections.
+/// What the phone and the network know about each other, for circuits and for packets. The phone searches a
+/// network when it is switched on, reports when it comes to another area or network, and asks for
+/// connections.
 class MobilityManagement {
  public:
-  /// Everything at one moment, as the packets number it.
+  /// The condition at one moment, with the numbers of the packets.
   struct Condition {
     int circuitState, circuitSubstate, locationUpdateStatus;
     int packetState, packetSubstate, packetUpdateStatus;
     int registrationState;
     bool operator==(const Condition&) const = default;
   };
-  /// A part of a procedure.
+  /// A step of a procedure.
   struct Step {
     int duration_ms;
     Condition condition;
   };
 
-  /// Switched on at the start of time.
+  /// The phone is switched on at the start of time.
   MobilityManagement();
 
-  /// Time passes; true when something is another from now on.
+  /// Lets time pass. True when something has changed.
   bool update(std::chrono::milliseconds now);
 
-  /// The phone has gone to a cell of another area, or of another network. During a call it tells that when
-  /// the call has ended.
+  /// The phone has come to a cell of another area or network. During a call, it reports that after the call.
   void areaChanged(std::chrono::milliseconds now);
   void networkChanged(std::chrono::milliseconds now);
 
-  /// A call over that technology begins or ends; beginning twice is beginning once. GSM phones do not
-  /// transfer packets meanwhile.
+  /// A call over this technology begins or ends. A second beginning has no effect. Meanwhile a GSM phone
+  /// transfers no packets.
   void callBegan(std::chrono::milliseconds now, Access access);
   void callEnded(std::chrono::milliseconds now);
 
@@ -55,8 +55,8 @@ class MobilityManagement {
   const Condition& lasting() const;
 
   Condition _condition;
-  Procedure _procedure;            // what is left of it
-  std::chrono::milliseconds _end;  // of its step
+  Procedure _procedure;            // the remaining steps
+  std::chrono::milliseconds _end;  // of the current step
   Procedure _afterCall;
   bool _isInCall = false;
   Access _callAccess = Access::UMTS;

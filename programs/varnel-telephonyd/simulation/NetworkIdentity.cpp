@@ -18,7 +18,7 @@ constexpr std::int64_t digit(int number, int place) {
   return number % 10;
 }
 
-// The digits from the first to the third; of a code of two digits the third is the filler.
+// The three digits of the network code. A code of two digits has a filler as its third.
 std::array<std::int64_t, 3> codedDigits(const Network& network) {
   constexpr std::int64_t filler = 0xF;
   const int code = network.networkCode;
@@ -40,14 +40,14 @@ Bytes servingNetwork(const Situation& situation, Service service) {
       .u8(15, digit(country, 1) << 4 | digit(country, 2))
       .u8(16, third << 4 | digit(country, 0))
       .u8(17, second << 4 | first)
-      .u8(18, cell.area >> 8)  // the only number with its high byte first
+      .u8(18, cell.area >> 8)  // the only number that begins with its high byte
       .u8(19, cell.area)
-      .u8(20, cell.area % 100)  // a routing area for each location area
+      .u8(20, cell.area % 100)  // each location area is a routing area
       .finish();
 }
 
-// A network is six digits, those of its two codes by turns, but the next one begins behind the third of them:
-// the lists are such that the digits which two networks share are the same for both.
+// A network is six digits: digits of its two codes by turns. But the next network begins after the third of
+// them. In these lists, the digits that two networks share are the same for both.
 Bytes equivalentNetworks(const Situation& situation, bool isRegistered) {
   constexpr std::size_t headSize = 17, stride = 3, networkSize = 6;
   std::span<const Network> networks;

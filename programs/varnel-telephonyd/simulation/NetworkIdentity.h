@@ -5,13 +5,13 @@
 
 namespace varnel::simulation {
 
-/// What a network serves a phone with. Numbered as in the packets.
+/// The service that a network gives to a phone. The numbers are those of the packets.
 enum class Service { None, CircuitsOnly, PacketsOnly, CircuitsAndPackets, Limited };
 
-/// The network, area and service of the serving cell.
+/// The network, the area, and the service of the serving cell.
 Bytes servingNetwork(const Situation& situation, Service service);
 
-/// The networks that the serving one counts as its equals; none before the phone is registered.
+/// The networks that the serving network treats as equivalent; none before the phone is registered.
 Bytes equivalentNetworks(const Situation& situation, bool isRegistered);
 
 }  // namespace varnel::simulation

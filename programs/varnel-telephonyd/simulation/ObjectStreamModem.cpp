@@ -14,7 +14,7 @@ constexpr std::int64_t fastest_bytes = 2'400;  // in one step of the walk
 
 }  // namespace
 
-// The braces keep the order in which the parts of the world draw their randomness.
+// Braces fix the order in which the parts of the world draw random numbers.
 ObjectStreamModem::ObjectStreamModem(Random random)
     : ScheduledModem(random.fork()),
       _walk{Town::build(random.fork()), random.fork()},
@@ -53,7 +53,7 @@ void ObjectStreamModem::activityChanged() {
   if (_activity.isLocated() && _activity.locatedAt() == now()) chooseTemporaryIdentities();
 }
 
-// Less goes up than comes down, and between the bursts there is silence.
+// The phone sends less than it receives, and between bursts it sends nothing.
 void ObjectStreamModem::transfer() {
   if (_random.oneIn(3)) return;
   _received_bytes += _random.between(40, fastest_bytes);

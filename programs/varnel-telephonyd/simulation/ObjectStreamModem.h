@@ -9,8 +9,8 @@
 
 namespace varnel::simulation {
 
-/// A GSM modem that tells no packets but pictures: every message is a property list that says all there is to
-/// be said of the phone. There is one every second and with every change of what the phone is busy with.
+/// A GSM modem that sends pictures instead of packets. Every message is a property list with everything about
+/// the phone. There is one every second, and one for every change of the phone's activity.
 class ObjectStreamModem final : public ScheduledModem {
  public:
   explicit ObjectStreamModem(std::uint64_t seed) : ObjectStreamModem(Random(seed)) {}

@@ -8,7 +8,7 @@ namespace {
 constexpr int firstContextID = 5;
 }  // namespace
 
-// The addresses are of the ranges set aside for documentation.
+// The addresses are from ranges that are reserved for documentation.
 const PacketData::Purpose PacketData::purposes[] = {
     {"ims", "IPv6", "2001:db8:1::", 5, 1, 3600, 300},
     {"internet", "IPv4v6", "192.0.2.", 9, 12, 90, 400'000},
@@ -49,7 +49,7 @@ void PacketData::enterNextState(Context& context) {
 }
 
 void PacketData::transfer(Context& context) {
-  // Between the bursts there is silence.
+  // Nothing is sent between bursts.
   if (_random.oneIn(3)) return;
   context.received_bytes += _random.between(40, context.purpose->fastest_bytes);
   context.sent_bytes += _random.between(40, 40 + context.purpose->fastest_bytes / 8);

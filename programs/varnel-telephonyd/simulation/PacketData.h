@@ -9,28 +9,28 @@
 
 namespace varnel::simulation {
 
-/// The packet-data contexts of the phone: they come and go, and data flows through those that are active.
+/// The packet-data contexts of the phone. They come and go, and data flows through the active ones.
 class PacketData {
  public:
   explicit PacketData(Random random);
 
-  /// One second passes.
+  /// Lets one second pass.
   void step();
 
-  /// The contexts that exist now, each a dictionary of texts.
+  /// The current contexts. Each is a dictionary of texts.
   Value contexts() const;
 
  private:
   enum class State { Inactive, Activating, Active, Deactivating };
 
-  // What a context is for and how it is used.
+  // The purpose of a context, and how it is used.
   struct Purpose {
     const char* accessPoint;
     const char* type;
-    const char* addressPrefix;  // before a number from 1 to 250
+    const char* addressPrefix;  // followed by a number from 1 to 250
     int qualityClass;
     int longestIdle_s, longestUse_s;
-    std::int64_t fastest_bytes;  // a second
+    std::int64_t fastest_bytes;  // per second
   };
   struct Context {
     const Purpose* purpose;

@@ -6,7 +6,7 @@
 
 namespace varnel::simulation {
 
-/// What a GSM phone is busy with: it rests, tells the network where it is, calls and transfers packets.
+/// What a GSM phone does: it idles, reports its location, makes calls, and transfers packets.
 class PhoneActivity {
  public:
   enum class Kind {
@@ -21,23 +21,23 @@ class PhoneActivity {
     PacketTransfer,
   };
 
-  /// A phone that has just been switched on and is about to tell where it is.
+  /// The phone has just been switched on and is about to report its location.
   explicit PhoneActivity(Random random);
 
   Kind kind() const { return _kind; }
-  /// Whether a channel is the phone's alone.
+  /// Whether the phone has a channel of its own.
   bool isDedicated() const;
   /// Whether the network knows where the phone is.
   bool isLocated() const { return _isLocated; }
-  /// When the phone last told where it is.
+  /// When the phone last reported its location.
   std::chrono::milliseconds locatedAt() const { return _locatedAt; }
 
-  /// After that time at the latest the phone tells again where it is.
+  /// After this time at most, the phone reports its location again.
   static constexpr std::chrono::milliseconds locationPeriod{std::chrono::minutes(30)};
 
-  /// Time passes; true when the phone is busy with something else from now on.
+  /// Lets time pass. True when the activity has changed.
   bool update(std::chrono::milliseconds now);
-  /// The phone has come into another area, and tells so once it is idle.
+  /// The phone has come to another area. It reports that as soon as it is idle.
   void areaChanged() { _isLocated = false; }
 
  private:
@@ -47,7 +47,7 @@ class PhoneActivity {
   Random _random;
   Kind _kind = Kind::Idle;
   bool _isLocated = false;
-  Kind _nextWish = Kind::PacketAccess;  // calls and packets come in turn
+  Kind _nextWish = Kind::PacketAccess;  // calls and packets alternate
   std::chrono::milliseconds _locatedAt{0};
   std::chrono::milliseconds _end;
 };

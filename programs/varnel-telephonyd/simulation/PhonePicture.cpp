@@ -13,7 +13,7 @@ namespace {
 
 using Kind = PhoneActivity::Kind;
 
-// What the network broadcasts, and what the phone can do.
+// Broadcast by the network, and properties of the phone.
 constexpr std::int64_t minimumLevel_dbm = -104, mostPower_dbm = 33, leastPower_dbm = 5;
 constexpr std::int64_t weakestNeighbour_dbm = -100;
 constexpr std::size_t mostNeighbours = 6;
@@ -29,7 +29,7 @@ constexpr std::int64_t farAway_dbm = -85;  // farther than the 550 m of one step
   return buffer;
 }
 
-// A value of a type of its own.
+// A value with its own type.
 Value typed(std::string_view type, Value value) {
   Value wrapped = Value::ofDictionary();
   wrapped.dictionary()->set(type, std::move(value));
@@ -46,7 +46,7 @@ Value stationCode(const Cell& cell) {
   return typed("Colors", text("%d/%d (NCC/BCC)", cell.code / 8, cell.code % 8));
 }
 
-// How much a cell is above what it takes to camp on it, without and with what the network adds for some.
+// How far a cell is above the minimum, without and with the offset that the network adds for some cells.
 std::int64_t c1_db(std::int64_t level_dbm) { return level_dbm - minimumLevel_dbm; }
 std::int64_t c2_db(const Cell& cell, std::int64_t level_dbm) {
   constexpr std::int64_t offset_db = 6;
@@ -101,7 +101,7 @@ class Picture {
     return section;
   }
 
-  // An array, since there may be any number of them.
+  // An array, since the number of neighbors varies.
   Value neighbours() const {
     Value list = Value::ofArray({"Neighbor Cell"});
     for (const ReceivedCell& received : _view.walk.cells(Access::GSM)) {
@@ -137,7 +137,7 @@ class Picture {
     rows.set("RxQual", isDedicated ? number(quality()) : Value(none));
     return section;
   }
-  // In steps of 2 dB, the less the nearer the mast is.
+  // In steps of 2 dB. The nearer the mast, the lower.
   std::int64_t power_dbm() const {
     const std::int64_t power_dbm = mostPower_dbm - std::max<std::int64_t>(_level_dbm + 95, 0) / 2 * 2;
     return std::max(power_dbm, leastPower_dbm);
@@ -170,7 +170,7 @@ class Picture {
     rows.set("Received", typed("Bytes", std::to_string(_view.received_bytes)));
     return section;
   }
-  // From the most careful to the fastest.
+  // From the most robust to the fastest scheme.
   std::int64_t codingScheme() const { return std::clamp<std::int64_t>((_level_dbm + 104) / 4, 1, 9); }
 
   Value events() const {

@@ -4,10 +4,10 @@
 
 namespace varnel::simulation {
 
-/// How the layers of a GSM phone call their states: radio resources and mobility (3GPP TS 44.018, 24.008),
-/// calls (24.008, clause 5), packets (44.060).
+/// The states of a GSM phone's protocol layers: radio resources and mobility (3GPP TS 44.018, 24.008), calls
+/// (24.008, clause 5), and packets (44.060).
 struct PhoneStates {
-  const char* name;  ///< of what the phone is busy with
+  const char* name;  ///< the name of the activity
   const char* radioResources;
   const char* channel;
   const char* mobility;
@@ -16,7 +16,7 @@ struct PhoneStates {
   const char* packets;
 };
 
-/// While the phone is busy with that.
+/// The states during this activity.
 const PhoneStates& phoneStates(PhoneActivity::Kind kind);
 
 }  // namespace varnel::simulation

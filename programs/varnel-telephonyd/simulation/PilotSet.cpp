@@ -36,7 +36,7 @@ std::vector<ReceivedPilot> PilotSet::pilots(const CDMACarrier& carrier) const {
 
 bool PilotSet::has(const Cell& cell) const { return std::ranges::count(_members, &cell, &Member::cell) != 0; }
 
-// A full set gives up its oldest pilot: only the serving cell's comes in so.
+// A full set drops its oldest pilot. This happens only for the pilot of the serving cell.
 void PilotSet::add(const Cell& cell) {
   if (_members.size() == mostPilots) _members.erase(_members.begin());
   _members.push_back({&cell});

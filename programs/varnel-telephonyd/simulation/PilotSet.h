@@ -6,11 +6,12 @@
 
 namespace varnel::simulation {
 
-/// The pilots of a CDMA phone's active set. On a channel of its own the phone takes in every pilot that gets
-/// strong enough and drops one that has been weak for a while; else it has the serving cell's alone.
+/// The active set of a CDMA phone: its pilots. With its own channel, the phone adds every pilot that becomes
+/// strong enough, and drops a pilot that was weak for a while. Otherwise the set holds only the serving
+/// cell's pilot.
 class PilotSet {
  public:
-  /// Strengths of pilots, of `ReceivedPilot::whole`.
+  /// Strengths of pilots, in parts of `ReceivedPilot::whole`.
   struct Thresholds {
     std::int64_t add, drop;
   };
@@ -18,12 +19,13 @@ class PilotSet {
 
   explicit PilotSet(Thresholds thresholds) : _thresholds(thresholds) {}
 
-  /// Looks at the strengths, once a step of the walk. The serving cell's pilot is in the set always.
+  /// Compares the strengths. Call it once per step of the walk. The serving cell's pilot is always in the
+  /// set.
   void update(const CDMACarrier& carrier, const Cell& serving);
-  /// From now on the set has that cell alone, or none.
+  /// Sets the active set to this cell only, or to no cell.
   void reset(const Cell* only);
 
-  /// The members in the order in which they came, as the carrier tells them.
+  /// The members in the order in which they were added, with the strengths on this carrier.
   std::vector<ReceivedPilot> pilots(const CDMACarrier& carrier) const;
 
  private:

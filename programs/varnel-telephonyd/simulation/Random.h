@@ -5,13 +5,13 @@
 
 namespace varnel::simulation {
 
-/// Numbers drawn from a seed, the same on every machine: the distributions of the standard library differ
-/// from one to the next, and so does floating-point arithmetic.
+/// Random numbers from a seed, the same on every machine. The distributions of the standard library differ
+/// between machines, and so does floating-point arithmetic.
 class Random {
  public:
   explicit Random(std::uint64_t seed) : _engine(seed) {}
 
-  /// A source of its own, so that what one part of the world draws does not disturb the others.
+  /// A separate source, so that one part of the world does not change the numbers of the others.
   Random fork() { return Random(_engine()); }
 
   /// A number from the lowest to the highest, both included.
@@ -19,9 +19,9 @@ class Random {
     const auto count = static_cast<std::uint64_t>(highest - lowest) + 1;
     return lowest + static_cast<std::int64_t>(_engine() % count);
   }
-  /// True once in that many times, on average.
+  /// True once in this many times, on average.
   bool oneIn(std::int64_t times) { return between(1, times) == 1; }
-  /// Bell-shaped around 0, with that standard deviation.
+  /// Bell-shaped around 0, with this standard deviation.
   std::int64_t noise(std::int64_t deviation) {
     return between(-deviation, deviation) + between(-deviation, deviation) + between(-deviation, deviation);
   }

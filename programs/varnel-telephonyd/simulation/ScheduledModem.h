@@ -10,25 +10,25 @@
 
 namespace varnel::simulation {
 
-/// A modem whose doings repeat, each at a pace of its own.
+/// A modem whose tasks repeat, each at its own pace.
 class ScheduledModem : public SimulatedModem {
  public:
   SimulatedMessage next() final;
 
  protected:
   struct Pace {
-    std::chrono::milliseconds first;      ///< when it happens for the first time
-    std::chrono::milliseconds interval;   ///< from one time to the next
-    std::chrono::milliseconds jitter{0};  ///< by how much each interval may be longer or shorter
+    std::chrono::milliseconds first;      ///< when it happens first
+    std::chrono::milliseconds interval;   ///< from one run to the next
+    std::chrono::milliseconds jitter{0};  ///< how much longer or shorter each interval may be
   };
 
   explicit ScheduledModem(Random random) : _random(random) {}
 
-  /// What falls on the same moment happens in the order in which it was told here.
+  /// Repeats a task. Tasks that are due at the same moment run in the order of these calls.
   void repeat(Pace pace, std::function<void()> task);
-  /// Sends a packet now. As on a real link, some come behind a prefix of two bytes.
+  /// Sends a packet now. As on a real link, some packets have a prefix of two bytes.
   void send(Bytes packet);
-  /// Sends a message that is no packet now, as it is.
+  /// Sends a message that is no packet, unchanged.
   void sendBare(Bytes message);
   /// The time since the start of the stream.
   std::chrono::milliseconds now() const { return _now; }

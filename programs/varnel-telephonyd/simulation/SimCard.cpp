@@ -8,7 +8,7 @@ namespace varnel::simulation {
 
 namespace {
 
-// The digit that makes the sum of all digits, every second one doubled, a multiple of ten.
+// With this digit, the sum of all digits, of which every second one is doubled, is a multiple of ten.
 char checkDigit(const std::string& digits) {
   int sum = 0;
   bool isDoubled = true;
@@ -19,7 +19,7 @@ char checkDigit(const std::string& digits) {
   return static_cast<char>('0' + (10 - sum % 10) % 10);
 }
 
-// Telecom cards begin with 89; then the test network's country and issuer.
+// Numbers of telecom cards begin with 89. Then come the test network's country and issuer.
 std::string cardNumber(Random& random) {
   std::string digits = "8900101";
   while (digits.size() < 18) digits += static_cast<char>('0' + random.between(0, 9));
@@ -36,7 +36,7 @@ std::string locationText(const char* identityName, std::uint32_t identity, const
 }
 
 std::string accessClassText(const std::string& cardNumber) {
-  // It is the last digit before the check digit.
+  // The access class is the last digit before the check digit.
   const int accessClass = cardNumber[cardNumber.size() - 2] - '0';
   char text[32];
   std::snprintf(text, sizeof text, "0x%04X (class %d)", 1u << accessClass, accessClass);
@@ -46,7 +46,7 @@ std::string accessClassText(const std::string& cardNumber) {
 }  // namespace
 
 SimCard::SimCard(Random random, const Cell& cell) : _random(random), _number(cardNumber(_random)) {
-  // Numbers of this range are for fiction.
+  // Numbers in this range are reserved for fiction.
   _subscriberNumber = "+1212555" + std::to_string(_random.between(1000100, 1000199)).substr(3);
   registerIn(cell);
 }

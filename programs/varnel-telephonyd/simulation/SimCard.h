@@ -9,20 +9,20 @@
 
 namespace varnel::simulation {
 
-/// The SIM card in the phone. Its number tells it from the cards of other seeds.
+/// The SIM card in the phone. Each seed has a card with another number.
 class SimCard {
  public:
   SimCard(Random random, const Cell& cell);
 
-  /// The phone has registered in the area of that cell and got other temporary identities.
+  /// The phone has registered in the area of this cell and got new temporary identities.
   void registerIn(const Cell& cell);
 
-  /// The elementary files as the telephony server tells them: a dictionary of texts.
+  /// The elementary files as the telephony server reports them: a dictionary of texts.
   Value files() const;
 
  private:
   Random _random;
-  std::string _number;  // of the card, with its check digit
+  std::string _number;  // the card's number with its check digit
   std::string _subscriberNumber;
   int _area;
   Network _network;

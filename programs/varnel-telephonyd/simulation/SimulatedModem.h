@@ -14,12 +14,12 @@ struct SimulatedMessage {
   Bytes bytes;
 };
 
-/// A modem that exists on paper only, carried through a town by somebody who walks. Its messages go on
-/// without end, at the pace of a real one; the same seed gives the same messages on every machine.
+/// A simulated modem that somebody carries through a town. Its messages never end, and come at the pace of a
+/// real modem. The same seed gives the same messages on every machine.
 class SimulatedModem {
  public:
   virtual ~SimulatedModem() = default;
-  /// The identifier under which the telephony service publishes it.
+  /// The technology, as the telephony service names it.
   virtual std::string_view technology() const = 0;
   /// The next message, no earlier than the one before.
   virtual SimulatedMessage next() = 0;

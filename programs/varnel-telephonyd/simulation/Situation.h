@@ -6,7 +6,7 @@
 
 namespace varnel::simulation {
 
-/// When and where a modem is: what its packets tell of.
+/// The time and the place that a modem's packets report on.
 struct Situation {
   std::chrono::milliseconds now;
   const Walk& walk;

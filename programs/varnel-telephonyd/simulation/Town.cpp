@@ -13,7 +13,7 @@ constexpr std::int64_t siteSpacing_cm = 180'00;
 struct Carrier {
   int band, channel, resourceBlocks, antennas;
 };
-// The carrier that every LTE site has, and those of which it may have one more.
+// The carrier of every LTE site, and those of which a site may have one more.
 constexpr Carrier commonCarrier{3, 1300, 100, 2};
 constexpr Carrier furtherCarriers[] = {
     {7, 2850, 75, 4},
@@ -22,12 +22,12 @@ constexpr Carrier furtherCarriers[] = {
     {38, 37900, 100, 2},
 };
 constexpr int umtsBand = 1, umtsChannel = 10588;
-// The carriers of the time-division mode, one a site in turn.
+// The carriers of the time-division mode. Sites use them in turn.
 constexpr int utranBand = 34, utranChannels[] = {10054, 10062, 10070};
 constexpr int cdmaBandClass = 0, cdma1xRTTChannel = 283, hrpdChannel = 78, pilotIncrement = 4;
 constexpr int gsmBand = 900, firstGSMChannel = 10, lastGSMChannel = 50;
 
-// Of the sectors of a site that has two.
+// The directions of a site's two sectors.
 constexpr int directions[] = {1, -1};
 
 // What the cells of one site have in common.
@@ -57,7 +57,7 @@ class Builder {
       if (number % 2 == 0) addGSM(site);
       sites.push_back(site);
     }
-    // The networks that were built last leave the older ones as they were.
+    // The newest networks come last, so that the older ones stay as they were.
     for (const Site& site : sites) {
       addUTRAN(site);
       if (site.number % 2 == 1) addCDMA(site);
@@ -73,7 +73,7 @@ class Builder {
     _cells.push_back(cell);
   }
 
-  // Two sectors, one up the street and one down.
+  // Two sectors, one per direction of the street.
   void addLTE(const Site& site, const Carrier& carrier, std::uint32_t firstSector) {
     const auto group = static_cast<int>(_random.between(0, 167));
     for (int sector = 0; sector < 2; ++sector) {
@@ -109,7 +109,7 @@ class Builder {
   // Two sectors on one carrier.
   void addUTRAN(const Site& site) {
     const auto firstSector = static_cast<std::uint32_t>(site.number) * 2;
-    // In steps that keep the codes of the town apart.
+    // The steps keep the codes of the town apart.
     const auto code = static_cast<int>(_random.between(0, 3)) + 10 * site.number;
     for (int sector = 0; sector < 2; ++sector) {
       add(site, {.access = Access::UTRAN,
@@ -121,7 +121,7 @@ class Builder {
                  .power_cdbm = power(-12'00)});
     }
   }
-  // The voice and the data network share the masts and the pilots.
+  // The voice network and the data network share masts and pilots.
   void addCDMA(const Site& site) {
     const int pilot = pilotIncrement * static_cast<int>(_random.between(1, 511 / pilotIncrement));
     const std::uint32_t identity = 100 + static_cast<std::uint32_t>(site.number);

@@ -7,13 +7,13 @@
 
 namespace varnel::simulation {
 
-/// A town: a street that ends where it began, and the cells along it.
+/// A town: a street that forms a ring, and the cells along it.
 struct Town {
   std::int64_t streetLength_cm;
   std::vector<Cell> cells;
 
-  /// Builds a town, of another look for each source of randomness. There are several tracking areas, and LTE
-  /// sites with carriers of several bands.
+  /// Builds a town that depends on the source of randomness. There are several tracking areas, and LTE sites
+  /// with carriers of several bands.
   static Town build(Random random);
 };
 

@@ -6,11 +6,11 @@ namespace varnel::simulation {
 
 namespace {
 
-// What the strongest cell has of the power, and the least that is told.
+// The strongest cell's share of the power, and the smallest share that is reported.
 constexpr std::int64_t bestEcN0_cdb = -4'00, worstEcN0_cdb = -24'00;
 
-// Of parts of -1 dB, -2 dB and so on, whole decibels as they are told: each half a decibel above, so that it
-// is surely told as that.
+// Energies of parts of -1 dB, -2 dB, and so on, as they are reported in whole decibels. Each is half a
+// decibel higher, so that rounding cannot change it.
 constexpr std::int64_t energies[] = {467'272, 371'167, 294'829, 234'191, 186'024, 147'764, 117'373, 93'233,
                                      74'058,  58'826,  46'727,  37'117,  29'483,  23'419,  18'602,  14'776,
                                      11'737,  9'323,   7'406,   5'883,   4'673,   3'712,   2'948,   2'342};

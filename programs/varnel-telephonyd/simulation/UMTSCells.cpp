@@ -12,16 +12,16 @@ namespace {
 constexpr std::uint16_t servingCellCode = 0x4127, cellSetsCode = 0x417A, rankingCode = 0x4005;
 enum class CellSet { Active, Monitored, Detected };  // numbered as in the packets
 
-constexpr std::int64_t weakestHeard_cdb = -20'00;  // of a cell's part of the carrier
+constexpr std::int64_t weakestHeard_cdb = -20'00;  // the cell's share of the carrier's power
 constexpr std::int64_t weakestGSM_cdbm = -104'00;
-// A cell's list of neighbours goes as far as the next site.
+// The list of neighbors reaches to the next site.
 constexpr std::int64_t listedDistance_cm = 260'00;
 constexpr std::int64_t activeRange_cdb = 4'00;
 constexpr int mostActive = 3;
 constexpr std::size_t mostRanked = 8;
 constexpr std::int64_t hysteresis_db = 4, offsetOfGSM_db = 6;
 
-// The strongest first; the serving cell is among them however weak it has become.
+// The strongest first. The serving cell is always among them.
 std::vector<ReceivedCell> heardCells(const Situation& situation) {
   auto cells = situation.walk.cells(Access::UMTS);
   std::erase_if(cells, [&](const ReceivedCell& received) {
@@ -31,7 +31,7 @@ std::vector<ReceivedCell> heardCells(const Situation& situation) {
   return cells;
 }
 
-// The power on the carrier in tenths of a decibel, 0 for -54.8 dBm.
+// The power on the carrier in tenths of a decibel. 0 stands for -54.8 dBm.
 std::int64_t signalReading(std::int64_t rssi_cdbm) {
   constexpr std::int64_t weakest_cdbm = -106'00, atWeakest = -512;
   return (std::max(rssi_cdbm, weakest_cdbm) - weakest_cdbm) / 10 + atWeakest;
@@ -46,7 +46,7 @@ Bytes umtsServingCell(const Situation& situation) {
       .u32(13, uplinkUARFCN(cell.channel))
       .u32(17, cell.channel)
       .u32(21, cell.identity)
-      .u16(25, cell.area)  // a registration area for each location area
+      .u16(25, cell.area)  // each location area is a registration area
       .finish();
 }
 
@@ -68,7 +68,7 @@ Bytes umtsCellSets(const Situation& situation, UTRANConnection::State state, Ran
   }
   for (const ReceivedCell& received : cells) {
     packet.record(energiesSize);
-    // Of the three searches behind one another the first ones may miss the cell.
+    // There are three searches after each other. The first ones may miss the cell.
     const std::int64_t energy = umtsEnergy(umtsEcN0_cdb(situation.walk, *received.cell));
     const std::int64_t firstFound = random.oneIn(5) ? random.between(1, 2) : 0;
     for (std::int64_t search = firstFound; search < 3; ++search)

@@ -7,20 +7,20 @@
 
 namespace varnel::simulation {
 
-/// The packets in which a UMTS modem tells its serving cell and the cells around.
+/// The packets with which a UMTS modem reports its serving cell and the cells around it.
 
-/// Its identity, channels and registration area.
+/// Its identity, its channels, and its registration area.
 Bytes umtsServingCell(const Situation& situation);
 
-/// The cells of the carrier and the sets that they belong to: on a dedicated channel several cells may be
-/// active, else the serving one alone.
+/// The cells of the carrier and their sets. On a dedicated channel several cells can be active, otherwise
+/// only the serving cell is.
 Bytes umtsCellSets(const Situation& situation, UTRANConnection::State state, Random& random);
 
 /// The UMTS cells in the order in which the phone would choose them.
 Bytes umtsRanking(const Situation& situation);
 
-/// The GSM cells in that order. They have packets of their own, for the records of both kinds begin at the
-/// same place.
+/// The GSM cells in that order. They have separate packets, since the records of both kinds begin at the same
+/// place.
 Bytes gsmRanking(const Situation& situation);
 
 }  // namespace varnel::simulation

@@ -13,7 +13,7 @@ constexpr std::int64_t windowSize = 200;  // blocks
 constexpr int processes = 6;
 constexpr std::size_t processSize = 9;
 
-// What goes wrong of a thousand blocks when the cell is strong, and how strong that is.
+// The rate of wrong blocks at a strong cell, and the level of a strong cell.
 constexpr std::int64_t leastWrong_permille = 8, strong_cdbm = -85'00;
 
 std::int64_t missing_db(const Situation& situation) {
@@ -22,7 +22,7 @@ std::int64_t missing_db(const Situation& situation) {
 
 }  // namespace
 
-// The three classes of speech, the data and the signalling; or what everybody shares.
+// Three classes of speech, data, and signaling, or the common channels.
 void UMTSChannels::configure(UTRANConnection::State state, std::chrono::milliseconds now) {
   using State = UTRANConnection::State;
   _channels.clear();
@@ -37,7 +37,7 @@ void UMTSChannels::configure(UTRANConnection::State state, std::chrono::millisec
 
 Bytes UMTSChannels::transmitPower(const Situation& situation) {
   constexpr std::size_t headSize = 16, recordSize = 14;
-  // In tenths of a decibel; -18.8 dBm would be 0, which says that nothing was sent.
+  // In tenths of a decibel. -18.8 dBm would be 0, which means that nothing was sent.
   constexpr std::int64_t zero_cdbm = -18'80;
   PacketWriter packet(transmitPowerCode, situation.now, headSize);
   packet.u8(14, samples);
@@ -51,7 +51,7 @@ Bytes UMTSChannels::transmitPower(const Situation& situation) {
 
 std::int64_t UMTSChannels::power_cdbm(const Situation& situation) {
   constexpr std::int64_t weakest_cdbm = -49'00, strongest_cdbm = 24'00;
-  // The power with which a cell sends and that with which it has to receive, taken together.
+  // The sum of the power that a cell sends and the level that it has to receive.
   constexpr std::int64_t balance_cdbm = -75'00;
   const std::int64_t needed = balance_cdbm - situation.walk.level_cdbm(situation.serving);
   return std::clamp(needed + _random.noise(50), weakest_cdbm, strongest_cdbm);
@@ -76,8 +76,8 @@ void UMTSChannels::receive(TransportChannel& channel, std::int64_t elapsed_ms, s
   for (std::int64_t i = 0; i < blocks; ++i) channel.wrong += _random.between(1, 1000) <= wrong_permille;
 }
 
-// The processes of a second carrier do not follow upon those of the first: every process of the first moves
-// them by the size of 18 records.
+// The processes of a second carrier do not follow those of the first: every process of the first carrier
+// moves them by the size of 18 records.
 Bytes UMTSChannels::highSpeed(const Situation& situation) {
   constexpr std::size_t headSize = 18, secondCarrierMove = 18 * processSize;
   constexpr std::int64_t subframe_ms = 2, mostSubframes = 1023;

@@ -10,26 +10,26 @@
 
 namespace varnel::simulation {
 
-/// The channels of a UMTS connection: how strongly the phone sends and how well it receives.
+/// The channels of a UMTS connection: the transmit power of the phone, and how well it receives.
 class UMTSChannels {
  public:
   explicit UMTSChannels(Random random) : _random(random) {}
 
-  /// The connection has entered that state. Its transport channels begin to count anew.
+  /// The connection has entered this state. The counters of its transport channels start again.
   void configure(UTRANConnection::State state, std::chrono::milliseconds now);
 
-  /// Samples of the transmit power, which follows the path loss. Where the phone sends in bursts only, the
-  /// samples between them are 0.
+  /// Samples of the transmit power, which follows the path loss. When the phone sends only in bursts, the
+  /// samples between bursts are 0.
   Bytes transmitPower(const Situation& situation);
-  /// The blocks of each transport channel since it was set up, and how many of them were wrong.
+  /// The blocks of each transport channel since it was set up, and the number of wrong blocks.
   Bytes blockErrors(const Situation& situation);
-  /// What the high-speed channels, of one carrier or of two, brought since the last report.
+  /// What the high-speed channels of one or two carriers have received since the last report.
   Bytes highSpeed(const Situation& situation);
 
  private:
   struct TransportChannel {
     int identity;
-    int blocks;  // a second
+    int blocks;  // per second
     std::int64_t received = 0, wrong = 0;
   };
 

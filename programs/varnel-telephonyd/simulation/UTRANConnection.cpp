@@ -54,7 +54,7 @@ UTRANConnection::State UTRANConnection::nextState() {
     case State::CellFach:
       break;
   }
-  // From one rest to a deeper one, then back to work or to the end.
+  // From one state of rest to a deeper one, then back to work or to the end.
   const State rest = _rest;
   if (rest == State::CellPCH)
     _rest = State::URAPCH;

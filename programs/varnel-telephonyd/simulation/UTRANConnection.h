@@ -6,8 +6,8 @@
 
 namespace varnel::simulation {
 
-/// How a phone is connected with a network of UMTS, of either mode. Data flows on a dedicated channel; as it
-/// becomes silent the phone goes by way of the common channels into deeper and deeper rest.
+/// The connection of a phone with a UMTS network of either mode. Data flows on a dedicated channel. When
+/// there is less data, the phone goes over the common channels to deeper and deeper states of rest.
 class UTRANConnection {
  public:
   /// Numbered as in the modem's packets.
@@ -19,15 +19,15 @@ class UTRANConnection {
   /// Whether transport channels are set up.
   bool hasChannels() const { return _state == State::CellDCH || _state == State::CellFach; }
 
-  /// The phone is disconnected from now on.
+  /// Disconnects the phone.
   void end(std::chrono::milliseconds now);
 
-  /// Time passes; true when the state is another one from now on.
+  /// Lets time pass. True when the state has changed.
   bool update(std::chrono::milliseconds now);
 
   enum class Area { Same, Another };
-  /// The phone has gone to another cell, of the same registration area or of another one: at rest it may have
-  /// to tell the network. True when the state is another one from now on.
+  /// The phone has another cell, of the same registration area or of another one. At rest it may have to tell
+  /// the network. True when the state has changed.
   bool cellChanged(std::chrono::milliseconds now, Area area);
 
  private:
@@ -36,7 +36,7 @@ class UTRANConnection {
 
   Random _random;
   State _state = State::Disconnected;
-  State _rest = State::CellPCH;  // where the common channels lead to
+  State _rest = State::CellPCH;  // the next state after the common channels
   std::chrono::milliseconds _end;
 };
 

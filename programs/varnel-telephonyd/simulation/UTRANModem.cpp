@@ -18,20 +18,20 @@ constexpr std::uint16_t neighboursCode = 0xD00A, channelsCode = 0xD00C, gsmNeigh
 
 constexpr std::int64_t weakestNeighbour_cdbm = -105'00;
 constexpr std::int64_t weakestGSM_cdbm = -100'00, weakestIdentified_cdbm = -92'00;
-// A cell's list of neighbours goes as far as the next site.
+// The list of neighbors reaches to the next site.
 constexpr std::int64_t listedDistance_cm = 260'00;
 
 struct TransportChannel {
   int identity;
-  std::int64_t target;  // of the block error rate
+  std::int64_t target;  // the target of the block error rate
 };
-// Error rates are sent as 25.133 has them, from 0 (none) to 63 (all), in steps of 0.065 on a logarithmic
-// scale: 31 is one block of a hundred. The voice and the signalling go before the data.
+// Error rates are sent as in 25.133, from 0 (none) to 63 (all), on a logarithmic scale in steps of 0.065. 31
+// is one block of a hundred. Voice and signaling come before data.
 constexpr TransportChannel dedicatedChannels[] = {{1, 27}, {2, 30}, {3, 31}, {5, 43}};
 constexpr TransportChannel commonChannels[] = {{32, 31}};
 constexpr std::int64_t mostErrors = 63;
 
-// A coded composite of transport channels.
+// A composite of transport channels.
 struct Composite {
   int identity, timeslot;
 };
@@ -74,7 +74,7 @@ void UTRANModem::servingCellChanged(const Cell& previous) {
 
 void UTRANModem::stateChanged() {
   sendState();
-  // Also without channels: the report then takes back the earlier ones.
+  // Sent even without channels: this report then replaces the earlier ones.
   sendChannels();
 }
 
@@ -92,15 +92,15 @@ void UTRANModem::sendServingCell() {
   send(PacketWriter(servingCellCode, now(), size)
            .u8(13, 1)                // version
            .u8(14, 0)                // no restrictions
-           .u8(15, cell.area % 256)  // a registration area for each location area
-           .u16(17, cell.channel)    // up and down share
+           .u8(15, cell.area % 256)  // each location area is a registration area
+           .u16(17, cell.channel)    // uplink and downlink share
            .u16(19, cell.channel)    // the carrier
            .u32(21, cell.identity)
            .bits(25, 0, 1, 0)  // access is not barred
            .finish());
 }
 
-// The records begin at a fixed place, whatever comes before them.
+// The records always begin at the same place.
 void UTRANModem::sendNeighbours() {
   constexpr std::size_t headSize = 168, recordSize = 16;
   auto cells = walk().cells(Access::UTRAN);
@@ -120,8 +120,8 @@ void UTRANModem::sendNeighbours() {
   send(packet.finish());
 }
 
-// The phone tells those apart that the list does not have only while it is on a dedicated channel; the
-// serving cell counts as one only while it is active.
+// Only on a dedicated channel does the phone tell apart cells that are not in the list. The serving cell
+// counts as one only while it is active.
 bool UTRANModem::isHeard(const ReceivedCell& received) const {
   if (received.level_cdbm < weakestNeighbour_cdbm) return false;
   if (received.cell == &servingCell()) return _connection.hasChannels();
@@ -157,8 +157,8 @@ void UTRANModem::sendGSMNeighbours() {
   send(packet.finish());
 }
 
-// The composites do not follow upon the transport channels: every transport channel moves them by more than
-// the size of its record.
+// The composites do not follow the transport channels directly: every transport channel moves them by more
+// than the size of its record.
 void UTRANModem::sendChannels() {
   constexpr std::size_t headSize = 17, channelSize = 2;
   constexpr std::size_t compositesStart = 289, compositesMove = 34, compositeSize = 8;

@@ -5,9 +5,9 @@
 
 namespace varnel::simulation {
 
-/// A UTRAN modem of the time-division mode. It tells the state of its connection when that changes, its
-/// serving cell when that changes and every few seconds, the cells around, and while it has channels how well
-/// they are received.
+/// A UTRAN modem of the time-division mode. It reports the state of its connection when it changes, its
+/// serving cell when it changes and every few seconds, and the cells around it. While it has channels, it
+/// reports how well it receives them.
 class UTRANModem final : public WalkingModem {
  public:
   explicit UTRANModem(std::uint64_t seed) : UTRANModem(Random(seed)) {}

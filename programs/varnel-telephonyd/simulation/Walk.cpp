@@ -7,20 +7,20 @@ namespace varnel::simulation {
 
 namespace {
 
-constexpr std::int64_t slowest_cm = 90, fastest_cm = 180;  // a second
+constexpr std::int64_t slowest_cm = 90, fastest_cm = 180;  // per second
 constexpr std::int64_t stepsPerSecond = std::chrono::seconds(1) / Walk::stepTime;
 constexpr std::int64_t weakest_cdbm = -140'00, strongest_cdbm = -40'00;
 constexpr std::int64_t frontToBack_cdb = 15'00;
 
-// The shadow forgets a part of itself with every step and gains as much by chance: in all it has a standard
-// deviation of 4 dB and changes within some 20 m.
+// With every step the shadow loses a part of itself and gains as much at random. Its standard deviation is 4
+// dB, and it changes within about 20 m.
 constexpr std::int64_t shadowMemory_steps = 128;
 constexpr std::int64_t shadowNoise_cdb = 50;
 constexpr std::int64_t fastNoise_cdb = 2'00;
-// The phone smooths what it measures.
+// The phone smooths its measurements.
 constexpr std::int64_t smoothing_steps = 4;
 
-// 10 lg of a number of at least 1, in hundredths, correct to 0.3; in whole numbers throughout.
+// 10 lg of a number of at least 1, in hundredths, correct to 0.3. It uses only integers.
 std::int64_t decibels_cdb(std::uint64_t number) {
   const auto exponent = static_cast<std::int64_t>(63 - std::countl_zero(number | 1));
   const std::uint64_t mantissa = ((number << 10) >> exponent) - 1024;
@@ -67,7 +67,7 @@ std::int64_t Walk::distance_cm(const Cell& one, const Cell& other) const {
   return std::abs(distanceUpTheStreet_cm(one.position_cm, other.position_cm));
 }
 
-// By the shorter way round; negative where that is down the street.
+// The distance on the shorter way along the ring; negative when that is toward the start of the street.
 std::int64_t Walk::distanceUpTheStreet_cm(std::int64_t from_cm, std::int64_t to_cm) const {
   const std::int64_t length = _town.streetLength_cm;
   const std::int64_t ahead = ((to_cm - from_cm) % length + length) % length;
@@ -79,7 +79,7 @@ std::int64_t Walk::meanLevel_cdbm(const Cell& cell) const {
   const auto squaredDistance_m = static_cast<std::uint64_t>((along * along + away * away) / 10'000);
   // 35 lg of the distance
   const std::int64_t pathLoss = decibels_cdb(squaredDistance_m) * 7 / 4;
-  // From 1 straight in front of the aerial to -1 behind it.
+  // From 1, directly in front of the antenna, to -1, behind it.
   const std::int64_t front_percent = cell.direction * along * 100 / (std::abs(along) + away);
   const std::int64_t aerialLoss = cell.direction == 0 ? 0 : frontToBack_cdb * (100 - front_percent) / 200;
   return cell.power_cdbm - pathLoss - aerialLoss;

@@ -10,17 +10,17 @@
 
 namespace varnel::simulation {
 
-/// A cell and how strongly it is received, in hundredths of a decibel above one milliwatt.
+/// A cell and its received level, in hundredths of a decibel above one milliwatt.
 struct ReceivedCell {
   const Cell* cell;
   std::int64_t level_cdbm;
 };
 
-/// Somebody who walks through the town with a phone, and what the phone receives on the way: levels fall with
-/// the distance and behind the aerials, drift as houses pass by, and tremble.
+/// A person who walks through the town with a phone, and what the phone receives. Levels fall with the
+/// distance and behind antennas, change slowly with the houses on the way, and also change quickly.
 class Walk {
  public:
-  /// How long one step takes.
+  /// The time per step.
   static constexpr std::chrono::milliseconds stepTime{100};
 
   Walk(Town town, Random random);
@@ -32,12 +32,12 @@ class Walk {
   /// The cells of a technology, the strongest first. Every technology has some.
   std::vector<ReceivedCell> cells(Access access) const;
   std::int64_t level_cdbm(const Cell& cell) const { return stateOf(cell).level_cdbm; }
-  /// How far apart two cells are along the street.
+  /// The distance between two cells along the street.
   std::int64_t distance_cm(const Cell& one, const Cell& other) const;
 
  private:
   struct CellState {
-    std::int64_t shadow_cdb = 0;  // of the houses between
+    std::int64_t shadow_cdb = 0;  // of the houses between cell and phone
     std::int64_t level_cdbm = 0;
   };
 
@@ -52,7 +52,7 @@ class Walk {
   const Town _town;
   Random _random;
   std::int64_t _position_cm;
-  std::int64_t _speed_cm;  // a second
+  std::int64_t _speed_cm;  // per second
   std::vector<CellState> _states;
 };
 

@@ -10,7 +10,7 @@ namespace {
 constexpr std::uint16_t simFilesCode = 0, cellMonitorCode = 1, packetDataCode = 2;
 }  // namespace
 
-// The braces keep the order in which the parts of the world draw their randomness.
+// Braces fix the order in which the parts of the world draw random numbers.
 WalkingModem::WalkingModem(Random& random, Access access)
     : ScheduledModem(random.fork()),
       _walk{Town::build(random.fork()), random.fork()},

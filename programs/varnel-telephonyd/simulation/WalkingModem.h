@@ -8,22 +8,22 @@
 
 namespace varnel::simulation {
 
-/// A modem that is carried through the town. It sends what the telephony server
-/// adds to every modem's packets: the SIM card, the cells around and the packet-data contexts.
+/// A modem that somebody carries through the town. It also sends what the telephony server adds to every
+/// modem's packets: the SIM card, the cells around, and the packet-data contexts.
 class WalkingModem : public ScheduledModem {
  protected:
-  /// Draws from the source what the world needs. The modem begins with that technology.
+  /// Draws from the source what the world needs. The modem starts with this technology.
   WalkingModem(Random& random, Access access);
 
   const Walk& walk() const { return _walk; }
   const Cell& servingCell() const { return _selection.servingCell(); }
 
-  /// The strongest cell of that technology serves from now on.
+  /// The strongest cell of this technology becomes the serving cell.
   void changeAccess(Access access);
 
-  /// A step has been walked; the serving cell may have changed.
+  /// A step was walked. The serving cell may have changed.
   virtual void stepWalked() = 0;
-  /// Another cell serves from now on.
+  /// The serving cell has changed.
   virtual void servingCellChanged(const Cell& previous) = 0;
 
  private:
