@@ -83,6 +83,7 @@ StreamFailure VarnelModel::failureToStart() {
     logError(" ***** Could not send the START command (got error=%d)", sent.status);
     return StreamFailure::Command;
   }
+  // Kept: a success, logged as an error.
   logError("Starting the display update timer");
   _displayUpdateTimer = _services.queue.repeating(refreshInterval, _whileAlive([this] { refresh(); }));
   return StreamFailure::None;
@@ -97,6 +98,7 @@ bool VarnelModel::createPorts() {
   if (!createLocalPort()) return false;
   const auto portName = createLogChannel();
   if (!portName || !createRemotePort(*portName)) return false;
+  // Kept: a success, logged as an error.
   logError(" ***** Created ports (send=%p, recv=%p)", static_cast<const void*>(_sendPort.get()),
            static_cast<const void*>(_recvPort.get()));
   return true;
@@ -110,6 +112,7 @@ bool VarnelModel::createLocalPort() {
       });
   _recvPort = std::move(created.port);
   if (created.alreadyExists) {
+    // Kept: three s.
     logError("Local messsage port already exists");
     return false;
   }
@@ -149,8 +152,8 @@ bool VarnelModel::createRemotePort(const std::string& name) {
 
 void VarnelModel::destroyPorts() {
   _displayUpdateTimer.reset();
-  // Without a handler, the port does not report that the service has gone away, which would restart the
-  // monitor.
+  // The handler goes first. Otherwise invalidating the port would restart the monitor, as if the service had
+  // gone away.
   if (_recvPort) {
     _recvPort->setInvalidationHandler({});
     _recvPort->invalidate();
@@ -171,6 +174,7 @@ void VarnelModel::configureGenerator() {
   const auto technology = askForTechnology();
   if (!technology) return;
   _logGenerator = LogGenerator::generatorFromTechnology(*technology, _services.generator);
+  // Kept: "generated" for "generator". The line is an error in both cases, and null means that there is none.
   logError("Got log generated: %p", static_cast<const void*>(_logGenerator.get()));
   _technology = technology->string() ? technology->string()->substr(0, longestTechnologyKept) : std::string();
   noteWhetherDisplayStands();

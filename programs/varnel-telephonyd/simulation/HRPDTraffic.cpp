@@ -30,8 +30,7 @@ constexpr ForwardRate forwardRates[] = {
 constexpr std::int64_t packetsPerLoss = 100;
 
 constexpr std::int64_t packetsPerHaste = 4;
-// A packet of twice the size needs twice the power. From a size to the next but one, packets grow to about
-// twice the size.
+// Each larger size of packet needs this much more power.
 constexpr std::int64_t step_db = 3;
 
 }  // namespace
