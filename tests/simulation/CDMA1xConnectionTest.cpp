@@ -13,7 +13,7 @@ namespace {
 using namespace std::chrono_literals;
 using State = CDMA1xConnection::State;
 
-// One hour's states, one after the other, from the first on.
+// The states of one hour in their order, with the first one.
 std::vector<State> statesOfAnHour(std::uint64_t seed = 1) {
   CDMA1xConnection connection{Random(seed)};
   std::vector states{connection.state()};

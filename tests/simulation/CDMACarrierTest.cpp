@@ -9,7 +9,7 @@ Cell mast(std::int64_t power_cdbm = -6'00) {
   return {.access = Access::HRPD, .code = 4, .identity = 1, .setback_cm = 20'00, .power_cdbm = power_cdbm};
 }
 
-// A street so short that everything is received far above the noise.
+// The street is so short that everything is received far above the noise.
 Town townOf(std::vector<Cell> cells) { return {50'00, std::move(cells)}; }
 
 TEST(CDMACarrier, AMastThatIsAloneIsNearlyEverything) {

@@ -41,7 +41,7 @@ std::vector<Message> messagesOf(unsigned code, std::chrono::milliseconds duratio
 
 int i8(const Message& message, std::size_t offset) { return static_cast<std::int8_t>(message.u8(offset)); }
 
-// A status of 1x as 0x119C tells it: where its subpackets begin, and what its pilots' energies come to.
+// A report of 1x in 0x119C: the places of its subpackets, and the strengths of its pilots.
 struct VoiceStatus {
   explicit VoiceStatus(const Message& message) {
     std::size_t start = 17;
@@ -152,7 +152,7 @@ TEST(CDMAModem, VoiceStatesFollowOneAnotherAsInANetwork) {
 }
 
 TEST(CDMAModem, DataStatesFollowOneAnotherAsInANetwork) {
-  // A call may end any of them.
+  // A call may end any state.
   const std::map<unsigned, std::set<unsigned>> allowed = {
       {inactive, {acquisition}}, {acquisition, {2, inactive}},    {2, {3, inactive}},
       {3, {access, inactive}},   {access, {connected, inactive}}, {connected, {3, inactive}},
@@ -216,7 +216,7 @@ TEST(CDMAModem, VoiceStatusesAreBelievable) {
     EXPECT_TRUE(isWithoutPilot || status.strengths_db.contains(status.reference));
     for (const auto& [pilot, strength_db] : status.strengths_db) {
       EXPECT_LE(pilot, 511u);
-      // A fifth of the power is the most.
+      // At most a fifth of the power.
       EXPECT_THAT(strength_db, AllOf(Ge(-25.0), Le(-6.9)));
     }
     references.insert(status.reference);
@@ -231,7 +231,7 @@ TEST(CDMAModem, VoiceStatusesAreBelievable) {
 }
 
 TEST(CDMAModem, OneFrameOfAHundredIsErasedAndMoreWhereTheActiveSetIsWeak) {
-  std::map<bool, std::pair<int, int>> erasedOfAll;  // by whether the active set is weak
+  std::map<bool, std::pair<int, int>> erasedOfAll;  // the key says whether the active set is weak
   bool isWeak = false;
   std::optional<std::chrono::milliseconds> last;
   for (const Message& message : messages(1, 120min)) {
@@ -361,7 +361,7 @@ TEST(CDMAModem, FingersFollowThePilotsOfTheActiveSet) {
       if (pilot == noPilot) continue;
       ++used;
       ASSERT_TRUE(pilots.contains(pilot));
-      // No path carries more than its pilot does; both are whole 512ths.
+      // No path carries more than its pilot; both are whole 512ths.
       const double ratio = message.u16(record + 6) / 512.0, strength = pilots[pilot] + 1 / 512.0;
       EXPECT_GT(ratio, 0);
       EXPECT_LE(ratio, strength / (1 - std::min(strength, 0.99)));
@@ -372,7 +372,7 @@ TEST(CDMAModem, FingersFollowThePilotsOfTheActiveSet) {
   EXPECT_THAT(assigned, IsSupersetOf({0, 1, 2, 3, 4}));
 }
 
-// The bits that the counters of a packet come to, by the sizes of the packets that they count.
+// The number of bits that the counters of a packet stand for, from the sizes of the counted packets.
 std::int64_t receivedBits(const Message& message) {
   constexpr std::int64_t sizes[] = {128,  256,  512,  1024, 0,    128, 256,  512,  1024, 0,    128, 256,
                                     512,  1024, 0,    128,  256,  512, 1024, 0,    128,  256,  512, 1024,
@@ -447,7 +447,7 @@ INSTANTIATE_TEST_SUITE_P(Links, CDMARates,
 
 TEST(CDMAModem, TheForwardRateFollowsThePilot) {
   double strength = 0;
-  std::map<bool, std::pair<double, int>> bits;  // and seconds, by whether the pilot is strong
+  std::map<bool, std::pair<double, int>> bits;  // bits and seconds; the key says whether the pilot is strong
   std::optional<Message> last;
   unsigned state = inactive, serving = noPilot;
   for (const Message& message : messages(1, 60min)) {

@@ -11,7 +11,7 @@ using namespace std::chrono_literals;
 using State = GSMConnection::State;
 using Traffic = GSMConnection::Traffic;
 
-// At the first moment at which it has that state.
+// A connection at the first moment at which it has this state.
 GSMConnection connectionIn(State state, std::chrono::milliseconds& now) {
   GSMConnection connection(Random(1));
   connection.arrive(now);

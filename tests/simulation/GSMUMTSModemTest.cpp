@@ -61,7 +61,7 @@ TEST(GSMUMTSModem, UMTSAndGSMAlternate) {
       if (message.code() == 0x4125) rrcState = message.u8(13);
       if (!isOfGSM(message.code()) && !isOfUMTS(message.code())) continue;
       if (isOnGSM == isOfGSM(message.code())) continue;
-      // Each technology is left at rest.
+      // Each technology is idle when the phone leaves it.
       EXPECT_EQ(isOnGSM ? rrState : rrcState, isOnGSM ? rrInactive : disconnected);
       EXPECT_THAT(message.at - since, AllOf(Ge(13s), Le(70s))) << seed << ", " << message.at.count();
       since = message.at;
@@ -163,7 +163,7 @@ TEST(GSMUMTSModem, CellSetsAreBelievable) {
       EXPECT_LE(set, 2u);
       active += set == 0;
       sets.insert(set);
-      // From -24 to -4 dB of 524,288, and half a decibel more.
+      // From -24 to -4 dB of 524,288, plus half a decibel.
       const unsigned last = message.u32(energies + 40);
       EXPECT_THAT(last, AllOf(Ge(2342u), Le(234'191u)));
       EXPECT_THAT(message.u32(energies + 32), AnyOf(0u, last));
@@ -214,7 +214,7 @@ TEST(GSMUMTSModem, RankingsAreOfOneKindOfCellsAtATime) {
   EXPECT_GE(gsmRankings, 50);
 }
 
-// Power and level always make -75 dBm together, but for the trembling and the limits.
+// Power and level together are always -75 dBm, except for noise and the limits.
 TEST(GSMUMTSModem, TransmitPowerFollowsThePathLoss) {
   std::int64_t rscp_dbm = 0;
   unsigned state = disconnected;

@@ -17,7 +17,7 @@ using Moment = std::pair<State, Session>;
 
 Moment momentOf(const HRPDConnection& connection) { return {connection.state(), connection.session()}; }
 
-// With the radio for itself, until that moment.
+// Runs the connection until this moment, with the radio for itself.
 void runUntil(HRPDConnection& connection, Moment moment, std::chrono::milliseconds& now) {
   while (momentOf(connection) != moment) connection.update(now += 100ms, Radio::Free);
 }

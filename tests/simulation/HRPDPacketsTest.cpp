@@ -87,7 +87,7 @@ TEST(HRPDPackets, ReverseCountersStandInTheirBlocks) {
   ASSERT_EQ(packet.packet.size(), 1750u);
   EXPECT_EQ(packet.u16(3), 0x127Eu);
   EXPECT_EQ(packet.u32(14), 0x01020304u);
-  // The third block, the twelfth size: by two, three and four subframes, and in haste by one and two.
+  // The third block, twelfth size: two, three, and four subframes, and with low latency one and two.
   for (const std::size_t offset :
        {18 + 24 * 11 + 576 * 2 + 4, 18 + 24 * 11 + 576 * 2 + 8, 18 + 24 * 11 + 576 * 2 + 12,
         306 + 24 * 11 + 576 * 2, 306 + 24 * 11 + 576 * 2 + 4})

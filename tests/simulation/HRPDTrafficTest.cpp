@@ -13,7 +13,7 @@ using testing::AllOf;
 using testing::Ge;
 using testing::Le;
 
-// The counters that are not 0 after so many slots at that ratio.
+// The counters that are not 0 after this many slots at this ratio.
 std::map<std::size_t, std::uint32_t> received(std::int64_t carrierToInterference, std::int64_t slots) {
   ForwardPackets packets;
   Random random(1);
@@ -87,7 +87,7 @@ TEST(ReversePackets, EachTakesItsSubframes) {
     for (std::uint32_t i = 0; i < ReversePackets::terminations; ++i)
       subframes += packets.counts(0, mode, 6)[i] * (i + 1);
   }
-  // The last one may go on behind the end.
+  // The last packet may go on after the end.
   EXPECT_THAT(subframes, AllOf(Ge(15'000u), Le(15'003u)));
   EXPECT_EQ(packets.counts(0, 0, 6)[0], 0u);
   EXPECT_EQ(packets.counts(0, 1, 6)[2] + packets.counts(0, 1, 6)[3], 0u);

@@ -67,7 +67,7 @@ TEST(LTEModem, ServingCellsAreBelievable) {
     areas.insert(cell.u16(26));
     bands.insert(cell.u32(28));
   }
-  // Once round the town.
+  // One round through the town.
   EXPECT_GE(identities.size(), 20u);
   EXPECT_EQ(areas.size(), 3u);
   EXPECT_GE(bands.size(), 2u);
@@ -89,13 +89,13 @@ TEST(LTEModem, ACellKeepsItsArea) {
   }
 }
 
-// What a measurement says of a carrier's cell, in its own units.
+// What a measurement says about a cell of the carrier, in its own units.
 struct Cell {
   unsigned channel, code;
   auto operator<=>(const Cell&) const = default;
 };
 
-// The fields of 0xB17F that levels are in.
+// The fields of 0xB17F with levels.
 struct ServingMeasurement {
   explicit ServingMeasurement(const Message& message)
       : cell{message.u16(17), message.u16(19) & 0x1FF},

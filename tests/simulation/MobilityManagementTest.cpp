@@ -9,10 +9,10 @@ namespace {
 
 using namespace std::chrono_literals;
 
-// A phone for which time passes.
+// A phone and the time that passes for it.
 class MobilityManagementTest : public testing::Test {
  protected:
-  // State, substate and status of the circuits, the same of the packets, and the registration.
+  // State, substate, and status of the circuits, the same for the packets, and the registration.
   std::vector<int> condition() const {
     std::vector<int> numbers;
     for (const Bytes& packet : {_mobility.circuitState(_situation), _mobility.packetState(_situation)}) {
@@ -22,7 +22,7 @@ class MobilityManagementTest : public testing::Test {
     numbers.push_back(_mobility.registrationState(_situation).at(13));
     return numbers;
   }
-  // What follows, one after the other.
+  // The conditions that follow, in their order.
   std::vector<std::vector<int>> conditionsWithin(std::chrono::milliseconds duration) {
     std::vector<std::vector<int>> conditions;
     for (const auto end = _now + duration; _now < end; _now += 100ms)

@@ -37,7 +37,7 @@ TEST_F(NetworkIdentity, ThereAreNoEqualsBeforeThePhoneIsRegistered) {
   EXPECT_EQ(equivalent(false), (Bytes{0, 0, 0, 0}));
 }
 
-// Six digits from each third place: 0 1 0 0 1 0 are 001 and 100, 0 1 0 0 1 1 are 001 and 101.
+// Six digits from every third place: 0 1 0 0 1 0 are 001 and 100, 0 1 0 0 1 1 are 001 and 101.
 TEST_F(NetworkIdentity, TheEqualsOfTheHomeNetworkAreThePartnerAndADistantOne) {
   EXPECT_EQ(equivalent(true), (Bytes{0, 0, 0, 2, 0, 1, 0, 0, 1, 0, 0, 1, 1}));
 }

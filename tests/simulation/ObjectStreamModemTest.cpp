@@ -83,7 +83,7 @@ TEST(ObjectStreamModem, MessagesArePropertyListsOfBothEncodingsAndNothingElse) {
   EXPECT_THAT(beginnings, UnorderedElementsAre("bplist", "<?xml "));
 }
 
-// What a tree of values has.
+// The contents of a tree of values.
 struct Census {
   int arrays = 0, wrappers = 0, chains = 0, others = 0;
 

@@ -27,7 +27,7 @@ TEST(SimulatedModems, OnlyWhatIsSimulatedIsMade) {
   EXPECT_EQ(simulatedModem("kalvi-5g", 1), nullptr);
 }
 
-// What every modem keeps to.
+// The properties of every modem.
 struct Modem {
   std::string technology;
   std::set<unsigned> codes;               // that it sends

@@ -12,7 +12,7 @@ using namespace std::chrono_literals;
 using State = UTRANConnection::State;
 using Area = UTRANConnection::Area;
 
-// One hour's states, one after the other, from the first on.
+// The states of one hour in their order, with the first one.
 std::vector<State> statesOfAnHour() {
   UTRANConnection connection(Random(1));
   std::vector states{connection.state()};
@@ -22,7 +22,7 @@ std::vector<State> statesOfAnHour() {
   return states;
 }
 
-// At the first moment at which it has that state.
+// A connection at the first moment at which it has this state.
 UTRANConnection connectionIn(State state, std::chrono::milliseconds& now) {
   UTRANConnection connection(Random(1));
   while (connection.state() != state) connection.update(now += 100ms);

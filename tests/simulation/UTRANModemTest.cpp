@@ -75,7 +75,7 @@ TEST(UTRANModem, ServingCellsAreBelievable) {
     channels.insert(cell.u16(19));
     areas.insert(cell.u8(15));
   }
-  // Once round the town.
+  // One round through the town.
   EXPECT_GE(identities.size(), 20u);
   EXPECT_EQ(channels.size(), 3u);
   EXPECT_EQ(areas.size(), 3u);

@@ -10,7 +10,7 @@
 namespace varnel::simulation {
 namespace {
 
-// One LTE cell without a direction, 100 m up a street of 2 km.
+// One LTE cell without a direction, 100 m along a street of 2 km.
 Cell cellAt(std::int64_t position_cm) {
   return {.access = Access::LTE,
           .band = 3,
@@ -93,7 +93,7 @@ TEST(CellSelection, AClearlyStrongerCellTakesOverAndAWeakerOneDoesNot) {
     EXPECT_GT(walk.level_cdbm(selection.servingCell()), walk.level_cdbm(*serving) + 3'00);
     serving = &selection.servingCell();
   }
-  // Twice a round, and now and then forth and back between the cells.
+  // Twice per round, and sometimes back and forth between the cells.
   EXPECT_GE(changes, 2);
   EXPECT_LE(changes, 40);
 }

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// How often this thread has taken memory with `new` so far. A program that links this counts its
+/// How often this thread has allocated memory with `new` so far. A program that links this file counts its
 /// allocations.
 std::uint64_t allocationCount();
 

@@ -39,8 +39,8 @@ inline constexpr const char* c2kVariables[] = {
     "kFLDataRate",      "kRLDataRate",
 };
 
-/// A generator whose variables all lie in one dictionary, under their own names. The dictionary is emptied
-/// before each message, so afterwards it tells what the message published, in which order.
+/// A generator whose variables are all in one dictionary, under their own names. The dictionary is emptied
+/// before each message. So afterwards it shows what the message published, and in which order.
 class C2KTest : public testing::Test {
  protected:
   C2KTest() {
@@ -55,28 +55,28 @@ class C2KTest : public testing::Test {
     log.take();
   }
 
-  /// What the message publishes; the log keeps its lines.
+  /// What the message publishes. The log keeps its lines.
   std::string published(const Bytes& message) {
     *display.dictionary() = {};
     log.take();
     generator.updateState_withData(state, message);
     return described(display);
   }
-  /// What the message shows for one variable; absent when it does not publish it.
+  /// What the message publishes for one variable; absent when it publishes nothing for it.
   std::string published(const Bytes& message, std::string_view variable) {
     published(message);
     return described(display.dictionary()->get(variable));
   }
 
-  /// Expects the message to publish nothing and to log this line alone, or none when it is empty.
+  /// Expects the message to publish nothing and to log only this line, or no line if it is empty.
   void expectRefused(const Bytes& message, const std::string& line) {
     EXPECT_EQ(published(message), "{}") << message.size() << " bytes";
     EXPECT_EQ(log.takeTexts(), line.empty() ? std::vector<std::string>() : std::vector<std::string>{line})
         << message.size() << " bytes";
   }
 
-  /// Hands over what is left of the packet at every shorter length. The check gets the length, what was
-  /// published and the lines that were logged. Each time the state is as it was before.
+  /// Sends the packet cut at every shorter length. The check gets the length, what was published, and the
+  /// logged lines. Each time the state is the same as before.
   void forEachTruncation(
       const Bytes& packet,
       const std::function<void(std::size_t, const std::string&, const std::vector<std::string>&)>& check) {
@@ -90,7 +90,7 @@ class C2KTest : public testing::Test {
     }
   }
 
-  /// The bytes of the messages since the last call, as the next display state holds them.
+  /// The bytes of the messages since the last call, as the next display state will hold them.
   std::string collected() {
     generator.generateLogUsingState(state);
     return described(state.get("DisplayState"));
@@ -104,21 +104,21 @@ class C2KTest : public testing::Test {
   Dictionary state;
 };
 
-/// A packet of type 1 with sub-packets one behind the other from offset 17 on.
+/// A packet of log type 1 with subpackets one after the other from offset 17.
 class SubpacketBuilder {
  public:
-  /// A sub-packet of that id whose size is that of its bytes, which begin with its header.
+  /// A subpacket with this id. Its size is that of its bytes, which begin with its header.
   SubpacketBuilder& add(std::uint8_t id, std::size_t size) {
     return add(id, size, static_cast<std::uint16_t>(size));
   }
-  /// A sub-packet that claims another size than it has.
+  /// A subpacket that claims a wrong size.
   SubpacketBuilder& add(std::uint8_t id, std::size_t size, std::uint16_t claimedSize) {
     _start = _bytes.size();
     _bytes.resize(_start + size);
     ++_bytes[14];
     return u8(0, id).u16(2, claimedSize);
   }
-  /// Puts a value into the sub-packet that was added last, at an offset within it.
+  /// Writes a value at an offset within the last subpacket.
   SubpacketBuilder& u8(std::size_t offset, std::uint8_t value) {
     _bytes.at(_start + offset) = value;
     return *this;
@@ -126,17 +126,17 @@ class SubpacketBuilder {
   SubpacketBuilder& u16(std::size_t offset, std::uint16_t value) {
     return u8(offset, static_cast<std::uint8_t>(value)).u8(offset + 1, static_cast<std::uint8_t>(value >> 8));
   }
-  /// Puts the byte everywhere behind its header.
+  /// Sets all bytes after the header of the last subpacket.
   SubpacketBuilder& fill(std::uint8_t byte) {
     for (std::size_t at = _start + 4; at < _bytes.size(); ++at) _bytes[at] = byte;
     return *this;
   }
-  /// Says another number of sub-packets than there are.
+  /// Claims a wrong number of subpackets.
   SubpacketBuilder& count(std::uint8_t number) {
     _bytes[14] = number;
     return *this;
   }
-  /// Puts bytes behind the last sub-packet.
+  /// Adds bytes after the last subpacket.
   SubpacketBuilder& pad(std::size_t size, std::uint8_t byte = 0) {
     _bytes.resize(_bytes.size() + size, byte);
     return *this;

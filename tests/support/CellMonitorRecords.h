@@ -9,12 +9,12 @@
 
 namespace varnel {
 
-/// A message of cell-monitor records, header included.
+/// A message with cell-monitor records, header included.
 inline Bytes cellMonitorMessage(Array records) {
   return serverMessage(0xFF0001, Value::ofArray(std::move(records)));
 }
 
-/// A cell-monitor record of that technology and cell type with these entries.
+/// A cell-monitor record with this technology, this cell type, and these entries.
 inline Value cellRecord(const char* technology, const char* type,
                         std::initializer_list<Dictionary::Entry> entries = {}) {
   Value record = dictionaryOf({{"RadioAccessTechnology", technology}, {"CellType", type}});
@@ -26,8 +26,8 @@ inline Dictionary::Entry number(const char* key, std::int64_t value) {
   return {key, Value::ofInteger(value)};
 }
 
-/// Elements that are no record of any kind: other values, and dictionaries that lack the technology or the
-/// cell type or have something else there than a text. Each of them has all these entries where it can.
+/// Elements that are no valid records: other values, and dictionaries that lack the technology or the cell
+/// type or have no text there. Each has all these entries where possible.
 inline Array elementsThatAreNoRecords(const char* technology, const char* type,
                                       std::initializer_list<Dictionary::Entry> entries) {
   const auto record = [&] { return cellRecord(technology, type, entries); };

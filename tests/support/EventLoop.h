@@ -9,7 +9,7 @@
 
 namespace varnel {
 
-/// Runs the calling thread's event loop until the condition holds; false when it does not within the time.
+/// Runs the calling thread's event loop until the condition holds; false when the time is up first.
 inline bool runUntil(const std::function<bool()>& condition,
                      std::chrono::milliseconds within = std::chrono::seconds(60)) {
   const auto deadline = std::chrono::steady_clock::now() + within;
@@ -21,15 +21,16 @@ inline bool runUntil(const std::function<bool()>& condition,
   return true;
 }
 
-/// Runs the event loop for that long: for what must not happen. What must is waited for.
+/// Runs the event loop for this long, for things that must not happen. For things that must happen, use
+/// `runUntil`.
 inline void runFor(std::chrono::milliseconds duration) {
   runUntil([] { return false; }, duration);
 }
 
-/// A peer with an event loop of its own, as another process has one.
+/// A peer with its own event loop, like another process.
 class PeerThread {
  public:
-  /// Sets the peer up on its thread, runs the event loop there, and at the end destroys what the function
+  /// Sets the peer up on its thread and runs the event loop there. At the end, destroys what the function
   /// returned. The caller's event loop runs until the peer is set up.
   explicit PeerThread(std::function<std::shared_ptr<void>()> setUp)
       : _thread(QThread::create([this, setUp = std::move(setUp)] {

@@ -16,10 +16,10 @@ class FakeDeviceFiles final : public DeviceFiles {
     Value list;
   };
 
-  /// The paths at which something stands.
+  /// The paths of existing files.
   std::set<std::string> existing;
   bool refusesWrites = false;
-  /// Every attempt to write, the oldest first, refused ones included.
+  /// Every attempt to write, the oldest first, including refused ones.
   std::vector<Write> writes;
 
   bool exists(const std::string& path) const override { return existing.contains(path); }

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// A host that tells of the link what the test says.
+/// A host that reports about the link what the test says.
 class FakeLinkReports final : public LinkReports {
  public:
   LinkReport linkReport() const override { return report; }

@@ -11,8 +11,8 @@
 
 namespace varnel {
 
-/// A main queue whose time passes only when a test says so. Tasks run in the order of their moments, those of
-/// one moment in the order in which they were put there. It outlives its timers.
+/// A main queue whose time passes only when a test says so. Tasks run in the order of their moments. Tasks of
+/// the same moment run in the order in which they were added. The queue must outlive its timers.
 class FakeQueue final : public MainQueue {
  public:
   using Duration = std::chrono::milliseconds;
@@ -23,7 +23,7 @@ class FakeQueue final : public MainQueue {
     return std::make_unique<Timer>(*this, interval, std::move(task));
   }
 
-  /// Runs everything that is due now, and what that puts there for now.
+  /// Runs everything that is due now, including tasks that are added meanwhile for now.
   void run() { advance(Duration::zero()); }
 
   /// Lets time pass and runs each task at its moment.
@@ -37,15 +37,15 @@ class FakeQueue final : public MainQueue {
     _now = end;
   }
 
-  /// How much time has passed since the beginning.
+  /// The time that has passed since the beginning.
   Duration now() const { return _now; }
-  /// Tasks that have yet to run, timers not counted.
+  /// The tasks that have not run yet, without timers.
   std::size_t waitingTasks() const { return _tasks.size() - _timers; }
   /// Timers that have not been destroyed.
   std::size_t liveTimers() const { return _timers; }
 
  private:
-  // The moment of a task, and how many were put there before it.
+  // The moment of a task, and the number of tasks that were added before it.
   using Position = std::pair<Duration, std::uint64_t>;
 
   class Timer final : public RepeatingTimer {
@@ -68,7 +68,7 @@ class FakeQueue final : public MainQueue {
     }
     void fire() {
       schedule();
-      const Task task = _task;  // which may destroy this timer
+      const Task task = _task;  // a copy: the task may destroy this timer
       task();
     }
 

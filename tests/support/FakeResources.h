@@ -33,7 +33,7 @@ class FakeResources final : public Resources {
     return paths;
   }
 
-  /// The names under which property lists were asked for, the oldest first.
+  /// The names that were requested, the oldest first.
   const std::vector<std::string>& requests() const { return _requests; }
 
  private:

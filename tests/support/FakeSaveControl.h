@@ -6,7 +6,7 @@
 
 namespace varnel {
 
-/// Counts what it is asked for.
+/// Counts the requests.
 class FakeSaveControl final : public SaveControl {
  public:
   bool allowSaveButton() const override { return allows; }

@@ -12,18 +12,18 @@
 
 namespace varnel {
 
-/// A telephony service that does as the test says. It outlives its connections.
+/// A telephony service that does what the test says. It must outlive its connections.
 class FakeTelephony final : public TelephonyService {
  public:
   bool refusesConnections = false;
-  /// What each request for a log channel yields.
+  /// The answer to each request for a log channel.
   TelephonyConnection::LogChannel logChannel{0, "service.commands"};
-  /// Called while a log channel is being made, when the connection is open.
+  /// Called while a log channel is being made and the connection is open.
   std::function<void()> whileMakingLogChannel;
 
-  /// How often a connection was asked for.
+  /// How many connections were requested.
   unsigned attempts = 0;
-  /// The local ports for which a log channel was asked for, the oldest first.
+  /// The local ports of the requested log channels, the oldest first.
   std::vector<std::string> logChannelNames;
 
   std::unique_ptr<TelephonyConnection> connect(std::function<void()> notificationHandler) override {
@@ -38,7 +38,7 @@ class FakeTelephony final : public TelephonyService {
   void notify() {
     const std::vector<Connection*> open = _connections;
     for (Connection* connection : open) {
-      // A notification may close connections, this one included.
+      // A notification may close connections, including this one.
       if (std::ranges::find(_connections, connection) == _connections.end()) continue;
       const std::function<void()> handler = connection->_notificationHandler;
       handler();

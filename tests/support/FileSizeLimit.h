@@ -7,7 +7,7 @@
 
 namespace varnel {
 
-/// While it lasts no file of this process grows beyond so many bytes, as if the disk were full.
+/// While this object lives, no file of this process grows beyond the limit, as if the disk were full.
 class FileSizeLimit {
  public:
   explicit FileSizeLimit(rlim_t bytes) : _handler(std::signal(SIGXFSZ, SIG_IGN)) {

@@ -13,7 +13,7 @@
 namespace varnel {
 
 /// Message ports within one process. The test plays the peer: it delivers messages, answers requests, goes
-/// away and refuses what it likes. It outlives its ports.
+/// away, and refuses what it wants to. It must outlive its ports.
 class MemoryPorts final : public MessagePorts {
  public:
   /// One message that was sent to a remote port.
@@ -23,17 +23,17 @@ class MemoryPorts final : public MessagePorts {
     std::chrono::milliseconds timeout;
     std::optional<std::chrono::milliseconds> replyTimeout;
   };
-  /// How the peer takes a request. A reply that nobody awaits is lost.
+  /// How the peer answers a request. A reply for which nobody waits is lost.
   using Answer = std::function<RemotePort::SendResult(const Request&)>;
 
   bool refusesLocalPorts = false;
   bool refusesRemotePorts = false;
-  /// Sends that are not answered go out and bring no reply.
+  /// Without an answer function, requests are sent and get no reply.
   Answer answer;
 
-  /// Everything that was sent, the oldest first.
+  /// All sent messages, the oldest first.
   std::vector<Request> requests;
-  /// What became of the ports, the oldest first: "local NAME created", "local handler set", "local handler
+  /// What happened to the ports, the oldest first: "local NAME created", "local handler set", "local handler
   /// removed", "local delivers", "local invalidated", "local destroyed", "remote NAME created", "remote
   /// invalidated", "remote destroyed".
   std::vector<std::string> events;
@@ -53,29 +53,29 @@ class MemoryPorts final : public MessagePorts {
     return port;
   }
 
-  /// True while a local port of that name lives.
+  /// True while there is a local port with this name.
   bool hasLocalPort(std::string_view name) const { return local(name) != nullptr; }
-  /// The live local port of that name, as handlers log its address.
+  /// The local port with this name, whose address handlers log.
   const LocalPort* localPort(std::string_view name) const { return local(name); }
-  /// The remote port made last, while it exists.
+  /// The newest remote port, while it exists.
   const RemotePort* remotePort() const { return _remotes.empty() ? nullptr : _remotes.back(); }
 
-  /// Hands a message to the local port of that name and returns the reply.
+  /// Delivers a message to the local port with this name, and returns the reply.
   std::optional<Bytes> deliver(std::string_view name, std::int32_t identifier, ByteView data) {
     Local* port = local(name);
     if (!port || !port->_delivers) throw std::logic_error("no local port takes messages under that name");
-    const LocalPort::MessageHandler handler = port->_messageHandler;  // which may destroy the port
+    const LocalPort::MessageHandler handler = port->_messageHandler;  // a copy: it may destroy the port
     return call(handler, identifier, data);
   }
 
-  /// The peer of the local port of that name goes away.
+  /// The peer of the local port with this name goes away.
   void invalidateLocalPort(std::string_view name) {
     Local* port = local(name);
     if (!port) throw std::logic_error("no local port has that name");
     port->invalidate();
   }
 
-  /// The peer of every remote port goes away, which only a question for their validity tells.
+  /// The peer of every remote port goes away. Only `isValid` tells.
   void endRemotePorts() {
     for (Remote* port : _remotes) port->_isValid = false;
   }
@@ -105,7 +105,7 @@ class MemoryPorts final : public MessagePorts {
     void invalidate() override {
       if (std::erase(_ports._locals, this) == 0) return;
       _ports.note("local invalidated");
-      const InvalidationHandler handler = _invalidationHandler;  // which may destroy this port
+      const InvalidationHandler handler = _invalidationHandler;  // a copy: the handler may destroy this port
       if (handler) handler();
     }
 

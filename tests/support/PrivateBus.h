@@ -8,10 +8,10 @@
 
 namespace varnel {
 
-/// A D-Bus session bus of the test's own, on which anybody may own any name.
+/// A private D-Bus session bus for the test, on which everybody may own every name.
 class PrivateBus {
  public:
-  /// False where the machine has no bus to start.
+  /// False when the bus cannot be started on this machine.
   bool start() {
     std::ofstream(_folder.file("bus.conf"))
         << "<busconfig><type>session</type><listen>" << address()
@@ -24,7 +24,7 @@ class PrivateBus {
     return !_daemon->output().empty();
   }
   std::string address() const { return "unix:path=" + _folder.file("bus"); }
-  /// Where its socket lies, under the name that a session's bus has in its runtime folder.
+  /// The folder of its socket, which has the same name as a session's bus in its runtime folder.
   std::string folder() const { return _folder.path().string(); }
 
  private:

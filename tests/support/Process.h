@@ -20,7 +20,7 @@
 
 namespace varnel {
 
-/// A folder of its own that goes with the test.
+/// A temporary folder, which is removed with this object.
 class TemporaryFolder {
  public:
   TemporaryFolder() {
@@ -47,7 +47,7 @@ inline std::string contentsOf(const std::string& path) {
   return std::string(std::istreambuf_iterator<char>(file), {});
 }
 
-/// Waits until the condition holds; false when it does not within the time, which is to be long: other work
+/// Waits until the condition holds; false when the time is up first. The time must be long, since other work
 /// may keep every core busy.
 template <class Condition>
 bool eventually(Condition condition, std::chrono::milliseconds within = std::chrono::seconds(60)) {
@@ -59,7 +59,7 @@ bool eventually(Condition condition, std::chrono::milliseconds within = std::chr
   return true;
 }
 
-/// A terminal with nobody before it but the test. Who reads from it is told when it goes.
+/// A terminal that the test controls. Its reader learns when it goes away.
 class Terminal {
  public:
   Terminal() : _keyboard(::posix_openpt(O_RDWR | O_NOCTTY | O_CLOEXEC)) {
@@ -72,7 +72,7 @@ class Terminal {
   void type(std::string_view keys) const {
     EXPECT_EQ(::write(_keyboard, keys.data(), keys.size()), static_cast<ssize_t>(keys.size()));
   }
-  /// Whether keys are shown as they are typed, and handed on by the line.
+  /// Whether the terminal shows typed keys and passes them on line by line.
   bool showsLines() const {
     termios mode{};
     ::tcgetattr(_keyboard, &mode);
@@ -84,11 +84,12 @@ class Terminal {
   const int _keyboard;
 };
 
-/// A real program, its standard output and error in files. It is killed when the object goes.
+/// A real program with its standard output and error in files. The destructor kills it.
 class Process {
  public:
-  /// Environment: assignments ("NAME=value") and names to take out ("NAME"), on top of the test's own.
-  /// Standard input is the terminal, when there is one: that of the program, which is in its foreground.
+  /// `environment` has assignments ("NAME=value") and names to remove ("NAME"), relative to the test's own.
+  /// If there is a terminal, it is the program's standard input and controlling terminal, and the program is
+  /// in its foreground.
   Process(const std::string& program, std::vector<std::string> arguments,
           std::vector<std::string> environment = {}, const Terminal* terminal = nullptr) {
     arguments.insert(arguments.begin(), program);
@@ -121,19 +122,19 @@ class Process {
 
   void signal(int number) const { ::kill(_id, number); }
 
-  /// True when the program ends by itself within the time.
+  /// True when the program ends by itself within this time.
   bool waitForEnd(std::chrono::milliseconds within = std::chrono::seconds(120)) {
     return eventually(
         [this] { return _hasEnded || (_hasEnded = ::wait4(_id, &_status, WNOHANG, &_usage) == _id); },
         within);
   }
-  /// The exit status of a program that has ended by itself; minus the signal that ended it otherwise.
+  /// The exit status of a program that has ended by itself, or minus the number of the signal that ended it.
   int exitStatus() const { return WIFEXITED(_status) ? WEXITSTATUS(_status) : -WTERMSIG(_status); }
 
-  /// The most memory that a program that has ended had at one time, in bytes; no less than what the test
-  /// itself had when it started the program.
+  /// The highest memory use of a program that has ended, in bytes. It is at least the test's own use when it
+  /// started the program.
   std::size_t peakMemory() const { return static_cast<std::size_t>(_usage.ru_maxrss) * 1024; }
-  /// How long the processor worked for a program that has ended.
+  /// The processor time of a program that has ended.
   std::chrono::microseconds processorTime() const {
     const auto sum = [](const timeval& time) {
       return std::chrono::seconds(time.tv_sec) + std::chrono::microseconds(time.tv_usec);

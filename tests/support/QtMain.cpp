@@ -4,7 +4,7 @@
 
 #include "host/HostApplication.h"
 
-// The main of tests that need an event loop, in a locale that is not the one that programs start with.
+// The main function of tests that need an event loop, in another locale than the one in which programs start.
 int main(int argumentCount, char** arguments) {
   ::setenv("LC_ALL", "C.UTF-8", 1);
   testing::InitGoogleTest(&argumentCount, arguments);

@@ -14,7 +14,7 @@
 
 namespace varnel {
 
-/// A local socket without any manners: its bytes are the test's.
+/// A local socket that sends exactly the bytes of the test.
 class RawSocket {
  public:
   /// Connects to the socket at the path.
@@ -25,7 +25,7 @@ class RawSocket {
       ADD_FAILURE() << "cannot connect to " << path << ": " << std::strerror(errno);
     return socket;
   }
-  /// Listens at the path; connections are taken with `accept`.
+  /// Listens at the path. `accept` takes the connections.
   static RawSocket listeningAt(const std::string& path) { return boundTo(path, SOCK_STREAM); }
   /// Receives datagrams at the path, as many as the kernel keeps.
   static RawSocket receivingAt(const std::string& path) { return boundTo(path, SOCK_DGRAM); }
@@ -47,14 +47,14 @@ class RawSocket {
     }
     return true;
   }
-  /// Whatever arrives next within the time; empty when nothing does or the peer has gone.
+  /// The next bytes that arrive within the time; empty when none arrive, or when the peer has gone.
   Bytes receive(std::chrono::milliseconds within = std::chrono::seconds(60)) const {
     Bytes bytes(65536);
     const ssize_t count = waits(within) ? ::recv(_descriptor, bytes.data(), bytes.size(), 0) : ssize_t{0};
     bytes.resize(count > 0 ? static_cast<std::size_t>(count) : 0);
     return bytes;
   }
-  /// True when there is something to receive, the peer's end included, within the time.
+  /// True when there is something to receive within the time, including the end of the peer.
   bool waits(std::chrono::milliseconds within) const {
     pollfd socket{_descriptor, POLLIN, 0};
     return ::poll(&socket, 1, static_cast<int>(within.count())) > 0;

@@ -10,7 +10,7 @@
 
 namespace varnel {
 
-/// Takes every line of the system log as long as it lives.
+/// Takes every line of the system log while it lives.
 class RecordingLog final : public LogSink {
  public:
   struct Line {

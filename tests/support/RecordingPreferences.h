@@ -8,7 +8,7 @@
 
 namespace varnel {
 
-/// Preferences that remember what was done to them, the oldest first.
+/// Preferences that remember the calls, the oldest first.
 class RecordingPreferences final : public Preferences {
  public:
   void set(std::string_view domain, std::string_view key, Value value) override {

@@ -21,8 +21,8 @@ inline void PrintTo(const Size& size, std::ostream* out) {
   *out << "(" << size.width << ", " << size.height << ")";
 }
 
-/// Bold letters are 10 wide at any size and 20 high, regular ones 7 wide and 16 high, so that widths can be
-/// told by counting letters.
+/// Bold letters are 10 wide and 20 high at any size, regular ones 7 wide and 16 high. So a test gets a width
+/// by counting letters.
 class LetterMetrics final : public TextMetrics {
  public:
   Size sizeOfText(std::string_view text, const Font& font) const override {
@@ -56,7 +56,7 @@ class RecordingScrollContainer final : public ScrollContainer {
   Size contentSize;
 };
 
-/// A cell of a row that is as wide as the test says.
+/// A cell in a row of the width that the test sets.
 class RecordingCellView final : public CellView {
  public:
   RecordingCellView(CellStyle style, const Rect& row) : style(style), _row(row) {}
@@ -84,7 +84,7 @@ class RecordingCellView final : public CellView {
 
  private:
   const Rect& _row;
-  Rect _bounds;  // nothing before the first layout
+  Rect _bounds;  // empty before the first layout
 };
 
 /// A table on a screen of `visibleRows` rows.
@@ -110,11 +110,11 @@ class RecordingTable final : public TableView {
   }
   void sizeToFit() override { isSizedToFit = true; }
 
-  /// What a table does when it comes onto the screen for the first time.
+  /// What a table does when it first appears on the screen.
   void appear() {
     if (!_isLoaded) load();
   }
-  /// The user scrolls down by that many rows.
+  /// The user scrolls down by this many rows.
   void scroll(std::size_t rows) {
     _firstVisible += rows;
     showVisibleRows();
@@ -123,16 +123,16 @@ class RecordingTable final : public TableView {
     _selected = IndexPath{0, row};
     _delegate->tableView_didSelectRowAtIndexPath(*this, _selected);
   }
-  /// Selects no row at all.
+  /// Selects no row.
   void selectNothing() { _delegate->tableView_didSelectRowAtIndexPath(*this, std::nullopt); }
   const std::optional<IndexPath>& selected() const { return _selected; }
-  /// The table becomes that wide.
+  /// Changes the width of the table.
   void resize(double width) {
     content.width = width;
     for (auto& [row, cell] : _visible) cell->layOutAgain();
   }
 
-  /// Rows, as they were at the last reload.
+  /// The number of rows at the last reload.
   std::size_t rows() const { return _rows; }
   /// The cell of a visible row.
   TableCell& cell(std::size_t row) const { return *_visible.at(row); }
@@ -186,7 +186,7 @@ class RecordingTable final : public TableView {
   std::size_t _firstVisible = 0;
   std::map<std::size_t, std::unique_ptr<TableCell>> _visible;  // by row
   std::optional<IndexPath> _selected;
-  CellPool _reloaded;  // cells that were visible when a reload began; those that no row takes go
+  CellPool _reloaded;  // cells that were visible when a reload began; the table drops those that no row takes
   CellPool _pool;      // cells that were scrolled away
 };
 

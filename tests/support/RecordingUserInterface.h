@@ -11,7 +11,7 @@
 
 namespace varnel {
 
-/// What happened to what a user interface made, the oldest first.
+/// What happened to the objects of a user interface, the oldest first.
 using RecordedEvents = std::vector<std::string>;
 
 class RecordingPane final : public TablePane {
@@ -25,7 +25,8 @@ class RecordingPane final : public TablePane {
   }
   void resignFirstResponder() override { ++resignations; }
 
-  /// The toolbar in one line: "[wheel] [Connecting] [space] [Save]", a "hidden wheel" while it stands still.
+  /// The toolbar in one line: "[wheel] [Connecting] [space] [Save]". A wheel that stands still is a "hidden
+  /// wheel".
   std::string toolbarText() const {
     std::string text;
     for (const ToolbarItem& item : toolbar) text += (text.empty() ? "[" : " [") + described(item) + "]";
@@ -77,7 +78,7 @@ class RecordingModalScreen final : public ModalScreen {
   TableView* table(std::string_view outlet) override { return found(tables, outlet); }
   TextField* textField(std::string_view outlet) override { return found(fields, outlet); }
 
-  /// Presses the button of that title.
+  /// Presses the button with this title.
   void press(const std::string& title) const {
     for (const auto& row : layout.rows) {
       for (const ScreenElement& element : row) {
@@ -164,7 +165,7 @@ class RecordingStack final : public NavigationStack {
   RecordingPane& pane(std::size_t index) const {
     return static_cast<RecordingPane&>(_controllers.at(index)->pane());
   }
-  /// The pane on top.
+  /// The top pane.
   RecordingPane& pane() const { return pane(_controllers.size() - 1); }
   bool isPresenting() const { return _presented != nullptr; }
   /// The presented screen.
@@ -244,7 +245,7 @@ class RecordingUserInterface final : public UserInterface {
 
   RecordedEvents events;
   Rect windowFrame;
-  /// The stack made last; it belongs to whoever asked for it.
+  /// The newest stack. It belongs to the caller that asked for it.
   RecordingStack* stack = nullptr;
 
  private:

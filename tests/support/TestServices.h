@@ -9,7 +9,7 @@
 
 namespace varnel {
 
-/// What a generator may ask of its host, every part of it in the hands of a test. Standard output is a text.
+/// The services of a generator, all under the control of a test. Standard output is a text.
 struct TestServices {
   TestServices() = default;
   TestServices(const TestServices&) = delete;

@@ -16,16 +16,16 @@
 
 namespace varnel {
 
-/// How long something may take on a busy machine.
+/// The longest time that something may take on a busy machine.
 constexpr int patience_ms = 60'000;
 
-/// A row of a test's table: a leaf when it has a value, else an inner node.
+/// A row of a test's table: a leaf if it has a value, else an inner node.
 struct TestRow {
   std::string name;
   std::optional<std::string> value{};
 };
 
-/// A delegate that shows rows as panes do and records what it is asked for.
+/// A delegate that shows rows like a pane, and records the calls.
 class TestRows : public TableViewDelegate {
  public:
   explicit TestRows(std::vector<TestRow> rows) : rows(std::move(rows)) {}
@@ -54,7 +54,7 @@ class TestRows : public TableViewDelegate {
   }
 
   std::vector<TestRow> rows;
-  std::vector<std::size_t> asked;   ///< rows that a cell was asked for
+  std::vector<std::size_t> asked;   ///< rows for which the table asked for a cell
   std::vector<std::size_t> chosen;  ///< rows that the user has chosen
   unsigned made = 0;                ///< cells made
 
@@ -62,7 +62,7 @@ class TestRows : public TableViewDelegate {
   FontMetrics _metrics;
 };
 
-/// So many leaves named "Row 0", "Row 1", ... whose values are the given text and the number.
+/// This many leaves named "Row 0", "Row 1", and so on. Their values are the given text and the number.
 inline std::vector<TestRow> leaves(std::size_t count, const std::string& value = "") {
   std::vector<TestRow> rows;
   for (std::size_t i = 0; i < count; ++i)
@@ -70,7 +70,7 @@ inline std::vector<TestRow> leaves(std::size_t count, const std::string& value =
   return rows;
 }
 
-/// Turns a mouse's wheel over the widget, by that many logical pixels: positive is up or to the left.
+/// Turns the mouse's wheel over the widget by this many logical pixels. Positive is up or to the left.
 inline void turnWheel(QWidget& widget, const QPoint& position, const QPoint& pixels,
                       Qt::KeyboardModifiers modifiers = Qt::NoModifier) {
   QWheelEvent event(position, widget.mapToGlobal(position), QPoint(), pixels * 2, Qt::NoButton, modifiers,
@@ -90,7 +90,7 @@ class PaintCounter : public QObject {
   std::vector<QObject*> painted;
 };
 
-/// A controller that records what its stack calls; its pane's table has no rows unless a test sets some.
+/// A controller that records the calls of its stack. Its pane's table has no rows unless a test sets some.
 class TestController : public PaneController {
  public:
   TestController(std::string name, std::vector<std::string>& events)

@@ -3,7 +3,7 @@
 #include <QApplication>
 #include <cstdlib>
 
-// The main of tests that need windows, on a screen that nobody sees.
+// The main function of tests that need windows, on an invisible screen.
 int main(int argumentCount, char** arguments) {
   ::setenv("QT_QPA_PLATFORM", "offscreen", 1);
   ::setenv("LC_ALL", "C.UTF-8", 1);
