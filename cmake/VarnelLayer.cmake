@@ -18,6 +18,11 @@ if(VARNEL_SANITIZE)
     target_compile_options(varnel_options INTERFACE -Wno-maybe-uninitialized)
   endif()
 endif()
+if(VARNEL_COVERAGE)
+  # Several threads and processes count at once.
+  target_compile_options(varnel_options INTERFACE --coverage -fprofile-abs-path -fprofile-update=atomic)
+  target_link_options(varnel_options INTERFACE --coverage)
+endif()
 if(VARNEL_FUZZ)
   # Reporting every comparison to the fuzzer took a fifth of the time, and the fuzzer has a dictionary.
   target_compile_options(varnel_options INTERFACE -fsanitize=fuzzer-no-link -fno-sanitize-coverage=trace-cmp)
