@@ -12,7 +12,7 @@ constexpr double containerHeight = 50;
 const Font keyFont = Font::boldSystem(fontSize);
 const Font valueFont = Font::system(fontSize);
 
-Rect centred(double x, const Size& size, double height) {
+Rect centered(double x, const Size& size, double height) {
   return {x, (height - size.height) / 2, size.width, size.height};
 }
 
@@ -56,7 +56,7 @@ void VarnelCell::setLayout() {
   const double need = keySize.width + keyInset + gapBeforeValue + valueSize.width;
   const double behindKey = content.x + keyInset + keySize.width + gapBeforeValue;
   const double valueX = need < content.width ? content.width - valueSize.width : behindKey;
-  _value->setFrame(centred(valueX, valueSize, content.height));
+  _value->setFrame(centered(valueX, valueSize, content.height));
   // Kept: the scrolled content is wider than key and value need.
   const double contentWidth =
       need > content.width ? content.width + keySize.width + valueSize.width : content.width;
@@ -78,7 +78,7 @@ Size VarnelCell::measured(const Label* label) const { return _metrics.sizeOfText
 
 Size VarnelCell::placeKey(const Rect& content) {
   const Size size = measured(_key);
-  _key->setFrame(centred(content.x + keyInset, size, content.height));
+  _key->setFrame(centered(content.x + keyInset, size, content.height));
   return size;
 }
 

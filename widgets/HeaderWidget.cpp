@@ -4,7 +4,7 @@
 #include <array>
 #include <cmath>
 
-#include "widgets/Colours.h"
+#include "widgets/Colors.h"
 #include "widgets/QtValues.h"
 
 namespace varnel {
@@ -94,7 +94,7 @@ QRect HeaderWidget::titleRoom(int backWidth, int titleWidth) const {
 void HeaderWidget::paintEvent(QPaintEvent*) {
   QPainter painter(this);
   const double thickness = 1 / devicePixelRatioF();
-  painter.fillRect(QRectF(0, height() - thickness, width(), thickness), separatorColour(palette()));
+  painter.fillRect(QRectF(0, height() - thickness, width(), thickness), separatorColor(palette()));
 }
 
 }  // namespace varnel

@@ -6,7 +6,7 @@
 #include <cmath>
 #include <memory>
 
-#include "widgets/Colours.h"
+#include "widgets/Colors.h"
 #include "widgets/QtValues.h"
 
 namespace varnel {
@@ -76,7 +76,7 @@ void NoticeWidget::paintEvent(QPaintEvent*) {
   painter.setPen(palette().color(QPalette::Text));
   layOut(_text, width())->draw(&painter, QPointF(sideInset, upperInset));
   const double thickness = 1 / devicePixelRatioF();
-  painter.fillRect(QRectF(0, height() - thickness, width(), thickness), separatorColour(palette()));
+  painter.fillRect(QRectF(0, height() - thickness, width(), thickness), separatorColor(palette()));
 }
 
 }  // namespace varnel

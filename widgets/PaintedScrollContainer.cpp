@@ -71,7 +71,7 @@ void PaintedScrollContainer::scrollTo(double position) {
   _row.update();
 }
 
-void PaintedScrollContainer::paint(QPainter& painter, const Colours& colours) const {
+void PaintedScrollContainer::paint(QPainter& painter, const Colors& colors) const {
   painter.save();
   painter.setClipRect(qtRect(_frame));
   painter.translate(_frame.x - _position, _frame.y);
@@ -79,12 +79,12 @@ void PaintedScrollContainer::paint(QPainter& painter, const Colours& colours) co
   painter.restore();
   if (range() <= 0) return;
   for (const Edge edge : {Edge::Left, Edge::Right}) {
-    if (goesOnPast(edge)) paintMore(painter, edge, colours);
+    if (goesOnPast(edge)) paintMore(painter, edge, colors);
   }
-  paintBar(painter, colours.bar);
+  paintBar(painter, colors.bar);
 }
 
-void PaintedScrollContainer::paintMore(QPainter& painter, Edge edge, const Colours& colours) const {
+void PaintedScrollContainer::paintMore(QPainter& painter, Edge edge, const Colors& colors) const {
   painter.save();
   painter.setRenderHint(QPainter::Antialiasing);
   painter.setPen(Qt::NoPen);
@@ -92,18 +92,18 @@ void PaintedScrollContainer::paintMore(QPainter& painter, Edge edge, const Colou
   painter.translate(edge == Edge::Left ? _frame.x : _frame.x + _frame.width, _frame.y);
   if (edge == Edge::Right) painter.scale(-1, 1);
   QLinearGradient fade(dotsWidth, 0, dotsWidth + fadeWidth, 0);
-  QColor transparent = colours.ground;
+  QColor transparent = colors.ground;
   transparent.setAlpha(0);
-  fade.setColorAt(0, colours.ground);
+  fade.setColorAt(0, colors.ground);
   fade.setColorAt(1, transparent);
   painter.fillRect(QRectF(0, 0, dotsWidth + fadeWidth, _frame.height), fade);
-  painter.setBrush(colours.mark);
+  painter.setBrush(colors.mark);
   for (int dot = 1; dot <= dots; ++dot)
     painter.drawEllipse(QPointF(dot * firstDot, _frame.height / 2), dotRadius, dotRadius);
   painter.restore();
 }
 
-void PaintedScrollContainer::paintBar(QPainter& painter, const QColor& colour) const {
+void PaintedScrollContainer::paintBar(QPainter& painter, const QColor& color) const {
   const double track = _frame.width - 2 * barInset;
   const double length = std::min(track, std::max(shortestBar, track * _frame.width / _contentSize.width));
   const double left = _frame.x + barInset + (track - length) * _position / range();
@@ -111,7 +111,7 @@ void PaintedScrollContainer::paintBar(QPainter& painter, const QColor& colour) c
   painter.save();
   painter.setRenderHint(QPainter::Antialiasing);
   painter.setPen(Qt::NoPen);
-  painter.setBrush(colour);
+  painter.setBrush(color);
   painter.drawRoundedRect(QRectF(left, top, length, barThickness), barThickness / 2, barThickness / 2);
   painter.restore();
 }

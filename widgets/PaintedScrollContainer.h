@@ -14,7 +14,7 @@ namespace varnel {
 class PaintedScrollContainer final : public ScrollContainer {
  public:
   /// The colors around the texts.
-  struct Colours {
+  struct Colors {
     QColor ground;  ///< the background of the row
     QColor bar;
     QColor mark;
@@ -39,15 +39,15 @@ class PaintedScrollContainer final : public ScrollContainer {
   bool hasMoreThanFits() const;
   /// Paints the labels with the painter's pen. If it can be scrolled, also paints a thin bar below them.
   /// Texts that go on past an edge fade out there before three dots.
-  void paint(QPainter& painter, const Colours& colours) const;
+  void paint(QPainter& painter, const Colors& colors) const;
 
  private:
   enum class Edge { Left, Right };
 
   double endOfTexts() const;
   bool goesOnPast(Edge edge) const;
-  void paintMore(QPainter& painter, Edge edge, const Colours& colours) const;
-  void paintBar(QPainter& painter, const QColor& colour) const;
+  void paintMore(QPainter& painter, Edge edge, const Colors& colors) const;
+  void paintBar(QPainter& painter, const QColor& color) const;
 
   QWidget& _row;
   std::vector<std::unique_ptr<PaintedLabel>> _labels;

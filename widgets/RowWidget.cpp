@@ -7,7 +7,7 @@
 #include <algorithm>
 
 #include "platform/ui/TableView.h"
-#include "widgets/Colours.h"
+#include "widgets/Colors.h"
 #include "widgets/QtValues.h"
 
 namespace varnel {
@@ -19,11 +19,11 @@ constexpr double builtInTextSize = 15;
 constexpr double accessoryRoom = 30;
 constexpr double markStroke = 2;
 
-void stroke(QPainter& painter, const QColor& colour, const QPainterPath& path) {
+void stroke(QPainter& painter, const QColor& color, const QPainterPath& path) {
   painter.save();
   painter.setRenderHint(QPainter::Antialiasing);
   painter.setBrush(Qt::NoBrush);
-  painter.setPen(QPen(colour, markStroke, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
+  painter.setPen(QPen(color, markStroke, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
   painter.drawPath(path);
   painter.restore();
 }
@@ -151,13 +151,13 @@ void RowWidget::scrollSidewaysTo(double position) {
 
 void RowWidget::paintEvent(QPaintEvent*) {
   QPainter painter(this);
-  const QColor ground = _emphasis.isSelected ? selectionColour(palette()) : palette().color(QPalette::Base);
+  const QColor ground = _emphasis.isSelected ? selectionColor(palette()) : palette().color(QPalette::Base);
   painter.fillRect(rect(), ground);
   painter.setPen(palette().color(QPalette::Text));
   paintBuiltInText(painter);
-  const PaintedScrollContainer::Colours colours{ground, barColour(palette()), markColour(palette())};
-  _labels.paint(painter, colours);
-  for (const auto& container : _containers) container->paint(painter, colours);
+  const PaintedScrollContainer::Colors colors{ground, barColor(palette()), markColor(palette())};
+  _labels.paint(painter, colors);
+  for (const auto& container : _containers) container->paint(painter, colors);
   paintAccessory(painter);
   paintSeparator(painter);
   if (_emphasis.hasFocusFrame) paintFocusFrame(painter);
@@ -179,23 +179,23 @@ void RowWidget::paintAccessory(QPainter& painter) const {
     case CellAccessory::None:
       return;
     case CellAccessory::DisclosureIndicator:
-      return stroke(painter, markColour(palette()), disclosureIndicator(middle));
+      return stroke(painter, markColor(palette()), disclosureIndicator(middle));
     case CellAccessory::Checkmark:
-      return stroke(painter, accentColour(palette(), palette().color(QPalette::Base)), checkmark(middle));
+      return stroke(painter, accentColor(palette(), palette().color(QPalette::Base)), checkmark(middle));
   }
 }
 
 void RowWidget::paintSeparator(QPainter& painter) const {
   const double thickness = 1 / devicePixelRatioF();
   painter.fillRect(QRectF(textInset, height() - thickness, width() - textInset, thickness),
-                   separatorColour(palette()));
+                   separatorColor(palette()));
 }
 
 void RowWidget::paintFocusFrame(QPainter& painter) const {
   painter.save();
   painter.setRenderHint(QPainter::Antialiasing);
   painter.setBrush(Qt::NoBrush);
-  painter.setPen(QPen(accentColour(palette(), palette().color(QPalette::Base)), markStroke));
+  painter.setPen(QPen(accentColor(palette(), palette().color(QPalette::Base)), markStroke));
   painter.drawRoundedRect(QRectF(rect()).adjusted(2, 2, -2, -2), 4, 4);
   painter.restore();
 }

@@ -38,11 +38,11 @@ void SpinnerWidget::paintEvent(QPaintEvent*) {
   painter.setRenderHint(QPainter::Antialiasing);
   painter.translate(width() / 2.0, height() / 2.0);
   painter.rotate(360.0 / spokes * _step);
-  QColor colour = palette().color(QPalette::WindowText);
+  QColor color = palette().color(QPalette::WindowText);
   for (int spoke = 0; spoke < spokes; ++spoke) {
     // The foremost spoke is the darkest gray.
-    colour.setAlphaF(0.15F + 0.5F * static_cast<float>(spoke) / (spokes - 1));
-    painter.setPen(QPen(colour, 2, Qt::SolidLine, Qt::RoundCap));
+    color.setAlphaF(0.15F + 0.5F * static_cast<float>(spoke) / (spokes - 1));
+    painter.setPen(QPen(color, 2, Qt::SolidLine, Qt::RoundCap));
     painter.rotate(360.0 / spokes);
     painter.drawLine(QPointF(0, -4.5), QPointF(0, -8.5));
   }

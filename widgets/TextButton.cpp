@@ -5,7 +5,7 @@
 #include <QPainterPath>
 #include <cmath>
 
-#include "widgets/Colours.h"
+#include "widgets/Colors.h"
 #include "widgets/QtValues.h"
 
 namespace varnel {
@@ -38,9 +38,9 @@ QSize TextButton::minimumSizeHint() const { return {markWidth() + 2 * padding, b
 void TextButton::paintEvent(QPaintEvent*) {
   QPainter painter(this);
   painter.setRenderHint(QPainter::Antialiasing);
-  const QColor colour = accentColour(palette(), palette().color(QPalette::Window));
+  const QColor color = accentColor(palette(), palette().color(QPalette::Window));
   painter.setOpacity(isDown() ? 0.4 : 1);
-  painter.setPen(QPen(colour, 2, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
+  painter.setPen(QPen(color, 2, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
   if (_mark == Mark::Back) paintMark(painter);
   const QRect room = rect().adjusted(padding + markWidth(), 0, -padding, 0);
   painter.setFont(textFont());

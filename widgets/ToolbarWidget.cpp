@@ -5,7 +5,7 @@
 #include <algorithm>
 #include <utility>
 
-#include "widgets/Colours.h"
+#include "widgets/Colors.h"
 #include "widgets/QtValues.h"
 #include "widgets/SpinnerWidget.h"
 #include "widgets/TextButton.h"
@@ -130,7 +130,7 @@ void ToolbarWidget::fallSilent() {
 
 void ToolbarWidget::paintEvent(QPaintEvent*) {
   QPainter painter(this);
-  painter.fillRect(QRectF(0, 0, width(), 1 / devicePixelRatioF()), separatorColour(palette()));
+  painter.fillRect(QRectF(0, 0, width(), 1 / devicePixelRatioF()), separatorColor(palette()));
 }
 
 }  // namespace varnel

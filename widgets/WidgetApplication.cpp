@@ -49,7 +49,7 @@ WidgetApplication::WidgetApplication(int& argumentCount, char** arguments)
     : _application(makeApplication(argumentCount, arguments)) {
   std::setlocale(LC_NUMERIC, "C");  // the application object has set the user's locale
   QApplication::setQuitOnLastWindowClosed(false);
-  if (const auto bus = sessionBusAddress()) _colours = std::make_unique<DesktopColours>(*bus);
+  if (const auto bus = sessionBusAddress()) _colors = std::make_unique<DesktopColors>(*bus);
   QApplication::setApplicationDisplayName(QStringLiteral("Varnel"));
   // The desktop finds the installed menu entry and icon by this identity.
   const QString applicationID = QStringLiteral("org.varnel.Varnel");

@@ -10,7 +10,7 @@
 #include "app/VarnelApp.h"
 #include "host/BuildInfo.h"
 #include "programs/varnel/HostServices.h"
-#include "widgets/DesktopColours.h"
+#include "widgets/DesktopColors.h"
 #include "widgets/WidgetApplication.h"
 #include "widgets/WidgetUserInterface.h"
 
@@ -48,16 +48,16 @@ class Photographer {
   static constexpr int milliseconds = 1000;  // until a pane has slid in
 
   void take(const std::string& pane) {
-    for (const auto& [scheme, name] : {std::pair{DesktopColours::Scheme::Light, "light"},
-                                       std::pair{DesktopColours::Scheme::Dark, "dark"}}) {
-      DesktopColours::apply(scheme);
+    for (const auto& [scheme, name] :
+         {std::pair{DesktopColors::Scheme::Light, "light"}, std::pair{DesktopColors::Scheme::Dark, "dark"}}) {
+      DesktopColors::apply(scheme);
       QApplication::processEvents();
       const std::string file = _folder + "/" + pane + "-" + name + ".png";
       if (window().grab().save(QString::fromStdString(file))) continue;
       std::cerr << "varnel_screenshots: " << file << " cannot be written\n";
       _haveAll = false;
     }
-    DesktopColours::apply(DesktopColours::Scheme::Light);
+    DesktopColors::apply(DesktopColors::Scheme::Light);
   }
 
   WidgetApplication& _host;

@@ -187,7 +187,7 @@ Output outputFor(const Options& options, const Wishes& wishes) {
   return wishes.format == "json" ? Output::StatisticsJson : Output::StatisticsTable;
 }
 
-void fulfil(Options& options, const Wishes& wishes) {
+void fulfill(Options& options, const Wishes& wishes) {
   const std::string format = wishes.format.empty() ? "text" : wishes.format;
   options.output = outputFor(options, wishes);
   if (wishes.subscription) options.subscription = static_cast<std::uint8_t>(*wishes.subscription);
@@ -229,7 +229,7 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
   }
   if (const auto taken = fileTakenForPath(options, wishes)) return mistake(*taken);
   if (const auto found = conflict(options, wishes)) return mistake(*found);
-  fulfil(options, wishes);
+  fulfill(options, wishes);
   return options;
 }
 

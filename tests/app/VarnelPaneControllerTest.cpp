@@ -22,7 +22,7 @@ VarnelPaneController::Node tree(const Value& display) {
 Value display() {
   return dictionaryOf({{"Serving Cell", dictionaryOf({{"RSSI", "-71 dBm"}, {"Band", "7"}})},
                        {"State", "Idle"},
-                       {"Neighbours", Value::ofArray()}});
+                       {"Neighbors", Value::ofArray()}});
 }
 
 class VarnelPaneControllerTest : public testing::Test {
@@ -79,7 +79,7 @@ TEST_F(VarnelPaneControllerTest, ARowForEveryChild) {
   EXPECT_EQ(table().rows(), 3u);
   EXPECT_EQ(key(0), "Serving Cell");
   EXPECT_EQ(key(1), "State");
-  EXPECT_EQ(key(2), "Neighbours");
+  EXPECT_EQ(key(2), "Neighbors");
 }
 
 TEST_F(VarnelPaneControllerTest, AnInnerNodesRowShowsItsNameWithADisclosureMark) {
@@ -111,8 +111,8 @@ TEST_F(VarnelPaneControllerTest, AnInnerNodeWithoutChildrenHasAMarkAndOpensAnEmp
   show(tree(display()));
   EXPECT_EQ(accessory(2), CellAccessory::DisclosureIndicator);
   table().select(2);
-  EXPECT_EQ(pushed().path(), "/Neighbours");
-  EXPECT_EQ(userInterface.stack->pane().title, "Neighbours");
+  EXPECT_EQ(pushed().path(), "/Neighbors");
+  EXPECT_EQ(userInterface.stack->pane().title, "Neighbors");
   EXPECT_EQ(userInterface.stack->pane().table().rows(), 0u);
 }
 

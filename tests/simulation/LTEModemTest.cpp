@@ -190,7 +190,7 @@ TEST(LTEModem, TheCellMonitorHasTheLevelOfTheMeasurements) {
   EXPECT_GE(compared, 50);
 }
 
-TEST(LTEModem, IdleNeighboursEnterAndLeave) {
+TEST(LTEModem, IdleNeighborsEnterAndLeave) {
   Cell serving{};
   std::map<unsigned, std::set<unsigned>> heard;  // by carrier
   int entered = 0, left = 0;
@@ -237,7 +237,7 @@ TEST(LTEModem, IdleNeighboursEnterAndLeave) {
 
 TEST(LTEModem, ConnectedMeasurementsTellTheCellsOfTheServingCarrier) {
   Cell serving{};
-  std::set<unsigned> neighbours, detected, levels;
+  std::set<unsigned> neighbors, detected, levels;
   for (const Message& message : messages(1, 20min)) {
     if (message.code() == 0xB0C2) serving = {message.u16(16), message.u16(14)};
     if (message.code() != 0xB179) continue;
@@ -247,24 +247,24 @@ TEST(LTEModem, ConnectedMeasurementsTellTheCellsOfTheServingCarrier) {
     EXPECT_THAT(message.u16(23), AllOf(Ge(80u), Le(400u)));
     EXPECT_THAT(message.u16(25), AllOf(Ge(4u), Le(144u)));
     levels.insert(message.u16(23));
-    const unsigned neighbourCount = message.u8(27), detectedCount = message.u8(28);
-    ASSERT_EQ(message.packet.size(), 29 + 6 * neighbourCount + 2 * detectedCount);
+    const unsigned neighborCount = message.u8(27), detectedCount = message.u8(28);
+    ASSERT_EQ(message.packet.size(), 29 + 6 * neighborCount + 2 * detectedCount);
     std::set<unsigned> codes{serving.code};
-    for (std::size_t i = 0; i < neighbourCount; ++i) {
+    for (std::size_t i = 0; i < neighborCount; ++i) {
       const std::size_t record = 29 + 6 * i;
       codes.insert(message.u16(record));
-      neighbours.insert(message.u16(record));
+      neighbors.insert(message.u16(record));
       EXPECT_THAT(message.u16(record + 2), AllOf(Ge(64u), Le(400u)));
       EXPECT_THAT(message.u16(record + 4), AllOf(Ge(4u), Le(144u)));
     }
     for (std::size_t i = 0; i < detectedCount; ++i) {
-      codes.insert(message.u16(29 + 6 * neighbourCount + 2 * i));
-      detected.insert(message.u16(29 + 6 * neighbourCount + 2 * i));
+      codes.insert(message.u16(29 + 6 * neighborCount + 2 * i));
+      detected.insert(message.u16(29 + 6 * neighborCount + 2 * i));
     }
-    EXPECT_EQ(codes.size(), 1 + neighbourCount + detectedCount);
+    EXPECT_EQ(codes.size(), 1 + neighborCount + detectedCount);
     EXPECT_LE(*codes.rbegin(), 503u);
   }
-  EXPECT_GE(neighbours.size(), 10u);
+  EXPECT_GE(neighbors.size(), 10u);
   EXPECT_GE(detected.size(), 10u);
   EXPECT_GE(levels.size(), 50u);
 }
@@ -371,7 +371,7 @@ TEST(LTEModem, TheSimCardRegistersInTheServingCellsArea) {
   EXPECT_GE(locations.size(), 3u);
 }
 
-TEST(LTEModem, TheCellMonitorTellsTheServingCellAndNeighboursOfEveryTechnology) {
+TEST(LTEModem, TheCellMonitorTellsTheServingCellAndNeighborsOfEveryTechnology) {
   std::set<std::string> technologies;
   std::set<std::int64_t> levels;
   for (const Message& message : messagesOf(0xFF0001, 2min)) {

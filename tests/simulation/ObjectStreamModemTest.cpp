@@ -160,7 +160,7 @@ TEST(ObjectStreamModem, ServingCellsAreBelievableAndChange) {
   EXPECT_GE(levels.size(), 30u);
 }
 
-TEST(ObjectStreamModem, NeighboursComeStrongestFirstAndEnterAndLeave) {
+TEST(ObjectStreamModem, NeighborsComeStrongestFirstAndEnterAndLeave) {
   std::set<std::size_t> counts;
   for (const Value& picture : pictures(40min)) {
     const Array& cells = arrayAt(picture, "Neighbor Cells");

@@ -112,8 +112,8 @@ TEST(UTRANModem, TheCellMonitorAgreesWithTheModem) {
 }
 
 // A record of 0xD00A.
-struct Neighbour {
-  Neighbour(const Message& message, std::size_t record)
+struct Neighbor {
+  Neighbor(const Message& message, std::size_t record)
       : channel(message.u16(record) & 0x3FFF),
         code(message.u16(record + 1) >> 6 & 0x7F),
         level(message.u16(record + 2) >> 5 & 0xFF),
@@ -123,7 +123,7 @@ struct Neighbour {
   unsigned channel, code, level, set, isDetectedJointly;
 };
 
-TEST(UTRANModem, NeighboursAreBelievable) {
+TEST(UTRANModem, NeighborsAreBelievable) {
   unsigned state = disconnected, servingChannel = 0;
   std::set<unsigned> sets;
   for (const Message& message : messages(1, 20min)) {
@@ -135,7 +135,7 @@ TEST(UTRANModem, NeighboursAreBelievable) {
     std::set<unsigned> codes;
     unsigned active = 0;
     for (std::size_t i = 0; i < count; ++i) {
-      const Neighbour cell(message, 168 + 16 * i);
+      const Neighbor cell(message, 168 + 16 * i);
       EXPECT_THAT(cell.channel, AnyOf(10054u, 10062u, 10070u));
       // From -105 to -40 dBm, in halves above -140.
       EXPECT_THAT(cell.level, AllOf(Ge(70u), Le(200u)));
@@ -152,13 +152,13 @@ TEST(UTRANModem, NeighboursAreBelievable) {
   EXPECT_THAT(sets, UnorderedElementsAre(0u, 1u, 2u));
 }
 
-TEST(UTRANModem, NeighboursEnterAndLeave) {
+TEST(UTRANModem, NeighborsEnterAndLeave) {
   std::set<unsigned> heard, all;
   int entered = 0, left = 0;
   for (const Message& message : messagesOf(0xD00A, 5min)) {
     std::set<unsigned> codes;
     for (std::size_t record = 168; record < message.packet.size(); record += 16)
-      codes.insert(Neighbour(message, record).code);
+      codes.insert(Neighbor(message, record).code);
     for (const unsigned code : codes) entered += !heard.contains(code);
     for (const unsigned code : heard) left += !codes.contains(code);
     heard = codes;
@@ -169,7 +169,7 @@ TEST(UTRANModem, NeighboursEnterAndLeave) {
   EXPECT_GE(all.size(), 8u);
 }
 
-TEST(UTRANModem, GSMNeighboursAreBelievableAndEnterAndLeave) {
+TEST(UTRANModem, GSMNeighborsAreBelievableAndEnterAndLeave) {
   std::set<unsigned> channels, counts, validities;
   for (const Message& message : messagesOf(0xD00E, 20min)) {
     const unsigned count = message.u8(16);

@@ -9,7 +9,7 @@ namespace varnel::simulation {
 
 namespace {
 
-constexpr int neighboursOfServing = 4, neighboursOfOthers = 2;
+constexpr int neighborsOfServing = 4, neighborsOfOthers = 2;
 
 std::string_view name(Access access) {
   switch (access) {
@@ -40,8 +40,8 @@ class RecordList {
     set(record, cellMonitor::cellIdentity, cell.identity);
     addRadio(record, cell);
   }
-  void addNeighbours(const Cell& serving, Access access) {
-    auto left = access == serving.access ? neighboursOfServing : neighboursOfOthers;
+  void addNeighbors(const Cell& serving, Access access) {
+    auto left = access == serving.access ? neighborsOfServing : neighborsOfOthers;
     for (const ReceivedCell& received : _walk.cells(access)) {
       if (received.cell == &serving) continue;
       if (left-- == 0) break;
@@ -108,7 +108,7 @@ Value cellMonitorRecords(const Walk& walk, const Cell& serving) {
   RecordList list(walk);
   list.addServing(serving);
   for (const Access access : {Access::LTE, Access::UTRAN, Access::UMTS, Access::GSM})
-    list.addNeighbours(serving, access);
+    list.addNeighbors(serving, access);
   return list.records();
 }
 

@@ -9,11 +9,11 @@ namespace varnel::simulation {
 namespace {
 
 constexpr std::uint16_t connectionStateCode = 0x512C, servingCellCode = 0x5134, measurementsCode = 0x5137,
-                        neighbourIdentitiesCode = 0x51FF, mobileAllocationCode = 0x51F8,
+                        neighborIdentitiesCode = 0x51FF, mobileAllocationCode = 0x51F8,
                         dedicatedChannelCode = 0x5076, discontinuousTransmissionCode = 0x5072;
 
-constexpr std::int64_t weakestNeighbour_cdbm = -106'00, weakestIdentified_cdbm = -95'00;
-constexpr std::size_t mostNeighbours = 6;
+constexpr std::int64_t weakestNeighbor_cdbm = -106'00, weakestIdentified_cdbm = -95'00;
+constexpr std::size_t mostNeighbors = 6;
 // Broadcast by the network.
 constexpr std::int64_t minimumLevel_cdbm = -102'00, reselectionOffset_db = 4;
 
@@ -31,14 +31,14 @@ std::int64_t receiveQuality(std::int64_t level_cdbm) {
 }
 
 // The strongest first. Only the strongest cell on a channel is received.
-std::vector<ReceivedCell> neighbours(const Situation& situation) {
+std::vector<ReceivedCell> neighbors(const Situation& situation) {
   std::vector<ReceivedCell> heard;
   for (const ReceivedCell& received : situation.walk.cells(Access::GSM)) {
     const bool isDrowned = received.cell->channel == situation.serving.channel ||
                            std::ranges::any_of(heard, [&](const ReceivedCell& stronger) {
                              return stronger.cell->channel == received.cell->channel;
                            });
-    if (!isDrowned && received.level_cdbm >= weakestNeighbour_cdbm && heard.size() < mostNeighbours)
+    if (!isDrowned && received.level_cdbm >= weakestNeighbor_cdbm && heard.size() < mostNeighbors)
       heard.push_back(received);
   }
   return heard;
@@ -72,7 +72,7 @@ Bytes gsmServingCell(const Situation& situation) {
 
 Bytes gsmMeasurements(const Situation& situation, const GSMConnection& connection) {
   constexpr std::size_t headSize = 29, recordSize = 14;
-  const auto cells = neighbours(situation);
+  const auto cells = neighbors(situation);
   const std::int64_t level_cdbm = situation.walk.level_cdbm(situation.serving);
   const bool isTransferring = connection.state() == GSMConnection::State::Transfer;
   const bool isTransferringData = isTransferring && !connection.isSpeaking();
@@ -88,20 +88,20 @@ Bytes gsmMeasurements(const Situation& situation, const GSMConnection& connectio
   }
   // A phone that transfers data should rarely change its cell.
   packet.u8(26, isTransferringData).u8(28, std::ssize(cells));
-  for (const auto& [cell, neighbourLevel_cdbm] : cells)
+  for (const auto& [cell, neighborLevel_cdbm] : cells)
     packet.record(recordSize)
         .u16(0, cell->channel)
-        .u8(2, receiveLevel(neighbourLevel_cdbm))
-        .u32(3, pathLossCriterion_db(neighbourLevel_cdbm));
+        .u8(2, receiveLevel(neighborLevel_cdbm))
+        .u32(3, pathLossCriterion_db(neighborLevel_cdbm));
   return packet.finish();
 }
 
-Bytes gsmNeighbourIdentities(const Situation& situation) {
+Bytes gsmNeighborIdentities(const Situation& situation) {
   constexpr std::size_t headSize = 15, recordSize = 4;
-  auto cells = neighbours(situation);
+  auto cells = neighbors(situation);
   std::erase_if(cells,
                 [](const ReceivedCell& received) { return received.level_cdbm < weakestIdentified_cdbm; });
-  PacketWriter packet(neighbourIdentitiesCode, situation.now, headSize);
+  PacketWriter packet(neighborIdentitiesCode, situation.now, headSize);
   packet.u8(14, std::ssize(cells));
   for (const ReceivedCell& received : cells)
     packet.record(recordSize).u16(0, received.cell->channel).u8(2, received.cell->code);

@@ -16,7 +16,7 @@ Bytes gsmServingCell(const Situation& situation);
 /// The serving cell with its selection criteria, or in a call with its quality; then its neighbors.
 Bytes gsmMeasurements(const Situation& situation, const GSMConnection& connection);
 /// The identity codes of those neighbors that are strong enough.
-Bytes gsmNeighbourIdentities(const Situation& situation);
+Bytes gsmNeighborIdentities(const Situation& situation);
 
 /// The channels over which a call hops, its current channel, and whether it sends nothing between words.
 Bytes gsmMobileAllocation(const Situation& situation);

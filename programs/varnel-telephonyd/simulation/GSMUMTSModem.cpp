@@ -181,7 +181,7 @@ void GSMUMTSModem::sendGSMServingCell() { send(gsmServingCell(situation())); }
 void GSMUMTSModem::sendGSMState() { send(gsmConnectionState(situation(), _gsm)); }
 
 void GSMUMTSModem::sendGSMMeasurements() {
-  send(gsmNeighbourIdentities(situation()));
+  send(gsmNeighborIdentities(situation()));
   send(gsmMeasurements(situation(), _gsm));
 }
 

@@ -12,7 +12,7 @@ namespace {
 using namespace std::chrono_literals;
 
 constexpr std::uint16_t antennasCode = 0xB0C1, servingCellCode = 0xB0C2, connectedMeasurementCode = 0xB179,
-                        servingMeasurementCode = 0xB17F, neighboursCode = 0xB180, candidatesCode = 0xB186;
+                        servingMeasurementCode = 0xB17F, neighborsCode = 0xB180, candidatesCode = 0xB186;
 
 // Broadcast by the network.
 constexpr std::int64_t minimumLevel_dbm = -124, maximumPower_dbm = 23;
@@ -27,7 +27,7 @@ struct Scale {
   }
 };
 constexpr Scale rsrp{-140'00, 4}, rsrq{-30'00, 4}, rssi{-140'00, 2};
-constexpr Scale neighbourRSRP{-140'00, 2}, connectedRSRQ{-20'00, 8};
+constexpr Scale neighborRSRP{-140'00, 2}, connectedRSRQ{-20'00, 8};
 
 // Powers, and levels relative to the minimum, are sent in decibels above -30; minimum levels in steps of 2 dB
 // above -140 dBm; search thresholds in steps of 2 dB.
@@ -77,7 +77,7 @@ LTEModem::LTEModem(Random random) : WalkingModem(random, Access::LTE), _random(r
   repeat({.first = 30ms, .interval = 5s, .jitter = 300ms}, [this] { sendAntennas(); });
   repeatIn(Phase::Idle, {.first = 40ms, .interval = 1280ms, .jitter = 20ms},
            &LTEModem::sendServingMeasurement);
-  repeatIn(Phase::Idle, {.first = 60ms, .interval = 2560ms, .jitter = 40ms}, &LTEModem::sendNeighbours);
+  repeatIn(Phase::Idle, {.first = 60ms, .interval = 2560ms, .jitter = 40ms}, &LTEModem::sendNeighbors);
   repeatIn(Phase::Idle, {.first = 900ms, .interval = 3s, .jitter = 100ms}, &LTEModem::considerReselection);
   repeatIn(Phase::Connected, {.first = 80ms, .interval = 480ms, .jitter = 10ms},
            &LTEModem::sendConnectedMeasurement);
@@ -169,18 +169,18 @@ void LTEModem::sendServingMeasurement() {
 }
 
 // One carrier per report: the next one on which the phone receives a neighbor.
-void LTEModem::sendNeighbours() {
+void LTEModem::sendNeighbors() {
   std::vector<int> channels;
   for (const ReceivedCell& received : walk().cells(Access::LTE)) {
     if (std::ranges::count(channels, received.cell->channel) == 0) channels.push_back(received.cell->channel);
   }
   std::ranges::sort(channels);
   for (std::size_t tries = 0; tries < channels.size(); ++tries) {
-    if (sendNeighboursOn(channels[_nextCarrier++ % channels.size()])) return;
+    if (sendNeighborsOn(channels[_nextCarrier++ % channels.size()])) return;
   }
 }
 
-bool LTEModem::sendNeighboursOn(int channel) {
+bool LTEModem::sendNeighborsOn(int channel) {
   constexpr std::size_t headSize = 21, recordSize = 20, mostCells = 32;
   auto cells = measureLTECarrier(walk(), channel, _random);
   std::erase_if(cells, [this](const LTEMeasurement& measurement) {
@@ -189,7 +189,7 @@ bool LTEModem::sendNeighboursOn(int channel) {
   if (cells.empty()) return false;
   cells.resize(std::min(cells.size(), mostCells));
 
-  PacketWriter packet(neighboursCode, now(), headSize);
+  PacketWriter packet(neighborsCode, now(), headSize);
   packet
       .u8(13, 3)  // version
       .u16(17, channel)
@@ -200,8 +200,8 @@ bool LTEModem::sendNeighboursOn(int channel) {
     packet.record(recordSize)
         .bits(0, 0, 9, measurement.cell->code)
         .bits(1, 1, 8, rssi.steps(measurement.rssi_cdbm))
-        .bits(2, 1, 9, neighbourRSRP.steps(measurement.measuredRSRP_cdbm))
-        .bits(4, 0, 9, neighbourRSRP.steps(measurement.averageRSRP_cdbm))
+        .bits(2, 1, 9, neighborRSRP.steps(measurement.measuredRSRP_cdbm))
+        .bits(4, 0, 9, neighborRSRP.steps(measurement.averageRSRP_cdbm))
         .bits(5, 1, 7, rsrq.steps(measurement.measuredRSRQ_cdb))
         .bits(6, 0, 7, rsrq.steps(measurement.averageRSRQ_cdb))
         .bits(6, 7, 7, power(aboveMinimum_db(measurement.averageRSRP_cdbm)))
@@ -214,15 +214,15 @@ bool LTEModem::sendNeighboursOn(int channel) {
 }
 
 void LTEModem::sendConnectedMeasurement() {
-  constexpr std::size_t headSize = 29, neighbourSize = 6, detectedSize = 2;
+  constexpr std::size_t headSize = 29, neighborSize = 6, detectedSize = 2;
   const Cell& cell = servingCell();
   const auto carrier = measureLTECarrier(walk(), cell.channel, _random);
   const LTEMeasurement& serving = measurementOf(cell, carrier);
-  std::vector<LTEMeasurement> neighbours, detected;
+  std::vector<LTEMeasurement> neighbors, detected;
   for (const LTEMeasurement& measurement : carrier) {
     if (measurement.cell == &cell) continue;
     if (measurement.isMeasurable())
-      neighbours.push_back(measurement);
+      neighbors.push_back(measurement);
     else if (measurement.isDetectable())
       detected.push_back(measurement);
   }
@@ -235,13 +235,13 @@ void LTEModem::sendConnectedMeasurement() {
       .u16(21, now().count() % 10'240)  // subframe, counted over all frames
       .bits(23, 0, 16, rsrp.steps(serving.averageRSRP_cdbm))
       .bits(25, 0, 16, connectedRSRQ.steps(serving.averageRSRQ_cdb))
-      .u8(27, std::ssize(neighbours))
+      .u8(27, std::ssize(neighbors))
       .u8(28, std::ssize(detected));
-  for (const LTEMeasurement& neighbour : neighbours)
-    packet.record(neighbourSize)
-        .u16(0, neighbour.cell->code)
-        .bits(2, 0, 16, rsrp.steps(neighbour.averageRSRP_cdbm))
-        .bits(4, 0, 16, connectedRSRQ.steps(neighbour.averageRSRQ_cdb));
+  for (const LTEMeasurement& neighbor : neighbors)
+    packet.record(neighborSize)
+        .u16(0, neighbor.cell->code)
+        .bits(2, 0, 16, rsrp.steps(neighbor.averageRSRP_cdbm))
+        .bits(4, 0, 16, connectedRSRQ.steps(neighbor.averageRSRQ_cdb));
   for (const LTEMeasurement& found : detected) packet.record(detectedSize).u16(0, found.cell->code);
   send(packet.finish());
 }

@@ -26,8 +26,8 @@ class LTEModem final : public WalkingModem {
   void sendServingCell();
   void sendAntennas();
   void sendServingMeasurement();
-  void sendNeighbours();
-  bool sendNeighboursOn(int channel);
+  void sendNeighbors();
+  bool sendNeighborsOn(int channel);
   void sendConnectedMeasurement();
   void sendReselectionCandidate(const Cell& serving, const Cell& candidate);
   void considerReselection();

@@ -15,8 +15,8 @@ using Kind = PhoneActivity::Kind;
 
 // Broadcast by the network, and properties of the phone.
 constexpr std::int64_t minimumLevel_dbm = -104, mostPower_dbm = 33, leastPower_dbm = 5;
-constexpr std::int64_t weakestNeighbour_dbm = -100;
-constexpr std::size_t mostNeighbours = 6;
+constexpr std::int64_t weakestNeighbor_dbm = -100;
+constexpr std::size_t mostNeighbors = 6;
 constexpr std::int64_t farAway_dbm = -85;  // farther than the 550 m of one step of the timing advance
 
 [[gnu::format(printf, 1, 2)]] std::string text(const char* format, ...) {
@@ -65,7 +65,7 @@ class Picture {
     Dictionary& sections = *picture.dictionary();
     sections.set("Picture", typed("Header", header()));
     sections.set("Serving Cell", servingCell());
-    sections.set("Neighbor Cells", neighbours());
+    sections.set("Neighbor Cells", neighbors());
     sections.set("Radio Resources", radioResources());
     sections.set("Mobility Management", mobility());
     sections.set("Packet Data", packets());
@@ -102,17 +102,17 @@ class Picture {
   }
 
   // An array, since the number of neighbors varies.
-  Value neighbours() const {
+  Value neighbors() const {
     Value list = Value::ofArray({"Neighbor Cell"});
     for (const ReceivedCell& received : _view.walk.cells(Access::GSM)) {
       const std::int64_t level_dbm = received.level_cdbm / 100;
       if (received.cell == &_view.serving) continue;
-      if (level_dbm < weakestNeighbour_dbm || list.array()->size() > mostNeighbours) break;
-      list.array()->push_back(neighbour(*received.cell, level_dbm));
+      if (level_dbm < weakestNeighbor_dbm || list.array()->size() > mostNeighbors) break;
+      list.array()->push_back(neighbor(*received.cell, level_dbm));
     }
     return list;
   }
-  static Value neighbour(const Cell& cell, std::int64_t level_dbm) {
+  static Value neighbor(const Cell& cell, std::int64_t level_dbm) {
     Value row = Value::ofDictionary();
     Dictionary& rows = *row.dictionary();
     rows.set("ARFCN", number(cell.channel));

@@ -13,10 +13,10 @@ namespace {
 using namespace std::chrono_literals;
 using State = UTRANConnection::State;
 
-constexpr std::uint16_t neighboursCode = 0xD00A, channelsCode = 0xD00C, gsmNeighboursCode = 0xD00E,
+constexpr std::uint16_t neighborsCode = 0xD00A, channelsCode = 0xD00C, gsmNeighborsCode = 0xD00E,
                         stateCode = 0xD0E0, servingCellCode = 0xD0E2;
 
-constexpr std::int64_t weakestNeighbour_cdbm = -105'00;
+constexpr std::int64_t weakestNeighbor_cdbm = -105'00;
 constexpr std::int64_t weakestGSM_cdbm = -100'00, weakestIdentified_cdbm = -92'00;
 // The list of neighbors reaches to the next site.
 constexpr std::int64_t listedDistance_cm = 260'00;
@@ -51,8 +51,8 @@ UTRANModem::UTRANModem(Random random)
     : WalkingModem(random, Access::UTRAN), _random(random.fork()), _connection(random.fork()) {
   repeat({.first = 20ms, .interval = 4s, .jitter = 300ms}, [this] { sendServingCell(); });
   repeat({.first = 30ms, .interval = 5s, .jitter = 100ms}, [this] { sendState(); });
-  repeat({.first = 40ms, .interval = 2s, .jitter = 100ms}, [this] { sendNeighbours(); });
-  repeat({.first = 60ms, .interval = 3s, .jitter = 100ms}, [this] { sendGSMNeighbours(); });
+  repeat({.first = 40ms, .interval = 2s, .jitter = 100ms}, [this] { sendNeighbors(); });
+  repeat({.first = 60ms, .interval = 3s, .jitter = 100ms}, [this] { sendGSMNeighbors(); });
   repeat({.first = 80ms, .interval = 1s, .jitter = 30ms}, [this] {
     if (_connection.hasChannels()) sendChannels();
   });
@@ -67,7 +67,7 @@ void UTRANModem::stepWalked() {
 void UTRANModem::servingCellChanged(const Cell& previous) {
   using Area = UTRANConnection::Area;
   sendServingCell();
-  sendNeighbours();
+  sendNeighbors();
   const Area area = servingCell().area == previous.area ? Area::Same : Area::Another;
   if (_connection.cellChanged(now(), area)) stateChanged();
 }
@@ -101,12 +101,12 @@ void UTRANModem::sendServingCell() {
 }
 
 // The records always begin at the same place.
-void UTRANModem::sendNeighbours() {
+void UTRANModem::sendNeighbors() {
   constexpr std::size_t headSize = 168, recordSize = 16;
   auto cells = walk().cells(Access::UTRAN);
   std::erase_if(cells, [this](const ReceivedCell& received) { return !isHeard(received); });
 
-  PacketWriter packet(neighboursCode, now(), headSize);
+  PacketWriter packet(neighborsCode, now(), headSize);
   packet
       .u8(13, 1)  // version
       .bits(16, 1, 7, std::ssize(cells));
@@ -123,7 +123,7 @@ void UTRANModem::sendNeighbours() {
 // Only on a dedicated channel does the phone tell apart cells that are not in the list. The serving cell
 // counts as one only while it is active.
 bool UTRANModem::isHeard(const ReceivedCell& received) const {
-  if (received.level_cdbm < weakestNeighbour_cdbm) return false;
+  if (received.level_cdbm < weakestNeighbor_cdbm) return false;
   if (received.cell == &servingCell()) return _connection.hasChannels();
   return setOf(*received.cell) == CellSet::Monitored || _connection.state() == State::CellDCH;
 }
@@ -134,12 +134,12 @@ UTRANModem::CellSet UTRANModem::setOf(const Cell& cell) const {
                                                                       : CellSet::Detected;
 }
 
-void UTRANModem::sendGSMNeighbours() {
+void UTRANModem::sendGSMNeighbors() {
   constexpr std::size_t headSize = 17, recordSize = 8;
   auto cells = walk().cells(Access::GSM);
   std::erase_if(cells, [](const ReceivedCell& received) { return received.level_cdbm < weakestGSM_cdbm; });
 
-  PacketWriter packet(gsmNeighboursCode, now(), headSize);
+  PacketWriter packet(gsmNeighborsCode, now(), headSize);
   packet
       .u8(13, 1)  // version
       .u8(16, std::ssize(cells));

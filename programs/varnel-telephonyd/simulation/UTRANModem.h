@@ -25,8 +25,8 @@ class UTRANModem final : public WalkingModem {
   void stateChanged();
   void sendState();
   void sendServingCell();
-  void sendNeighbours();
-  void sendGSMNeighbours();
+  void sendNeighbors();
+  void sendGSMNeighbors();
   void sendChannels();
   std::int64_t signalToInterference_cdb();
   CellSet setOf(const Cell& cell) const;

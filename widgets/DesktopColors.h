@@ -10,7 +10,7 @@ namespace varnel {
 /// Follows the desktop's light or dark scheme where the toolkit does not. It asks the desktop's settings
 /// portal (org.freedesktop.portal.Settings, "color-scheme") and listens to its changes. Without a portal the
 /// toolkit's colors stay.
-class DesktopColours final : public QObject {
+class DesktopColors final : public QObject {
   Q_OBJECT
 
  public:
@@ -19,8 +19,8 @@ class DesktopColours final : public QObject {
 
   /// Asks on the bus with this address, the user's session bus. It does not wait: a bus that does not answer
   /// leaves the colors as they are.
-  explicit DesktopColours(const std::string& busAddress);
-  ~DesktopColours() override;
+  explicit DesktopColors(const std::string& busAddress);
+  ~DesktopColors() override;
 
   /// Gives the application the colors of this scheme.
   static void apply(Scheme scheme);

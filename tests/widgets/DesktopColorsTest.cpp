@@ -1,4 +1,4 @@
-#include "widgets/DesktopColours.h"
+#include "widgets/DesktopColors.h"
 
 #include <gtest/gtest.h>
 
@@ -7,7 +7,7 @@
 #include <QTest>
 
 #include "tests/support/PrivateBus.h"
-#include "widgets/Colours.h"
+#include "widgets/Colors.h"
 
 namespace varnel {
 
@@ -41,26 +41,26 @@ constexpr int patience_ms = 60'000;
 
 bool isDark() { return QApplication::palette().color(QPalette::Base).lightness() < 60; }
 
-class DesktopColoursTest : public testing::Test {
+class DesktopColorsTest : public testing::Test {
  protected:
-  ~DesktopColoursTest() override { QApplication::setPalette(QPalette()); }
+  ~DesktopColorsTest() override { QApplication::setPalette(QPalette()); }
 };
 
-TEST_F(DesktopColoursTest, DarkAndBackAgain) {
+TEST_F(DesktopColorsTest, DarkAndBackAgain) {
   const QColor light = QApplication::palette().color(QPalette::Base);
   ASSERT_GT(light.lightness(), 200);
-  DesktopColours::apply(DesktopColours::Scheme::Dark);
+  DesktopColors::apply(DesktopColors::Scheme::Dark);
   const QPalette dark = QApplication::palette();
   EXPECT_TRUE(isDark());
   EXPECT_GT(contrast(dark.color(QPalette::Base), dark.color(QPalette::Text)), 7);
   EXPECT_GT(contrast(dark.color(QPalette::Window), dark.color(QPalette::WindowText)), 7);
-  DesktopColours::apply(DesktopColours::Scheme::NoPreference);
+  DesktopColors::apply(DesktopColors::Scheme::NoPreference);
   EXPECT_EQ(QApplication::palette().color(QPalette::Base), light);
-  DesktopColours::apply(DesktopColours::Scheme::Light);
+  DesktopColors::apply(DesktopColors::Scheme::Light);
   EXPECT_EQ(QApplication::palette().color(QPalette::Base), light);
 }
 
-TEST_F(DesktopColoursTest, FollowsTheDesktopsPortal) {
+TEST_F(DesktopColorsTest, FollowsTheDesktopsPortal) {
   PrivateBus bus;
   ASSERT_TRUE(bus.start()) << "dbus-daemon is needed";
   // The session bus of the program. Nothing else here uses it.
@@ -68,12 +68,12 @@ TEST_F(DesktopColoursTest, FollowsTheDesktopsPortal) {
   const QDBusConnection connection = QDBusConnection::sessionBus();
   ASSERT_TRUE(connection.isConnected());
   {
-    const DesktopColours colours(bus.address());
+    const DesktopColors colors(bus.address());
     QTest::qWait(100);
     EXPECT_FALSE(isDark()) << "there is no portal";
   }
   FakePortal portal(connection);
-  const DesktopColours colours(bus.address());
+  const DesktopColors colors(bus.address());
   EXPECT_TRUE(QTest::qWaitFor(isDark, patience_ms)) << "what the portal says at first";
   portal.change(2);
   EXPECT_TRUE(QTest::qWaitFor([] { return !isDark(); }, patience_ms));
@@ -84,4 +84,4 @@ TEST_F(DesktopColoursTest, FollowsTheDesktopsPortal) {
 }  // namespace
 }  // namespace varnel
 
-#include "DesktopColoursTest.moc"
+#include "DesktopColorsTest.moc"

@@ -14,14 +14,14 @@ QColor blend(const QColor& from, const QColor& to, double share);
 double contrast(const QColor& one, const QColor& other);
 
 /// Lines between rows and along bars.
-QColor separatorColour(const QPalette& palette);
+QColor separatorColor(const QPalette& palette);
 /// Scroll bars within rows.
-QColor barColour(const QPalette& palette);
+QColor barColor(const QPalette& palette);
 /// Marks that are less prominent than text.
-QColor markColour(const QPalette& palette);
+QColor markColor(const QPalette& palette);
 /// The ground of the selected row. The text on it keeps its color.
-QColor selectionColour(const QPalette& palette);
+QColor selectionColor(const QPalette& palette);
 /// Things that can be pressed: the desktop's highlight color, made readable on this ground.
-QColor accentColour(const QPalette& palette, const QColor& ground);
+QColor accentColor(const QPalette& palette, const QColor& ground);
 
 }  // namespace varnel

@@ -1,4 +1,4 @@
-#include "widgets/Colours.h"
+#include "widgets/Colors.h"
 
 #include <algorithm>
 #include <cmath>
@@ -14,8 +14,8 @@ double linear(double channel) {
   return channel <= 0.04045 ? channel / 12.92 : std::pow((channel + 0.055) / 1.055, 2.4);
 }
 
-double luminance(const QColor& colour) {
-  return 0.2126 * linear(colour.redF()) + 0.7152 * linear(colour.greenF()) + 0.0722 * linear(colour.blueF());
+double luminance(const QColor& color) {
+  return 0.2126 * linear(color.redF()) + 0.7152 * linear(color.greenF()) + 0.0722 * linear(color.blueF());
 }
 
 }  // namespace
@@ -33,23 +33,23 @@ double contrast(const QColor& one, const QColor& other) {
   return (light + 0.05) / (dark + 0.05);
 }
 
-QColor separatorColour(const QPalette& palette) {
+QColor separatorColor(const QPalette& palette) {
   return blend(palette.color(QPalette::Base), palette.color(QPalette::Text), 0.16);
 }
 
-QColor barColour(const QPalette& palette) {
+QColor barColor(const QPalette& palette) {
   return blend(palette.color(QPalette::Base), palette.color(QPalette::Text), 0.3);
 }
 
-QColor markColour(const QPalette& palette) {
+QColor markColor(const QPalette& palette) {
   return blend(palette.color(QPalette::Base), palette.color(QPalette::Text), 0.5);
 }
 
-QColor selectionColour(const QPalette& palette) {
+QColor selectionColor(const QPalette& palette) {
   return blend(palette.color(QPalette::Base), palette.color(QPalette::Highlight), 0.3);
 }
 
-QColor accentColour(const QPalette& palette, const QColor& ground) {
+QColor accentColor(const QPalette& palette, const QColor& ground) {
   const QColor highlight = palette.color(QPalette::Highlight);
   const QColor text = palette.color(QPalette::WindowText);
   double share = 0;

@@ -1,4 +1,4 @@
-#include "widgets/Colours.h"
+#include "widgets/Colors.h"
 
 #include <gtest/gtest.h>
 
@@ -7,13 +7,13 @@
 namespace varnel {
 namespace {
 
-TEST(Colours, ContrastOfBlackAndWhiteIs21) {
+TEST(Colors, ContrastOfBlackAndWhiteIs21) {
   EXPECT_NEAR(contrast(Qt::black, Qt::white), 21.0, 0.001);
   EXPECT_NEAR(contrast(Qt::white, Qt::white), 1.0, 0.001);
   EXPECT_NEAR(contrast(QColor(0x77, 0x77, 0x77), Qt::white), 4.48, 0.01);
 }
 
-TEST(Colours, ABlendGoesPartOfTheWay) {
+TEST(Colors, ABlendGoesPartOfTheWay) {
   EXPECT_EQ(blend(QColor(0, 100, 200), QColor(100, 100, 0), 0.5).rgb(), qRgb(50, 100, 100));
 }
 

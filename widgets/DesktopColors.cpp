@@ -1,4 +1,4 @@
-#include "widgets/DesktopColours.h"
+#include "widgets/DesktopColors.h"
 
 #include <QApplication>
 #include <QDBusMessage>
@@ -14,9 +14,9 @@ const QString service = QStringLiteral("org.freedesktop.portal.Desktop");
 const QString objectPath = QStringLiteral("/org/freedesktop/portal/desktop");
 const QString interface = QStringLiteral("org.freedesktop.portal.Settings");
 const QString appearance = QStringLiteral("org.freedesktop.appearance");
-const QString colourScheme = QStringLiteral("color-scheme");
+const QString colorScheme = QStringLiteral("color-scheme");
 
-const QString connectionName = QStringLiteral("varnel-colours");
+const QString connectionName = QStringLiteral("varnel-colors");
 
 QDBusMessage busMethod(const QString& name) {
   const QString bus = QStringLiteral("org.freedesktop.DBus");
@@ -24,10 +24,10 @@ QDBusMessage busMethod(const QString& name) {
 }
 
 // The number inside a variant, which may be inside other variants.
-DesktopColours::Scheme schemeIn(QVariant value) {
+DesktopColors::Scheme schemeIn(QVariant value) {
   while (value.metaType() == QMetaType::fromType<QDBusVariant>())
     value = value.value<QDBusVariant>().variant();
-  return static_cast<DesktopColours::Scheme>(value.toUInt());
+  return static_cast<DesktopColors::Scheme>(value.toUInt());
 }
 
 // The style derives the palette's other colors from these.
@@ -43,14 +43,14 @@ QPalette darkPalette() {
 
 // A bus connection of the toolkit would wait for the bus. So this class connects to the bus as to any peer,
 // and sends the first message itself.
-DesktopColours::DesktopColours(const std::string& busAddress)
+DesktopColors::DesktopColors(const std::string& busAddress)
     : _bus(QDBusConnection::connectToPeer(QString::fromStdString(busAddress), connectionName)) {
   if (_bus.isConnected()) introduceItself();
 }
 
-DesktopColours::~DesktopColours() { QDBusConnection::disconnectFromPeer(connectionName); }
+DesktopColors::~DesktopColors() { QDBusConnection::disconnectFromPeer(connectionName); }
 
-void DesktopColours::introduceItself() {
+void DesktopColors::introduceItself() {
   auto* const watcher = new QDBusPendingCallWatcher(_bus.asyncCall(busMethod(QStringLiteral("Hello"))), this);
   connect(watcher, &QDBusPendingCallWatcher::finished, this, [this, watcher] {
     watcher->deleteLater();
@@ -60,7 +60,7 @@ void DesktopColours::introduceItself() {
   });
 }
 
-void DesktopColours::listen() {
+void DesktopColors::listen() {
   _bus.connect(QString(), objectPath, interface, QStringLiteral("SettingChanged"), this,
                SLOT(settingChanged(QString, QString, QDBusVariant)));
   QDBusMessage wish = busMethod(QStringLiteral("AddMatch"));
@@ -70,10 +70,10 @@ void DesktopColours::listen() {
   _bus.asyncCall(wish);
 }
 
-void DesktopColours::ask() {
+void DesktopColors::ask() {
   QDBusMessage question =
       QDBusMessage::createMethodCall(service, objectPath, interface, QStringLiteral("Read"));
-  question << appearance << colourScheme;
+  question << appearance << colorScheme;
   auto* const watcher = new QDBusPendingCallWatcher(_bus.asyncCall(question), this);
   connect(watcher, &QDBusPendingCallWatcher::finished, this, [watcher] {
     watcher->deleteLater();
@@ -82,11 +82,11 @@ void DesktopColours::ask() {
   });
 }
 
-void DesktopColours::settingChanged(const QString& group, const QString& key, const QDBusVariant& value) {
-  if (group == appearance && key == colourScheme) apply(schemeIn(value.variant()));
+void DesktopColors::settingChanged(const QString& group, const QString& key, const QDBusVariant& value) {
+  if (group == appearance && key == colorScheme) apply(schemeIn(value.variant()));
 }
 
-void DesktopColours::apply(Scheme scheme) {
+void DesktopColors::apply(Scheme scheme) {
   // Restores the toolkit's own palette, which may be dark already.
   QApplication::setPalette(QPalette());
   constexpr int halfLight = 128;
