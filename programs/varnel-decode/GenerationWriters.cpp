@@ -4,6 +4,7 @@
 
 #include "host/Printable.h"
 #include "model/VarnelModelNode.h"
+#include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/StandardOutput.h"
 #include "programs/varnel-decode/Timestamps.h"
 #include "programs/varnel-decode/TreeWriters.h"
@@ -89,6 +90,7 @@ ValueTable::ValueTable(std::FILE* output, const std::vector<std::string>& paths,
 }
 
 void ValueTable::take(const Generation& generation) {
+  _hasEmptyTimes |= generation.dating == Dating::Unknown;
   std::string values;
   for (const Column& column : _columns) values += ',' + csvField(valueIn(column, generation));
   if (_style.displays == Displays::Changed && _before == values) return;
@@ -96,6 +98,12 @@ void ValueTable::take(const Generation& generation) {
   if (generation.dating == Dating::Known) line += timestamp(generation.time);
   writeOutput(_output, line + values + '\n');
   _before = std::move(values);
+}
+
+void ValueTable::finish(const std::string& inputName) {
+  if (!_hasEmptyTimes || std::ranges::find(_columns, elapsedPath, &Column::path) != _columns.end()) return;
+  tell("the modem of " + inputName +
+       " knew no date, so rows have no time; the path Elapsed gives the seconds since the first record");
 }
 
 std::string ValueTable::valueIn(const Column& column, const Generation& generation) const {
@@ -108,11 +116,30 @@ std::string ValueTable::valueIn(const Column& column, const Generation& generati
 }
 
 void SeenPaths::take(const Generation& generation) {
+  _isAnyShown = true;
   std::erase_if(_unseen, [&](const std::string& path) {
     return treePath(path) == elapsedPath ||
            leafValueUnderPath(generation.display, treePath(path)).has_value();
   });
   if (!_unseen.empty()) _shown.take(generation.display);
+}
+
+// The phone may never have met such a cell. More likely, the name was mistyped.
+void SeenPaths::finish(const std::string& inputName) {
+  if (!_isAnyShown || _guess.isNeeded()) return;
+  for (const std::string& path : _unseen)
+    tell("no display of " + inputName + " has a value under '" + path + "'; " + adviceFor(path));
+}
+
+std::string SeenPaths::adviceFor(const std::string& path) const {
+  const auto nearest = nearestTo(path);
+  if (nearest.empty()) return "--format paths shows what there is";
+  std::string advice = "did you mean ";
+  for (std::size_t i = 0; i < nearest.size(); ++i) {
+    if (i > 0) advice += i + 1 < nearest.size() ? ", " : " or ";
+    advice.append("'").append(nearest[i]).append("'");
+  }
+  return advice + "?";
 }
 
 }  // namespace varnel

@@ -10,6 +10,7 @@
 #include "programs/varnel-decode/DisplayJson.h"
 #include "programs/varnel-decode/Generation.h"
 #include "programs/varnel-decode/NearestPaths.h"
+#include "programs/varnel-decode/TechnologyGuess.h"
 
 namespace varnel {
 
@@ -17,8 +18,11 @@ namespace varnel {
 class GenerationSink {
  public:
   virtual ~GenerationSink() = default;
-  /// Throws std::runtime_error when the program should not go on.
+  /// Throws std::runtime_error after a failure; the sink gets no more generations then.
   virtual void take(const Generation& generation) = 0;
+  /// The capture or snapshot of that name has no more generations. Writes and tells what follows from all of
+  /// them. Throws std::runtime_error after a failure.
+  virtual void finish(const std::string& /*inputName*/) {}
 };
 
 /// Turns the path of a node as users write it ("Section/Label") into the path in the tree ("/Section/Label").
@@ -79,6 +83,8 @@ class ValueTable final : public GenerationSink {
   ValueTable(std::FILE* output, const std::vector<std::string>& paths, std::optional<std::string> captureName,
              WritingStyle style, const NumberFormats& formats);
   void take(const Generation& generation) override;
+  /// Tells which path gives a time when rows have none.
+  void finish(const std::string& inputName) override;
 
  private:
   struct Column {
@@ -92,13 +98,19 @@ class ValueTable final : public GenerationSink {
   std::optional<std::string> _captureName;
   const WritingStyle _style;
   std::optional<std::string> _before;  // the values of the last row
+  bool _hasEmptyTimes = false;
 };
 
 /// Notes which of the paths have had a value.
 class SeenPaths final : public GenerationSink {
  public:
-  explicit SeenPaths(std::vector<std::string> paths) : _unseen(std::move(paths)) {}
+  /// The guess must outlive the sink.
+  SeenPaths(std::vector<std::string> paths, const TechnologyGuess& guess)
+      : _unseen(std::move(paths)), _guess(guess) {}
   void take(const Generation& generation) override;
+  /// Tells each path without a value, and the paths that it may mean. Says nothing when there was no display,
+  /// or when the guess is needed: then another line says why.
+  void finish(const std::string& inputName) override;
 
   /// The paths that had a value in no display, as they were given.
   const std::vector<std::string>& unseen() const { return _unseen; }
@@ -106,8 +118,12 @@ class SeenPaths final : public GenerationSink {
   std::vector<std::string> nearestTo(std::string_view path) const { return _shown.to(path); }
 
  private:
+  std::string adviceFor(const std::string& path) const;
+
   std::vector<std::string> _unseen;
+  const TechnologyGuess& _guess;
   NearestPaths _shown;
+  bool _isAnyShown = false;
 };
 
 }  // namespace varnel

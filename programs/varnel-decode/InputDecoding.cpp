@@ -5,7 +5,6 @@
 #include <memory>
 #include <optional>
 #include <stdexcept>
-#include <system_error>
 #include <vector>
 
 #include "LogGenerator/LogGenerator.h"
@@ -15,13 +14,13 @@
 #include "host/FileResources.h"
 #include "host/HostLog.h"
 #include "host/Printable.h"
-#include "host/WholeFile.h"
 #include "host/captures/Capture.h"
 #include "programs/varnel-decode/ElapsedTime.h"
+#include "programs/varnel-decode/FileOutput.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/MessageStatistics.h"
 #include "programs/varnel-decode/OfflineDecoder.h"
-#include "programs/varnel-decode/PlotRecorder.h"
+#include "programs/varnel-decode/Picture.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/ProgressBar.h"
 #include "programs/varnel-decode/RecordOutputs.h"
@@ -38,15 +37,6 @@ namespace {
 
 constexpr int generalError = 1;
 
-void writeFile(const std::string& path, ByteView bytes) {
-  if (const auto failure = writeOutputFile(path, bytes))
-    throw std::system_error(failure, "cannot write " + path);
-}
-
-ByteView bytesOf(const std::string& text) {
-  return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
-}
-
 // What the options ask for, of one capture or snapshot.
 class InputDecoding {
  public:
@@ -55,11 +45,9 @@ class InputDecoding {
         _path(options.captures[index]),
         _name(captureName(_path)),
         _isFirst(index == 0),
-        _seen(watchedPaths(options)),
         _subscriptions(options.subscription),
         _outputs(options) {
     if (options.captures.size() > 1) _captureName = _path;
-    if (options.plot) _recorder.emplace(options.plot->paths);
   }
 
   int run(const DecodingServices& services) {
@@ -77,19 +65,22 @@ class InputDecoding {
   }
 
  private:
-  static std::vector<std::string> watchedPaths(const Options& options) {
-    std::vector<std::string> paths = options.tablePaths;
-    if (options.plot) paths.insert(paths.end(), options.plot->paths.begin(), options.plot->paths.end());
-    return paths;
-  }
+  struct Sink {
+    std::unique_ptr<GenerationSink> sink;
+    bool hasFailed = false;
+  };
 
-  void startStream(const std::optional<std::string>& technology, const DecodingServices& services) {
+  void addSinks(const std::optional<std::string>& technology, const DecodingServices& services) {
     _formats = formatsFor(_options, technology, services);
+    const auto add = [this](auto sink) { _sinks.push_back({std::move(sink)}); };
+    std::vector<std::string> paths = _options.tablePaths;
+    if (_options.plot) paths.insert(paths.end(), _options.plot->paths.begin(), _options.plot->paths.end());
+    if (!paths.empty()) add(std::make_unique<SeenPaths>(paths, _guess));
     if (_options.output == Output::EveryDisplay)
-      _streamed = std::make_unique<EveryDisplay>(stdout, _captureName, _options.style, _formats);
+      add(std::make_unique<EveryDisplay>(stdout, _captureName, _options.style, _formats));
     if (_options.output == Output::ValueTable)
-      _streamed =
-          std::make_unique<ValueTable>(stdout, _options.tablePaths, _captureName, _options.style, _formats);
+      add(std::make_unique<ValueTable>(stdout, _options.tablePaths, _captureName, _options.style, _formats));
+    if (_options.plot) add(std::make_unique<Picture>(*_options.plot));
   }
 
   // What the user says overrules what the capture says.
@@ -106,7 +97,7 @@ class InputDecoding {
     const auto technology = technologyOf(capture, _options, services.technologies);
     if (!technology)
       return mistake("--technology is needed to decode " + _name + ", a capture that names none").code;
-    startStream(technology, services);
+    addSinks(technology, services);
     const int status = decodeCaptureOf(*technology, capture, services);
     tellGuess(*technology, services);
     return status;
@@ -133,7 +124,7 @@ class InputDecoding {
       if (_options.snapshotPath) isDone &= succeeds([&] { writeSnapshotFile(end, items); });
       isDone &= writeBinaryLog(items);
     }
-    isDone &= drawPicture();
+    isDone &= finishSinks();
     isDone &= succeeds([&] { writeSummary(display); });
     return isDone && !_isOutputBroken ? 0 : generalError;
   }
@@ -156,7 +147,7 @@ class InputDecoding {
   // Whether nobody wants to see what the records say.
   bool isConvertingAlone() const {
     return !_outputs.areNone() && _options.output == Output::Display &&
-           _options.writeDisplay == displayAsNothing && !_recorder && !isSaving();
+           _options.writeDisplay == displayAsNothing && !_options.plot && !isSaving();
   }
 
   int convert(Capture& capture) {
@@ -213,49 +204,52 @@ class InputDecoding {
     tell(_guess.sentence(_name, technology, services.technologies, services.services));
   }
 
+  // What an option asks for that only captures have.
+  std::optional<std::string> wishForCapture() const {
+    if (countsMessages()) return "--stats counts the messages of captures";
+    if (!_outputs.areNone()) return "--records, --pcap and --framed write the records of captures";
+    if (_options.subscription) return "--sim chooses among the records of captures";
+    if (_options.snapshotPath) return "--snapshot saves what was decoded of a capture";
+    return std::nullopt;
+  }
+
   int showSnapshot(ByteWindow& bytes, const DecodingServices& services) {
-    startStream(_options.technology, services);
-    if (countsMessages())
-      return mistake("--stats counts the messages of captures, but " + _name + " is a snapshot").code;
-    if (!_outputs.areNone())
-      return mistake("--records, --pcap and --framed write the records of captures, but " + _name +
-                     " is a snapshot")
-          .code;
-    if (_options.subscription)
-      return mistake("--sim chooses among the records of captures, but " + _name + " is a snapshot").code;
-    if (_options.snapshotPath)
-      return mistake("--snapshot saves what was decoded of a capture, but " + _name + " is a snapshot").code;
+    if (const auto wish = wishForCapture()) return mistake(*wish + ", but " + _name + " is a snapshot").code;
+    addSinks(_options.technology, services);
     std::optional<SnapshotFile> snapshot;
     if (!succeeds([&] { snapshot.emplace(bytes, _name); })) return generalError;
-    bool isDone = !wantsGenerations() || succeeds([&] {
-      for (const Generation& generation : snapshot->generations()) {
-        _elapsed.record(generation.time);
-        report(generation);
-      }
-    });
+    bool isDone = _sinks.empty() || succeeds([&] {
+                    for (const Generation& generation : snapshot->generations()) {
+                      _elapsed.record(generation.time);
+                      report(generation);
+                    }
+                  });
     isDone &= writeBinaryLog(snapshot->items());
-    isDone &= drawPicture();
+    isDone &= finishSinks();
     isDone &= succeeds([&] { writeSummary(snapshot->shown()); });
     return isDone && !_isOutputBroken ? 0 : generalError;
   }
 
-  bool wantsGenerations() const { return _streamed || _recorder; }
-
-  // An output that has failed gets no more; what goes to files goes on.
+  // A sink that has failed gets no more; the others go on.
   void report(Generation generation) {
     generation.dating = _dating;
     generation.elapsed = _elapsed.at(generation.time);
-    _isAnyShown = true;
-    _hasEmptyTimes |= _options.output == Output::ValueTable && _dating == Dating::Unknown;
-    if (wantsGenerations()) _seen.take(generation);
-    if (_recorder) _recorder->take(generation);
-    if (!_streamed || succeeds([&] { _streamed->take(generation); })) return;
-    _streamed.reset();
-    _isOutputBroken = true;
+    for (Sink& sink : _sinks) {
+      if (sink.hasFailed) continue;
+      sink.hasFailed = !succeeds([&] { sink.sink->take(generation); });
+      _isOutputBroken |= sink.hasFailed;
+    }
+  }
+
+  bool finishSinks() {
+    bool isDone = true;
+    if (isPointless()) return isDone;
+    for (const Sink& sink : _sinks) isDone &= succeeds([&] { sink.sink->finish(_name); });
+    return isDone;
   }
 
   // Whether nobody would see what else the capture holds.
-  bool isPointless() const { return _isOutputBroken && !_recorder && !isSaving() && _outputs.areNone(); }
+  bool isPointless() const { return _isOutputBroken && !_options.plot && !isSaving() && _outputs.areNone(); }
 
   bool isSaving() const { return _options.snapshotPath || _options.binaryLogPath; }
 
@@ -277,37 +271,6 @@ class InputDecoding {
     });
   }
 
-  // Values that are no numbers, such as states, have no place in a picture.
-  void tellUnplottedPaths() const {
-    if (!_recorder) return;
-    for (const auto& [path, value] : _recorder->unplotted()) {
-      std::string line = "no value of " + _name;
-      line.append(" under '").append(path).append("' begins with a number (one is '").append(value);
-      tell(line + "'), so no line shows it");
-    }
-  }
-
-  void tellEmptyTimes() const {
-    if (!_hasEmptyTimes || isPointless()) return;
-    const bool isElapsedShown = std::ranges::any_of(
-        _options.tablePaths, [](const std::string& path) { return treePath(path) == elapsedPath; });
-    if (!isElapsedShown)
-      tell("the modem of " + _name +
-           " knew no date, so rows have no time; the path Elapsed gives the seconds since the first record");
-  }
-
-  bool drawPicture() const {
-    tellUnseenPaths();
-    tellEmptyTimes();
-    tellUnplottedPaths();
-    return !_recorder || succeeds([&] {
-      if (_recorder->isEmpty())
-        throw std::runtime_error(_name + " has no number under the paths to plot, so " + _options.plot->file +
-                                 " was not written; --format paths shows what there is");
-      writeFile(_options.plot->file, bytesOf(drawPlot(_recorder->plot(_name))));
-    });
-  }
-
   void tellClockSteps(const ClockSteps& steps) const {
     if (steps.count == 0 || isPointless()) return;
     const std::string howOften = steps.count == 1 ? "once" : std::to_string(steps.count) + " times";
@@ -319,25 +282,6 @@ class InputDecoding {
     if (count == 0) return;
     tell(_name + " brought more than 16 MiB at a time: " + std::to_string(count) +
          " of its messages were decoded, but their raw bytes were not kept");
-  }
-
-  // A cell may never have been met; more likely its name was mistyped. Nothing is known when not all was
-  // looked at, and another line says so when there was nothing to see.
-  void tellUnseenPaths() const {
-    if (isPointless() || !_isAnyShown || _guess.isNeeded()) return;
-    for (const std::string& path : _seen.unseen())
-      tell("no display of " + _name + " has a value under '" + path + "'; " + adviceFor(path));
-  }
-
-  std::string adviceFor(const std::string& path) const {
-    const auto nearest = _seen.nearestTo(path);
-    if (nearest.empty()) return "--format paths shows what there is";
-    std::string advice = "did you mean ";
-    for (std::size_t i = 0; i < nearest.size(); ++i) {
-      if (i > 0) advice += i + 1 < nearest.size() ? ", " : " or ";
-      advice.append("'").append(nearest[i]).append("'");
-    }
-    return advice + "?";
   }
 
   // What is written once all is read.
@@ -371,19 +315,15 @@ class InputDecoding {
   const std::string _path;
   const std::string _name;  // as errors and headings tell it
   const bool _isFirst;
-  std::optional<std::string> _captureName;    // in the output; absent when there is but one
-  NumberFormats _formats;                     // of what is streamed
-  std::unique_ptr<GenerationSink> _streamed;  // to standard output
-  std::optional<PlotRecorder> _recorder;
-  SeenPaths _seen;
+  std::optional<std::string> _captureName;  // in the output; absent when there is but one
+  NumberFormats _formats;                   // of what is streamed
   Subscriptions _subscriptions;
   RecordOutputs _outputs;
   MessageStatistics _statistics;
   TechnologyGuess _guess;
+  std::vector<Sink> _sinks;
   ElapsedTime _elapsed;
   Dating _dating = Dating::Known;  // of the last record
-  bool _isAnyShown = false;
-  bool _hasEmptyTimes = false;  // in a table
   bool _isOutputBroken = false;
 };
 

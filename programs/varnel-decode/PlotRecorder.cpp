@@ -14,6 +14,7 @@
 #include "base/ClockStep.h"
 #include "host/Printable.h"
 #include "model/VarnelModelNode.h"
+#include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/plot/ChartModule.h"
 
 namespace varnel {

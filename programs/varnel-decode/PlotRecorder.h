@@ -7,7 +7,7 @@
 #include <string_view>
 #include <vector>
 
-#include "programs/varnel-decode/GenerationWriters.h"
+#include "programs/varnel-decode/Generation.h"
 #include "programs/varnel-decode/plot/Plot.h"
 
 namespace varnel {
@@ -56,10 +56,10 @@ class PlotLine {
 };
 
 /// Collects the numbers under some paths for a picture.
-class PlotRecorder final : public GenerationSink {
+class PlotRecorder {
  public:
   explicit PlotRecorder(const std::vector<std::string>& paths);
-  void take(const Generation& generation) override;
+  void take(const Generation& generation);
 
   bool isEmpty() const;
   /// The picture of all paths with numbers. If the first record has no date, times are seconds since that

@@ -180,7 +180,8 @@ TEST(SeenPaths, APathIsSeenOnceADisplayHasAValueThere) {
   Value display = Value::ofDictionary();
   display.dictionary()->set("A", "1");
   display.dictionary()->set("B", Value::ofArray());
-  SeenPaths seen({"/A", "B", "C", "A"});
+  const TechnologyGuess guess;
+  SeenPaths seen({"/A", "B", "C", "A"}, guess);
   EXPECT_THAT(seen.unseen(), ElementsAre("/A", "B", "C", "A"));
   seen.take({{}, display});
   EXPECT_THAT(seen.unseen(), ElementsAre("B", "C"));
