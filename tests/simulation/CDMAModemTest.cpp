@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
+#include "tests/support/DistinctValues.h"
 #include "tests/support/SimulatedMessages.h"
 
 namespace varnel {
@@ -190,44 +191,79 @@ TEST(CDMAModem, ACallTakesTheRadioForItself) {
   }
 }
 
-TEST(CDMAModem, VoiceStatusesAreBelievable) {
-  std::set<unsigned> references, channels;
-  std::set<std::size_t> counts;
-  std::set<int> gains;
+bool isWithoutPilot(const VoiceStatus& status) {
+  return status.state == 11 || status.state == 2 || status.state == 3;
+}
+
+// The statuses of 1x within 20 minutes.
+std::vector<VoiceStatus> voiceStatuses() {
+  std::vector<VoiceStatus> statuses;
+  for (const Message& message : messagesOf(0x119C, 20min)) statuses.emplace_back(message);
+  return statuses;
+}
+
+TEST(CDMAModem, VoiceStatusesHaveFourSubpackets) {
   for (const Message& message : messagesOf(0x119C, 20min)) {
     const VoiceStatus status(message);
-    ASSERT_EQ(status.end, message.packet.size());
-    ASSERT_EQ(status.subpackets.size(), 4u);
-    const std::size_t radio = status.subpackets.at(2);
+    EXPECT_EQ(status.end, message.packet.size());
+    EXPECT_EQ(status.subpackets.size(), 4u);
+  }
+}
+
+TEST(CDMAModem, RadiosOfVoiceAreBelievable) {
+  std::set<int> gains;
+  for (const Message& message : messagesOf(0x119C, 20min)) {
+    const std::size_t radio = VoiceStatus(message).subpackets.at(2);
     EXPECT_EQ(message.u8(radio + 4), 0u);
     EXPECT_EQ(message.u8(radio + 5), 0u);
-    EXPECT_THAT(message.u16(radio + 6), AnyOf(283u, 242u));
     EXPECT_EQ(message.u16(radio + 8), message.u16(radio + 6));
-    EXPECT_TRUE(status.state == traffic || message.u16(radio + 6) == 283);
     // From -103 to -45 dBm.
     for (const std::size_t chain : {10, 11}) EXPECT_THAT(i8(message, radio + chain), AllOf(Ge(-119), Le(54)));
     const int power = static_cast<std::int16_t>(message.u16(radio + 12));
     EXPECT_THAT(power, AllOf(Ge(-500), Le(230)));
-    const bool isWithoutPilot = status.state == 11 || status.state == 2 || status.state == 3;
-    EXPECT_EQ(status.strengths_db.empty(), isWithoutPilot);
-    if (status.state != traffic) {
-      EXPECT_LE(status.strengths_db.size(), 1u);
-    }
-    EXPECT_TRUE(isWithoutPilot || status.strengths_db.contains(status.reference));
+    gains.insert(i8(message, radio + 10));
+  }
+  EXPECT_GE(gains.size(), 30u);
+}
+
+TEST(CDMAModem, CallsMayBeOnASecondChannel) {
+  std::set<unsigned> channels;
+  for (const Message& message : messagesOf(0x119C, 20min)) {
+    const VoiceStatus status(message);
+    const unsigned channel = message.u16(status.subpackets.at(2) + 6);
+    EXPECT_TRUE(status.state == traffic || channel == 283);
+    channels.insert(channel);
+  }
+  EXPECT_THAT(channels, UnorderedElementsAre(283u, 242u));
+}
+
+TEST(CDMAModem, PilotsOfVoiceAreBelievable) {
+  for (const VoiceStatus& status : voiceStatuses()) {
     for (const auto& [pilot, strength_db] : status.strengths_db) {
       EXPECT_LE(pilot, 511u);
       // At most a fifth of the power.
       EXPECT_THAT(strength_db, AllOf(Ge(-25.0), Le(-6.9)));
     }
-    references.insert(status.reference);
-    channels.insert(message.u16(radio + 6));
-    counts.insert(status.strengths_db.size());
-    gains.insert(i8(message, radio + 10));
   }
-  EXPECT_GE(references.size(), 4u);
-  EXPECT_EQ(channels.size(), 2u);
+}
+
+TEST(CDMAModem, SeveralPilotsAreActiveInACallOnly) {
+  const auto statuses = voiceStatuses();
+  for (const VoiceStatus& status : statuses) {
+    EXPECT_EQ(status.strengths_db.empty(), isWithoutPilot(status));
+    if (status.state != traffic) {
+      EXPECT_LE(status.strengths_db.size(), 1u);
+    }
+  }
+  const auto counts = distinctValues(statuses, [](const VoiceStatus& s) { return s.strengths_db.size(); });
   EXPECT_THAT(counts, IsSupersetOf({0u, 1u, 2u}));
-  EXPECT_GE(gains.size(), 30u);
+}
+
+TEST(CDMAModem, TheReferenceIsOneOfThePilotsAndChanges) {
+  const auto statuses = voiceStatuses();
+  for (const VoiceStatus& status : statuses)
+    EXPECT_TRUE(isWithoutPilot(status) || status.strengths_db.contains(status.reference));
+  EXPECT_GE(distinctValues(statuses, &VoiceStatus::reference).size(), 4u);
 }
 
 TEST(CDMAModem, OneFrameOfAHundredIsErasedAndMoreWhereTheActiveSetIsWeak) {
@@ -264,34 +300,54 @@ TEST(CDMAModem, OneFrameOfAHundredIsErasedAndMoreWhereTheActiveSetIsWeak) {
   EXPECT_THAT(rate(true), AllOf(Gt(0.025), Le(0.3)));
 }
 
+unsigned dataAddress(const Message& message) { return message.u16(38) | message.u8(40) << 16; }
+
 TEST(CDMAModem, DataStatusesAreBelievable) {
-  std::set<unsigned> pilots, addresses, colors, channels;
   for (const Message& message : messagesOf(0x1183, 30min)) {
     ASSERT_EQ(message.packet.size(), 50u);
-    const unsigned channel = message.u16(13) & 0x7FF, state = message.u8(36), session = message.u8(37);
-    EXPECT_THAT(channel, AnyOf(78u, 37u));
-    EXPECT_TRUE(channel == 78 || (state == connected && session == sessionOpen));
     EXPECT_EQ(message.u8(14) >> 3, 0u);
-    const int level_dbm = i8(message, 15), power_dbm = i8(message, 17);
+    const int level_dbm = i8(message, 15);
     EXPECT_THAT(level_dbm, AllOf(Ge(-106), Le(-45)));
     EXPECT_THAT(i8(message, 16), AllOf(Ge(-106), Le(level_dbm + 4)));
-    EXPECT_EQ(message.u16(18) == noPilot, state == inactive || state == acquisition);
-    if (state < access) {
+  }
+}
+
+TEST(CDMAModem, DataMayBeOnASecondChannelWhileConnected) {
+  std::set<unsigned> channels;
+  for (const Message& message : messagesOf(0x1183, 30min)) {
+    const unsigned channel = message.u16(13) & 0x7FF;
+    EXPECT_TRUE(channel == 78 || (message.u8(36) == connected && message.u8(37) == sessionOpen));
+    channels.insert(channel);
+  }
+  EXPECT_THAT(channels, UnorderedElementsAre(78u, 37u));
+}
+
+TEST(CDMAModem, ThePhoneSendsDataFromTheAccessOn) {
+  for (const Message& message : messagesOf(0x1183, 30min)) {
+    const int level_dbm = i8(message, 15), power_dbm = i8(message, 17);
+    if (message.u8(36) < access) {
       EXPECT_EQ(power_dbm, -50);
     } else {
       EXPECT_NEAR(power_dbm, std::min(-73 - level_dbm, 23), 6);
     }
-    const unsigned address = message.u16(38) | message.u8(40) << 16;
-    EXPECT_EQ(address == 0, session == 0);
-    if (message.u16(18) != noPilot) pilots.insert(message.u16(18));
-    addresses.insert(address);
-    colors.insert(message.u8(41));
-    channels.insert(channel);
+  }
+}
+
+TEST(CDMAModem, DataHaveAServingPilotOnceOneIsAcquired) {
+  std::set<unsigned> pilots;
+  for (const Message& message : messagesOf(0x1183, 30min)) {
+    const unsigned state = message.u8(36), pilot = message.u16(18);
+    EXPECT_EQ(pilot == noPilot, state == inactive || state == acquisition);
+    if (pilot != noPilot) pilots.insert(pilot);
   }
   EXPECT_GE(pilots.size(), 4u);
-  EXPECT_GE(addresses.size(), 3u);
-  EXPECT_EQ(colors.size(), 3u);
-  EXPECT_EQ(channels.size(), 2u);
+}
+
+TEST(CDMAModem, DataHaveAnAddressWithASession) {
+  const auto all = messagesOf(0x1183, 30min);
+  for (const Message& message : all) EXPECT_EQ(dataAddress(message) == 0, message.u8(37) == 0);
+  EXPECT_GE(distinctValues(all, dataAddress).size(), 3u);
+  EXPECT_EQ(distinctValues(all, [](const Message& message) { return message.u8(41); }).size(), 3u);
 }
 
 TEST(CDMAModem, BothHalvesHearTheSameMasts) {
@@ -471,28 +527,39 @@ TEST(CDMAModem, TheForwardRateFollowsThePilot) {
 
 TEST(CDMAModem, TheSystemIsToldOnceItIsKnown) {
   unsigned voice = 11;
-  std::set<unsigned> systems, networks, zones, revisions, indicators, stations;
   for (const Message& message : messages(1, 40min)) {
     if (message.code() == 0x119C) voice = VoiceStatus(message).state;
-    if (message.code() != 0x134F) continue;
-    EXPECT_THAT(voice, AnyOf(paging, sleeping, traffic));
+    if (message.code() == 0x134F) {
+      EXPECT_THAT(voice, AnyOf(paging, sleeping, traffic));
+    }
+  }
+}
+
+TEST(CDMAModem, SystemsAreBelievable) {
+  for (const Message& message : messagesOf(0x134F, 40min)) {
     ASSERT_EQ(message.packet.size(), 186u);
     EXPECT_GE(message.u8(13), 2u);
     EXPECT_EQ(message.u32(46), 2u);
     EXPECT_THAT(message.u16(184), AllOf(Ge(101u), Le(111u)));
-    indicators.insert(message.u32(42));
-    systems.insert(message.u16(50));
-    networks.insert(message.u16(52));
-    zones.insert(message.u8(131));
-    revisions.insert(message.u8(133));
-    stations.insert(message.u16(184));
   }
-  EXPECT_THAT(indicators, UnorderedElementsAre(0u, 7u));
-  EXPECT_EQ(systems.size(), 2u);
-  EXPECT_EQ(networks.size(), 2u);
-  EXPECT_EQ(zones.size(), 3u);
-  EXPECT_THAT(revisions, UnorderedElementsAre(6u, 9u));
-  EXPECT_EQ(stations.size(), 6u);
+}
+
+TEST(CDMAModem, TheWalkLeadsThroughSystems) {
+  const auto all = messagesOf(0x134F, 40min);
+  const auto u16 = [&all](std::size_t offset) {
+    return distinctValues(all, [=](const Message& message) { return message.u16(offset); });
+  };
+  const auto u8 = [&all](std::size_t offset) {
+    return distinctValues(all, [=](const Message& message) { return message.u8(offset); });
+  };
+  EXPECT_THAT(distinctValues(all, [](const Message& message) { return message.u32(42); }),
+              UnorderedElementsAre(0u, 7u))
+      << "roaming indicators";
+  EXPECT_EQ(u16(50).size(), 2u) << "systems";
+  EXPECT_EQ(u16(52).size(), 2u) << "networks";
+  EXPECT_EQ(u8(131).size(), 3u) << "packet zones";
+  EXPECT_THAT(u8(133), UnorderedElementsAre(6u, 9u)) << "protocol revisions";
+  EXPECT_EQ(u16(184).size(), 6u) << "base stations";
 }
 
 }  // namespace

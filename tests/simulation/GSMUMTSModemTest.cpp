@@ -2,11 +2,13 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <array>
 #include <map>
 #include <set>
 #include <vector>
 
 #include "platform/TelephonyService.h"
+#include "tests/support/DistinctValues.h"
 #include "tests/support/SimulatedMessages.h"
 
 namespace varnel {
@@ -43,6 +45,21 @@ int s32(const Message& message, std::size_t offset) { return static_cast<std::in
 bool isOfUMTS(unsigned code) { return code >> 12 == 4; }
 bool isOfGSM(unsigned code) { return code >> 12 == 5; }
 
+// A message, and the state of the UMTS connection that was told last.
+struct InState {
+  Message message;
+  unsigned state;
+};
+std::vector<InState> messagesInState(unsigned code, std::chrono::milliseconds duration) {
+  std::vector<InState> found;
+  unsigned state = disconnected;
+  for (const Message& message : messages(1, duration)) {
+    if (message.code() == 0x4125) state = message.u8(13);
+    if (message.code() == code) found.push_back({message, state});
+  }
+  return found;
+}
+
 TEST(GSMUMTSModem, TheMessagesAreTheSameOnEveryMachine) {
   const Message first = messagesOf(0x4127, 1s).at(0);
   EXPECT_EQ(first.packet,
@@ -50,25 +67,42 @@ TEST(GSMUMTSModem, TheMessagesAreTheSameOnEveryMachine) {
                    0x00, 0x00, 0x5C, 0x29, 0x00, 0x00, 0x5C, 0x1F, 0x01, 0x00, 0x2D, 0x32, 0x00, 0x00}));
 }
 
+// When a technology was left for the other one, and the state of its connection then.
+struct Departure {
+  std::chrono::milliseconds at;
+  bool isOfGSM;
+  unsigned state;
+};
+std::vector<Departure> departures(std::uint64_t seed, std::chrono::milliseconds duration) {
+  std::vector<Departure> departures;
+  bool isOnGSM = false;
+  unsigned rrState = rrInactive, rrcState = disconnected;
+  for (const Message& message : messages(seed, duration)) {
+    if (message.code() == 0x512C) rrState = message.u8(13);
+    if (message.code() == 0x4125) rrcState = message.u8(13);
+    if (!(isOnGSM ? isOfUMTS : isOfGSM)(message.code())) continue;
+    departures.push_back({message.at, isOnGSM, isOnGSM ? rrState : rrcState});
+    isOnGSM = !isOnGSM;
+  }
+  return departures;
+}
+
 TEST(GSMUMTSModem, UMTSAndGSMAlternate) {
   for (const std::uint64_t seed : {1, 2, 3, 4, 5}) {
-    int stays = 0;
-    bool isOnGSM = false;
+    const auto all = departures(seed, 10min);
+    EXPECT_GE(all.size(), 12u) << seed;
     auto since = 0ms;
-    unsigned rrState = rrInactive, rrcState = disconnected;
-    for (const Message& message : messages(seed, 10min)) {
-      if (message.code() == 0x512C) rrState = message.u8(13);
-      if (message.code() == 0x4125) rrcState = message.u8(13);
-      if (!isOfGSM(message.code()) && !isOfUMTS(message.code())) continue;
-      if (isOnGSM == isOfGSM(message.code())) continue;
-      // Each technology is idle when the phone leaves it.
-      EXPECT_EQ(isOnGSM ? rrState : rrcState, isOnGSM ? rrInactive : disconnected);
-      EXPECT_THAT(message.at - since, AllOf(Ge(13s), Le(70s))) << seed << ", " << message.at.count();
-      since = message.at;
-      isOnGSM = !isOnGSM;
-      ++stays;
+    for (const Departure& departure : all) {
+      EXPECT_THAT(departure.at - since, AllOf(Ge(13s), Le(70s))) << seed << ", " << departure.at.count();
+      since = departure.at;
     }
-    EXPECT_GE(stays, 12) << seed;
+  }
+}
+
+TEST(GSMUMTSModem, ATechnologyIsLeftAtRest) {
+  for (const std::uint64_t seed : {1, 2, 3, 4, 5}) {
+    for (const Departure& departure : departures(seed, 10min))
+      EXPECT_EQ(departure.state, departure.isOfGSM ? rrInactive : disconnected) << departure.at.count();
   }
 }
 
@@ -99,101 +133,144 @@ TEST(GSMUMTSModem, RRStatesFollowOneAnotherAsInANetwork) {
       {rrRelease, {rrIdle}},      {rrToUMTS, {rrInactive}},
   };
   unsigned state = rrInactive;
-  std::set<unsigned> states, modes;
+  std::set<unsigned> states;
   for (const Message& message : messagesOf(0x512C, 40min)) {
-    ASSERT_EQ(message.packet.size(), 17u);
     const unsigned next = message.u8(13);
     EXPECT_TRUE(next == state || allowed.at(state).contains(next)) << state << " to " << next;
-    EXPECT_EQ(message.u8(14), next == rrTransfer ? 1u : 0u);
-    EXPECT_EQ(message.u8(15), 0u);
     states.insert(state = next);
-    modes.insert(message.u8(16));
   }
   EXPECT_THAT(states, UnorderedElementsAre(rrInactive, rrFromUMTS, rrIdle, rrReselection, rrPending,
                                            rrTransfer, rrRelease, rrToUMTS));
+}
+
+TEST(GSMUMTSModem, RRSubstatesAreThoseOfTheState) {
+  for (const Message& message : messagesOf(0x512C, 40min)) {
+    ASSERT_EQ(message.packet.size(), 17u);
+    EXPECT_EQ(message.u8(14), message.u8(13) == rrTransfer ? 1u : 0u);
+    EXPECT_EQ(message.u8(15), 0u);
+  }
+}
+
+TEST(GSMUMTSModem, GSMTransfersSpeechAndData) {
+  const auto modes = distinctValues(messagesOf(0x512C, 40min), [](const Message& m) { return m.u8(16); });
   EXPECT_THAT(modes, UnorderedElementsAre(0u, 1u));
 }
 
 TEST(GSMUMTSModem, CipheringIsOnWithAConnection) {
-  unsigned state = disconnected;
-  std::set<unsigned> flags;
-  for (const Message& message : messages(1, 20min)) {
-    if (message.code() == 0x4125) state = message.u8(13);
-    if (message.code() != 0x4157) continue;
+  const auto all = messagesInState(0x4157, 20min);
+  for (const auto& [message, state] : all) {
     ASSERT_EQ(message.packet.size(), 19u);
     EXPECT_EQ(message.u8(13), state == disconnected || state == connecting ? 0u : 1u);
-    flags.insert(message.u8(13));
   }
-  EXPECT_EQ(flags.size(), 2u);
+  EXPECT_EQ(distinctValues(all, [](const InState& each) { return each.message.u8(13); }).size(), 2u);
 }
 
 TEST(GSMUMTSModem, UMTSServingCellsAreBelievable) {
-  std::set<unsigned> identities, areas;
   for (const Message& cell : messagesOf(0x4127, 40min)) {
     ASSERT_EQ(cell.packet.size(), 29u);
     EXPECT_EQ(cell.u32(13), 9638u);  // 1927.6 and 2117.6 MHz
     EXPECT_EQ(cell.u32(17), 10588u);
     EXPECT_LT(cell.u32(21), 1u << 28);
-    identities.insert(cell.u32(21));
-    areas.insert(cell.u16(25));
   }
-  EXPECT_GE(identities.size(), 8u);
-  EXPECT_EQ(areas.size(), 3u);
 }
 
-TEST(GSMUMTSModem, CellSetsAreBelievable) {
-  unsigned state = disconnected;
-  std::set<unsigned> sets, readings;
-  std::size_t mostActive = 0;
-  int missed = 0;
-  for (const Message& message : messages(1, 20min)) {
-    if (message.code() == 0x4125) state = message.u8(13);
-    if (message.code() != 0x417A) continue;
-    const unsigned count = message.u8(15);
-    ASSERT_GE(count, 1u);
-    ASSERT_EQ(message.packet.size(), 16 + 15 * count + 44 * count);
-    // From -95 to -40 dBm, in tenths of a decibel.
-    EXPECT_THAT(s16(message, 13), AllOf(Ge(-402), Le(148)));
-    readings.insert(message.u16(13));
-    std::size_t active = 0;
-    for (std::size_t i = 0; i < count; ++i) {
-      const std::size_t record = 16 + 15 * i, energies = 16 + 15 * count + 44 * i;
-      EXPECT_LE(message.u16(record + 7) & 0x1FFF, 511u);
-      const unsigned set = message.u8(record + 8) >> 5;
-      EXPECT_LE(set, 2u);
-      active += set == 0;
-      sets.insert(set);
-      // From -24 to -4 dB of 524,288, plus half a decibel.
-      const unsigned last = message.u32(energies + 40);
-      EXPECT_THAT(last, AllOf(Ge(2342u), Le(234'191u)));
-      EXPECT_THAT(message.u32(energies + 32), AnyOf(0u, last));
-      EXPECT_THAT(message.u32(energies + 36), AnyOf(0u, last));
-      missed += message.u32(energies + 32) == 0;
-    }
-    EXPECT_GE(active, 1u);
-    EXPECT_LE(active, state == cellDCH ? 3u : 1u);
-    mostActive = std::max(mostActive, active);
+TEST(GSMUMTSModem, TheWalkLeadsThroughUMTSCellsOfEveryArea) {
+  const auto cells = messagesOf(0x4127, 40min);
+  EXPECT_GE(distinctValues(cells, [](const Message& cell) { return cell.u32(21); }).size(), 8u);
+  EXPECT_EQ(distinctValues(cells, [](const Message& cell) { return cell.u16(25); }).size(), 3u);
+}
+
+// A cell of 0x417A, with the energies of its three searches.
+struct HeardCell {
+  unsigned code, set;
+  std::array<unsigned, 3> energies;
+};
+std::vector<HeardCell> heardCells(const Message& message) {
+  const unsigned count = message.u8(15);
+  EXPECT_EQ(message.packet.size(), 16 + 15 * count + 44 * count);
+  std::vector<HeardCell> cells;
+  for (std::size_t i = 0; i < count; ++i) {
+    const std::size_t record = 16 + 15 * i, energies = 16 + 15 * count + 44 * i;
+    cells.push_back({message.u16(record + 7) & 0x1FFF,
+                     message.u8(record + 8) >> 5,
+                     {message.u32(energies + 32), message.u32(energies + 36), message.u32(energies + 40)}});
   }
-  EXPECT_THAT(sets, UnorderedElementsAre(0u, 1u, 2u));
-  EXPECT_GE(readings.size(), 50u);
-  EXPECT_GE(mostActive, 2u);
+  return cells;
+}
+
+TEST(GSMUMTSModem, HeardCellsAreBelievable) {
+  for (const Message& message : messagesOf(0x417A, 20min)) {
+    ASSERT_FALSE(heardCells(message).empty());
+    for (const HeardCell& cell : heardCells(message)) {
+      EXPECT_LE(cell.code, 511u);
+      EXPECT_LE(cell.set, 2u);
+      // From -24 to -4 dB of 524,288, plus half a decibel.
+      EXPECT_THAT(cell.energies[2], AllOf(Ge(2342u), Le(234'191u)));
+    }
+  }
+}
+
+TEST(GSMUMTSModem, EarlierSearchesNowAndThenMissACell) {
+  int missed = 0;
+  for (const Message& message : messagesOf(0x417A, 20min)) {
+    for (const auto& [code, set, energies] : heardCells(message)) {
+      EXPECT_THAT(energies[0], AnyOf(0u, energies[2]));
+      EXPECT_THAT(energies[1], AnyOf(0u, energies[2]));
+      missed += energies[0] == 0;
+    }
+  }
   EXPECT_GE(missed, 10);
 }
 
+TEST(GSMUMTSModem, CellsAreOfEverySet) {
+  std::set<unsigned> sets;
+  for (const Message& message : messagesOf(0x417A, 20min))
+    for (const HeardCell& cell : heardCells(message)) sets.insert(cell.set);
+  EXPECT_THAT(sets, UnorderedElementsAre(0u, 1u, 2u));
+}
+
+TEST(GSMUMTSModem, SeveralCellsAreActiveOnADedicatedChannelOnly) {
+  std::ptrdiff_t mostActive = 0;
+  for (const auto& [message, state] : messagesInState(0x417A, 20min)) {
+    const auto active = std::ranges::count(heardCells(message), 0u, &HeardCell::set);
+    EXPECT_THAT(active, AllOf(Ge(1), Le(state == cellDCH ? 3 : 1)));
+    mostActive = std::max(mostActive, active);
+  }
+  EXPECT_GE(mostActive, 2);
+}
+
+TEST(GSMUMTSModem, CarrierReadingsAreBelievableAndVary) {
+  const auto readings =
+      distinctValues(messagesOf(0x417A, 20min), [](const Message& message) { return s16(message, 13); });
+  // From -95 to -40 dBm, in tenths of a decibel.
+  EXPECT_THAT(readings, Each(AllOf(Ge(-402), Le(148))));
+  EXPECT_GE(readings.size(), 50u);
+}
+
+// The rankings of cells, without those of the other kind. The offset is that of the number of cells.
+std::vector<Message> rankings(std::size_t countOffset) {
+  std::vector<Message> all = messagesOf(0x4005, 20min);
+  std::erase_if(all, [=](const Message& message) { return message.u8(countOffset) == 0; });
+  return all;
+}
+
 TEST(GSMUMTSModem, RankingsAreOfOneKindOfCellsAtATime) {
-  int umtsRankings = 0, gsmRankings = 0;
-  unsigned state = disconnected;
-  for (const Message& message : messages(1, 20min)) {
-    if (message.code() == 0x4125) state = message.u8(13);
-    if (message.code() != 0x4005) continue;
-    EXPECT_NE(state, cellDCH);
+  for (const Message& message : messagesOf(0x4005, 20min)) {
     const unsigned umtsCount = message.u8(13), gsmCount = message.u8(14);
     EXPECT_TRUE(umtsCount == 0 || gsmCount == 0);
-    ASSERT_EQ(message.packet.size(), 15 + 10 * umtsCount + 7 * gsmCount);
-    umtsRankings += umtsCount != 0;
-    gsmRankings += gsmCount != 0;
-    for (std::size_t i = 0; i < umtsCount; ++i) {
-      const std::size_t record = 15 + 10 * i;
+    EXPECT_EQ(message.packet.size(), 15 + 10 * umtsCount + 7 * gsmCount);
+  }
+}
+
+TEST(GSMUMTSModem, NoCellsAreRankedOnADedicatedChannel) {
+  for (const auto& [message, state] : messagesInState(0x4005, 20min)) EXPECT_NE(state, cellDCH);
+}
+
+TEST(GSMUMTSModem, RankedUMTSCellsAreBelievable) {
+  const auto all = rankings(13);
+  EXPECT_GE(all.size(), 50u);
+  for (const Message& message : all) {
+    for (std::size_t record = 15; record < message.packet.size(); record += 10) {
       EXPECT_EQ(message.u16(record), 10588u);
       EXPECT_LE(message.u16(record + 2), 511u);
       const int rscp_dbm = s16(message, record + 5);
@@ -202,155 +279,199 @@ TEST(GSMUMTSModem, RankingsAreOfOneKindOfCellsAtATime) {
       EXPECT_THAT(s8(message, record + 7), AllOf(Ge(-48), Le(-8)));
       EXPECT_THAT(s16(message, record + 8) - rscp_dbm, AnyOf(0, 4));
     }
-    for (std::size_t i = 0; i < gsmCount; ++i) {
-      const std::size_t record = 15 + 7 * i;
+  }
+}
+
+TEST(GSMUMTSModem, RankedGSMCellsAreBelievable) {
+  const auto all = rankings(14);
+  EXPECT_GE(all.size(), 50u);
+  for (const Message& message : all) {
+    for (std::size_t record = 15; record < message.packet.size(); record += 7) {
       EXPECT_THAT(message.u16(record), AllOf(Ge(10u), Le(50u)));
       EXPECT_LE(message.u16(record + 2), 63u);
       EXPECT_THAT(s8(message, record + 4), AllOf(Ge(-104), Le(-40)));
       EXPECT_EQ(s16(message, record + 5), s8(message, record + 4) - 6);
     }
   }
-  EXPECT_GE(umtsRankings, 50);
-  EXPECT_GE(gsmRankings, 50);
+}
+
+std::vector<int> powerSamples(const Message& message) {
+  std::vector<int> samples;
+  for (std::size_t record = 16; record < message.packet.size(); record += 14)
+    samples.push_back(s16(message, record + 4));
+  return samples;
+}
+
+int power_dbm(int sample) { return (sample + 512) / 10 - 70; }
+
+TEST(GSMUMTSModem, TransmitPowerIsToldWhileThereAreChannels) {
+  std::set<int> powers;
+  for (const auto& [message, state] : messagesInState(0x4031, 20min)) {
+    EXPECT_THAT(state, AnyOf(cellDCH, cellFach));
+    EXPECT_EQ(message.u8(14), 10u);
+    ASSERT_EQ(message.packet.size(), 16u + 14 * 10);
+    for (const int sample : powerSamples(message))
+      if (sample != 0) powers.insert(power_dbm(sample));
+  }
+  EXPECT_THAT(powers, Each(AllOf(Ge(-49), Le(24))));
+  EXPECT_GE(powers.size(), 20u);
+}
+
+TEST(GSMUMTSModem, OnlyASharedChannelIsSilentBetweenBursts) {
+  std::ptrdiff_t silent = 0;
+  for (const auto& [message, state] : messagesInState(0x4031, 20min)) {
+    const auto samples = powerSamples(message);
+    EXPECT_NE(samples.at(0), 0);
+    const auto silentHere = std::ranges::count(samples, 0);
+    EXPECT_TRUE(silentHere == 0 || state == cellFach);
+    silent += silentHere;
+  }
+  EXPECT_GE(silent, 20);
 }
 
 // Power and level together are always -75 dBm, except for noise and the limits.
 TEST(GSMUMTSModem, TransmitPowerFollowsThePathLoss) {
   std::int64_t rscp_dbm = 0;
-  unsigned state = disconnected;
-  std::set<int> powers;
-  int silent = 0;
+  int compared = 0;
   for (const Message& message : messages(1, 20min)) {
-    if (message.code() == 0x4125) state = message.u8(13);
     if (message.code() == 0xFF0001) {
       const Value serving = message.payload().array()->at(0);
       rscp_dbm = textOf(serving, cellMonitor::radioAccessTechnology) == "UMTS"
                      ? numberOf(serving, cellMonitor::rscp)
                      : 0;
     }
-    if (message.code() != 0x4031) continue;
-    EXPECT_THAT(state, AnyOf(cellDCH, cellFach));
-    const unsigned count = message.u8(14);
-    EXPECT_EQ(count, 10u);
-    ASSERT_EQ(message.packet.size(), 16 + 14 * count);
-    EXPECT_NE(message.u16(20), 0u);
-    for (std::size_t i = 0; i < count; ++i) {
-      const int sample = s16(message, 16 + 14 * i + 4);
-      silent += sample == 0;
-      EXPECT_TRUE(sample != 0 || state == cellFach);
+    if (message.code() != 0x4031 || rscp_dbm == 0) continue;
+    for (const int sample : powerSamples(message)) {
       if (sample == 0) continue;
-      const int power_dbm = (sample + 512) / 10 - 70;
-      EXPECT_THAT(power_dbm, AllOf(Ge(-49), Le(24)));
-      if (rscp_dbm != 0) {
-        EXPECT_NEAR(power_dbm, -75 - rscp_dbm, 12);
-      }
-      powers.insert(power_dbm);
+      EXPECT_NEAR(power_dbm(sample), -75 - rscp_dbm, 12);
+      ++compared;
     }
   }
-  EXPECT_GE(powers.size(), 20u);
-  EXPECT_GE(silent, 20);
+  EXPECT_GE(compared, 1000);
 }
 
-TEST(GSMUMTSModem, BlockErrorsGrowAsLongAsTheChannelsStay) {
-  unsigned state = disconnected;
-  std::map<unsigned, std::pair<unsigned, unsigned>> counted;  // received and wrong, by channel
+// What a transport channel of 0x4116 has received since it was set up.
+struct Blocks {
   unsigned received = 0, wrong = 0;
-  for (const Message& message : messages(1, 20min)) {
-    if (message.code() == 0x4125 && message.u8(13) != state) {
-      state = message.u8(13);
-      counted.clear();
-    }
-    if (message.code() != 0x4116) continue;
+};
+std::map<unsigned, Blocks> blocksOf(const Message& message) {
+  std::map<unsigned, Blocks> blocks;
+  for (std::size_t record = 16; record < message.packet.size(); record += 9)
+    blocks[message.u8(record)] = {message.u32(record + 1), message.u32(record + 5)};
+  return blocks;
+}
+
+TEST(GSMUMTSModem, BlockErrorsAreOfTheChannelsOfTheState) {
+  for (const auto& [message, state] : messagesInState(0x4116, 20min)) {
     const unsigned count = message.u8(13);
     EXPECT_EQ(count, state == cellDCH ? 5u : 2u);
     EXPECT_EQ(message.u16(14), 200u);
     ASSERT_EQ(message.packet.size(), 16 + 9 * count);
-    for (std::size_t record = 16; record < message.packet.size(); record += 9) {
-      const unsigned identity = message.u8(record);
+    for (const auto& [identity, blocks] : blocksOf(message)) {
       EXPECT_THAT(identity, AllOf(Ge(1u), Le(32u)));
-      auto& [lastReceived, lastWrong] = counted[identity];
-      EXPECT_GE(message.u32(record + 1), lastReceived);
-      EXPECT_GE(message.u32(record + 5), lastWrong);
-      EXPECT_LE(message.u32(record + 5), message.u32(record + 1));
-      received += message.u32(record + 1) - lastReceived;
-      wrong += message.u32(record + 5) - lastWrong;
-      lastReceived = message.u32(record + 1);
-      lastWrong = message.u32(record + 5);
+      EXPECT_LE(blocks.wrong, blocks.received);
     }
+  }
+}
+
+// How the blocks of a channel have grown from one report to the next; from nothing when it was set up.
+struct Growth {
+  Blocks before, now;
+};
+std::vector<Growth> growths() {
+  std::vector<Growth> growths;
+  unsigned state = disconnected;
+  std::map<unsigned, Blocks> before;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0x4125 && message.u8(13) != state) {
+      state = message.u8(13);
+      before.clear();
+    }
+    if (message.code() != 0x4116) continue;
+    const auto now = blocksOf(message);
+    for (const auto& [identity, blocks] : now) growths.push_back({before[identity], blocks});
+    before = now;
+  }
+  return growths;
+}
+
+TEST(GSMUMTSModem, BlockErrorsGrowAsLongAsTheChannelsStay) {
+  for (const auto& [before, now] : growths()) {
+    EXPECT_GE(now.received, before.received);
+    EXPECT_GE(now.wrong, before.wrong);
+  }
+}
+
+TEST(GSMUMTSModem, AFewBlocksOfAThousandAreWrong) {
+  unsigned received = 0, wrong = 0;
+  for (const auto& [before, now] : growths()) {
+    received += now.received - before.received;
+    wrong += now.wrong - before.wrong;
   }
   EXPECT_GE(received, 10'000u);
   EXPECT_THAT(wrong * 1000 / received, AllOf(Ge(5u), Le(60u)));
 }
 
+// Where the processes of 0x4221 begin.
+std::vector<std::size_t> processRecords(const Message& message) {
+  std::vector<std::size_t> records;
+  for (std::size_t i = 0; i < message.u8(16); ++i) records.push_back(18 + 9 * i);
+  for (std::size_t i = 0; i < message.u8(17); ++i) records.push_back(990 + 9 * i);
+  return records;
+}
+
 TEST(GSMUMTSModem, HighSpeedProcessesAreOfOneCarrierOrTwo) {
-  unsigned state = disconnected;
   std::set<unsigned> configurations;
-  for (const Message& message : messages(1, 20min)) {
-    if (message.code() == 0x4125) state = message.u8(13);
-    if (message.code() != 0x4221) continue;
+  for (const auto& [message, state] : messagesInState(0x4221, 20min)) {
     EXPECT_EQ(state, cellDCH);
     EXPECT_EQ(message.u8(13), 2u);
-    const unsigned subframes = message.u16(14) & 0x3FF, configuration = message.u8(15) >> 2;
-    EXPECT_LE(subframes, 980u);
+    const unsigned configuration = message.u8(15) >> 2, primary = message.u8(16), secondary = message.u8(17);
     configurations.insert(configuration);
-    const unsigned primary = message.u8(16), secondary = message.u8(17);
     EXPECT_EQ(primary, 6u);
     EXPECT_EQ(secondary, configuration == 2 ? 6u : 0u);
     // 18 + 9 * 6 = 72; 18 + 162 * 6 + 9 * 6 = 1044
-    ASSERT_EQ(message.packet.size(), secondary == 0 ? 72u : 1044u);
-    std::vector<std::size_t> records;
-    for (std::size_t i = 0; i < 6; ++i) records.push_back(18 + 9 * i);
-    for (std::size_t i = 0; i < secondary; ++i) records.push_back(990 + 9 * i);
-    unsigned sent = 0;
-    for (std::size_t i = 0; i < records.size(); ++i) {
-      EXPECT_EQ(message.u8(records[i]), i % 6);
-      EXPECT_LE(message.u16(records[i] + 7), message.u16(records[i] + 5));
-      EXPECT_LE(message.u32(records[i] + 1), message.u16(records[i] + 7) * 14'411u);
-      sent += message.u16(records[i] + 5);
-    }
-    EXPECT_LE(sent, subframes * (secondary == 0 ? 1 : 2));
+    EXPECT_EQ(message.packet.size(), secondary == 0 ? 72u : 1044u);
   }
   EXPECT_THAT(configurations, UnorderedElementsAre(0u, 2u));
 }
 
+TEST(GSMUMTSModem, HighSpeedProcessesHaveNoMoreBlocksThanThereAreSubframes) {
+  for (const Message& message : messagesOf(0x4221, 20min)) {
+    const unsigned subframes = message.u16(14) & 0x3FF;
+    EXPECT_LE(subframes, 980u);
+    unsigned sent = 0, process = 0;
+    for (const std::size_t record : processRecords(message)) {
+      EXPECT_EQ(message.u8(record), process++ % 6);
+      EXPECT_LE(message.u16(record + 7), message.u16(record + 5));
+      EXPECT_LE(message.u32(record + 1), message.u16(record + 7) * 14'411u);
+      sent += message.u16(record + 5);
+    }
+    EXPECT_LE(sent, subframes * (message.u8(17) == 0 ? 1 : 2));
+  }
+}
+
 TEST(GSMUMTSModem, GSMServingCellsAreBelievable) {
-  std::set<unsigned> identities;
   for (const Message& cell : messagesOf(0x5134, 40min)) {
     ASSERT_EQ(cell.packet.size(), 26u);
     EXPECT_THAT(cell.u16(13), AllOf(Ge(10u), Le(50u)));
     EXPECT_LE(cell.u16(15), 63u);
     EXPECT_THAT(cell.u16(17), AllOf(Ge(12000u), Le(12011u)));
-    identities.insert(cell.u16(17));
   }
-  EXPECT_GE(identities.size(), 4u);
+}
+
+TEST(GSMUMTSModem, TheWalkLeadsThroughGSMCells) {
+  const auto cells = messagesOf(0x5134, 40min);
+  EXPECT_GE(distinctValues(cells, [](const Message& cell) { return cell.u16(17); }).size(), 4u);
 }
 
 TEST(GSMUMTSModem, GSMMeasurementsTellCriteriaOrInACallTheQuality) {
-  unsigned channel = 0;
   bool isSpeaking = false, isTransferringData = false;
-  std::map<unsigned, unsigned> identities;
-  std::set<unsigned> levels, counts;
-  std::size_t identified = 0, unidentified = 0;
   for (const Message& message : messages(1, 20min)) {
     if (message.code() == 0x512C) {
       isSpeaking = message.u8(13) == rrTransfer && message.u8(16) == 0;
       isTransferringData = message.u8(13) == rrTransfer && message.u8(16) == 1;
     }
-    if (message.code() == 0x5134) channel = message.u16(13);
-    if (message.code() == 0x51FF) {
-      ASSERT_EQ(message.packet.size(), 15 + 4 * message.u8(14));
-      identities.clear();
-      for (std::size_t record = 15; record < message.packet.size(); record += 4) {
-        EXPECT_LE(message.u8(record + 2), 63u);
-        identities[message.u16(record)] = message.u8(record + 2);
-      }
-    }
     if (message.code() != 0x5137) continue;
-    const unsigned count = message.u8(28);
-    ASSERT_EQ(message.packet.size(), 29 + 14 * count);
-    counts.insert(count);
-    levels.insert(message.u8(15));
-    EXPECT_THAT(message.u8(15), AllOf(Ge(8u), Le(63u)));
     if (isSpeaking) {
       EXPECT_LE(message.u32(16), 7u);
       EXPECT_LE(message.u32(20), 7u);
@@ -360,48 +481,101 @@ TEST(GSMUMTSModem, GSMMeasurementsTellCriteriaOrInACallTheQuality) {
       EXPECT_EQ(s32(message, 20), s32(message, 16) + 4);
     }
     EXPECT_EQ(message.u8(26), isTransferringData ? 1u : 0u);
-    std::set<unsigned> channels{channel};
-    for (std::size_t record = 29; record < message.packet.size(); record += 14) {
+  }
+}
+
+TEST(GSMUMTSModem, GSMLevelsAreBelievableAndVary) {
+  const auto levels = distinctValues(messagesOf(0x5137, 20min), [](const Message& m) { return m.u8(15); });
+  EXPECT_THAT(levels, Each(AllOf(Ge(8u), Le(63u))));
+  EXPECT_GE(levels.size(), 15u);
+}
+
+TEST(GSMUMTSModem, GSMNeighborsAreOnChannelsApart) {
+  unsigned serving = 0;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0x5134) serving = message.u16(13);
+    if (message.code() != 0x5137) continue;
+    std::set<unsigned> channels{serving};
+    for (std::size_t record = 29; record < message.packet.size(); record += 14)
       channels.insert(message.u16(record));
+    EXPECT_EQ(channels.size(), message.u8(28) + 1);
+  }
+}
+
+TEST(GSMUMTSModem, GSMNeighborsAreBelievable) {
+  const auto all = messagesOf(0x5137, 20min);
+  EXPECT_GE(distinctValues(all, [](const Message& message) { return message.u8(28); }).size(), 2u);
+  for (const Message& message : all) {
+    ASSERT_EQ(message.packet.size(), 29 + 14 * message.u8(28));
+    for (std::size_t record = 29; record < message.packet.size(); record += 14) {
       EXPECT_LE(message.u8(record + 2), 63u);
       EXPECT_EQ(s32(message, record + 3), static_cast<int>(message.u8(record + 2)) - 8);
-      (identities.contains(message.u16(record)) ? identified : unidentified)++;
     }
-    EXPECT_EQ(channels.size(), count + 1);  // all apart
   }
-  EXPECT_GE(levels.size(), 15u);
-  EXPECT_GE(counts.size(), 2u);
-  EXPECT_GE(identified, 100u);
-  EXPECT_GE(unidentified, 20u);
+}
+
+TEST(GSMUMTSModem, IdentityCodesAreThoseOfStrongNeighbors) {
+  std::set<unsigned> identified;  // channels
+  int known = 0, unknown = 0;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0x51FF) {
+      ASSERT_EQ(message.packet.size(), 15 + 4 * message.u8(14));
+      identified.clear();
+      for (std::size_t record = 15; record < message.packet.size(); record += 4) {
+        EXPECT_LE(message.u8(record + 2), 63u);
+        identified.insert(message.u16(record));
+      }
+    }
+    if (message.code() != 0x5137) continue;
+    for (std::size_t record = 29; record < message.packet.size(); record += 14)
+      (identified.contains(message.u16(record)) ? known : unknown)++;
+  }
+  EXPECT_GE(known, 100);
+  EXPECT_GE(unknown, 20);
 }
 
 TEST(GSMUMTSModem, CallsHopOverTheirAllocation) {
-  bool isSpeaking = false;
-  std::set<unsigned> allocation, dedicated, silences;
+  std::set<unsigned> allocation, dedicated;
   for (const Message& message : messages(1, 20min)) {
-    if (message.code() == 0x512C) isSpeaking = message.u8(13) == rrTransfer && message.u8(16) == 0;
     if (message.code() == 0x51F8) {
-      ASSERT_EQ(message.packet.size(), 27u);
-      EXPECT_LE(message.u8(13), 63u);
-      EXPECT_EQ(message.u8(14), 6u);
       allocation.clear();
-      for (std::size_t entry = 15; entry < 27; entry += 2) allocation.insert(message.u16(entry));
-      EXPECT_EQ(allocation.size(), 6u);
-      EXPECT_THAT(allocation, Each(AllOf(Ge(51u), Le(124u))));
+      for (std::size_t entry = 15; entry < message.packet.size(); entry += 2)
+        allocation.insert(message.u16(entry));
     }
-    if (message.code() == 0x5076) {
-      EXPECT_TRUE(isSpeaking);
-      ASSERT_EQ(message.packet.size(), 17u);
-      EXPECT_TRUE(allocation.contains(message.u16(13)));
-      dedicated.insert(message.u16(13));
-    }
-    if (message.code() == 0x5072) {
-      EXPECT_TRUE(isSpeaking);
-      ASSERT_EQ(message.packet.size(), 20u);
-      silences.insert(message.u8(19));
-    }
+    if (message.code() != 0x5076) continue;
+    ASSERT_EQ(message.packet.size(), 17u);
+    EXPECT_TRUE(allocation.contains(message.u16(13)));
+    dedicated.insert(message.u16(13));
   }
   EXPECT_GE(dedicated.size(), 6u);
+}
+
+TEST(GSMUMTSModem, AnAllocationHasSixChannels) {
+  for (const Message& message : messagesOf(0x51F8, 20min)) {
+    ASSERT_EQ(message.packet.size(), 27u);
+    EXPECT_LE(message.u8(13), 63u);
+    EXPECT_EQ(message.u8(14), 6u);
+    std::set<unsigned> channels;
+    for (std::size_t entry = 15; entry < 27; entry += 2) channels.insert(message.u16(entry));
+    EXPECT_EQ(channels.size(), 6u);
+    EXPECT_THAT(channels, Each(AllOf(Ge(51u), Le(124u))));
+  }
+}
+
+TEST(GSMUMTSModem, DedicatedChannelsAreToldInACallOnly) {
+  bool isSpeaking = false;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0x512C) isSpeaking = message.u8(13) == rrTransfer && message.u8(16) == 0;
+    if (message.code() == 0x5076 || message.code() == 0x5072) {
+      EXPECT_TRUE(isSpeaking) << message.at.count();
+    }
+  }
+}
+
+TEST(GSMUMTSModem, CallsFallSilentBetweenWords) {
+  const auto all = messagesOf(0x5072, 20min);
+  for (const Message& message : all) ASSERT_EQ(message.packet.size(), 20u);
+  const auto silences = distinctValues(all, [](const Message& message) { return message.u8(19); });
   EXPECT_THAT(silences, UnorderedElementsAre(0u, 1u));
 }
 
@@ -430,52 +604,76 @@ TEST(GSMUMTSModem, BroadcastsDifferFromCellToCell) {
   EXPECT_THAT((numbers[{0x51FD, 33}]), UnorderedElementsAre(1u));
 }
 
-TEST(GSMUMTSModem, MobilityStatesAreThoseOfProcedures) {
-  std::set<unsigned> circuits, packets, registrations;
-  for (const Message& message : messages(1, 20min)) {
-    if (message.code() == 0x7131) {
-      ASSERT_EQ(message.packet.size(), 16u);
-      circuits.insert(message.u8(13));
-      EXPECT_THAT(message.u8(14), AnyOf(0u, 2u, 7u, 8u));
-      EXPECT_LE(message.u8(15), 1u);
-    } else if (message.code() == 0x7130) {
-      ASSERT_EQ(message.packet.size(), 16u);
-      packets.insert(message.u8(13));
-      EXPECT_THAT(message.u8(14), AnyOf(0u, 6u, 7u, 8u, 12u));
-      EXPECT_LE(message.u8(15), 1u);
-    } else if (message.code() == 0x7132) {
-      ASSERT_EQ(message.packet.size(), 16u);
-      registrations.insert(message.u8(13));
-      EXPECT_EQ(message.u8(14), 0u);
-    }
+TEST(GSMUMTSModem, CircuitStatesAreThoseOfProcedures) {
+  const auto all = messagesOf(0x7131, 20min);
+  for (const Message& message : all) {
+    ASSERT_EQ(message.packet.size(), 16u);
+    EXPECT_THAT(message.u8(14), AnyOf(0u, 2u, 7u, 8u));
+    EXPECT_LE(message.u8(15), 1u);
   }
-  EXPECT_THAT(circuits, UnorderedElementsAre(0u, 3u, 5u, 6u, 9u, 13u, 14u, 19u));
-  EXPECT_THAT(packets, UnorderedElementsAre(0u, 1u, 2u, 3u, 5u, 6u));
-  EXPECT_THAT(registrations, UnorderedElementsAre(0u, 1u, 2u, 5u));
+  EXPECT_THAT(distinctValues(all, [](const Message& message) { return message.u8(13); }),
+              UnorderedElementsAre(0u, 3u, 5u, 6u, 9u, 13u, 14u, 19u));
+}
+
+TEST(GSMUMTSModem, PacketStatesAreThoseOfProcedures) {
+  const auto all = messagesOf(0x7130, 20min);
+  for (const Message& message : all) {
+    ASSERT_EQ(message.packet.size(), 16u);
+    EXPECT_THAT(message.u8(14), AnyOf(0u, 6u, 7u, 8u, 12u));
+    EXPECT_LE(message.u8(15), 1u);
+  }
+  EXPECT_THAT(distinctValues(all, [](const Message& message) { return message.u8(13); }),
+              UnorderedElementsAre(0u, 1u, 2u, 3u, 5u, 6u));
+}
+
+TEST(GSMUMTSModem, RegistrationStatesAreThoseOfProcedures) {
+  const auto all = messagesOf(0x7132, 20min);
+  for (const Message& message : all) {
+    ASSERT_EQ(message.packet.size(), 16u);
+    EXPECT_EQ(message.u8(14), 0u);
+  }
+  EXPECT_THAT(distinctValues(all, [](const Message& message) { return message.u8(13); }),
+              UnorderedElementsAre(0u, 1u, 2u, 5u));
+}
+
+constexpr unsigned homeCode = 0x10F1, partnerCode = 0x0101;  // 001/01 and 001/100
+
+unsigned areaOf(const Message& network) { return network.u8(18) << 8 | network.u8(19); }
+
+// The serving networks of that code.
+std::vector<Message> networksOf(unsigned code) {
+  std::vector<Message> all = messagesOf(0x7135, 20min);
+  std::erase_if(all, [code](const Message& network) { return network.u16(16) != code; });
+  return all;
+}
+
+TEST(GSMUMTSModem, ServingNetworksAreBelievable) {
+  for (const Message& network : messagesOf(0x7135, 20min)) {
+    ASSERT_EQ(network.packet.size(), 32u);
+    EXPECT_EQ(network.u8(15), 0x00u);
+    EXPECT_THAT(network.u16(16), AnyOf(homeCode, partnerCode));
+    EXPECT_EQ(network.u8(13), network.u16(16) == partnerCode ? 1u : 0u);
+    EXPECT_EQ(network.u8(20), areaOf(network) % 100);
+  }
 }
 
 TEST(GSMUMTSModem, TheNetworkChangesWithTheTechnology) {
-  std::set<unsigned> home, partner, services;
   int changes = 0;
   unsigned last = 0x01;
-  for (const Message& message : messages(1, 20min)) {
-    if (message.code() != 0x7135) continue;
-    ASSERT_EQ(message.packet.size(), 32u);
-    EXPECT_EQ(message.u8(15), 0x00u);
-    const unsigned code = message.u16(16);
-    ASSERT_THAT(code, AnyOf(0x10F1u, 0x0101u));  // 001/01 and 001/100
-    EXPECT_EQ(message.u8(13), code == 0x0101 ? 1u : 0u);
-    EXPECT_THAT(message.u8(14), AnyOf(0u, 3u, 4u));
-    services.insert(message.u8(14));
-    const unsigned area = message.u8(18) << 8 | message.u8(19);
-    (code == 0x0101 ? partner : home).insert(area);
-    EXPECT_EQ(message.u8(20), area % 100);
-    changes += code != last;
-    last = code;
+  for (const Message& network : messagesOf(0x7135, 20min)) {
+    changes += network.u16(16) != last;
+    last = network.u16(16);
   }
   EXPECT_GE(changes, 20);
-  EXPECT_EQ(home.size(), 3u);
-  EXPECT_GE(partner.size(), 2u);
+}
+
+TEST(GSMUMTSModem, NetworksHaveSeveralAreas) {
+  EXPECT_EQ(distinctValues(networksOf(homeCode), areaOf).size(), 3u);
+  EXPECT_GE(distinctValues(networksOf(partnerCode), areaOf).size(), 2u);
+}
+
+TEST(GSMUMTSModem, ServiceIsNoneOrLimitedOrWhole) {
+  const auto services = distinctValues(messagesOf(0x7135, 20min), [](const Message& m) { return m.u8(14); });
   EXPECT_THAT(services, UnorderedElementsAre(0u, 3u, 4u));
 }
 
@@ -503,7 +701,7 @@ TEST(GSMUMTSModem, EquivalentNetworksAreThoseOfTheServingOne) {
 
 TEST(GSMUMTSModem, TheCellMonitorAgreesWithTheModem) {
   std::map<std::int64_t, std::int64_t> channels;
-  std::set<std::string> serving, neighbours;
+  std::set<std::string> serving, neighbors;
   for (const Message& message : messages(1, 10min)) {
     if (message.code() == 0x4127) channels[message.u32(21)] = message.u32(17);
     if (message.code() == 0x5134) channels[message.u16(17)] = message.u16(13);
@@ -526,11 +724,11 @@ TEST(GSMUMTSModem, TheCellMonitorAgreesWithTheModem) {
         EXPECT_THAT(numberOf(record, cellMonitor::rssi), AllOf(Ge(-60), Le(-20)));
       }
       if (textOf(record, cellMonitor::cellType) == "Neighbor")
-        neighbours.insert(textOf(record, cellMonitor::radioAccessTechnology));
+        neighbors.insert(textOf(record, cellMonitor::radioAccessTechnology));
     }
   }
   EXPECT_THAT(serving, UnorderedElementsAre("GSM", "UMTS"));
-  EXPECT_THAT(neighbours, UnorderedElementsAre("GSM", "LTE", "UMTS", "UTRAN"));
+  EXPECT_THAT(neighbors, UnorderedElementsAre("GSM", "LTE", "UMTS", "UTRAN"));
 }
 
 TEST(GSMUMTSModem, TheSimCardRegistersInTheServingCellsNetwork) {

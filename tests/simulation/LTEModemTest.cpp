@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "platform/TelephonyService.h"
+#include "tests/support/DistinctValues.h"
 #include "tests/support/SimulatedMessages.h"
 
 namespace varnel {
@@ -52,7 +53,6 @@ const std::map<unsigned, Carrier> carriers = {
 };
 
 TEST(LTEModem, ServingCellsAreBelievable) {
-  std::set<unsigned> identities, areas, bands;
   for (const Message& cell : messagesOf(0xB0C2, 40min)) {
     ASSERT_EQ(cell.packet.size(), 38u);
     EXPECT_LE(cell.u16(14), 503u);
@@ -63,14 +63,15 @@ TEST(LTEModem, ServingCellsAreBelievable) {
     EXPECT_EQ(cell.u8(21), cell.u8(20));
     EXPECT_LT(cell.u32(22), 1u << 28);
     EXPECT_THAT(cell.u16(26), AllOf(Ge(1u), Le(0xFFFDu)));
-    identities.insert(cell.u32(22));
-    areas.insert(cell.u16(26));
-    bands.insert(cell.u32(28));
   }
-  // One round through the town.
-  EXPECT_GE(identities.size(), 20u);
-  EXPECT_EQ(areas.size(), 3u);
-  EXPECT_GE(bands.size(), 2u);
+}
+
+// One round through the town.
+TEST(LTEModem, TheWalkLeadsThroughCellsOfEveryAreaAndOfSeveralBands) {
+  const auto cells = messagesOf(0xB0C2, 40min);
+  EXPECT_GE(distinctValues(cells, [](const Message& cell) { return cell.u32(22); }).size(), 20u);
+  EXPECT_EQ(distinctValues(cells, [](const Message& cell) { return cell.u16(26); }).size(), 3u);
+  EXPECT_GE(distinctValues(cells, [](const Message& cell) { return cell.u32(28); }).size(), 2u);
 }
 
 TEST(LTEModem, TheServingCellChangesWithinMinutes) {
@@ -132,16 +133,20 @@ TEST(LTEModem, ServingCellMeasurementsComeEveryOneOrTwoSecondsOfIdling) {
   EXPECT_THAT(all.size(), AllOf(Ge(8u), Le(12u)));
 }
 
-TEST(LTEModem, ServingCellMeasurementsAreBelievable) {
+TEST(LTEModem, ServingCellMeasurementsAreOfTheServingCell) {
   Cell serving{};
-  std::set<unsigned> levels, qualities, rules;
   for (const Message& message : messages(1, 20min)) {
     if (message.code() == 0xB0C2) serving = {message.u16(16), message.u16(14)};
-    if (message.code() != 0xB17F) continue;
+    if (message.code() == 0xB17F) {
+      EXPECT_EQ(ServingMeasurement(message).cell, serving);
+    }
+  }
+}
+
+TEST(LTEModem, ServingCellMeasurementsAreBelievable) {
+  for (const Message& message : messagesOf(0xB17F, 20min)) {
     ASSERT_EQ(message.packet.size(), 33u);
     const ServingMeasurement measurement(message);
-    EXPECT_EQ(measurement.cell, serving);
-    EXPECT_THAT(message.u8(20) >> 1 & 0xF, AnyOf(5u, 6u));  // priority
     // From -120 to -40 dBm, in quarters above -140, and -19.5 to -2 dB above -30.
     EXPECT_THAT(measurement.averageRSRP, AllOf(Ge(80u), Le(400u)));
     EXPECT_THAT(measurement.averageRSRQ, AllOf(Ge(42u), Le(112u)));
@@ -151,21 +156,34 @@ TEST(LTEModem, ServingCellMeasurementsAreBelievable) {
     const double rsrp_dbm = measurement.averageRSRP * 0.25 - 140,
                  rsrq_db = measurement.averageRSRQ * 0.25 - 30;
     EXPECT_NEAR(measurement.rssi * 0.5 - 140, rsrp_dbm + 7.78 - rsrq_db, 0.8);
-    EXPECT_EQ(message.u8(26) >> 1 & 0x3F, 8u);                // -124 dBm
-    EXPECT_NEAR(measurement.left - 30.0, rsrp_dbm + 124, 1);  // above them
-    EXPECT_EQ(message.u16(26) >> 7 & 0x7F, 53u);              // 23 dBm
-    EXPECT_EQ(message.u16(27) >> 6 & 0x3F, 53u);              // 23 dBm
-    EXPECT_EQ((message.u16(29) >> 7) & 0x3F, 0u);             // no cycle without coverage
-    EXPECT_EQ(message.u16(30) >> 5 & 0x3F, 29u);              // 58 dB
-    EXPECT_EQ(message.u16(31) >> 3 & 0x3F, 22u);              // 44 dB
-    EXPECT_EQ(message.u8(32) >> 2 & 0xF, measurement.left > 74 ? 1u : 5u);
-    levels.insert(measurement.averageRSRP);
-    qualities.insert(measurement.averageRSRQ);
-    rules.insert(message.u8(32));
+    EXPECT_NEAR(measurement.left - 30.0, rsrp_dbm + 124, 1);  // above the minimum
   }
-  EXPECT_GE(levels.size(), 50u);
-  EXPECT_GE(qualities.size(), 10u);
-  EXPECT_GE(rules.size(), 3u);
+}
+
+TEST(LTEModem, ServingCellMeasurementsTellWhatTheNetworkBroadcasts) {
+  for (const Message& message : messagesOf(0xB17F, 20min)) {
+    EXPECT_THAT(message.u8(20) >> 1 & 0xF, AnyOf(5u, 6u));  // priority
+    EXPECT_EQ(message.u8(26) >> 1 & 0x3F, 8u);              // -124 dBm
+    EXPECT_EQ(message.u16(26) >> 7 & 0x7F, 53u);            // 23 dBm
+    EXPECT_EQ(message.u16(27) >> 6 & 0x3F, 53u);            // 23 dBm
+    EXPECT_EQ((message.u16(29) >> 7) & 0x3F, 0u);           // no cycle without coverage
+    EXPECT_EQ(message.u16(30) >> 5 & 0x3F, 29u);            // 58 dB
+    EXPECT_EQ(message.u16(31) >> 3 & 0x3F, 22u);            // 44 dB
+  }
+}
+
+TEST(LTEModem, OtherTechnologiesAreMeasuredNearTheMinimum) {
+  const auto all = messagesOf(0xB17F, 20min);
+  for (const Message& message : all)
+    EXPECT_EQ(message.u8(32) >> 2 & 0xF, ServingMeasurement(message).left > 74 ? 1u : 5u);
+  EXPECT_GE(distinctValues(all, [](const Message& message) { return message.u8(32); }).size(), 3u);
+}
+
+TEST(LTEModem, LevelAndQualityOfTheServingCellVary) {
+  std::vector<ServingMeasurement> all;
+  for (const Message& message : messagesOf(0xB17F, 20min)) all.emplace_back(message);
+  EXPECT_GE(distinctValues(all, &ServingMeasurement::averageRSRP).size(), 50u);
+  EXPECT_GE(distinctValues(all, &ServingMeasurement::averageRSRQ).size(), 10u);
 }
 
 TEST(LTEModem, TheCellMonitorHasTheLevelOfTheMeasurements) {
@@ -190,23 +208,36 @@ TEST(LTEModem, TheCellMonitorHasTheLevelOfTheMeasurements) {
   EXPECT_GE(compared, 50);
 }
 
-TEST(LTEModem, IdleNeighborsEnterAndLeave) {
+// Where the cells of 0xB180 begin.
+std::vector<std::size_t> neighborRecords(const Message& message) {
+  const unsigned count = (message.u16(19) >> 6 & 0x1F) + 1;
+  EXPECT_EQ(message.packet.size(), 21 + 20 * count);
+  std::vector<std::size_t> records;
+  for (std::size_t i = 0; i < count; ++i) records.push_back(21 + 20 * i);
+  return records;
+}
+
+std::set<unsigned> neighborCodes(const Message& message) {
+  return distinctValues(neighborRecords(message),
+                        [&](std::size_t record) { return message.u16(record) & 0x1FF; });
+}
+
+TEST(LTEModem, IdleNeighborsAreOtherCellsThanTheServingOne) {
   Cell serving{};
-  std::map<unsigned, std::set<unsigned>> heard;  // by carrier
-  int entered = 0, left = 0;
   for (const Message& message : messages(1, 10min)) {
     if (message.code() == 0xB0C2) serving = {message.u16(16), message.u16(14)};
     if (message.code() != 0xB180) continue;
+    const auto codes = neighborCodes(message);
+    EXPECT_EQ(codes.size(), neighborRecords(message).size());
+    EXPECT_TRUE(message.u16(17) != serving.channel || !codes.contains(serving.code));
+    EXPECT_LE(*codes.rbegin(), 503u);
+  }
+}
+
+TEST(LTEModem, MeasurementsOfIdleNeighborsAreBelievable) {
+  for (const Message& message : messagesOf(0xB180, 10min)) {
     EXPECT_EQ(message.u8(19) & 0x3F, 8u);  // -124 dBm
-    const unsigned count = (message.u16(19) >> 6 & 0x1F) + 1;
-    ASSERT_EQ(message.packet.size(), 21 + 20 * count);
-    const unsigned channel = message.u16(17);
-    std::set<unsigned> codes;
-    for (std::size_t record = 21; record < message.packet.size(); record += 20) {
-      const Cell cell{channel, message.u16(record) & 0x1FF};
-      EXPECT_NE(cell, serving);
-      EXPECT_LE(cell.code, 503u);
-      codes.insert(cell.code);
+    for (const std::size_t record : neighborRecords(message)) {
       const unsigned rssi = message.u16(record + 1) >> 1 & 0xFF, average = message.u16(record + 4) & 0x1FF;
       const unsigned measured = message.u16(record + 2) >> 1 & 0x1FF;
       // From -124 to -40 dBm, in halves above -140, and -19.5 to -2 dB, in quarters above -30.
@@ -217,56 +248,92 @@ TEST(LTEModem, IdleNeighborsEnterAndLeave) {
       EXPECT_THAT(message.u8(record + 6) & 0x7F, AllOf(Ge(42u), Le(112u)));
       EXPECT_NEAR(message.u8(record + 5) >> 1, message.u8(record + 6) & 0x7F, 9);
       EXPECT_NEAR((message.u16(record + 6) >> 7 & 0x7F) - 30.0, average * 0.5 - 140 + 124, 1);
+    }
+  }
+}
+
+TEST(LTEModem, TimesOfIdleNeighborsAreBelievable) {
+  for (const Message& message : messagesOf(0xB180, 10min)) {
+    for (const std::size_t record : neighborRecords(message)) {
       EXPECT_LE(message.u16(record + 8), 300u);
       EXPECT_LE(message.u16(record + 12) & 0x7FF, 1023u);
       // Ten milliseconds of samples, 19 bits from bit 3 on.
       const unsigned sample = (message.u16(record + 13) | message.u8(record + 15) << 16) >> 3;
       EXPECT_LT(sample, 307'204u);
     }
-    EXPECT_EQ(codes.size(), count);
-    if (const auto before = heard.find(channel); before != heard.end()) {
-      for (const unsigned code : codes) entered += !before->second.contains(code);
-      for (const unsigned code : before->second) left += !codes.contains(code);
-    }
-    heard[channel] = codes;
+  }
+}
+
+TEST(LTEModem, IdleNeighborsEnterAndLeave) {
+  std::map<unsigned, std::set<unsigned>> heard;  // by carrier
+  int entered = 0, left = 0;
+  for (const Message& message : messagesOf(0xB180, 10min)) {
+    const auto codes = neighborCodes(message);
+    const auto [carrier, isNew] = heard.try_emplace(message.u16(17), codes);
+    for (const unsigned code : codes) entered += !carrier->second.contains(code);
+    for (const unsigned code : carrier->second) left += !codes.contains(code);
+    carrier->second = codes;
   }
   EXPECT_GE(heard.size(), 2u);
   EXPECT_GE(entered, 10);
   EXPECT_GE(left, 10);
 }
 
+// The cells of 0xB179.
+std::vector<unsigned> measuredNeighbors(const Message& message) {
+  std::vector<unsigned> codes;
+  for (std::size_t i = 0; i < message.u8(27); ++i) codes.push_back(message.u16(29 + 6 * i));
+  return codes;
+}
+std::vector<unsigned> detectedCells(const Message& message) {
+  std::vector<unsigned> codes;
+  for (std::size_t i = 0; i < message.u8(28); ++i)
+    codes.push_back(message.u16(29 + 6 * message.u8(27) + 2 * i));
+  return codes;
+}
+
 TEST(LTEModem, ConnectedMeasurementsTellTheCellsOfTheServingCarrier) {
   Cell serving{};
-  std::set<unsigned> neighbors, detected, levels;
   for (const Message& message : messages(1, 20min)) {
     if (message.code() == 0xB0C2) serving = {message.u16(16), message.u16(14)};
     if (message.code() != 0xB179) continue;
     EXPECT_EQ((Cell{message.u16(17), message.u16(19)}), serving);
+    const auto neighbors = measuredNeighbors(message), detected = detectedCells(message);
+    std::set<unsigned> codes{serving.code};
+    codes.insert(neighbors.begin(), neighbors.end());
+    codes.insert(detected.begin(), detected.end());
+    EXPECT_EQ(codes.size(), 1 + neighbors.size() + detected.size());
+    EXPECT_LE(*codes.rbegin(), 503u);
+  }
+}
+
+TEST(LTEModem, ConnectedMeasurementsAreBelievable) {
+  for (const Message& message : messagesOf(0xB179, 20min)) {
+    ASSERT_EQ(message.packet.size(), 29 + 6 * message.u8(27) + 2 * message.u8(28));
     EXPECT_LT(message.u16(21), 10'240u);
     // From -120 to -40 dBm, in quarters above -140, and -19.5 to -2 dB, in eighths above -20.
     EXPECT_THAT(message.u16(23), AllOf(Ge(80u), Le(400u)));
     EXPECT_THAT(message.u16(25), AllOf(Ge(4u), Le(144u)));
-    levels.insert(message.u16(23));
-    const unsigned neighborCount = message.u8(27), detectedCount = message.u8(28);
-    ASSERT_EQ(message.packet.size(), 29 + 6 * neighborCount + 2 * detectedCount);
-    std::set<unsigned> codes{serving.code};
-    for (std::size_t i = 0; i < neighborCount; ++i) {
-      const std::size_t record = 29 + 6 * i;
-      codes.insert(message.u16(record));
-      neighbors.insert(message.u16(record));
+    for (std::size_t record = 29; record < 29 + 6 * message.u8(27); record += 6) {
       EXPECT_THAT(message.u16(record + 2), AllOf(Ge(64u), Le(400u)));
       EXPECT_THAT(message.u16(record + 4), AllOf(Ge(4u), Le(144u)));
     }
-    for (std::size_t i = 0; i < detectedCount; ++i) {
-      codes.insert(message.u16(29 + 6 * neighborCount + 2 * i));
-      detected.insert(message.u16(29 + 6 * neighborCount + 2 * i));
-    }
-    EXPECT_EQ(codes.size(), 1 + neighborCount + detectedCount);
-    EXPECT_LE(*codes.rbegin(), 503u);
+  }
+}
+
+TEST(LTEModem, ManyCellsAreMeasuredAndDetectedWhileConnected) {
+  std::set<unsigned> neighbors, detected;
+  for (const Message& message : messagesOf(0xB179, 20min)) {
+    for (const unsigned code : measuredNeighbors(message)) neighbors.insert(code);
+    for (const unsigned code : detectedCells(message)) detected.insert(code);
   }
   EXPECT_GE(neighbors.size(), 10u);
   EXPECT_GE(detected.size(), 10u);
-  EXPECT_GE(levels.size(), 50u);
+}
+
+TEST(LTEModem, TheLevelVariesWhileConnected) {
+  const auto all = messagesOf(0xB179, 20min);
+  EXPECT_GE(distinctValues(all, [](const Message& message) { return message.u16(23); }).size(), 50u);
 }
 
 TEST(LTEModem, ReselectionCandidatesComeOneAtATimeAndAreOfEveryTechnology) {

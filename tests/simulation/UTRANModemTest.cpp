@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "platform/TelephonyService.h"
+#include "tests/support/DistinctValues.h"
 #include "tests/support/SimulatedMessages.h"
 
 namespace varnel {
@@ -15,6 +16,7 @@ namespace {
 using namespace std::chrono_literals;
 using testing::AllOf;
 using testing::AnyOf;
+using testing::Each;
 using testing::Ge;
 using testing::Le;
 using testing::UnorderedElementsAre;
@@ -62,7 +64,6 @@ TEST(UTRANModem, StatesFollowOneAnotherAsInANetwork) {
 }
 
 TEST(UTRANModem, ServingCellsAreBelievable) {
-  std::set<unsigned> identities, channels, areas;
   for (const Message& cell : messagesOf(0xD0E2, 40min)) {
     ASSERT_EQ(cell.packet.size(), 26u);
     EXPECT_EQ(cell.u8(14), 0u);
@@ -71,14 +72,15 @@ TEST(UTRANModem, ServingCellsAreBelievable) {
     EXPECT_EQ(cell.u16(17), cell.u16(19));
     EXPECT_LT(cell.u32(21), 1u << 28);
     EXPECT_EQ(cell.u8(25), 0u);
-    identities.insert(cell.u32(21));
-    channels.insert(cell.u16(19));
-    areas.insert(cell.u8(15));
   }
-  // One round through the town.
-  EXPECT_GE(identities.size(), 20u);
-  EXPECT_EQ(channels.size(), 3u);
-  EXPECT_EQ(areas.size(), 3u);
+}
+
+// One round through the town.
+TEST(UTRANModem, TheWalkLeadsThroughCellsOfEveryCarrierAndArea) {
+  const auto cells = messagesOf(0xD0E2, 40min);
+  EXPECT_GE(distinctValues(cells, [](const Message& cell) { return cell.u32(21); }).size(), 20u);
+  EXPECT_EQ(distinctValues(cells, [](const Message& cell) { return cell.u16(19); }).size(), 3u);
+  EXPECT_EQ(distinctValues(cells, [](const Message& cell) { return cell.u8(15); }).size(), 3u);
 }
 
 TEST(UTRANModem, TheServingCellChangesWithinMinutes) {
@@ -123,105 +125,153 @@ struct Neighbor {
   unsigned channel, code, level, set, isDetectedJointly;
 };
 
+std::vector<Neighbor> neighbors(const Message& message) {
+  const unsigned count = message.u8(16) >> 1;
+  EXPECT_EQ(message.packet.size(), 168 + 16 * count);
+  std::vector<Neighbor> cells;
+  for (std::size_t i = 0; i < count; ++i) cells.emplace_back(message, 168 + 16 * i);
+  return cells;
+}
+
 TEST(UTRANModem, NeighborsAreBelievable) {
-  unsigned state = disconnected, servingChannel = 0;
-  std::set<unsigned> sets;
-  for (const Message& message : messages(1, 20min)) {
-    if (message.code() == 0xD0E0) state = message.u8(14);
-    if (message.code() == 0xD0E2) servingChannel = message.u16(19);
-    if (message.code() != 0xD00A) continue;
-    const unsigned count = message.u8(16) >> 1;
-    ASSERT_EQ(message.packet.size(), 168 + 16 * count);
-    std::set<unsigned> codes;
-    unsigned active = 0;
-    for (std::size_t i = 0; i < count; ++i) {
-      const Neighbor cell(message, 168 + 16 * i);
+  for (const Message& message : messagesOf(0xD00A, 20min)) {
+    const auto cells = neighbors(message);
+    for (const Neighbor& cell : cells) {
       EXPECT_THAT(cell.channel, AnyOf(10054u, 10062u, 10070u));
       // From -105 to -40 dBm, in halves above -140.
       EXPECT_THAT(cell.level, AllOf(Ge(70u), Le(200u)));
-      EXPECT_EQ(cell.isDetectedJointly, cell.channel == servingChannel ? 1u : 0u);
       EXPECT_LE(cell.set, 2u);
-      EXPECT_TRUE(cell.set != 2 || state == cellDCH) << state;
-      active += cell.set == 0;
-      codes.insert(cell.code);
-      sets.insert(cell.set);
     }
-    EXPECT_EQ(active, state == cellDCH || state == cellFach ? 1u : 0u);
-    EXPECT_EQ(codes.size(), count);
+    EXPECT_EQ(distinctValues(cells, &Neighbor::code).size(), cells.size());
+  }
+}
+
+TEST(UTRANModem, NeighborsOfTheServingCarrierAreDetectedJointly) {
+  unsigned servingChannel = 0;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0xD0E2) servingChannel = message.u16(19);
+    if (message.code() != 0xD00A) continue;
+    for (const Neighbor& cell : neighbors(message))
+      EXPECT_EQ(cell.isDetectedJointly, cell.channel == servingChannel ? 1u : 0u);
+  }
+}
+
+TEST(UTRANModem, NeighborsAreOfTheSetsOfTheState) {
+  unsigned state = disconnected;
+  std::set<unsigned> sets;
+  for (const Message& message : messages(1, 20min)) {
+    if (message.code() == 0xD0E0) state = message.u8(14);
+    if (message.code() != 0xD00A) continue;
+    const auto cells = neighbors(message);
+    EXPECT_EQ(std::ranges::count(cells, 0u, &Neighbor::set), state == cellDCH || state == cellFach ? 1 : 0);
+    EXPECT_TRUE(state == cellDCH || std::ranges::count(cells, 2u, &Neighbor::set) == 0) << state;
+    sets.merge(distinctValues(cells, &Neighbor::set));
   }
   EXPECT_THAT(sets, UnorderedElementsAre(0u, 1u, 2u));
 }
 
 TEST(UTRANModem, NeighborsEnterAndLeave) {
-  std::set<unsigned> heard, all;
+  std::set<unsigned> heard;
   int entered = 0, left = 0;
   for (const Message& message : messagesOf(0xD00A, 5min)) {
-    std::set<unsigned> codes;
-    for (std::size_t record = 168; record < message.packet.size(); record += 16)
-      codes.insert(Neighbor(message, record).code);
+    const std::set<unsigned> codes = distinctValues(neighbors(message), &Neighbor::code);
     for (const unsigned code : codes) entered += !heard.contains(code);
     for (const unsigned code : heard) left += !codes.contains(code);
     heard = codes;
-    all.insert(codes.begin(), codes.end());
   }
   EXPECT_GE(entered, 20);
   EXPECT_GE(left, 20);
-  EXPECT_GE(all.size(), 8u);
 }
 
-TEST(UTRANModem, GSMNeighborsAreBelievableAndEnterAndLeave) {
-  std::set<unsigned> channels, counts, validities;
-  for (const Message& message : messagesOf(0xD00E, 20min)) {
-    const unsigned count = message.u8(16);
-    counts.insert(count);
-    ASSERT_EQ(message.packet.size(), 17 + 8 * count);
-    for (std::size_t record = 17; record < message.packet.size(); record += 8) {
-      EXPECT_THAT(message.u16(record) & 0x3FFF, AllOf(Ge(12000u), Le(12011u)));
-      EXPECT_EQ(message.u8(record + 1) >> 6 & 1, 0u);
-      const unsigned isValid = message.u8(record + 1) >> 7;
-      validities.insert(isValid);
-      EXPECT_LE(message.u8(record + 2), isValid ? 7u : 0u);
-      EXPECT_LE(message.u8(record + 3), isValid ? 7u : 0u);
-      EXPECT_THAT(message.u16(record + 4), AllOf(Ge(10u), Le(50u)));
-      const auto level_dbm = static_cast<std::int16_t>(message.u16(record + 6));
-      EXPECT_THAT(level_dbm, AllOf(Ge(-100), Le(-40)));
-      channels.insert(message.u16(record + 4));
-    }
+TEST(UTRANModem, ManyCellsAreNeighborsOverTime) {
+  std::set<unsigned> codes;
+  for (const Message& message : messagesOf(0xD00A, 5min))
+    codes.merge(distinctValues(neighbors(message), &Neighbor::code));
+  EXPECT_GE(codes.size(), 8u);
+}
+
+// A record of 0xD00E.
+struct GSMNeighbor {
+  unsigned identity, isValid, network, base, channel;
+  int level_dbm;
+};
+std::vector<GSMNeighbor> gsmNeighbors(std::chrono::milliseconds duration) {
+  std::vector<GSMNeighbor> cells;
+  for (const Message& message : messagesOf(0xD00E, duration)) {
+    EXPECT_EQ(message.packet.size(), 17 + 8 * message.u8(16));
+    for (std::size_t record = 17; record < message.packet.size(); record += 8)
+      cells.push_back({message.u16(record) & 0x7FFF, message.u8(record + 1) >> 7, message.u8(record + 2),
+                       message.u8(record + 3), message.u16(record + 4),
+                       static_cast<std::int16_t>(message.u16(record + 6))});
   }
-  EXPECT_GE(counts.size(), 3u);
-  EXPECT_GE(channels.size(), 4u);
-  EXPECT_THAT(validities, UnorderedElementsAre(0u, 1u));
+  return cells;
 }
 
-TEST(UTRANModem, ChannelsAreMeasuredWhileThereAreAny) {
+TEST(UTRANModem, GSMNeighborsAreBelievable) {
+  for (const GSMNeighbor& cell : gsmNeighbors(20min)) {
+    EXPECT_THAT(cell.identity, AllOf(Ge(12000u), Le(12011u)));
+    EXPECT_THAT(cell.channel, AllOf(Ge(10u), Le(50u)));
+    EXPECT_THAT(cell.level_dbm, AllOf(Ge(-100), Le(-40)));
+  }
+}
+
+TEST(UTRANModem, OnlyIdentifiedGSMNeighborsHaveAnIdentityCode) {
+  const auto cells = gsmNeighbors(20min);
+  for (const GSMNeighbor& cell : cells) {
+    EXPECT_LE(cell.network, cell.isValid ? 7u : 0u);
+    EXPECT_LE(cell.base, cell.isValid ? 7u : 0u);
+  }
+  EXPECT_THAT(distinctValues(cells, &GSMNeighbor::isValid), UnorderedElementsAre(0u, 1u));
+}
+
+TEST(UTRANModem, GSMNeighborsEnterAndLeave) {
+  const auto all = messagesOf(0xD00E, 20min);
+  EXPECT_GE(distinctValues(all, [](const Message& message) { return message.u8(16); }).size(), 3u);
+  EXPECT_GE(distinctValues(gsmNeighbors(20min), &GSMNeighbor::channel).size(), 4u);
+}
+
+// How many channels and composites a message of 0xD00C tells.
+unsigned channelCount(const Message& message) { return message.u16(14) >> 6 & 0x3F; }
+unsigned compositeCount(const Message& message) { return message.u8(15) >> 4; }
+
+TEST(UTRANModem, ChannelsAreThoseOfTheState) {
   unsigned state = disconnected;
-  std::set<unsigned> errorRates, ratios;
-  int released = 0;
   for (const Message& message : messages(1, 20min)) {
     if (message.code() == 0xD0E0) state = message.u8(14);
     if (message.code() != 0xD00C) continue;
-    const unsigned channels = message.u16(14) >> 6 & 0x3F, composites = message.u8(15) >> 4;
-    EXPECT_EQ(channels, state == cellDCH ? 4u : state == cellFach ? 1u : 0u);
-    EXPECT_EQ(composites, state == cellDCH ? 2u : state == cellFach ? 1u : 0u);
-    released += channels == 0;
-    ASSERT_EQ(message.packet.size(), 289 + 34 * channels + 8 * composites);
-    for (std::size_t record = 17; record < 17 + 2 * channels; record += 2) {
-      EXPECT_THAT(message.u8(record), AllOf(Ge(1u), Le(32u)));
-      EXPECT_LE(message.u8(record + 1), 63u);
-      errorRates.insert(message.u8(record + 1));
-    }
-    for (std::size_t record = 289 + 34 * channels; record < message.packet.size(); record += 8) {
-      EXPECT_THAT(message.u8(record), AnyOf(1u, 2u));
-      EXPECT_LE(message.u8(record + 1), 6u);
-      for (std::size_t i = 2; i < 8; ++i) {
-        // From 0 to 14 dB, in halves above -11.
-        EXPECT_THAT(message.u8(record + i), AllOf(Ge(22u), Le(50u)));
-        ratios.insert(message.u8(record + i));
-      }
+    EXPECT_EQ(channelCount(message), state == cellDCH ? 4u : state == cellFach ? 1u : 0u);
+    EXPECT_EQ(compositeCount(message), state == cellDCH ? 2u : state == cellFach ? 1u : 0u);
+    EXPECT_EQ(message.packet.size(), 289 + 34 * channelCount(message) + 8 * compositeCount(message));
+  }
+}
+
+TEST(UTRANModem, ChannelsAreTakenBackWhenTheyAreGone) {
+  EXPECT_GE(std::ranges::count(messagesOf(0xD00C, 20min), 0u, channelCount), 10);
+}
+
+TEST(UTRANModem, ErrorRatesAreBelievableAndVary) {
+  std::set<unsigned> errorRates;
+  for (const Message& message : messagesOf(0xD00C, 20min)) {
+    for (std::size_t i = 0; i < channelCount(message); ++i) {
+      EXPECT_THAT(message.u8(17 + 2 * i), AllOf(Ge(1u), Le(32u)));
+      errorRates.insert(message.u8(18 + 2 * i));
     }
   }
-  EXPECT_GE(released, 10);
+  EXPECT_THAT(errorRates, Each(Le(63u)));
   EXPECT_GE(errorRates.size(), 10u);
+}
+
+TEST(UTRANModem, RatiosOfCompositesAreBelievableAndVary) {
+  std::set<unsigned> ratios;
+  for (const Message& message : messagesOf(0xD00C, 20min)) {
+    for (std::size_t record = 289 + 34 * channelCount(message); record < message.packet.size(); record += 8) {
+      EXPECT_THAT(message.u8(record), AnyOf(1u, 2u));
+      EXPECT_LE(message.u8(record + 1), 6u);
+      for (std::size_t i = 2; i < 8; ++i) ratios.insert(message.u8(record + i));
+    }
+  }
+  // From 0 to 14 dB, in halves above -11.
+  EXPECT_THAT(ratios, Each(AllOf(Ge(22u), Le(50u))));
   EXPECT_GE(ratios.size(), 5u);
 }
 
