@@ -261,7 +261,7 @@ void LTEModem::considerReselection() {
 // priority and technology of the next.
 void LTEModem::sendReselectionCandidate(const Cell& serving, const Cell& candidate) {
   constexpr std::size_t headSize = 21, recordSize = 8, recordSizeOfCDMA = 12;
-  enum Technology { lte, utran, geran, cdma1xRTT, cdmaHRPD };
+  enum Technology { LTE, UTRAN, GERAN, CDMA1xRTT, CDMAHRPD };
   const bool isCDMA = candidate.access == Access::CDMA1xRTT || candidate.access == Access::HRPD;
   PacketWriter packet(candidatesCode, now(), headSize);
   packet
@@ -273,19 +273,19 @@ void LTEModem::sendReselectionCandidate(const Cell& serving, const Cell& candida
       .u16(0, priority(candidate));
   switch (candidate.access) {
     case Access::LTE:
-      packet.u16(2, lte).u16(4, candidate.channel).bits(6, 7, 9, candidate.code);
+      packet.u16(2, LTE).u16(4, candidate.channel).bits(6, 7, 9, candidate.code);
       break;
     case Access::UMTS:
     case Access::UTRAN:
-      packet.u16(2, utran).u16(4, candidate.channel).u16(6, candidate.code);
+      packet.u16(2, UTRAN).u16(4, candidate.channel).u16(6, candidate.code);
       break;
     case Access::GSM:
       // LTE uses number 8 for the band of 900 MHz.
-      packet.u16(2, geran).u16(4, candidate.channel).u8(6, 8).u8(7, candidate.code);
+      packet.u16(2, GERAN).u16(4, candidate.channel).u8(6, 8).u8(7, candidate.code);
       break;
     case Access::CDMA1xRTT:
     case Access::HRPD:
-      packet.u16(2, candidate.access == Access::HRPD ? cdmaHRPD : cdma1xRTT)
+      packet.u16(2, candidate.access == Access::HRPD ? CDMAHRPD : CDMA1xRTT)
           .u8(4, candidate.band)
           .u16(8, candidate.channel)
           .u16(10, candidate.code);
