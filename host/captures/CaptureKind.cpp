@@ -69,7 +69,8 @@ Verdict verdictWithoutMore(Beginning beginning, Verdict otherwise) {
   return beginning == Beginning::Whole ? otherwise : Verdict::NeedsMore;
 }
 
-// Whether frames that tell their length begin here. A log frame says so alone, others want a successor.
+// Whether frames with lengths begin here. One log frame is enough; any other frame needs a second one after
+// it.
 Verdict lengthFrames(ByteView bytes, Beginning beginning) {
   const auto size = lengthFrameAt(bytes);
   if (!size) return verdictWithoutMore(beginning, Verdict::Unknown);
@@ -81,7 +82,7 @@ Verdict lengthFrames(ByteView bytes, Beginning beginning) {
   return rest[0] == frameEnd && rest[1] == 0x01 ? Verdict::Known : Verdict::Unknown;
 }
 
-// Whether a log frame that tells its length is among the bytes.
+// Whether the bytes hold a log frame with a length.
 bool hasLengthFrame(ByteView bytes) {
   bytes = bytes.first(std::min(bytes.size(), longestSearch));
   for (auto at = bytes.begin(); at != bytes.end(); ++at) {
@@ -102,14 +103,14 @@ bool isSoundSegment(ByteView segment) {
   return frame.size() >= smallest && isSound(frame);
 }
 
-// Whether the bytes begin with a whole and sound frame, which may begin with the end of another.
+// Whether the bytes begin with a whole, sound frame. Before it, there may be the end of another frame.
 bool beginsWithSoundFrame(ByteView bytes) {
   while (!bytes.empty() && bytes[0] == frameEnd) bytes = bytes.subspan(1);
   const auto end = std::ranges::find(bytes, frameEnd);
   return end != bytes.end() && isSoundSegment({bytes.begin(), end});
 }
 
-// Whether a sound frame with a checksum is among the bytes.
+// Whether the bytes hold a sound frame with a checksum.
 bool hasSoundFrame(ByteView bytes) {
   bytes = bytes.first(std::min(bytes.size(), longestSearch));
   auto begin = bytes.begin();
@@ -121,11 +122,11 @@ bool hasSoundFrame(ByteView bytes) {
   return false;
 }
 
-// Whether records follow each other from the first byte on: three, or all that there are but for a torn one.
+// Whether records follow each other from the first byte: three, or all that there are except a torn one.
 Verdict recordChain(ByteView bytes, Beginning beginning) {
   constexpr int enough = 3;
   constexpr std::size_t codeOffset = 2, timeEnd = smallestRecord - sizeof(std::uint16_t);
-  constexpr std::uint16_t endOfTime = 0x02C2;  // the year 2100, by the upper bits of a modem's time
+  constexpr std::uint16_t endOfTime = 0x02C2;  // the year 2100, in the upper bits of a modem's time
   for (int records = 0; records < enough; ++records) {
     const Verdict verdictAtEnd =
         verdictWithoutMore(beginning, records > 0 ? Verdict::Known : Verdict::Unknown);
@@ -141,8 +142,8 @@ Verdict recordChain(ByteView bytes, Beginning beginning) {
   return Verdict::Known;
 }
 
-// The header of a phone's own log file: its length (4), version (1), whether frames have checksums (1), how
-// many identifiers follow (4) and these, 16 bytes each; later versions have more.
+// The header of a phone's own log file: its length (4), version (1), whether frames have checksums (1), the
+// number of identifiers (4), and the identifiers (16 each). Later versions have more.
 Recognition logFileHeader(ByteView bytes, Beginning beginning) {
   constexpr std::uint32_t fixedSize = 10, identifierSize = 16, largest = 4096, lengthSize = 4;
   constexpr std::uint8_t latestVersion = 16;
@@ -152,7 +153,7 @@ Recognition logFileHeader(ByteView bytes, Beginning beginning) {
   const std::uint64_t identifiers = std::uint64_t{loadLittleEndian<std::uint32_t>(bytes, 6)} * identifierSize;
   if (length >= largest || version == 0 || version > latestVersion || flag > 1) return {};
   if (length + lengthSize < fixedSize + identifiers) return {};
-  // Most lengths count themselves.
+  // Most lengths include their own bytes.
   for (const std::uint32_t size : {length, length + lengthSize}) {
     if (size < fixedSize + identifiers) continue;
     if (bytes.size() < size) return {verdictWithoutMore(beginning, Verdict::Unknown)};

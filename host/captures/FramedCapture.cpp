@@ -14,11 +14,11 @@ constexpr std::uint8_t escape = 0x7D;
 constexpr std::uint8_t escapeBit = 0x20;
 constexpr std::size_t checksumSize = 2;
 constexpr std::size_t smallestSegment = checksumSize + 1;
-// Each byte may be escaped.
+// Every byte may have an escape.
 constexpr std::size_t longestSegment = 2 * (longestContents + checksumSize);
 
 std::uint8_t* find(std::uint8_t wanted, std::uint8_t* begin, const std::uint8_t* end) {
-  if (begin == end) return nullptr;  // where there may be no bytes at all to look at
+  if (begin == end) return nullptr;  // there may be no bytes to look at
   return static_cast<std::uint8_t*>(std::memchr(begin, wanted, static_cast<std::size_t>(end - begin)));
 }
 
@@ -54,7 +54,7 @@ std::optional<std::span<std::uint8_t>> FrameScanner::next() {
   return std::nullopt;
 }
 
-// What stands between two frame ends and may be a frame by its length.
+// The bytes between two frame ends, if their number fits a frame.
 std::optional<std::span<std::uint8_t>> FrameScanner::nextSegment() {
   for (;;) {
     const auto unread = _bytes.unread();

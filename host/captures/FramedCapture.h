@@ -7,16 +7,16 @@
 
 namespace varnel {
 
-/// Finds the frames of a diagnostic port in its stream: each ends in 0x7E and may begin with one; 0x7D
-/// escapes the byte behind it; the last two bytes are a checksum. Frames come in the buffer that they were
-/// read into.
+/// Finds the frames in the stream of a diagnostic port. Each ends in 0x7E and may begin with one. 0x7D
+/// escapes the next byte. The last two bytes are a checksum. Frames are in the buffer into which they were
+/// read.
 class FrameScanner {
  public:
-  /// Both outlive the scanner.
+  /// Both must outlive the scanner.
   FrameScanner(ByteWindow& bytes, LeftOut& leftOut) : _bytes(bytes), _leftOut(leftOut) {}
 
-  /// The contents of the next sound frame, without its checksum, which the reader may write to; nothing at
-  /// the end. What is not sound is counted. Valid until the next call. Throws CaptureError.
+  /// The contents of the next sound frame, without its checksum; nothing at the end. The caller may change
+  /// the bytes. Frames that are not sound are counted. Valid until the next call. Throws CaptureError.
   std::optional<std::span<std::uint8_t>> next();
 
  private:
@@ -26,9 +26,9 @@ class FrameScanner {
 
   ByteWindow& _bytes;
   LeftOut& _leftOut;
-  std::size_t _searched = 0;  // of the unread bytes: no frame ends there
+  std::size_t _searched = 0;  // no frame ends in this many unread bytes
   bool _isWithinNoise = false;
-  bool _mayBeTorn = true;  // the first frame began before the capture did, unless a frame's end comes before
+  bool _mayBeTorn = true;  // the first frame began before the capture, unless a frame end comes first
 };
 
 /// The framed stream of a diagnostic port.
@@ -41,8 +41,7 @@ class FramedCapture final : public Capture {
   FrameScanner _frames;
 };
 
-/// The bytes between two frame ends without their escapes, in their own place; empty when an escape has no
-/// byte behind it.
+/// Removes the escapes of the bytes between two frame ends, in place. Empty when an escape is the last byte.
 std::span<std::uint8_t> unescaped(std::span<std::uint8_t> segment);
 
 }  // namespace varnel
