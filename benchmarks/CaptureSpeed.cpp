@@ -16,13 +16,13 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "host/FileResources.h"
-#include "host/SystemClock.h"
 #include "host/captures/Capture.h"
 #include "host/captures/FramedCapture.h"
 #include "host/captures/ModemTime.h"
 #include "host/captures/PcapEncoders.h"
 #include "host/captures/StreamEncoders.h"
 #include "platform/TelephonyService.h"
+#include "programs/varnel-decode/OfflineDecoder.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 // What captures take to be read, a line a way: the least that framing takes, framing alone, and whole
@@ -71,9 +71,16 @@ std::vector<Bytes> unknownMessages() {
   return messages;
 }
 
+// Modems put their own time into what they send.
+void setTime(Bytes& message, Time time) {
+  constexpr std::size_t timeOffset = 5;
+  const ModemTime now = modemTimeOf(time);
+  std::memcpy(message.data() + timeOffset, &now.raw, sizeof now.raw);
+}
+
 // A message each millisecond, of which each so many-th is known.
 void makeFiles(const Files& files, std::size_t everySoMany) {
-  const std::vector<Bytes> known = knownMessages(), unknown = unknownMessages();
+  std::vector<Bytes> known = knownMessages(), unknown = unknownMessages();
   std::ofstream framed(files.framed, std::ios::binary), pcap(files.pcap, std::ios::binary);
   FramedWriter frames;
   PcapWriter packets;
@@ -82,7 +89,8 @@ void makeFiles(const Files& files, std::size_t everySoMany) {
     const Time time{1'709'301'909 + static_cast<std::int64_t>(i / 1000),
                     static_cast<std::int32_t>(i % 1000 * 1'000'000)};
     const std::size_t number = i / everySoMany;
-    const Bytes& message = i % everySoMany == 0 ? known[number % known.size()] : unknown[i % unknown.size()];
+    Bytes& message = i % everySoMany == 0 ? known[number % known.size()] : unknown[i % unknown.size()];
+    setTime(message, time);
     const CaptureRecord record{time, Dating::Known, message, {}};
     write(framed, frames.encode(record));
     write(pcap, packets.encode(record));
@@ -166,19 +174,18 @@ std::size_t readAll(const std::string& path) {
   return found;
 }
 
+// To displays, of which there is one every two seconds.
 std::size_t decodeAll(const std::string& path) {
   const FileResources resources{resourceFolder()};
-  const SystemClock clock;
+  CaptureClock clock;
   const ApplicationInfo application;
   std::ostream nowhere(nullptr);
   const auto generator =
       LogGenerator::generatorFromTechnology(technology::kalviLTE, {resources, clock, application, nowhere});
-  generator->keepNoRawBytes();
-  Dictionary state;
+  OfflineDecoder decoder(*generator, clock, RawBytes::NotKept);
   const auto capture = openCapture(path);
   std::size_t found = 0;
-  for (CaptureRecord record; capture->next(record); ++found)
-    generator->updateState_withData(state, record.message);
+  for (CaptureRecord record; capture->next(record); ++found) decoder.deliver(record.time, record.message);
   return found;
 }
 
