@@ -2,6 +2,7 @@
 
 #include <array>
 
+#include "host/captures/ChecksumFolding.h"
 #include "host/captures/LittleEndian.h"
 
 namespace varnel {
@@ -82,6 +83,9 @@ std::uint16_t frameChecksum(ByteView contents) {
   return static_cast<std::uint16_t>(~registerAfter(contents));
 }
 
-bool isSound(ByteView frame) { return registerAfter(frame) == residue; }
+bool isSound(ByteView frame) {
+  if (frame.size() >= leastToFold && canFold()) return isSoundByFolding(frame);
+  return registerAfter(frame) == residue;
+}
 
 }  // namespace varnel
