@@ -15,6 +15,7 @@ class Notice {
     Link,             ///< why nothing arrives
     MissingTemplate,  ///< why nothing can be shown
     StandingDisplay,  ///< that new messages are not shown any more
+    Mixture,          ///< that the display mixes several SIM cards
     Source,           ///< what the server says about where its messages come from
     DroppedByServer,
     TooLong,

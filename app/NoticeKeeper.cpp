@@ -69,6 +69,7 @@ bool NoticeKeeper::update() {
       {Matter::Link, linkLine(report)},
       {Matter::MissingTemplate, templateLine()},
       {Matter::StandingDisplay, standingLine()},
+      {Matter::Mixture, report.mixture},
       {Matter::Source, report.serverNote},
       {Matter::DroppedByServer, countLine("Messages that the server dropped, since they were read too slowly",
                                           report.droppedByServer)},

@@ -4,8 +4,10 @@
 #include <cerrno>
 #include <iterator>
 #include <system_error>
+#include <vector>
 
 #include "host/StreamReport.h"
+#include "host/Subscription.h"
 #include "host/TelephonyProtocol.h"
 
 namespace varnel {
@@ -65,7 +67,22 @@ std::string asSentence(std::string_view text) {
 LinkReport LinkMonitor::linkReport() const {
   LinkReport report = _report;
   report.place = _folder.string();
+  report.mixture = mixture();
   return report;
+}
+
+std::string LinkMonitor::mixture() const {
+  if (_shownSubscriptions.count() < 2) return {};
+  std::vector<std::uint8_t> numbers;
+  for (unsigned number = 0; number < _shownSubscriptions.size(); ++number)
+    if (_shownSubscriptions.test(number)) numbers.push_back(static_cast<std::uint8_t>(number));
+  return "The display mixes what the modems of " + subscriptionNames(numbers) +
+         " send; to see one of them alone, start varnel with --sim " + std::to_string(numbers.front());
+}
+
+void LinkMonitor::linkIsOpen() {
+  _report = {};
+  _shownSubscriptions.reset();
 }
 
 void LinkMonitor::tell(std::string_view what, std::string_view whatToDo) {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <bitset>
 #include <cstdint>
 #include <filesystem>
 #include <string>
@@ -28,15 +29,19 @@ class LinkMonitor final : public LinkReports {
   /// The server did not answer a command.
   void commandWentUnanswered();
   /// The server takes commands. Forgets what was reported about an earlier link.
-  void linkIsOpen() { _report = {}; }
+  void linkIsOpen();
+  /// A message of this SIM card's modem has arrived, and the viewer shows it.
+  void subscriptionIsShown(std::uint8_t subscription) { _shownSubscriptions.set(subscription); }
   /// Takes the server's report about its stream. Ignores bytes that are no report.
   void takeStreamReport(ByteView bytes);
 
  private:
   void tell(std::string_view what, std::string_view whatToDo);
+  std::string mixture() const;
 
   const std::filesystem::path _folder;
   LinkReport _report;
+  std::bitset<256> _shownSubscriptions;
 };
 
 }  // namespace varnel

@@ -17,4 +17,13 @@ std::string subscriptionName(std::optional<std::uint8_t> subscription) {
   return subscription ? "SIM " + std::to_string(*subscription) : "No SIM";
 }
 
+std::string subscriptionNames(std::span<const std::uint8_t> subscriptions) {
+  std::string names;
+  for (std::size_t i = 0; i < subscriptions.size(); ++i) {
+    if (i > 0) names += i + 1 < subscriptions.size() ? ", " : " and ";
+    names += subscriptionName(subscriptions[i]);
+  }
+  return names;
+}
+
 }  // namespace varnel

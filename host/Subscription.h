@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <optional>
+#include <span>
 #include <string>
 
 #include "base/Bytes.h"
@@ -34,5 +35,7 @@ class SubscriptionFilter {
 
 /// How messages to users name a subscription, or none.
 std::string subscriptionName(std::optional<std::uint8_t> subscription);
+/// The same of several, as "SIM 1, SIM 2 and SIM 3".
+std::string subscriptionNames(std::span<const std::uint8_t> subscriptions);
 
 }  // namespace varnel

@@ -1,25 +1,29 @@
 #pragma once
 
+#include <cstdint>
 #include <memory>
+#include <optional>
 
-#include "host/Subscription.h"
+#include "host/LinkMonitor.h"
 #include "platform/MessagePort.h"
 
 namespace varnel {
 
-/// Message ports whose local ports get only the messages of one subscription, and those without one.
+/// Message ports whose local ports get only the messages of one subscription, and those without one. When no
+/// subscription is wanted they get all messages. The monitor learns which subscriptions they got.
 class SubscriptionPorts final : public MessagePorts {
  public:
-  /// The ports must outlive this object.
-  SubscriptionPorts(MessagePorts& ports, std::uint8_t subscription)
-      : _ports(ports), _subscription(subscription) {}
+  /// The ports and the monitor must outlive this object.
+  SubscriptionPorts(MessagePorts& ports, LinkMonitor& monitor, std::optional<std::uint8_t> wanted)
+      : _ports(ports), _monitor(monitor), _wanted(wanted) {}
 
   LocalPortCreation createLocalPort(std::string_view name, LocalPort::MessageHandler handler) override;
   std::unique_ptr<RemotePort> createRemotePort(std::string_view name) override;
 
  private:
   MessagePorts& _ports;
-  std::uint8_t _subscription;
+  LinkMonitor& _monitor;
+  std::optional<std::uint8_t> _wanted;
 };
 
 }  // namespace varnel

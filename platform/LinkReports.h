@@ -15,6 +15,9 @@ struct LinkReport {
   /// The server's last sentence about where its messages come from, for example that a replay has ended.
   /// Empty when it has sent none since the link was opened.
   std::string serverNote;
+  /// One sentence: that messages of several SIM cards have arrived since the link was opened, that the
+  /// display mixes them, and how to see one card. Empty when there are not several.
+  std::string mixture;
   /// How many messages the server could not deliver since the link was opened, because this viewer reads too
   /// slowly.
   std::uint64_t droppedByServer = 0;

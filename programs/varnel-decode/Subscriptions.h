@@ -29,7 +29,7 @@ class Subscriptions {
   std::optional<std::string> remark(const std::string& captureName) const;
 
  private:
-  std::vector<std::string> others() const;
+  std::vector<std::uint8_t> others() const;
 
   const std::optional<std::uint8_t> _wanted;
   SubscriptionFilter _filter;

@@ -10,24 +10,16 @@ HostServices::HostServices(const Options& options, const ApplicationInfo& applic
       _folder(runtimeFolder(options.runtimeFolder)),
       _link(_folder),
       _ports(_folder, &_link),
+      _portsOfSubscription(_ports, _link, options.subscription),
       _telephony(_folder, std::chrono::seconds(1), &_link),
       _resources(readableResourceFolder()),
       _files(options.deviceRoot),
       _preferences(options.deviceRoot),
-      _application(application) {
-  if (options.subscription)
-    _portsOfSubscription.emplace(_ports, static_cast<std::uint8_t>(*options.subscription));
-}
+      _application(application) {}
 
 ModelServices HostServices::model(std::ostream& standardOutput) {
-  return {
-      ports(), _telephony, _queue, {_resources, _clock, _application, standardOutput}, writeXmlPropertyList,
-      &_link};
-}
-
-MessagePorts& HostServices::ports() {
-  if (_portsOfSubscription) return *_portsOfSubscription;
-  return _ports;
+  return {_portsOfSubscription, _telephony, _queue, {_resources, _clock, _application, standardOutput},
+          writeXmlPropertyList, &_link};
 }
 
 }  // namespace varnel

@@ -1,7 +1,6 @@
 #pragma once
 
 #include <iostream>
-#include <optional>
 
 #include "host/EventLoopQueue.h"
 #include "host/FilePreferences.h"
@@ -31,14 +30,11 @@ class HostServices final {
   Preferences& preferences() { return _preferences; }
 
  private:
-  // All ports, or only those of the subscription that the user asked for.
-  MessagePorts& ports();
-
   HostLog _log;
   std::filesystem::path _folder;
   LinkMonitor _link;
   SocketPorts _ports;
-  std::optional<SubscriptionPorts> _portsOfSubscription;  // set when the user asked for one
+  SubscriptionPorts _portsOfSubscription;  // of all subscriptions unless the user asked for one
   SocketTelephonyService _telephony;
   EventLoopQueue _queue;
   FileResources _resources;

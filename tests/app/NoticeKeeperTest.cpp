@@ -224,6 +224,17 @@ TEST_F(NoticeKeeperTest, WhatTheServerSaysOfItsSourceIsPassedOn) {
   EXPECT_EQ(keeper.text(), "The replay has ended");
 }
 
+TEST_F(NoticeKeeperTest, AMixtureOfSimCardsIsToldAsLongAsItIsOne) {
+  start();
+  receive();
+  link.report.mixture = "The display mixes SIM 1 and SIM 2";
+  queue.advance(4s);
+  EXPECT_EQ(keeper.text(), "The display mixes SIM 1 and SIM 2");
+  link.report.mixture.clear();
+  queue.advance(2s);
+  EXPECT_EQ(keeper.text(), "");
+}
+
 TEST_F(NoticeKeeperTest, MessagesThatAreNotShownAreCountedALineForEachReason) {
   start();
   link.report.droppedByServer = 12;

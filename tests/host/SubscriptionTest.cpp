@@ -60,9 +60,16 @@ class HandedPorts final : public MessagePorts {
   LocalPort::MessageHandler deliver;
 };
 
+TEST(Subscription, SeveralAreNamedInARow) {
+  EXPECT_EQ(subscriptionNames(Bytes{1}), "SIM 1");
+  EXPECT_EQ(subscriptionNames(Bytes{1, 2}), "SIM 1 and SIM 2");
+  EXPECT_EQ(subscriptionNames(Bytes{1, 2, 255}), "SIM 1, SIM 2 and SIM 255");
+}
+
 TEST(SubscriptionPorts, DeliverOneSubscriptionAndWhatNamesNone) {
   HandedPorts handed;
-  SubscriptionPorts ports(handed, 2);
+  LinkMonitor monitor("/run/varnel");
+  SubscriptionPorts ports(handed, monitor, 2);
   std::vector<Bytes> delivered;
   const auto created = ports.createLocalPort("log", [&](std::int32_t identifier, ByteView data) {
     delivered.emplace_back(data.begin(), data.end());
@@ -78,6 +85,37 @@ TEST(SubscriptionPorts, DeliverOneSubscriptionAndWhatNamesNone) {
   EXPECT_THAT(delivered, ElementsAre(second, unnamed, plain));
   EXPECT_EQ(ports.createRemotePort("commands"), nullptr);
   EXPECT_EQ(handed.lastName, "commands");
+  EXPECT_EQ(monitor.linkReport().mixture, "");
+}
+
+TEST(SubscriptionPorts, DeliverAllAndTellOfAMixtureUnlessOneIsWanted) {
+  HandedPorts handed;
+  LinkMonitor monitor("/run/varnel");
+  SubscriptionPorts ports(handed, monitor, {});
+  std::vector<Bytes> delivered;
+  ports.createLocalPort("log", [&](std::int32_t identifier, ByteView data) {
+    delivered.emplace_back(data.begin(), data.end());
+    return std::optional<Bytes>(Bytes{static_cast<std::uint8_t>(identifier)});
+  });
+  const Bytes first{0x81, 1, 1, 13}, second{0x81, 2, 1, 13}, unnamed{0x81, 0, 1, 13}, plain{1, 13};
+  EXPECT_EQ(handed.deliver(7, second), Bytes{7});
+  EXPECT_EQ(handed.deliver(8, unnamed), Bytes{8});
+  EXPECT_EQ(handed.deliver(9, plain), Bytes{9});
+  EXPECT_EQ(handed.deliver(9, second), Bytes{9});
+  EXPECT_EQ(monitor.linkReport().mixture, "");
+  EXPECT_EQ(handed.deliver(9, first), Bytes{9});
+  EXPECT_THAT(delivered, ElementsAre(second, unnamed, plain, second, first));
+  const std::string told =
+      "The display mixes what the modems of SIM 1 and SIM 2 send; to see one of them alone, start varnel "
+      "with --sim 1";
+  EXPECT_EQ(monitor.linkReport().mixture, told);
+  EXPECT_EQ(handed.deliver(9, second), Bytes{9});
+  EXPECT_EQ(monitor.linkReport().mixture, told);
+  // Another link may be that of another phone.
+  monitor.linkIsOpen();
+  EXPECT_EQ(monitor.linkReport().mixture, "");
+  EXPECT_EQ(handed.deliver(9, first), Bytes{9});
+  EXPECT_EQ(monitor.linkReport().mixture, "");
 }
 
 }  // namespace
