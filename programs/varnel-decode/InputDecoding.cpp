@@ -2,9 +2,12 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <filesystem>
 #include <memory>
 #include <optional>
+#include <set>
 #include <stdexcept>
+#include <system_error>
 #include <vector>
 
 #include "LogGenerator/LogGenerator.h"
@@ -36,6 +39,33 @@ namespace varnel {
 namespace {
 
 constexpr int generalError = 1;
+
+// What the user says overrules what the capture says.
+std::optional<std::string> technologyOf(const Capture& capture, const Options& options,
+                                        const std::vector<std::string>& technologies) {
+  if (options.technology) return options.technology;
+  const auto named = capture.technology();
+  const bool isKnown = named && std::ranges::find(technologies, *named) != technologies.end();
+  return isKnown ? named : std::nullopt;
+}
+
+// Absent as well for what cannot be looked into twice, and for what is no capture: decoding it tells why.
+std::optional<std::string> technologyIn(const std::string& path, const Options& options,
+                                        const std::vector<std::string>& technologies) {
+  std::error_code failure;
+  if (options.technology || !std::filesystem::is_regular_file(path, failure)) return options.technology;
+  try {
+    return technologyOf(*openCapture(path), options, technologies);
+  } catch (const CaptureError&) {
+    return std::nullopt;
+  }
+}
+
+// What displays may be of: anything when it is not known, as that of a snapshot.
+std::vector<std::string> possibleTechnologies(const std::optional<std::string>& technology,
+                                              const DecodingServices& services) {
+  return technology ? std::vector{*technology} : services.technologies;
+}
 
 // What the options ask for, of one capture or snapshot.
 class InputDecoding {
@@ -71,25 +101,21 @@ class InputDecoding {
   };
 
   void addSinks(const std::optional<std::string>& technology, const DecodingServices& services) {
-    _formats = formatsFor(_options, technology, services);
+    if (_options.style.valuesAs == ValuesAs::Numbers)
+      _formats = numberFormatsOf(possibleTechnologies(technology, services), services.services);
     const auto add = [this](auto sink) { _sinks.push_back({std::move(sink)}); };
     std::vector<std::string> paths = _options.tablePaths;
     if (_options.plot) paths.insert(paths.end(), _options.plot->paths.begin(), _options.plot->paths.end());
     if (!paths.empty()) add(std::make_unique<SeenPaths>(paths, _guess));
     if (_options.output == Output::EveryDisplay)
       add(std::make_unique<EveryDisplay>(stdout, _captureName, _options.style, _formats));
-    if (_options.output == Output::ValueTable)
+    if (_options.output == Output::ValueTable) {
+      // Several captures share a table, whose header is written already.
+      if (!_captureName)
+        writeOutput(stdout, csvHeader(_options.tablePaths, TableColumns::TimeAndValues, _formats));
       add(std::make_unique<ValueTable>(stdout, _options.tablePaths, _captureName, _options.style, _formats));
+    }
     if (_options.plot) add(std::make_unique<Picture>(*_options.plot));
-  }
-
-  // What the user says overrules what the capture says.
-  static std::optional<std::string> technologyOf(const Capture& capture, const Options& options,
-                                                 const std::vector<std::string>& technologies) {
-    if (options.technology) return options.technology;
-    const auto named = capture.technology();
-    const bool isKnown = named && std::ranges::find(technologies, *named) != technologies.end();
-    return isKnown ? named : std::nullopt;
   }
 
   int decodeCapture(Capture& capture, const DecodingServices& services) {
@@ -329,10 +355,18 @@ class InputDecoding {
 
 }  // namespace
 
-NumberFormats formatsFor(const Options& options, const std::optional<std::string>& technology,
-                         const DecodingServices& services) {
-  if (options.style.valuesAs == ValuesAs::Texts) return {};
-  return numberFormatsOf(technology, services.technologies, services.services);
+std::string commonCsvHeader(const Options& options, const DecodingServices& services) {
+  std::set<std::string> technologies;
+  if (options.style.valuesAs == ValuesAs::Numbers) {
+    for (const std::string& path : options.captures) {
+      const auto possible =
+          possibleTechnologies(technologyIn(path, options, services.technologies), services);
+      technologies.insert(possible.begin(), possible.end());
+    }
+  }
+  const NumberFormats formats =
+      numberFormatsOf({technologies.begin(), technologies.end()}, services.services);
+  return csvHeader(options.tablePaths, TableColumns::CaptureTimeAndValues, formats);
 }
 
 int decodeInput(const Options& options, std::size_t index, const DecodingServices& services) {

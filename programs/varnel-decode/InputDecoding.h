@@ -1,11 +1,9 @@
 #pragma once
 
 #include <cstddef>
-#include <optional>
 #include <string>
 #include <vector>
 
-#include "LogGenerator/NumberFormats.h"
 #include "LogGenerator/Services.h"
 #include "programs/varnel-decode/CaptureClock.h"
 #include "programs/varnel-decode/Options.h"
@@ -21,9 +19,9 @@ struct DecodingServices {
   const std::vector<std::string>& technologies;  ///< all that there are
 };
 
-/// The numbers and units that the options ask for, of displays of that technology, which may not be known.
-NumberFormats formatsFor(const Options& options, const std::optional<std::string>& technology,
-                         const DecodingServices& services);
+/// The header line of the one table that several captures make. Looks into those that are files for the
+/// technologies that they name.
+std::string commonCsvHeader(const Options& options, const DecodingServices& services);
 
 /// Does for one of the captures or snapshots all that the options ask for. The process's exit status: 0, 1
 /// after a failure and 2 after a mistake of the user, each of which has been told on standard error.

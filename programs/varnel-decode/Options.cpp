@@ -90,7 +90,8 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
   auto* every = app.add_flag("--every", wishes.isEvery,
                              "write each display, one every 2 s of the capture, as a line of JSON");
   auto* table = app.add_option("--csv", options.tablePaths,
-                               "write the values under these paths as CSV, one row per display")
+                               "write the values under these paths as CSV, one row per display; the path "
+                               "Elapsed gives the seconds since the first record")
                     ->type_name("PATH")
                     ->excludes(every);
   app.add_flag("--numbers", wishes.isNumbers,

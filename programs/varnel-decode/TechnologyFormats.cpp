@@ -4,10 +4,9 @@
 
 namespace varnel {
 
-NumberFormats numberFormatsOf(const std::optional<std::string>& technology,
-                              const std::vector<std::string>& technologies, const Services& services) {
+NumberFormats numberFormatsOf(const std::vector<std::string>& technologies, const Services& services) {
   NumberFormats formats;
-  for (const std::string& name : technology ? std::vector{*technology} : technologies)
+  for (const std::string& name : technologies)
     formats.add(LogGenerator::generatorFromTechnology(name, services)->numberFormats());
   return formats;
 }

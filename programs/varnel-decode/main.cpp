@@ -11,7 +11,6 @@
 #include "host/ProgramStart.h"
 #include "host/TerminateHandler.h"
 #include "platform/TelephonyService.h"
-#include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/InputDecoding.h"
 #include "programs/varnel-decode/Jobs.h"
 #include "programs/varnel-decode/Options.h"
@@ -36,12 +35,6 @@ std::vector<std::string> technologiesWithGenerator(const Services& services) {
   return names;
 }
 
-std::string headerOf(const Options& options, const DecodingServices& services) {
-  const auto columns =
-      options.captures.size() > 1 ? TableColumns::CaptureTimeAndValues : TableColumns::TimeAndValues;
-  return csvHeader(options.tablePaths, columns, formatsFor(options, options.technology, services));
-}
-
 int decodeAll(const Options& options, const DecodingServices& services) {
   if (options.technology && !succeeds([] { static_cast<void>(readableResourceFolder()); }))
     return generalError;
@@ -49,7 +42,8 @@ int decodeAll(const Options& options, const DecodingServices& services) {
   const auto decodeOne = [&](std::size_t index) { return decodeInput(options, index, services); };
   const bool isPassedOn = succeeds([&] {
     const bool areSeveral = options.captures.size() > 1;
-    if (options.output == Output::ValueTable) writeOutput(stdout, headerOf(options, services));
+    if (areSeveral && options.output == Output::ValueTable)
+      writeOutput(stdout, commonCsvHeader(options, services));
     status = areSeveral ? runJobs(options.captures, options.jobs, decodeOne) : decodeOne(0);
   });
   return isPassedOn ? status : generalError;

@@ -3,6 +3,7 @@
 
 #include <csignal>
 
+#include "host/captures/PcapEncoders.h"
 #include "tests/varnel-decode/DecodeProgram.h"
 
 // Runs the whole program: displays over time, and what becomes of messages.
@@ -118,6 +119,31 @@ TEST_F(DecodeGenerations, NumbersOfCsvArePlainAndTheHeaderHasTheUnit) {
             "2024-03-01T14:05:11.000Z,-93.25,\n"
             "2024-03-01T14:05:13.000Z,-93.25,\n"
             "2024-03-01T14:05:13.000Z,-93.00,\n");
+}
+
+std::string recordOf(const char* technology) {
+  PcapngWriter writer(technology);
+  const ByteView beginning = writer.beginning();
+  std::string text(beginning.begin(), beginning.end());
+  const Bytes message{1, 13, 0, 0xC1, 0xB0, 0, 0, 0, 0, 0, 0, 0, 0};
+  const ByteView record = writer.encode({{afternoon, 0}, Dating::Known, message, {}});
+  return text.append(record.begin(), record.end());
+}
+
+TEST_F(DecodeGenerations, UnitsAreThoseOfTheTechnologyThatTheCaptureNames) {
+  const std::string path = "Serving Cell Measurements/Average RSRP";
+  const std::string lte = write("lte", recordOf("kalvi-lte")),
+                    utran = write("utran", recordOf("kalvi-utran-2"));
+  const auto table = [&](std::vector<std::string> captures) {
+    captures.insert(captures.begin(), {"--numbers", "--csv", path, "--"});
+    return run(captures).output;
+  };
+  EXPECT_THAT(table({lte}), StartsWith("Time," + path + " [dBm]\n"));
+  EXPECT_THAT(table({utran}), StartsWith("Time," + path + "\n")) << "which has no such entry";
+  EXPECT_THAT(table({lte, utran}), StartsWith("Capture,Time," + path + " [dBm]\n"));
+  EXPECT_THAT(table({utran, utran}), StartsWith("Capture,Time," + path + "\n"));
+  const Result overruled = run({"--technology", "kalvi-lte", "--numbers", "--csv", path, "--", utran, utran});
+  EXPECT_THAT(overruled.output, StartsWith("Capture,Time," + path + " [dBm]\n"));
 }
 
 TEST_F(DecodeGenerations, ASelectedRecordHasTheUnitOfItsList) {
