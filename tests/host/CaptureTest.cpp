@@ -1,17 +1,14 @@
-#include "host/CaptureWriter.h"
-#include "host/captures/Capture.h"
-
 #include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <unistd.h>
 
 #include <filesystem>
-#include <fstream>
-#include <optional>
 #include <string>
-#include <utility>
 #include <vector>
+
+#include "host/CaptureWriter.h"
+#include "tests/host/captures/CaptureFiles.h"
 
 namespace varnel {
 namespace {
@@ -75,107 +72,86 @@ class FileBytes {
 
 constexpr std::uint32_t microsecondMagic = 0xA1B2C3D4, nanosecondMagic = 0xA1B23C4D;
 
-using Record = std::pair<Time, Bytes>;
-
-struct Reading {
-  std::vector<Record> records;
-  std::optional<std::string> error;
-  std::vector<std::string> told;
-};
-
-class PcapFiles : public testing::Test {
- protected:
-  PcapFiles() {
-    std::string name = (std::filesystem::temp_directory_path() / "varnel-capture-XXXXXX").string();
-    _folder = ::mkdtemp(name.data());
-  }
-  ~PcapFiles() override { std::filesystem::remove_all(_folder); }
-
-  std::string path(const std::string& name = "test.pcap") const { return (_folder / name).string(); }
-
-  static Reading read(const std::string& file) {
-    Reading reading;
-    try {
-      const auto capture =
-          openCapture(file, {.tell = [&](const std::string& line) { reading.told.push_back(line); }});
-      CaptureRecord record;
-      while (capture->next(record))
-        reading.records.emplace_back(record.time, Bytes(record.message.begin(), record.message.end()));
-    } catch (const CaptureError& error) {
-      reading.error = error.what();
-    }
-    return reading;
-  }
-
-  Reading readBytes(const Bytes& bytes) const {
-    std::ofstream file(path(), std::ios::binary);
-    file.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
-    file.close();
-    return read(path());
-  }
-
- private:
-  std::filesystem::path _folder;
-};
-
-void expectOneLineAboutTheFile(const Reading& reading, const std::string& file) {
+void expectOneLineAboutTheFile(const CaptureReading& reading, const std::string& file) {
   ASSERT_TRUE(reading.error);
   EXPECT_THAT(*reading.error, HasSubstr(file));
   EXPECT_THAT(*reading.error, Not(HasSubstr("\n")));
 }
 
+class PcapFiles : public CaptureFiles {
+ protected:
+  // Where the parts of a file with two records end.
+  struct Ends {
+    std::size_t header, firstRecord, whole;
+  };
+
+  // A file that ends between two parts is sound. The first record stays in any case.
+  void expectTruncationsAreErrors(const Bytes& whole, const Ends& ends) const {
+    ASSERT_EQ(whole.size(), ends.whole);
+    for (std::size_t length = 0; length < whole.size(); ++length) {
+      const CaptureReading reading = readBytes(firstOf(whole, length));
+      EXPECT_EQ(reading.records.size(), length < ends.firstRecord ? 0u : 1u) << length;
+      if (length == ends.header || length == ends.firstRecord)
+        EXPECT_FALSE(reading.error) << length;
+      else
+        expectOneLineAboutTheFile(reading, path());
+    }
+  }
+};
+
 TEST_F(PcapFiles, MicrosecondsInLittleEndian) {
-  const Reading reading =
+  const CaptureReading reading =
       readBytes(FileBytes().pcapHeader(microsecondMagic).pcapRecord(1700000000, 250000, {1, 2, 3}).bytes);
   EXPECT_FALSE(reading.error);
-  EXPECT_EQ(reading.records, (std::vector<Record>{{{1700000000, 250000000}, {1, 2, 3}}}));
+  EXPECT_EQ(reading.records, (std::vector<KeptRecord>{{{1700000000, 250000000}, {1, 2, 3}}}));
 }
 
 TEST_F(PcapFiles, NanosecondsInBigEndian) {
-  const Reading reading = readBytes(FileBytes(FileBytes::Order::Big)
-                                        .pcapHeader(nanosecondMagic)
-                                        .pcapRecord(1700000000, 123456789, {9})
-                                        .pcapRecord(1700000001, 0, {})
-                                        .bytes);
+  const CaptureReading reading = readBytes(FileBytes(FileBytes::Order::Big)
+                                               .pcapHeader(nanosecondMagic)
+                                               .pcapRecord(1700000000, 123456789, {9})
+                                               .pcapRecord(1700000001, 0, {})
+                                               .bytes);
   EXPECT_FALSE(reading.error);
-  EXPECT_EQ(reading.records, (std::vector<Record>{{{1700000000, 123456789}, {9}}, {{1700000001, 0}, {}}}));
+  EXPECT_EQ(reading.records,
+            (std::vector<KeptRecord>{{{1700000000, 123456789}, {9}}, {{1700000001, 0}, {}}}));
 }
 
 TEST_F(PcapFiles, NextGenerationFilesInBothByteOrders) {
   for (const auto order : {FileBytes::Order::Little, FileBytes::Order::Big}) {
     // 1,700,000,000.5 s in nanoseconds
-    const Reading reading = readBytes(FileBytes(order)
-                                          .pcapngHeader()
-                                          .pcapngInterface(147)
-                                          .pcapngPacket(1700000000500000000, {5, 6, 7, 8})
-                                          .bytes);
+    const CaptureReading reading = readBytes(FileBytes(order)
+                                                 .pcapngHeader()
+                                                 .pcapngInterface(147)
+                                                 .pcapngPacket(1700000000500000000, {5, 6, 7, 8})
+                                                 .bytes);
     EXPECT_FALSE(reading.error) << *reading.error;
-    EXPECT_EQ(reading.records, (std::vector<Record>{{{1700000000, 500000000}, {5, 6, 7, 8}}}));
+    EXPECT_EQ(reading.records, (std::vector<KeptRecord>{{{1700000000, 500000000}, {5, 6, 7, 8}}}));
   }
 }
 
 TEST_F(PcapFiles, ACaptureWithoutRecordsIsFine) {
-  const Reading reading = readBytes(FileBytes().pcapHeader(microsecondMagic).bytes);
+  const CaptureReading reading = readBytes(FileBytes().pcapHeader(microsecondMagic).bytes);
   EXPECT_FALSE(reading.error);
   EXPECT_TRUE(reading.records.empty());
 }
 
 TEST_F(PcapFiles, ASubSecondPartOfMoreThanASecondIsCarried) {
-  const Reading reading = readBytes(FileBytes()
-                                        .pcapHeader(microsecondMagic)
-                                        .pcapRecord(100, 1500000, {1})
-                                        .pcapRecord(100, 1000000, {2})
-                                        .pcapRecord(100, 0xFFFFFFFF, {3})
-                                        .bytes);
+  const CaptureReading reading = readBytes(FileBytes()
+                                               .pcapHeader(microsecondMagic)
+                                               .pcapRecord(100, 1500000, {1})
+                                               .pcapRecord(100, 1000000, {2})
+                                               .pcapRecord(100, 0xFFFFFFFF, {3})
+                                               .bytes);
   ASSERT_EQ(reading.records.size(), 3u);
-  EXPECT_EQ(reading.records[0].first, (Time{101, 500000000}));
-  EXPECT_EQ(reading.records[1].first, (Time{101, 0}));
-  EXPECT_GE(reading.records[2].first.nanoseconds, 0);
-  EXPECT_LT(reading.records[2].first.nanoseconds, 1000000000);
+  EXPECT_EQ(reading.records[0].time, (Time{101, 500000000}));
+  EXPECT_EQ(reading.records[1].time, (Time{101, 0}));
+  EXPECT_GE(reading.records[2].time.nanoseconds, 0);
+  EXPECT_LT(reading.records[2].time.nanoseconds, 1000000000);
 }
 
 TEST_F(PcapFiles, AnotherLinkTypeIsAnError) {
-  const Reading reading = readBytes(FileBytes().pcapHeader(microsecondMagic, 1).bytes);
+  const CaptureReading reading = readBytes(FileBytes().pcapHeader(microsecondMagic, 1).bytes);
   expectOneLineAboutTheFile(reading, path());
   EXPECT_THAT(*reading.error,
               EndsWith(" holds Ethernet frames (link type 1), but captures of the log channel have link type "
@@ -189,16 +165,7 @@ TEST_F(PcapFiles, EveryTruncationIsAnErrorThatKeepsWhatCameBefore) {
                           .pcapRecord(1, 0, {1, 2, 3})     // up to 43
                           .pcapRecord(2, 0, {4, 5, 6, 7})  // up to 63
                           .bytes;
-  ASSERT_EQ(whole.size(), 63u);
-  for (std::size_t length = 0; length < whole.size(); ++length) {
-    const Reading reading =
-        readBytes(Bytes(whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(length)));
-    EXPECT_EQ(reading.records.size(), length < 43 ? 0u : 1u) << length;
-    if (length == 24 || length == 43)
-      EXPECT_FALSE(reading.error) << length;
-    else
-      expectOneLineAboutTheFile(reading, path());
-  }
+  expectTruncationsAreErrors(whole, {.header = 24, .firstRecord = 43, .whole = 63});
 }
 
 TEST_F(PcapFiles, EveryTruncationOfANextGenerationFileIsAnError) {
@@ -208,28 +175,19 @@ TEST_F(PcapFiles, EveryTruncationOfANextGenerationFileIsAnError) {
                           .pcapngPacket(1, {1, 2, 3, 4})  // up to 96
                           .pcapngPacket(2, {1, 2, 3, 4})  // up to 132
                           .bytes;
-  ASSERT_EQ(whole.size(), 132u);
-  for (std::size_t length = 0; length < whole.size(); ++length) {
-    const Reading reading =
-        readBytes(Bytes(whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(length)));
-    EXPECT_EQ(reading.records.size(), length < 96 ? 0u : 1u) << length;
-    if (length == 60 || length == 96)
-      EXPECT_FALSE(reading.error) << length;
-    else
-      expectOneLineAboutTheFile(reading, path());
-  }
+  expectTruncationsAreErrors(whole, {.header = 60, .firstRecord = 96, .whole = 132});
 }
 
 TEST_F(PcapFiles, ARecordThatWasCutShortIsAnError) {
-  const Reading reading = readBytes(FileBytes()
-                                        .pcapHeader(microsecondMagic)
-                                        .pcapRecord(1, 0, {1})
-                                        .u32(2)
-                                        .u32(0)
-                                        .u32(2)
-                                        .u32(300)
-                                        .raw({1, 2})
-                                        .bytes);
+  const CaptureReading reading = readBytes(FileBytes()
+                                               .pcapHeader(microsecondMagic)
+                                               .pcapRecord(1, 0, {1})
+                                               .u32(2)
+                                               .u32(0)
+                                               .u32(2)
+                                               .u32(300)
+                                               .raw({1, 2})
+                                               .bytes);
   EXPECT_EQ(reading.records.size(), 1u);
   expectOneLineAboutTheFile(reading, path());
   EXPECT_THAT(*reading.error,
@@ -240,25 +198,25 @@ TEST_F(PcapFiles, ARecordThatWasCutShortIsAnError) {
 TEST_F(PcapFiles, ARecordMayBeLongerThanTheFilesSnapshotLength) {
   const Bytes large(1'048'576, 0x5A);
   for (const auto order : {FileBytes::Order::Little, FileBytes::Order::Big}) {
-    const Reading reading =
+    const CaptureReading reading =
         readBytes(FileBytes(order).pcapHeader(microsecondMagic, 147, 65535).pcapRecord(1, 0, large).bytes);
     EXPECT_FALSE(reading.error) << *reading.error;
     ASSERT_EQ(reading.records.size(), 1u);
-    EXPECT_TRUE(reading.records[0].second == large);
+    EXPECT_TRUE(reading.records[0].message == large);
   }
 }
 
 TEST_F(PcapFiles, ARecordOfMoreThanAMebibyteIsLeftOutAndTold) {
   const Bytes tooLarge(1'048'577, 0x5A);
   for (const auto order : {FileBytes::Order::Little, FileBytes::Order::Big}) {
-    const Reading reading = readBytes(FileBytes(order)
-                                          .pcapHeader(microsecondMagic)
-                                          .pcapRecord(1, 0, {1})
-                                          .pcapRecord(2, 0, tooLarge)
-                                          .pcapRecord(3, 0, {3})
-                                          .bytes);
+    const CaptureReading reading = readBytes(FileBytes(order)
+                                                 .pcapHeader(microsecondMagic)
+                                                 .pcapRecord(1, 0, {1})
+                                                 .pcapRecord(2, 0, tooLarge)
+                                                 .pcapRecord(3, 0, {3})
+                                                 .bytes);
     EXPECT_FALSE(reading.error) << *reading.error;
-    EXPECT_EQ(reading.records, (std::vector<Record>{{{1, 0}, {1}}, {{3, 0}, {3}}}));
+    EXPECT_EQ(reading.records, (std::vector<KeptRecord>{{{1, 0}, {1}}, {{3, 0}, {3}}}));
     EXPECT_EQ(reading.told, (std::vector<std::string>{
                                 path() + ", record 2 is left out: its 1048577 bytes are more than a message "
                                          "may have, 1 MiB"}));
@@ -266,9 +224,9 @@ TEST_F(PcapFiles, ARecordOfMoreThanAMebibyteIsLeftOutAndTold) {
 }
 
 TEST_F(PcapFiles, SecondsAreUnsigned) {
-  const Reading reading =
+  const CaptureReading reading =
       readBytes(FileBytes().pcapHeader(microsecondMagic).pcapRecord(0xFFFFFFFF, 0, {1}).bytes);
-  EXPECT_EQ(reading.records, (std::vector<Record>{{{4294967295, 0}, {1}}}));
+  EXPECT_EQ(reading.records, (std::vector<KeptRecord>{{{4294967295, 0}, {1}}}));
 }
 
 TEST_F(PcapFiles, MessagesOfTheAirInterfaceAreCalledSo) {
@@ -279,7 +237,7 @@ TEST_F(PcapFiles, MessagesOfTheAirInterfaceAreCalledSo) {
   packet[23] = 17;
   packet[36] = 0x12;
   packet[37] = 0x79;
-  const Reading reading =
+  const CaptureReading reading =
       readBytes(FileBytes().pcapHeader(microsecondMagic, 1).pcapRecord(1, 0, packet).bytes);
   ASSERT_TRUE(reading.error);
   EXPECT_EQ(*reading.error,
@@ -292,9 +250,9 @@ TEST_F(PcapFiles, MessagesOfTheAirInterfaceAreCalledSo) {
 TEST_F(PcapFiles, ForeignFilesAreErrors) {
   expectOneLineAboutTheFile(readBytes({}), path());
   expectOneLineAboutTheFile(readBytes(Bytes(100, 'a')), path());
-  expectOneLineAboutTheFile(read(path("missing.pcap")), path("missing.pcap"));
-  EXPECT_THAT(*read(path("missing.pcap")).error, EndsWith(": No such file or directory"));
-  expectOneLineAboutTheFile(read(std::filesystem::temp_directory_path().string()),
+  expectOneLineAboutTheFile(readCapture(path("missing.pcap")), path("missing.pcap"));
+  EXPECT_THAT(*readCapture(path("missing.pcap")).error, EndsWith(": No such file or directory"));
+  expectOneLineAboutTheFile(readCapture(std::filesystem::temp_directory_path().string()),
                             std::filesystem::temp_directory_path().string());
 }
 
@@ -303,12 +261,12 @@ TEST_F(PcapFiles, ADashIsStandardInput) {
   const int kept = ::dup(STDIN_FILENO);
   const int file = ::open(path().c_str(), O_RDONLY);
   ::dup2(file, STDIN_FILENO);
-  const Reading reading = read("-");
+  const CaptureReading reading = readCapture("-");
   ::dup2(kept, STDIN_FILENO);
   ::close(file);
   ::close(kept);
   EXPECT_FALSE(reading.error);
-  EXPECT_EQ(reading.records, (std::vector<Record>{{{7, 8000}, {9}}}));
+  EXPECT_EQ(reading.records, (std::vector<KeptRecord>{{{7, 8000}, {9}}}));
 }
 
 TEST_F(PcapFiles, WhatIsWrittenIsReadBack) {
@@ -317,21 +275,20 @@ TEST_F(PcapFiles, WhatIsWrittenIsReadBack) {
     CaptureWriter writer(path());
     writer.write({1700000000, 999999999}, Bytes{1, 2, 3});
     // The record is available at once.
-    EXPECT_EQ(read(path()).records.size(), 1u);
+    EXPECT_EQ(readCapture(path()).records.size(), 1u);
     writer.write({1700000001, 0}, {});
     writer.write({1700000001, 1}, large);
   }
-  const Reading reading = read(path());
+  const CaptureReading reading = readCapture(path());
   EXPECT_FALSE(reading.error);
   EXPECT_TRUE(reading.records ==
-              (std::vector<Record>{
+              (std::vector<KeptRecord>{
                   {{1700000000, 999999999}, {1, 2, 3}}, {{1700000001, 0}, {}}, {{1700000001, 1}, large}}));
 }
 
 TEST_F(PcapFiles, TheWriterWritesNanosecondsAndTheLinkType) {
   CaptureWriter(path()).write({1, 2}, Bytes{3});
-  std::ifstream file(path(), std::ios::binary);
-  const std::string header(std::istreambuf_iterator<char>(file), {});
+  const std::string header = contentsOf(path());
   ASSERT_EQ(header.size(), 41u);
   EXPECT_THAT(header, StartsWith(std::string("\x4D\x3C\xB2\xA1\x02\x00\x04\x00", 8)));
   EXPECT_EQ(header.substr(20, 4), std::string("\x93\x00\x00\x00", 4));
@@ -340,7 +297,7 @@ TEST_F(PcapFiles, TheWriterWritesNanosecondsAndTheLinkType) {
 TEST_F(PcapFiles, TheWriterNamesTheTechnologyInPcapng) {
   CaptureWriter(path(), ExistingRecording::Refused, "kalvi-lte").write({1, 2}, Bytes{3});
   EXPECT_EQ(openCapture(path())->technology(), "kalvi-lte");
-  EXPECT_EQ(read(path()).records, (std::vector<Record>{{{1, 2}, {3}}}));
+  EXPECT_EQ(readCapture(path()).records, (std::vector<KeptRecord>{{{1, 2}, {3}}}));
 }
 
 TEST_F(PcapFiles, AFileThatCannotBeWrittenIsAnError) {

@@ -33,9 +33,7 @@ std::vector<Message> messages(std::uint64_t seed, std::chrono::milliseconds dura
 }
 
 std::vector<Message> messagesOf(unsigned code, std::chrono::milliseconds duration) {
-  std::vector<Message> all = messages(1, duration);
-  std::erase_if(all, [code](const Message& message) { return message.code() != code; });
-  return all;
+  return simulatedMessagesOf(code, "kalvi-gsm-umts", 1, duration);
 }
 
 int s8(const Message& message, std::size_t offset) { return static_cast<std::int8_t>(message.u8(offset)); }

@@ -32,9 +32,7 @@ std::vector<Message> messages(std::uint64_t seed, std::chrono::milliseconds dura
 }
 
 std::vector<Message> messagesOf(unsigned code, std::chrono::milliseconds duration, std::uint64_t seed = 1) {
-  std::vector<Message> all = messages(seed, duration);
-  std::erase_if(all, [code](const Message& message) { return message.code() != code; });
-  return all;
+  return simulatedMessagesOf(code, "kalvi-lte", seed, duration);
 }
 
 TEST(LTEModem, TheMessagesAreTheSameOnEveryMachine) {

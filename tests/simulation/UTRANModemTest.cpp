@@ -30,9 +30,7 @@ std::vector<Message> messages(std::uint64_t seed, std::chrono::milliseconds dura
 }
 
 std::vector<Message> messagesOf(unsigned code, std::chrono::milliseconds duration) {
-  std::vector<Message> all = messages(1, duration);
-  std::erase_if(all, [code](const Message& message) { return message.code() != code; });
-  return all;
+  return simulatedMessagesOf(code, "kalvi-utran-2", 1, duration);
 }
 
 TEST(UTRANModem, TheMessagesAreTheSameOnEveryMachine) {

@@ -37,6 +37,15 @@ inline std::vector<SimulatedPacket> simulatedMessages(std::string_view technolog
   return messages;
 }
 
+/// The messages of that log code among them.
+inline std::vector<SimulatedPacket> simulatedMessagesOf(unsigned code, std::string_view technology,
+                                                        std::uint64_t seed,
+                                                        std::chrono::milliseconds duration) {
+  std::vector<SimulatedPacket> messages = simulatedMessages(technology, seed, duration);
+  std::erase_if(messages, [code](const SimulatedPacket& message) { return message.code() != code; });
+  return messages;
+}
+
 /// The text of that key in a dictionary.
 inline std::string textOf(const Value& dictionary, std::string_view key) {
   const std::string* found = dictionary.dictionary()->get(key).string();

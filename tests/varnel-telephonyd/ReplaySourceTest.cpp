@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "host/CaptureWriter.h"
+#include "tests/support/Process.h"
 #include "tests/support/RecordingLog.h"
 
 namespace varnel {
@@ -19,13 +20,7 @@ using Messages = std::vector<std::pair<std::chrono::milliseconds, Bytes>>;
 
 class Replay : public testing::Test {
  protected:
-  Replay() {
-    std::string name = (std::filesystem::temp_directory_path() / "varnel-replay-XXXXXX").string();
-    _folder = ::mkdtemp(name.data());
-  }
-  ~Replay() override { std::filesystem::remove_all(_folder); }
-
-  std::string path() const { return (_folder / "replay.pcap").string(); }
+  std::string path() const { return _folder.file("replay.pcap"); }
 
   void write(const std::vector<std::pair<Time, Bytes>>& records) const {
     CaptureWriter writer(path());
@@ -43,7 +38,7 @@ class Replay : public testing::Test {
   }
 
  private:
-  std::filesystem::path _folder;
+  TemporaryFolder _folder;
 };
 
 TEST_F(Replay, MessagesKeepTheirOrderAndDistances) {

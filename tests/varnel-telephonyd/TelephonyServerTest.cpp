@@ -2,7 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -13,6 +12,7 @@
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "tests/support/FakeQueue.h"
 #include "tests/support/MemoryPorts.h"
+#include "tests/support/Process.h"
 #include "tests/support/RecordingLog.h"
 
 namespace varnel {
@@ -536,9 +536,8 @@ TEST_P(SimulatedStreamTest, TheViewersCommandStartsAllOfIt) {
 
 // A replayed recording of a simulated modem is the same stream.
 TEST_P(SimulatedStreamTest, ARecordingIsReplayedAsItWasSent) {
-  std::string folder = (std::filesystem::temp_directory_path() / "varnel-recording-XXXXXX").string();
-  ASSERT_NE(::mkdtemp(folder.data()), nullptr);
-  const std::string path = folder + "/walk.pcap";
+  const TemporaryFolder folder;
+  const std::string path = folder.file("walk.pcap");
   std::vector<Bytes> sent;
   {
     CaptureWriter writer(path);
@@ -551,7 +550,6 @@ TEST_P(SimulatedStreamTest, ARecordingIsReplayedAsItWasSent) {
   EXPECT_EQ(serve([&] { return std::make_unique<ReplaySource>(path, 1, ReplaySource::AtEnd::Stop); },
                   [](ByteView) {}),
             sent);
-  std::filesystem::remove_all(folder);
 }
 
 INSTANTIATE_TEST_SUITE_P(Technologies, SimulatedStreamTest, testing::ValuesIn(simulatedStreams),

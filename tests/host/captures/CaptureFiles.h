@@ -4,7 +4,6 @@
 
 #include <algorithm>
 #include <cstdint>
-#include <filesystem>
 #include <fstream>
 #include <functional>
 #include <memory>
@@ -13,6 +12,7 @@
 #include <vector>
 
 #include "host/captures/Capture.h"
+#include "tests/support/Process.h"
 
 namespace varnel {
 
@@ -105,13 +105,7 @@ inline Bytes firstOf(const Bytes& bytes, std::size_t count) {
 /// A folder for the files of a test.
 class CaptureFiles : public testing::Test {
  protected:
-  CaptureFiles() {
-    std::string name = (std::filesystem::temp_directory_path() / "varnel-capture-XXXXXX").string();
-    _folder = ::mkdtemp(name.data());
-  }
-  ~CaptureFiles() override { std::filesystem::remove_all(_folder); }
-
-  std::string path(const std::string& name = "capture") const { return (_folder / name).string(); }
+  std::string path(const std::string& name = "capture") const { return _folder.file(name); }
 
   CaptureReading readBytes(const Bytes& bytes) const {
     std::ofstream file(path(), std::ios::binary);
@@ -121,7 +115,7 @@ class CaptureFiles : public testing::Test {
   }
 
  private:
-  std::filesystem::path _folder;
+  TemporaryFolder _folder;
 };
 
 /// Bytes worked out by hand: two log records, alone and inside frames and wrappers.
