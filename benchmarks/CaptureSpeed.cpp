@@ -25,10 +25,10 @@
 #include "programs/varnel-decode/OfflineDecoder.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 
-// What captures take to be read, a line a way: the least that framing takes, framing alone, and whole
-// captures read and decoded, framed and as pcap, all beside a copy of the same bytes. Of the captures of real
-// modems one record in 29 has a log code that the decoders know, and so has the first one here; of the second
-// each has.
+// How long it takes to read captures, one line per way: the least that framing can take, framing alone, and
+// reading and decoding whole captures, framed and as pcap. All are compared with a copy of the same bytes. In
+// captures of real modems one record in 29 has a log code that the decoders know. The first capture here is
+// like them; in the second one, every record has such a log code.
 
 namespace varnel {
 namespace {
@@ -56,7 +56,7 @@ std::vector<Bytes> knownMessages() {
   return messages;
 }
 
-// Packets of a log code that no decoder knows, of up to 77 bytes, at random.
+// Random packets of up to 77 bytes, with a log code that no decoder knows.
 std::vector<Bytes> unknownMessages() {
   constexpr std::size_t different = 5000, smallest = 25, sizes = 53;
   std::mt19937 random(1);
@@ -71,14 +71,14 @@ std::vector<Bytes> unknownMessages() {
   return messages;
 }
 
-// Modems put their own time into what they send.
+// In its packets, a modem puts its own time.
 void setTime(Bytes& message, Time time) {
   constexpr std::size_t timeOffset = 5;
   const ModemTime now = modemTimeOf(time);
   std::memcpy(message.data() + timeOffset, &now.raw, sizeof now.raw);
 }
 
-// A message each millisecond, of which each so many-th is known.
+// A message per millisecond. One in `everySoMany` has a known log code.
 void makeFiles(const Files& files, std::size_t everySoMany) {
   std::vector<Bytes> known = knownMessages(), unknown = unknownMessages();
   std::ofstream framed(files.framed, std::ios::binary), pcap(files.pcap, std::ios::binary);
@@ -104,7 +104,7 @@ Bytes contentsOf(const std::string& path) {
   return bytes;
 }
 
-// A checksum by tables of eight bytes, as most programs have it.
+// A checksum with tables for eight bytes, as most programs compute it.
 class EightByteChecksum {
  public:
   EightByteChecksum() {
@@ -138,7 +138,7 @@ class EightByteChecksum {
   std::array<std::array<std::uint16_t, 256>, 8> _tables{};
 };
 
-// Finds the frames, takes their escapes out, checks them and counts their log codes: no less will do.
+// Finds the frames, removes their escapes, checks them, and counts their log codes. No reader can do less.
 std::size_t floorOf(ByteView bytes) {
   static const EightByteChecksum checksum;
   static std::array<std::uint32_t, 65536> counts;
@@ -174,7 +174,7 @@ std::size_t readAll(const std::string& path) {
   return found;
 }
 
-// To displays, of which there is one every two seconds.
+// Decodes to displays, one per two seconds.
 std::size_t decodeAll(const std::string& path) {
   const FileResources resources{resourceFolder()};
   CaptureClock clock;
@@ -189,7 +189,7 @@ std::size_t decodeAll(const std::string& path) {
   return found;
 }
 
-// Of the processor, which others may keep busy meanwhile.
+// The processor's time, so that other work on the machine does not count.
 double secondsUsed() {
   timespec used{};
   ::clock_gettime(CLOCK_PROCESS_CPUTIME_ID, &used);
@@ -202,7 +202,7 @@ struct Way {
   double best = std::numeric_limits<double>::infinity();
 };
 
-// By turns, so that what slows one down for a while slows down the others as well.
+// The ways run in turns, so that all are slowed down alike.
 void race(std::vector<Way>& ways) {
   for (int turn = 0; turn < turns; ++turn) {
     for (Way& way : ways) {

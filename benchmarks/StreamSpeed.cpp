@@ -19,9 +19,10 @@
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "tests/support/AllocationCounter.h"
 
-// Without arguments: the technologies, then the ways, a line each. With a technology and a way: what a
-// message of the technology's mixed stream takes, "NANOSECONDS ALLOCATIONS". With a number besides: goes over
-// the stream that often and measures nothing, for whoever counts the instructions of `measuredWay`.
+// Without arguments: writes the technologies, then the ways, one per line. With a technology and a way:
+// writes what a message of the technology's mixed stream costs, as "NANOSECONDS ALLOCATIONS". With a number
+// after them: decodes the stream this many times and measures nothing, for a program that counts the
+// instructions of `measuredWay`.
 
 namespace varnel {
 namespace {
@@ -32,7 +33,7 @@ constexpr std::size_t messagesOfAStream = 4000;
 constexpr std::size_t messagesPerDisplay = 50;
 constexpr int turns = 20;
 
-// A sink that takes trace lines and puts them where nobody reads them.
+// A sink that takes trace lines and stores them where nobody reads them.
 class Trace final : public LogSink {
  public:
   void write(int /*priority*/, std::string_view text) override {
@@ -50,7 +51,7 @@ std::vector<Bytes> streamOf(std::string_view technology) {
   return messages;
 }
 
-// A generator with its real template, and what it has been given.
+// A generator with its real template, and the messages that it has got.
 class Decoding {
  public:
   explicit Decoding(std::string_view technology)
@@ -81,7 +82,7 @@ Floor floorOf(std::string_view technology, const std::vector<Bytes>& messages) {
   return floor;
 }
 
-// Takes the messages from the first up to, but not with, the end.
+// Processes the messages from `first` up to `end`, which is not included.
 using Way = std::function<void(std::size_t first, std::size_t end)>;
 
 struct Run {
@@ -126,7 +127,7 @@ struct Cost {
   double nanoseconds = 0, allocations = 0;
 };
 
-// What the ways take between displays, over the whole stream.
+// The cost of the ways between displays, over the whole stream.
 Cost goOver(const Run& run, std::size_t size) {
   Clock::duration time{};
   std::uint64_t allocated = 0;
@@ -154,7 +155,7 @@ int measure(std::string_view technology, std::string_view way, int rounds) {
   const Run run = runOf(technology, way, messages);
   Trace trace;
   if (way == "decoding, traced") setLogSink(&trace, logNoticePriority);
-  goOver(run, messages.size());  // the first time fills the display
+  goOver(run, messages.size());  // the first run fills the display
   for (int i = 0; i < rounds; ++i) goOver(run, messages.size());
   if (rounds > 0) return 0;
   const Run floor = floorRun(technology, messages);
@@ -165,7 +166,7 @@ int measure(std::string_view technology, std::string_view way, int rounds) {
   }
   setLogSink(nullptr, -1);
   std::printf("%.1f %.2f %.1f\n", best.nanoseconds, best.allocations, bestFloor.nanoseconds);
-  return witness == 42 ? 1 : 0;  // the floor's results are of use
+  return witness == 42 ? 1 : 0;  // uses the results of the floor
 }
 
 }  // namespace

@@ -4,11 +4,11 @@
 
 namespace varnel {
 
-/// Whether the processor can do what `isSoundByFolding` does.
+/// Whether the processor has the instructions that `isSoundByFolding` needs.
 bool canFold();
 
-/// What `isSound` tells, in less than half of its time, of a frame of at least 16 bytes. Only where
-/// `canFold`.
+/// The same as `isSound` in less than half of the time, for a frame of at least 16 bytes. Call it only if
+/// `canFold` returns true.
 bool isSoundByFolding(ByteView frame);
 
 inline constexpr std::size_t leastToFold = 16;

@@ -11,12 +11,12 @@ namespace {
 
 constexpr std::uint16_t polynomial = 0x8408;
 constexpr std::uint16_t start = 0xFFFF;
-// What is left when a checksum is taken over a sound frame and its own checksum.
+// The checksum over a sound frame including its own checksum.
 constexpr std::uint16_t residue = 0xF0B8;
 
 using Table = std::array<std::uint16_t, 256>;
 
-// tables[n][b]: what the byte b does to the checksum when n more bytes follow it.
+// tables[n][b]: the effect of byte b on the checksum when n more bytes follow it.
 constexpr std::size_t stride = 16;
 
 constexpr std::array<Table, stride> makeTables() {
@@ -37,7 +37,7 @@ constexpr std::array<Table, stride> makeTables() {
 
 constexpr std::array<Table, stride> tables = makeTables();
 
-// What four and eight bytes do to the checksum when that many more follow them.
+// The effect of four and of eight bytes on the checksum when this many more bytes follow them.
 template <std::size_t following>
 std::uint32_t effectOfFour(std::uint32_t bytes) {
   return tables[following + 3][bytes & 0xFF] ^ tables[following + 2][bytes >> 8 & 0xFF] ^
@@ -50,8 +50,8 @@ std::uint32_t effectOfEight(std::uint64_t bytes) {
          effectOfFour<following>(static_cast<std::uint32_t>(bytes >> 32));
 }
 
-// What is in the register already does the same as the first two of so many bytes. What the bytes do by
-// themselves need not wait for it.
+// The register already has the effect of the bytes before, so it is combined with the first two of these
+// bytes. The effects of the other bytes do not depend on it.
 template <std::size_t count>
 std::uint32_t effectOfRest(std::uint32_t rest) {
   return tables[count - 1][rest & 0xFF] ^ tables[count - 2][rest >> 8];

@@ -40,7 +40,7 @@ namespace {
 
 constexpr int generalError = 1;
 
-// What the user says overrules what the capture says.
+// The user's technology comes before that of the capture.
 std::optional<std::string> technologyOf(const Capture& capture, const Options& options,
                                         const std::vector<std::string>& technologies) {
   if (options.technology) return options.technology;
@@ -49,7 +49,8 @@ std::optional<std::string> technologyOf(const Capture& capture, const Options& o
   return isKnown ? named : std::nullopt;
 }
 
-// Absent as well for what cannot be looked into twice, and for what is no capture: decoding it tells why.
+// Absent also for an input that can be read only once, and for anything that is no capture. Decoding reports
+// why.
 std::optional<std::string> technologyIn(const std::string& path, const Options& options,
                                         const std::vector<std::string>& technologies) {
   std::error_code failure;
@@ -61,13 +62,13 @@ std::optional<std::string> technologyIn(const std::string& path, const Options& 
   }
 }
 
-// What displays may be of: anything when it is not known, as that of a snapshot.
+// The technologies that the displays may belong to: all, when it is not known, as with a snapshot.
 std::vector<std::string> possibleTechnologies(const std::optional<std::string>& technology,
                                               const DecodingServices& services) {
   return technology ? std::vector{*technology} : services.technologies;
 }
 
-// What the options ask for, of one capture or snapshot.
+// Does everything that the options ask for with one capture or snapshot.
 class InputDecoding {
  public:
   InputDecoding(const Options& options, std::size_t index)
@@ -110,7 +111,7 @@ class InputDecoding {
     if (_options.output == Output::EveryDisplay)
       add(std::make_unique<EveryDisplay>(stdout, _captureName, _options.style, _formats));
     if (_options.output == Output::ValueTable) {
-      // Several captures share a table, whose header is written already.
+      // Several captures share one table, whose header is already written.
       if (!_captureName)
         writeOutput(stdout, csvHeader(_options.tablePaths, TableColumns::TimeAndValues, _formats));
       add(std::make_unique<ValueTable>(stdout, _options.tablePaths, _captureName, _options.style, _formats));
@@ -162,7 +163,7 @@ class InputDecoding {
     return generalError;
   }
 
-  // When there are some, tells what users should know of those that were not decoded.
+  // Throws when there are no records. Otherwise tells users about those that were not decoded.
   void requireRecords(const OfflineDecoder& decoder) const {
     const auto remark = _subscriptions.remark(_name);
     if (!decoder.hasStarted())
@@ -170,7 +171,7 @@ class InputDecoding {
     if (remark) tell(*remark);
   }
 
-  // Whether nobody wants to see what the records say.
+  // Whether no output shows what the records say.
   bool isConvertingAlone() const {
     return !_outputs.areNone() && _options.output == Output::Display &&
            _options.writeDisplay == displayAsNothing && !_options.plot && !isSaving();
@@ -188,13 +189,13 @@ class InputDecoding {
     return isDone ? 0 : generalError;
   }
 
-  // Without records earlier files stay.
+  // Without records, earlier files stay.
   bool finishOutputs() { return _subscriptions.counts().empty() || _outputs.finish(_name); }
 
-  // Counts the record and writes it to the outputs. Whether it is to be decoded.
+  // Counts the record and writes it to the outputs. Returns whether it is to be decoded.
   bool pass(const CaptureRecord& record) {
     const bool isChosen = _subscriptions.take(record);
-    // What nobody has chosen is kept where nothing is mixed up by it.
+    // Without a choice of the user, all records are kept: nothing is mixed up in these outputs.
     if (isChosen || !_options.subscription) _outputs.write(record);
     return isChosen;
   }
@@ -224,13 +225,13 @@ class InputDecoding {
     if (!_guess.isAnyKnown()) _guess.take(message, fate);
   }
 
-  // The technology is more likely wrong than the capture.
+  // The technology is more likely to be wrong than the capture.
   void tellGuess(const std::string& technology, const DecodingServices& services) const {
     if (!_guess.isNeeded() || services.templates.missing()) return;
     tell(_guess.sentence(_name, technology, services.technologies, services.services));
   }
 
-  // What an option asks for that only captures have.
+  // The option that only captures can fulfill; nothing when there is none.
   std::optional<std::string> wishForCapture() const {
     if (countsMessages()) return "--stats counts the messages of captures";
     if (!_outputs.areNone()) return "--records, --pcap and --framed write the records of captures";
@@ -256,7 +257,7 @@ class InputDecoding {
     return isDone && !_isOutputBroken ? 0 : generalError;
   }
 
-  // A sink that has failed gets no more; the others go on.
+  // A sink that has failed gets no more generations; the others go on.
   void report(Generation generation) {
     generation.dating = _dating;
     generation.elapsed = _elapsed.at(generation.time);
@@ -274,7 +275,7 @@ class InputDecoding {
     return isDone;
   }
 
-  // Whether nobody would see what else the capture holds.
+  // Whether nobody would see the rest of the capture.
   bool isPointless() const { return _isOutputBroken && !_options.plot && !isSaving() && _outputs.areNone(); }
 
   bool isSaving() const { return _options.snapshotPath || _options.binaryLogPath; }
@@ -310,7 +311,7 @@ class InputDecoding {
          " of its messages were decoded, but their raw bytes were not kept");
   }
 
-  // What is written once all is read.
+  // Writes the outputs that need the whole capture.
   void writeSummary(const Value& display) const {
     switch (_options.output) {
       case Output::Display:
@@ -339,10 +340,10 @@ class InputDecoding {
 
   const Options& _options;
   const std::string _path;
-  const std::string _name;  // as errors and headings tell it
+  const std::string _name;  // for errors and headings
   const bool _isFirst;
-  std::optional<std::string> _captureName;  // in the output; absent when there is but one
-  NumberFormats _formats;                   // of what is streamed
+  std::optional<std::string> _captureName;  // as in the output; absent for a single capture
+  NumberFormats _formats;                   // of the streamed output
   Subscriptions _subscriptions;
   RecordOutputs _outputs;
   MessageStatistics _statistics;

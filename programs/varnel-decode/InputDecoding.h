@@ -11,20 +11,20 @@
 
 namespace varnel {
 
-/// What the decoders get; clock and templates are those that the services show.
+/// What the decoders use. Clock and templates are those in the services.
 struct DecodingServices {
   const Services& services;
   CaptureClock& clock;
   const TemplateWatch& templates;
-  const std::vector<std::string>& technologies;  ///< all that there are
+  const std::vector<std::string>& technologies;  ///< all technologies
 };
 
-/// The header line of the one table that several captures make. Looks into those that are files for the
-/// technologies that they name.
+/// The header line of the one table for several captures. Looks into captures that are files to find their
+/// technologies.
 std::string commonCsvHeader(const Options& options, const DecodingServices& services);
 
-/// Does for one of the captures or snapshots all that the options ask for. The process's exit status: 0, 1
-/// after a failure and 2 after a mistake of the user, each of which has been told on standard error.
+/// Does everything that the options ask for with one of the captures or snapshots. Returns the exit status:
+/// 0, 1 after a failure, or 2 after a mistake of the user. Standard error then has a line about it.
 int decodeInput(const Options& options, std::size_t index, const DecodingServices& services);
 
 }  // namespace varnel

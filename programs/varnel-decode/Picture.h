@@ -8,12 +8,12 @@
 
 namespace varnel {
 
-/// Draws the numbers under some paths into a file when all generations have come.
+/// Draws the numbers under some paths into a file, after the last generation.
 class Picture final : public GenerationSink {
  public:
   explicit Picture(const PlotWish& wish) : _file(wish.file), _recorder(wish.paths) {}
   void take(const Generation& generation) override { _recorder.take(generation); }
-  /// Tells each path whose values are no numbers: no line shows it.
+  /// Names each path whose values are no numbers: no line shows it.
   void finish(const std::string& inputName) override;
 
  private:

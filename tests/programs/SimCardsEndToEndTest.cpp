@@ -26,14 +26,14 @@ using testing::Not;
 
 constexpr std::uint32_t servingCell = 0xB0C1;
 
-// Antennas as the modem of a SIM card tells them, 4 and 2.
+// The numbers of antennas that the modems of the SIM cards report: 4 and 2.
 Bytes antennasOf(std::uint8_t card) {
   Bytes message = PacketBuilder(servingCell, 22).u8(20, card == 1 ? 4 : 2).bytes();
   message.insert(message.begin(), {0x81, card});
   return message;
 }
 
-// By turns a message of each of the SIM cards.
+// Messages of the SIM cards by turns.
 class CardsByTurns final : public MessageSource {
  public:
   explicit CardsByTurns(std::vector<std::uint8_t> cards) : _cards(std::move(cards)) {}
@@ -52,7 +52,7 @@ std::chrono::milliseconds sinceStart() {
       std::chrono::steady_clock::now().time_since_epoch());
 }
 
-// A server of this process, and a viewer that ends after two refreshes.
+// A server in this process, and a viewer that ends after two refreshes.
 class SimCards : public testing::Test {
  protected:
   std::string shownOf(const std::vector<std::uint8_t>& cards, const std::vector<std::string>& more = {}) {

@@ -18,7 +18,7 @@ TEST(FrameChecksum, IsTheSameAtEveryLengthAsBitByBit) {
   }
 }
 
-// How a frame is checked depends on its length and on the processor.
+// The length of a frame and the processor decide how the frame is checked.
 TEST(FrameChecksum, OfEveryLengthFindsEveryBitThatIsTurned) {
   Bytes contents;
   for (int i = 0; i < 100; ++i) {
