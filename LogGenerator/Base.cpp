@@ -60,14 +60,16 @@ void Base::initWithDict_codeDict(ClassDictionary& classDict, CodeDictionary& cod
 }
 
 void Base::updateSectionRef(const Value& section) {
-  sectionRef = section;
+  sectionRef.bind(section);
   logWarning("%s", getSectionName());
 }
 
 void Base::updateLogCodeDict(CodeDictionary& codeDict) {
   const auto codes = getLogCodeArray();
   logWarning("Array Count: %d", static_cast<std::int32_t>(codes.size()));
-  for (const std::uint32_t code : codes) codeDict.subscribe(code, *this);
+  const auto ownHandlers = handlers();
+  for (std::size_t i = 0; i < codes.size(); ++i)
+    codeDict.subscribe(codes[i], {this, i < ownHandlers.size() ? &ownHandlers[i] : nullptr});
 }
 
 void Base::clearElementsInArray(Array& array) {

@@ -4,11 +4,12 @@
 #include <cstdint>
 #include <exception>
 #include <map>
+#include <span>
 #include <string_view>
 #include <vector>
 
-#include "LogGenerator/Packet.h"
-#include "base/Dictionary.h"
+#include "LogGenerator/PacketHandler.h"
+#include "LogGenerator/Section.h"
 #include "base/Value.h"
 
 namespace varnel {
@@ -20,7 +21,7 @@ class SectionFormats;
 /// Section name → the decoder that owns that section.
 using ClassDictionary = std::map<std::string_view, Base*>;
 
-/// Declared for a record index at or past the record count; nothing raises it. It would end the program.
+/// Declared for a record index at or past the record count. Nothing raises it.
 class ArrayOutOfBoundsException : public std::exception {
  public:
   const char* what() const noexcept override { return "ArrayOutOfBoundsException"; }
@@ -41,38 +42,34 @@ class Base {
   virtual std::string_view getSectionName() const = 0;
   /// The log codes that the decoder wants, in order.
   virtual std::vector<std::uint32_t> getLogCodeArray() const = 0;
-  /// The shortest packet of that log code, header included, that the decoder does not drop unread.
-  virtual std::size_t minimumLength(std::uint32_t /*logCode*/) const { return 0; }
-  /// Tells how the section's entries write numbers that have a unit or other texts around them.
-  virtual void listNumberFormats(SectionFormats& /*formats*/) const {}
   /// Decodes one whole packet, header included, into the section.
   virtual void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) = 0;
 
+  /// A handler for each log code of the array, for the index to call; empty when the decoder has its own
+  /// `updateWithData_logCode`, which is then called instead.
+  virtual std::span<const PacketHandler> handlers() const { return {}; }
+  /// Decodes one whole packet by one of the handlers.
+  virtual void decode(const Packet& /*packet*/, const PacketHandler& /*handler*/) {}
+  /// Tells how the section's entries write numbers that have a unit or other texts around them.
+  virtual void listNumberFormats(SectionFormats& /*formats*/) const {}
+
   /// Takes the section that the decoder fills from now on: a dictionary, or an array for a list section.
   void updateSectionRef(const Value& section);
+  Section& section() { return sectionRef; }
+  const Section& section() const { return sectionRef; }
 
   /// Linear energy → whole decibels, 0 down to −31.
   static std::int16_t lookUpECNO(std::uint32_t energy);
 
- protected:
-  /// The section; the absent value until a display is built around this decoder.
-  Value sectionRef;
-
-  /// The section as what the decoder takes it for. Without a section of that kind everything is decoded and
-  /// logged as ever, into a container that nobody sees.
-  Dictionary& rows() { return sectionRef.dictionary() ? *sectionRef.dictionary() : _unseenRows; }
-  Array& list() { return sectionRef.array() ? *sectionRef.array() : _unseenList; }
-
-  void updateLogCodeDict(CodeDictionary& codeDict);
-
-  /// How a list section changes, under the array lock. The second one empties the array as well; who
-  /// empties it before making the new rows lets these take the memory of the old ones.
+  /// How the elements of a list change: under the array lock.
   static void clearElementsInArray(Array& array);
   static void replaceArray_With(Array& array, Array elements);
 
- private:
-  Dictionary _unseenRows;
-  Array _unseenList;
+ protected:
+  /// The section, which has no container until a display is built around this decoder.
+  Section sectionRef;
+
+  void updateLogCodeDict(CodeDictionary& codeDict);
 };
 
 }  // namespace varnel

@@ -7,28 +7,17 @@
 
 namespace varnel {
 
-void CodeDictionary::subscribe(std::uint32_t code, Base& decoder) {
-  auto& [decoders, shortestTaken] = _subscriptions[code];
-  const std::size_t shortest = decoder.minimumLength(code);
-  shortestTaken = decoders.empty() ? shortest : std::min(shortestTaken, shortest);
-  if (decoders.empty()) _codes.push_back(code);
-  decoders.push_back(&decoder);
+void CodeDictionary::subscribe(std::uint32_t code, const Subscriber& subscriber) {
+  auto& [subscribers, shortestTaken] = _subscriptions[code];
+  const std::size_t shortest = subscriber.handler ? subscriber.handler->minimumLength : 0;
+  shortestTaken = subscribers.empty() ? shortest : std::min(shortestTaken, shortest);
+  if (subscribers.empty()) _codes.push_back(code);
+  subscribers.push_back(subscriber);
 }
 
 const CodeDictionary::Subscription* CodeDictionary::subscription(std::uint32_t code) const {
   const auto found = _subscriptions.find(code);
   return found == _subscriptions.end() ? nullptr : &found->second;
-}
-
-std::span<Base* const> CodeDictionary::subscribers(std::uint32_t code) const {
-  const Subscription* found = subscription(code);
-  return found ? std::span<Base* const>(found->decoders) : std::span<Base* const>();
-}
-
-std::vector<std::string> CodeDictionary::keys() const {
-  std::vector<std::string> texts;
-  for (const std::uint32_t code : _codes) texts.push_back(std::to_string(code));
-  return texts;
 }
 
 ClassIndex::~ClassIndex() { _standardOutput << "Deallocing ClassIndex\n"; }
@@ -38,9 +27,23 @@ Base* ClassIndex::getClass(std::string_view sectionName) const {
   return found == classDict.end() ? nullptr : found->second;
 }
 
+std::vector<Base*> ClassIndex::getSubscribers(std::uint32_t code) const {
+  std::vector<Base*> decoders;
+  if (const auto* found = subscription(code)) {
+    for (const Subscriber& subscriber : found->subscribers) decoders.push_back(subscriber.decoder);
+  }
+  return decoders;
+}
+
+std::vector<std::string> ClassIndex::getAllLogCodes() const {
+  std::vector<std::string> texts;
+  for (const std::uint32_t code : logCodes()) texts.push_back(std::to_string(code));
+  return texts;
+}
+
 std::vector<CodeSections> ClassIndex::codeSections() const {
   std::vector<CodeSections> list;
-  for (const std::uint32_t code : codeDictionary.codes()) {
+  for (const std::uint32_t code : logCodes()) {
     CodeSections& entry = list.emplace_back(CodeSections{code, {}});
     for (const Base* decoder : getSubscribers(code)) {
       const std::string_view name = decoder->getSectionName();

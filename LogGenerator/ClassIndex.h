@@ -16,26 +16,32 @@
 
 namespace varnel {
 
+/// Who wants a log code: a decoder, with its handler if it has one.
+struct Subscriber {
+  Base* decoder;
+  const PacketHandler* handler;
+
+  void deliver(const Packet& packet, std::uint32_t logCode) const {
+    if (handler) return decoder->decode(packet, *handler);
+    decoder->updateWithData_logCode(packet, logCode);
+  }
+};
+
 /// Log code → the decoders subscribed to it, in the order of their subscription. Codes keep the order in
 /// which they were first subscribed to.
 class CodeDictionary {
  public:
-  /// Who wants a code.
   struct Subscription {
-    std::vector<Base*> decoders;
+    std::vector<Subscriber> subscribers;
     /// The shortest packet, header included, that one of them does not drop unread.
     std::size_t shortestTaken = 0;
   };
 
   /// A decoder that subscribes twice receives each packet twice.
-  void subscribe(std::uint32_t code, Base& decoder);
+  void subscribe(std::uint32_t code, const Subscriber& subscriber);
   /// Null for a code that nobody wants.
   const Subscription* subscription(std::uint32_t code) const;
-  /// Empty for a code that nobody wants.
-  std::span<Base* const> subscribers(std::uint32_t code) const;
   std::span<const std::uint32_t> codes() const { return _codes; }
-  /// The codes as decimal texts.
-  std::vector<std::string> keys() const;
 
  private:
   std::vector<std::uint32_t> _codes;
@@ -57,10 +63,19 @@ class ClassIndex {
   const CodeDictionary::Subscription* subscription(std::uint32_t code) const {
     return codeDictionary.subscription(code);
   }
-  /// Empty when nobody wants the code.
-  std::span<Base* const> getSubscribers(std::uint32_t code) const { return codeDictionary.subscribers(code); }
-  /// Every subscribed code as decimal text.
-  std::vector<std::string> getAllLogCodes() const { return codeDictionary.keys(); }
+  /// The decoders that want the code, in the order of their subscription.
+  std::vector<Base*> getSubscribers(std::uint32_t code) const;
+  /// Every subscribed code, and the same as decimal texts.
+  std::span<const std::uint32_t> logCodes() const { return codeDictionary.codes(); }
+  std::vector<std::string> getAllLogCodes() const;
+  /// The section that has that container; null when none has.
+  template <class Container>
+  const Section* sectionIn(const Container& container) const {
+    for (const auto& [name, decoder] : classDict) {
+      if (decoder->section().holds(container)) return &decoder->section();
+    }
+    return nullptr;
+  }
   /// Every subscribed code with the sections of its subscribers, each once.
   std::vector<CodeSections> codeSections() const;
   /// How the sections of all decoders write numbers.

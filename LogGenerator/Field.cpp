@@ -84,46 +84,37 @@ std::string_view Formatter::text(const Format& format, std::int32_t number) {
   });
 }
 
-void setFields(Dictionary& section, const Packet& packet, std::span<const Field> fields) {
+void setFields(Dictionary& record, const Packet& packet, std::span<const Field> fields) {
   Formatter formatter;
-  for (const Field& field : fields) section.setText(field.label, formatter.text(packet, field));
+  for (const Field& field : fields) record.setText(field.label, formatter.text(packet, field));
 }
 
-void setInteger(Dictionary& section, std::string_view label, const Format& format, std::int32_t number) {
-  Formatter formatter;
-  section.setText(label, formatter.text(format, number));
+void setInteger(Dictionary& record, std::string_view label, const Format& format, std::int32_t number) {
+  record.setText(label, Formatter().text(format, number));
 }
 
-void setReal(Dictionary& section, std::string_view label, const Format& format, double number) {
-  Formatter formatter;
-  section.setText(label, formatter.text(format, number));
+Value recordOf(const Packet& packet, std::span<const Field> fields) {
+  Value record = Value::ofDictionary();
+  record.dictionary()->reserve(fields.size());
+  setFields(*record.dictionary(), packet, fields);
+  return record;
 }
 
-Value fieldRow(const Packet& record, std::span<const Field> fields) {
-  Value row = Value::ofDictionary();
-  row.dictionary()->reserve(fields.size());
-  setFields(*row.dictionary(), record, fields);
-  return row;
-}
-
-Array recordRows(const Packet& packet, const Records& records, std::span<const Field> fields) {
+void addRecords(Array& list, const Packet& packet, const Records& records, std::span<const Field> fields) {
   const std::size_t size = extent(fields);
-  Array rows;
-  rows.reserve(records.count);
+  list.reserve(list.size() + records.count);
   for (std::size_t i = 0; i < records.count; ++i) {
     const std::size_t offset = records.first + records.stride * i;
-    if (packet.holds(offset, size)) rows.push_back(fieldRow(packet.from(offset), fields));
+    if (packet.holds(offset, size)) list.push_back(recordOf(packet.from(offset), fields));
   }
-  return rows;
 }
 
-Array countedRows(const Packet& packet, const Records& records, std::span<const Field> fields) {
-  Array rows;
-  rows.reserve(records.count);
+void addCountedRecords(Array& list, const Packet& packet, const Records& records,
+                       std::span<const Field> fields) {
+  list.reserve(list.size() + records.count);
   for (std::size_t i = 0; i < records.count; ++i) {
-    rows.push_back(fieldRow(packet.from(records.first + records.stride * i), fields));
+    list.push_back(recordOf(packet.from(records.first + records.stride * i), fields));
   }
-  return rows;
 }
 
 }  // namespace varnel

@@ -153,7 +153,7 @@ consteval Format choice(std::span<const Choice> choices, Format otherwise) {
   return otherwise;
 }
 
-/// One row of a packet's table: where the value lies, its display key and how it is shown.
+/// One field of a packet's table: where the value lies, the entry that shows it, and how.
 struct Field {
   Source source;
   std::string_view label;
@@ -165,12 +165,6 @@ constexpr std::size_t extent(std::span<const Field> fields) {
   std::size_t end = 0;
   for (const Field& field : fields) end = std::max(end, field.source.end());
   return end;
-}
-
-/// For static_assert: does not compile when a field reads past that many bytes.
-consteval bool within(std::span<const Field> fields, std::size_t size) {
-  if (extent(fields) > size) throw "a field lies past the minimum length";
-  return true;
 }
 
 /// Makes display texts. Each stands in the formatter's own room until the next one is made.
@@ -192,18 +186,16 @@ class Formatter {
   std::array<char, 448> _room;
 };
 
-/// Shows the fields in a section, in the order of the table.
-void setFields(Dictionary& section, const Packet& packet, std::span<const Field> fields);
-
 /// The raw value of a field: a signed one as a 32-bit two's complement.
 std::uint32_t rawValue(const Packet& packet, const Source& source);
 
-/// Shows a number that a decoder has worked out, by an integer format or by a real one.
-void setInteger(Dictionary& section, std::string_view label, const Format& format, std::int32_t number);
-void setReal(Dictionary& section, std::string_view label, const Format& format, double number);
+/// Sets the fields of a record, in the order of the table.
+void setFields(Dictionary& record, const Packet& packet, std::span<const Field> fields);
+/// Sets a number of a record that a decoder has worked out, by an integer format.
+void setInteger(Dictionary& record, std::string_view label, const Format& format, std::int32_t number);
 
-/// A row of its own that shows the fields of a record.
-Value fieldRow(const Packet& record, std::span<const Field> fields);
+/// A new record that shows the fields.
+Value recordOf(const Packet& packet, std::span<const Field> fields);
 
 /// Where the records of a counted list lie.
 struct Records {
@@ -212,9 +204,11 @@ struct Records {
   std::size_t count;
 };
 
-/// A row a record, in their order. A record whose fields do not lie wholly inside the packet is left out.
-Array recordRows(const Packet& packet, const Records& records, std::span<const Field> fields);
-/// A row for every counted record. Bytes past the packet's end read as 0.
-Array countedRows(const Packet& packet, const Records& records, std::span<const Field> fields);
+/// Adds the records to a list, in their order. One whose fields do not lie wholly inside the packet is left
+/// out.
+void addRecords(Array& list, const Packet& packet, const Records& records, std::span<const Field> fields);
+/// Adds every counted record. Bytes past the packet's end read as 0.
+void addCountedRecords(Array& list, const Packet& packet, const Records& records,
+                       std::span<const Field> fields);
 
 }  // namespace varnel

@@ -1,20 +1,11 @@
 #include "LogGenerator/KLVLogGenerator2.h"
 
-#include <charconv>
-
+#include "LogGenerator/LogMessage.h"
 #include "base/Log.h"
 
 namespace varnel {
 
 namespace {
-
-constexpr std::uint8_t modemLogType = 1;
-constexpr std::uint8_t extraLogType = 0xFF;
-constexpr std::uint8_t prefixMark = 0x81;
-constexpr std::size_t prefixSize = 2;
-constexpr std::size_t logCodeOffset = 3;
-// Added to the codes of messages that the telephony server made itself.
-constexpr std::uint32_t extraCodeBase = 0xFF0000;
 
 // The generator's line goes out before those of the classes that it is built on.
 const Services& announceCreation(const Services& services, const ClassIndex* classIndex) {
@@ -44,34 +35,33 @@ void KLVLogGenerator2::updateState_withData(Dictionary& state, ByteView data) {
 }
 
 void KLVLogGenerator2::updateWithData(ByteView data) {
-  if (data.size() < Packet::headerSize) return countMessageNotDecoded();
-  // Kept: the length was tested with the prefix, so a packet behind one may lack two bytes of its header.
-  if (data[0] == prefixMark) data = data.subspan(prefixSize);
-  const Packet packet(data);
-  const std::uint8_t logType = packet.u8(0);
-  if (logType != modemLogType && logType != extraLogType) {
-    logError("Invalid log type: %x. Dropping.", logType);
+  const auto message = LogMessage::framed(data);
+  if (!message) return countMessageNotDecoded();
+  if (!message->isOfKnownType()) {
+    logError("Invalid log type: %x. Dropping.", message->logType());
     return countMessageNotDecoded();
   }
-  const std::uint32_t logCode = packet.u16(logCodeOffset) | (logType == extraLogType ? extraCodeBase : 0);
+  const std::uint32_t logCode = message->logCode();
   const auto* subscription = cIndex ? cIndex->subscription(logCode) : nullptr;
   if (!subscription) return countMessageNotDecoded();
-  if (packet.size() < subscription->shortestTaken) [[unlikely]]
+  if (message->packet().size() < subscription->shortestTaken) [[unlikely]]
     countMessageNotDecoded();
-  for (Base* decoder : subscription->decoders) decoder->updateWithData_logCode(packet, logCode);
+  const Time now = services().clock.now();
+  for (const Subscriber& subscriber : subscription->subscribers) {
+    subscriber.decoder->section().setTime(now);
+    subscriber.deliver(message->packet(), logCode);
+  }
 }
 
-MessageFate KLVLogGenerator2::fateOf(ByteView message) const {
+MessageFate KLVLogGenerator2::fateOf(ByteView data) const {
   using enum MessageFate::Outcome;
-  if (message.size() < Packet::headerSize) return {TooShort};
-  if (message[0] == prefixMark) message = message.subspan(prefixSize);
-  const Packet packet(message);
-  const std::uint8_t logType = packet.u8(0);
-  if (logType != modemLogType && logType != extraLogType) return {Unknown};
-  const std::uint32_t logCode = packet.u16(logCodeOffset) | (logType == extraLogType ? extraCodeBase : 0);
+  const auto message = LogMessage::framed(data);
+  if (!message) return {TooShort};
+  if (!message->isOfKnownType()) return {Unknown};
+  const std::uint32_t logCode = message->logCode();
   const auto* subscription = cIndex ? cIndex->subscription(logCode) : nullptr;
   if (!subscription) return {Unknown, logCode};
-  return {packet.size() < subscription->shortestTaken ? TooShort : Decoded, logCode};
+  return {message->packet().size() < subscription->shortestTaken ? TooShort : Decoded, logCode};
 }
 
 std::optional<std::string> KLVLogGenerator2::missingTemplate() const {
@@ -92,6 +82,16 @@ NumberFormats KLVLogGenerator2::numberFormats() const {
 
 std::vector<CodeSections> KLVLogGenerator2::codeSections() const {
   return cIndex ? cIndex->codeSections() : std::vector<CodeSections>();
+}
+
+std::optional<Time> KLVLogGenerator2::writtenAt(const Dictionary& entries, std::string_view key) const {
+  const Section* section = cIndex ? cIndex->sectionIn(entries) : nullptr;
+  return section ? section->writtenAt(key) : std::nullopt;
+}
+
+std::optional<Time> KLVLogGenerator2::refilledAt(const Array& list) const {
+  const Section* section = cIndex ? cIndex->sectionIn(list) : nullptr;
+  return section ? section->refilledAt() : std::nullopt;
 }
 
 Value KLVLogGenerator2::getDisplayFromState(Dictionary& state) {
@@ -164,14 +164,11 @@ Value KLVLogGenerator2::generateLogUsingState(Dictionary& state) {
 Value KLVLogGenerator2::getStartCommand() const {
   Value logCodes = Value::ofArray();
   Value extraCodes = Value::ofArray();
-  for (const std::string& text : cIndex ? cIndex->getAllLogCodes() : std::vector<std::string>()) {
-    std::uint32_t code = 0;
-    std::from_chars(text.data(), text.data() + text.size(), code);
-    if (code >= extraCodeBase) {
-      extraCodes.array()->push_back(Value::ofInteger(code - extraCodeBase));
-    } else {
-      logCodes.array()->push_back(Value::ofInteger(code));
-    }
+  for (const std::uint32_t code : cIndex ? cIndex->logCodes() : std::span<const std::uint32_t>()) {
+    const bool isExtra = code >= LogMessage::extraCodeBase;
+    (isExtra ? extraCodes : logCodes)
+        .array()
+        ->push_back(Value::ofInteger(isExtra ? code - LogMessage::extraCodeBase : code));
   }
   Value command = Value::ofDictionary();
   command.dictionary()->set("SetState", "Streaming");

@@ -10,10 +10,7 @@ namespace varnel {
 
 /// The template-driven generator. Its display is a copy of a template resource; each section of the copy
 /// belongs to the decoder that the class index has for the section's name, and each packet goes to the
-/// decoders that subscribed to its log code.
-///
-/// A packet is: log type (1 byte, 1 or 0xFF), record length (2), log code (2), timestamp (8), payload. A
-/// leading 0x81 and the byte behind it are no part of it.
+/// decoders that subscribed to its log code. Packets are those of `LogMessage`, of either log type.
 class KLVLogGenerator2 : public KLVLogGenerator {
  public:
   void updateState_withData(Dictionary& state, ByteView data) override;
@@ -24,6 +21,8 @@ class KLVLogGenerator2 : public KLVLogGenerator {
   std::optional<std::string> missingTemplate() const override;
   bool changesDisplayOf(const Dictionary& state) const override;
   std::vector<CodeSections> codeSections() const override;
+  std::optional<Time> writtenAt(const Dictionary& entries, std::string_view key) const override;
+  std::optional<Time> refilledAt(const Array& list) const override;
 
  protected:
   /// Takes ownership of both. A generator without a template resource has neither: it decodes nothing.

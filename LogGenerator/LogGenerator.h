@@ -11,6 +11,7 @@
 #include "LogGenerator/MessageFate.h"
 #include "LogGenerator/NumberFormats.h"
 #include "LogGenerator/Services.h"
+#include "LogGenerator/WriteTimes.h"
 #include "base/Bytes.h"
 #include "base/Dictionary.h"
 #include "base/Value.h"
@@ -28,13 +29,12 @@ inline constexpr std::string_view history = "History";
 }  // namespace stateKey
 
 /// Turns the messages of one modem technology into a display dictionary.
-class LogGenerator {
+class LogGenerator : public WriteTimes {
  public:
   /// Logs "Creating Log object: %p".
   explicit LogGenerator(const Services& services);
   LogGenerator(const LogGenerator&) = delete;
   LogGenerator& operator=(const LogGenerator&) = delete;
-  virtual ~LogGenerator() = default;
 
   /// A new generator for the technology that the telephony service names; null for a technology that has
   /// none.

@@ -42,6 +42,7 @@ class Packet {
                                       ((std::uint64_t{1} << width) - 1));
   }
 
+  ByteView bytes() const { return _bytes; }
   /// The bytes from the offset on, as a view whose offsets count from there; empty past the end.
   Packet from(std::size_t offset) const { return Packet(_bytes.subspan(offset < size() ? offset : size())); }
   /// What follows the header; empty for a packet that is shorter than one.

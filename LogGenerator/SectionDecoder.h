@@ -1,8 +1,7 @@
 #pragma once
 
-#include <cstddef>
 #include <cstdint>
-#include <initializer_list>
+#include <span>
 #include <string_view>
 #include <vector>
 
@@ -11,59 +10,52 @@
 
 namespace varnel {
 
-/// One log code of a decoder. A packet shorter than the minimum, header included, is dropped silently.
-template <class Decoder>
-struct PacketHandler {
-  std::uint32_t logCode;
-  std::size_t minimumLength;
-  void (Decoder::*decode)(const Packet& packet);
-};
-
-/// All log codes of a decoder, in the order in which it subscribes to them. As a static member it keeps its
-/// elements for the whole life of the program.
-template <class Decoder>
-using PacketHandlers = std::initializer_list<PacketHandler<Decoder>>;
-
-/// What becomes of a log code that a decoder does not list.
-enum class UnknownCodes { Logged, Ignored };
-
 inline void logUnknownCode(std::uint32_t logCode) {
   logError("Received an unknown log message: %d", logCode);
 }
 
-/// The common steps of a decoder: its trace line, the log-code test, the length test, the handler. `Decoder`
-/// supplies the static members `sectionName`, `traceLine` and `handlers`, the table of its log codes, and may
-/// replace the two constants below.
-template <class Decoder>
+/// The common steps of a decoder: its trace line, the log code, the length, what the handler shows.
 class SectionDecoder : public Base {
  public:
-  static constexpr int tracePriority = logWarningPriority;
-  static constexpr UnknownCodes unknownCodes = UnknownCodes::Logged;
+  /// What becomes of a log code that a decoder does not list.
+  enum class UnknownCodes { Logged, Ignored };
 
-  std::string_view getSectionName() const final { return Decoder::sectionName; }
+  std::string_view getSectionName() const final { return _sectionName; }
+  std::vector<std::uint32_t> getLogCodeArray() const final;
+  std::span<const PacketHandler> handlers() const final { return _handlers; }
+  void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) final;
+  void decode(const Packet& packet, const PacketHandler& handler) final;
+  /// Tells the formats of all tables of the handlers.
+  void listNumberFormats(SectionFormats& formats) const override;
 
-  std::vector<std::uint32_t> getLogCodeArray() const final {
-    std::vector<std::uint32_t> codes;
-    for (const auto& handler : Decoder::handlers) codes.push_back(handler.logCode);
-    return codes;
+ protected:
+  /// The handlers, all log codes of the decoder in the order in which it subscribes to them, live as long as
+  /// the program.
+  SectionDecoder(std::string_view sectionName, std::string_view traceLine,
+                 std::span<const PacketHandler> handlers, UnknownCodes unknownCodes = UnknownCodes::Logged,
+                 int tracePriority = logWarningPriority)
+      : _sectionName(sectionName),
+        _traceLine(traceLine),
+        _handlers(handlers),
+        _unknownCodes(unknownCodes),
+        _tracePriority(tracePriority) {}
+
+  /// The handler's way to a member function.
+  template <auto method>
+  static void calling(SectionDecoder& decoder, const Packet& packet) {
+    call(decoder, method, packet);
   }
 
-  std::size_t minimumLength(std::uint32_t logCode) const final {
-    for (const auto& handler : Decoder::handlers) {
-      if (handler.logCode == logCode) return handler.minimumLength;
-    }
-    return 0;
+ private:
+  template <class Decoder>
+  static void call(SectionDecoder& decoder, void (Decoder::*method)(const Packet&), const Packet& packet) {
+    (static_cast<Decoder&>(decoder).*method)(packet);
   }
 
-  void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) final {
-    logLine(Decoder::tracePriority, "%s", Decoder::traceLine);
-    for (const auto& handler : Decoder::handlers) {
-      if (handler.logCode != logCode) continue;
-      if (packet.size() >= handler.minimumLength) (static_cast<Decoder*>(this)->*handler.decode)(packet);
-      return;
-    }
-    if constexpr (Decoder::unknownCodes == UnknownCodes::Logged) logUnknownCode(logCode);
-  }
+  const std::string_view _sectionName, _traceLine;
+  const std::span<const PacketHandler> _handlers;
+  const UnknownCodes _unknownCodes;
+  const int _tracePriority;
 };
 
 }  // namespace varnel

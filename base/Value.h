@@ -72,6 +72,8 @@ class Value {
 
   /// Becomes the given text. Reuses the memory of a text that was there.
   void assignText(std::string_view text);
+  /// Becomes the given integer.
+  void assignInteger(std::int64_t number) { _content = number; }
 
   /// For an array or a dictionary, a new one that shares its elements with this one; any other value itself.
   Value shallowCopy() const;

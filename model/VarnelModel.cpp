@@ -236,7 +236,7 @@ std::shared_ptr<const VarnelModelNode> VarnelModel::topLevelNodes() {
   if (_nodes || !_logGenerator) return _nodes;
   const Value display = _logGenerator->generateLogUsingState(_state);
   _nodesByPath.emplace();
-  _nodes = VarnelModelNode::makeTreeFromObject_withPathDictionary(display, *_nodesByPath);
+  _nodes = VarnelModelNode::makeTreeFromObject_withPathDictionary(display, *_nodesByPath, *_logGenerator);
   return _nodes;
 }
 

@@ -21,6 +21,7 @@ using Children = VarnelModelNode::Children;
 // An entry of a dictionary as a child in the tree.
 struct Row {
   std::string_view name;
+  std::string_view key;
   const Value* value;
 };
 
@@ -38,55 +39,65 @@ std::vector<Row> rowsOf(const Dictionary& entries) {
   rows.reserve(inOrder.size());
   for (const Dictionary::Entry* entry : inOrder) {
     if (entry->key == sortMark) continue;
-    rows.push_back({isSorted ? displayNameOfSortedKey(entry->key) : entry->key, &entry->value});
+    rows.push_back({isSorted ? displayNameOfSortedKey(entry->key) : entry->key, entry->key, &entry->value});
   }
   return rows;
 }
 
 class TreeBuilder {
  public:
-  explicit TreeBuilder(PathDictionary& paths) : _paths(paths) {}
+  TreeBuilder(PathDictionary& paths, const WriteTimes& times) : _paths(paths), _times(times) {}
 
-  Node build(std::string_view name, const Value& object, const std::string& path) {
-    Node node = make(name, object, path);
+  // What nobody keeps a time of is as old as what it stands in.
+  Node build(std::string_view name, const Value& object, const std::string& path,
+             const std::optional<Time>& writtenAt = {}) {
+    Node node = make(name, object, path, writtenAt);
     _paths.insert_or_assign(path, node);
     return node;
   }
 
  private:
-  Node make(std::string_view name, const Value& object, const std::string& path) {
-    if (const std::string* text = object.string()) return std::make_shared<VarnelModelLeafNode>(name, *text);
+  Node make(std::string_view name, const Value& object, const std::string& path,
+            const std::optional<Time>& writtenAt) {
+    if (const std::string* text = object.string())
+      return std::make_shared<VarnelModelLeafNode>(name, *text, writtenAt);
     if (const Dictionary* entries = object.dictionary()) {
-      return std::make_shared<VarnelModelTreeNode>(name, childrenOf(*entries, path),
+      return std::make_shared<VarnelModelTreeNode>(name, childrenOf(*entries, path, writtenAt),
                                                    VarnelModelTreeNode::Origin::Dictionary);
     }
     if (const Array* elements = object.array()) {
-      return std::make_shared<VarnelModelTreeNode>(name, childrenOf(*elements, path),
+      return std::make_shared<VarnelModelTreeNode>(name, childrenOf(*elements, path, writtenAt),
                                                    VarnelModelTreeNode::Origin::Array);
     }
-    return std::make_shared<VarnelModelLeafNode>(name, unknownValue);
+    return std::make_shared<VarnelModelLeafNode>(name, unknownValue, writtenAt);
   }
 
-  Children childrenOf(const Dictionary& entries, const std::string& path) {
+  Children childrenOf(const Dictionary& entries, const std::string& path,
+                      const std::optional<Time>& writtenAt) {
     const std::vector<Row> rows = rowsOf(entries);
     Children children;
     children.reserve(rows.size());
-    for (const auto& [name, value] : rows) children.push_back(build(name, *value, childPath(path, name)));
+    for (const auto& [name, key, value] : rows) {
+      const auto itsTime = _times.writtenAt(entries, key);
+      children.push_back(build(name, *value, childPath(path, name), itsTime ? itsTime : writtenAt));
+    }
     return children;
   }
 
-  Children childrenOf(const Array& elements, const std::string& path) {
+  Children childrenOf(const Array& elements, const std::string& path, const std::optional<Time>& writtenAt) {
+    const auto itsTime = _times.refilledAt(elements);
     const ArrayLock::Scope lock;
     Children children;
     children.reserve(elements.size());
     for (const Value& element : elements) {
       const std::string name = std::to_string(children.size());
-      children.push_back(build(name, element, childPath(path, name)));
+      children.push_back(build(name, element, childPath(path, name), itsTime ? itsTime : writtenAt));
     }
     return children;
   }
 
   PathDictionary& _paths;
+  const WriteTimes& _times;
 };
 
 // The text of an object that the tree shows as a leaf; nothing for an object with children.
@@ -100,7 +111,7 @@ std::optional<std::string_view> leafText(const Value& object) {
 template <class Predicate>
 const Value* firstRow(const Value& object, const Predicate& isWanted) {
   if (const Dictionary* entries = object.dictionary()) {
-    for (const auto& [name, value] : rowsOf(*entries))
+    for (const auto& [name, key, value] : rowsOf(*entries))
       if (isWanted(name, *value)) return value;
   } else if (const Array* elements = object.array()) {
     const ArrayLock::Scope lock;
@@ -219,7 +230,12 @@ class ObjectFinder {
 
 std::shared_ptr<const VarnelModelNode> VarnelModelNode::makeTreeFromObject_withPathDictionary(
     const Value& object, PathDictionary& paths) {
-  return TreeBuilder(paths).build("Varnel", object, "/");
+  return makeTreeFromObject_withPathDictionary(object, paths, WriteTimes());
+}
+
+std::shared_ptr<const VarnelModelNode> VarnelModelNode::makeTreeFromObject_withPathDictionary(
+    const Value& object, PathDictionary& paths, const WriteTimes& times) {
+  return TreeBuilder(paths, times).build("Varnel", object, "/");
 }
 
 std::optional<std::string_view> leafValueUnderPath(const Value& object, std::string_view path) {

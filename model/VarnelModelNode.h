@@ -7,6 +7,8 @@
 #include <unordered_map>
 #include <vector>
 
+#include "LogGenerator/WriteTimes.h"
+#include "base/Time.h"
 #include "base/Value.h"
 
 namespace varnel {
@@ -34,6 +36,9 @@ class VarnelModelNode {
   /// "/". Records every node in the path dictionary; of two nodes with the same path, the later one.
   static std::shared_ptr<const VarnelModelNode> makeTreeFromObject_withPathDictionary(const Value& object,
                                                                                       PathDictionary& paths);
+  /// The same with leaves that know when packets last wrote them.
+  static std::shared_ptr<const VarnelModelNode> makeTreeFromObject_withPathDictionary(
+      const Value& object, PathDictionary& paths, const WriteTimes& times);
 
  private:
   std::string _name;
@@ -42,12 +47,16 @@ class VarnelModelNode {
 /// A leaf: a name and its value.
 class VarnelModelLeafNode final : public VarnelModelNode {
  public:
-  VarnelModelLeafNode(std::string_view name, std::string_view value)
-      : VarnelModelNode(name), _string(value) {}
+  VarnelModelLeafNode(std::string_view name, std::string_view value,
+                      const std::optional<Time>& writtenAt = {})
+      : VarnelModelNode(name), _string(value), _writtenAt(writtenAt) {}
   const std::string* value() const override { return &_string; }
+  /// When a packet last wrote the value; absent when that is not known.
+  const std::optional<Time>& writtenAt() const { return _writtenAt; }
 
  private:
   std::string _string;
+  std::optional<Time> _writtenAt;
 };
 
 /// An inner node and its children, in order.

@@ -5,6 +5,7 @@
 
 #include "LogGenerator/C2K/DisplayVariables.h"
 #include "LogGenerator/C2K/PacketDecoders.h"
+#include "LogGenerator/LogMessage.h"
 #include "base/Log.h"
 
 namespace varnel {
@@ -12,13 +13,6 @@ namespace varnel {
 namespace {
 
 constexpr std::string_view templateName = "C2KTemplate";
-
-constexpr std::uint8_t modemLogType = 1;
-constexpr std::uint8_t extraLogType = 0xFF;
-constexpr std::uint8_t prefixMark = 0x81;
-constexpr std::size_t prefixSize = 2;
-constexpr std::size_t logCodeOffset = 3;
-constexpr std::uint32_t extraCodeBase = 0xFF0000;
 
 enum class Length { Exact, Minimum };
 
@@ -97,10 +91,10 @@ std::unique_ptr<LogGenerator> C2KLogGenerator::generator(const Services& service
 }
 
 void C2KLogGenerator::updateState_withData(Dictionary& state, ByteView data) {
-  if (state.get(_slots.display).isAbsent()) getDisplayFromState(state);
-  const Value& placements = state.get(_slots.lookup);
+  if (_entries.display.get(state).isAbsent()) getDisplayFromState(state);
+  const Value& placements = _entries.lookup.get(state);
   if (!_lookup.isMadeFrom(placements)) _lookup = c2k::Lookup(placements);
-  c2k::State decoderState{state, _slots};
+  c2k::State decoderState{state, _entries};
   updateFromLog_usingLookup_usingState(data, _lookup, decoderState);
 }
 
@@ -157,24 +151,22 @@ Value C2KLogGenerator::getDisplayFromState(Dictionary& state) {
   return display;
 }
 
-void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView message, c2k::Lookup& lookup,
+void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView data, c2k::Lookup& lookup,
                                                            c2k::State& state) {
-  if (message.size() < Packet::headerSize) return countMessageNotDecoded();
-  // Kept: the length was tested with the prefix, so a packet behind one may lack two bytes of its header.
-  if (message[0] == prefixMark) message = message.subspan(prefixSize);
-  const Packet packet(message);
-  const std::uint8_t logType = packet.u8(0);
+  const auto message = LogMessage::framed(data);
+  if (!message) return countMessageNotDecoded();
   // Kept: whatever the line says, the packet is not dropped.
-  if (logType != modemLogType) logError("Invalid log type: %x. Dropping.", logType);
-  const std::uint32_t logCode = packet.u16(logCodeOffset) | (logType == extraLogType ? extraCodeBase : 0);
-  const auto kind = std::ranges::find(packetKinds, logCode, &PacketKind::logCode);
+  if (message->logType() != LogMessage::modemLogType)
+    logError("Invalid log type: %x. Dropping.", message->logType());
+  const auto kind = std::ranges::find(packetKinds, message->logCode(), &PacketKind::logCode);
   if (kind == std::end(packetKinds)) return countMessageNotDecoded();
-  if (hasRightLength(*kind, packet)) {
-    kind->decode(packet, state, lookup);
+  if (hasRightLength(*kind, message->packet())) {
+    lookup.setTime(services().clock.now());
+    kind->decode(message->packet(), state, lookup);
   } else {
     countMessageNotDecoded();
   }
-  collect(message);
+  collect(message->packet().bytes());
 }
 
 NumberFormats C2KLogGenerator::numberFormats() const {
@@ -203,18 +195,16 @@ std::vector<CodeSections> C2KLogGenerator::codeSections() const {
 }
 
 // Any log type will do, as in decoding.
-MessageFate C2KLogGenerator::fateOf(ByteView message) const {
+MessageFate C2KLogGenerator::fateOf(ByteView data) const {
   using enum MessageFate::Outcome;
-  if (message.size() < Packet::headerSize) return {TooShort};
-  if (message[0] == prefixMark) message = message.subspan(prefixSize);
-  const Packet packet(message);
-  const std::uint32_t logCode =
-      packet.u16(logCodeOffset) | (packet.u8(0) == extraLogType ? extraCodeBase : 0);
+  const auto message = LogMessage::framed(data);
+  if (!message) return {TooShort};
+  const std::uint32_t logCode = message->logCode();
   const auto kind = std::ranges::find(packetKinds, logCode, &PacketKind::logCode);
   if (kind == std::end(packetKinds)) return {Unknown, logCode};
-  if (packet.size() < kind->length) return {TooShort, logCode};
-  const bool isTooLong = kind->rule == Length::Exact && packet.size() > kind->length;
-  return {isTooLong ? TooLong : Decoded, logCode};
+  const std::size_t size = message->packet().size();
+  if (size < kind->length) return {TooShort, logCode};
+  return {kind->rule == Length::Exact && size > kind->length ? TooLong : Decoded, logCode};
 }
 
 std::optional<std::string> C2KLogGenerator::missingTemplate() const {

@@ -23,6 +23,9 @@ class C2KLogGenerator final : public KLVLogGenerator {
   bool changesDisplayOf(const Dictionary& state) const override;
   /// The sections are those of the template that show a variable which the packet's decoder publishes.
   std::vector<CodeSections> codeSections() const override;
+  std::optional<Time> writtenAt(const Dictionary& entries, std::string_view key) const override {
+    return _lookup.writtenAt(entries, key);
+  }
 
   /// Fills the display, a dictionary, with the shape of the template, and the lookup with an array for each
   /// variable: a placement {"key": the row, "dict": the dictionary of the display that holds the row} for
@@ -37,8 +40,8 @@ class C2KLogGenerator final : public KLVLogGenerator {
   /// Decodes one message. Packets of the known log codes are kept for the binary log, decodable or not.
   void updateFromLog_usingLookup_usingState(ByteView message, c2k::Lookup& lookup, c2k::State& state);
 
-  c2k::StateSlots _slots;
-  c2k::Lookup _lookup;  // made from the one in the state
+  c2k::StateEntries _entries;  // where those of the state stand
+  c2k::Lookup _lookup;         // made from the one in the state
   bool _lacksTemplate = false;
 };
 

@@ -48,15 +48,14 @@ struct Progress {
   std::uint64_t bits;
 };
 
-void store(Dictionary& entries, Dictionary::Slot& sequence, Dictionary::Slot& sent,
-           const Progress& progress) {
-  entries.set(sequence, Value::ofInteger(progress.sequence));
-  entries.set(sent, Value::ofInteger(static_cast<std::int64_t>(progress.bits)));
+void store(Dictionary& entries, BoundEntry& sequence, BoundEntry& sent, const Progress& progress) {
+  sequence.setInteger(entries, progress.sequence);
+  sent.setInteger(entries, static_cast<std::int64_t>(progress.bits));
 }
 
-std::optional<Progress> previousProgress(const Dictionary& entries, LinkSlots& link) {
-  const auto sequence = entries.get(link.sequence).integer();
-  const auto bits = entries.get(link.sent).integer();
+std::optional<Progress> previousProgress(const Dictionary& entries, LinkEntries& link) {
+  const auto sequence = link.sequence.get(entries).integer();
+  const auto bits = link.sent.get(entries).integer();
   if (!sequence || !bits) return std::nullopt;
   return Progress{static_cast<std::uint32_t>(*sequence), static_cast<std::uint64_t>(*bits)};
 }
@@ -69,8 +68,8 @@ void showRate(Variable variable, const Progress& previous, const Progress& now, 
   storeDisplayNumber(variable, rateFormat, bits / (steps * 1024.0), lookup);
 }
 
-void updateRate(Variable variable, const Progress& now, State& state, LinkSlots& link, Lookup& lookup) {
-  Dictionary* extraInfo = state.entries.get(state.slots.extraInfo).dictionary();
+void updateRate(Variable variable, const Progress& now, State& state, LinkEntries& link, Lookup& lookup) {
+  Dictionary* extraInfo = state.bound.extraInfo.get(state.entries).dictionary();
   if (const auto previous = previousProgress(state.entries, link)) {
     showRate(variable, *previous, now, lookup);
     if (extraInfo) store(*extraInfo, link.oldSequence, link.oldSent, *previous);
@@ -96,7 +95,7 @@ void decodeFLDataRate(const Packet& packet, State& state, Lookup& lookup) {
   const auto counters = packet.numbers<flCounterCount>(flCounters);
   const std::uint64_t bits =
       std::inner_product(counters.begin(), counters.end(), std::begin(flWeights), std::uint64_t{0});
-  updateRate(forwardRate, {packet.u32(flSequenceOffset), bits}, state, state.slots.forwardLink, lookup);
+  updateRate(forwardRate, {packet.u32(flSequenceOffset), bits}, state, state.bound.forwardLink, lookup);
 }
 
 void decodeRLDataRate(const Packet& packet, State& state, Lookup& lookup) {
@@ -104,7 +103,7 @@ void decodeRLDataRate(const Packet& packet, State& state, Lookup& lookup) {
   for (std::size_t rate = 0; rate < rlRateCount; ++rate) {
     bits += rlPacketsAtRate(packet, rate) * rlWeights[rate];
   }
-  updateRate(reverseRate, {packet.u32(rlSequenceOffset), bits}, state, state.slots.reverseLink, lookup);
+  updateRate(reverseRate, {packet.u32(rlSequenceOffset), bits}, state, state.bound.reverseLink, lookup);
 }
 
 void listDataRateFormats(std::vector<VariableFormat>& formats) {

@@ -15,7 +15,7 @@ std::vector<Lookup::Place> placesIn(const Array& placements) {
     const std::string* key = entries->get(keyEntry).string();
     Dictionary* section = entries->get(sectionEntry).dictionary();
     if (!key || !section) break;
-    places.push_back({section, Dictionary::Slot(*key)});
+    places.push_back({section, BoundEntry(*key)});
   }
   return places;
 }
@@ -30,9 +30,18 @@ Lookup::Lookup(const Value& placements) : _placements(placements) {
   }
 }
 
+std::optional<Time> Lookup::writtenAt(const Dictionary& section, std::string_view key) const {
+  for (const std::vector<Place>& places : _places) {
+    for (const Place& place : places) {
+      if (place.section == &section && place.entry.key() == key) return place.entry.writtenAt;
+    }
+  }
+  return std::nullopt;
+}
+
 Value Lookup::dictionaryFor(Variable variable) {
   if (const auto shownAt = places(variable); !shownAt.empty()) {
-    const Value& shown = shownAt[0].section->get(shownAt[0].key);
+    const Value& shown = shownAt[0].entry.get(*shownAt[0].section);
     if (shown.dictionary() && !shown.sharesDictionary()) return shown;
   }
   return Value::ofDictionary();
@@ -48,11 +57,17 @@ void addPlacement(Dictionary& placements, std::string_view variable, std::string
 }
 
 void storeDisplayValue(Variable variable, const Value& value, Lookup& lookup) {
-  for (Lookup::Place& place : lookup.places(variable)) place.section->set(place.key, value);
+  for (Lookup::Place& place : lookup.places(variable)) {
+    place.entry.set(*place.section, Value(value));
+    place.entry.writtenAt = lookup.time();
+  }
 }
 
 void storeDisplayText(Variable variable, std::string_view text, Lookup& lookup) {
-  for (Lookup::Place& place : lookup.places(variable)) place.section->setText(place.key, text);
+  for (Lookup::Place& place : lookup.places(variable)) {
+    place.entry.setText(*place.section, text);
+    place.entry.writtenAt = lookup.time();
+  }
 }
 
 void storeDisplayNumber(Variable variable, const Format& format, double number, Lookup& lookup) {

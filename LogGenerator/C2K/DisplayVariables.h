@@ -10,6 +10,7 @@
 #include <string_view>
 #include <vector>
 
+#include "LogGenerator/BoundEntry.h"
 #include "LogGenerator/Field.h"
 #include "LogGenerator/SortedKey.h"
 #include "base/Dictionary.h"
@@ -86,7 +87,7 @@ class Lookup {
  public:
   struct Place {
     Dictionary* section;
-    Dictionary::Slot key;
+    BoundEntry entry;
   };
 
   /// Without an argument, or with what is no dictionary, there are no places.
@@ -99,12 +100,18 @@ class Lookup {
   }
   /// In their order, up to the first placement that is none.
   std::span<Place> places(Variable variable) { return _places[variable.index()]; }
+  /// The time of the packets that are decoded from now on.
+  void setTime(const Time& now) { _now = now; }
+  const Time& time() const { return _now; }
+  /// When a packet last wrote the entry; absent when none did.
+  std::optional<Time> writtenAt(const Dictionary& section, std::string_view key) const;
   /// A dictionary to fill and to publish: the one that the variable shows, when nobody else has it, or else a
   /// new one.
   Value dictionaryFor(Variable variable);
 
  private:
   Value _placements;  // keeps the sections
+  Time _now;
   std::array<std::vector<Place>, std::size(variableNames)> _places;
 };
 

@@ -68,7 +68,7 @@ void decodeEVDOActiveSet(const Packet& packet, State& /*state*/, Lookup& lookup)
     return;
   }
   PilotStrengths pilots(activeSetVariable, lookup);
-  for (std::size_t i = 0; i < count; ++i) {
+  for (std::uint8_t i = 0; i < count; ++i) {
     const Packet pilot = packet.from(evdoActiveSetSize + pilotSize * i);
     pilots.add(i, pilot.u16(0), decibelFormat, decibelsOfRatio512(pilot.u16(2)));
   }
@@ -86,7 +86,7 @@ void decodeFingerC2I(const Packet& packet, State& /*state*/, Lookup& lookup) {
     return;
   }
   PilotStrengths fingers(fingersVariable, lookup);
-  for (std::size_t i = 0; i < count; ++i) {
+  for (std::uint8_t i = 0; i < count; ++i) {
     const Packet finger = packet.from(fingerC2ISize + fingerSize * i);
     if (const std::uint16_t pn = finger.u16(0); pn != unassignedPN) {
       fingers.add(i, pn, decibelFormat, decibelsOfRatio512(finger.u16(6)));

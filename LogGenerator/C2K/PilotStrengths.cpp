@@ -1,34 +1,45 @@
 #include "LogGenerator/C2K/PilotStrengths.h"
 
+#include <array>
+#include <charconv>
 #include <cmath>
-#include <string>
 
 namespace varnel::c2k {
 
-void PilotStrengths::add(std::size_t index, std::uint16_t pn, const Format& format, double decibels) {
-  if (!_rewriting) begin();
-  Formatter formatter;
-  _rewriting->add(std::to_string(index) + ';' + std::to_string(pn), formatter.text(format, decibels));
+void PilotStrengths::add(std::uint8_t index, std::uint16_t pn, const Format& format, double decibels) {
+  if (_size == 0) put(sortedMark, sortedMark);
+  std::array<char, 16> key;  // room for two numbers, of 8 and of 16 bits, and more
+  char* end = std::to_chars(key.begin(), key.end(), index).ptr;
+  *end++ = ';';
+  end = std::to_chars(end, key.end(), pn).ptr;
+  put({key.data(), end}, Formatter().text(format, decibels));
 }
 
 void PilotStrengths::publish() {
-  if (!_rewriting) begin();
-  _rewriting.reset();
-  storeDisplayValue(_variable, _rows, _lookup);
+  if (_size == 0) put(sortedMark, sortedMark);
+  _pilots.dictionary()->truncate(_size);
+  storeDisplayValue(_variable, _pilots, _lookup);
 }
 
 void PilotStrengths::publishOrNone() {
-  if (_rewriting) {
+  if (_size > 0) {
     publish();
   } else {
     storeDisplayText(_variable, "(none)", _lookup);
   }
 }
 
-void PilotStrengths::begin() {
-  _rows = _lookup.dictionaryFor(_variable);
-  _rewriting.emplace(*_rows.dictionary());
-  _rewriting->add(sortedMark, sortedMark);
+// Pilots mostly come again, and then take the room of those of the packet before.
+void PilotStrengths::put(std::string_view key, std::string_view text) {
+  if (_size == 0) _pilots = _lookup.dictionaryFor(_variable);
+  Dictionary& pilots = *_pilots.dictionary();
+  if (pilots.hasAt(_size, key)) {
+    pilots.at(_size).assignText(text);
+  } else {
+    pilots.truncate(_size);
+    pilots.add(key, text);
+  }
+  ++_size;
 }
 
 double decibels(double ratio) { return 10.0 * std::log10(ratio); }

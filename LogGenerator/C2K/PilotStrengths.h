@@ -2,7 +2,6 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <optional>
 
 #include "LogGenerator/C2K/DisplayVariables.h"
 #include "LogGenerator/Field.h"
@@ -17,21 +16,21 @@ class PilotStrengths {
   PilotStrengths(Variable variable, Lookup& lookup) : _variable(variable), _lookup(lookup) {}
 
   /// Adds a pilot with its strength in dB, by a format made by `real`. Every index comes once.
-  void add(std::size_t index, std::uint16_t pn, const Format& format, double decibels);
+  void add(std::uint8_t index, std::uint16_t pn, const Format& format, double decibels);
 
-  /// Ends the row and publishes it as a sorted dictionary, which is empty but for its mark when there are no
+  /// Publishes the pilots as a sorted dictionary, which is empty but for its mark when there are no
   /// pilots.
   void publish();
   /// The same, but without pilots the text "(none)".
   void publishOrNone();
 
  private:
-  void begin();
+  void put(std::string_view key, std::string_view text);
 
   Variable _variable;
   Lookup& _lookup;
-  Value _rows;
-  std::optional<Dictionary::Rewriting> _rewriting;  // of the rows, once they have begun
+  Value _pilots;
+  std::size_t _size = 0;  // of the entries that are this packet's
 };
 
 /// How the strength of a pilot is shown.

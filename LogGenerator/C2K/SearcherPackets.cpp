@@ -90,12 +90,12 @@ void showActiveSet(const Packet& activeSet, Lookup& lookup) {
   const Integration integration{.length = static_cast<double>(activeSet.u16(4)),
                                 .gain = static_cast<double>(activeSet.u8(6)),
                                 .exponent = activeSet.u8(7)};
-  const std::size_t count = activeSet.u8(8);
+  const std::uint8_t count = activeSet.u8(8);
   const std::size_t extensions = activeSet.u8(9);
   const std::uint16_t referencePN = activeSet.u16(10);
   const std::size_t stride = (6 * extensions + 15) & 0xFFC;
   PilotStrengths pilots(activeSetVariable, lookup);
-  for (std::size_t i = 0; i < count; ++i) {
+  for (std::uint8_t i = 0; i < count; ++i) {
     const std::uint16_t pn = activeSet.u16(12 + i * stride);
     const std::uint16_t energy = activeSet.u16(24 + 4 * extensions + i * stride);
     pilots.add(i, pn, pn == referencePN ? referencePilot : decibelFormat, pilotStrength(integration, energy));
@@ -106,7 +106,7 @@ void showActiveSet(const Packet& activeSet, Lookup& lookup) {
 
 // The frame-error rate between 0 and 1. It is computed in single precision at every step.
 std::optional<float> trafficFER(const State& state) {
-  const Value& rate = state.entries.get(state.slots.trafficFER);
+  const Value& rate = state.bound.trafficFER.get(state.entries);
   if (const auto real = rate.real()) return static_cast<float>(*real);
   if (const auto integer = rate.integer()) return static_cast<float>(*integer);
   return std::nullopt;
@@ -117,7 +117,7 @@ void endTrafficFER(State& state, Lookup& lookup) {
   const auto rate = trafficFER(state);
   if (!rate) return;
   storeDisplayNumber(trafficFERVariable, oldErrorRate, *rate * 100.0F, lookup);
-  state.entries.remove(state.slots.trafficFER);
+  state.entries.remove(state.bound.trafficFER.key());
 }
 
 }  // namespace
@@ -150,7 +150,7 @@ void decode1xTrafficFER(const Packet& packet, State& state, Lookup& lookup) {
   const float sample = demodulation->u8(erasureOffset) ? 1.0F / 64 : 0.0F;
   const auto previous = trafficFER(state);
   const float rate = previous ? sample + *previous * (63.0F / 64) : sample;
-  state.entries.set(state.slots.trafficFER, Value::ofReal(rate));
+  state.bound.trafficFER.set(state.entries, Value::ofReal(rate));
   storeDisplayNumber(trafficFERVariable, errorRate, rate * 100.0F, lookup);
 }
 

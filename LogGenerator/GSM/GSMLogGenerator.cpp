@@ -79,6 +79,7 @@ void GSMLogGenerator::updateState_withData(Dictionary& state, ByteView data) {
   if (!object)
     throw AssertionFailure(assertionFile, unreadableObjectLine, "Could not deserialize the object");
   Value display = processObject(*object);
+  _received = services().clock.now();
   state.set(stateKey::displayState, *object);
   state.set(stateKey::display, std::move(display));
   state.set(stateKey::extraInfo, Value::ofDictionary());

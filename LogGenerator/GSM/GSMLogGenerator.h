@@ -17,6 +17,10 @@ class GSMLogGenerator final : public LogGenerator {
   void updateState_withData(Dictionary& state, ByteView data) override;
   Value generateLogUsingState(Dictionary& state) override;
   Value getStartCommand() const override;
+  /// The whole picture is as old as its message.
+  std::optional<Time> writtenAt(const Dictionary& /*entries*/, std::string_view /*key*/) const override {
+    return _received;
+  }
   /// The records of the history.
   Value getSaveContentsFromState(const Dictionary& state) const override;
 
@@ -26,6 +30,9 @@ class GSMLogGenerator final : public LogGenerator {
   static Value processObject(const Value& object);
   /// The value of a dictionary's only entry; absent for anything else.
   static Value canCollapse(const Value& object);
+
+ private:
+  std::optional<Time> _received;
 };
 
 }  // namespace varnel

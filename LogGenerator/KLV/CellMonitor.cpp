@@ -24,18 +24,18 @@ bool holdsText(const Dictionary& record, std::string_view key, std::string_view 
   return found && *found == text;
 }
 
-void showCell(Dictionary& row, const Dictionary& record, std::span<const CellMonitorColumn> columns) {
+void fill(Dictionary& record, const Dictionary& cell, std::span<const CellMonitorColumn> columns) {
   using Width = CellMonitorColumn::Width;
   for (const CellMonitorColumn& column : columns) {
-    const auto number = record.get(column.key).int32();
+    const auto number = cell.get(column.key).int32();
     if (!number) {
       logError("%s", column.failureMessage);
     } else if (column.width == Width::Unsigned16) {
-      setInteger(row, column.label, column.format, static_cast<std::uint16_t>(*number));
+      setInteger(record, column.label, column.format, static_cast<std::uint16_t>(*number));
     } else if (static_cast<std::int16_t>(*number) == std::numeric_limits<std::int16_t>::max()) {
-      row.setText(column.label, "");
+      record.setText(column.label, "");
     } else {
-      setInteger(row, column.label, column.format, static_cast<std::int16_t>(*number));
+      setInteger(record, column.label, column.format, static_cast<std::int16_t>(*number));
     }
   }
 }
@@ -79,29 +79,25 @@ const Dictionary* firstCellOfKind(const Array& records, std::string_view radioAc
   return nullptr;
 }
 
-void showCellMonitorRows(Dictionary& section, const Dictionary& record,
-                         std::span<const CellMonitorRow> rows) {
-  for (const CellMonitorRow& row : rows) {
-    if (const auto number = record.get(row.key).int32()) {
-      section.setText(row.label, std::to_string(*number));
+void showCell(Section& section, const Dictionary& cell, std::span<const CellMonitorEntry> entries) {
+  for (const CellMonitorEntry& entry : entries) {
+    if (const auto number = cell.get(entry.key).int32()) {
+      section.setText(entry.label, std::to_string(*number));
     } else {
-      logError("%s", row.failureMessage);
+      logError("%s", entry.failureMessage);
     }
   }
 }
 
-Array cellMonitorList(const Array& records, std::string_view radioAccessTechnology, std::string_view cellType,
-                      std::span<const CellMonitorColumn> columns) {
-  Array rows;
-  for (const Value& record : records) {
-    const Dictionary* cell = cellOfKind(record, radioAccessTechnology, cellType);
+void addCells(Array& list, const Array& cells, std::string_view radioAccessTechnology,
+              std::string_view cellType, std::span<const CellMonitorColumn> columns) {
+  for (const Value& candidate : cells) {
+    const Dictionary* cell = cellOfKind(candidate, radioAccessTechnology, cellType);
     if (!cell) continue;
-    Value row = Value::ofDictionary();
-    row.dictionary()->reserve(columns.size());
-    showCell(*row.dictionary(), *cell, columns);
-    rows.push_back(std::move(row));
+    const Value& record = list.emplace_back(Value::ofDictionary());
+    record.dictionary()->reserve(columns.size());
+    fill(*record.dictionary(), *cell, columns);
   }
-  return rows;
 }
 
 }  // namespace varnel

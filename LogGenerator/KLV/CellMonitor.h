@@ -6,6 +6,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/Packet.h"
+#include "LogGenerator/Section.h"
 #include "base/Dictionary.h"
 #include "base/Value.h"
 
@@ -41,15 +42,15 @@ const Dictionary* cellOfKind(const Value& record, std::string_view radioAccessTe
 const Dictionary* firstCellOfKind(const Array& records, std::string_view radioAccessTechnology,
                                   std::string_view cellType);
 
-/// One entry of a cell-monitor record and how a section shows it.
-struct CellMonitorRow {
+/// One number of a cell-monitor record and the entry of a section that shows it.
+struct CellMonitorEntry {
   std::string_view key;             ///< the record's key
   std::string_view label;           ///< the section's
   std::string_view failureMessage;  ///< logged as an error when the record has no such number
 };
 
-/// Shows each entry as a signed 32-bit decimal; an entry that is missing leaves its row as it is.
-void showCellMonitorRows(Dictionary& section, const Dictionary& record, std::span<const CellMonitorRow> rows);
+/// Shows each number as a signed 32-bit decimal; one that is missing leaves its entry as it is.
+void showCell(Section& section, const Dictionary& cell, std::span<const CellMonitorEntry> entries);
 
 /// One number that a list section shows of a cell-monitor record, which keeps only 16 bits of it.
 struct CellMonitorColumn {
@@ -65,8 +66,8 @@ struct CellMonitorColumn {
   Format format = integer();
 };
 
-/// A row a record of that kind, in the order of the records. A number that a record lacks is left out.
-Array cellMonitorList(const Array& records, std::string_view radioAccessTechnology, std::string_view cellType,
-                      std::span<const CellMonitorColumn> columns);
+/// Adds a record per cell of that kind, in their order. A number that a cell lacks is left out.
+void addCells(Array& list, const Array& cells, std::string_view radioAccessTechnology,
+              std::string_view cellType, std::span<const CellMonitorColumn> columns);
 
 }  // namespace varnel

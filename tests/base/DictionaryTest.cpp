@@ -172,73 +172,52 @@ TEST(Dictionary, SetTextLeavesCopiesOfTheValueAlone) {
   EXPECT_EQ(*copy.string(), "old");
 }
 
-TEST(Dictionary, ASlotFindsItsKeyWhereverItStands) {
+TEST(Dictionary, FindTellsThePositionOfAKey) {
   Dictionary dictionary;
-  Dictionary::Slot slot("b");
-  EXPECT_TRUE(dictionary.get(slot).isAbsent());
+  EXPECT_EQ(dictionary.find("a"), Dictionary::nowhere);
   dictionary.set("a", "1");
-  dictionary.set(slot, "2");
-  EXPECT_EQ(*dictionary.get("b").string(), "2");
-  EXPECT_EQ(*dictionary.get(slot).string(), "2");
+  dictionary.set("b", "2");
+  EXPECT_EQ(dictionary.find("b"), 1u);
+  EXPECT_TRUE(dictionary.hasAt(1, "b"));
+  EXPECT_FALSE(dictionary.hasAt(0, "b"));
+  EXPECT_FALSE(dictionary.hasAt(2, "b"));
   dictionary.remove("a");
-  dictionary.set("c", "3");
-  dictionary.setText(slot, "4");
-  EXPECT_EQ(dictionary.size(), 2u);
-  EXPECT_EQ(*dictionary.get("b").string(), "4");
-  EXPECT_EQ(*dictionary.get("c").string(), "3");
-  dictionary.remove(slot);
-  EXPECT_TRUE(dictionary.get(slot).isAbsent());
-  dictionary.setText(slot, "5");
-  EXPECT_EQ(*dictionary.get(slot).string(), "5");
-  dictionary.set(slot, Value());
-  EXPECT_EQ(*dictionary.get(slot).string(), "5");
+  EXPECT_EQ(dictionary.find("b"), 0u);
+  EXPECT_EQ(dictionary.find("a"), Dictionary::nowhere);
 }
 
-TEST(Dictionary, ASlotServesSeveralDictionaries) {
-  Dictionary first, second;
-  first.set("a", "1");
-  first.set("b", "2");
-  second.set("b", "3");
-  Dictionary::Slot slot("b");
-  EXPECT_EQ(*first.get(slot).string(), "2");
-  EXPECT_EQ(*second.get(slot).string(), "3");
-  EXPECT_EQ(*first.get(slot).string(), "2");
-}
-
-TEST(Dictionary, RewritingLeavesJustTheRowsThatWereAdded) {
+TEST(Dictionary, TheValueAtAPositionCanBeReplaced) {
   Dictionary dictionary;
-  for (const char* key : {"a", "b", "c"}) dictionary.set(key, "old");
-  {
-    Dictionary::Rewriting rewriting(dictionary);
-    rewriting.add("c", "1");
-    rewriting.add("d", "2");
-  }
-  EXPECT_EQ(keysOf(dictionary), "c d ");
-  EXPECT_EQ(textOf(dictionary, "c"), "1");
-  EXPECT_EQ(textOf(dictionary, "d"), "2");
-  EXPECT_FALSE(dictionary.has("a"));
-  EXPECT_FALSE(dictionary.has("b"));
-  { const Dictionary::Rewriting rewriting(dictionary); }
-  EXPECT_TRUE(dictionary.empty());
-  EXPECT_FALSE(dictionary.has("c"));
+  dictionary.set("a", "1");
+  dictionary.set("b", "2");
+  dictionary.at(1).assignText("3");
+  EXPECT_EQ(textOf(dictionary, "b"), "3");
+  dictionary.at(0) = Value::ofInteger(4);
+  EXPECT_EQ(dictionary.at(0).integer(), 4);
+  EXPECT_EQ(keysOf(dictionary), "a b ");
 }
 
-TEST(Dictionary, RewritingTakesOtherKindsAndGrows) {
-  Dictionary dictionary;
-  dictionary.set("a", Value::ofInteger(1));
-  {
-    Dictionary::Rewriting rewriting(dictionary);
-    for (int i = 0; i < 60; ++i) rewriting.add("key " + std::to_string(i), std::to_string(i));
-  }
+TEST(Dictionary, AddPutsAnEntryAtTheEnd) {
+  Dictionary dictionary = numbered(60);
+  dictionary.add("last", "1");
+  EXPECT_EQ(dictionary.find("last"), 60u);
+  EXPECT_EQ(textOf(dictionary, "last"), "1");
+}
+
+TEST(Dictionary, TruncateRemovesTheEntriesFromAPositionOn) {
+  Dictionary dictionary = numbered(60);
+  const std::string first = dictionary.begin()->key;
+  const std::string second = (dictionary.begin() + 1)->key;
+  dictionary.truncate(60);
   EXPECT_EQ(dictionary.size(), 60u);
-  EXPECT_EQ(*dictionary.get("key 59").string(), "59");
-  EXPECT_TRUE(dictionary.get("a").isAbsent());
-  {
-    Dictionary::Rewriting rewriting(dictionary);
-    rewriting.add("key 59", "one");
-  }
-  EXPECT_EQ(keysOf(dictionary), "key 59 ");
-  EXPECT_EQ(textOf(dictionary, "key 59"), "one");
+  dictionary.truncate(1);
+  EXPECT_EQ(dictionary.size(), 1u);
+  EXPECT_TRUE(dictionary.has(first));
+  EXPECT_FALSE(dictionary.has(second));
+  dictionary.set(second, "again");
+  EXPECT_EQ(dictionary.find(second), 1u);
+  dictionary.truncate(0);
+  EXPECT_TRUE(dictionary.empty());
 }
 
 // As the walk over a history record does: values go from one key to another of the same dictionary.

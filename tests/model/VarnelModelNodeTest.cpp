@@ -527,5 +527,38 @@ TEST(DisplayTree, ArraysWithinArraysAreWalkedWhole) {
   EXPECT_THAT(tree.allPaths(), UnorderedElementsAre("/", "/0", "/0/0", "/0/1", "/1", "/2", "/2/0", "/2/0/0"));
 }
 
+class FixedTimes final : public WriteTimes {
+ public:
+  std::optional<Time> writtenAt(const Dictionary& /*entries*/, std::string_view key) const override {
+    return key == "RSRP" || key == "1;Sorted" ? std::optional(Time{.seconds = 100}) : std::nullopt;
+  }
+  std::optional<Time> refilledAt(const Array& /*list*/) const override { return Time{.seconds = 200}; }
+};
+
+std::optional<Time> timeOf(const PathDictionary& paths, const std::string& path) {
+  return dynamic_cast<const VarnelModelLeafNode&>(*paths.at(path)).writtenAt();
+}
+
+TEST(DisplayTree, LeavesCarryTheTimeOfTheirEntryOrOfWhatTheyStandIn) {
+  const Value display = dictionaryOf(
+      {{"Serving Cell", dictionaryOf({{"RSRP", "-80 dBm"}, {"Band", "3"}})},
+       {"Order", dictionaryOf({{"_sorted", "_sorted"}, {"1;Sorted", "yes"}})},
+       {"Neighbors", Value::ofArray({dictionaryOf({{"RSRP", "-90 dBm"}, {"Band", "7"}}), "text"})}});
+  PathDictionary paths;
+  VarnelModelNode::makeTreeFromObject_withPathDictionary(display, paths, FixedTimes());
+  EXPECT_EQ(timeOf(paths, "/Serving Cell/RSRP"), Time{.seconds = 100});
+  EXPECT_EQ(timeOf(paths, "/Serving Cell/Band"), std::nullopt);
+  EXPECT_EQ(timeOf(paths, "/Order/Sorted"), Time{.seconds = 100});
+  EXPECT_EQ(timeOf(paths, "/Neighbors/0/RSRP"), Time{.seconds = 100});
+  EXPECT_EQ(timeOf(paths, "/Neighbors/0/Band"), Time{.seconds = 200});
+  EXPECT_EQ(timeOf(paths, "/Neighbors/1"), Time{.seconds = 200});
+}
+
+TEST(DisplayTree, WithoutTimesNoLeafHasOne) {
+  PathDictionary paths;
+  VarnelModelNode::makeTreeFromObject_withPathDictionary(dictionaryOf({{"RSRP", "-80 dBm"}}), paths);
+  EXPECT_EQ(timeOf(paths, "/RSRP"), std::nullopt);
+}
+
 }  // namespace
 }  // namespace varnel

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <string_view>
 
+#include "LogGenerator/LogMessage.h"
 #include "base/Bytes.h"
 #include "base/PropertyList.h"
 #include "base/Value.h"
@@ -16,9 +17,9 @@ class PacketBuilder {
  public:
   /// The header of that log code (type 0xFF from 0xFF0000 on, else 1) and zeros up to the size.
   PacketBuilder(std::uint32_t logCode, std::size_t size) : _bytes(size) {
-    u8(0, logCode < 0xFF0000 ? 1 : 0xFF);
+    u8(0, logCode < LogMessage::extraCodeBase ? LogMessage::modemLogType : LogMessage::extraLogType);
     u16(1, static_cast<std::uint16_t>(size));
-    u16(3, static_cast<std::uint16_t>(logCode));
+    u16(LogMessage::logCodeOffset, static_cast<std::uint16_t>(logCode));
   }
 
   /// Puts the byte everywhere behind the header.
@@ -47,7 +48,7 @@ class PacketBuilder {
 
 /// A message that the telephony server made: the header of its log code, then the payload.
 inline Bytes serverMessageOfBytes(std::uint32_t logCode, ByteView payload) {
-  Bytes message = PacketBuilder(logCode, 13).bytes();
+  Bytes message = PacketBuilder(logCode, Packet::headerSize).bytes();
   message.insert(message.end(), payload.begin(), payload.end());
   return message;
 }

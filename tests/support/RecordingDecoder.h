@@ -24,7 +24,7 @@ class RecordingDecoder : public Base {
   }
 
   /// The container that the decoder was given.
-  const Value& section() const { return sectionRef; }
+  const Value& section() const { return sectionRef.container(); }
 };
 
 }  // namespace varnel

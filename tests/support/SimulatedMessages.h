@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "LogGenerator/LogMessage.h"
 #include "base/Dictionary.h"
 #include "base/PropertyList.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
@@ -20,8 +21,10 @@ struct SimulatedPacket {
   unsigned u8(std::size_t offset) const { return packet.at(offset); }
   unsigned u16(std::size_t offset) const { return u8(offset) | u8(offset + 1) << 8; }
   unsigned u32(std::size_t offset) const { return u16(offset) | u16(offset + 2) << 16; }
-  unsigned code() const { return (u8(0) == 0xFF ? 0xFF0000 : 0) | u16(3); }
-  Value payload() const { return readPropertyList(ByteView(packet).subspan(13)).value_or(Value()); }
+  unsigned code() const { return LogMessage::framed(packet)->logCode(); }
+  Value payload() const {
+    return readPropertyList(LogMessage::framed(packet)->packet().payload()).value_or(Value());
+  }
 };
 
 /// What a modem sends in that time.

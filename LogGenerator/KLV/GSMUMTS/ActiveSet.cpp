@@ -27,31 +27,31 @@ std::int32_t receivedSignalStrength(const Packet& packet) {
   return (reading + 512) / 10 - 106;
 }
 
+void update(Section& section, const Packet& packet) {
+  const std::int32_t strength = receivedSignalStrength(packet);
+  section.refill([&](Array& cells) {
+    for (std::size_t i = 0; i < packet.u8(cellSet::countOffset); ++i) {
+      const Packet cell = cellSet::cell(packet, i);
+      if (rawValue(cell, cellSet::membership) != cellSet::activeSet) continue;
+      const std::int16_t ecNo = Base::lookUpECNO(energyPerChip(cellSet::energy(packet, i)));
+      const Value& record = cells.emplace_back(recordOf(cell, identity));
+      setInteger(*record.dictionary(), "RSCP", level, strength + ecNo);
+      setInteger(*record.dictionary(), "Energy Per Chip", level, ecNo);
+    }
+  });
+}
+
+constexpr PacketHandler packets[] = {
+    {cellSet::logCode, cellSet::minimumSize, update},
+};
+
 }  // namespace
 
-constinit const PacketHandlers<ActiveSet> ActiveSet::handlers = {
-    {cellSet::logCode, cellSet::minimumSize, &ActiveSet::update},
-};
+ActiveSet::ActiveSet() : SectionDecoder("Active Set", "ActiveSet", packets) {}
 
 void ActiveSet::listNumberFormats(SectionFormats& formats) const {
   formats.add("RSCP", level);
   formats.add("Energy Per Chip", level);
-}
-
-void ActiveSet::update(const Packet& packet) {
-  clearElementsInArray(list());
-  const std::int32_t strength = receivedSignalStrength(packet);
-  Array cells;
-  for (std::size_t i = 0; i < packet.u8(cellSet::countOffset); ++i) {
-    const Packet cell = cellSet::cell(packet, i);
-    if (rawValue(cell, cellSet::membership) != cellSet::activeSet) continue;
-    const std::int16_t ecNo = lookUpECNO(energyPerChip(cellSet::energy(packet, i)));
-    Value row = fieldRow(cell, identity);
-    setInteger(*row.dictionary(), "RSCP", level, strength + ecNo);
-    setInteger(*row.dictionary(), "Energy Per Chip", level, ecNo);
-    cells.push_back(std::move(row));
-  }
-  replaceArray_With(list(), std::move(cells));
 }
 
 }  // namespace varnel

@@ -6,7 +6,6 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint32_t logCode = 0x4116;
 constexpr std::size_t minimumSize = 16;
 constexpr std::size_t countOffset = 13;
 constexpr std::size_t recordSize = 9;
@@ -14,25 +13,26 @@ constexpr std::size_t recordSize = 9;
 constexpr Field window[] = {
     {u16(14), "Window Size"},
 };
-static_assert(within(window, minimumSize));
 
 constexpr Field channel[] = {
     {u8(0), "Transport Channel ID"},
     {u32(1), "CRC Received"},
     {u32(5), "CRC Received in Error"},
 };
-static_assert(within(channel, recordSize));
+
+void update(Section& section, const Packet& packet) {
+  section.show(packet, window);
+  Array channels;
+  addCountedRecords(channels, packet, {minimumSize, recordSize, packet.u8(countOffset)}, channel);
+  section.set("Transport Channels", Value::ofArray(std::move(channels)));
+}
+
+constexpr PacketHandler packets[] = {
+    {0x4116, minimumSize, update},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<BLER> BLER::handlers = {
-    {logCode, minimumSize, &BLER::update},
-};
-
-void BLER::update(const Packet& packet) {
-  setFields(rows(), packet, window);
-  const Records channels = {minimumSize, recordSize, packet.u8(countOffset)};
-  rows().set("Transport Channels", Value::ofArray(countedRows(packet, channels, channel)));
-}
+BLER::BLER() : SectionDecoder("BLER", "BLER", packets) {}
 
 }  // namespace varnel

@@ -5,14 +5,9 @@
 namespace varnel {
 
 /// The block errors of the UMTS transport channels.
-class BLER final : public SectionDecoder<BLER> {
+class BLER final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "BLER";
-  static constexpr std::string_view traceLine = "BLER";
-  static const PacketHandlers<BLER> handlers;
-
- private:
-  void update(const Packet& packet);
+  BLER();
 };
 
 }  // namespace varnel

@@ -1,14 +1,15 @@
 #pragma once
 
-#include "LogGenerator/SectionWithoutCodes.h"
+#include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
 
 /// How often the serving cell changed.
-class CellChangeCounters final : public SectionWithoutCodes<CellChangeCounters> {
+class CellChangeCounters final : public SectionDecoder {
  public:
   static constexpr std::string_view sectionName = "Cell Change Counters";
-  static constexpr std::string_view traceLine = "CellChangeCounters";
+
+  CellChangeCounters() : SectionDecoder(sectionName, "CellChangeCounters", {}, UnknownCodes::Ignored) {}
 };
 
 }  // namespace varnel

@@ -37,17 +37,18 @@ inline Packet energy(const Packet& packet, std::size_t index) {
 
 }  // namespace cellSet
 
-/// A set of cells that has its section but no rows.
+/// A set of cells that has its section but no records.
 /// Kept: whatever the packet holds, the list becomes empty.
-template <class Decoder>
-class EmptyCellSet : public SectionDecoder<Decoder> {
- private:
-  void update(const Packet&) { this->clearElementsInArray(this->list()); }
+class EmptyCellSet : public SectionDecoder {
+ protected:
+  EmptyCellSet(std::string_view sectionName, std::string_view traceLine)
+      : SectionDecoder(sectionName, traceLine, packets) {}
 
- public:
-  static constexpr PacketHandlers<Decoder> handlers = {
-      {cellSet::logCode, cellSet::minimumSize, &EmptyCellSet::update},
-  };
+ private:
+  static void empty(Section& section, const Packet& /*packet*/) {
+    section.refill([](Array& /*cells*/) {});
+  }
+  static constexpr PacketHandler packets[] = {{cellSet::logCode, cellSet::minimumSize, empty}};
 };
 
 }  // namespace varnel

@@ -1,15 +1,16 @@
 #pragma once
 
-#include "LogGenerator/SectionWithoutCodes.h"
+#include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
 
 /// The GPRS coding scheme.
-class CodingScheme final : public SectionWithoutCodes<CodingScheme> {
+class CodingScheme final : public SectionDecoder {
  public:
   static constexpr std::string_view sectionName = "Coding Scheme";
+
   // Kept: the text of `CellChangeCounters`.
-  static constexpr std::string_view traceLine = "CellChangeCounters";
+  CodingScheme() : SectionDecoder(sectionName, "CellChangeCounters", {}, UnknownCodes::Ignored) {}
 };
 
 }  // namespace varnel

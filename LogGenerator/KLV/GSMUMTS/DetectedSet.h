@@ -5,10 +5,11 @@
 namespace varnel {
 
 /// The cells that were found without being on the network's list.
-class DetectedSet final : public EmptyCellSet<DetectedSet> {
+class DetectedSet final : public EmptyCellSet {
  public:
   static constexpr std::string_view sectionName = "Detected Set";
-  static constexpr std::string_view traceLine = "DetectedSet";
+
+  DetectedSet() : EmptyCellSet(sectionName, "DetectedSet") {}
 };
 
 }  // namespace varnel

@@ -9,15 +9,6 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint32_t packetControlLogCode = 0x51F5;
-constexpr std::size_t packetControlSize = 18;
-constexpr std::uint32_t controlChannelLogCode = 0x51FB;
-constexpr std::size_t controlChannelSize = 34;
-constexpr std::uint32_t packetSystemInformationLogCode = 0x51FD;
-constexpr std::size_t packetSystemInformationSize = 35;
-constexpr std::uint32_t systemInformation13LogCode = 0x51F4;
-constexpr std::size_t systemInformation13Size = 15;
-
 constexpr Choice controlOrders[] = {
     {0xFF, "Not Available"},
     {0, "NC0"},
@@ -42,13 +33,11 @@ constexpr Field packetControl[] = {
     {u8(13), "PFC Supported", choice(flowContextSupport, "Unknown")},
     {u8(14), "Priority Access Threshold", choice(accessThresholds, "Unknown")},
 };
-static_assert(within(packetControl, packetControlSize));
 
 constexpr std::string_view operatingModes[] = {"Class 1", "Class 2", "Class 3"};
 constexpr Field operatingMode[] = {
     {networkIdentity::operatingMode, "Network Operating Mode", entry(operatingModes)},
 };
-static_assert(within(operatingMode, networkIdentity::minimumSize));
 
 constexpr std::string_view t3192Times[] = {
     "500 ms", "1000 ms", "1500 ms", "0 ms", "80 ms", "120 ms", "160 ms", "200 ms",
@@ -59,12 +48,10 @@ constexpr Field cellOptions[] = {
     {gprsCellOptions::accessBurstType, "Access Burst Type", choice(burstTypes, "11-bit format")},
     {gprsCellOptions::drxTimerMaximum, "DRX Timer Max"},
 };
-static_assert(within(cellOptions, gprsCellOptions::minimumSize));
 
 constexpr Field controlChannel[] = {
     {u8(13), "PBCCH Present"},
 };
-static_assert(within(controlChannel, controlChannelSize));
 
 constexpr Choice support[] = {{0, "Not Supported"}};
 constexpr Field packetSystemInformation[] = {
@@ -74,7 +61,6 @@ constexpr Field packetSystemInformation[] = {
     {u8(14), "Count LR"},
     {u8(15), "Count HR"},
 };
-static_assert(within(packetSystemInformation, packetSystemInformationSize));
 
 constexpr Choice positions[] = {
     {0xFF, "Not Available"},
@@ -84,45 +70,24 @@ constexpr Choice positions[] = {
 constexpr Field systemInformation13[] = {
     {u8(14), "SI13 Position", choice(positions, "Unknown")},
 };
-static_assert(within(systemInformation13, systemInformation13Size));
 
 constexpr Choice hysteresis[] = {{0, "Not Applied"}};
 constexpr Field reselection[] = {
     {gsmMeasurement::reselectHysteresis, "Cell Reselect Hysteresis", choice(hysteresis, "Applied")},
 };
-static_assert(within(reselection, gsmMeasurement::minimumSize));
+
+constexpr PacketHandler packets[] = {
+    {0x51F5, 18, packetControl},
+    {networkIdentity::logCode, networkIdentity::minimumSize, operatingMode},
+    {gprsCellOptions::logCode, gprsCellOptions::minimumSize, cellOptions},
+    {0x51FB, 34, controlChannel},
+    {0x51FD, 35, packetSystemInformation},
+    {0x51F4, 15, systemInformation13},
+    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, reselection},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<GPRSInformation> GPRSInformation::handlers = {
-    {packetControlLogCode, packetControlSize, &GPRSInformation::updatePacketControl},
-    {networkIdentity::logCode, networkIdentity::minimumSize, &GPRSInformation::updateOperatingMode},
-    {gprsCellOptions::logCode, gprsCellOptions::minimumSize, &GPRSInformation::updateCellOptions},
-    {controlChannelLogCode, controlChannelSize, &GPRSInformation::updateControlChannel},
-    {packetSystemInformationLogCode, packetSystemInformationSize,
-     &GPRSInformation::updatePacketSystemInformation},
-    {systemInformation13LogCode, systemInformation13Size, &GPRSInformation::updateSystemInformation13},
-    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &GPRSInformation::updateReselection},
-};
-
-void GPRSInformation::updatePacketControl(const Packet& packet) { setFields(rows(), packet, packetControl); }
-
-void GPRSInformation::updateOperatingMode(const Packet& packet) { setFields(rows(), packet, operatingMode); }
-
-void GPRSInformation::updateCellOptions(const Packet& packet) { setFields(rows(), packet, cellOptions); }
-
-void GPRSInformation::updateControlChannel(const Packet& packet) {
-  setFields(rows(), packet, controlChannel);
-}
-
-void GPRSInformation::updatePacketSystemInformation(const Packet& packet) {
-  setFields(rows(), packet, packetSystemInformation);
-}
-
-void GPRSInformation::updateSystemInformation13(const Packet& packet) {
-  setFields(rows(), packet, systemInformation13);
-}
-
-void GPRSInformation::updateReselection(const Packet& packet) { setFields(rows(), packet, reselection); }
+GPRSInformation::GPRSInformation() : SectionDecoder("GPRS Information", "GPRSInformation", packets) {}
 
 }  // namespace varnel

@@ -3,16 +3,10 @@
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/GSMUMTS/GPRSCellOptions.h"
 #include "LogGenerator/KLV/GSMUMTS/GSMMeasurement.h"
-#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
 namespace {
-
-constexpr std::uint32_t stateLogCode = 0x512C;
-constexpr std::size_t stateSize = 17;
-constexpr std::uint32_t transmissionLogCode = 0x5072;
-constexpr std::size_t transmissionSize = 20;
 
 // Kept: the blanks in three of the names, and two that are no RR_ names.
 constexpr std::string_view states[] = {
@@ -46,45 +40,33 @@ constexpr Field state[] = {
     {u8(15), "RR Status"},
     {u8(16), "RR Mode", choice(modes, "Data")},
 };
-static_assert(within(state, stateSize));
 
 constexpr Field measurement[] = {
     {gsmMeasurement::receiveLevel, "Serving Rx Level"},
     {u32(gsmMeasurement::firstValue), "Rx Quality Full"},
     {u32(gsmMeasurement::secondValue), "Rx Quality Sub"},
 };
-static_assert(within(measurement, gsmMeasurement::minimumSize));
 
 // Discontinuous transmission.
 constexpr Choice off[] = {{0, "OFF"}};
 constexpr Field transmission[] = {
     {u8(19), "DTX Used", choice(off, "ON")},
 };
-static_assert(within(transmission, transmissionSize));
 
 // Discontinuous reception.
 constexpr Field reception[] = {
     {gprsCellOptions::drxTimerMaximum, "DRX Used", integer("%d sec")},
 };
-static_assert(within(reception, gprsCellOptions::minimumSize));
+
+constexpr PacketHandler packets[] = {
+    {0x512C, 17, state},
+    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, measurement},
+    {0x5072, 20, transmission},
+    {gprsCellOptions::logCode, gprsCellOptions::minimumSize, reception},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<GSMRRInfo> GSMRRInfo::handlers = {
-    {stateLogCode, stateSize, &GSMRRInfo::updateState},
-    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &GSMRRInfo::updateMeasurement},
-    {transmissionLogCode, transmissionSize, &GSMRRInfo::updateTransmission},
-    {gprsCellOptions::logCode, gprsCellOptions::minimumSize, &GSMRRInfo::updateReception},
-};
-
-void GSMRRInfo::listNumberFormats(SectionFormats& formats) const { formats.add(reception); }
-
-void GSMRRInfo::updateState(const Packet& packet) { setFields(rows(), packet, state); }
-
-void GSMRRInfo::updateMeasurement(const Packet& packet) { setFields(rows(), packet, measurement); }
-
-void GSMRRInfo::updateTransmission(const Packet& packet) { setFields(rows(), packet, transmission); }
-
-void GSMRRInfo::updateReception(const Packet& packet) { setFields(rows(), packet, reception); }
+GSMRRInfo::GSMRRInfo() : SectionDecoder("GSM RR Info", "GSMRRInfo", packets) {}
 
 }  // namespace varnel

@@ -2,7 +2,6 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/GSMUMTS/CellRanking.h"
-#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -16,21 +15,20 @@ constexpr Field cell[] = {
     {s8(4), "RSSI", integer("%d dBm")},
     {s16(5), "Ranking Value"},
 };
-static_assert(within(cell, recordSize));
+
+void update(Section& section, const Packet& packet) {
+  using namespace cellRanking;
+  section.refill([&](Array& cells) {
+    addCountedRecords(cells, packet, {firstRecord, recordSize, packet.u8(gsmCountOffset)}, cell);
+  });
+}
+
+constexpr PacketHandler packets[] = {
+    {cellRanking::logCode, cellRanking::minimumSize, update, cell},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<GSMSet> GSMSet::handlers = {
-    {cellRanking::logCode, cellRanking::minimumSize, &GSMSet::update},
-};
-
-void GSMSet::listNumberFormats(SectionFormats& formats) const { formats.add(cell); }
-
-void GSMSet::update(const Packet& packet) {
-  using namespace cellRanking;
-  clearElementsInArray(list());
-  const Records cells = {firstRecord, recordSize, packet.u8(gsmCountOffset)};
-  replaceArray_With(list(), countedRows(packet, cells, cell));
-}
+GSMSet::GSMSet() : SectionDecoder("GSM Set", "GSMSet", packets) {}
 
 }  // namespace varnel

@@ -5,16 +5,9 @@
 namespace varnel {
 
 /// The ranked GSM cells, a row each.
-class GSMSet final : public SectionDecoder<GSMSet> {
+class GSMSet final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "GSM Set";
-  static constexpr std::string_view traceLine = "GSMSet";
-  static const PacketHandlers<GSMSet> handlers;
-
-  void listNumberFormats(SectionFormats& formats) const override;
-
- private:
-  void update(const Packet& packet);
+  GSMSet();
 };
 
 }  // namespace varnel

@@ -6,7 +6,6 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint32_t logCode = 0x4221;
 constexpr std::size_t minimumSize = 18;
 constexpr std::size_t primaryCountOffset = 16;
 constexpr std::size_t secondaryCountOffset = 17;
@@ -22,7 +21,6 @@ constexpr Field configuration[] = {
     {bits(14, 0, 10), "Sub Frames", number},
     {bits(15, 2, 2), "Carrier Info", entry(carriers)},
 };
-static_assert(within(configuration, minimumSize));
 
 // A process of the hybrid automatic repeat request (HARQ).
 constexpr Field process[] = {
@@ -33,25 +31,29 @@ constexpr Field process[] = {
 };
 static_assert(extent(process) == processSize);
 
-void showProcesses(Dictionary& section, std::string_view label, const Packet& packet,
-                   const Records& records) {
-  // A count of 0 leaves what was there.
-  if (records.count > 0) section.set(label, Value::ofArray(recordRows(packet, records, process)));
+void showProcesses(Section& section, std::string_view label, const Packet& packet, const Records& records) {
+  if (records.count == 0) return;  // what was there stays
+  Array processes;
+  addRecords(processes, packet, records, process);
+  section.set(label, Value::ofArray(std::move(processes)));
 }
 
-}  // namespace
-
-constinit const PacketHandlers<HSDPAInformation> HSDPAInformation::handlers = {
-    {logCode, minimumSize, &HSDPAInformation::update},
-};
-
-void HSDPAInformation::update(const Packet& packet) {
-  setFields(rows(), packet, configuration);
+void update(Section& section, const Packet& packet) {
+  section.show(packet, configuration);
   const std::size_t primaryCount = packet.u8(primaryCountOffset);
   const std::size_t firstSecondary = firstPrimary + primaryStride * primaryCount;
   const std::size_t secondaryCount = packet.u8(secondaryCountOffset);
-  showProcesses(rows(), "Primary HARQ Process", packet, {firstPrimary, processSize, primaryCount});
-  showProcesses(rows(), "Secondary HARQ Process", packet, {firstSecondary, processSize, secondaryCount});
+  showProcesses(section, "Primary HARQ Process", packet, {firstPrimary, processSize, primaryCount});
+  showProcesses(section, "Secondary HARQ Process", packet, {firstSecondary, processSize, secondaryCount});
 }
+
+constexpr PacketHandler packets[] = {
+    {0x4221, minimumSize, update},
+};
+
+}  // namespace
+
+HSDPAInformation::HSDPAInformation()
+    : SectionDecoder("HSDPA Info", "HSDPA Info", packets, UnknownCodes::Ignored) {}
 
 }  // namespace varnel

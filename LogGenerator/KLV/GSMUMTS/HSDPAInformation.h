@@ -5,15 +5,9 @@
 namespace varnel {
 
 /// High-speed downlink packet access: what each HARQ process received.
-class HSDPAInformation final : public SectionDecoder<HSDPAInformation> {
+class HSDPAInformation final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "HSDPA Info";
-  static constexpr std::string_view traceLine = "HSDPA Info";
-  static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static const PacketHandlers<HSDPAInformation> handlers;
-
- private:
-  void update(const Packet& packet);
+  HSDPAInformation();
 };
 
 }  // namespace varnel

@@ -67,7 +67,6 @@ inline constexpr std::string_view states[] = {
 inline constexpr Field serviceState[] = {
     {state, "MM Service State", entry(states)},
 };
-static_assert(within(serviceState, minimumSize));
 
 }  // namespace registration
 

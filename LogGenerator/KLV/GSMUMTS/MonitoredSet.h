@@ -5,10 +5,11 @@
 namespace varnel {
 
 /// The cells of the network's list that are not in the active set.
-class MonitoredSet final : public EmptyCellSet<MonitoredSet> {
+class MonitoredSet final : public EmptyCellSet {
  public:
   static constexpr std::string_view sectionName = "Monitored Set";
-  static constexpr std::string_view traceLine = "MonitoredSet";
+
+  MonitoredSet() : EmptyCellSet(sectionName, "MonitoredSet") {}
 };
 
 }  // namespace varnel

@@ -9,7 +9,6 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint32_t identityCodesLogCode = 0x51FF;
 constexpr std::size_t identityCodesSize = 15;
 constexpr std::size_t identityCodeCountOffset = 14;
 constexpr std::size_t identityCodeSize = 4;
@@ -22,7 +21,6 @@ constexpr Field cell[] = {
     {u8(2), "RSSI"},
     {u32(3), "C1 Value"},
 };
-static_assert(within(cell, gsmMeasurement::neighborSize));
 
 using Width = CellMonitorColumn::Width;
 constexpr CellMonitorColumn cellMonitorColumns[] = {
@@ -33,11 +31,14 @@ constexpr CellMonitorColumn cellMonitorColumns[] = {
 
 }  // namespace
 
-constinit const PacketHandlers<NeighboringCells> NeighboringCells::handlers = {
-    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, &NeighboringCells::updateMeasurements},
-    {identityCodesLogCode, identityCodesSize, &NeighboringCells::updateIdentityCodes},
-    {cellMonitorLogCode, 0, &NeighboringCells::updateFromCellMonitor},
+constinit const PacketHandler NeighboringCells::packets[] = {
+    {gsmMeasurement::logCode, gsmMeasurement::minimumSize, calling<&NeighboringCells::updateMeasurements>},
+    {0x51FF, identityCodesSize, calling<&NeighboringCells::updateIdentityCodes>},
+    {cellMonitorLogCode, 0, calling<&NeighboringCells::updateFromCellMonitor>},
 };
+
+NeighboringCells::NeighboringCells(CellMonitorReader& cellMonitor)
+    : SectionDecoder("Neighboring Cells", "NeighboringCells", packets), _cellMonitor(cellMonitor) {}
 
 void NeighboringCells::listNumberFormats(SectionFormats& formats) const {
   formats.add(cell);
@@ -46,16 +47,14 @@ void NeighboringCells::listNumberFormats(SectionFormats& formats) const {
 
 void NeighboringCells::updateMeasurements(const Packet& packet) {
   using namespace gsmMeasurement;
-  clearElementsInArray(list());
-  Array cells;
-  for (std::size_t i = 0; i < packet.u8(neighborCountOffset); ++i) {
-    const Packet record = packet.from(firstNeighbor + neighborSize * i);
-    Value row = fieldRow(record, cell);
-    const auto bsic = arfcnToBsic.find(static_cast<std::uint16_t>(rawValue(record, channel)));
-    if (bsic != arfcnToBsic.end()) setInteger(*row.dictionary(), "BSIC", integer(), bsic->second);
-    cells.push_back(std::move(row));
-  }
-  replaceArray_With(list(), std::move(cells));
+  sectionRef.refill([&](Array& cells) {
+    for (std::size_t i = 0; i < packet.u8(neighborCountOffset); ++i) {
+      const Packet neighbor = packet.from(firstNeighbor + neighborSize * i);
+      const Value& record = cells.emplace_back(recordOf(neighbor, cell));
+      const auto bsic = arfcnToBsic.find(static_cast<std::uint16_t>(rawValue(neighbor, channel)));
+      if (bsic != arfcnToBsic.end()) setInteger(*record.dictionary(), "BSIC", integer(), bsic->second);
+    }
+  });
 }
 
 void NeighboringCells::updateIdentityCodes(const Packet& packet) {
@@ -69,10 +68,9 @@ void NeighboringCells::updateIdentityCodes(const Packet& packet) {
 
 void NeighboringCells::updateFromCellMonitor(const Packet& packet) {
   const Array* records = _cellMonitor.read(packet);
-  clearElementsInArray(list());
-  if (!records) return;
-  replaceArray_With(list(),
-                    cellMonitorList(*records, cellMonitor::gsm, cellMonitor::neighbor, cellMonitorColumns));
+  sectionRef.refill([&](Array& cells) {
+    if (records) addCells(cells, *records, cellMonitor::gsm, cellMonitor::neighbor, cellMonitorColumns);
+  });
 }
 
 }  // namespace varnel

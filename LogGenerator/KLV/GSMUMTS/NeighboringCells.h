@@ -9,17 +9,15 @@
 namespace varnel {
 
 /// The GSM neighbour cells, from the modem or from the telephony server: a row each.
-class NeighboringCells final : public SectionDecoder<NeighboringCells> {
+class NeighboringCells final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "Neighboring Cells";
-  static constexpr std::string_view traceLine = "NeighboringCells";
-  static const PacketHandlers<NeighboringCells> handlers;
-
-  explicit NeighboringCells(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
+  explicit NeighboringCells(CellMonitorReader& cellMonitor);
 
   void listNumberFormats(SectionFormats& formats) const override;
 
  private:
+  static const PacketHandler packets[];
+
   void updateMeasurements(const Packet& packet);
   void updateIdentityCodes(const Packet& packet);
   void updateFromCellMonitor(const Packet& packet);

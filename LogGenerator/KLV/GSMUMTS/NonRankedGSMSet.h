@@ -1,14 +1,15 @@
 #pragma once
 
-#include "LogGenerator/SectionWithoutCodes.h"
+#include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
 
 /// The GSM cells that take no part in the ranking.
-class NonRankedGSMSet final : public SectionWithoutCodes<NonRankedGSMSet> {
+class NonRankedGSMSet final : public SectionDecoder {
  public:
   static constexpr std::string_view sectionName = "Non-Ranked GSM Set";
-  static constexpr std::string_view traceLine = "NonRankedGSMSet";
+
+  NonRankedGSMSet() : SectionDecoder(sectionName, "NonRankedGSMSet", {}, UnknownCodes::Ignored) {}
 };
 
 }  // namespace varnel

@@ -1,14 +1,15 @@
 #pragma once
 
-#include "LogGenerator/SectionWithoutCodes.h"
+#include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
 
 /// The UMTS cells that take no part in the ranking.
-class NonRankedUMTSSet final : public SectionWithoutCodes<NonRankedUMTSSet> {
+class NonRankedUMTSSet final : public SectionDecoder {
  public:
   static constexpr std::string_view sectionName = "Non-Ranked UMTS Set";
-  static constexpr std::string_view traceLine = "NonRankedUMTSSet";
+
+  NonRankedUMTSSet() : SectionDecoder(sectionName, "NonRankedUMTSSet", {}, UnknownCodes::Ignored) {}
 };
 
 }  // namespace varnel

@@ -10,19 +10,15 @@ namespace {
 constexpr Field state[] = {
     {mmState::state, "MM State", entry(mmState::states)},
 };
-static_assert(within(state, mmState::minimumSize));
+
+constexpr PacketHandler packets[] = {
+    {mmState::logCode, mmState::minimumSize, state},
+    {registration::logCode, registration::minimumSize, registration::serviceState},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<ProcessCO> ProcessCO::handlers = {
-    {mmState::logCode, mmState::minimumSize, &ProcessCO::updateState},
-    {registration::logCode, registration::minimumSize, &ProcessCO::updateRegistration},
-};
-
-void ProcessCO::updateState(const Packet& packet) { setFields(rows(), packet, state); }
-
-void ProcessCO::updateRegistration(const Packet& packet) {
-  setFields(rows(), packet, registration::serviceState);
-}
+// Kept: the trace line of `ProcessCS`.
+ProcessCO::ProcessCO() : SectionDecoder("Process CO", "ProcessCS", packets) {}
 
 }  // namespace varnel

@@ -5,16 +5,9 @@
 namespace varnel {
 
 /// The state of the mobility management, in short.
-class ProcessCO final : public SectionDecoder<ProcessCO> {
+class ProcessCO final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "Process CO";
-  // Kept: the text of `ProcessCS`.
-  static constexpr std::string_view traceLine = "ProcessCS";
-  static const PacketHandlers<ProcessCO> handlers;
-
- private:
-  void updateState(const Packet& packet);
-  void updateRegistration(const Packet& packet);
+  ProcessCO();
 };
 
 }  // namespace varnel

@@ -27,19 +27,14 @@ constexpr Field state[] = {
     {mmState::subState, "MM Sub State", entry(subStates)},
     {mmState::updateStatus, "LU Reject Cause", entry(updateStatuses)},
 };
-static_assert(within(state, mmState::minimumSize));
+
+constexpr PacketHandler packets[] = {
+    {mmState::logCode, mmState::minimumSize, state},
+    {registration::logCode, registration::minimumSize, registration::serviceState},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<ProcessCS> ProcessCS::handlers = {
-    {mmState::logCode, mmState::minimumSize, &ProcessCS::updateState},
-    {registration::logCode, registration::minimumSize, &ProcessCS::updateRegistration},
-};
-
-void ProcessCS::updateState(const Packet& packet) { setFields(rows(), packet, state); }
-
-void ProcessCS::updateRegistration(const Packet& packet) {
-  setFields(rows(), packet, registration::serviceState);
-}
+ProcessCS::ProcessCS() : SectionDecoder("Process CS", "ProcessCS", packets) {}
 
 }  // namespace varnel

@@ -50,19 +50,14 @@ constexpr Field state[] = {
     {u8(14), "MM Sub State", entry(subStates)},
     {u8(15), "Attach Reject Cause", entry(updateStatuses)},
 };
-static_assert(within(state, minimumSize));
+
+constexpr PacketHandler packets[] = {
+    {logCode, minimumSize, state},
+    {registration::logCode, registration::minimumSize, registration::serviceState},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<ProcessPS> ProcessPS::handlers = {
-    {logCode, minimumSize, &ProcessPS::updateState},
-    {registration::logCode, registration::minimumSize, &ProcessPS::updateRegistration},
-};
-
-void ProcessPS::updateState(const Packet& packet) { setFields(rows(), packet, state); }
-
-void ProcessPS::updateRegistration(const Packet& packet) {
-  setFields(rows(), packet, registration::serviceState);
-}
+ProcessPS::ProcessPS() : SectionDecoder("Process PS", "ProcessPS", packets) {}
 
 }  // namespace varnel

@@ -5,15 +5,9 @@
 namespace varnel {
 
 /// The packet-switched mobility management (GMM).
-class ProcessPS final : public SectionDecoder<ProcessPS> {
+class ProcessPS final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "Process PS";
-  static constexpr std::string_view traceLine = "ProcessPS";
-  static const PacketHandlers<ProcessPS> handlers;
-
- private:
-  void updateState(const Packet& packet);
-  void updateRegistration(const Packet& packet);
+  ProcessPS();
 };
 
 }  // namespace varnel

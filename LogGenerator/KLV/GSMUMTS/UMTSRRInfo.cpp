@@ -10,14 +10,7 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint32_t stateLogCode = 0x4125;
-constexpr std::size_t stateSize = 14;
-constexpr std::uint32_t transmitPowerLogCode = 0x4031;
 constexpr std::size_t transmitPowerSize = 16;
-constexpr std::uint32_t servingCellLogCode = 0x4127;
-constexpr std::size_t servingCellSize = 29;
-constexpr std::uint32_t cipheringLogCode = 0x4157;
-constexpr std::size_t cipheringSize = 19;
 
 // 3GPP TS 25.331, 7.1.
 constexpr std::string_view states[] = {
@@ -26,36 +19,33 @@ constexpr std::string_view states[] = {
 constexpr Field state[] = {
     {u8(13), "RRC State", entry(states)},
 };
-static_assert(within(state, stateSize));
 
 constexpr std::size_t sampleCountOffset = 14;
 constexpr std::size_t firstSample = transmitPowerSize;
 constexpr std::size_t sampleSize = 14;
 constexpr Source samplePower = s16(4);
 
-constexpr Field cellAndChannels[] = {
+constexpr std::size_t servingCellSize = 29;
+constexpr Field servingCell[] = {
     {u32(21), "Cell ID"},
     {u32(17), "Downlink Frequency"},
     {u32(13), "Uplink Frequency"},
-};
-constexpr Field registrationArea[] = {
     {u16(25), "URA ID"},
 };
-static_assert(within(cellAndChannels, servingCellSize) && within(registrationArea, servingCellSize));
+static_assert(extent(servingCell) <= servingCellSize);
 
 constexpr Choice off[] = {{0, "Disabled"}};
 constexpr Field ciphering[] = {
     {u8(13), "Ciphering", choice(off, "Enabled")},
 };
-static_assert(within(ciphering, cipheringSize));
 
-constexpr std::string_view channelRow = "UARFCN";
-constexpr std::string_view transmitPowerRow = "Transmit Power";
+constexpr std::string_view channelEntry = "UARFCN";
+constexpr std::string_view transmitPowerEntry = "Transmit Power";
 constexpr Format transmitPower = real("%4.2f dBm");
 
-constexpr CellMonitorRow cellMonitorRows[] = {
+constexpr CellMonitorEntry cellMonitorEntries[] = {
     {cellMonitor::cellIdentity, "Cell ID", "UMTSRRInfo: Failed to retrieve Cell ID\n"},
-    {cellMonitor::uarfcn, channelRow, "UMTSRRInfo: Failed to retrieve UARFCN\n"},
+    {cellMonitor::uarfcn, channelEntry, "UMTSRRInfo: Failed to retrieve UARFCN\n"},
     {cellMonitor::scramblingCode, "Scrambling Code", "UMTSRRInfo: Failed to retrieve Scrambling Code\n"},
 };
 
@@ -74,41 +64,39 @@ double meanTransmitPower(const Packet& packet) {
   return used > 0 ? sum / used : std::numeric_limits<double>::quiet_NaN();
 }
 
+void showTransmitPower(Section& section, const Packet& packet) {
+  // Kept: " nan dBm" when there is nothing to take the mean of.
+  section.setReal(transmitPowerEntry, transmitPower, meanTransmitPower(packet));
+}
+
+// Kept: a modem packet removes "UARFCN"; only the cell monitor writes it.
+void showServingCell(Section& section, const Packet& packet) {
+  section.remove(channelEntry);
+  section.show(packet, servingCell);
+}
+
 }  // namespace
 
-constinit const PacketHandlers<UMTSRRInfo> UMTSRRInfo::handlers = {
-    {stateLogCode, stateSize, &UMTSRRInfo::updateState},
-    {transmitPowerLogCode, transmitPowerSize, &UMTSRRInfo::updateTransmitPower},
-    {servingCellLogCode, servingCellSize, &UMTSRRInfo::updateServingCell},
-    {cipheringLogCode, cipheringSize, &UMTSRRInfo::updateCiphering},
-    {cellMonitorLogCode, 0, &UMTSRRInfo::updateFromCellMonitor},
+constinit const PacketHandler UMTSRRInfo::packets[] = {
+    {0x4125, 14, state},
+    {0x4031, transmitPowerSize, showTransmitPower},
+    {0x4127, servingCellSize, showServingCell},
+    {0x4157, 19, ciphering},
+    {cellMonitorLogCode, 0, calling<&UMTSRRInfo::updateFromCellMonitor>},
 };
 
+UMTSRRInfo::UMTSRRInfo(CellMonitorReader& cellMonitor)
+    : SectionDecoder("UMTS RR Info", "UMTSRRInfo", packets), _cellMonitor(cellMonitor) {}
+
 void UMTSRRInfo::listNumberFormats(SectionFormats& formats) const {
-  formats.add(transmitPowerRow, transmitPower);
+  formats.add(transmitPowerEntry, transmitPower);
 }
-
-void UMTSRRInfo::updateState(const Packet& packet) { setFields(rows(), packet, state); }
-
-void UMTSRRInfo::updateTransmitPower(const Packet& packet) {
-  // Kept: " nan dBm" when there is nothing to take the mean of.
-  setReal(rows(), transmitPowerRow, transmitPower, meanTransmitPower(packet));
-}
-
-void UMTSRRInfo::updateServingCell(const Packet& packet) {
-  setFields(rows(), packet, cellAndChannels);
-  // The cell monitor alone writes this row; the modem has just said the channels itself.
-  rows().remove(channelRow);
-  setFields(rows(), packet, registrationArea);
-}
-
-void UMTSRRInfo::updateCiphering(const Packet& packet) { setFields(rows(), packet, ciphering); }
 
 void UMTSRRInfo::updateFromCellMonitor(const Packet& packet) {
   const Array* records = _cellMonitor.read(packet);
   if (!records) return;
   const Dictionary* cell = firstCellOfKind(*records, cellMonitor::umts, cellMonitor::serving);
-  if (cell) showCellMonitorRows(rows(), *cell, cellMonitorRows);
+  if (cell) showCell(sectionRef, *cell, cellMonitorEntries);
 }
 
 }  // namespace varnel

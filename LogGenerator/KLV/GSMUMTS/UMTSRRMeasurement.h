@@ -1,14 +1,15 @@
 #pragma once
 
-#include "LogGenerator/SectionWithoutCodes.h"
+#include "LogGenerator/SectionDecoder.h"
 
 namespace varnel {
 
 /// The measurements that the UMTS radio resource control asks for.
-class UMTSRRMeasurement final : public SectionWithoutCodes<UMTSRRMeasurement> {
+class UMTSRRMeasurement final : public SectionDecoder {
  public:
   static constexpr std::string_view sectionName = "UMTS RR Measurement";
-  static constexpr std::string_view traceLine = "UMTSRRMeasurement";
+
+  UMTSRRMeasurement() : SectionDecoder(sectionName, "UMTSRRMeasurement", {}, UnknownCodes::Ignored) {}
 };
 
 }  // namespace varnel

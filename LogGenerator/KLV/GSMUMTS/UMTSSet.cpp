@@ -20,7 +20,6 @@ constexpr Field cell[] = {
     {s16(8), "Ranking Value"},
     {s16(5), "Rank Cell RSCP", integer("%d dB")},
 };
-static_assert(within(cell, recordSize));
 
 using Width = CellMonitorColumn::Width;
 constexpr CellMonitorColumn cellMonitorColumns[] = {
@@ -32,31 +31,33 @@ constexpr CellMonitorColumn cellMonitorColumns[] = {
      integer("%d dB")},
 };
 
-}  // namespace
-
-constinit const PacketHandlers<UMTSSet> UMTSSet::handlers = {
-    {cellRanking::logCode, cellRanking::minimumSize, &UMTSSet::updateFromRanking},
-    {cellMonitorLogCode, 0, &UMTSSet::updateFromCellMonitor},
-};
-
-void UMTSSet::listNumberFormats(SectionFormats& formats) const {
-  formats.add(cell);
-  formats.add(cellMonitorColumns);
+void showRanking(Section& section, const Packet& packet) {
+  using namespace cellRanking;
+  section.refill([&](Array& cells) {
+    addCountedRecords(cells, packet, {firstRecord, recordSize, packet.u8(umtsCountOffset)}, cell);
+  });
 }
 
-void UMTSSet::updateFromRanking(const Packet& packet) {
-  using namespace cellRanking;
-  clearElementsInArray(list());
-  const Records cells = {firstRecord, recordSize, packet.u8(umtsCountOffset)};
-  replaceArray_With(list(), countedRows(packet, cells, cell));
+}  // namespace
+
+constinit const PacketHandler UMTSSet::packets[] = {
+    {cellRanking::logCode, cellRanking::minimumSize, showRanking, cell},
+    {cellMonitorLogCode, 0, calling<&UMTSSet::updateFromCellMonitor>},
+};
+
+UMTSSet::UMTSSet(CellMonitorReader& cellMonitor)
+    : SectionDecoder("UMTS Set", "UMTSSet", packets), _cellMonitor(cellMonitor) {}
+
+void UMTSSet::listNumberFormats(SectionFormats& formats) const {
+  SectionDecoder::listNumberFormats(formats);
+  formats.add(cellMonitorColumns);
 }
 
 void UMTSSet::updateFromCellMonitor(const Packet& packet) {
   const Array* records = _cellMonitor.read(packet);
-  clearElementsInArray(list());
-  if (!records) return;
-  replaceArray_With(list(),
-                    cellMonitorList(*records, cellMonitor::umts, cellMonitor::neighbor, cellMonitorColumns));
+  sectionRef.refill([&](Array& cells) {
+    if (records) addCells(cells, *records, cellMonitor::umts, cellMonitor::neighbor, cellMonitorColumns);
+  });
 }
 
 }  // namespace varnel

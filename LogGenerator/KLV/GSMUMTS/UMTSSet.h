@@ -6,18 +6,15 @@
 namespace varnel {
 
 /// The ranked UMTS cells or, from the telephony server, the neighbours: a row each.
-class UMTSSet final : public SectionDecoder<UMTSSet> {
+class UMTSSet final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "UMTS Set";
-  static constexpr std::string_view traceLine = "UMTSSet";
-  static const PacketHandlers<UMTSSet> handlers;
-
-  explicit UMTSSet(CellMonitorReader& cellMonitor) : _cellMonitor(cellMonitor) {}
+  explicit UMTSSet(CellMonitorReader& cellMonitor);
 
   void listNumberFormats(SectionFormats& formats) const override;
 
  private:
-  void updateFromRanking(const Packet& packet);
+  static const PacketHandler packets[];
+
   void updateFromCellMonitor(const Packet& packet);
 
   CellMonitorReader& _cellMonitor;

@@ -5,10 +5,11 @@
 namespace varnel {
 
 /// The active set on another frequency (3GPP TS 25.331).
-class VirtualActiveSet final : public EmptyCellSet<VirtualActiveSet> {
+class VirtualActiveSet final : public EmptyCellSet {
  public:
   static constexpr std::string_view sectionName = "Virtual Active Set";
-  static constexpr std::string_view traceLine = "VirtualActiveSet";
+
+  VirtualActiveSet() : EmptyCellSet(sectionName, "VirtualActiveSet") {}
 };
 
 }  // namespace varnel

@@ -2,7 +2,6 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/LTE/ConnectedModeMeasurement.h"
-#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -18,19 +17,15 @@ constexpr Field servingCell[] = {
     {u16(23), "Serving Filtered RSRP", rsrp},
     {u16(25), "Serving Filtered RSRQ", rsrq},
 };
-static_assert(within(servingCell, connectedModeMeasurement::minimumSize));
+
+constexpr PacketHandler packets[] = {
+    {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize, servingCell},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<ConnectedModeMeasurementMisc> ConnectedModeMeasurementMisc::handlers = {
-    {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize,
-     &ConnectedModeMeasurementMisc::update},
-};
-
-void ConnectedModeMeasurementMisc::listNumberFormats(SectionFormats& formats) const {
-  formats.add(servingCell);
-}
-
-void ConnectedModeMeasurementMisc::update(const Packet& packet) { setFields(rows(), packet, servingCell); }
+ConnectedModeMeasurementMisc::ConnectedModeMeasurementMisc()
+    : SectionDecoder("Connected mode LTE Intra-frequency Measurement",
+                     "Connected mode LTE Intra-frequency Measurement", packets) {}
 
 }  // namespace varnel

@@ -5,16 +5,9 @@
 namespace varnel {
 
 /// The serving cell of the connected-mode intra-frequency measurement.
-class ConnectedModeMeasurementMisc final : public SectionDecoder<ConnectedModeMeasurementMisc> {
+class ConnectedModeMeasurementMisc final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "Connected mode LTE Intra-frequency Measurement";
-  static constexpr std::string_view traceLine = "Connected mode LTE Intra-frequency Measurement";
-  static const PacketHandlers<ConnectedModeMeasurementMisc> handlers;
-
-  void listNumberFormats(SectionFormats& formats) const override;
-
- private:
-  void update(const Packet& packet);
+  ConnectedModeMeasurementMisc();
 };
 
 }  // namespace varnel

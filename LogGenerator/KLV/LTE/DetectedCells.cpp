@@ -10,19 +10,21 @@ namespace {
 constexpr Field detectedCell[] = {
     {u16(0), "Physical Cell ID"},
 };
-static_assert(within(detectedCell, connectedModeMeasurement::detectedCellSize));
+
+void update(Section& section, const Packet& packet) {
+  using namespace connectedModeMeasurement;
+  section.refill([&](Array& cells) {
+    addRecords(cells, packet, {firstDetectedCell(packet), detectedCellSize, detectedCellCount(packet)},
+               detectedCell);
+  });
+}
+
+constexpr PacketHandler packets[] = {
+    {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize, update},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<DetectedCells> DetectedCells::handlers = {
-    {connectedModeMeasurement::logCode, connectedModeMeasurement::minimumSize, &DetectedCells::update},
-};
-
-void DetectedCells::update(const Packet& packet) {
-  using namespace connectedModeMeasurement;
-  clearElementsInArray(list());
-  const Records records{firstDetectedCell(packet), detectedCellSize, detectedCellCount(packet)};
-  replaceArray_With(list(), recordRows(packet, records, detectedCell));
-}
+DetectedCells::DetectedCells() : SectionDecoder("Detected Cells", "Detected Cells", packets) {}
 
 }  // namespace varnel

@@ -5,14 +5,9 @@
 namespace varnel {
 
 /// The detected cells of the connected-mode intra-frequency measurement, a row each.
-class DetectedCells final : public SectionDecoder<DetectedCells> {
+class DetectedCells final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "Detected Cells";
-  static constexpr std::string_view traceLine = "Detected Cells";
-  static const PacketHandlers<DetectedCells> handlers;
-
- private:
-  void update(const Packet& packet);
+  DetectedCells();
 };
 
 }  // namespace varnel

@@ -2,7 +2,6 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/LTE/NeighborMeasurement.h"
-#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -31,7 +30,6 @@ constexpr Field cell[] = {
     {antennaFrame, "Ant 1 Frame Offset"},
     {antennaSample, "Ant 1 Sample Offset"},
 };
-static_assert(within(cell, recordSize));
 
 // Kept: five of the values are traced under one label.
 void trace(const Packet& record) {
@@ -44,28 +42,28 @@ void trace(const Packet& record) {
   }
 }
 
-}  // namespace
+void update(Section& section, const Packet& packet) {
+  section.refill([&](Array& cells) {
+    // The field holds the number of cells less one.
+    const std::uint32_t count = packet.bits(19, 6, 5) + 1;
+    logWarning("Number of neighboring cells being reported: %d\n", count);
+    for (std::uint32_t i = 0; i < count; ++i) {
+      const std::size_t offset = neighborMeasurement::minimumSize + recordSize * i;
+      if (!packet.holds(offset, extent(cell))) continue;
+      const Packet neighbor = packet.from(offset);
+      cells.push_back(recordOf(neighbor, cell));
+      trace(neighbor);
+    }
+  });
+}
 
-constinit const PacketHandlers<NeighborCellsList> NeighborCellsList::handlers = {
-    {neighborMeasurement::logCode, neighborMeasurement::minimumSize, &NeighborCellsList::update},
+constexpr PacketHandler packets[] = {
+    {neighborMeasurement::logCode, neighborMeasurement::minimumSize, update, cell},
 };
 
-void NeighborCellsList::listNumberFormats(SectionFormats& formats) const { formats.add(cell); }
+}  // namespace
 
-void NeighborCellsList::update(const Packet& packet) {
-  clearElementsInArray(list());
-  // The field holds the number of cells less one.
-  const std::uint32_t count = packet.bits(19, 6, 5) + 1;
-  logWarning("Number of neighboring cells being reported: %d\n", count);
-  Array rows;
-  for (std::uint32_t i = 0; i < count; ++i) {
-    const std::size_t offset = neighborMeasurement::minimumSize + recordSize * i;
-    if (!packet.holds(offset, extent(cell))) continue;
-    const Packet record = packet.from(offset);
-    rows.push_back(fieldRow(record, cell));
-    trace(record);
-  }
-  replaceArray_With(list(), std::move(rows));
-}
+NeighborCellsList::NeighborCellsList()
+    : SectionDecoder("Neighbor Cells List", "Neighbor Cells List", packets) {}
 
 }  // namespace varnel

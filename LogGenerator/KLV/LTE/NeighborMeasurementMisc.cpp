@@ -2,7 +2,6 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/LTE/NeighborMeasurement.h"
-#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
@@ -13,16 +12,14 @@ constexpr Field frequency[] = {
     {u16(17), "E-ARFCN"},
     {bits(19, 0, 6), "Qrxlevmin", integer("%d dBm", 2, -140)},
 };
-static_assert(within(frequency, neighborMeasurement::minimumSize));
+
+constexpr PacketHandler packets[] = {
+    {neighborMeasurement::logCode, neighborMeasurement::minimumSize, frequency},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<NeighborMeasurementMisc> NeighborMeasurementMisc::handlers = {
-    {neighborMeasurement::logCode, neighborMeasurement::minimumSize, &NeighborMeasurementMisc::update},
-};
-
-void NeighborMeasurementMisc::listNumberFormats(SectionFormats& formats) const { formats.add(frequency); }
-
-void NeighborMeasurementMisc::update(const Packet& packet) { setFields(rows(), packet, frequency); }
+NeighborMeasurementMisc::NeighborMeasurementMisc()
+    : SectionDecoder("Neighbor Measurements", "Neighbor Measurements", packets) {}
 
 }  // namespace varnel

@@ -5,16 +5,9 @@
 namespace varnel {
 
 /// What the idle-mode neighbour measurement says of its frequency.
-class NeighborMeasurementMisc final : public SectionDecoder<NeighborMeasurementMisc> {
+class NeighborMeasurementMisc final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "Neighbor Measurements";
-  static constexpr std::string_view traceLine = "Neighbor Measurements";
-  static const PacketHandlers<NeighborMeasurementMisc> handlers;
-
-  void listNumberFormats(SectionFormats& formats) const override;
-
- private:
-  void update(const Packet& packet);
+  NeighborMeasurementMisc();
 };
 
 }  // namespace varnel

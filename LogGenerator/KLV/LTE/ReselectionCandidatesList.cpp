@@ -49,28 +49,29 @@ constexpr Cell cells[] = {
     {cdmaCell, extent(cdmaCell)}, {cdmaCell, extent(cdmaCell)},
 };
 
-}  // namespace
+void update(Section& section, const Packet& packet) {
+  section.refill([&](Array& candidates) {
+    // Kept: only the count's low byte counts.
+    const std::uint8_t count = packet.u8(countOffset);
+    for (std::size_t i = 0; i < count; ++i) {
+      // Kept: records start every 4 bytes and are read further than that, so they overlap.
+      const Packet source = packet.from(reselectionCandidates::minimumSize + recordStride * i);
+      const std::uint16_t type = source.u16(typeOffset);
+      const Cell cell = type < std::size(cells) ? cells[type] : Cell{};
+      if (!source.holds(0, std::max(extent(candidate), cell.size))) continue;
+      const Value& record = candidates.emplace_back(recordOf(source, candidate));
+      setFields(*record.dictionary(), source, cell.fields);
+    }
+  });
+}
 
-constinit const PacketHandlers<ReselectionCandidatesList> ReselectionCandidatesList::handlers = {
-    {reselectionCandidates::logCode, reselectionCandidates::minimumSize, &ReselectionCandidatesList::update},
+constexpr PacketHandler packets[] = {
+    {reselectionCandidates::logCode, reselectionCandidates::minimumSize, update},
 };
 
-void ReselectionCandidatesList::update(const Packet& packet) {
-  clearElementsInArray(list());
-  // Kept: only the count's low byte counts.
-  const std::uint8_t count = packet.u8(countOffset);
-  Array rows;
-  for (std::size_t i = 0; i < count; ++i) {
-    // Kept: records start every 4 bytes and are read further than that, so they overlap.
-    const Packet record = packet.from(reselectionCandidates::minimumSize + recordStride * i);
-    const std::uint16_t type = record.u16(typeOffset);
-    const Cell cell = type < std::size(cells) ? cells[type] : Cell{};
-    if (!record.holds(0, std::max(extent(candidate), cell.size))) continue;
-    Value row = fieldRow(record, candidate);
-    setFields(*row.dictionary(), record, cell.fields);
-    rows.push_back(std::move(row));
-  }
-  replaceArray_With(list(), std::move(rows));
-}
+}  // namespace
+
+ReselectionCandidatesList::ReselectionCandidatesList()
+    : SectionDecoder("Reselection Candidates List", "Reselection Candidates List", packets) {}
 
 }  // namespace varnel

@@ -12,14 +12,14 @@ constexpr Field servingCell[] = {
     {u16(15), "Serving EARFCN"},
     {u16(17), "Serving Cell ID"},
 };
-static_assert(within(servingCell, reselectionCandidates::minimumSize));
+
+constexpr PacketHandler packets[] = {
+    {reselectionCandidates::logCode, reselectionCandidates::minimumSize, servingCell},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<ReselectionCandidatesMisc> ReselectionCandidatesMisc::handlers = {
-    {reselectionCandidates::logCode, reselectionCandidates::minimumSize, &ReselectionCandidatesMisc::update},
-};
-
-void ReselectionCandidatesMisc::update(const Packet& packet) { setFields(rows(), packet, servingCell); }
+ReselectionCandidatesMisc::ReselectionCandidatesMisc()
+    : SectionDecoder("Reselection Candidates", "Reselection Candidates", packets) {}
 
 }  // namespace varnel

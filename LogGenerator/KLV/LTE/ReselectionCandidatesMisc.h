@@ -5,14 +5,9 @@
 namespace varnel {
 
 /// The serving cell of the idle-mode reselection report.
-class ReselectionCandidatesMisc final : public SectionDecoder<ReselectionCandidatesMisc> {
+class ReselectionCandidatesMisc final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "Reselection Candidates";
-  static constexpr std::string_view traceLine = "Reselection Candidates";
-  static const PacketHandlers<ReselectionCandidatesMisc> handlers;
-
- private:
-  void update(const Packet& packet);
+  ReselectionCandidatesMisc();
 };
 
 }  // namespace varnel

@@ -1,14 +1,10 @@
 #include "LogGenerator/KLV/LTE/ServingCellMeasurement.h"
 
 #include "LogGenerator/Field.h"
-#include "LogGenerator/NumberFormats.h"
 
 namespace varnel {
 
 namespace {
-
-constexpr std::uint32_t logCode = 0xB17F;
-constexpr std::size_t minimumSize = 33;
 
 constexpr Choice truth[] = {{0, "False"}};
 
@@ -39,16 +35,14 @@ constexpr Field measurement[] = {
     {bits(32, 1, 1), "Measurement Rules Updated", choice(truth, "True")},
     {bits(32, 2, 4), "Measurement Rules"},
 };
-static_assert(within(measurement, minimumSize));
+
+constexpr PacketHandler packets[] = {
+    {0xB17F, 33, measurement},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<ServingCellMeasurement> ServingCellMeasurement::handlers = {
-    {logCode, minimumSize, &ServingCellMeasurement::update},
-};
-
-void ServingCellMeasurement::listNumberFormats(SectionFormats& formats) const { formats.add(measurement); }
-
-void ServingCellMeasurement::update(const Packet& packet) { setFields(rows(), packet, measurement); }
+ServingCellMeasurement::ServingCellMeasurement()
+    : SectionDecoder("Serving Cell Measurements", "Serving Cell Measurements", packets) {}
 
 }  // namespace varnel

@@ -16,7 +16,7 @@ void PDPContextList::updateWithData_logCode(const Packet& packet, std::uint32_t 
   logWarning("PDPContextList");
   const auto payload = readPropertyList(packet.payload());
   if (!payload || !payload->array()) return;
-  replaceArray_With(list(), std::move(*payload->array()));
+  sectionRef.refill([&](Array& contexts) { contexts = std::move(*payload->array()); });
 }
 
 }  // namespace varnel

@@ -11,7 +11,7 @@ constexpr std::uint32_t simFilesLogCode = 0xFF0000;
 
 struct SimFile {
   std::string_view payloadKey;
-  std::string_view rowName;
+  std::string_view entry;
 };
 
 constexpr SimFile simFiles[] = {
@@ -44,7 +44,7 @@ void SimInfo::updateWithData_logCode(const Packet& packet, std::uint32_t logCode
     logError("SIM File dictionary data could not be constructed");
     throw LogCode_0xFF0000::UnknownDataException();
   }
-  for (const SimFile& file : simFiles) rows().set(file.rowName, files->get(file.payloadKey));
+  for (const SimFile& file : simFiles) sectionRef.set(file.entry, files->get(file.payloadKey));
 }
 
 }  // namespace varnel

@@ -17,7 +17,6 @@ constexpr Field channel[] = {
 };
 constexpr std::size_t firstRatio = 2;
 constexpr std::size_t ratioCount = 6;
-static_assert(within(channel, compositeChannelSize) && firstRatio + ratioCount == compositeChannelSize);
 
 Value ratios(const Packet& record) {
   Array texts;
@@ -25,25 +24,26 @@ Value ratios(const Packet& record) {
   return Value::ofArray(std::move(texts));
 }
 
-}  // namespace
+void update(Section& section, const Packet& packet) {
+  using namespace transportChannels;
+  section.refill([&](Array& channels) {
+    for (std::size_t i = 0; i < compositeChannelCount(packet); ++i) {
+      const std::size_t offset = firstCompositeChannel(packet) + compositeChannelSize * i;
+      if (!packet.holds(offset, compositeChannelSize)) continue;
+      const Packet composite = packet.from(offset);
+      const Value& record = channels.emplace_back(recordOf(composite, channel));
+      record.dictionary()->set("SIR", ratios(composite));
+    }
+  });
+}
 
-constinit const PacketHandlers<CCTRCHSIRMeasurement> CCTRCHSIRMeasurement::handlers = {
-    {transportChannels::logCode, transportChannels::minimumSize, &CCTRCHSIRMeasurement::update},
+constexpr PacketHandler packets[] = {
+    {transportChannels::logCode, transportChannels::minimumSize, update},
 };
 
-void CCTRCHSIRMeasurement::update(const Packet& packet) {
-  using namespace transportChannels;
-  clearElementsInArray(list());
-  Array channels;
-  for (std::size_t i = 0; i < compositeChannelCount(packet); ++i) {
-    const std::size_t offset = firstCompositeChannel(packet) + compositeChannelSize * i;
-    if (!packet.holds(offset, compositeChannelSize)) continue;
-    const Packet record = packet.from(offset);
-    Value row = fieldRow(record, channel);
-    row.dictionary()->set("SIR", ratios(record));
-    channels.push_back(std::move(row));
-  }
-  replaceArray_With(list(), std::move(channels));
-}
+}  // namespace
+
+CCTRCHSIRMeasurement::CCTRCHSIRMeasurement()
+    : SectionDecoder("CCTRCH SIR", "CCTRCH SIR Measurement", packets, UnknownCodes::Ignored) {}
 
 }  // namespace varnel

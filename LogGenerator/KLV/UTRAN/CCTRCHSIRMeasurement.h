@@ -5,15 +5,9 @@
 namespace varnel {
 
 /// The signal-to-interference ratios of the coded composite transport channels, a row each.
-class CCTRCHSIRMeasurement final : public SectionDecoder<CCTRCHSIRMeasurement> {
+class CCTRCHSIRMeasurement final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "CCTRCH SIR";
-  static constexpr std::string_view traceLine = "CCTRCH SIR Measurement";
-  static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static const PacketHandlers<CCTRCHSIRMeasurement> handlers;
-
- private:
-  void update(const Packet& packet);
+  CCTRCHSIRMeasurement();
 };
 
 }  // namespace varnel

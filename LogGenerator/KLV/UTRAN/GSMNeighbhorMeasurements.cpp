@@ -6,7 +6,6 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint32_t logCode = 0xD00E;
 constexpr std::size_t minimumSize = 17;
 constexpr std::size_t countOffset = 16;
 constexpr std::size_t recordSize = 8;
@@ -20,17 +19,20 @@ constexpr Field cell[] = {
     {u16(4), "ARFCN"},
     {s16(6), "RSSI"},
 };
-static_assert(within(cell, recordSize));
+
+void update(Section& section, const Packet& packet) {
+  section.refill([&](Array& cells) {
+    addRecords(cells, packet, {minimumSize, recordSize, packet.u8(countOffset)}, cell);
+  });
+}
+
+constexpr PacketHandler packets[] = {
+    {0xD00E, minimumSize, update},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<GSMNeighbhorMeasurements> GSMNeighbhorMeasurements::handlers = {
-    {logCode, minimumSize, &GSMNeighbhorMeasurements::update},
-};
-
-void GSMNeighbhorMeasurements::update(const Packet& packet) {
-  clearElementsInArray(list());
-  replaceArray_With(list(), recordRows(packet, {minimumSize, recordSize, packet.u8(countOffset)}, cell));
-}
+GSMNeighbhorMeasurements::GSMNeighbhorMeasurements()
+    : SectionDecoder("GSM Neighbor Cell List", "GSM Neighbor Cell List", packets, UnknownCodes::Ignored) {}
 
 }  // namespace varnel

@@ -5,15 +5,9 @@
 namespace varnel {
 
 /// The GSM neighbour cells of a UTRAN modem, a row each.
-class GSMNeighbhorMeasurements final : public SectionDecoder<GSMNeighbhorMeasurements> {
+class GSMNeighbhorMeasurements final : public SectionDecoder {
  public:
-  static constexpr std::string_view sectionName = "GSM Neighbor Cell List";
-  static constexpr std::string_view traceLine = "GSM Neighbor Cell List";
-  static constexpr UnknownCodes unknownCodes = UnknownCodes::Ignored;
-  static const PacketHandlers<GSMNeighbhorMeasurements> handlers;
-
- private:
-  void update(const Packet& packet);
+  GSMNeighbhorMeasurements();
 };
 
 }  // namespace varnel

@@ -6,7 +6,6 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint32_t logCode = 0xD0E0;
 constexpr std::size_t expectedSize = 15;
 constexpr std::size_t versionOffset = 13;
 constexpr std::size_t modeOffset = 14;
@@ -22,23 +21,25 @@ std::uint8_t rrcMode(const Packet& packet) {
   return isKnown ? packet.u8(modeOffset) : unknownMode;
 }
 
-}  // namespace
-
-constinit const PacketHandlers<RRC_State> RRC_State::handlers = {
-    {logCode, 0, &RRC_State::update},
-};
-
-void RRC_State::update(const Packet& packet) {
-  // Kept: a short packet is only warned of, and then decoded as far as it goes.
+void update(Section& section, const Packet& packet) {
+  // Kept: "is length is". A short packet is only warned of, and then decoded as far as it goes.
   if (packet.size() < expectedSize) {
     logWarning("LogCode_0xD0E0 is length is %ld expected size %ld", packet.size(), expectedSize);
   }
   const std::uint8_t mode = rrcMode(packet);
   const std::string_view text = mode < std::size(modes) ? modes[mode] : "Unknown RRC Mode";
-  rows().setText("State", text);
+  section.setText("State", text);
   if (logTakes(logWarningPriority)) {
-    logWarning("Display Dict = %s, rrc mode = %d %s", describe(sectionRef), mode, text);
+    logWarning("Display Dict = %s, rrc mode = %d %s", describe(section.container()), mode, text);
   }
 }
+
+constexpr PacketHandler packets[] = {
+    {0xD0E0, 0, update},
+};
+
+}  // namespace
+
+RRC_State::RRC_State() : SectionDecoder("RRC Info", "RRC Info", packets, UnknownCodes::Ignored) {}
 
 }  // namespace varnel

@@ -11,19 +11,23 @@ constexpr Field channel[] = {
     {u8(0), "TRCH ID"},
     {u8(1), "TRCH BLER Measurement"},
 };
-static_assert(within(channel, transportChannels::transportChannelSize));
+
+void update(Section& section, const Packet& packet) {
+  using namespace transportChannels;
+  section.refill([&](Array& channels) {
+    addRecords(channels, packet, {firstTransportChannel, transportChannelSize, transportChannelCount(packet)},
+               channel);
+  });
+}
+
+constexpr PacketHandler packets[] = {
+    {transportChannels::logCode, transportChannels::minimumSize, update},
+};
 
 }  // namespace
 
-constinit const PacketHandlers<TRCHBLERMeasurement> TRCHBLERMeasurement::handlers = {
-    {transportChannels::logCode, transportChannels::minimumSize, &TRCHBLERMeasurement::update},
-};
-
-void TRCHBLERMeasurement::update(const Packet& packet) {
-  using namespace transportChannels;
-  clearElementsInArray(list());
-  const Records records{firstTransportChannel, transportChannelSize, transportChannelCount(packet)};
-  replaceArray_With(list(), recordRows(packet, records, channel));
-}
+TRCHBLERMeasurement::TRCHBLERMeasurement()
+    : SectionDecoder("TRCH BLER", "TRCH BLER Measurement", packets, UnknownCodes::Ignored,
+                     logNoticePriority) {}
 
 }  // namespace varnel

@@ -8,9 +8,6 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint32_t logCode = 0xD0E2;
-constexpr std::size_t minimumSize = 26;
-
 constexpr Choice access[] = {{0, "All Calls"}};
 
 constexpr Field servingCell[] = {
@@ -21,9 +18,8 @@ constexpr Field servingCell[] = {
     {u8(15), "URA ID"},
     {bits(25, 0, 1), "Allowed Access", choice(access, "Emergency Calls Only")},
 };
-static_assert(within(servingCell, minimumSize));
 
-constexpr CellMonitorRow cellMonitorRows[] = {
+constexpr CellMonitorEntry cellMonitorEntries[] = {
     {cellMonitor::lac, "Local Area Code", "Serving Cell Info: Failed to retrieve LAC\n"},
     {cellMonitor::cellIdentity, "Cell ID", "Serving Cell Info: Failed to retrieve Cell ID\n"},
     {cellMonitor::bandInfo, "Freq Band Indicator",
@@ -33,28 +29,28 @@ constexpr CellMonitorRow cellMonitorRows[] = {
     {cellMonitor::uarfcn, "Uplink UARFCN", "Serving Cell Info: Failed to retrieve UARFCN\n"},
 };
 
-}  // namespace
-
-constinit const PacketHandlers<UTRANServingCellInfo> UTRANServingCellInfo::handlers = {
-    {logCode, minimumSize, &UTRANServingCellInfo::updateFromModem},
-    {cellMonitorLogCode, 0, &UTRANServingCellInfo::updateFromCellMonitor},
-};
-
-void UTRANServingCellInfo::updateFromModem(const Packet& packet) { setFields(rows(), packet, servingCell); }
-
-void UTRANServingCellInfo::updateFromCellMonitor(const Packet& packet) {
+void showCells(Section& section, const Packet& packet) {
   const auto cells = readCellMonitorArray(packet);
   if (!cells) return;
   // Every serving cell is shown in turn, so the last one stays.
   for (const Value& record : *cells->array()) {
     const Dictionary* cell = cellOfKind(record, cellMonitor::utran, cellMonitor::serving);
     if (!cell) continue;
-    showCellMonitorRows(rows(), *cell, cellMonitorRows);
-    // Kept: the one channel number goes into both rows.
-    if (const auto channel = cell->get(cellMonitor::uarfcn).int32()) {
-      rows().setText("Downlink UARFCN", std::to_string(*channel));
-    }
+    showCell(section, *cell, cellMonitorEntries);
+    // Kept: the one channel number goes into both entries.
+    if (const auto channel = cell->get(cellMonitor::uarfcn).int32())
+      section.setText("Downlink UARFCN", std::to_string(*channel));
   }
 }
+
+constexpr PacketHandler packets[] = {
+    {0xD0E2, 26, servingCell},
+    {cellMonitorLogCode, 0, showCells},
+};
+
+}  // namespace
+
+UTRANServingCellInfo::UTRANServingCellInfo()
+    : SectionDecoder("Serving Cell Info", "Serving Cell Info", packets, UnknownCodes::Ignored) {}
 
 }  // namespace varnel

@@ -109,15 +109,16 @@ TEST(CellMonitor, WhatIsNoDictionaryIsNoRecord) {
   EXPECT_EQ(cellOfKind(Value::ofArray({"LTE", "Serving"}), "LTE", "Serving"), nullptr);
 }
 
-// What a record with this number shows in a section whose row held "before".
+// What a record with this number shows in a section whose entry held "before".
 std::string shownNumber(const Value& number) {
-  static constexpr CellMonitorRow rows[] = {{"LAC", "Location Area Code", "Failed to retrieve LAC\n"}};
-  Dictionary section;
-  section.set("Location Area Code", "before");
-  Dictionary record;
-  record.set("LAC", number);
-  showCellMonitorRows(section, record, rows);
-  return *section.get("Location Area Code").string();
+  static constexpr CellMonitorEntry entries[] = {{"LAC", "Location Area Code", "Failed to retrieve LAC\n"}};
+  const Value shown = dictionaryOf({{"Location Area Code", "before"}});
+  Section section;
+  section.bind(shown);
+  Dictionary cell;
+  cell.set("LAC", number);
+  showCell(section, cell, entries);
+  return *shown.dictionary()->get("Location Area Code").string();
 }
 
 TEST(CellMonitor, IntegersAreShownAsDecimals) {
@@ -151,7 +152,7 @@ TEST(CellMonitor, RealsThatAreNotFiniteAreZero) {
   EXPECT_EQ(shownNumber(Value::ofReal(std::numeric_limits<double>::quiet_NaN())), "0");
 }
 
-TEST(CellMonitor, WhatIsNoNumberLeavesTheRowAndIsReported) {
+TEST(CellMonitor, WhatIsNoNumberLeavesTheEntryAndIsReported) {
   const Value values[] = {Value(),          Value::ofBoolean(true), "12",
                           Value::ofArray(), Value::ofDictionary(),  Value::ofData({1})};
   for (const Value& value : values) {
@@ -162,14 +163,16 @@ TEST(CellMonitor, WhatIsNoNumberLeavesTheRowAndIsReported) {
 }
 
 TEST(CellMonitor, EachEntryOfTheTableIsTriedInOrder) {
-  static constexpr CellMonitorRow rows[] = {
+  static constexpr CellMonitorEntry entries[] = {
       {"C", "Third", "no C"}, {"A", "First", "no A"}, {"X", "None", "no X\n"}, {"B", "Second", "no B"}};
   RecordingLog log;
-  Dictionary section;
-  const Value record =
+  const Value shown = Value::ofDictionary();
+  Section section;
+  section.bind(shown);
+  const Value cell =
       dictionaryOf({{"A", Value::ofInteger(1)}, {"B", Value::ofInteger(2)}, {"D", Value::ofInteger(4)}});
-  showCellMonitorRows(section, *record.dictionary(), rows);
-  EXPECT_EQ(described(section), R"({First: "1", Second: "2"})");
+  showCell(section, *cell.dictionary(), entries);
+  EXPECT_EQ(described(shown), R"({First: "1", Second: "2"})");
   EXPECT_THAT(log.takeTexts(), ElementsAre("<3>no C", "<3>no X\n"));
 }
 
