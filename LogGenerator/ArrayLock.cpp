@@ -25,7 +25,7 @@ void ArrayLock::lockArray() {
   try {
     lock.mutex.lock();
   } catch (const std::system_error&) {
-    // The thread has nested its locking more often than the mutex can count, so it holds the lock for good.
+    // The thread has locked more often than the mutex can count, so it keeps the lock forever.
   }
   ++lock.counter;
 }

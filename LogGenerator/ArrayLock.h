@@ -2,11 +2,11 @@
 
 namespace varnel {
 
-/// The one lock around every walk over an array of the display and every emptying or refilling of one.
+/// The lock for every walk over an array of the display, and for every change of such an array.
 ///
-/// Kept: the lock is recursive but is released only when the nesting counter (8 bits, wrapping) is back at 0,
-/// and then once. A thread that nests its locking therefore keeps the lock. Everybody runs on the main
-/// thread, where this blocks nobody.
+/// Kept: the lock is recursive, but it is released only once, when the nesting counter (8 bits, wrapping) is
+/// back at 0. So a thread that locks several times keeps the lock. Everything runs on the main thread, where
+/// this blocks nobody.
 class ArrayLock {
  public:
   static void lockArray();

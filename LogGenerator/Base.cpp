@@ -48,7 +48,7 @@ constexpr EnergyStep energySteps[] = {
     {949, -29},
     {813, -30},
     {756, -31},
-    // Kept: there is no step for −32, and what lies below the table shows 0 like what lies above it.
+    // Kept: there is no step for −32. A value below the table shows 0, like a value above it.
     {705, -31},
 };
 

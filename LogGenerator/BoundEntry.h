@@ -12,14 +12,14 @@
 
 namespace varnel {
 
-/// An entry that packets write over and over. It remembers where its key stood last, so that finding the key
-/// again takes one comparison. It fits every dictionary.
+/// An entry that packets write again and again. It remembers the last position of its key, so that finding
+/// the key again takes one comparison. It works with every dictionary.
 class BoundEntry {
  public:
   explicit BoundEntry(std::string_view key) : _key(key) {}
 
   const std::string& key() const { return _key; }
-  /// When a packet last wrote it; absent when none did. Whoever writes says so.
+  /// When a packet last wrote it; absent when none did. The writer sets it.
   std::optional<Time> writtenAt;
 
   /// The value; the absent value when there is none.

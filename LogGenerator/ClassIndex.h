@@ -16,7 +16,7 @@
 
 namespace varnel {
 
-/// Who wants a log code: a decoder, with its handler if it has one.
+/// A decoder that wants a log code, with its handler if it has one.
 struct Subscriber {
   Base* decoder;
   const PacketHandler* handler;
@@ -27,19 +27,19 @@ struct Subscriber {
   }
 };
 
-/// Log code → the decoders subscribed to it, in the order of their subscription. Codes keep the order in
+/// Log code → the decoders that subscribed to it, in the order of their subscription. Codes keep the order in
 /// which they were first subscribed to.
 class CodeDictionary {
  public:
   struct Subscription {
     std::vector<Subscriber> subscribers;
-    /// The shortest packet, header included, that one of them does not drop unread.
+    /// The length of the shortest packet, header included, that at least one of them takes.
     std::size_t shortestTaken = 0;
   };
 
   /// A decoder that subscribes twice receives each packet twice.
   void subscribe(std::uint32_t code, const Subscriber& subscriber);
-  /// Null for a code that nobody wants.
+  /// Null for a code without subscribers.
   const Subscription* subscription(std::uint32_t code) const;
   std::span<const std::uint32_t> codes() const { return _codes; }
 
@@ -48,7 +48,7 @@ class CodeDictionary {
   std::unordered_map<std::uint32_t, Subscription> _subscriptions;
 };
 
-/// The root of the per-technology indexes, which create every decoder of their technology once.
+/// The base of the class index of each technology, which creates every decoder of its technology once.
 class ClassIndex {
  public:
   explicit ClassIndex(std::ostream& standardOutput) : _standardOutput(standardOutput) {}
@@ -57,18 +57,18 @@ class ClassIndex {
   /// Writes "Deallocing ClassIndex" to standard output.
   virtual ~ClassIndex();
 
-  /// The decoder of that section; null when there is none.
+  /// The decoder of this section; null when there is none.
   Base* getClass(std::string_view sectionName) const;
-  /// Null when nobody wants the code.
+  /// Null for a code without subscribers.
   const CodeDictionary::Subscription* subscription(std::uint32_t code) const {
     return codeDictionary.subscription(code);
   }
   /// The decoders that want the code, in the order of their subscription.
   std::vector<Base*> getSubscribers(std::uint32_t code) const;
-  /// Every subscribed code, and the same as decimal texts.
+  /// Every subscribed code; the same as decimal texts.
   std::span<const std::uint32_t> logCodes() const { return codeDictionary.codes(); }
   std::vector<std::string> getAllLogCodes() const;
-  /// The section that has that container; null when none has.
+  /// The section with this container; null when there is none.
   template <class Container>
   const Section* sectionIn(const Container& container) const {
     for (const auto& [name, decoder] : classDict) {
@@ -76,15 +76,15 @@ class ClassIndex {
     }
     return nullptr;
   }
-  /// Every subscribed code with the sections of its subscribers, each once.
+  /// Every subscribed code with the sections of its subscribers. Each section comes once.
   std::vector<CodeSections> codeSections() const;
-  /// How the sections of all decoders write numbers.
+  /// Adds the formats of all decoders' sections.
   void listNumberFormats(NumberFormats& formats) const;
-  /// A debugging aid: logs what kind of object the class dictionary is.
+  /// For debugging: logs the kind of object of the class dictionary.
   void status() const;
 
  protected:
-  /// Creates a decoder and registers it. What the decoders of an index share is handed to each.
+  /// Creates a decoder and registers it. Each decoder gets what the decoders of an index share.
   template <class Decoder, class... Shared>
   std::unique_ptr<Decoder> create(Shared&... shared) {
     auto decoder = std::make_unique<Decoder>(shared...);

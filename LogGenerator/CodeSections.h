@@ -6,8 +6,7 @@
 
 namespace varnel {
 
-/// The sections of a display that the packets of one log code feed, in the order in which their decoders get
-/// the packet.
+/// The sections that the packets of one log code feed, in the order in which their decoders get the packet.
 struct CodeSections {
   std::uint32_t logCode;
   std::vector<std::string> sections;

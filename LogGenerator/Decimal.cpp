@@ -11,12 +11,13 @@ namespace varnel {
 namespace {
 
 constexpr std::uint64_t powersOf10[] = {1, 10, 100, 1000};
-// Numbers below have a fraction to shift out (up to 2^52 they have), and 13 digits before the point at most.
+// Below this limit, numbers have at most 13 digits before the point, and (up to 2^52) a fraction to shift
+// out.
 constexpr double limit = 9e12;
-// Sign, digits, point and decimals of such a number.
+// Sign, digits, point, and decimals of such a number.
 constexpr std::ptrdiff_t longest = 1 + 13 + 1 + 3;
 
-// |number| × the factor as a whole number, rounded. The number is mantissa × 2^-shift.
+// |number| × factor as a whole number, rounded. The number is mantissa × 2^-shift.
 std::uint64_t scaled(double number, std::uint64_t factor) {
   constexpr int mantissaBits = 52;
   constexpr int bias = 1023;
@@ -24,7 +25,7 @@ std::uint64_t scaled(double number, std::uint64_t factor) {
   const auto bits = std::bit_cast<std::uint64_t>(number);
   const int exponent = static_cast<int>(bits >> mantissaBits & 0x7FF);
   const int shift = bias + mantissaBits - exponent;
-  // The product has at most 63 bits, so here it is less than a half.
+  // The product has at most 63 bits, so it is less than a half here.
   if (shift > 63) return 0;
   const std::uint64_t product = ((bits & (hiddenBit - 1)) | hiddenBit) * factor;
   const std::uint64_t half = std::uint64_t{1} << (shift - 1);

@@ -2,9 +2,9 @@
 
 namespace varnel {
 
-/// Writes a number with so many decimals, rounded as `%.pf` does: the number's exact binary value to the
-/// nearest decimal, a half to the even one. Returns the end of what was written, which has no terminating
-/// zero; the room must do for the number and its decimals.
+/// Writes a number with `precision` decimals and rounds like `%.pf`: from the number's exact binary value to
+/// the nearest decimal, a half to the even one. Returns the end of the text, which has no terminating zero.
+/// There must be enough room for the number and its decimals.
 char* putDecimal(char* out, char* end, double number, int precision);
 
 }  // namespace varnel

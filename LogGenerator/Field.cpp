@@ -34,7 +34,7 @@ char* putRaw(char* out, char* end, const Source& source, const Format& format, s
   return putInteger(out, end, format, raw);
 }
 
-// Pads what stands between the two on its left to the width, as printf does.
+// Pads the text between the two pointers on its left side to the width, like printf.
 char* pad(char* begin, char* end, const Format& format) {
   const auto length = static_cast<std::size_t>(end - begin);
   if (length >= format.width) return end;
@@ -43,7 +43,7 @@ char* pad(char* begin, char* end, const Format& format) {
   return paddedEnd;
 }
 
-// The texts around a number, which put(out, end) writes.
+// The texts before and after a number, which put(out, end) writes.
 template <std::size_t size, class Put>
 std::string_view numberText(std::array<char, size>& room, const Format& format, Put put) {
   char* const begin = std::ranges::copy(format.before, room.begin()).out;

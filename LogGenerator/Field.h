@@ -12,7 +12,7 @@
 
 namespace varnel {
 
-/// Where a field's raw value lies: a little-endian run of bits, read as an unsigned or a signed number.
+/// The place of a field's raw value: a little-endian run of bits, read as an unsigned or a signed number.
 struct Source {
   std::uint16_t byte;
   std::uint8_t firstBit;
@@ -32,14 +32,14 @@ consteval Source u32(std::uint16_t byte) { return bits(byte, 0, 32); }
 consteval Source s8(std::uint16_t byte) { return {byte, 0, 8, true}; }
 consteval Source s16(std::uint16_t byte) { return {byte, 0, 16, true}; }
 
-/// A raw value and the text that it shows.
+/// A raw value and its text.
 struct Choice {
   std::uint32_t raw;
   std::string_view text;
 };
 
-/// How a raw value becomes a display text. Made by `integer`, `hexadecimal`, `real`, `choice` and `entry`,
-/// below.
+/// Turns a raw value into a display text. `integer`, `hexadecimal`, `real`, `choice`, and `entry` below make
+/// formats.
 struct Format {
   enum class Kind : std::uint8_t { Integer, Real, Choice };
 
@@ -51,13 +51,13 @@ struct Format {
   bool hasLeadingZeros = false;                 // the flag 0, of %0wx
   std::uint8_t width = 0, precision = 0;        // of %w.pf
   std::int32_t factor = 1, summand = 0;         // integers: raw × factor + summand
-  double realFactor = 1.0, realSummand = 0.0;   // reals likewise
-  std::span<const Choice> choices{};            // raw values with texts, of each kind
-  std::span<const std::string_view> entries{};  // texts of the first raw values, of each kind
-  std::string_view otherwise{};                 // of the kind Choice: the text of a raw value that is none
-  Choice exception{};  // a raw value with a text of its own; none while the text is empty
+  double realFactor = 1.0, realSummand = 0.0;   // the same for reals
+  std::span<const Choice> choices{};            // raw values with texts, for every kind of format
+  std::span<const std::string_view> entries{};  // texts of the first raw values, for every kind of format
+  std::string_view otherwise{};                 // for the kind Choice: the text of any other raw value
+  Choice exception{};  // one raw value with its own text; unused while the text is empty
 
-  /// The same format, but one raw value shows a text instead.
+  /// The same format, but this raw value shows this text.
   consteval Format unless(std::uint32_t raw, std::string_view text) const {
     Format changed = *this;
     changed.exception = {raw, text};
@@ -67,7 +67,7 @@ struct Format {
 
 namespace format {
 
-// Splits "before%4.2fafter" around its one conversion, which must end in one of the given letters.
+// Splits "before%4.2fafter" around its only conversion, which must end in one of the given letters.
 consteval Format split(std::string_view text, std::string_view conversions) {
   Format result;
   const std::size_t percent = text.find('%');
@@ -92,7 +92,7 @@ consteval Format split(std::string_view text, std::string_view conversions) {
   if (result.hasPlus && (result.isUnsigned || result.isHexadecimal)) throw "the number has no sign";
   result.before = text.substr(0, percent);
   result.after = text.substr(at + 1);
-  const bool isPercentage = result.after.starts_with("%%");  // shown as one
+  const bool isPercentage = result.after.starts_with("%%");  // shown as a percent sign
   if (isPercentage) result.after.remove_prefix(1);
   if (result.after.find('%', isPercentage) != std::string_view::npos) throw "the format has two conversions";
   if (result.before.size() + result.after.size() > 64 || result.width > 32 || result.precision > 16) {
@@ -103,7 +103,7 @@ consteval Format split(std::string_view text, std::string_view conversions) {
 
 }  // namespace format
 
-/// raw × factor + summand by %d (as a signed 32-bit number) or %u.
+/// raw × factor + summand, written by %d (as a signed 32-bit number) or %u.
 consteval Format integer(std::string_view text = "%d", std::int32_t factor = 1, std::int32_t summand = 0) {
   Format result = format::split(text, "du");
   result.factor = factor;
@@ -111,10 +111,10 @@ consteval Format integer(std::string_view text = "%d", std::int32_t factor = 1, 
   return result;
 }
 
-/// raw by %0wx.
+/// The raw value, written by %0wx.
 consteval Format hexadecimal(std::string_view text) { return format::split(text, "x"); }
 
-/// raw × factor + summand by %w.pf.
+/// raw × factor + summand, written by %w.pf.
 consteval Format real(std::string_view text, double factor = 1.0, double summand = 0.0) {
   Format result = format::split(text, "f");
   result.kind = Format::Kind::Real;
@@ -123,7 +123,7 @@ consteval Format real(std::string_view text, double factor = 1.0, double summand
   return result;
 }
 
-/// The text of the choice with that raw value, or else the other one.
+/// The text of the choice with this raw value, or else the other text.
 consteval Format choice(std::span<const Choice> choices, std::string_view otherwise) {
   Format result;
   result.kind = Format::Kind::Choice;
@@ -132,7 +132,7 @@ consteval Format choice(std::span<const Choice> choices, std::string_view otherw
   return result;
 }
 
-/// The entry that the raw value counts from 0, or past the last one the other text.
+/// The entry whose index is the raw value; past the last entry the other text.
 consteval Format entry(std::span<const std::string_view> entries, std::string_view otherwise = "Unknown") {
   Format result;
   result.kind = Format::Kind::Choice;
@@ -141,33 +141,33 @@ consteval Format entry(std::span<const std::string_view> entries, std::string_vi
   return result;
 }
 
-/// The same, but past the last one the number by its format.
+/// The same; past the last entry the number in its format.
 consteval Format entry(std::span<const std::string_view> entries, Format otherwise) {
   otherwise.entries = entries;
   return otherwise;
 }
 
-/// The text of the choice with that raw value, or else the number by its format.
+/// The text of the choice with this raw value, or else the number in its format.
 consteval Format choice(std::span<const Choice> choices, Format otherwise) {
   otherwise.choices = choices;
   return otherwise;
 }
 
-/// One field of a packet's table: where the value lies, the entry that shows it, and how.
+/// One field of a packet's table: the place of the value, the entry that shows it, and its format.
 struct Field {
   Source source;
   std::string_view label;
   Format format = integer();
 };
 
-/// How many bytes the fields read, from offset 0 to the end of the last one.
+/// How many bytes the fields cover, from offset 0 to the end of the last field.
 constexpr std::size_t extent(std::span<const Field> fields) {
   std::size_t end = 0;
   for (const Field& field : fields) end = std::max(end, field.source.end());
   return end;
 }
 
-/// Makes display texts. Each stands in the formatter's own room until the next one is made.
+/// Makes display texts. Each text is in the formatter's own memory and is valid until the next one is made.
 class Formatter {
  public:
   /// The text of a field of a packet.
@@ -175,39 +175,39 @@ class Formatter {
   std::string_view text(const Packet& packet, const Field& field) {
     return text(packet, field.source, field.format);
   }
-  /// The text of a computed number by a format made by `real`, whose factor and summand play no part. What is
-  /// not a number shows no minus.
+  /// The text of a computed number in a format made by `real`, without its factor and summand. A NaN shows no
+  /// minus.
   std::string_view text(const Format& format, double number);
-  /// The text of a computed number by a format made by `integer`.
+  /// The text of a computed number in a format made by `integer`.
   std::string_view text(const Format& format, std::int32_t number);
 
  private:
-  // Room for a double of any size with 16 decimals and the texts around it.
+  // Room for a double of any size with 16 decimals, and the texts around it.
   std::array<char, 448> _room;
 };
 
-/// The raw value of a field: a signed one as a 32-bit two's complement.
+/// The raw value of a field. A signed one is in 32-bit two's complement.
 std::uint32_t rawValue(const Packet& packet, const Source& source);
 
 /// Sets the fields of a record, in the order of the table.
 void setFields(Dictionary& record, const Packet& packet, std::span<const Field> fields);
-/// Sets a number of a record that a decoder has worked out, by an integer format.
+/// Sets a computed number of a record, in an integer format.
 void setInteger(Dictionary& record, std::string_view label, const Format& format, std::int32_t number);
 
-/// A new record that shows the fields.
+/// A new record with the fields.
 Value recordOf(const Packet& packet, std::span<const Field> fields);
 
-/// Where the records of a counted list lie.
+/// The place of the records of a counted list.
 struct Records {
-  std::size_t first;   ///< offset of the first one
-  std::size_t stride;  ///< from one to the next
+  std::size_t first;   ///< offset of the first record
+  std::size_t stride;  ///< from one record to the next
   std::size_t count;
 };
 
-/// Adds the records to a list, in their order. One whose fields do not lie wholly inside the packet is left
-/// out.
+/// Adds the records to a list, in their order. Leaves out a record whose fields do not lie wholly inside the
+/// packet.
 void addRecords(Array& list, const Packet& packet, const Records& records, std::span<const Field> fields);
-/// Adds every counted record. Bytes past the packet's end read as 0.
+/// Adds all counted records. Bytes past the packet's end read as 0.
 void addCountedRecords(Array& list, const Packet& packet, const Records& records,
                        std::span<const Field> fields);
 

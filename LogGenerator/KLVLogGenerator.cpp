@@ -11,7 +11,7 @@ namespace varnel {
 
 namespace {
 
-// Layout of the version report, after the 12 bytes of record header: length, log code, timestamp.
+// The layout of the version report after the record header of 12 bytes: length, log code, timestamp.
 constexpr std::size_t logCodeOffset = 2;
 constexpr std::size_t firstWordOffset = 12;
 constexpr std::size_t secondWordOffset = 14;
@@ -27,7 +27,7 @@ constexpr std::size_t daylightOffset = 87;
 
 constexpr std::uint16_t versionReportLogCode = 0x1FFD;
 constexpr std::uint16_t reportWord = 1;
-// Kept: the name stands in the file as it is here.
+// Kept: the file holds this word, not a name.
 constexpr std::string_view executableName = "EXECUTABLE_NAME";
 
 template <class Number>
@@ -35,7 +35,7 @@ void put(std::uint8_t* at, Number number) {
   std::memcpy(at, &number, sizeof number);
 }
 
-// The field's last byte stays the terminating zero.
+// The last byte of the field stays zero.
 void putText(std::uint8_t* at, std::size_t fieldSize, std::string_view text) {
   std::copy_n(text.begin(), std::min(text.size(), fieldSize - 1), at);
 }
@@ -91,7 +91,7 @@ std::optional<Bytes> KLVLogGenerator::generateDlfFromState(const Dictionary& sta
       return std::nullopt;
     }
     if (bytes->size() < 2) continue;
-    // Kept: each interval loses its first byte, the log type of its first packet, and no other.
+    // Kept: each interval loses its first byte, the log type of its first packet. Later packets keep theirs.
     dlf.insert(dlf.end(), bytes->begin() + 1, bytes->end());
   }
   return dlf;
@@ -124,7 +124,7 @@ void KLVLogGenerator::storeBinDataInState(Dictionary& state) {
                mostRawBytes);
   }
   Bytes next;
-  next.reserve(_binData.size());  // the next display brings about as much
+  next.reserve(_binData.size());  // the next interval is probably about as large
   state.set(stateKey::displayState, Value::ofData(std::exchange(_binData, std::move(next))));
 }
 

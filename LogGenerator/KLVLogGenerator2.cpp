@@ -7,7 +7,7 @@ namespace varnel {
 
 namespace {
 
-// The generator's line goes out before those of the classes that it is built on.
+// This line must come before the log lines of the base classes.
 const Services& announceCreation(const Services& services, const ClassIndex* classIndex) {
   logError("Creating KLVLogGenerator2 object with %p", static_cast<const void*>(classIndex));
   return services;
@@ -24,7 +24,7 @@ KLVLogGenerator2::KLVLogGenerator2(const Services& services, std::string listNam
 }
 
 KLVLogGenerator2::~KLVLogGenerator2() {
-  // Kept: every template-driven generator says this, whatever its own name.
+  // Kept: every generator with a template writes this line, under any name.
   logWarning("KLV_GSMLogGenerator is destructed %p", static_cast<const void*>(this));
 }
 
@@ -69,7 +69,7 @@ std::optional<std::string> KLVLogGenerator2::missingTemplate() const {
   return pListName + ".plist";
 }
 
-// A display that stands in the state already is another's, and so are its sections.
+// If the state already has a display, it belongs to another generator, and so do its sections.
 bool KLVLogGenerator2::changesDisplayOf(const Dictionary& state) const {
   return _hasBuiltDisplay || state.get(stateKey::display).isAbsent();
 }

@@ -8,9 +8,9 @@
 
 namespace varnel {
 
-/// The template-driven generator. Its display is a copy of a template resource; each section of the copy
-/// belongs to the decoder that the class index has for the section's name, and each packet goes to the
-/// decoders that subscribed to its log code. Packets are those of `LogMessage`, of either log type.
+/// The generator with a template. Its display is a copy of a template resource. The class index has a decoder
+/// for each section of the copy, by the section's name. Each packet goes to the decoders that have subscribed
+/// to its log code. Packets are those of `LogMessage`, with either log type.
 class KLVLogGenerator2 : public KLVLogGenerator {
  public:
   void updateState_withData(Dictionary& state, ByteView data) override;
@@ -25,16 +25,16 @@ class KLVLogGenerator2 : public KLVLogGenerator {
   std::optional<Time> refilledAt(const Array& list) const override;
 
  protected:
-  /// Takes ownership of both. A generator without a template resource has neither: it decodes nothing.
+  /// Takes ownership of both. A generator without a template resource has neither, and decodes nothing.
   KLVLogGenerator2(const Services& services, std::string pListName, std::shared_ptr<ClassIndex> classIndex);
   ~KLVLogGenerator2() override;
 
  private:
-  /// Framing and dispatch of one message.
+  /// Frames one message and passes it to its decoders.
   void updateWithData(ByteView data);
   /// The display in the state. Kept: the call that builds it returns nothing; only later calls return it.
   Value getDisplayFromState(Dictionary& state);
-  /// A live copy of a template, its sections handed to their decoders.
+  /// A copy of a template whose sections belong to their decoders.
   Value processTemplate(const Value& object);
   /// Looks through a display and reports what is neither string nor container.
   static void printDict(const Value& object);

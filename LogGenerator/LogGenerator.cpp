@@ -8,7 +8,7 @@ namespace {
 
 constexpr std::size_t largestHistory = 5;
 
-// Kept: the record ends at the first value that the state lacks, so it may well be empty.
+// Kept: the record ends at the first value that the state lacks, so it can be empty.
 Value snapshotRecord(const Dictionary& state, const std::string& date) {
   Value record = Value::ofDictionary();
   for (const auto key : {stateKey::displayState, stateKey::display, stateKey::extraInfo}) {

@@ -18,7 +18,7 @@
 
 namespace varnel {
 
-/// Keys of the state dictionary, which belongs to the model and outlives the generators that fill it.
+/// Keys of the state dictionary. The model owns it, and it outlives the generators that fill it.
 namespace stateKey {
 inline constexpr std::string_view displayTemplate = "Template";
 inline constexpr std::string_view lookup = "Lookup";
@@ -36,46 +36,46 @@ class LogGenerator : public WriteTimes {
   LogGenerator(const LogGenerator&) = delete;
   LogGenerator& operator=(const LogGenerator&) = delete;
 
-  /// A new generator for the technology that the telephony service names; null for a technology that has
-  /// none.
+  /// A new generator for the technology that the telephony service names; null when there is no generator for
+  /// it.
   static std::unique_ptr<LogGenerator> generatorFromTechnology(const Value& technology,
                                                                const Services& services);
-  /// The names of the technologies that have a generator.
+  /// The technologies that have a generator.
   static std::vector<std::string_view> technologies();
 
-  /// Folds one incoming message into the state.
+  /// Takes one message and updates the state.
   virtual void updateState_withData(Dictionary& state, ByteView data) = 0;
-  /// The display dictionary, or the absent value when there is none yet; records a snapshot in the history.
+  /// The display dictionary; absent when there is none yet. Adds a snapshot record to the history.
   virtual Value generateLogUsingState(Dictionary& state) = 0;
   /// The command that starts the stream.
   virtual Value getStartCommand() const = 0;
   /// The items to save: an array of dictionaries, each with a "Description".
   virtual Value getSaveContentsFromState(const Dictionary& state) const = 0;
-  /// What becomes of a message, which is not decoded for that; for those who count messages. Without packets,
-  /// as here, all are decoded and none has a log code.
+  /// What becomes of a message. It does not decode the message; it is for counting. A generator without
+  /// packets, like this base class, decodes all messages and has no log codes.
   virtual MessageFate fateOf(ByteView /*message*/) const { return {MessageFate::Outcome::Decoded}; }
-  /// How the display writes its numbers; for those who want them without their units. Without packets, as
-  /// here, nothing is known of units.
+  /// The formats of the display's numbers, for callers that want numbers without units. A generator without
+  /// packets, like this base class, has none.
   virtual NumberFormats numberFormats() const { return {}; }
-  /// What the packets of each log code feed, in the order of the start command; for those who name packets.
-  /// Without packets, as here, nothing.
+  /// The sections that the packets of each log code feed, in the order of the start command. A generator
+  /// without packets, like this base class, has none.
   virtual std::vector<CodeSections> codeSections() const { return {}; }
-  /// How many messages the binary log lacks because their interval had brought too much already. They were
-  /// decoded like all others. Always 0 without a binary log, as here.
+  /// How many messages the binary log lacks because their interval was full. They were decoded like all
+  /// others. Always 0 without a binary log, as in this base class.
   virtual std::uint64_t messagesLeftOutOfLog() const { return 0; }
-  /// Collects no raw bytes from now on, for those who save nothing: the records of the history hold empty
-  /// data in their place. Nothing happens without a binary log, as here.
+  /// Keeps no raw bytes from now on, for callers that save nothing. The records of the history then hold
+  /// empty data. Does nothing without a binary log, as in this base class.
   virtual void keepNoRawBytes() {}
-  /// How many of the messages folded in were of another fate than to be decoded.
+  /// How many messages were not decoded.
   std::uint64_t messagesNotDecoded() const { return _messagesNotDecoded; }
 
-  /// The resource file without which there is no display, when it could not be loaded; absent otherwise.
+  /// The template file, when it could not be loaded and so there is no display; absent otherwise.
   virtual std::optional<std::string> missingTemplate() const { return std::nullopt; }
-  /// False when the state's display was made by an earlier generator and no message changes it any more.
+  /// False when an earlier generator made the state's display, so that no message changes it any more.
   virtual bool changesDisplayOf(const Dictionary& /*state*/) const { return true; }
 
  protected:
-  /// Appends a snapshot record to the state's "History", which keeps the newest five.
+  /// Appends a snapshot record to the state's "History", which keeps the last five.
   void updateHistoryInState(Dictionary& state) const;
   const Services& services() const { return _services; }
   void countMessageNotDecoded() { ++_messagesNotDecoded; }

@@ -8,20 +8,21 @@
 
 namespace varnel {
 
-/// One message of the log channel of a modem that sends packets. A packet is: log type (1 byte), record
-/// length (2), log code (2), timestamp (8), payload. A leading 0x81 and the byte behind it are no part of it.
+/// One message of the log channel from a modem that sends packets. A packet is log type (1 byte), record
+/// length (2), log code (2), timestamp (8), and payload. A leading 0x81 and the byte after it do not belong
+/// to the packet.
 class LogMessage {
  public:
   static constexpr std::uint8_t prefixMark = 0x81;
   static constexpr std::size_t prefixSize = 2;
-  /// The log types of the modem's packets and of those that the telephony server makes itself.
+  /// The log types: packets of the modem, and packets that the telephony server makes itself.
   static constexpr std::uint8_t modemLogType = 1, extraLogType = 0xFF;
   static constexpr std::size_t logCodeOffset = 3;
-  /// Added to the codes of what the telephony server makes.
+  /// Added to the log codes of the telephony server's own packets.
   static constexpr std::uint32_t extraCodeBase = 0xFF0000;
 
-  /// Nothing for a message that is shorter than a header. Kept: the prefix counts there, so a packet behind
-  /// one may lack two bytes of its header.
+  /// Nothing for a message that is shorter than a header. Kept: this length includes the prefix, so a packet
+  /// after a prefix can lack two bytes of its header.
   static std::optional<LogMessage> framed(ByteView message) {
     if (message.size() < Packet::headerSize) return std::nullopt;
     return LogMessage(message[0] == prefixMark ? message.subspan(prefixSize) : message);
@@ -30,7 +31,7 @@ class LogMessage {
   const Packet& packet() const { return _packet; }
   std::uint8_t logType() const { return _logType; }
   bool isOfKnownType() const { return _logType == modemLogType || _logType == extraLogType; }
-  /// 32 bits: the packet's 16, and `extraCodeBase` where the telephony server made it.
+  /// 32 bits: the 16 bits in the packet. For a packet of the telephony server, `extraCodeBase` is added.
   std::uint32_t logCode() const { return _logCode; }
 
  private:

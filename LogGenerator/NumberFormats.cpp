@@ -7,7 +7,8 @@ namespace varnel {
 
 namespace {
 
-// An unsigned 32-bit number has no more; longer rows of digits are identities, as those of SIM cards.
+// An unsigned 32-bit number has no more digits. A longer text of digits is an identity, such as a SIM card's
+// number.
 constexpr std::size_t mostDigits = 10;
 
 std::size_t leadingDigits(std::string_view text) {
@@ -15,8 +16,8 @@ std::size_t leadingDigits(std::string_view text) {
   return static_cast<std::size_t>(std::ranges::find_if_not(text, isDigit) - text.begin());
 }
 
-// Whether the text is a decimal number that every reader of numbers takes: digits without a leading 0, and
-// perhaps a fraction.
+// Whether the text is a decimal number that every program can read: digits without a leading 0, and maybe a
+// fraction.
 bool isPlainNumber(std::string_view text) {
   if (text.starts_with('-')) text.remove_prefix(1);
   const std::size_t whole = leadingDigits(text);
@@ -28,13 +29,13 @@ bool isPlainNumber(std::string_view text) {
   return !text.empty() && leadingDigits(text) == text.size();
 }
 
-// The number in a text that has these texts around it; empty when it is not of that form.
+// The number between these two texts; empty when the text has another form.
 std::string_view numberBetween(std::string_view before, std::string_view after, std::string_view text) {
   if (!text.starts_with(before)) return {};
   text.remove_prefix(before.size());
   if (!text.ends_with(after)) return {};
   text.remove_suffix(after.size());
-  text.remove_prefix(std::min(text.find_first_not_of(' '), text.size()));  // of a format with a width
+  text.remove_prefix(std::min(text.find_first_not_of(' '), text.size()));  // blanks of a width
   if (text.starts_with('+')) text.remove_prefix(1);
   return isPlainNumber(text) ? text : std::string_view();
 }
@@ -47,7 +48,7 @@ std::optional<std::string_view> behindName(std::string_view path, std::string_vi
   return std::nullopt;
 }
 
-// The path from its next name on; empty when there is none.
+// The path from its next name; empty when there is none.
 std::string_view fromNextName(std::string_view path) {
   const std::size_t slash = path.find('/');
   return slash == std::string_view::npos ? std::string_view() : path.substr(slash + 1);
@@ -57,7 +58,7 @@ std::string_view fromNextName(std::string_view path) {
 
 std::string_view EntryFormats::Surroundings::unit() const {
   std::string_view text = after.substr(std::min(after.find_first_not_of(' '), after.size()));
-  return text.substr(0, text.find(" ("));  // a remark stands behind the unit
+  return text.substr(0, text.find(" ("));  // a remark follows the unit
 }
 
 std::string_view EntryFormats::unit() const {

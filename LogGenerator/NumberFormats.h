@@ -12,11 +12,10 @@
 
 namespace varnel {
 
-/// How one entry of a display writes its numbers. It is a view of the formats that it comes from, and knows
-/// none where those do not.
+/// The formats of one entry of a display. It is a view of the `NumberFormats` from which it comes.
 class EntryFormats {
  public:
-  /// Texts around a number; formats live as long as the program.
+  /// Texts before and after a number. The formats live as long as the program.
   struct Surroundings {
     std::string_view before, after;
     std::string_view unit() const;
@@ -26,38 +25,38 @@ class EntryFormats {
   explicit EntryFormats(const std::vector<Surroundings>& formats) : _formats(&formats) {}
   bool areKnown() const { return _formats != nullptr; }
 
-  /// The unit of the values, as "dBm". Empty when their formats name none, or different ones.
+  /// The unit of the values, such as "dBm". Empty when their formats name no unit, or different ones.
   std::string_view unit() const;
 
-  /// The number that a value shows: decimal, without a leading plus. Empty when the value is no number:
-  /// another text, one that is not finite, or a row of digits that is longer than a 32-bit number.
+  /// The number in a value, in decimal and without a leading plus. Empty when the value is no number: another
+  /// text, a number that is not finite, or more digits than a 32-bit number has.
   std::string_view number(std::string_view value) const;
 
  private:
   const std::vector<Surroundings>* _formats = nullptr;
 };
 
-/// Where the entry stands that a path leads to.
+/// The entry to which a path leads.
 struct EntryPlace {
   EntryFormats formats;
-  /// How many names of the path lead to the entry; what follows them stands in it, as a pilot in a list of
-  /// pilots. 0 when there are no formats.
+  /// How many names of the path lead to the entry. The names after them are inside it, like a pilot in a list
+  /// of pilots. 0 when there are no formats.
   std::size_t depth = 0;
 };
 
-/// How the entries of a display write their numbers, as their decoders say. What is shown of a value, its
-/// number and its unit, is told apart by this alone and not by what a value looks like.
+/// The formats of a display's entries, from their decoders. Only the formats decide what is a number and what
+/// is a unit, not the look of a value.
 class NumberFormats {
  public:
-  /// Adds a format of an entry of that section. An entry may have several. Formats that mostly show texts of
-  /// a table are passed over.
+  /// Adds a format of an entry in this section. An entry may have several formats. Ignores formats that
+  /// mostly show texts of a table.
   void add(std::string_view section, std::string_view entry, const Format& format);
-  /// Adds all formats of others.
+  /// Adds all formats of another object.
   void add(const NumberFormats& others);
 
-  /// The formats of what stands under a path. Valid while these are not added to.
+  /// The formats of the entry at a path. Valid until formats are added to this object.
   EntryPlace at(std::span<const std::string> path) const;
-  /// The same of a path as users write it, names and slashes, which may select records of lists in brackets.
+  /// The same for a path as users write it: names with slashes, and selections of records in brackets.
   EntryFormats under(std::string_view path) const;
 
   std::string_view unit(std::span<const std::string> path) const { return at(path).formats.unit(); }
@@ -73,13 +72,13 @@ class NumberFormats {
   std::map<std::string, Section, std::less<>> _sections;
 };
 
-/// The formats of one section, for its decoder to add to.
+/// The formats of one section. Its decoder adds to them.
 class SectionFormats {
  public:
   SectionFormats(NumberFormats& formats, std::string_view section) : _formats(formats), _section(section) {}
 
   void add(std::string_view entry, const Format& format) { _formats.add(_section, entry, format); }
-  /// Adds each row of a table, of fields or of cell-monitor columns.
+  /// Adds each field of a table, or each cell-monitor column.
   template <class Row>
   void add(std::span<const Row> table) {
     for (const Row& row : table) add(row.label, row.format);

@@ -13,8 +13,8 @@ namespace varnel {
 static_assert(std::endian::native == std::endian::little,
               "packets are little-endian and are loaded as they are");
 
-/// A view of one log packet, or of one record within it. Bytes past its end read as 0, so no read is ever out
-/// of bounds; whoever must know asks `holds` first. Offsets count from the first byte, header included.
+/// A view of one log packet, or of one record in it. Bytes past its end read as 0, so no read is out of
+/// bounds. A caller that has to know calls `holds` first. Offsets count from the first byte, header included.
 class Packet {
  public:
   /// Log type 1, record length 2, log code 2, timestamp 8.
@@ -23,7 +23,7 @@ class Packet {
   explicit Packet(ByteView bytes) : _bytes(bytes) {}
 
   std::size_t size() const { return _bytes.size(); }
-  /// True when that many bytes from the offset on lie inside the packet.
+  /// True when this many bytes from the offset lie inside the packet.
   bool holds(std::size_t offset, std::size_t length) const {
     return offset <= size() && size() - offset >= length;
   }
@@ -31,7 +31,7 @@ class Packet {
   std::uint8_t u8(std::size_t offset) const { return offset < size() ? _bytes[offset] : 0; }
   std::uint16_t u16(std::size_t offset) const { return load<std::uint16_t>(offset); }
   std::uint32_t u32(std::size_t offset) const { return load<std::uint32_t>(offset); }
-  /// So many numbers of 32 bits, one after another.
+  /// This many 32-bit numbers, one after the other.
   template <std::size_t count>
   std::array<std::uint32_t, count> numbers(std::size_t offset) const {
     return load<std::array<std::uint32_t, count>>(offset);
@@ -43,13 +43,13 @@ class Packet {
   }
 
   ByteView bytes() const { return _bytes; }
-  /// The bytes from the offset on, as a view whose offsets count from there; empty past the end.
+  /// The bytes from the offset on, as a view whose offsets count from there. Empty past the end.
   Packet from(std::size_t offset) const { return Packet(_bytes.subspan(offset < size() ? offset : size())); }
-  /// What follows the header; empty for a packet that is shorter than one.
+  /// The bytes after the header; empty for a packet that is shorter than a header.
   ByteView payload() const { return from(headerSize)._bytes; }
 
  private:
-  // Little-endian, as the machine is.
+  // Little-endian, like the machine.
   template <class Number>
   Number load(std::size_t offset) const {
     Number value{};

@@ -16,18 +16,18 @@
 
 namespace varnel {
 
-/// What a decoder writes to: its section of the display, a dictionary of entries or, for a list section, an
-/// array of records. Until a display is built around the decoder, or when the template has a container of the
-/// other kind, whatever is written is seen nowhere.
+/// What a decoder writes to: its section of the display. This is a dictionary of entries, or for a list
+/// section an array of records. Nobody sees what is written until a display is built with the decoder, or if
+/// the template has a container of the other kind.
 class Section {
  public:
-  /// Takes the container that is written to from now on.
+  /// Sets the container to write to from now on.
   void bind(const Value& container);
   const Value& container() const { return _container; }
   bool holds(const Dictionary& container) const { return _container.dictionary() == &container; }
   bool holds(const Array& container) const { return _container.array() == &container; }
 
-  /// The time of the packets that are decoded from now on.
+  /// Sets the time of the packets that are decoded from now on.
   void setTime(const Time& now) { _now = now; }
   /// When a packet last wrote the entry; absent when none did.
   std::optional<Time> writtenAt(std::string_view entry) const;
@@ -37,14 +37,14 @@ class Section {
   /// Shows the fields, in the order of the table. The table must outlive the section.
   void show(const Packet& packet, std::span<const Field> fields);
   void setText(std::string_view entry, std::string_view text);
-  /// Shows a number that a decoder has worked out, by an integer format or by a real one.
+  /// Shows a computed number, in an integer format or in a real one.
   void setInteger(std::string_view entry, const Format& format, std::int32_t number);
   void setReal(std::string_view entry, const Format& format, double number);
   /// Setting the absent value changes nothing.
   void set(std::string_view entry, Value value);
   void remove(std::string_view entry);
 
-  /// Empties the list and has `build(Array&)` fill it, all under the array lock.
+  /// Empties the list and calls `build(Array&)` to fill it, both under the array lock.
   template <class Build>
   void refill(Build build) {
     Array unseen;
@@ -56,7 +56,7 @@ class Section {
   }
 
  private:
-  // A field table, and the entry of each of its fields.
+  // A field table, and the entry for each of its fields.
   struct Table {
     const Field* fields;
     std::vector<std::size_t> entries;

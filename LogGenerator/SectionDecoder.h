@@ -14,10 +14,10 @@ inline void logUnknownCode(std::uint32_t logCode) {
   logError("Received an unknown log message: %d", logCode);
 }
 
-/// The common steps of a decoder: its trace line, the log code, the length, what the handler shows.
+/// The common steps of a decoder: trace line, log code, length, and showing what the handler says.
 class SectionDecoder : public Base {
  public:
-  /// What becomes of a log code that a decoder does not list.
+  /// What a decoder does with a log code that it does not have.
   enum class UnknownCodes { Logged, Ignored };
 
   std::string_view getSectionName() const final { return _sectionName; }
@@ -25,12 +25,12 @@ class SectionDecoder : public Base {
   std::span<const PacketHandler> handlers() const final { return _handlers; }
   void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) final;
   void decode(const Packet& packet, const PacketHandler& handler) final;
-  /// Tells the formats of all tables of the handlers.
+  /// Adds the formats of all tables of the handlers.
   void listNumberFormats(SectionFormats& formats) const override;
 
  protected:
-  /// The handlers, all log codes of the decoder in the order in which it subscribes to them, live as long as
-  /// the program.
+  /// The handlers are all log codes of the decoder, in the order in which it subscribes to them. They must
+  /// live as long as the program.
   SectionDecoder(std::string_view sectionName, std::string_view traceLine,
                  std::span<const PacketHandler> handlers, UnknownCodes unknownCodes = UnknownCodes::Logged,
                  int tracePriority = logWarningPriority)
@@ -40,7 +40,7 @@ class SectionDecoder : public Base {
         _unknownCodes(unknownCodes),
         _tracePriority(tracePriority) {}
 
-  /// The handler's way to a member function.
+  /// Lets a handler call a member function.
   template <auto method>
   static void calling(SectionDecoder& decoder, const Packet& packet) {
     call(decoder, method, packet);

@@ -8,12 +8,12 @@
 
 namespace varnel {
 
-/// What a generator may ask of its host. Everything outlives the generator.
+/// What a generator needs from its host. Every object in it must outlive the generator.
 struct Services {
   const Resources& resources;
   const Clock& clock;
   const ApplicationInfo& application;
-  std::ostream& standardOutput;  ///< for the few lines that belong there
+  std::ostream& standardOutput;  ///< for the few lines that generators write there
 };
 
 }  // namespace varnel

@@ -5,11 +5,12 @@
 
 namespace varnel {
 
-/// The key that marks a dictionary whose rows are shown in the order of their keys; it is no row itself.
+/// The key that marks a dictionary whose entries are shown in the order of their keys. It is not shown
+/// itself.
 inline constexpr std::string_view sortMark = "_sorted";
 
-/// What is shown of a key of a sorted dictionary: of "order;name" the name. A key with no ";" or with several
-/// is shown whole.
+/// The displayed part of a key in a sorted dictionary: of "order;name" the name. A key without ";" or with
+/// several is shown whole.
 constexpr std::string_view displayNameOfSortedKey(std::string_view key) {
   const std::size_t semicolon = key.find(';');
   const bool hasTwoParts = semicolon != std::string_view::npos && semicolon == key.rfind(';');

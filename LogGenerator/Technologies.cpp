@@ -6,7 +6,7 @@
 #include "LogGenerator/LogGenerator.h"
 #include "platform/TelephonyService.h"
 
-// The generators of all technologies, known here and nowhere else.
+// Only this file knows the generators of all technologies.
 namespace varnel {
 
 namespace {

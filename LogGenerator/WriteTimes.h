@@ -9,8 +9,8 @@
 
 namespace varnel {
 
-/// When packets last wrote what a display shows, by the clock of whoever decodes. The answers are absent for
-/// what no packet has written, and for what nobody keeps a time of: that is as old as what it stands in.
+/// When packets last wrote what a display shows, by the decoder's clock. Absent for what no packet has
+/// written, and for what has no time of its own: that has the time of the container around it.
 class WriteTimes {
  public:
   virtual ~WriteTimes() = default;

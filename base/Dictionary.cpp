@@ -28,7 +28,7 @@ void Dictionary::setText(std::string_view key, std::string_view text) {
   }
 }
 
-// The key may be a view of what stands in the dictionary, which moves when it grows.
+// The key may be a view of a text in the dictionary, which moves when the dictionary grows.
 void Dictionary::add(std::string_view key, Value value) {
   _entries.emplace_back(key, std::move(value));
   if (!_positions.empty()) {

@@ -12,8 +12,8 @@
 
 namespace varnel {
 
-/// String keys in the order in which they were first set. Setting a key again keeps its place; a key that was
-/// removed and is set again goes to the end. No key ever holds the absent value.
+/// Values by string keys, in the order in which the keys were first set. Setting a key again keeps its place.
+/// A key that was removed and is set again goes to the end. No key has the absent value.
 class Dictionary {
  public:
   struct Entry {
@@ -24,7 +24,7 @@ class Dictionary {
     Value value;
   };
 
-  /// The position of a key that is not there.
+  /// The position of a missing key.
   static constexpr std::size_t nowhere = static_cast<std::size_t>(-1);
 
   /// The key's value; the absent value when there is no such key.
@@ -33,20 +33,20 @@ class Dictionary {
 
   /// Setting the absent value changes nothing.
   void set(std::string_view key, Value value);
-  /// Sets a text. Where a text stands already its room is used again, so rewriting entries of a like length
-  /// allocates nothing.
+  /// Sets a text. Reuses the memory of an old text, so writing entries of similar length again allocates
+  /// nothing.
   void setText(std::string_view key, std::string_view text);
   void remove(std::string_view key);
-  /// Adds an entry at the end, for whoever knows that the key is not there.
+  /// Adds an entry at the end. The key must not be in the dictionary.
   void add(std::string_view key, Value value);
-  /// Removes the entries from that position on.
+  /// Removes the entries from this position on.
   void truncate(std::size_t size);
-  /// Makes room for that many keys at once.
+  /// Reserves memory for this many keys.
   void reserve(std::size_t size) { _entries.reserve(size); }
 
-  /// Where the key stands, `nowhere` when it is not there. A position is good until a key is removed.
+  /// The position of the key; `nowhere` when it is missing. A position is valid until a key is removed.
   std::size_t find(std::string_view key) const;
-  /// Whether the key stands at that position.
+  /// Whether the key is at this position.
   bool hasAt(std::size_t position, std::string_view key) const {
     return position < _entries.size() && _entries[position].key == key;
   }
@@ -61,7 +61,7 @@ class Dictionary {
 
  private:
   static const Value absentValue;
-  // Up to here a walk over the entries beats an index.
+  // Up to this size, a search through the entries is faster than an index.
   static constexpr std::size_t largestUnindexed = 48;
 
   struct Hash {
@@ -72,7 +72,7 @@ class Dictionary {
   void indexAll();
 
   std::vector<Entry> _entries;
-  // Where each key stands; empty as long as the dictionary is small, as those of a display are.
+  // The position of each key; empty while the dictionary is small, like those of a display.
   std::unordered_map<std::string, std::size_t, Hash, std::equal_to<>> _positions;
 };
 

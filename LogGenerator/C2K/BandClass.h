@@ -4,7 +4,7 @@
 
 namespace varnel::c2k {
 
-/// Band classes as 3GPP2 C.S0057 numbers them.
+/// Band classes, by their numbers in 3GPP2 C.S0057.
 inline constexpr std::string_view bandClasses[] = {
     "800 MHz cellular band [0]",
     "1.8 to 2.0GHz PCS band [1]",

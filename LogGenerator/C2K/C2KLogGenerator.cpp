@@ -24,7 +24,7 @@ struct PacketKind {
   std::span<const c2k::Variable> published;
 };
 
-// In the order in which the start command asks for them.
+// In the order of the start command.
 constexpr PacketKind packetKinds[] = {
     {0x108A, Length::Minimum, c2k::fingerC2ISize, c2k::decodeFingerC2I, c2k::fingerC2IVariables},
     {0x1183, Length::Exact, c2k::evdoStatusSize, c2k::decodeEVDOStatus, c2k::evdoStatusVariables},
@@ -36,7 +36,7 @@ constexpr PacketKind packetKinds[] = {
     {0x134F, Length::Minimum, c2k::systemInfoSize, c2k::decodeSystemInfo, c2k::systemInfoVariables},
 };
 
-// Each variable is published by some packet.
+// Some packet publishes each variable.
 static_assert(std::ranges::all_of(c2k::variableNames, [](std::string_view name) {
   return std::ranges::any_of(packetKinds, [&](const PacketKind& kind) {
     return std::ranges::find(kind.published, name, &c2k::Variable::name) != kind.published.end();
@@ -61,7 +61,7 @@ bool hasRightLength(const PacketKind& kind, const Packet& packet) {
 
 using VariableFormats = std::vector<c2k::VariableFormat>;
 
-// Gives every row of a template the formats of the variable that it names.
+// Gives each entry of a template the formats of the variable that it names.
 void addFormats(std::string_view section, const Dictionary& rows, const VariableFormats& variables,
                 NumberFormats& formats) {
   for (const auto& [key, value] : rows) {
@@ -75,7 +75,7 @@ void addFormats(std::string_view section, const Dictionary& rows, const Variable
   }
 }
 
-// Whether a template has a row for one of the variables.
+// Whether a template has an entry for one of the variables.
 bool showsAny(const Dictionary& rows, std::span<const c2k::Variable> variables) {
   return std::ranges::any_of(rows, [&](const Dictionary::Entry& row) {
     if (const Dictionary* const inner = row.value.dictionary()) return showsAny(*inner, variables);
@@ -155,7 +155,7 @@ void C2KLogGenerator::updateFromLog_usingLookup_usingState(ByteView data, c2k::L
                                                            c2k::State& state) {
   const auto message = LogMessage::framed(data);
   if (!message) return countMessageNotDecoded();
-  // Kept: whatever the line says, the packet is not dropped.
+  // Kept: in spite of the log line, the packet is not dropped.
   if (message->logType() != LogMessage::modemLogType)
     logError("Invalid log type: %x. Dropping.", message->logType());
   const auto kind = std::ranges::find(packetKinds, message->logCode(), &PacketKind::logCode);
@@ -194,7 +194,7 @@ std::vector<CodeSections> C2KLogGenerator::codeSections() const {
   return list;
 }
 
-// Any log type will do, as in decoding.
+// Any log type is accepted, as in decoding.
 MessageFate C2KLogGenerator::fateOf(ByteView data) const {
   using enum MessageFate::Outcome;
   const auto message = LogMessage::framed(data);
@@ -211,7 +211,7 @@ std::optional<std::string> C2KLogGenerator::missingTemplate() const {
   return _lacksTemplate ? std::optional(std::string(templateName) + ".plist") : std::nullopt;
 }
 
-// The lookup outlives a reconnection like the display, so another generator of this kind goes on with it.
+// Like the display, the lookup outlives a reconnection, so a new generator of this kind can go on with it.
 bool C2KLogGenerator::changesDisplayOf(const Dictionary& state) const {
   return state.get(stateKey::display).isAbsent() || !state.get(stateKey::lookup).isAbsent();
 }

@@ -10,7 +10,7 @@ namespace varnel::c2k {
 
 namespace {
 
-// The bits that each packet of a counter stands for; packets of a counter with 0 do not count.
+// The bits per packet of each counter. A counter with 0 does not count.
 constexpr std::uint64_t flWeights[] = {
     128,  256,  512, 1024, 0,    128,  256,  512,  1024, 0,    128,  256,  512,  1024,
     0,    128,  256, 512,  1024, 0,    128,  256,  512,  1024, 0,    512,  1024, 2048,
@@ -32,7 +32,7 @@ constexpr std::size_t flSequenceOffset = 13;
 constexpr std::size_t flCounters = 17;
 static_assert(flCounters + counterSize * flCounterCount == flDataRateSize);
 
-// The reverse link counts in three blocks of two halves. In each half every rate has a row, of which the
+// The reverse link has three blocks of counters with two halves each. A half has a record per rate, whose
 // first counters count.
 constexpr std::size_t rlSequenceOffset = 14;
 constexpr std::size_t rlCounters = 18;
@@ -42,7 +42,7 @@ constexpr std::size_t rlHalfSize = rlRowSize * rlRateCount;
 constexpr std::size_t rlHalfCount = 6;
 static_assert(rlHalfSize == 288 && rlCounters + rlHalfSize * rlHalfCount <= rlDataRateSize);
 
-// What a link had sent when it wrote a packet.
+// What a link had sent when it sent a packet.
 struct Progress {
   std::uint32_t sequence;
   std::uint64_t bits;
@@ -61,7 +61,7 @@ std::optional<Progress> previousProgress(const Dictionary& entries, LinkEntries&
 }
 
 void showRate(Variable variable, const Progress& previous, const Progress& now, Lookup& lookup) {
-  // The sequence wraps. One that does not rise leaves the rate as it is.
+  // The sequence value wraps. If it does not rise, the rate stays as it is.
   const auto steps = static_cast<std::int32_t>(now.sequence - previous.sequence);
   if (steps < 1) return;
   const auto bits = static_cast<double>(static_cast<std::int64_t>(now.bits - previous.bits));

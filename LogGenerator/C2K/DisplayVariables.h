@@ -18,13 +18,14 @@
 
 namespace varnel::c2k {
 
-// Display variables are the names under which decoders publish what they find. The lookup has an array for
-// each variable that the template names: its placements {"key": a row, "dict": the dictionary that holds it}.
+// Display variables are the names under which decoders publish texts. The lookup has an array for each
+// variable that the template names. The array holds placements {"key": the entry, "dict": the dictionary with
+// the entry}.
 
-/// The mark, as key and as text, of a dictionary whose rows are ordered by key.
+/// Marks, as a key and as a text, a dictionary whose entries are sorted by key.
 inline constexpr std::string_view sortedMark = sortMark;
 
-/// The variables that decoders set, by the names under which the template places them.
+/// The variables that decoders publish, with their names in the template.
 inline constexpr std::string_view variableNames[] = {
     "kChannel",         "k1xEVDODeviceState",
     "kBandClass",       "kRxAGC0",
@@ -43,11 +44,11 @@ inline constexpr std::string_view variableNames[] = {
     "kFLDataRate",      "kRLDataRate",
 };
 
-/// A display variable, written as its name: one that there is not does not compile.
+/// A display variable, written as its name. A wrong name does not compile.
 class Variable {
  public:
   consteval Variable(const char* name) : _index(indexOf(name)) {}
-  /// Its place among the names.
+  /// Its index among the names.
   constexpr std::size_t index() const { return _index; }
   constexpr std::string_view name() const { return variableNames[_index]; }
 
@@ -68,21 +69,21 @@ struct VariableField {
   Format format = integer();
 };
 
-/// A variable, and one of the formats in which it shows numbers.
+/// A variable, and one of its formats for numbers.
 struct VariableFormat {
   Variable variable;
   Format format;
 };
 
-/// For static_assert: does not compile when a field reads past that many bytes.
+/// For static_assert: does not compile when a field reads past this many bytes.
 consteval bool within(std::span<const VariableField> fields, std::size_t size) {
   for (const VariableField& field : fields)
     if (field.source.end() > size) throw "a field lies past the minimum length";
   return true;
 }
 
-/// The places of each variable, as a lookup has them. They are looked up once, since a lookup that a template
-/// has filled does not change any more.
+/// The places of each variable, from a lookup. It finds them only once, since a lookup does not change after
+/// the template has filled it.
 class Lookup {
  public:
   struct Place {
@@ -90,40 +91,40 @@ class Lookup {
     BoundEntry entry;
   };
 
-  /// Without an argument, or with what is no dictionary, there are no places.
+  /// Without an argument, or with a value that is no dictionary, there are no places.
   Lookup() = default;
   explicit Lookup(const Value& placements);
 
-  /// Whether it was made from this very dictionary.
+  /// Whether it was made from this dictionary.
   bool isMadeFrom(const Value& placements) const {
     return _placements.dictionary() == placements.dictionary();
   }
-  /// In their order, up to the first placement that is none.
+  /// The places in their order, up to the first invalid placement.
   std::span<Place> places(Variable variable) { return _places[variable.index()]; }
   /// The time of the packets that are decoded from now on.
   void setTime(const Time& now) { _now = now; }
   const Time& time() const { return _now; }
   /// When a packet last wrote the entry; absent when none did.
   std::optional<Time> writtenAt(const Dictionary& section, std::string_view key) const;
-  /// A dictionary to fill and to publish: the one that the variable shows, when nobody else has it, or else a
-  /// new one.
+  /// A dictionary to fill and to publish: the one that the variable shows, if nothing else refers to it, else
+  /// a new one.
   Value dictionaryFor(Variable variable);
 
  private:
-  Value _placements;  // keeps the sections
+  Value _placements;  // keeps the sections alive
   Time _now;
   std::array<std::vector<Place>, std::size(variableNames)> _places;
 };
 
-/// Adds a placement of the variable: a row of a section, which is a dictionary.
+/// Adds a placement of the variable: an entry of a section, which is a dictionary.
 void addPlacement(Dictionary& placements, std::string_view variable, std::string_view key,
                   const Value& section);
 
-/// Shows a value in every place of its variable; nowhere when the lookup does not know the variable.
+/// Shows a value in every place of its variable. Does nothing when the lookup does not have the variable.
 void storeDisplayValue(Variable variable, const Value& value, Lookup& lookup);
-/// The same with a text, which takes the room of the text that stands there.
+/// The same for a text, which reuses the memory of the old text.
 void storeDisplayText(Variable variable, std::string_view text, Lookup& lookup);
-/// The same with a computed number, by a format made by `real`.
+/// The same for a computed number, in a format made by `real`.
 void storeDisplayNumber(Variable variable, const Format& format, double number, Lookup& lookup);
 /// Publishes the fields of a packet in the order of the table.
 void storeDisplayFields(const Packet& packet, std::span<const VariableField> fields, Lookup& lookup);

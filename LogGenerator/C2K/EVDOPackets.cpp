@@ -27,7 +27,7 @@ constexpr VariableField channel[] = {
     {bits(14, 3, 5), "kBandClass", bandClass},
     {s8(15), "kRxAGC0", dBm},
 };
-// Shown while the access terminal is in the access state or beyond.
+// Shown while the access terminal is in the access state or a later one.
 constexpr VariableField levelsInUse[] = {
     {s8(16), "kRxAGC1", dBm},
     {s8(17), "kTxAGC", dBm},
@@ -80,7 +80,7 @@ void decodeFingerC2I(const Packet& packet, State& /*state*/, Lookup& lookup) {
   constexpr std::size_t fingerSize = 14;
   const std::uint8_t count = packet.u8(countOffset);
   if (packet.size() != fingerC2ISize + fingerSize * count) {
-    // Kept: the size in the line is that of a packet without fingers.
+    // Kept: the size in the log line is that of a packet without fingers.
     logError("Log code 0x108a has bad length of %u bytes, but has %d substructs (size=%u).",
              static_cast<std::uint32_t>(packet.size()), count, fingerC2ISize);
     return;

@@ -7,16 +7,17 @@
 #include "LogGenerator/C2K/State.h"
 #include "LogGenerator/Packet.h"
 
-/// The decoders of CDMA2000 packets. Each takes a packet of the right length, publishes its display variables
-/// through the lookup, and keeps what it must remember until the next packet in the state.
+/// The decoders of CDMA2000 packets. Each takes a packet of the right length and publishes its display
+/// variables through the lookup. What it has to remember until the next packet is in the state.
 namespace varnel::c2k {
 
-/// Lengths of packets in bytes, header included: of the EV-DO status exactly, of all others at least.
+/// Lengths of packets in bytes, header included. That of the EV-DO status is exact; all others are minimum
+/// lengths.
 inline constexpr std::uint32_t evdoStatusSize = 50;
 inline constexpr std::uint32_t evdoActiveSetSize = 25;
 inline constexpr std::uint32_t fingerC2ISize = 23;
 inline constexpr std::uint32_t subpacketsSize = 17;
-/// Kept: the base station id lies behind it, at 184.
+/// Kept: the base station id is after it, at 184.
 inline constexpr std::uint32_t systemInfoSize = 171;
 inline constexpr std::uint32_t flDataRateSize = 241;
 inline constexpr std::uint32_t rlDataRateSize = 1750;
@@ -36,27 +37,27 @@ inline constexpr Variable systemInfoVariables[] = {"k1xRoamingHome", "kSystemId"
 inline constexpr Variable flDataRateVariables[] = {"kFLDataRate"};
 inline constexpr Variable rlDataRateVariables[] = {"kRLDataRate"};
 
-/// How the decoders of each file write numbers that have a unit or other texts around them; those of a
-/// variable that shows pilots hold for each of its pilots.
+/// The formats of numbers with a unit or with other texts around them, per file of decoders. The format of a
+/// variable that shows pilots is that of each pilot.
 void listEVDOFormats(std::vector<VariableFormat>& formats);
 void listSearcherFormats(std::vector<VariableFormat>& formats);
 void listDataRateFormats(std::vector<VariableFormat>& formats);
 
-/// 0x1183: state of the EV-DO session, its channel and its signal levels.
+/// 0x1183: state of the EV-DO session, its channel, and its signal levels.
 void decodeEVDOStatus(const Packet& packet, State& state, Lookup& lookup);
-/// 0x12b6: strengths of the pilots in the EV-DO active set.
+/// 0x12B6: strengths of the pilots in the EV-DO active set.
 void decodeEVDOActiveSet(const Packet& packet, State& state, Lookup& lookup);
-/// 0x108a: carrier to interference of each EV-DO finger.
+/// 0x108A: carrier-to-interference ratio of each EV-DO finger.
 void decodeFingerC2I(const Packet& packet, State& state, Lookup& lookup);
-/// 0x119c: state of the 1x device, its channels, signal levels and active set.
+/// 0x119C: state of the 1x device, its channels, signal levels, and active set.
 void decode1xStatus(const Packet& packet, State& state, Lookup& lookup);
-/// 0x119d: one more frame for the average of the frame-error rate on the 1x traffic channel.
+/// 0x119D: one more frame for the average frame error rate on the 1x traffic channel.
 void decode1xTrafficFER(const Packet& packet, State& state, Lookup& lookup);
-/// 0x134f: the system that serves the phone.
+/// 0x134F: the system that serves the phone.
 void decodeSystemInfo(const Packet& packet, State& state, Lookup& lookup);
-/// 0x1192: the data rate of the EV-DO forward link since the packet before.
+/// 0x1192: the data rate of the EV-DO forward link since the previous packet.
 void decodeFLDataRate(const Packet& packet, State& state, Lookup& lookup);
-/// 0x127e: the data rate of the EV-DO reverse link since the packet before.
+/// 0x127E: the data rate of the EV-DO reverse link since the previous packet.
 void decodeRLDataRate(const Packet& packet, State& state, Lookup& lookup);
 
 }  // namespace varnel::c2k

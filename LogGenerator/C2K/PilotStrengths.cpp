@@ -29,7 +29,7 @@ void PilotStrengths::publishOrNone() {
   }
 }
 
-// Pilots mostly come again, and then take the room of those of the packet before.
+// Most pilots come again, and reuse the memory of the previous packet's pilots.
 void PilotStrengths::put(std::string_view key, std::string_view text) {
   if (_size == 0) _pilots = _lookup.dictionaryFor(_variable);
   Dictionary& pilots = *_pilots.dictionary();

@@ -10,18 +10,17 @@
 
 namespace varnel::c2k {
 
-/// Pilots, each shown by its PN offset in the order of its index, under one variable.
+/// The pilots of one variable. Each is shown by its PN offset, in the order of its index.
 class PilotStrengths {
  public:
   PilotStrengths(Variable variable, Lookup& lookup) : _variable(variable), _lookup(lookup) {}
 
-  /// Adds a pilot with its strength in dB, by a format made by `real`. Every index comes once.
+  /// Adds a pilot with its strength in dB, in a format made by `real`. Each index may come only once.
   void add(std::uint8_t index, std::uint16_t pn, const Format& format, double decibels);
 
-  /// Publishes the pilots as a sorted dictionary, which is empty but for its mark when there are no
-  /// pilots.
+  /// Publishes the pilots as a sorted dictionary. Without pilots the dictionary has only its mark.
   void publish();
-  /// The same, but without pilots the text "(none)".
+  /// The same, but without pilots publishes the text "(none)".
   void publishOrNone();
 
  private:
@@ -30,16 +29,16 @@ class PilotStrengths {
   Variable _variable;
   Lookup& _lookup;
   Value _pilots;
-  std::size_t _size = 0;  // of the entries that are this packet's
+  std::size_t _size = 0;  // the number of entries that belong to this packet
 };
 
-/// How the strength of a pilot is shown.
+/// The format of a pilot's strength.
 inline constexpr Format decibelFormat = real("%+.2f dB");
 
 /// A linear ratio in dB. Kept: 0 gives minus infinity.
 double decibels(double ratio);
 
-/// A ratio that packets carry in units of 1/512, in dB.
+/// A ratio in units of 1/512, as in packets, converted to dB.
 double decibelsOfRatio512(std::uint16_t ratio);
 
 }  // namespace varnel::c2k

@@ -70,14 +70,14 @@ void showRF(const Packet& rf, bool isInTraffic, Lookup& lookup) {
   }
 }
 
-// How the searcher scales the energies that it measures.
+// The scale of the energies that the searcher measures.
 struct Integration {
   double length;
   double gain;
   int exponent;
 };
 
-// The strength of a pilot, Ec/Io. What is no number or too small shows as the floor, -50 dB.
+// The strength of a pilot, Ec/Io. A NaN, or a value that is too small, shows as the minimum, -50 dB.
 double pilotStrength(const Integration& integration, std::uint16_t energy) {
   constexpr double floor = 0.00001;
   const double n = integration.length;
@@ -100,11 +100,11 @@ void showActiveSet(const Packet& activeSet, Lookup& lookup) {
     const std::uint16_t energy = activeSet.u16(24 + 4 * extensions + i * stride);
     pilots.add(i, pn, pn == referencePN ? referencePilot : decibelFormat, pilotStrength(integration, energy));
   }
-  // Kept: unlike those of EV-DO, an active set without pilots shows no text.
+  // Kept: unlike in EV-DO, an active set without pilots shows no text.
   pilots.publish();
 }
 
-// The frame-error rate between 0 and 1. It is computed in single precision at every step.
+// The frame error rate between 0 and 1. Every step is computed in single precision.
 std::optional<float> trafficFER(const State& state) {
   const Value& rate = state.bound.trafficFER.get(state.entries);
   if (const auto real = rate.real()) return static_cast<float>(*real);
@@ -112,7 +112,7 @@ std::optional<float> trafficFER(const State& state) {
   return std::nullopt;
 }
 
-// The rate of a call that is over is shown once more; the next call starts its average afresh.
+// Shows the rate of the ended call once more. The next call starts a new average.
 void endTrafficFER(State& state, Lookup& lookup) {
   const auto rate = trafficFER(state);
   if (!rate) return;
@@ -127,7 +127,7 @@ void decode1xStatus(const Packet& packet, State& state, Lookup& lookup) {
   const auto rf = findSubpacket(packet, SubpacketId::RF);
   const auto activeSet = findSubpacket(packet, SubpacketId::ActiveSetInfo);
   const auto fingers = findSubpacket(packet, SubpacketId::FingerInfo);
-  // Kept: the fingers must be there though nobody reads them.
+  // Kept: the fingers are required, but nothing reads them.
   if (!system || !rf || !activeSet || !fingers) {
     logWarning("Log code 0x119c: missing subpacket (ss=%d,rf=%d,ai=%d,fi=%d).", system.has_value(),
                rf.has_value(), activeSet.has_value(), fingers.has_value());

@@ -8,8 +8,8 @@
 
 namespace varnel::c2k {
 
-/// The entries of the state that hold what one link had sent when it wrote its last packet, and those of the
-/// extra information that hold what it had sent then and before. Their names begin with that of the link.
+/// The entries of the state with what a link had sent when it sent its last packet, and the entries of the
+/// extra information with what it had sent then and before. Their names begin with the name of the link.
 struct LinkEntries {
   explicit LinkEntries(const std::string& link)
       : sequence(link + "DataSeqNum"),
@@ -24,7 +24,7 @@ struct LinkEntries {
   BoundEntry oldSequence, oldSent;
 };
 
-/// Where the entries stand that packets need.
+/// The positions of the entries that packets use.
 struct StateEntries {
   BoundEntry display{stateKey::display};
   BoundEntry lookup{stateKey::lookup};
@@ -34,7 +34,7 @@ struct StateEntries {
   LinkEntries reverseLink{"RL"};
 };
 
-/// The state dictionary, in which decoders keep what they must remember until the next packet.
+/// The state dictionary, in which decoders keep what they have to remember until the next packet.
 struct State {
   Dictionary& entries;
   StateEntries& bound;

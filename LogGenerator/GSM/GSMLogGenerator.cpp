@@ -10,12 +10,12 @@ namespace varnel {
 
 namespace {
 
-// Kept: the name and the lines by which failures are known, wherever the checks stand in this file.
+// Kept: failures are known by this file name and these lines, which are not the real ones.
 constexpr const char* assertionFile = "LogGenerator/GSM/GSMLogGenerator";
 constexpr int unknownObjectLine = 78;
 constexpr int unreadableObjectLine = 90;
 
-// Of the kinds that have no display form.
+// The name of a kind that has no display form.
 constexpr const char* kindName(Value::Kind kind) {
   switch (kind) {
     case Value::Kind::Integer:
@@ -33,7 +33,7 @@ constexpr const char* kindName(Value::Kind kind) {
   }
 }
 
-// A dictionary has as many entries when it is processed, so it can collapse before.
+// Processing does not change the number of a dictionary's entries, so the dictionary can be collapsed first.
 Value processChild(const Value& child) {
   const Value onlyEntry = GSMLogGenerator::canCollapse(child);
   return onlyEntry.isAbsent() ? GSMLogGenerator::processObject(child) : processChild(onlyEntry);
@@ -49,7 +49,7 @@ Value processEntries(const Dictionary& entries) {
 Value processElements(const Array& elements) {
   Array processed;
   processed.reserve(elements.size());
-  // Kept: the first element of every array is left out unseen.
+  // Kept: the first element of every array is left out.
   for (std::size_t i = 1; i < elements.size(); ++i) processed.push_back(processChild(elements[i]));
   return Value::ofArray(std::move(processed));
 }
@@ -65,7 +65,7 @@ Value GSMLogGenerator::canCollapse(const Value& object) {
   return entries && entries->size() == 1 ? entries->begin()->value : Value();
 }
 
-// As deep as a property list may be, which its reader bounds.
+// The recursion is as deep as the property list, whose depth its reader limits.
 Value GSMLogGenerator::processObject(const Value& object) {
   if (object.string()) return object;
   if (const Dictionary* entries = object.dictionary()) return processEntries(*entries);

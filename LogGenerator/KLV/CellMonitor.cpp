@@ -53,7 +53,7 @@ const Array* CellMonitorReader::read(const Packet& packet) {
   if (!_payload || !std::ranges::equal(payload, *_payload)) {
     if (!_payload) _payload.emplace();
     _payload->assign(payload.begin(), payload.end());
-    _records.reset();  // gives its memory to the new one
+    _records.reset();  // frees the memory for the new one
     _records = parsedArray(payload);
   }
   if (_records) return _records->array();

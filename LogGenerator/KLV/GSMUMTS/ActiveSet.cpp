@@ -11,7 +11,7 @@ namespace {
 constexpr Field identity[] = {
     {cellSet::scramblingCode, "Scrambling Code"},
 };
-// Kept: no dBm, though it is a power.
+// Kept: the value is a power and should be in dBm.
 constexpr Format level = integer("%d dB");
 
 std::uint32_t energyPerChip(const Packet& record) {
@@ -21,7 +21,7 @@ std::uint32_t energyPerChip(const Packet& record) {
   return 0;
 }
 
-// Of all cells together, in dBm.
+// The sum over all cells, in dBm.
 std::int32_t receivedSignalStrength(const Packet& packet) {
   const auto reading = static_cast<std::int32_t>(rawValue(packet, cellSet::receivedSignal));
   return (reading + 512) / 10 - 106;

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The UMTS cells of the active set, a row each.
+/// The UMTS cells of the active set, one record per cell.
 class ActiveSet final : public SectionDecoder {
  public:
   ActiveSet();

@@ -14,7 +14,7 @@ inline constexpr std::uint32_t logCode = 0x4005;
 inline constexpr std::size_t minimumSize = 15;
 inline constexpr std::size_t umtsCountOffset = 13;
 inline constexpr std::size_t gsmCountOffset = 14;
-/// Kept: the GSM records start where the UMTS records do, not behind them.
+/// Kept: the GSM records start where the UMTS records start, not after them.
 inline constexpr std::size_t firstRecord = minimumSize;
 
 }  // namespace cellRanking

@@ -8,8 +8,8 @@
 
 namespace varnel {
 
-/// The UMTS cells that the phone measures and their sets, log code 0x417A: records of the cells, then records
-/// of their energies.
+/// The UMTS cells that the phone measures, and their sets, log code 0x417A: records of the cells, then
+/// records of their energies.
 namespace cellSet {
 
 inline constexpr std::uint32_t logCode = 0x417A;
@@ -20,12 +20,12 @@ inline constexpr std::size_t firstCell = minimumSize;
 inline constexpr std::size_t cellSize = 15;
 inline constexpr std::size_t energySize = 44;
 
-// Of a cell record.
+// In a cell record.
 inline constexpr Source scramblingCode = bits(7, 0, 13);
 inline constexpr Source membership = bits(8, 5, 3);
 inline constexpr std::uint32_t activeSet = 0;
 
-// Of an energy record: linear Ec/N0, the first one that is not 0 counts.
+// In an energy record: linear Ec/N0. The first one that is not 0 counts.
 inline constexpr Source energies[] = {u32(32), u32(36), u32(40)};
 
 inline Packet cell(const Packet& packet, std::size_t index) {
@@ -37,8 +37,8 @@ inline Packet energy(const Packet& packet, std::size_t index) {
 
 }  // namespace cellSet
 
-/// A set of cells that has its section but no records.
-/// Kept: whatever the packet holds, the list becomes empty.
+/// A set of cells with a section, but without records.
+/// Kept: the list becomes empty, whatever the packet holds.
 class EmptyCellSet : public SectionDecoder {
  protected:
   EmptyCellSet(std::string_view sectionName, std::string_view traceLine)

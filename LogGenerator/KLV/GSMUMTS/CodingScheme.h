@@ -9,7 +9,7 @@ class CodingScheme final : public SectionDecoder {
  public:
   static constexpr std::string_view sectionName = "Coding Scheme";
 
-  // Kept: the text of `CellChangeCounters`.
+  // Kept: the trace line of `CellChangeCounters`.
   CodingScheme() : SectionDecoder(sectionName, "CellChangeCounters", {}, UnknownCodes::Ignored) {}
 };
 

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The cells that were found without being on the network's list.
+/// The cells that the phone has found, but that are not in the network's list.
 class DetectedSet final : public EmptyCellSet {
  public:
   static constexpr std::string_view sectionName = "Detected Set";

@@ -10,7 +10,7 @@ constexpr std::size_t minimumSize = 17;
 constexpr std::size_t countOffset = 16;
 constexpr std::size_t networkSize = 3;
 
-// The number of three decimal digits, a byte each, of which every other one counts.
+// The number made of three decimal digits. Each digit is a byte, and every other byte counts.
 std::int32_t everyOtherDigit(const Packet& network, std::size_t first) {
   return network.u8(first) * 100 + network.u8(first + 2) * 10 + network.u8(first + 4);
 }
@@ -18,7 +18,7 @@ std::int32_t everyOtherDigit(const Packet& network, std::size_t first) {
 void update(Section& section, const Packet& packet) {
   section.refill([&](Array& networks) {
     for (std::size_t i = 0; i < packet.u8(countOffset); ++i) {
-      // Kept: six bytes are read of three, so that each network runs into the next.
+      // Kept: a network has three bytes, but six are read, so each network runs into the next one.
       const Packet network = packet.from(minimumSize + networkSize * i);
       const Value& record = networks.emplace_back(Value::ofDictionary());
       setInteger(*record.dictionary(), "Mobile Country Code", integer(), everyOtherDigit(network, 0));

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The networks that count as the registered one, a row each.
+/// The networks that count as equivalent to the registered one, one record per network.
 class EquivalentPLMNList final : public SectionDecoder {
  public:
   EquivalentPLMNList();

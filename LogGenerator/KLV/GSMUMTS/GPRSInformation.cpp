@@ -15,7 +15,7 @@ constexpr Choice controlOrders[] = {
     {1, "NC1"},
     {2, "NC2"},
 };
-// Kept: "Available" where its siblings have "Not Available".
+// Kept: "Available", although the other tables have "Not Available".
 constexpr Choice flowContextSupport[] = {
     {0xFF, "Available"},
     {0, "Not Supported"},

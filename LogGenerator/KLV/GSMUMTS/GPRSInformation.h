@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// What the GSM cell says of its packet service.
+/// What the GSM cell broadcasts about its packet service.
 class GPRSInformation final : public SectionDecoder {
  public:
   GPRSInformation();

@@ -7,8 +7,8 @@
 
 namespace varnel {
 
-/// Measurements of the GSM serving cell and of its neighbours, log code 0x5137. Two 32-bit values are read by
-/// one section as the path loss criteria C1 and C2, by another as receive qualities.
+/// Measurements of the GSM serving cell and of its neighbors, log code 0x5137. One section shows the two
+/// 32-bit values as the path loss criteria C1 and C2, another one as receive qualities.
 namespace gsmMeasurement {
 
 inline constexpr std::uint32_t logCode = 0x5137;

@@ -8,7 +8,7 @@ namespace varnel {
 
 namespace {
 
-// Kept: the blanks in three of the names, and two that are no RR_ names.
+// Kept: three of the names have a blank, and two do not begin with RR_.
 constexpr std::string_view states[] = {
     /*  0 */ "RR_INACTIVE",
     /*  1 */ "RR_GOING_ACTIVE",

@@ -18,13 +18,13 @@ constexpr Field identity[] = {
 };
 
 constexpr Field dedicatedChannel[] = {
-    // Kept: the low byte of two.
+    // Kept: only the low byte of two.
     {u8(13), "MA Dedicated ARFCN"},
 };
 
 constexpr Field measurement[] = {
     {gsmMeasurement::receiveLevel, "RSSI", integer("%d dBm")},
-    // Kept: the low 16 bits, without a sign.
+    // Kept: only the low 16 bits, without a sign.
     {u16(gsmMeasurement::firstValue), "C1 Value"},
     {u16(gsmMeasurement::secondValue), "C2 Value"},
 };

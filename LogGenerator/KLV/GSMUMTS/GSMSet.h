@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The ranked GSM cells, a row each.
+/// The ranked GSM cells, one record per cell.
 class GSMSet final : public SectionDecoder {
  public:
   GSMSet();

@@ -11,7 +11,7 @@ constexpr std::size_t primaryCountOffset = 16;
 constexpr std::size_t secondaryCountOffset = 17;
 constexpr std::size_t firstPrimary = minimumSize;
 constexpr std::size_t processSize = 9;
-// Kept: as if each primary process took 18 records.
+// Kept: each primary process counts as 18 records.
 constexpr std::size_t primaryStride = 18 * processSize;
 
 constexpr Format number = integer("%u");
@@ -32,7 +32,7 @@ constexpr Field process[] = {
 static_assert(extent(process) == processSize);
 
 void showProcesses(Section& section, std::string_view label, const Packet& packet, const Records& records) {
-  if (records.count == 0) return;  // what was there stays
+  if (records.count == 0) return;  // the old list stays
   Array processes;
   addRecords(processes, packet, records, process);
   section.set(label, Value::ofArray(std::move(processes)));

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// High-speed downlink packet access: what each HARQ process received.
+/// High-speed downlink packet access: what each HARQ process has received.
 class HSDPAInformation final : public SectionDecoder {
  public:
   HSDPAInformation();

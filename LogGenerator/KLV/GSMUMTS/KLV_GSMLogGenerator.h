@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The generator of GSM/UMTS modems: template "KLV_GSM", decoders of `KLV_GSMClassIndex`.
+/// The generator of GSM/UMTS modems, with the template "KLV_GSM" and the decoders of `KLV_GSMClassIndex`.
 class KLV_GSMLogGenerator final : public KLVLogGenerator2 {
  public:
   explicit KLV_GSMLogGenerator(const Services& services);

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The channels that the GSM connection hops over.
+/// The channels over which the GSM connection hops.
 class MobileAllocation final : public SectionDecoder {
  public:
   MobileAllocation();

@@ -16,8 +16,8 @@ inline constexpr Source state = u8(13);
 inline constexpr Source subState = u8(14);
 inline constexpr Source updateStatus = u8(15);
 
-/// Those of both circuit-switched processes.
-// Kept: the blanks in two of the names.
+/// The states of both circuit-switched processes.
+/// Kept: two of the names have a blank.
 inline constexpr std::string_view states[] = {
     /*  0 */ "MM_NULL",
     /*  1 */ "Unknown",
@@ -49,7 +49,7 @@ inline constexpr std::string_view states[] = {
 
 }  // namespace mmState
 
-/// Registration and the choice of the network, log code 0x7132.
+/// Registration, and the choice of the network, log code 0x7132.
 namespace registration {
 
 inline constexpr std::uint32_t logCode = 0x7132;
@@ -63,7 +63,7 @@ inline constexpr std::string_view states[] = {
     "REG_STATE_OFFLINE",
 };
 
-/// The row of all three processes.
+/// The entry that all three processes have.
 inline constexpr Field serviceState[] = {
     {state, "MM Service State", entry(states)},
 };
@@ -79,7 +79,7 @@ inline constexpr Source operatingMode = u8(13);
 inline constexpr Source serviceType = u8(14);
 /// Mobile country and network code in three bytes (3GPP TS 24.008, 10.5.1.3).
 inline constexpr std::size_t plmn = 15;
-/// Location area code, the one big-endian number.
+/// The location area code, which is the only big-endian number.
 inline constexpr std::size_t lac = 18;
 inline constexpr Source rac = u8(20);
 

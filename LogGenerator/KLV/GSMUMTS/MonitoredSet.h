@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The cells of the network's list that are not in the active set.
+/// The cells in the network's list that are not in the active set.
 class MonitoredSet final : public EmptyCellSet {
  public:
   static constexpr std::string_view sectionName = "Monitored Set";

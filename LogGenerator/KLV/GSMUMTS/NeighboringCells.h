@@ -8,7 +8,7 @@
 
 namespace varnel {
 
-/// The GSM neighbour cells, from the modem or from the telephony server: a row each.
+/// The GSM neighbor cells, from the modem or from the telephony server, one record per cell.
 class NeighboringCells final : public SectionDecoder {
  public:
   explicit NeighboringCells(CellMonitorReader& cellMonitor);
@@ -23,7 +23,7 @@ class NeighboringCells final : public SectionDecoder {
   void updateFromCellMonitor(const Packet& packet);
 
   CellMonitorReader& _cellMonitor;
-  /// Channel → base station identity code, as last heard.
+  /// Channel → base station identity code, from the last packet with identity codes.
   std::unordered_map<std::uint16_t, std::uint8_t> arfcnToBsic;
 };
 

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The GSM cells that take no part in the ranking.
+/// The GSM cells that are not ranked.
 class NonRankedGSMSet final : public SectionDecoder {
  public:
   static constexpr std::string_view sectionName = "Non-Ranked GSM Set";

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The UMTS cells that take no part in the ranking.
+/// The UMTS cells that are not ranked.
 class NonRankedUMTSSet final : public SectionDecoder {
  public:
   static constexpr std::string_view sectionName = "Non-Ranked UMTS Set";

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The state of the mobility management, in short.
+/// A summary of the mobility management.
 class ProcessCO final : public SectionDecoder {
  public:
   ProcessCO();

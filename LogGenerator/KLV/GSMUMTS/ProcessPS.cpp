@@ -30,7 +30,7 @@ constexpr std::string_view subStates[] = {
     "GMM_PLMN_SEARCH",
     "GMM_SUSPENDED",
     "GMM_UPDATE_NEEDED",
-    // Kept: one T too few.
+    // Kept: a T is missing.
     "GMM_ATTEMPING_TO_UPDATE",
     "GMM_ATTEMPTING_TO_UPDATE_MM",
     "GMM_IMSI_DETACH_INITIATED",
@@ -44,7 +44,7 @@ constexpr std::string_view updateStatuses[] = {
     "GMM_GU3_ROUTING_AREA_NOT_ALLOWED",
 };
 
-// Kept: the labels say MM, as in the circuit-switched section.
+// Kept: the labels say MM, as in the circuit-switched section, instead of GMM.
 constexpr Field state[] = {
     {u8(13), "MM State", entry(states)},
     {u8(14), "MM Sub State", entry(subStates)},

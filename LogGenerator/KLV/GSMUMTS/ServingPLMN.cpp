@@ -36,7 +36,7 @@ constexpr CellMonitorEntry cellMonitorEntries[] = {
     {cellMonitor::lac, areaEntry, "ServingPLMN: Failed to retrieve LAC\n"},
 };
 
-// A binary-coded digit; what is none, such as the filler of a two-digit network code, is a blank.
+// A binary-coded digit. Any other nibble, such as the filler of a two-digit network code, becomes a blank.
 char digit(std::uint32_t nibble) { return nibble < 10 ? static_cast<char>('0' + nibble) : ' '; }
 
 void setDigits(Section& section, std::string_view entry, std::array<std::uint32_t, 3> nibbles) {
@@ -44,7 +44,7 @@ void setDigits(Section& section, std::string_view entry, std::array<std::uint32_
   section.setText(entry, {text.data(), text.size()});
 }
 
-// The first serving cell of either technology.
+// The first serving cell of GSM or UMTS.
 const Dictionary* servingCell(const Array& records) {
   for (const Value& record : records) {
     for (const std::string_view access : {cellMonitor::umts, cellMonitor::gsm}) {

@@ -5,7 +5,7 @@
 
 namespace varnel {
 
-/// The network that the phone is registered on, from the modem or from the telephony server.
+/// The network on which the phone is registered, from the modem or from the telephony server.
 class ServingPLMN final : public SectionDecoder {
  public:
   explicit ServingPLMN(CellMonitorReader& cellMonitor);

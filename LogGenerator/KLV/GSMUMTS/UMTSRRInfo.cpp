@@ -49,7 +49,7 @@ constexpr CellMonitorEntry cellMonitorEntries[] = {
     {cellMonitor::scramblingCode, "Scrambling Code", "UMTSRRInfo: Failed to retrieve Scrambling Code\n"},
 };
 
-// The mean in dBm of the samples that are not 0; without one it is not a number.
+// The mean in dBm of the samples that are not 0; NaN when there is none.
 double meanTransmitPower(const Packet& packet) {
   double sum = 0;
   int used = 0;
@@ -65,7 +65,7 @@ double meanTransmitPower(const Packet& packet) {
 }
 
 void showTransmitPower(Section& section, const Packet& packet) {
-  // Kept: " nan dBm" when there is nothing to take the mean of.
+  // Kept: without samples the text is " nan dBm".
   section.setReal(transmitPowerEntry, transmitPower, meanTransmitPower(packet));
 }
 

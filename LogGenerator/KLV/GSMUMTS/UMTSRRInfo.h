@@ -5,7 +5,7 @@
 
 namespace varnel {
 
-/// The UMTS radio resource control: its state, the serving cell and the transmit power.
+/// The UMTS radio resource control: its state, the serving cell, and the transmit power.
 class UMTSRRInfo final : public SectionDecoder {
  public:
   explicit UMTSRRInfo(CellMonitorReader& cellMonitor);

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The measurements that the UMTS radio resource control asks for.
+/// The measurements that the UMTS radio resource control requests.
 class UMTSRRMeasurement final : public SectionDecoder {
  public:
   static constexpr std::string_view sectionName = "UMTS RR Measurement";

@@ -15,7 +15,7 @@ constexpr Field cell[] = {
     {u16(2), "Scrambling Code"},
     {s8(4), "RSCP", integer("%d dB", 1, -21)},
     {s8(7), "Energy Per Chip", real("%f dB", 0.5)},
-    // Kept: a channel number with a sign.
+    // Kept: a channel number is read as signed.
     {s16(0), "Downlink Frequency"},
     {s16(8), "Ranking Value"},
     {s16(5), "Rank Cell RSCP", integer("%d dB")},

@@ -5,7 +5,7 @@
 
 namespace varnel {
 
-/// The ranked UMTS cells or, from the telephony server, the neighbours: a row each.
+/// The ranked UMTS cells, or the neighbors from the telephony server, one record per cell.
 class UMTSSet final : public SectionDecoder {
  public:
   explicit UMTSSet(CellMonitorReader& cellMonitor);

@@ -7,8 +7,8 @@
 
 namespace varnel {
 
-/// The connected-mode intra-frequency measurement, log code 0xB179: the serving cell, then the neighbour
-/// records, then the detected-cell records.
+/// The connected-mode intra-frequency measurement, log code 0xB179: the serving cell, then the records of
+/// neighbors, then the records of detected cells.
 namespace connectedModeMeasurement {
 
 inline constexpr std::uint32_t logCode = 0xB179;

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The detected cells of the connected-mode intra-frequency measurement, a row each.
+/// The detected cells of the connected-mode intra-frequency measurement, one record per cell.
 class DetectedCells final : public SectionDecoder {
  public:
   DetectedCells();

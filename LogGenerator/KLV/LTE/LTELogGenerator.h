@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The generator of LTE modems: template "LTE", decoders of `LTEClassIndex`.
+/// The generator of LTE modems, with the template "LTE" and the decoders of `LTEClassIndex`.
 class LTELogGenerator final : public KLVLogGenerator2 {
  public:
   explicit LTELogGenerator(const Services& services);

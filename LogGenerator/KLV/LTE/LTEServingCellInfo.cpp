@@ -10,7 +10,7 @@ namespace {
 
 constexpr std::uint32_t transmitAntennasLogCode = 0xB0C1;
 
-// Channel bandwidths by their resource blocks, 3GPP TS 36.101, 5.6.
+// Channel bandwidths by their number of resource blocks, 3GPP TS 36.101, 5.6.
 constexpr Choice bandwidths[] = {
     {6, "1.4 MHz"}, {15, "3 MHz"}, {25, "5 MHz"}, {50, "10 MHz"}, {75, "15 MHz"}, {100, "20 MHz"},
 };
@@ -52,7 +52,7 @@ void showIdentity(Section& section, const Packet& packet) {
 
 void showTransmitAntennas(Section& section, const Packet& packet) {
   section.show(packet, transmitAntennas);
-  // Kept: the code is known and has just been shown, and is reported all the same.
+  // Kept: the code is known, and the packet was shown. It is reported as unknown nevertheless.
   logUnknownCode(transmitAntennasLogCode);
 }
 

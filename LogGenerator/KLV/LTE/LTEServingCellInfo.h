@@ -4,8 +4,8 @@
 
 namespace varnel {
 
-/// The LTE serving cell, put together from two modem packets and the telephony server's cell-monitor array. A
-/// row keeps its last value until a packet that carries it arrives again.
+/// The LTE serving cell, from two modem packets and the telephony server's cell-monitor array. An entry keeps
+/// its last value until a packet with this entry arrives.
 class LTEServingCellInfo final : public SectionDecoder {
  public:
   LTEServingCellInfo();

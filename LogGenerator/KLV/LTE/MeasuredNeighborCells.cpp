@@ -16,7 +16,7 @@ constexpr Field neighbor[] = {
 void update(Section& section, const Packet& packet) {
   using namespace connectedModeMeasurement;
   const std::uint8_t count = neighborCount(packet);
-  // Kept: both sizes are cut to 8 bits, and the actual one counts the header of the packet too.
+  // Kept: both sizes are cut to 8 bits, and the actual size includes the packet's header.
   const auto expected = static_cast<std::uint8_t>(count * neighborSize);
   const auto actual = static_cast<std::uint8_t>(packet.size() - detectedCellSize * detectedCellCount(packet));
   section.refill([&](Array& cells) {

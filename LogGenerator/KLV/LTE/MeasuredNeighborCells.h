@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The neighbour cells of the connected-mode intra-frequency measurement, a row each.
+/// The neighbor cells of the connected-mode intra-frequency measurement, one record per cell.
 class MeasuredNeighborCells final : public SectionDecoder {
  public:
   MeasuredNeighborCells();

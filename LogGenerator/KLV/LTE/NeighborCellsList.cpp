@@ -9,7 +9,7 @@ namespace {
 
 constexpr std::size_t recordSize = 20;
 
-// Kept: half a decibel a step, twice what the serving cell's RSRP has.
+// Kept: half a decibel per step. The serving cell's RSRP has a quarter.
 constexpr Format level = real("%4.2f dBm", 0.5, -140.0);
 constexpr Format quality = real("%4.2f dB", 0.25, -30.0);
 constexpr Source antennaFrame = bits(12, 0, 11);
@@ -31,7 +31,7 @@ constexpr Field cell[] = {
     {antennaSample, "Ant 1 Sample Offset"},
 };
 
-// Kept: five of the values are traced under one label.
+// Kept: five values are traced under one label.
 void trace(const Packet& record) {
   if (!logTakes(logWarningPriority)) return;
   logWarning("Physical Cell ID: %d\n", record.bits(0, 0, 9));
@@ -44,7 +44,7 @@ void trace(const Packet& record) {
 
 void update(Section& section, const Packet& packet) {
   section.refill([&](Array& cells) {
-    // The field holds the number of cells less one.
+    // The field holds the number of cells minus one.
     const std::uint32_t count = packet.bits(19, 6, 5) + 1;
     logWarning("Number of neighboring cells being reported: %d\n", count);
     for (std::uint32_t i = 0; i < count; ++i) {

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The cells of the idle-mode neighbour measurement, a row each.
+/// The cells of the idle-mode neighbor measurement, one record per cell.
 class NeighborCellsList final : public SectionDecoder {
  public:
   NeighborCellsList();

@@ -5,7 +5,7 @@
 
 namespace varnel {
 
-/// The idle-mode neighbour measurement, log code 0xB180: one frequency, then its cells.
+/// The idle-mode neighbor measurement, log code 0xB180: one frequency, then its cells.
 namespace neighborMeasurement {
 
 inline constexpr std::uint32_t logCode = 0xB180;

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// What the idle-mode neighbour measurement says of its frequency.
+/// The frequency of the idle-mode neighbor measurement.
 class NeighborMeasurementMisc final : public SectionDecoder {
  public:
   NeighborMeasurementMisc();

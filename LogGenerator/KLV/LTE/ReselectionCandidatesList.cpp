@@ -15,7 +15,7 @@ constexpr std::size_t typeOffset = 2;
 
 constexpr Choice types[] = {{0, "LTE"}, {1, "UTRAN"}, {2, "GERAN"}, {3, "CDMA1XRTT"}, {4, "CDMAHRPD"}};
 
-// What every candidate begins with.
+// The first fields of every candidate.
 constexpr Field candidate[] = {
     {u16(0), "Candidate Priority"},
     {u16(typeOffset), "Candidate RAT Type", choice(types, "??")},
@@ -39,7 +39,7 @@ constexpr Field cdmaCell[] = {
     {u16(10), "Pilot"},
 };
 
-// The rest of a candidate, by its radio access technology.
+// The other fields of a candidate, which depend on its radio access technology.
 struct Cell {
   std::span<const Field> fields;
   std::size_t size;
@@ -51,10 +51,10 @@ constexpr Cell cells[] = {
 
 void update(Section& section, const Packet& packet) {
   section.refill([&](Array& candidates) {
-    // Kept: only the count's low byte counts.
+    // Kept: only the low byte of the count is read.
     const std::uint8_t count = packet.u8(countOffset);
     for (std::size_t i = 0; i < count; ++i) {
-      // Kept: records start every 4 bytes and are read further than that, so they overlap.
+      // Kept: a record starts every 4 bytes, but records are longer, so they overlap.
       const Packet source = packet.from(reselectionCandidates::minimumSize + recordStride * i);
       const std::uint16_t type = source.u16(typeOffset);
       const Cell cell = type < std::size(cells) ? cells[type] : Cell{};

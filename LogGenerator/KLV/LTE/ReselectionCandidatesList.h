@@ -4,7 +4,8 @@
 
 namespace varnel {
 
-/// The candidates of the idle-mode reselection report, of any radio access technology, a row each.
+/// The candidates of the idle-mode reselection report, of any radio access technology, one record per
+/// candidate.
 class ReselectionCandidatesList final : public SectionDecoder {
  public:
   ReselectionCandidatesList();

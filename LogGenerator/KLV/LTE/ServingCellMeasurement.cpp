@@ -25,12 +25,12 @@ constexpr Field measurement[] = {
     {bits(25, 0, 9), "Measured RSSI", rssi},
     {bits(26, 1, 6), "Qrxlevmin", integer("%d dBm", 2, -140)},
     {bits(26, 7, 7), "P_Max", power},
-    // Kept: six bits never reach 64.
+    // Kept: a value of six bits never reaches 64, so "Not Present" never shows.
     {bits(27, 6, 6), "Max UE Tx Power", power},
     {bits(29, 0, 7), "Srxlev", integer("%d dBm", 1, -30)},
     {bits(29, 7, 6), "Num of Consecutive DRX Cycles of S < 0"},
     {bits(30, 5, 6), "S Intra Search", integer("%d dB", 2).unless(32, "Not Present")},
-    // Kept: this threshold is a difference like the one above, and shows dBm all the same.
+    // Kept: this threshold is a difference, like the one above, but shows dBm.
     {bits(31, 3, 6), "S Non Intra Search", integer("%d dBm", 2).unless(32, "Not Present")},
     {bits(32, 1, 1), "Measurement Rules Updated", choice(truth, "True")},
     {bits(32, 2, 4), "Measurement Rules"},

@@ -11,7 +11,7 @@ constexpr std::uint32_t pdpContextsLogCode = 0xFF0002;
 
 std::vector<std::uint32_t> PDPContextList::getLogCodeArray() const { return {pdpContextsLogCode}; }
 
-// Kept: the code is not looked at. Whatever arrives here is taken for a list of contexts.
+// Kept: the log code is ignored. Every packet is taken as a list of contexts.
 void PDPContextList::updateWithData_logCode(const Packet& packet, std::uint32_t /*logCode*/) {
   logWarning("PDPContextList");
   const auto payload = readPropertyList(packet.payload());

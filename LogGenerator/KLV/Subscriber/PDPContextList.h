@@ -4,8 +4,7 @@
 
 namespace varnel {
 
-/// The active packet-data contexts: always the last array that the telephony server sent. What is no array is
-/// ignored.
+/// The active packet-data contexts: the last array from the telephony server. Other payloads are ignored.
 class PDPContextList final : public Base {
  public:
   std::string_view getSectionName() const override { return "PDP Context Info"; }

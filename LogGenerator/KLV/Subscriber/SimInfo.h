@@ -4,10 +4,10 @@
 
 namespace varnel {
 
-/// Names of the log code of the telephony server's SIM-file messages.
+/// Names for the log code of the telephony server's SIM files.
 namespace LogCode_0xFF0000 {
 
-/// Raised for a SIM payload that cannot be read. Nobody catches it: the program ends.
+/// Raised for a SIM payload that cannot be read. No code catches it, so the program ends.
 class UnknownDataException : public std::exception {
  public:
   const char* what() const noexcept override { return "LogCode_0xFF0000::UnknownDataException"; }
@@ -15,8 +15,8 @@ class UnknownDataException : public std::exception {
 
 }  // namespace LogCode_0xFF0000
 
-/// The SIM card's elementary files (3GPP TS 31.102), as the telephony server formats them. Rows accumulate: a
-/// message replaces those that it carries and leaves the others.
+/// The SIM card's elementary files (3GPP TS 31.102), as the telephony server formats them. Entries
+/// accumulate: a message replaces the entries that it has, and leaves the others.
 class SimInfo final : public Base {
  public:
   std::string_view getSectionName() const override { return "SIM Info"; }

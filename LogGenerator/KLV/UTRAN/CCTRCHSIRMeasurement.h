@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The signal-to-interference ratios of the coded composite transport channels, a row each.
+/// The signal-to-interference ratios of the coded composite transport channels, one record per channel.
 class CCTRCHSIRMeasurement final : public SectionDecoder {
  public:
   CCTRCHSIRMeasurement();

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The GSM neighbour cells of a UTRAN modem, a row each.
+/// The GSM neighbor cells of a UTRAN modem, one record per cell.
 class GSMNeighbhorMeasurements final : public SectionDecoder {
  public:
   GSMNeighbhorMeasurements();

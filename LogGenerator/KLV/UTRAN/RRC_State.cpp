@@ -22,7 +22,7 @@ std::uint8_t rrcMode(const Packet& packet) {
 }
 
 void update(Section& section, const Packet& packet) {
-  // Kept: "is length is". A short packet is only warned of, and then decoded as far as it goes.
+  // Kept: "is length is". A packet that is too short is decoded nevertheless.
   if (packet.size() < expectedSize) {
     logWarning("LogCode_0xD0E0 is length is %ld expected size %ld", packet.size(), expectedSize);
   }

@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The block error rates of the transport channels, a row each.
+/// The block error rates of the transport channels, one record per channel.
 class TRCHBLERMeasurement final : public SectionDecoder {
  public:
   TRCHBLERMeasurement();

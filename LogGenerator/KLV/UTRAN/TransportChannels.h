@@ -7,7 +7,8 @@
 
 namespace varnel {
 
-/// Measurements of the transport channels (TrCH) and of the coded composite ones (CCTrCH), log code 0xD00C.
+/// Measurements of the transport channels (TrCH) and of the coded composite transport channels (CCTrCH), log
+/// code 0xD00C.
 namespace transportChannels {
 
 inline constexpr std::uint32_t logCode = 0xD00C;
@@ -18,7 +19,7 @@ inline constexpr std::size_t compositeChannelSize = 8;
 
 inline std::uint32_t transportChannelCount(const Packet& packet) { return packet.bits(14, 6, 6); }
 inline std::uint32_t compositeChannelCount(const Packet& packet) { return packet.bits(15, 4, 4); }
-// Kept: not right behind the transport channels.
+// Kept: they do not directly follow the transport channels.
 inline std::size_t firstCompositeChannel(const Packet& packet) {
   return 289 + 34 * transportChannelCount(packet);
 }

@@ -15,7 +15,7 @@ bool containsUTRAN(std::string_view path) {
   return std::search(path.begin(), path.end(), name.begin(), name.end(), equalInAnyCase) != path.end();
 }
 
-// The file name without folders and extension; empty when no resource has the name in its path.
+// The file name without folders and extension; empty when the path of no resource has the name.
 std::string templateName(const Resources& resources) {
   const auto paths = resources.propertyListPaths();
   const auto found = std::ranges::find_if(paths, containsUTRAN);
@@ -43,7 +43,7 @@ std::unique_ptr<LogGenerator> UTRANLogGenerator::generator(const Services& servi
   return std::make_unique<UTRANLogGenerator>(services);
 }
 
-// Whatever its name was to be: this is the one that ships.
+// This is the template that ships, since it is not known which name was wanted.
 std::optional<std::string> UTRANLogGenerator::missingTemplate() const {
   return KLVLogGenerator2::missingTemplate() ? std::optional("UTRAN.plist") : std::nullopt;
 }

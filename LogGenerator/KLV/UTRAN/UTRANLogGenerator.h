@@ -4,8 +4,8 @@
 
 namespace varnel {
 
-/// The generator of UTRAN modems: the first template resource with "UTRAN" in its path, in any letter case,
-/// and the decoders of `UTRANClassIndex`. Without such a resource it decodes nothing.
+/// The generator of UTRAN modems, with the decoders of `UTRANClassIndex`. Its template is the first resource
+/// with "UTRAN" in its path, in any letter case. Without such a resource it decodes nothing.
 class UTRANLogGenerator final : public KLVLogGenerator2 {
  public:
   explicit UTRANLogGenerator(const Services& services);

@@ -6,7 +6,7 @@ namespace varnel {
 
 namespace {
 
-// Kept: the records start here, however many there are.
+// Kept: the records always start here, whatever their number.
 constexpr std::size_t firstRecord = 168;
 constexpr std::size_t recordSize = 16;
 
@@ -27,7 +27,7 @@ void update(Section& section, const Packet& packet) {
   section.refill([&](Array& cells) {
     addRecords(cells, packet, {firstRecord, recordSize, count}, cell);
     for (const Value& record : cells) {
-      // A cell of no known set has no status.
+      // A cell of an unknown set has no status.
       if (record.dictionary()->get(membershipEntry).string()->empty())
         record.dictionary()->remove(membershipEntry);
     }

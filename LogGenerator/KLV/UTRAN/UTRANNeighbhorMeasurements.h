@@ -4,7 +4,7 @@
 
 namespace varnel {
 
-/// The UTRAN neighbour cells, a row each.
+/// The UTRAN neighbor cells, one record per cell.
 class UTRANNeighbhorMeasurements final : public SectionDecoder {
  public:
   UTRANNeighbhorMeasurements();

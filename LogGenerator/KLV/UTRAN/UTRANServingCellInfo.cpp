@@ -32,12 +32,12 @@ constexpr CellMonitorEntry cellMonitorEntries[] = {
 void showCells(Section& section, const Packet& packet) {
   const auto cells = readCellMonitorArray(packet);
   if (!cells) return;
-  // Every serving cell is shown in turn, so the last one stays.
+  // Shows every serving cell in turn, so the last one stays.
   for (const Value& record : *cells->array()) {
     const Dictionary* cell = cellOfKind(record, cellMonitor::utran, cellMonitor::serving);
     if (!cell) continue;
     showCell(section, *cell, cellMonitorEntries);
-    // Kept: the one channel number goes into both entries.
+    // Kept: the same channel number goes into both entries.
     if (const auto channel = cell->get(cellMonitor::uarfcn).int32())
       section.setText("Downlink UARFCN", std::to_string(*channel));
   }

@@ -4,8 +4,7 @@
 
 namespace varnel {
 
-/// The UTRAN serving cell, put together from the modem's packets and the telephony server's cell-monitor
-/// array.
+/// The UTRAN serving cell, from the modem's packets and the telephony server's cell-monitor array.
 class UTRANServingCellInfo final : public SectionDecoder {
  public:
   UTRANServingCellInfo();

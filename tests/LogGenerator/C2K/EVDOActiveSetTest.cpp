@@ -14,7 +14,7 @@ struct Pilot {
   std::uint16_t pn, strength;
 };
 
-// What the decoder does not read is 0xFF.
+// Bytes that the decoder does not read are 0xFF.
 Bytes activeSet(const std::vector<Pilot>& pilots) {
   PacketBuilder packet(0x12B6, 25 + 12 * pilots.size());
   packet.fill(0xFF).u8(15, static_cast<std::uint8_t>(pilots.size()));

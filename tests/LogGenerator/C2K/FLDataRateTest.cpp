@@ -22,7 +22,7 @@ class FLDataRateTest : public C2KTest {
     for (const char* key : {"RLDataSeqNum", "RLDataSent"}) state.remove(key);
     *extraInfo.dictionary() = {};
   }
-  // What the second of two packets shows.
+  // The rate that the second of two packets shows.
   std::string rate(const PacketBuilder& first, const PacketBuilder& second) {
     state.remove("FLDataSeqNum");
     state.remove("FLDataSent");

@@ -14,7 +14,7 @@ struct Finger {
   std::uint16_t pn, c2i;
 };
 
-// What the decoder does not read is 0xFF.
+// Bytes that the decoder does not read are 0xFF.
 Bytes fingers(const std::vector<Finger>& list) {
   PacketBuilder packet(0x108A, 23 + 14 * list.size());
   packet.fill(0xFF).u8(22, static_cast<std::uint8_t>(list.size()));

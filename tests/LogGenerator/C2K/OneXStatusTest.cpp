@@ -12,7 +12,7 @@ using testing::IsEmpty;
 
 constexpr std::uint8_t ss = 1, rf = 2, ai = 3, fi = 4;
 
-// Sub-packets of a status: system state, RF, active-set info, finger info. What is not read is 0xFF.
+// Subpackets of a status: system state, RF, active-set info, finger info. Bytes that are not read are 0xFF.
 SubpacketBuilder& addSystemState(SubpacketBuilder& packet, std::uint8_t deviceState) {
   return packet.add(ss, 8).fill(0xFF).u8(4, deviceState);
 }
@@ -41,7 +41,7 @@ SubpacketBuilder& addActiveSet(SubpacketBuilder& packet) {
       .u16(24, 9);
 }
 
-// 77 bytes: the sub-packets begin at 17, 25, 41 and 69.
+// 77 bytes: the subpackets begin at 17, 25, 41 and 69.
 SubpacketBuilder status(std::uint8_t deviceState) {
   SubpacketBuilder packet(0x119C);
   addSystemState(packet, deviceState);
@@ -68,7 +68,7 @@ std::string missing(int systemState, int radio, int activeSet, int finger) {
 
 class OneXStatusTest : public C2KTest {
  protected:
-  // A status in traffic whose RF sub-packet has one value of its own.
+  // A status in traffic whose RF subpacket has one value of its own.
   std::string shownOfRF8(std::size_t offset, std::uint8_t value, std::string_view variable) {
     Bytes packet = status(traffic).bytes();
     packet[25 + offset] = value;
@@ -184,7 +184,7 @@ TEST_F(OneXStatusTest, TheTransmitPowerIsInTenthsOfADecibel) {
   EXPECT_EQ(shown(0x8000), R"("-3276.80 dBm")");
 }
 
-// The sub-packets and the walk over them.
+// The subpackets and the walk over them.
 
 TEST_F(OneXStatusTest, A16BytePacketIsTooShortAndA17ByteOneLacksItsSubpackets) {
   expectRefused(PacketBuilder(0x119C, 16).u8(14, 1).bytes(),

@@ -11,14 +11,15 @@ using testing::IsEmpty;
 
 constexpr const char* missing = "<4>Log code 0x119d: missing traffic demod subpacket.";
 
-// 42 bytes: the sub-packet begins at 17, the frame-erasure flag is the last byte. What is not read is 0xFF.
+// 42 bytes: the subpacket begins at 17, the frame-erasure flag is the last byte. Bytes that are not read are
+// 0xFF.
 SubpacketBuilder demodulation(std::uint8_t erasureFlag) {
   return SubpacketBuilder(0x119D).add(11, 25).fill(0xFF).u8(24, erasureFlag);
 }
 Bytes goodFrame() { return demodulation(0).bytes(); }
 Bytes erasedFrame() { return demodulation(1).bytes(); }
 
-// A status outside traffic, with its four sub-packets.
+// A status outside traffic, with its four subpackets.
 Bytes idleStatus() { return SubpacketBuilder(0x119C).add(1, 5).add(2, 14).add(3, 12).add(4, 4).bytes(); }
 
 class OneXTrafficFERTest : public C2KTest {
@@ -110,7 +111,7 @@ TEST_F(OneXTrafficFERTest, LeavingTrafficMakesTheNextCallStartAfresh) {
   EXPECT_EQ(published(erasedFrame()), R"({k1xTrafficFER: "1.56%"})");
 }
 
-// The sub-packet.
+// The subpacket.
 
 TEST_F(OneXTrafficFERTest, A16BytePacketIsTooShortAndA17ByteOneLacksItsSubpacket) {
   expectRefused(PacketBuilder(0x119D, 16).u8(14, 1).bytes(),
@@ -165,7 +166,7 @@ TEST_F(OneXTrafficFERTest, ASubpacketMayEndUpTo16BytesPastThePacketAndNoFurther)
 }
 
 TEST_F(OneXTrafficFERTest, TheWalkMayStepPastTheEndWhereAllBytesRead0) {
-  // The first sub-packet ends 16 bytes past the packet; what is there has id 0 and size 0.
+  // The first subpacket ends 16 bytes past the packet; what is there has id 0 and size 0.
   expectRefused(SubpacketBuilder(0x119D).add(1, 25, 41).count(255).bytes(), missing);
 }
 

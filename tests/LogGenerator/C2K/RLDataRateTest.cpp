@@ -16,7 +16,7 @@ PacketBuilder reverse(std::uint32_t sequence, std::uint32_t firstCounter) {
 
 class RLDataRateTest : public C2KTest {
  protected:
-  // What the second of two packets shows.
+  // The rate that the second of two packets shows.
   std::string rate(const PacketBuilder& first, const PacketBuilder& second) {
     state.remove("RLDataSeqNum");
     state.remove("RLDataSent");

@@ -9,7 +9,7 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-// What the decoder does not read is 0xFF.
+// Bytes that the decoder does not read are 0xFF.
 PacketBuilder systemInfo(std::size_t size = 186) {
   PacketBuilder packet(0x134F, size);
   packet.fill(0xFF).u8(13, 2).u32(42, 6).u32(46, 2).u16(50, 4139).u16(52, 0x0102).u8(131, 3).u8(133, 6);

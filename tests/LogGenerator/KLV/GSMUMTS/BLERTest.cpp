@@ -20,7 +20,7 @@ class BLERTest : public RowsDecoderTest<BLER, blocksCode> {
   }
 };
 
-// A packet of zeros that announces channels.
+// A packet of zeros with a count of channels.
 PacketBuilder counted(std::uint8_t channels, std::size_t size) {
   PacketBuilder packet(blocksCode, size);
   packet.u8(13, channels);

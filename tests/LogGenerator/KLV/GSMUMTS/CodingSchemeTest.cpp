@@ -8,7 +8,7 @@ namespace {
 struct CodingSchemeSubject {
   using Decoder = CodingScheme;
   static constexpr const char* sectionName = "Coding Scheme";
-  // The sibling's text.
+  // The text of its sibling.
   static constexpr const char* trace = "<4>CellChangeCounters";
   static Value emptySection() { return Value::ofDictionary(); }
 };

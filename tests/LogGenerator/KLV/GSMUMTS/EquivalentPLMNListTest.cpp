@@ -13,7 +13,7 @@ constexpr const char* trace = "<4>Equivalent PLMN List";
 
 using EquivalentPLMNListTest = ListDecoderTest<EquivalentPLMNList, networksCode>;
 
-// A packet of zeros that announces networks.
+// A packet of zeros with a count of networks.
 PacketBuilder counted(std::uint8_t networks, std::size_t size) {
   PacketBuilder packet(networksCode, size);
   packet.u8(16, networks);

@@ -13,7 +13,7 @@ constexpr const char* trace = "<4>GSMSet";
 
 using GSMSetTest = ListDecoderTest<GSMSet, rankingCode>;
 
-// A packet of zeros that announces GSM cells.
+// A packet of zeros with a count of GSM cells.
 PacketBuilder counted(std::uint8_t cells, std::size_t size) {
   PacketBuilder packet(rankingCode, size);
   packet.u8(14, cells);

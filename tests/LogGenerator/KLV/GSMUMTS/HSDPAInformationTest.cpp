@@ -17,7 +17,7 @@ class HSDPAInformationTest : public RowsDecoderTest<HSDPAInformation, processesC
   const Array& secondary() const { return *section.dictionary()->get("Secondary HARQ Process").array(); }
 };
 
-// A packet of zeros that announces primary and secondary processes.
+// A packet of zeros with a count of primary and secondary processes.
 PacketBuilder counted(std::uint8_t primary, std::uint8_t secondary, std::size_t size) {
   PacketBuilder packet(processesCode, size);
   packet.u8(16, primary).u8(17, secondary);

@@ -70,7 +70,7 @@ Value realTemplate() {
   return readPropertyList(bytes).value_or(Value());
 }
 
-// What stands under the key, at any depth.
+// All values under the key, at any depth.
 void collect(const Value& value, std::string_view key, std::vector<Value>& found) {
   if (const Array* array = value.array()) {
     for (const Value& element : *array) collect(element, key, found);

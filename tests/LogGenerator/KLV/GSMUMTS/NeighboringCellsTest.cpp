@@ -18,14 +18,14 @@ constexpr const char* noArray = "<3>Failed to get Cell Array\n";
 constexpr const char* noArfcn = "<3>NeighboringCells: Failed to retrieve ARFCN\n";
 constexpr const char* noRssi = "<3>NeighboringCells: Failed to retrieve RSSI\n";
 
-// A packet of zeros that announces neighbours.
+// A packet of zeros with a count of neighbors.
 PacketBuilder counted(std::uint8_t neighbors, std::size_t size) {
   PacketBuilder packet(measurementCode, size);
   packet.u8(28, neighbors);
   return packet;
 }
 
-// Two neighbours whose fields all differ, in a sea of bytes that no row may show.
+// Two neighbors whose fields all differ, among other bytes that must not be shown.
 Bytes twoNeighbors() {
   return PacketBuilder(measurementCode, 57)
       .fill(0xEE)
@@ -49,7 +49,7 @@ struct Color {
   std::uint8_t bsic;
 };
 
-// A list of BSICs in a sea of bytes that must not count.
+// A list of BSICs among other bytes that must not count.
 Bytes colors(const std::vector<Color>& list) {
   PacketBuilder packet(colorCode, 15 + 4 * list.size());
   packet.fill(0xEE).u8(14, static_cast<std::uint8_t>(list.size()));
@@ -69,12 +69,12 @@ class NeighboringCellsTest : public ListDecoderTest<NeighboringCells, measuremen
  protected:
   void decodeColors(const std::vector<Color>& list) { decode(colors(list), colorCode); }
   void decodeCells(Array records) { decode(cellMonitorMessage(std::move(records)), cellMonitorCode); }
-  /// The BSIC that a single neighbour of that ARFCN shows.
+  /// The BSIC that a single neighbor of that ARFCN shows.
   std::string bsicOf(std::uint16_t arfcn) {
     decode(counted(1, 43).u16(29, arfcn).bytes());
     return shown("BSIC");
   }
-  /// Expects the message to empty a filled list and to log these lines only.
+  /// Expects the message to empty a filled list and to log only these lines.
   void expectEmptied(const Bytes& message, const std::vector<std::string>& lines) {
     putOldContent();
     log.take();

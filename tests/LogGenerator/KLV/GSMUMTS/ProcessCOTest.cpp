@@ -11,7 +11,7 @@ using testing::ElementsAre;
 
 constexpr std::uint32_t mobilityCode = 0x7131;
 constexpr std::uint32_t registrationCode = 0x7132;
-// The sibling's text.
+// The text of its sibling.
 constexpr const char* trace = "<4>ProcessCS";
 
 using ProcessCOTest = RowsDecoderTest<ProcessCO, mobilityCode>;

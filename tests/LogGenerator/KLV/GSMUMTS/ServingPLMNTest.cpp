@@ -29,7 +29,7 @@ class ServingPLMNTest : public RowsDecoderTest<ServingPLMN, identityCode> {
   }
 };
 
-// A network whose fields all differ, in a sea of bytes that no row may show.
+// A network whose fields all differ, among other bytes that must not be shown.
 Bytes identity(std::size_t size = 32) {
   return PacketBuilder(identityCode, size)
       .fill(0xEE)

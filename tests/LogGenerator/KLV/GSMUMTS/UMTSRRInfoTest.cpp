@@ -26,7 +26,7 @@ Bytes state(std::uint8_t value, std::size_t size = 14) {
   return PacketBuilder(stateCode, size).fill(0xEE).u8(13, value).bytes();
 }
 
-// A packet of samples in a sea of bytes that must not count.
+// A packet of samples among other bytes that must not count.
 Bytes powers(const std::vector<std::int16_t>& samples) {
   PacketBuilder packet(powerCode, 16 + 14 * samples.size());
   packet.fill(0x55).u8(14, static_cast<std::uint8_t>(samples.size()));

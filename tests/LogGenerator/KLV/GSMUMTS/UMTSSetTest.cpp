@@ -22,7 +22,7 @@ constexpr const char* noEnergy = "<3>UMTSSet: Failed to retrieve Energy Per Chip
 class UMTSSetTest : public ListDecoderTest<UMTSSet, rankingCode> {
  protected:
   void decodeCells(Array records) { decode(cellMonitorMessage(std::move(records)), cellMonitorCode); }
-  /// Expects the message to empty a filled list and to log these lines only.
+  /// Expects the message to empty a filled list and to log only these lines.
   void expectEmptied(const Bytes& message, const std::vector<std::string>& lines) {
     putOldContent();
     log.take();
@@ -32,7 +32,7 @@ class UMTSSetTest : public ListDecoderTest<UMTSSet, rankingCode> {
   }
 };
 
-// A packet of zeros that announces UMTS cells.
+// A packet of zeros with a count of UMTS cells.
 PacketBuilder counted(std::uint8_t cells, std::size_t size) {
   PacketBuilder packet(rankingCode, size);
   packet.u8(13, cells);

@@ -13,7 +13,7 @@ constexpr const char* trace = "<4>Connected mode LTE Intra-frequency Measurement
 
 using ConnectedModeMeasurementMiscTest = RowsDecoderTest<ConnectedModeMeasurementMisc, reportCode>;
 
-// Fields that all differ, in a sea of bytes that no row may show.
+// Fields that all differ, among other bytes that must not be shown.
 Bytes report(std::size_t size = 29) {
   return PacketBuilder(reportCode, size)
       .fill(0xEE)

@@ -13,14 +13,14 @@ constexpr const char* trace = "<4>Detected Cells";
 
 using DetectedCellsTest = ListDecoderTest<DetectedCells, reportCode>;
 
-// A report that announces neighbours and detected cells, in a sea of bytes that no row may show.
+// A report that announces neighbors and detected cells, among other bytes that must not be shown.
 PacketBuilder report(std::uint8_t neighbors, std::uint8_t detected, std::size_t size) {
   PacketBuilder packet(reportCode, size);
   packet.fill(0xEE).u8(27, neighbors).u8(28, detected);
   return packet;
 }
 
-// Two neighbours, then three detected cells.
+// Two neighbors, then three detected cells.
 Bytes threeDetected() { return report(2, 3, 47).u16(41, 301).u16(43, 2).u16(45, 65000).bytes(); }
 
 TEST_F(DetectedCellsTest, FillsItsSectionFromOneCode) {

@@ -42,7 +42,7 @@ class LTEServingCellInfoTest : public testing::Test {
   Value section = Value::ofDictionary();
 };
 
-// A packet whose fields all differ, in a sea of bytes that no field may touch.
+// A packet whose fields all differ, among other bytes that must not be shown.
 Bytes identity(std::size_t size = 38) {
   return PacketBuilder(identityCode, size)
       .fill(0xEE)

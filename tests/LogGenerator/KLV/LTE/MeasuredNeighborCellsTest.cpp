@@ -13,14 +13,14 @@ constexpr const char* trace = "<4>Measured Neighbor Cells";
 
 using MeasuredNeighborCellsTest = ListDecoderTest<MeasuredNeighborCells, reportCode>;
 
-// A report that announces neighbours and detected cells; all else is zero.
+// A report with a count of neighbors and detected cells. All other bytes are 0.
 PacketBuilder report(std::uint8_t neighbors, std::uint8_t detected, std::size_t size) {
   PacketBuilder packet(reportCode, size);
   packet.u8(27, neighbors).u8(28, detected);
   return packet;
 }
 
-// Three neighbours and two detected cells, in a sea of bytes that no row may show.
+// Three neighbors and two detected cells, among other bytes that must not be shown.
 Bytes threeNeighbors() {
   return PacketBuilder(reportCode, 51)
       .fill(0xEE)

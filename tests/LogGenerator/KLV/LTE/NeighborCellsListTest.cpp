@@ -20,7 +20,7 @@ PacketBuilder counted(std::uint8_t byte19, std::uint8_t byte20, std::size_t size
   return packet;
 }
 
-// A cell whose fields all differ; the bits that no row shows are set.
+// A cell whose fields all differ; all bits that are not shown are set.
 void putFirstCell(PacketBuilder& packet, std::size_t at) {
   packet.u8(at, 0x2D)
       .u8(at + 1, 0x37)

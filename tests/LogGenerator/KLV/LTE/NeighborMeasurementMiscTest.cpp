@@ -13,7 +13,7 @@ constexpr const char* trace = "<4>Neighbor Measurements";
 
 using NeighborMeasurementMiscTest = RowsDecoderTest<NeighborMeasurementMisc, measurementCode>;
 
-// Fields that all differ; the bits that no row shows are set.
+// Fields that all differ; all bits that are not shown are set.
 Bytes measurement(std::size_t size = 21) {
   return PacketBuilder(measurementCode, size).fill(0xEE).u8(13, 3).u16(17, 3350).u8(19, 0xC6).bytes();
 }

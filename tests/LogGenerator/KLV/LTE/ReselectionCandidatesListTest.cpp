@@ -13,14 +13,14 @@ constexpr const char* trace = "<4>Reselection Candidates List";
 
 using ReselectionCandidatesListTest = ListDecoderTest<ReselectionCandidatesList, reselectionCode>;
 
-// A reselection that announces candidates; all else is zero.
+// A reselection with a count of candidates. All other bytes are 0.
 PacketBuilder reselection(std::uint16_t candidates, std::size_t size) {
   PacketBuilder packet(reselectionCode, size);
   packet.u16(19, candidates);
   return packet;
 }
 
-// One candidate of that type, in a sea of bytes that no row may show.
+// One candidate of that type, among other bytes that must not be shown.
 PacketBuilder candidate(std::uint16_t type, std::size_t size) {
   PacketBuilder packet(reselectionCode, size);
   packet.fill(0xEE).u16(19, 1).u16(21, 6).u16(23, type);

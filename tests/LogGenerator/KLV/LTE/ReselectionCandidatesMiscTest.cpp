@@ -13,7 +13,7 @@ constexpr const char* trace = "<4>Reselection Candidates";
 
 using ReselectionCandidatesMiscTest = RowsDecoderTest<ReselectionCandidatesMisc, reselectionCode>;
 
-// Fields that all differ, in a sea of bytes that no row may show.
+// Fields that all differ, among other bytes that must not be shown.
 Bytes reselection(std::size_t size = 21) {
   return PacketBuilder(reselectionCode, size).fill(0xEE).u8(13, 4).u16(15, 1300).u16(17, 301).bytes();
 }

@@ -15,7 +15,7 @@ using ServingCellMeasurementTest = RowsDecoderTest<ServingCellMeasurement, measu
 
 PacketBuilder zeros() { return PacketBuilder(measurementCode, 33); }
 
-// Fields that all differ; the bits that no row shows are set.
+// Fields that all differ; all bits that are not shown are set.
 Bytes measurement(std::size_t size = 33) {
   return PacketBuilder(measurementCode, size)
       .fill(0xEE)

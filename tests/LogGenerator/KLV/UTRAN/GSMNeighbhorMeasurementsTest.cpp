@@ -13,14 +13,14 @@ constexpr const char* trace = "<4>GSM Neighbor Cell List";
 
 using GSMNeighbhorMeasurementsTest = ListDecoderTest<GSMNeighbhorMeasurements, neighborsCode>;
 
-// A packet of zeros that announces cells.
+// A packet of zeros with a count of cells.
 PacketBuilder counted(std::uint8_t cells, std::size_t size) {
   PacketBuilder packet(neighborsCode, size);
   packet.u8(16, cells);
   return packet;
 }
 
-// Two cells whose fields all differ, in a sea of bytes that no row may show.
+// Two cells whose fields all differ, among other bytes that must not be shown.
 Bytes twoCells() {
   return PacketBuilder(neighborsCode, 33)
       .fill(0xEE)

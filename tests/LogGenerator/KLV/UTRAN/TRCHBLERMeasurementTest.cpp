@@ -13,14 +13,14 @@ constexpr const char* trace = "<5>TRCH BLER Measurement";
 
 using TRCHBLERMeasurementTest = ListDecoderTest<TRCHBLERMeasurement, channelsCode>;
 
-// A packet of zeros whose two bytes of counts are these.
+// A packet of zeros with these two count bytes.
 PacketBuilder counted(std::uint8_t byte14, std::uint8_t byte15, std::size_t size) {
   PacketBuilder packet(channelsCode, size);
   packet.u8(14, byte14).u8(15, byte15);
   return packet;
 }
 
-// Three channels, in a sea of bytes that no row may show.
+// Three channels, among other bytes that must not be shown.
 Bytes threeChannels() {
   return PacketBuilder(channelsCode, 23)
       .fill(0xEE)

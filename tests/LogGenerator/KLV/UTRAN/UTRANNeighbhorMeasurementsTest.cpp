@@ -13,7 +13,7 @@ constexpr const char* trace = "<4>NeighbhorMeasurements List";
 
 using UTRANNeighbhorMeasurementsTest = ListDecoderTest<UTRANNeighbhorMeasurements, neighborsCode>;
 
-// A packet of zeros with that byte of count.
+// A packet of zeros with this count byte.
 PacketBuilder counted(std::uint8_t byte16, std::size_t size) {
   PacketBuilder packet(neighborsCode, size);
   packet.u8(16, byte16);
@@ -23,7 +23,7 @@ PacketBuilder counted(std::uint8_t byte16, std::size_t size) {
 // One cell of zeros but for its fourth byte.
 Bytes cellOfByte3(std::uint8_t byte3) { return counted(2, 184).u8(171, byte3).bytes(); }
 
-// Two cells whose fields all differ, in a sea of bytes that no row may show.
+// Two cells whose fields all differ, among other bytes that must not be shown.
 Bytes twoCells() {
   return PacketBuilder(neighborsCode, 200)
       .fill(0xEE)

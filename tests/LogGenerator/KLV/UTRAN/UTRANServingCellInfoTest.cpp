@@ -21,7 +21,7 @@ class UTRANServingCellInfoTest : public RowsDecoderTest<UTRANServingCellInfo, ce
   }
 };
 
-// Fields that all differ; the bits that no row shows are set.
+// Fields that all differ; all bits that are not shown are set.
 Bytes servingCell(std::size_t size = 26) {
   return PacketBuilder(cellCode, size)
       .fill(0xEE)
