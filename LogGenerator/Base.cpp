@@ -66,6 +66,7 @@ void Base::updateSectionRef(const Value& section) {
 
 void Base::updateLogCodeDict(CodeDictionary& codeDict) {
   const auto codes = getLogCodeArray();
+  // Kept: the line does not say that it counts log codes.
   logWarning("Array Count: %d", static_cast<std::int32_t>(codes.size()));
   const auto ownHandlers = handlers();
   for (std::size_t i = 0; i < codes.size(); ++i)

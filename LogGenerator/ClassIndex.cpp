@@ -20,6 +20,7 @@ const CodeDictionary::Subscription* CodeDictionary::subscription(std::uint32_t c
   return found == _subscriptions.end() ? nullptr : &found->second;
 }
 
+// Kept: "Deallocing" is no word.
 ClassIndex::~ClassIndex() { _standardOutput << "Deallocing ClassIndex\n"; }
 
 Base* ClassIndex::getClass(std::string_view sectionName) const {
@@ -61,7 +62,7 @@ void ClassIndex::listNumberFormats(NumberFormats& formats) const {
 }
 
 void ClassIndex::status() const {
-  // The class dictionary has been a dictionary, and no string, ever since the compiler knows its type.
+  // Kept: the class dictionary is always a dictionary and never a string, and two lines say so.
   logWarning("Dictionary = %d", 1);
   logWarning("String = %d", 0);
 }

@@ -9,6 +9,7 @@ namespace {
 
 // This line must come before the log lines of the base classes.
 const Services& announceCreation(const Services& services, const ClassIndex* classIndex) {
+  // Kept: a success, logged as an error.
   logError("Creating KLVLogGenerator2 object with %p", static_cast<const void*>(classIndex));
   return services;
 }
@@ -20,6 +21,7 @@ KLVLogGenerator2::KLVLogGenerator2(const Services& services, std::string listNam
     : KLVLogGenerator(announceCreation(services, classIndex.get())),
       pListName(std::move(listName)),
       cIndex(std::move(classIndex)) {
+  // Kept: a success, logged as an error. The number is that of the owners of the class index.
   logError("Class Index: %ld", cIndex.use_count());
 }
 

@@ -36,7 +36,7 @@ class KLVLogGenerator2 : public KLVLogGenerator {
   Value getDisplayFromState(Dictionary& state);
   /// A copy of a template whose sections belong to their decoders.
   Value processTemplate(const Value& object);
-  /// Looks through a display and reports what is neither string nor container.
+  /// Reports values in a display that are neither strings nor containers. Kept: it prints nothing.
   static void printDict(const Value& object);
 
   std::string pListName;

@@ -16,7 +16,8 @@ namespace fs = std::filesystem;
 
 using Lines = std::vector<std::string>;
 
-constexpr const char* folders[] = {"app", "base", "host", "model", "platform", "programs", "widgets"};
+constexpr const char* folders[] = {"app",   "base",     "host",     "LogGenerator",
+                                   "model", "platform", "programs", "widgets"};
 
 constexpr std::string_view mark = "Kept:";
 constexpr std::size_t linesAbove = 3;  // above an oddity, in which its mark may be

@@ -6,6 +6,7 @@ namespace varnel {
 
 KLV_GSMClassIndex::KLV_GSMClassIndex(std::ostream& standardOutput) : ClassIndex(standardOutput) {}
 
+// Kept: "Deallocing" is no word.
 KLV_GSMClassIndex::~KLV_GSMClassIndex() { standardOutput() << "Deallocing KLV_GSMClassIndex\n"; }
 
 }  // namespace varnel

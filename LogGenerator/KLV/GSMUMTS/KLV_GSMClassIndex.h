@@ -51,6 +51,7 @@ class KLV_GSMClassIndex final : public ClassIndex {
   std::unique_ptr<PDPContextList> objPDPContextList = create<PDPContextList>();
   std::unique_ptr<ProcessPS> objProcessPS = create<ProcessPS>();
   std::unique_ptr<UMTSRRMeasurement> objUMTSRRMeasurement = create<UMTSRRMeasurement>();
+  // Kept: the name lacks its last s.
   std::unique_ptr<CellChangeCounters> objCellChangeCounter = create<CellChangeCounters>();
   std::unique_ptr<DetectedSet> objDetectedSet = create<DetectedSet>();
   std::unique_ptr<GSMSet> objGSMSet = create<GSMSet>();

@@ -8,6 +8,7 @@ namespace varnel {
 namespace {
 
 std::shared_ptr<ClassIndex> makeClassIndex(const Services& services) {
+  // Kept: a success, logged as an error.
   logError("Creating KLV_GSMLogGenerator object");
   return std::make_shared<KLV_GSMClassIndex>(services.standardOutput);
 }

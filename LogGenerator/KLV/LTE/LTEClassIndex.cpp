@@ -6,6 +6,7 @@ namespace varnel {
 
 LTEClassIndex::LTEClassIndex(std::ostream& standardOutput) : ClassIndex(standardOutput) {}
 
+// Kept: "Deallocing" is no word.
 LTEClassIndex::~LTEClassIndex() { standardOutput() << "Deallocing LTEClassIndex\n"; }
 
 }  // namespace varnel

@@ -8,6 +8,7 @@ namespace varnel {
 namespace {
 
 std::shared_ptr<ClassIndex> makeClassIndex(const Services& services) {
+  // Kept: a success, logged as an error.
   logError("Creating LTELogGenerator object");
   return std::make_shared<LTEClassIndex>(services.standardOutput);
 }

@@ -36,6 +36,7 @@ UTRANLogGenerator::UTRANLogGenerator(const Services& services)
 
 UTRANLogGenerator::UTRANLogGenerator(const Services& services, const std::string& listName)
     : KLVLogGenerator2(services, listName, makeClassIndex(services, listName)) {
+  // Kept: a success, logged as an error; and "Created", not "Creating".
   logError("Created UTRANLogGenerator object");
 }
 

@@ -40,6 +40,7 @@ constexpr PacketHandler packets[] = {
 
 }  // namespace
 
+// Kept: "Neighbhor" in the trace line has an h too many.
 UTRANNeighbhorMeasurements::UTRANNeighbhorMeasurements()
     : SectionDecoder("Neighbor Cell List", "NeighbhorMeasurements List", packets, UnknownCodes::Ignored) {}
 

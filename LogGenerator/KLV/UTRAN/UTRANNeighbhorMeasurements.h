@@ -5,6 +5,7 @@
 namespace varnel {
 
 /// The UTRAN neighbor cells, one record per cell.
+/// Kept: "Neighbhor" has an h too many.
 class UTRANNeighbhorMeasurements final : public SectionDecoder {
  public:
   UTRANNeighbhorMeasurements();
