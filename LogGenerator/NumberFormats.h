@@ -79,13 +79,13 @@ class SectionFormats {
 
   void add(std::string_view entry, const Format& format) { _formats.add(_section, entry, format); }
   /// Adds each field of a table, or each cell-monitor column.
-  template <class Row>
-  void add(std::span<const Row> table) {
-    for (const Row& row : table) add(row.label, row.format);
+  template <class Line>
+  void add(std::span<const Line> table) {
+    for (const Line& line : table) add(line.label, line.format);
   }
-  template <class Row, std::size_t size>
-  void add(const Row (&table)[size]) {
-    add(std::span<const Row>(table));
+  template <class Line, std::size_t size>
+  void add(const Line (&table)[size]) {
+    add(std::span<const Line>(table));
   }
 
  private:

@@ -51,7 +51,7 @@ class Dictionary {
     return position < _entries.size() && _entries[position].key == key;
   }
   const Value& at(std::size_t position) const { return _entries[position].value; }
-  /// To change the value, which never becomes the absent one.
+  /// The value at this position, for changing it. It must not become the absent value.
   Value& at(std::size_t position) { return _entries[position].value; }
 
   std::size_t size() const { return _entries.size(); }

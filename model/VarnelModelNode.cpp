@@ -19,14 +19,14 @@ using Node = std::shared_ptr<const VarnelModelNode>;
 using Children = VarnelModelNode::Children;
 
 // An entry of a dictionary as a child in the tree.
-struct Row {
+struct TreeEntry {
   std::string_view name;
   std::string_view key;
   const Value* value;
 };
 
 // The entries of a dictionary in the tree's order.
-std::vector<Row> rowsOf(const Dictionary& entries) {
+std::vector<TreeEntry> treeEntries(const Dictionary& entries) {
   std::vector<const Dictionary::Entry*> inOrder;
   inOrder.reserve(entries.size());
   for (const Dictionary::Entry& entry : entries) inOrder.push_back(&entry);
@@ -35,20 +35,20 @@ std::vector<Row> rowsOf(const Dictionary& entries) {
     std::ranges::sort(inOrder, {},
                       [](const Dictionary::Entry* entry) { return std::string_view(entry->key); });
 
-  std::vector<Row> rows;
-  rows.reserve(inOrder.size());
+  std::vector<TreeEntry> found;
+  found.reserve(inOrder.size());
   for (const Dictionary::Entry* entry : inOrder) {
     if (entry->key == sortMark) continue;
-    rows.push_back({isSorted ? displayNameOfSortedKey(entry->key) : entry->key, entry->key, &entry->value});
+    found.push_back({isSorted ? displayNameOfSortedKey(entry->key) : entry->key, entry->key, &entry->value});
   }
-  return rows;
+  return found;
 }
 
 class TreeBuilder {
  public:
   TreeBuilder(PathDictionary& paths, const WriteTimes& times) : _paths(paths), _times(times) {}
 
-  // What nobody keeps a time of is as old as what it stands in.
+  // An object without a time of its own has the time of its container.
   Node build(std::string_view name, const Value& object, const std::string& path,
              const std::optional<Time>& writtenAt = {}) {
     Node node = make(name, object, path, writtenAt);
@@ -74,10 +74,10 @@ class TreeBuilder {
 
   Children childrenOf(const Dictionary& entries, const std::string& path,
                       const std::optional<Time>& writtenAt) {
-    const std::vector<Row> rows = rowsOf(entries);
+    const std::vector<TreeEntry> inOrder = treeEntries(entries);
     Children children;
-    children.reserve(rows.size());
-    for (const auto& [name, key, value] : rows) {
+    children.reserve(inOrder.size());
+    for (const auto& [name, key, value] : inOrder) {
       const auto itsTime = _times.writtenAt(entries, key);
       children.push_back(build(name, *value, childPath(path, name), itsTime ? itsTime : writtenAt));
     }
@@ -107,11 +107,11 @@ std::optional<std::string_view> leafText(const Value& object) {
   return text ? std::string_view(*text) : unknownValue;
 }
 
-// The first entry, in the tree's order, for which the predicate is true; null when there is none.
+// The first child, in the order of the tree, for which the predicate is true; null when there is none.
 template <class Predicate>
-const Value* firstRow(const Value& object, const Predicate& isWanted) {
+const Value* firstChild(const Value& object, const Predicate& isWanted) {
   if (const Dictionary* entries = object.dictionary()) {
-    for (const auto& [name, key, value] : rowsOf(*entries))
+    for (const auto& [name, key, value] : treeEntries(*entries))
       if (isWanted(name, *value)) return value;
   } else if (const Array* elements = object.array()) {
     const ArrayLock::Scope lock;
@@ -159,7 +159,7 @@ class ObjectFinder {
     const std::pair<const Value*, std::size_t> search(&list, length);
     if (_failedSelections.contains(search)) return {nullptr, length};
     std::size_t end = length;
-    const Value* record = firstRow(list, [&](std::string_view /*name*/, const Value& candidate) {
+    const Value* record = firstChild(list, [&](std::string_view /*name*/, const Value& candidate) {
       end = endOfBrackets(candidate, length);
       return end != length;
     });
@@ -174,12 +174,12 @@ class ObjectFinder {
     std::size_t end = length;
     while (end < _path.size() && _path[end] == '[') {
       std::string_view rest = _path.substr(end + 1);
-      const Value* row = firstRow(record, [&](std::string_view name, const Value& value) {
+      const Value* entry = firstChild(record, [&](std::string_view name, const Value& value) {
         rest = _path.substr(end + 1);
         const auto text = leafText(value);
         return text && skip(rest, name) && skip(rest, "=") && skip(rest, *text) && skip(rest, "]");
       });
-      if (!row) return length;
+      if (!entry) return length;
       end = _path.size() - rest.size();
     }
     return end;
@@ -203,9 +203,9 @@ class ObjectFinder {
   }
 
   const Value* findAmong(const Dictionary& entries, std::size_t length) {
-    const std::vector<Row> rows = rowsOf(entries);
-    for (auto row = rows.rbegin(); row != rows.rend(); ++row)
-      if (const Value* found = findNamed(row->name, *row->value, length)) return found;
+    const std::vector<TreeEntry> inOrder = treeEntries(entries);
+    for (auto entry = inOrder.rbegin(); entry != inOrder.rend(); ++entry)
+      if (const Value* found = findNamed(entry->name, *entry->value, length)) return found;
     return nullptr;
   }
 

@@ -36,7 +36,7 @@ class VarnelModelNode {
   /// "/". Records every node in the path dictionary; of two nodes with the same path, the later one.
   static std::shared_ptr<const VarnelModelNode> makeTreeFromObject_withPathDictionary(const Value& object,
                                                                                       PathDictionary& paths);
-  /// The same with leaves that know when packets last wrote them.
+  /// The same. The leaves get the times when packets last wrote them.
   static std::shared_ptr<const VarnelModelNode> makeTreeFromObject_withPathDictionary(
       const Value& object, PathDictionary& paths, const WriteTimes& times);
 

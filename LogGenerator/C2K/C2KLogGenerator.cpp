@@ -62,9 +62,9 @@ bool hasRightLength(const PacketKind& kind, const Packet& packet) {
 using VariableFormats = std::vector<c2k::VariableFormat>;
 
 // Gives each entry of a template the formats of the variable that it names.
-void addFormats(std::string_view section, const Dictionary& rows, const VariableFormats& variables,
+void addFormats(std::string_view section, const Dictionary& entries, const VariableFormats& variables,
                 NumberFormats& formats) {
-  for (const auto& [key, value] : rows) {
+  for (const auto& [key, value] : entries) {
     const std::string_view name = displayNameOfSortedKey(key);
     if (const Dictionary* const inner = value.dictionary()) addFormats(name, *inner, variables, formats);
     const std::string* const variable = value.string();
@@ -76,10 +76,10 @@ void addFormats(std::string_view section, const Dictionary& rows, const Variable
 }
 
 // Whether a template has an entry for one of the variables.
-bool showsAny(const Dictionary& rows, std::span<const c2k::Variable> variables) {
-  return std::ranges::any_of(rows, [&](const Dictionary::Entry& row) {
-    if (const Dictionary* const inner = row.value.dictionary()) return showsAny(*inner, variables);
-    const std::string* const name = row.value.string();
+bool showsAny(const Dictionary& entries, std::span<const c2k::Variable> variables) {
+  return std::ranges::any_of(entries, [&](const Dictionary::Entry& entry) {
+    if (const Dictionary* const inner = entry.value.dictionary()) return showsAny(*inner, variables);
+    const std::string* const name = entry.value.string();
     return name && std::ranges::find(variables, *name, &c2k::Variable::name) != variables.end();
   });
 }
@@ -118,9 +118,9 @@ void C2KLogGenerator::processTemplate_storeDisplayIntoDict_storeLookupIntoDict(
     const Dictionary& displayTemplate, const Value& display, Dictionary& lookup) {
   for (const auto& [key, value] : displayTemplate) {
     if (const Dictionary* section = value.dictionary()) {
-      const Value rows = Value::ofDictionary();
-      processTemplate_storeDisplayIntoDict_storeLookupIntoDict(*section, rows, lookup);
-      display.dictionary()->set(key, rows);
+      const Value inner = Value::ofDictionary();
+      processTemplate_storeDisplayIntoDict_storeLookupIntoDict(*section, inner, lookup);
+      display.dictionary()->set(key, inner);
     } else if (const std::string* text = value.string(); text && *text == c2k::sortedMark) {
       display.dictionary()->set(key, c2k::sortedMark);
     } else if (text) {
@@ -176,7 +176,8 @@ NumberFormats C2KLogGenerator::numberFormats() const {
   c2k::listDataRateFormats(variables);
   NumberFormats formats;
   const Value displayTemplate = services().resources.propertyList(templateName);
-  if (const Dictionary* const rows = displayTemplate.dictionary()) addFormats({}, *rows, variables, formats);
+  if (const Dictionary* const entries = displayTemplate.dictionary())
+    addFormats({}, *entries, variables, formats);
   return formats;
 }
 

@@ -36,9 +36,9 @@ static_assert(flCounters + counterSize * flCounterCount == flDataRateSize);
 // first counters count.
 constexpr std::size_t rlSequenceOffset = 14;
 constexpr std::size_t rlCounters = 18;
-constexpr std::size_t rlRowSize = 24;
-constexpr std::size_t rlRowCounters = 4;
-constexpr std::size_t rlHalfSize = rlRowSize * rlRateCount;
+constexpr std::size_t rlRecordSize = 24;
+constexpr std::size_t rlRecordCounters = 4;
+constexpr std::size_t rlHalfSize = rlRecordSize * rlRateCount;
 constexpr std::size_t rlHalfCount = 6;
 static_assert(rlHalfSize == 288 && rlCounters + rlHalfSize * rlHalfCount <= rlDataRateSize);
 
@@ -83,8 +83,8 @@ void updateRate(Variable variable, const Progress& now, State& state, LinkEntrie
 std::uint64_t rlPacketsAtRate(const Packet& packet, std::size_t rate) {
   std::uint64_t sum = 0;
   for (std::size_t half = 0; half < rlHalfCount; ++half) {
-    const std::size_t row = rlCounters + rlHalfSize * half + rlRowSize * rate;
-    for (const std::uint32_t counter : packet.numbers<rlRowCounters>(row)) sum += counter;
+    const std::size_t record = rlCounters + rlHalfSize * half + rlRecordSize * rate;
+    for (const std::uint32_t counter : packet.numbers<rlRecordCounters>(record)) sum += counter;
   }
   return sum;
 }
