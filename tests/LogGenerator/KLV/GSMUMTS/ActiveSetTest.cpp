@@ -34,11 +34,6 @@ std::string row(int scramblingCode, int rscp, int energy) {
          " dB\", Energy Per Chip: \"" + std::to_string(energy) + " dB\"}";
 }
 
-TEST_F(ActiveSetTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Active Set");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x417Au));
-}
-
 TEST_F(ActiveSetTest, EachCellHasThreeRowsInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), R"([{Scrambling Code: "4660", RSCP: "-85 dB", Energy Per Chip: "-10 dB"}, )"
@@ -170,10 +165,6 @@ TEST_F(ActiveSetTest, PacketsOf16And17BytesAreAccepted) {
   }
 }
 
-TEST_F(ActiveSetTest, PacketsOf15BytesAndLessKeepTheListSilently) {
-  expectIgnoredBelow(16, twoCells(), cellSetCode, {trace});
-}
-
 TEST_F(ActiveSetTest, CellsBeyondThePacketShowZeros) {
   putOldContent();
   decode(PacketBuilder(cellSetCode, 16).u16(13, 0xFE00).u8(15, 255).bytes());
@@ -202,17 +193,6 @@ TEST_F(ActiveSetTest, EveryTruncatedPacketShowsBothCellsWithZerosForWhatIsCutOff
     EXPECT_EQ(shown(), size < 16 ? oldContent() : "[" + first + ", " + second + "]");
     EXPECT_THAT(lines, ElementsAre(trace));
   });
-}
-
-TEST_F(ActiveSetTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(twoCells(), 0x4005, {trace, "<3>Received an unknown log message: 16389"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(ActiveSetTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(twoCells()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(twoCells(), 0x4005),
-              ElementsAre(trace, "<3>Received an unknown log message: 16389"));
 }
 
 }  // namespace

@@ -45,11 +45,6 @@ std::string row(const char* identity, const char* received, const char* inError)
          "\", CRC Received in Error: \"" + inError + "\"}";
 }
 
-TEST_F(BLERTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "BLER");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x4116u));
-}
-
 TEST_F(BLERTest, TheWindowStandsBeforeTheChannelsAndEachChannelHasThreeRowsInThisOrder) {
   decode(twoChannels());
   EXPECT_EQ(shown(), R"({Window Size: "300", Transport Channels: [)"
@@ -128,10 +123,6 @@ TEST_F(BLERTest, PacketsOf16And17BytesAreDecoded) {
   }
 }
 
-TEST_F(BLERTest, PacketsOf15BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(16, twoChannels(), blocksCode, {trace});
-}
-
 TEST_F(BLERTest, EveryTruncatedPacketShowsBothChannelsWithZerosForWhatIsCutOff) {
   // 66051 is 0x00010203, 513 is 0x0201, 258 is 0x0102.
   forEachTruncation(twoChannels(), [&](std::size_t size, const std::vector<std::string>& lines) {
@@ -144,17 +135,6 @@ TEST_F(BLERTest, EveryTruncatedPacketShowsBothChannelsWithZerosForWhatIsCutOff) 
     EXPECT_EQ(shown(), size < 16 ? oldContent() : expected);
     EXPECT_THAT(lines, ElementsAre(trace));
   });
-}
-
-TEST_F(BLERTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(twoChannels(), 0x4125, {trace, "<3>Received an unknown log message: 16677"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(BLERTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(twoChannels()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(twoChannels(), 0x4125),
-              ElementsAre(trace, "<3>Received an unknown log message: 16677"));
 }
 
 }  // namespace

@@ -7,7 +7,6 @@ namespace {
 
 struct DetectedSetSubject {
   using Decoder = DetectedSet;
-  static constexpr const char* sectionName = "Detected Set";
   static constexpr const char* trace = "<4>DetectedSet";
 };
 

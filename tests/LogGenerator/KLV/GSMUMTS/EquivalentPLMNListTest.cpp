@@ -34,11 +34,6 @@ Bytes twoNetworks() {
   return packet.bytes();
 }
 
-TEST_F(EquivalentPLMNListTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Equivalent PLMN List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7150u));
-}
-
 TEST_F(EquivalentPLMNListTest, EachNetworkHasTwoRowsInThisOrder) {
   decode(PacketBuilder(networksCode, 23).u8(16, 1).u8(17, 2).u8(19, 6).u8(21, 2).u8(22, 1).bytes());
   EXPECT_EQ(shown(), R"([{Mobile Country Code: "262", Mobile Network Code: "1"}])");
@@ -102,10 +97,6 @@ TEST_F(EquivalentPLMNListTest, APacketOf18BytesShowsItsSingleDigit) {
   EXPECT_EQ(shown(), R"([{Mobile Country Code: "200", Mobile Network Code: "0"}])");
 }
 
-TEST_F(EquivalentPLMNListTest, PacketsOf16BytesAndLessKeepTheListSilently) {
-  expectIgnoredBelow(17, twoNetworks(), networksCode, {trace});
-}
-
 TEST_F(EquivalentPLMNListTest, TwoHundredFiftyFiveNetworksAreAllShown) {
   decode(counted(255, 785).u8(17, 1).u8(784, 9).bytes());
   ASSERT_EQ(rowCount(), 255u);
@@ -132,17 +123,6 @@ TEST_F(EquivalentPLMNListTest, EveryTruncatedPacketShowsBothNetworksWithZerosFor
     EXPECT_EQ(shown(), size < 17 ? oldContent() : expected[size - 17]);
     EXPECT_THAT(lines, ElementsAre(trace));
   });
-}
-
-TEST_F(EquivalentPLMNListTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(twoNetworks(), 0x7135, {trace, "<3>Received an unknown log message: 28981"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(EquivalentPLMNListTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(twoNetworks()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(twoNetworks(), 0x7135),
-              ElementsAre(trace, "<3>Received an unknown log message: 28981"));
 }
 
 }  // namespace

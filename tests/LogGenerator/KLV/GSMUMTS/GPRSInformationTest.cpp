@@ -52,12 +52,6 @@ Bytes packetSystem() {
       .bytes();
 }
 
-TEST_F(GPRSInformationTest, FillsItsSectionFromSevenCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "GPRS Information");
-  EXPECT_THAT(decoder.getLogCodeArray(),
-              ElementsAre(0x51F5u, 0x7135u, 0x51F6u, 0x51FBu, 0x51FDu, 0x51F4u, 0x5137u));
-}
-
 TEST_F(GPRSInformationTest, APositionPacketShowsItsRowAlone) {
   decode(PacketBuilder(positionCode, 15).fill(0xEE).u8(14, 1).bytes(), positionCode);
   EXPECT_EQ(shown(), R"({SI13 Position: "Located on Extended BCCH"})");
@@ -258,19 +252,6 @@ TEST_F(GPRSInformationTest, EachCodeKeepsTheRowsOfTheOthers) {
   EXPECT_EQ(shown(), R"({Cell Reselect Hysteresis: "Applied", T3192: "80 ms", )"
                      R"(Access Burst Type: "8-bit format", DRX Timer Max: "60", )"
                      R"(Network Operating Mode: "Class 1"})");
-}
-
-TEST_F(GPRSInformationTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(access(), 0x51F8, {trace, "<3>Received an unknown log message: 20984"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(GPRSInformationTest, WithoutASectionItRunsAndLogsAsUsual) {
-  for (const std::uint32_t code : {0x51F5, 0x7135, 0x51F6, 0x51FB, 0x51FD, 0x51F4, 0x5137}) {
-    EXPECT_THAT(linesWithoutSection(Bytes(40, 1), code), ElementsAre(trace)) << code;
-  }
-  EXPECT_THAT(linesWithoutSection(access(), 0x51F8),
-              ElementsAre(trace, "<3>Received an unknown log message: 20984"));
 }
 
 }  // namespace

@@ -39,11 +39,6 @@ constexpr const char* stateRows =
 constexpr const char* measurementRows =
     R"({Serving Rx Level: "200", Rx Quality Full: "-10", Rx Quality Sub: "66051"})";
 
-TEST_F(GSMRRInfoTest, FillsItsSectionFromFourCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "GSM RR Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x512Cu, 0x5137u, 0x5072u, 0x51F6u));
-}
-
 TEST_F(GSMRRInfoTest, AStatePacketShowsFourRowsInThisOrder) {
   decode(state(5));
   EXPECT_EQ(shown(), stateRows);
@@ -111,10 +106,6 @@ TEST_F(GSMRRInfoTest, AStatePacketOf18BytesShowsTheSameAsOneOf17) {
   EXPECT_EQ(shown(), stateRows);
 }
 
-TEST_F(GSMRRInfoTest, StatePacketsOf16BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(17, state(5), stateCode, {trace});
-}
-
 TEST_F(GSMRRInfoTest, AMeasurementPacketShowsThreeRowsInThisOrder) {
   decode(measurement(), measurementCode);
   EXPECT_EQ(shown(), measurementRows);
@@ -140,10 +131,6 @@ TEST_F(GSMRRInfoTest, AMeasurementPacketOf30BytesShowsTheSameAsOneOf29) {
   EXPECT_EQ(shown(), measurementRows);
 }
 
-TEST_F(GSMRRInfoTest, MeasurementPacketsOf28BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(29, measurement(), measurementCode, {trace});
-}
-
 TEST_F(GSMRRInfoTest, DtxIsOnForAnyFlagBut0) {
   expectTextOfEachByte(
       transmission(0), 19, "DTX Used", [](unsigned flag) { return flag == 0 ? "OFF" : "ON"; },
@@ -163,10 +150,6 @@ TEST_F(GSMRRInfoTest, TransmissionPacketsOf20And21BytesAreDecoded) {
     decode(transmission(1, size), transmissionCode);
     EXPECT_EQ(shown(), R"({Old: "row", DTX Used: "ON"})") << size;
   }
-}
-
-TEST_F(GSMRRInfoTest, TransmissionPacketsOf19BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(20, transmission(1), transmissionCode, {trace});
 }
 
 TEST_F(GSMRRInfoTest, ATimersPacketShowsByte16InSecondsAlone) {
@@ -190,10 +173,6 @@ TEST_F(GSMRRInfoTest, TimersPacketsOf24And25BytesAreDecoded) {
   }
 }
 
-TEST_F(GSMRRInfoTest, TimersPacketsOf23BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(24, timers(60), timersCode, {trace});
-}
-
 TEST_F(GSMRRInfoTest, EachCodeKeepsTheRowsOfTheOthers) {
   decode(timers(1), timersCode);
   decode(measurement(), measurementCode);
@@ -203,19 +182,6 @@ TEST_F(GSMRRInfoTest, EachCodeKeepsTheRowsOfTheOthers) {
   EXPECT_EQ(shown(), R"({DRX Used: "2 sec", Serving Rx Level: "200", Rx Quality Full: "-10", )"
                      R"(Rx Quality Sub: "66051", DTX Used: "OFF", RR State: "RR_IDLE", RR Sub State: "2", )"
                      R"(RR Status: "3", RR Mode: "Voice"})");
-}
-
-TEST_F(GSMRRInfoTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(state(5), 0x51F5, {trace, "<3>Received an unknown log message: 20981"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(GSMRRInfoTest, WithoutASectionItRunsAndLogsAsUsual) {
-  for (const std::uint32_t code : {0x512C, 0x5137, 0x5072, 0x51F6}) {
-    EXPECT_THAT(linesWithoutSection(Bytes(40, 1), code), ElementsAre(trace)) << code;
-  }
-  EXPECT_THAT(linesWithoutSection(state(5), 0x51F5),
-              ElementsAre(trace, "<3>Received an unknown log message: 20981"));
 }
 
 }  // namespace

@@ -46,11 +46,6 @@ Value cell(const char* technology, const char* type, std::int64_t arfcn) {
 
 constexpr const char* cellRows = R"({Cell ID: "40002", ARFCN: "62"})";
 
-TEST_F(GSMServingCellTest, FillsItsSectionFromFourCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "GSM Serving Cell");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x5134u, 0x5137u, 0x5076u, 0xFF0001u));
-}
-
 TEST_F(GSMServingCellTest, AnIdentityPacketShowsThreeRowsInThisOrder) {
   decode(identity());
   EXPECT_EQ(shown(), identityRows);
@@ -72,10 +67,6 @@ TEST_F(GSMServingCellTest, AnIdentityOfAllOnesIsUnsigned) {
 TEST_F(GSMServingCellTest, AnIdentityPacketOf27BytesShowsTheSameAsOneOf26) {
   decode(identity(27));
   EXPECT_EQ(shown(), identityRows);
-}
-
-TEST_F(GSMServingCellTest, IdentityPacketsOf25BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(26, identity(), identityCode, {trace});
 }
 
 TEST_F(GSMServingCellTest, AMeasurementPacketShowsThreeRowsInThisOrder) {
@@ -112,10 +103,6 @@ TEST_F(GSMServingCellTest, AMeasurementPacketOf30BytesShowsTheSameAsOneOf29) {
   EXPECT_EQ(shown(), measurementRows);
 }
 
-TEST_F(GSMServingCellTest, MeasurementPacketsOf28BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(29, measurement(), measurementCode, {trace});
-}
-
 TEST_F(GSMServingCellTest, ADedicatedFieldOf0x0123Shows35) {
   decode(dedicated(0x0123), dedicatedCode);
   EXPECT_EQ(shown(), R"({MA Dedicated ARFCN: "35"})");
@@ -135,10 +122,6 @@ TEST_F(GSMServingCellTest, DedicatedPacketsOf17And18BytesAreDecoded) {
     decode(dedicated(62, size), dedicatedCode);
     EXPECT_EQ(shown(), R"({Old: "row", MA Dedicated ARFCN: "62"})") << size;
   }
-}
-
-TEST_F(GSMServingCellTest, DedicatedPacketsOf16BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(17, dedicated(62), dedicatedCode, {trace});
 }
 
 TEST_F(GSMServingCellTest, AServingGSMCellShowsTwoRowsInThisOrder) {
@@ -225,21 +208,6 @@ TEST_F(GSMServingCellTest, RowsOfTheFourCodesMixAndTheLastValueOfEachStays) {
   decodeCells({cell("GSM", "Serving", 62)});
   EXPECT_EQ(shown(), R"({MA Dedicated ARFCN: "62", RSSI: "200 dBm", C1 Value: "300", C2 Value: "7", )"
                      R"(Cell ID: "40002", ARFCN: "62", BSIC: "300"})");
-}
-
-TEST_F(GSMServingCellTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(identity(), 0x51FF, {trace, "<3>Received an unknown log message: 20991"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(GSMServingCellTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(identity()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(measurement(), measurementCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(dedicated(1), dedicatedCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(cellMonitorMessage({cellRecord("GSM", "Serving")}), cellMonitorCode),
-              ElementsAre(trace, noCellId, noArfcn));
-  EXPECT_THAT(linesWithoutSection(serverMessageOfText(cellMonitorCode, ""), cellMonitorCode),
-              ElementsAre(trace, failedParse, noArray));
 }
 
 }  // namespace

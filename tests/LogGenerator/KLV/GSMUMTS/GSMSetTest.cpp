@@ -39,11 +39,6 @@ std::string row(const char* arfcn, const char* bsic, const char* rssi, const cha
          " dBm\", Ranking Value: \"" + ranking + "\"}";
 }
 
-TEST_F(GSMSetTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "GSM Set");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x4005u));
-}
-
 TEST_F(GSMSetTest, EachCellHasFourRowsInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), R"([{ARFCN: "975", BSIC: "300", RSSI: "-87 dBm", Ranking Value: "-10"}, )"
@@ -128,10 +123,6 @@ TEST_F(GSMSetTest, PacketsOf15And16BytesAreAccepted) {
   }
 }
 
-TEST_F(GSMSetTest, PacketsOf14BytesAndLessKeepTheListSilently) {
-  expectIgnoredBelow(15, twoCells(), rankingCode, {trace});
-}
-
 TEST_F(GSMSetTest, CellsBeyondThePacketShowZeros) {
   putOldContent();
   decode(counted(255, 15).bytes());
@@ -165,18 +156,6 @@ TEST_F(GSMSetTest, EveryTruncatedPacketShowsBothCellsWithZerosForWhatIsCutOff) {
     EXPECT_EQ(shown(), expected);
     EXPECT_THAT(lines, ElementsAre(trace));
   });
-}
-
-TEST_F(GSMSetTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(twoCells(), 0x417A, {trace, "<3>Received an unknown log message: 16762"});
-  expectIgnored(twoCells(), 0xFF0001, {trace, "<3>Received an unknown log message: 16711681"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(GSMSetTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(twoCells()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(twoCells(), 0x417A),
-              ElementsAre(trace, "<3>Received an unknown log message: 16762"));
 }
 
 }  // namespace

@@ -50,11 +50,6 @@ const std::string second = row("2", "8", "9", "513");
 const std::string third = row("3", "10", "11", "12");
 const std::string heading = R"(Version: "2", Sub Frames: "500", Carrier Info: "Dual Carrier")";
 
-TEST_F(HSDPAInformationTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "HSDPA Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x4221u));
-}
-
 TEST_F(HSDPAInformationTest, ThreeRowsAndTwoListsAreShownInThisOrder) {
   decode(threeProcesses());
   EXPECT_EQ(shown(), R"({Version: "2", Sub Frames: "500", Carrier Info: "Dual Carrier", )"
@@ -209,20 +204,6 @@ TEST_F(HSDPAInformationTest, PacketsOf18And19BytesAreDecoded) {
     EXPECT_EQ(shown(), R"({Old: "row", Version: "0", Sub Frames: "0", Carrier Info: "Single Carrier"})")
         << size;
   }
-}
-
-TEST_F(HSDPAInformationTest, PacketsOf17BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(18, threeProcesses(), processesCode, {trace});
-}
-
-TEST_F(HSDPAInformationTest, AForeignCodeIsIgnoredSilently) {
-  expectIgnored(threeProcesses(), 0x4116, {trace});
-  expectIgnored({}, 0xFFFFFFFF, {trace});
-}
-
-TEST_F(HSDPAInformationTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(threeProcesses()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(threeProcesses(), 0x4116), ElementsAre(trace));
 }
 
 }  // namespace

@@ -23,11 +23,6 @@ Bytes allocation(std::uint8_t hoppingSequence, const std::vector<std::uint16_t>&
   return packet.bytes();
 }
 
-TEST_F(MobileAllocationTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Mobile Allocation");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x51F8u));
-}
-
 TEST_F(MobileAllocationTest, TheSequenceNumberStandsBeforeTheFrequenciesInTheirOrder) {
   decode(allocation(63, {975, 62, 975}));
   EXPECT_EQ(shown(), R"({HSN: "63", ARFCNs: ["975", "62", "975"]})");
@@ -100,10 +95,6 @@ TEST_F(MobileAllocationTest, PacketsOf15And16BytesAreDecoded) {
   }
 }
 
-TEST_F(MobileAllocationTest, PacketsOf14BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(15, allocation(63, {975}), allocationCode, {trace});
-}
-
 TEST_F(MobileAllocationTest, EveryTruncatedPacketShowsAllFrequenciesWithZerosForWhatIsCutOff) {
   // 975 is 0x03CF, 300 is 0x012C.
   const char* const expected[] = {R"(["0", "0"])", R"(["207", "0"])", R"(["975", "0"])", R"(["975", "44"])"};
@@ -113,17 +104,6 @@ TEST_F(MobileAllocationTest, EveryTruncatedPacketShowsAllFrequenciesWithZerosFor
                            : R"({Old: "row", HSN: "63", ARFCNs: )" + std::string(expected[size - 15]) + "}");
     EXPECT_THAT(lines, ElementsAre(trace));
   });
-}
-
-TEST_F(MobileAllocationTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(allocation(63, {975}), 0x51F6, {trace, "<3>Received an unknown log message: 20982"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(MobileAllocationTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(allocation(63, {975})), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(allocation(63, {975}), 0x51F6),
-              ElementsAre(trace, "<3>Received an unknown log message: 20982"));
 }
 
 }  // namespace

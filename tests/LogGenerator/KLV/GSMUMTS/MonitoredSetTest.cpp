@@ -7,7 +7,6 @@ namespace {
 
 struct MonitoredSetSubject {
   using Decoder = MonitoredSet;
-  static constexpr const char* sectionName = "Monitored Set";
   static constexpr const char* trace = "<4>MonitoredSet";
 };
 

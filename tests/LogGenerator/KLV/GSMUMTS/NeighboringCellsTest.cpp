@@ -84,11 +84,6 @@ class NeighboringCellsTest : public ListDecoderTest<NeighboringCells, measuremen
   }
 };
 
-TEST_F(NeighboringCellsTest, FillsItsSectionFromThreeCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "Neighboring Cells");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x5137u, 0x51FFu, 0xFF0001u));
-}
-
 TEST_F(NeighboringCellsTest, EachNeighborHasThreeRowsInThisOrder) {
   decode(twoNeighbors());
   EXPECT_EQ(shown(), R"([{ARFCN: "975", RSSI: "200", C1 Value: "-10"}, )"
@@ -255,10 +250,6 @@ TEST_F(NeighboringCellsTest, PacketsOf29And30BytesAreAccepted) {
   }
 }
 
-TEST_F(NeighboringCellsTest, PacketsOf28BytesAndLessKeepTheListSilently) {
-  expectIgnoredBelow(29, twoNeighbors(), measurementCode, {trace});
-}
-
 TEST_F(NeighboringCellsTest, EveryTruncatedPacketShowsBothNeighborsWithZerosForWhatIsCutOff) {
   // 975 is 0x03CF, -10 is 0xFFFFFFF6, 66051 is 0x00010203.
   const auto firstOf = [](std::size_t size) {
@@ -398,15 +389,6 @@ TEST_F(NeighboringCellsTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesN
   expectIgnored(twoNeighbors(), 0x5134, {trace, "<3>Received an unknown log message: 20788"});
   expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
   EXPECT_EQ(bsicOf(62), R"("21")");
-}
-
-TEST_F(NeighboringCellsTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(twoNeighbors()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(colors({{62, 21}}), colorCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(cellMonitorMessage({cellRecord("GSM", "Neighbor")}), cellMonitorCode),
-              ElementsAre(trace, noArfcn, noRssi));
-  EXPECT_THAT(linesWithoutSection(serverMessageOfText(cellMonitorCode, ""), cellMonitorCode),
-              ElementsAre(trace, failedParse, noArray));
 }
 
 }  // namespace

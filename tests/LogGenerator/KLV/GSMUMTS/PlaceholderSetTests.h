@@ -5,8 +5,8 @@
 
 namespace varnel {
 
-/// The tests of a list section that UMTS cell set packets do nothing but empty. The subject has the
-/// `Decoder`, its `sectionName` and its `trace` line.
+/// The tests of a list section that UMTS cell set packets do nothing but empty. The subject has the `Decoder`
+/// and its `trace` line.
 template <class Subject>
 class PlaceholderSetTest : public ListDecoderTest<typename Subject::Decoder, cellSetCode> {
  protected:
@@ -26,11 +26,6 @@ class PlaceholderSetTest : public ListDecoderTest<typename Subject::Decoder, cel
 };
 
 TYPED_TEST_SUITE_P(PlaceholderSetTest);
-
-TYPED_TEST_P(PlaceholderSetTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(this->decoder.getSectionName(), TypeParam::sectionName);
-  EXPECT_THAT(this->decoder.getLogCodeArray(), testing::ElementsAre(0x417Au));
-}
 
 TYPED_TEST_P(PlaceholderSetTest, ACountOf0EmptiesTheList) {
   this->expectEmptied(cellSetPacket(-200, {}).bytes());
@@ -63,23 +58,9 @@ TYPED_TEST_P(PlaceholderSetTest, EveryTruncatedPacketEmptiesTheListDownTo16Bytes
   });
 }
 
-TYPED_TEST_P(PlaceholderSetTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  this->expectIgnored(this->threeCells(), 0x4005,
-                      {TypeParam::trace, "<3>Received an unknown log message: 16389"});
-  this->expectIgnored({}, 0xFFFFFFFF, {TypeParam::trace, "<3>Received an unknown log message: -1"});
-}
-
-TYPED_TEST_P(PlaceholderSetTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(this->linesWithoutSection(this->threeCells()), testing::ElementsAre(TypeParam::trace));
-  EXPECT_THAT(this->linesWithoutSection(this->threeCells(), 0x4005),
-              testing::ElementsAre(TypeParam::trace, "<3>Received an unknown log message: 16389"));
-}
-
-REGISTER_TYPED_TEST_SUITE_P(PlaceholderSetTest, FillsItsSectionFromOneCode, ACountOf0EmptiesTheList,
-                            CellsOfWhateverSetEmptyTheList, TwoHundredFiftyFiveCellsEmptyTheList,
-                            CellsBeyondThePacketEmptyTheList, PacketsOf16And17BytesEmptyTheList,
-                            EveryTruncatedPacketEmptiesTheListDownTo16Bytes,
-                            AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing,
-                            WithoutASectionItRunsAndLogsAsUsual);
+REGISTER_TYPED_TEST_SUITE_P(PlaceholderSetTest, ACountOf0EmptiesTheList, CellsOfWhateverSetEmptyTheList,
+                            TwoHundredFiftyFiveCellsEmptyTheList, CellsBeyondThePacketEmptyTheList,
+                            PacketsOf16And17BytesEmptyTheList,
+                            EveryTruncatedPacketEmptiesTheListDownTo16Bytes);
 
 }  // namespace varnel

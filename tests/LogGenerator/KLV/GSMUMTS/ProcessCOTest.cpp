@@ -23,11 +23,6 @@ Bytes registration(std::uint8_t state, std::size_t size = 16) {
   return PacketBuilder(registrationCode, size).fill(0xEE).u8(13, state).bytes();
 }
 
-TEST_F(ProcessCOTest, FillsItsSectionFromTwoCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "Process CO");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7131u, 0x7132u));
-}
-
 TEST_F(ProcessCOTest, AMobilityPacketShowsItsStateAlone) {
   decode(mobility(19));
   EXPECT_EQ(shown(), R"({MM State: "MM_IDLE"})");
@@ -90,23 +85,6 @@ TEST_F(ProcessCOTest, PacketsOf16And17BytesAreDecoded) {
     EXPECT_EQ(shown(), R"({Old: "row", MM State: "MM_NULL", MM Service State: "REG_STATE_INACTIVE"})")
         << size;
   }
-}
-
-TEST_F(ProcessCOTest, PacketsOf15BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(16, mobility(19), mobilityCode, {trace});
-  expectIgnoredBelow(16, registration(2), registrationCode, {trace});
-}
-
-TEST_F(ProcessCOTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(mobility(19), 0x7130, {trace, "<3>Received an unknown log message: 28976"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(ProcessCOTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(mobility(19)), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(registration(2), registrationCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(mobility(19), 0x7130),
-              ElementsAre(trace, "<3>Received an unknown log message: 28976"));
 }
 
 }  // namespace

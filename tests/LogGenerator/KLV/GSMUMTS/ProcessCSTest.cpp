@@ -22,11 +22,6 @@ Bytes registration(std::uint8_t state, std::size_t size = 16) {
   return PacketBuilder(registrationCode, size).fill(0xEE).u8(13, state).bytes();
 }
 
-TEST_F(ProcessCSTest, FillsItsSectionFromTwoCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "Process CS");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7131u, 0x7132u));
-}
-
 TEST_F(ProcessCSTest, AMobilityPacketShowsThreeRowsInThisOrder) {
   decode(mobility(19, 8, 0));
   EXPECT_EQ(shown(),
@@ -111,23 +106,6 @@ TEST_F(ProcessCSTest, PacketsOf16And17BytesAreDecoded) {
                        R"(MM Service State: "REG_STATE_INACTIVE"})")
         << size;
   }
-}
-
-TEST_F(ProcessCSTest, PacketsOf15BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(16, mobility(19, 8, 0), mobilityCode, {trace});
-  expectIgnoredBelow(16, registration(2), registrationCode, {trace});
-}
-
-TEST_F(ProcessCSTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(mobility(19, 8, 0), 0x7130, {trace, "<3>Received an unknown log message: 28976"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(ProcessCSTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(mobility(19, 8, 0)), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(registration(2), registrationCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(mobility(19, 8, 0), 0x7130),
-              ElementsAre(trace, "<3>Received an unknown log message: 28976"));
 }
 
 }  // namespace

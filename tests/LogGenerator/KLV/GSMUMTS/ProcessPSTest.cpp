@@ -22,11 +22,6 @@ Bytes registration(std::uint8_t state, std::size_t size = 16) {
   return PacketBuilder(registrationCode, size).fill(0xEE).u8(13, state).bytes();
 }
 
-TEST_F(ProcessPSTest, FillsItsSectionFromTwoCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "Process PS");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7130u, 0x7132u));
-}
-
 TEST_F(ProcessPSTest, AMobilityPacketShowsThreeRowsInThisOrder) {
   decode(mobility(3, 0, 0));
   EXPECT_EQ(shown(), R"({MM State: "GMM_REGISTERED", MM Sub State: "GMM_NORMAL_SERVICE", )"
@@ -110,23 +105,6 @@ TEST_F(ProcessPSTest, PacketsOf16And17BytesAreDecoded) {
                        R"(MM Service State: "REG_STATE_INACTIVE"})")
         << size;
   }
-}
-
-TEST_F(ProcessPSTest, PacketsOf15BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(16, mobility(3, 0, 0), mobilityCode, {trace});
-  expectIgnoredBelow(16, registration(2), registrationCode, {trace});
-}
-
-TEST_F(ProcessPSTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(mobility(3, 0, 0), 0x7131, {trace, "<3>Received an unknown log message: 28977"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(ProcessPSTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(mobility(3, 0, 0)), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(registration(2), registrationCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(mobility(3, 0, 0), 0x7131),
-              ElementsAre(trace, "<3>Received an unknown log message: 28977"));
 }
 
 }  // namespace

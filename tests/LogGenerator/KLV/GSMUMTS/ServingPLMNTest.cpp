@@ -58,11 +58,6 @@ Value cell(const char* technology, const char* type, std::int64_t lac) {
 constexpr const char* cellRows =
     R"({Mobile Country Code: "262", Mobile Network Code: "1", Location Area Code: "40002"})";
 
-TEST_F(ServingPLMNTest, FillsItsSectionFromThreeCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "Serving PLMN");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7135u, 0x7132u, 0xFF0001u));
-}
-
 TEST_F(ServingPLMNTest, AnIdentityPacketShowsFiveRowsInThisOrder) {
   decode(identity());
   EXPECT_EQ(shown(), identityRows);
@@ -141,10 +136,6 @@ TEST_F(ServingPLMNTest, AnIdentityPacketOf33BytesShowsTheSameAsOneOf32) {
   EXPECT_EQ(shown(), identityRows);
 }
 
-TEST_F(ServingPLMNTest, IdentityPacketsOf31BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(32, identity(), identityCode, {trace});
-}
-
 TEST_F(ServingPLMNTest, ASelectionPacketShowsTheModeInByte14Alone) {
   decode(selection(1), selectionCode);
   EXPECT_EQ(shown(), R"({PLMN Sel Mod: "Manual"})");
@@ -163,10 +154,6 @@ TEST_F(ServingPLMNTest, SelectionPacketsOf16And17BytesAreDecoded) {
     decode(selection(0, size), selectionCode);
     EXPECT_EQ(shown(), R"({Old: "row", PLMN Sel Mod: "Automatic"})") << size;
   }
-}
-
-TEST_F(ServingPLMNTest, SelectionPacketsOf15BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(16, selection(1), selectionCode, {trace});
 }
 
 TEST_F(ServingPLMNTest, AServingGSMCellShowsThreeDecimalsInThisOrder) {
@@ -287,21 +274,6 @@ TEST_F(ServingPLMNTest, WhicheverCameLastIsShownInTheRowsThatTheCodesShare) {
   EXPECT_EQ(shown(),
             R"({PLMN Sel Mod: "Automatic", Mobile Country Code: "310", Mobile Network Code: "23 ", )"
             R"(Location Area Code: "4660", Routing Area Code: "99", Service Type: "CS_PS_SERVICE"})");
-}
-
-TEST_F(ServingPLMNTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(identity(), 0x7131, {trace, "<3>Received an unknown log message: 28977"});
-  expectIgnored(identity(), 0xFF0000, {trace, "<3>Received an unknown log message: 16711680"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(ServingPLMNTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(identity()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(selection(1), selectionCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(cellMonitorMessage({cell("GSM", "Serving", 1)}), cellMonitorCode),
-              ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(serverMessageOfText(cellMonitorCode, ""), cellMonitorCode),
-              ElementsAre(trace, failedParse, noArray));
 }
 
 }  // namespace

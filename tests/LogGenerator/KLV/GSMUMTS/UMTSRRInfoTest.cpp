@@ -71,11 +71,6 @@ class UMTSRRInfoTest : public RowsDecoderTest<UMTSRRInfo, stateCode> {
   }
 };
 
-TEST_F(UMTSRRInfoTest, FillsItsSectionFromFiveCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "UMTS RR Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x4125u, 0x4031u, 0x4127u, 0x4157u, 0xFF0001u));
-}
-
 TEST_F(UMTSRRInfoTest, AStatePacketShowsItsStateAlone) {
   decode(state(3));
   EXPECT_EQ(shown(), R"({RRC State: "CELL_DCH"})");
@@ -91,10 +86,6 @@ TEST_F(UMTSRRInfoTest, EachStateHasItsTextAndAllFrom6OnAreUnknown) {
 TEST_F(UMTSRRInfoTest, AStatePacketOf15BytesShowsTheSameAsOneOf14) {
   decode(state(5, 15));
   EXPECT_EQ(shown(), R"({RRC State: "URA_PCH"})");
-}
-
-TEST_F(UMTSRRInfoTest, StatePacketsOf13BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(14, state(3), stateCode, {trace});
 }
 
 TEST_F(UMTSRRInfoTest, SamplesOf88AndMinus12ShowAMeanOfMinus15) {
@@ -256,10 +247,6 @@ TEST_F(UMTSRRInfoTest, CipheringPacketsOf19And20BytesAreDecoded) {
   }
 }
 
-TEST_F(UMTSRRInfoTest, CipheringPacketsOf18BytesAndLessAreDroppedSilently) {
-  expectIgnoredBelow(19, ciphering(1), cipheringCode, {trace});
-}
-
 TEST_F(UMTSRRInfoTest, AServingUMTSCellShowsThreeRowsInThisOrder) {
   decodeCells({cell("UMTS", "Serving", 10564)});
   EXPECT_EQ(shown(), cellRows);
@@ -350,23 +337,6 @@ TEST_F(UMTSRRInfoTest, APayloadThatIsADictionaryIsReportedAsAFailedParse) {
 TEST_F(UMTSRRInfoTest, EveryTruncatedCellMonitorMessageIsAFailedParse) {
   const Bytes message = cellMonitorMessage({cell("UMTS", "Serving", 1)});
   expectIgnoredBelow(message.size(), message, cellMonitorCode, {trace, failedParse, noArray});
-}
-
-TEST_F(UMTSRRInfoTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(servingCell(), 0x4116, {trace, "<3>Received an unknown log message: 16662"});
-  expectIgnored(cellMonitorMessage({}), 0xFF0000, {trace, "<3>Received an unknown log message: 16711680"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(UMTSRRInfoTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(state(3)), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(powers({88}), powerCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(servingCell(), cellCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(ciphering(1), cipheringCode), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(cellMonitorMessage({cellRecord("UMTS", "Serving")}), cellMonitorCode),
-              ElementsAre(trace, noCellId, noUarfcn, noScramblingCode));
-  EXPECT_THAT(linesWithoutSection(serverMessageOfText(cellMonitorCode, ""), cellMonitorCode),
-              ElementsAre(trace, failedParse, noArray));
 }
 
 }  // namespace

@@ -75,11 +75,6 @@ Value cell(const char* technology, const char* type, std::int64_t uarfcn) {
 constexpr const char* cellRows =
     R"({UARFCN: "10564", Scrambling Code: "77", RSCP: "-95 dBm", Energy Per Chip: "-9 dB"})";
 
-TEST_F(UMTSSetTest, FillsItsSectionFromTwoCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "UMTS Set");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x4005u, 0xFF0001u));
-}
-
 TEST_F(UMTSSetTest, EachRankedCellHasSixRowsInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), listOf({first, second}));
@@ -186,10 +181,6 @@ TEST_F(UMTSSetTest, PacketsOf15And16BytesAreAccepted) {
     decode(counted(0, size).bytes());
     EXPECT_EQ(shown(), "[]") << size;
   }
-}
-
-TEST_F(UMTSSetTest, PacketsOf14BytesAndLessKeepTheListSilently) {
-  expectIgnoredBelow(15, twoCells(), rankingCode, {trace});
 }
 
 TEST_F(UMTSSetTest, CellsBeyondThePacketAreShownOfZeros) {
@@ -369,20 +360,6 @@ TEST_F(UMTSSetTest, EachOfTheTwoCodesReplacesTheListOfTheOther) {
   EXPECT_EQ(shown(), listOf({cellRows}));
   decode(twoCells());
   EXPECT_EQ(shown(), listOf({first, second}));
-}
-
-TEST_F(UMTSSetTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(twoCells(), 0x417A, {trace, "<3>Received an unknown log message: 16762"});
-  expectIgnored(cellMonitorMessage({}), 0xFF0002, {trace, "<3>Received an unknown log message: 16711682"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(UMTSSetTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(twoCells()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(cellMonitorMessage({cellRecord("UMTS", "Neighbor")}), cellMonitorCode),
-              ElementsAre(trace, noUarfcn, noScramblingCode, noRscp, noEnergy));
-  EXPECT_THAT(linesWithoutSection(serverMessageOfText(cellMonitorCode, ""), cellMonitorCode),
-              ElementsAre(trace, failedParse, noArray));
 }
 
 }  // namespace

@@ -7,7 +7,6 @@ namespace {
 
 struct VirtualActiveSetSubject {
   using Decoder = VirtualActiveSet;
-  static constexpr const char* sectionName = "Virtual Active Set";
   static constexpr const char* trace = "<4>VirtualActiveSet";
 };
 

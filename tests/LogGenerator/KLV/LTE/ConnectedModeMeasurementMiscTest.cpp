@@ -29,31 +29,15 @@ constexpr const char* reportRows =
     R"({E-ARFCN: "1300", Serving Physical Cell ID: "301", Subframe Number: "9871", )"
     R"(Serving Filtered RSRP: "-97.25 dBm", Serving Filtered RSRQ: "-11.75 dB"})";
 
-TEST_F(ConnectedModeMeasurementMiscTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Connected mode LTE Intra-frequency Measurement");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB179u));
-}
-
 TEST_F(ConnectedModeMeasurementMiscTest, AReportShowsFiveRowsInThisOrder) {
   decode(report());
   EXPECT_EQ(shown(), reportRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(ConnectedModeMeasurementMiscTest, AReportOf28BytesIsDroppedSilently) {
-  expectIgnored(PacketBuilder(reportCode, 28).bytes(), reportCode, {trace});
-}
-
 TEST_F(ConnectedModeMeasurementMiscTest, AReportOf30BytesShowsTheSameAsOneOf29) {
   decode(report(30));
   EXPECT_EQ(shown(), reportRows);
-}
-
-TEST_F(ConnectedModeMeasurementMiscTest, EveryTruncatedReportIsDroppedSilently) {
-  forEachTruncation(report(), [&](std::size_t, const std::vector<std::string>& lines) {
-    EXPECT_EQ(shown(), oldContent());
-    EXPECT_THAT(lines, ElementsAre(trace));
-  });
 }
 
 TEST_F(ConnectedModeMeasurementMiscTest, ZerosShowTheLowEndOfEachScale) {
@@ -118,17 +102,6 @@ TEST_F(ConnectedModeMeasurementMiscTest, TheNumbersOfRecordsChangeNothing) {
   decode(packet);
   EXPECT_EQ(shown(), reportRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
-}
-
-TEST_F(ConnectedModeMeasurementMiscTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(report(), 0xB17F, {trace, "<3>Received an unknown log message: 45439"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(ConnectedModeMeasurementMiscTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(report()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(report(), 0xB17F),
-              ElementsAre(trace, "<3>Received an unknown log message: 45439"));
 }
 
 }  // namespace

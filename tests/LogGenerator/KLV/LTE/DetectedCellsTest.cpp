@@ -23,11 +23,6 @@ PacketBuilder report(std::uint8_t neighbors, std::uint8_t detected, std::size_t 
 // Two neighbors, then three detected cells.
 Bytes threeDetected() { return report(2, 3, 47).u16(41, 301).u16(43, 2).u16(45, 65000).bytes(); }
 
-TEST_F(DetectedCellsTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Detected Cells");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB179u));
-}
-
 TEST_F(DetectedCellsTest, EachDetectedCellBehindTheNeighborsHasARow) {
   decode(threeDetected());
   EXPECT_EQ(shown(), R"([{Physical Cell ID: "301"}, {Physical Cell ID: "2"}, {Physical Cell ID: "65000"}])");
@@ -112,27 +107,12 @@ TEST_F(DetectedCellsTest, EveryTruncatedReportKeepsItsWholeRecords) {
   });
 }
 
-TEST_F(DetectedCellsTest, AReportOf28BytesIsDroppedSilently) {
-  expectIgnored(Bytes(28, 0), reportCode, {trace});
-}
-
 TEST_F(DetectedCellsTest, ReportsOf29And30BytesAreAccepted) {
   for (const std::size_t size : {29u, 30u}) {
     putOldContent();
     decode(report(0, 0, size).bytes());
     EXPECT_EQ(shown(), "[]") << size << " bytes";
   }
-}
-
-TEST_F(DetectedCellsTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(threeDetected(), 0xB180, {trace, "<3>Received an unknown log message: 45440"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(DetectedCellsTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(threeDetected()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(threeDetected(), 0xB180),
-              ElementsAre(trace, "<3>Received an unknown log message: 45440"));
 }
 
 }  // namespace

@@ -80,22 +80,6 @@ constexpr const char* cellRows =
     R"({Tracking Area Code: "40002", Cell Identity: "26885892", Physical Cell ID: "302", )"
     R"(Freq Band Indicator: "7", UARFCN: "3350"})";
 
-TEST_F(LTEServingCellInfoTest, FillsItsSectionFromThreeCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "Serving Cell Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB0C2u, 0xB0C1u, 0xFF0001u));
-}
-
-TEST_F(LTEServingCellInfoTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  decode(identity(), 0xB0C3);
-  EXPECT_EQ(shown(), "{}");
-  EXPECT_THAT(log.takeTexts(), ElementsAre(trace, "<3>Received an unknown log message: 45251"));
-}
-
-TEST_F(LTEServingCellInfoTest, AForeignCodeIsReportedAsASignedDecimal) {
-  decode({}, 0xFFFFFFFF);
-  EXPECT_THAT(log.takeTexts(), ElementsAre(trace, "<3>Received an unknown log message: -1"));
-}
-
 TEST_F(LTEServingCellInfoTest, TheCodeThatCountsIsTheGivenOneNotTheHeaders) {
   decode(identity(), antennasCode);
   EXPECT_EQ(shown(), R"({Num Tx Antennas: "50"})");
@@ -104,12 +88,6 @@ TEST_F(LTEServingCellInfoTest, TheCodeThatCountsIsTheGivenOneNotTheHeaders) {
 TEST_F(LTEServingCellInfoTest, AnIdentityPacketShowsEightRowsInThisOrder) {
   decode(identity(), identityCode);
   EXPECT_EQ(shown(), identityRows);
-  EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
-}
-
-TEST_F(LTEServingCellInfoTest, AnIdentityPacketOf37BytesChangesNothingAndLogsNothingButItsTrace) {
-  decode(identity(37), identityCode);
-  EXPECT_EQ(shown(), "{}");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
@@ -207,22 +185,6 @@ TEST_F(LTEServingCellInfoTest, AnAntennasPacketOf23BytesShowsTheSameAsOneOf22) {
   decode(antennas(4, 23), antennasCode);
   EXPECT_EQ(shown(), R"({Num Tx Antennas: "4"})");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace, unknownAntennas));
-}
-
-TEST_F(LTEServingCellInfoTest, AnAntennasPacketOf21BytesIsDroppedWithoutTheUnknownMessage) {
-  decode(antennas(4, 21), antennasCode);
-  EXPECT_EQ(shown(), "{}");
-  EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
-}
-
-TEST_F(LTEServingCellInfoTest, EveryTruncatedAntennasPacketIsDroppedSilently) {
-  Bytes packet = antennas(4);
-  while (!packet.empty()) {
-    packet.pop_back();
-    decode(packet, antennasCode);
-    EXPECT_EQ(shown(), "{}") << packet.size() << " bytes";
-    EXPECT_THAT(log.takeTexts(), ElementsAre(trace)) << packet.size() << " bytes";
-  }
 }
 
 TEST_F(LTEServingCellInfoTest, ACellMonitorArrayShowsFiveRowsInThisOrder) {
@@ -323,19 +285,6 @@ TEST_F(LTEServingCellInfoTest, RowsOfTheThreeCodesMixAndTheLastValueOfEachStays)
             R"(Upload Frequency: "19300", Download Bandwidth: "10 MHz", Upload Bandwidth: "20 MHz", )"
             R"(Cell Identity: "26885892", Tracking Area Code: "40002", Freq Band Indicator: "7", )"
             R"(UARFCN: "3350"})");
-}
-
-TEST_F(LTEServingCellInfoTest, WithoutASectionEverythingRunsAndLogsAsUsual) {
-  LTEServingCellInfo sectionless;
-  const auto decodeWithout = [&](const Bytes& bytes, std::uint32_t logCode) {
-    sectionless.updateWithData_logCode(Packet(bytes), logCode);
-  };
-  decodeWithout(identity(), identityCode);
-  decodeWithout(antennas(2), antennasCode);
-  decodeWithout(serverMessage(0xFF0001, Value::ofArray({cell("LTE", "Serving", 3350)})), 0xFF0001);
-  decodeWithout(serverMessageOfText(0xFF0001, ""), 0xFF0001);
-  EXPECT_THAT(log.takeTexts(),
-              ElementsAre(trace, trace, unknownAntennas, trace, trace, failedParse, noArray));
 }
 
 }  // namespace

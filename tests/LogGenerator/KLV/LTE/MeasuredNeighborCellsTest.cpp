@@ -45,11 +45,6 @@ constexpr const char* second =
 constexpr const char* third =
     R"({Physical Cell ID: "65000", Filtered RSRP: "-140.00 dBm", Filtered RSRQ: "0.00 dB"})";
 
-TEST_F(MeasuredNeighborCellsTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Measured Neighbor Cells");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB179u));
-}
-
 TEST_F(MeasuredNeighborCellsTest, EachNeighborIsACellOfThreeRowsInThisOrder) {
   decode(threeNeighbors());
   EXPECT_EQ(shown(), listOf({first, second, third}));
@@ -214,27 +209,12 @@ TEST_F(MeasuredNeighborCellsTest, EveryTruncatedReportKeepsItsWholeRecords) {
   });
 }
 
-TEST_F(MeasuredNeighborCellsTest, AReportOf28BytesIsDroppedSilently) {
-  expectIgnored(Bytes(28, 0), reportCode, {trace});
-}
-
 TEST_F(MeasuredNeighborCellsTest, AReportOf30BytesIsAccepted) {
   putOldContent();
   decode(report(0, 0, 30).bytes());
   EXPECT_EQ(shown(), "[]");
   EXPECT_THAT(log.takeTexts(),
               ElementsAre(trace, "<3>Unexpected log packet bytes size: expected=0 actual=30"));
-}
-
-TEST_F(MeasuredNeighborCellsTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(threeNeighbors(), 0xB17F, {trace, "<3>Received an unknown log message: 45439"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(MeasuredNeighborCellsTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(threeNeighbors()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(report(0, 0, 29).bytes()),
-              ElementsAre(trace, "<3>Unexpected log packet bytes size: expected=0 actual=29"));
 }
 
 }  // namespace

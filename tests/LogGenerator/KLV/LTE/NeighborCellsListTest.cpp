@@ -76,11 +76,6 @@ std::vector<std::string> linesOf(const char* countLine, std::size_t cells) {
 constexpr const char* countOf1 = "<4>Number of neighboring cells being reported: 1\n";
 constexpr const char* countOf2 = "<4>Number of neighboring cells being reported: 2\n";
 
-TEST_F(NeighborCellsListTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Neighbor Cells List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB180u));
-}
-
 TEST_F(NeighborCellsListTest, EachCellHasTwelveRowsInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), listOf({first, second}));
@@ -230,10 +225,6 @@ TEST_F(NeighborCellsListTest, EveryTruncatedMeasurementKeepsAndLogsItsWholeRecor
   });
 }
 
-TEST_F(NeighborCellsListTest, AMeasurementOf20BytesIsDroppedSilently) {
-  expectIgnored(Bytes(20, 0), measurementCode, {trace});
-}
-
 TEST_F(NeighborCellsListTest, MeasurementsOf21And22BytesAreAccepted) {
   for (const std::size_t size : {21u, 22u}) {
     putOldContent();
@@ -241,17 +232,6 @@ TEST_F(NeighborCellsListTest, MeasurementsOf21And22BytesAreAccepted) {
     EXPECT_EQ(shown(), "[]") << size << " bytes";
     EXPECT_THAT(log.takeTexts(), ElementsAre(trace, countOf1)) << size << " bytes";
   }
-}
-
-TEST_F(NeighborCellsListTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(twoCells(), 0xB17F, {trace, "<3>Received an unknown log message: 45439"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(NeighborCellsListTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_EQ(linesWithoutSection(twoCells()), linesOf(countOf2, 2));
-  EXPECT_THAT(linesWithoutSection(twoCells(), 0xB17F),
-              ElementsAre(trace, "<3>Received an unknown log message: 45439"));
 }
 
 }  // namespace

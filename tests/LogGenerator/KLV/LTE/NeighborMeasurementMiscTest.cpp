@@ -20,11 +20,6 @@ Bytes measurement(std::size_t size = 21) {
 
 constexpr const char* measurementRows = R"({Version: "3", E-ARFCN: "3350", Qrxlevmin: "-128 dBm"})";
 
-TEST_F(NeighborMeasurementMiscTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Neighbor Measurements");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB180u));
-}
-
 TEST_F(NeighborMeasurementMiscTest, AMeasurementShowsThreeRowsInThisOrder) {
   decode(measurement());
   EXPECT_EQ(shown(), measurementRows);
@@ -34,17 +29,6 @@ TEST_F(NeighborMeasurementMiscTest, AMeasurementShowsThreeRowsInThisOrder) {
 TEST_F(NeighborMeasurementMiscTest, AMeasurementOf22BytesShowsTheSameAsOneOf21) {
   decode(measurement(22));
   EXPECT_EQ(shown(), measurementRows);
-}
-
-TEST_F(NeighborMeasurementMiscTest, AMeasurementOf20BytesIsDroppedSilently) {
-  expectIgnored(Bytes(20, 0), measurementCode, {trace});
-}
-
-TEST_F(NeighborMeasurementMiscTest, EveryTruncatedMeasurementIsDroppedSilently) {
-  forEachTruncation(measurement(), [&](std::size_t, const std::vector<std::string>& lines) {
-    EXPECT_EQ(shown(), oldContent());
-    EXPECT_THAT(lines, ElementsAre(trace));
-  });
 }
 
 TEST_F(NeighborMeasurementMiscTest, AllOnesShowTheHighEndOfEachScale) {
@@ -66,17 +50,6 @@ TEST_F(NeighborMeasurementMiscTest, EachBitCountsInItsOwnRowAlone) {
                             0,
                             "-140 dBm",
                             {"-138 dBm", "-136 dBm", "-132 dBm", "-124 dBm", "-108 dBm", "-76 dBm"}}});
-}
-
-TEST_F(NeighborMeasurementMiscTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(measurement(), 0xB186, {trace, "<3>Received an unknown log message: 45446"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(NeighborMeasurementMiscTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(measurement()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(measurement(), 0xB186),
-              ElementsAre(trace, "<3>Received an unknown log message: 45446"));
 }
 
 }  // namespace

@@ -47,11 +47,6 @@ constexpr const char* hrpdCandidate =
     R"({Candidate Priority: "1300", Candidate RAT Type: "CDMAHRPD", Band: "7", Channel: "283", Pilot: "511"})";
 constexpr const char* unknownCandidate = R"({Candidate Priority: "263", Candidate RAT Type: "??"})";
 
-TEST_F(ReselectionCandidatesListTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Reselection Candidates List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB186u));
-}
-
 TEST_F(ReselectionCandidatesListTest, AnLTECandidateShowsItsFrequencyAndCell) {
   decode(candidate(0, 29).u16(25, 1300).u16(27, 0x96B5).bytes());
   EXPECT_EQ(shown(),
@@ -228,27 +223,12 @@ TEST_F(ReselectionCandidatesListTest, EveryTruncatedReselectionKeepsItsWholeCand
   });
 }
 
-TEST_F(ReselectionCandidatesListTest, AReselectionOf20BytesIsDroppedSilently) {
-  expectIgnored(Bytes(20, 0), reselectionCode, {trace});
-}
-
 TEST_F(ReselectionCandidatesListTest, ReselectionsOf21And22BytesAreAccepted) {
   for (const std::size_t size : {21u, 22u}) {
     putOldContent();
     decode(reselection(0, size).bytes());
     EXPECT_EQ(shown(), "[]") << size << " bytes";
   }
-}
-
-TEST_F(ReselectionCandidatesListTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(threeCandidates(), 0xB180, {trace, "<3>Received an unknown log message: 45440"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(ReselectionCandidatesListTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(threeCandidates()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(threeCandidates(), 0xB180),
-              ElementsAre(trace, "<3>Received an unknown log message: 45440"));
 }
 
 }  // namespace

@@ -20,11 +20,6 @@ Bytes reselection(std::size_t size = 21) {
 
 constexpr const char* reselectionRows = R"({Version: "4", Serving EARFCN: "1300", Serving Cell ID: "301"})";
 
-TEST_F(ReselectionCandidatesMiscTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Reselection Candidates");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB186u));
-}
-
 TEST_F(ReselectionCandidatesMiscTest, AReselectionShowsThreeRowsInThisOrder) {
   decode(reselection());
   EXPECT_EQ(shown(), reselectionRows);
@@ -34,17 +29,6 @@ TEST_F(ReselectionCandidatesMiscTest, AReselectionShowsThreeRowsInThisOrder) {
 TEST_F(ReselectionCandidatesMiscTest, AReselectionOf22BytesShowsTheSameAsOneOf21) {
   decode(reselection(22));
   EXPECT_EQ(shown(), reselectionRows);
-}
-
-TEST_F(ReselectionCandidatesMiscTest, AReselectionOf20BytesIsDroppedSilently) {
-  expectIgnored(Bytes(20, 0), reselectionCode, {trace});
-}
-
-TEST_F(ReselectionCandidatesMiscTest, EveryTruncatedReselectionIsDroppedSilently) {
-  forEachTruncation(reselection(), [&](std::size_t, const std::vector<std::string>& lines) {
-    EXPECT_EQ(shown(), oldContent());
-    EXPECT_THAT(lines, ElementsAre(trace));
-  });
 }
 
 TEST_F(ReselectionCandidatesMiscTest, AllOnesAreShownUnsigned) {
@@ -60,17 +44,6 @@ TEST_F(ReselectionCandidatesMiscTest, EachBitCountsInItsOwnRowAlone) {
                           {{"Version", 13, 0, "0", {"1", "2", "4", "8", "16", "32", "64", "128"}},
                            {"Serving EARFCN", 15, 0, "0", powersOfTwo},
                            {"Serving Cell ID", 17, 0, "0", powersOfTwo}});
-}
-
-TEST_F(ReselectionCandidatesMiscTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(reselection(), 0xB180, {trace, "<3>Received an unknown log message: 45440"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(ReselectionCandidatesMiscTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(reselection()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(reselection(), 0xB180),
-              ElementsAre(trace, "<3>Received an unknown log message: 45440"));
 }
 
 }  // namespace

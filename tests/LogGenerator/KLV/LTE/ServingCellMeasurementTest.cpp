@@ -46,11 +46,6 @@ constexpr const char* measurementRows =
     R"(S Intra Search: "62 dB", S Non Intra Search: "22 dBm", Measurement Rules Updated: "True", )"
     R"(Measurement Rules: "9"})";
 
-TEST_F(ServingCellMeasurementTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Serving Cell Measurements");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB17Fu));
-}
-
 TEST_F(ServingCellMeasurementTest, AMeasurementShowsEighteenRowsInThisOrder) {
   decode(measurement());
   EXPECT_EQ(shown(), measurementRows);
@@ -60,17 +55,6 @@ TEST_F(ServingCellMeasurementTest, AMeasurementShowsEighteenRowsInThisOrder) {
 TEST_F(ServingCellMeasurementTest, AMeasurementOf34BytesShowsTheSameAsOneOf33) {
   decode(measurement(34));
   EXPECT_EQ(shown(), measurementRows);
-}
-
-TEST_F(ServingCellMeasurementTest, AMeasurementOf32BytesIsDroppedSilently) {
-  expectIgnored(Bytes(32, 0), measurementCode, {trace});
-}
-
-TEST_F(ServingCellMeasurementTest, EveryTruncatedMeasurementIsDroppedSilently) {
-  forEachTruncation(measurement(), [&](std::size_t, const std::vector<std::string>& lines) {
-    EXPECT_EQ(shown(), oldContent());
-    EXPECT_THAT(lines, ElementsAre(trace));
-  });
 }
 
 TEST_F(ServingCellMeasurementTest, ZerosShowTheLowEndOfEachScale) {
@@ -201,17 +185,6 @@ TEST_F(ServingCellMeasurementTest, EachMeasurementOverwritesTheRowsAndKeepsTheir
   EXPECT_EQ(section.dictionary()->begin()->key, "Measurement Rules");
   EXPECT_EQ(shown("Measurement Rules"), R"("9")");
   EXPECT_EQ(shown("P_Max"), R"("23 dBm")");
-}
-
-TEST_F(ServingCellMeasurementTest, AForeignCodeIsReportedBehindTheTraceLineAndChangesNothing) {
-  expectIgnored(measurement(), 0xB179, {trace, "<3>Received an unknown log message: 45433"});
-  expectIgnored({}, 0xFFFFFFFF, {trace, "<3>Received an unknown log message: -1"});
-}
-
-TEST_F(ServingCellMeasurementTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(measurement()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(measurement(), 0xB179),
-              ElementsAre(trace, "<3>Received an unknown log message: 45433"));
 }
 
 }  // namespace

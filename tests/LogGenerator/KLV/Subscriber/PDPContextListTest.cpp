@@ -43,11 +43,6 @@ class PDPContextListTest : public testing::Test {
   Value section = Value::ofArray({"old"});
 };
 
-TEST_F(PDPContextListTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "PDP Context Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xFF0002u));
-}
-
 TEST_F(PDPContextListTest, ShowsExactlyTheLastArrayReceived) {
   decode(serverMessage(pdpCode, Value::ofArray({dictionaryOf({{"APN", "internet"}, {"Address", "10.0.0.1"}}),
                                                 dictionaryOf({{"APN", "ims"}})})));
@@ -111,13 +106,6 @@ TEST_F(PDPContextListTest, TheReplacementHoldsTheArrayLock) {
   EXPECT_EQ(status, std::future_status::timeout);
   EXPECT_EQ(whileHeld, R"(["old"])");
   EXPECT_EQ(shown(), R"(["new"])");
-}
-
-TEST_F(PDPContextListTest, WithoutASectionEverythingRunsAndLogsAsUsual) {
-  PDPContextList sectionless;
-  const Bytes message = serverMessage(pdpCode, Value::ofArray({"new"}));
-  sectionless.updateWithData_logCode(Packet(message), pdpCode);
-  EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
 }  // namespace

@@ -43,11 +43,6 @@ class SimInfoTest : public testing::Test {
   Value section = Value::ofDictionary();
 };
 
-TEST_F(SimInfoTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "SIM Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xFF0000u));
-}
-
 TEST_F(SimInfoTest, EachFileHasItsRowInTheOrderOfTheTableWhateverThatOfThePayload) {
   decodeFiles({{"kSimFile_OPLMNAcT", "14"},
                {"kSimFile_OPL", "13"},
@@ -115,13 +110,6 @@ TEST_F(SimInfoTest, AnEmptyDictionaryChangesNothing) {
   decodeFiles({});
   EXPECT_EQ(shown(), R"({EF-LOCI: "old"})");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
-}
-
-TEST_F(SimInfoTest, AForeignCodeStopsBehindTheTraceLine) {
-  decode(serverMessage(simCode, dictionaryOf({{"kSimFile_ICCID", "8949"}})), 0xFF0002);
-  decode(serverMessageOfText(simCode, "unreadable"), 0x0000);
-  EXPECT_EQ(shown(), "{}");
-  EXPECT_THAT(log.takeTexts(), ElementsAre(trace, trace));
 }
 
 TEST_F(SimInfoTest, APayloadThatIsNoPropertyListIsReportedAndThrows) {

@@ -38,11 +38,6 @@ constexpr const char* second =
     R"({CCTRCH ID: "9", TSNUM: "254", SIR: ["0", "252", "251", "129", "128", "127"]})";
 constexpr const char* zeros = R"({CCTRCH ID: "0", TSNUM: "0", SIR: ["0", "0", "0", "0", "0", "0"]})";
 
-TEST_F(CCTRCHSIRMeasurementTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "CCTRCH SIR");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD00Cu));
-}
-
 TEST_F(CCTRCHSIRMeasurementTest, EachOfTwoChannelsHasTwoRowsAndAListOfSixRatios) {
   decode(twoChannels());
   EXPECT_EQ(shown(), listOf({first, second}));
@@ -126,26 +121,12 @@ TEST_F(CCTRCHSIRMeasurementTest, EveryTruncatedPacketKeepsItsWholeRecords) {
   });
 }
 
-TEST_F(CCTRCHSIRMeasurementTest, APacketOf16BytesIsDroppedSilently) {
-  expectIgnored(Bytes(16, 0), channelsCode, {trace});
-}
-
 TEST_F(CCTRCHSIRMeasurementTest, PacketsOf17And18BytesAreAccepted) {
   for (const std::size_t size : {17u, 18u}) {
     putOldContent();
     decode(counted(0, 0, size).bytes());
     EXPECT_EQ(shown(), "[]") << size << " bytes";
   }
-}
-
-TEST_F(CCTRCHSIRMeasurementTest, AForeignCodeIsIgnoredSilently) {
-  expectIgnored(twoChannels(), 0xD00E, {trace});
-  expectIgnored({}, 0xFFFFFFFF, {trace});
-}
-
-TEST_F(CCTRCHSIRMeasurementTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(twoChannels()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(twoChannels(), 0xD00E), ElementsAre(trace));
 }
 
 }  // namespace

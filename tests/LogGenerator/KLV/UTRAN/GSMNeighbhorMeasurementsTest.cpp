@@ -43,11 +43,6 @@ constexpr const char* first =
 constexpr const char* second =
     R"({Cell ID: "7", Band Indicator: "1", BSIC Valid: "0", NCC: "8", BCC: "9", ARFCN: "62", RSSI: "12"})";
 
-TEST_F(GSMNeighbhorMeasurementsTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "GSM Neighbor Cell List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD00Eu));
-}
-
 TEST_F(GSMNeighbhorMeasurementsTest, EachCellHasSevenRowsInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), listOf({first, second}));
@@ -143,26 +138,12 @@ TEST_F(GSMNeighbhorMeasurementsTest, EveryTruncatedPacketKeepsItsWholeRecords) {
   });
 }
 
-TEST_F(GSMNeighbhorMeasurementsTest, APacketOf16BytesIsDroppedSilently) {
-  expectIgnored(Bytes(16, 0), neighborsCode, {trace});
-}
-
 TEST_F(GSMNeighbhorMeasurementsTest, PacketsOf17And18BytesAreAccepted) {
   for (const std::size_t size : {17u, 18u}) {
     putOldContent();
     decode(counted(0, size).bytes());
     EXPECT_EQ(shown(), "[]") << size << " bytes";
   }
-}
-
-TEST_F(GSMNeighbhorMeasurementsTest, AForeignCodeIsIgnoredSilently) {
-  expectIgnored(twoCells(), 0xD00A, {trace});
-  expectIgnored({}, 0xFFFFFFFF, {trace});
-}
-
-TEST_F(GSMNeighbhorMeasurementsTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(twoCells()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(twoCells(), 0xD00A), ElementsAre(trace));
 }
 
 }  // namespace

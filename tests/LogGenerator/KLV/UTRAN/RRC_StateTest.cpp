@@ -19,11 +19,6 @@ Bytes state(std::uint8_t version, std::uint8_t mode, std::size_t size = 15) {
   return PacketBuilder(stateCode, size).fill(0xEE).u8(13, version).u8(14, mode).bytes();
 }
 
-TEST_F(RRC_StateTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "RRC Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD0E0u));
-}
-
 TEST_F(RRC_StateTest, AStateIsShownThenTheWholeSectionIsLogged) {
   decode(state(1, 3));
   EXPECT_EQ(shown(), R"({State: "Cell DCH"})");
@@ -106,11 +101,6 @@ TEST_F(RRC_StateTest, EveryTruncatedStateIsWarnedAboutAndTakenWithMode255) {
                     "<4>Display Dict = {Old = \"row\"; State = \"Unknown RRC Mode\"; }, "
                     "rrc mode = 255 Unknown RRC Mode"));
   });
-}
-
-TEST_F(RRC_StateTest, AForeignCodeIsIgnoredSilently) {
-  expectIgnored(state(1, 3), 0xD0E2, {trace});
-  expectIgnored({}, 0xFFFFFFFF, {trace});
 }
 
 TEST_F(RRC_StateTest, AMissingSectionIsLoggedAsNull) {

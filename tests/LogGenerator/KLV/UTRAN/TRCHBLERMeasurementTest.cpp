@@ -39,11 +39,6 @@ constexpr const char* first = R"({TRCH ID: "1", TRCH BLER Measurement: "63"})";
 constexpr const char* second = R"({TRCH ID: "254", TRCH BLER Measurement: "0"})";
 constexpr const char* third = R"({TRCH ID: "3", TRCH BLER Measurement: "128"})";
 
-TEST_F(TRCHBLERMeasurementTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "TRCH BLER");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD00Cu));
-}
-
 TEST_F(TRCHBLERMeasurementTest, EachChannelHasTwoRowsInThisOrderAndTheTraceLineIsANotice) {
   decode(threeChannels());
   EXPECT_EQ(shown(), listOf({first, second, third}));
@@ -115,26 +110,12 @@ TEST_F(TRCHBLERMeasurementTest, EveryTruncatedPacketKeepsItsWholeRecords) {
   });
 }
 
-TEST_F(TRCHBLERMeasurementTest, APacketOf16BytesIsDroppedSilently) {
-  expectIgnored(Bytes(16, 0), channelsCode, {trace});
-}
-
 TEST_F(TRCHBLERMeasurementTest, PacketsOf17And18BytesAreAccepted) {
   for (const std::size_t size : {17u, 18u}) {
     putOldContent();
     decode(counted(0, 0, size).bytes());
     EXPECT_EQ(shown(), "[]") << size << " bytes";
   }
-}
-
-TEST_F(TRCHBLERMeasurementTest, AForeignCodeIsIgnoredSilently) {
-  expectIgnored(threeChannels(), 0xD00A, {trace});
-  expectIgnored({}, 0xFFFFFFFF, {trace});
-}
-
-TEST_F(TRCHBLERMeasurementTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(threeChannels()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(threeChannels(), 0xD00A), ElementsAre(trace));
 }
 
 }  // namespace

@@ -38,11 +38,6 @@ constexpr const char* first =
 constexpr const char* second =
     R"({UARFCN: "77", Cell ID: "0", Filter RSCP: "0.496094", Status: "DSET", inJDCS: "FALSE"})";
 
-TEST_F(UTRANNeighbhorMeasurementsTest, FillsItsSectionFromOneCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Neighbor Cell List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD00Au));
-}
-
 TEST_F(UTRANNeighbhorMeasurementsTest, EachCellHasFiveRowsInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), listOf({first, second}));
@@ -155,26 +150,12 @@ TEST_F(UTRANNeighbhorMeasurementsTest, EveryTruncatedPacketKeepsTheRecordsWhoseF
   });
 }
 
-TEST_F(UTRANNeighbhorMeasurementsTest, APacketOf20BytesIsDroppedSilently) {
-  expectIgnored(Bytes(20, 0), neighborsCode, {trace});
-}
-
 TEST_F(UTRANNeighbhorMeasurementsTest, PacketsOf21And22BytesAreAccepted) {
   for (const std::size_t size : {21u, 22u}) {
     putOldContent();
     decode(counted(0, size).bytes());
     EXPECT_EQ(shown(), "[]") << size << " bytes";
   }
-}
-
-TEST_F(UTRANNeighbhorMeasurementsTest, AForeignCodeIsIgnoredSilently) {
-  expectIgnored(twoCells(), 0xD00E, {trace});
-  expectIgnored({}, 0xFFFFFFFF, {trace});
-}
-
-TEST_F(UTRANNeighbhorMeasurementsTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(twoCells()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(twoCells(), 0xD00E), ElementsAre(trace));
 }
 
 }  // namespace

@@ -52,17 +52,6 @@ constexpr const char* cellRows =
     R"({Local Area Code: "40002", Cell ID: "26885892", Freq Band Indicator: "8", )"
     R"(Cell Scrambling Code: "511", Uplink UARFCN: "10564", Downlink UARFCN: "10564"})";
 
-TEST_F(UTRANServingCellInfoTest, FillsItsSectionFromTwoCodesInThisOrder) {
-  EXPECT_EQ(decoder.getSectionName(), "Serving Cell Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD0E2u, 0xFF0001u));
-}
-
-TEST_F(UTRANServingCellInfoTest, AForeignCodeIsIgnoredSilently) {
-  expectIgnored(servingCell(), 0xD0E0, {trace});
-  expectIgnored(servingCell(), 0xFF0000, {trace});
-  expectIgnored({}, 0xFFFFFFFF, {trace});
-}
-
 TEST_F(UTRANServingCellInfoTest, AModemPacketShowsSixRowsInThisOrder) {
   decode(servingCell());
   EXPECT_EQ(shown(), servingCellRows);
@@ -72,17 +61,6 @@ TEST_F(UTRANServingCellInfoTest, AModemPacketShowsSixRowsInThisOrder) {
 TEST_F(UTRANServingCellInfoTest, AModemPacketOf27BytesShowsTheSameAsOneOf26) {
   decode(servingCell(27));
   EXPECT_EQ(shown(), servingCellRows);
-}
-
-TEST_F(UTRANServingCellInfoTest, AModemPacketOf25BytesIsDroppedSilently) {
-  expectIgnored(Bytes(25, 0), cellCode, {trace});
-}
-
-TEST_F(UTRANServingCellInfoTest, EveryTruncatedModemPacketIsDroppedSilently) {
-  forEachTruncation(servingCell(), [&](std::size_t, const std::vector<std::string>& lines) {
-    EXPECT_EQ(shown(), oldContent());
-    EXPECT_THAT(lines, ElementsAre(trace));
-  });
 }
 
 TEST_F(UTRANServingCellInfoTest, AllOnesShowAnUnsignedValueInEachRowButTheIdentity) {
@@ -250,17 +228,6 @@ TEST_F(UTRANServingCellInfoTest, TheLastPacketOfEitherKindIsShownInTheRowsThatTh
   EXPECT_EQ(shown("Downlink UARFCN"), R"("10563")");
   EXPECT_EQ(shown("Uplink UARFCN"), R"("9613")");
   EXPECT_EQ(shown("Local Area Code"), R"("40002")");
-}
-
-TEST_F(UTRANServingCellInfoTest, WithoutASectionItRunsAndLogsAsUsual) {
-  EXPECT_THAT(linesWithoutSection(servingCell()), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(servingCell(), 0xD0E0), ElementsAre(trace));
-  EXPECT_THAT(linesWithoutSection(serverMessageOfText(cellMonitorCode, ""), cellMonitorCode),
-              ElementsAre(trace, failedParse));
-  const Value record = cell("UTRAN", "Serving", 10564);
-  record.dictionary()->remove("LAC");
-  EXPECT_THAT(linesWithoutSection(serverMessage(cellMonitorCode, Value::ofArray({record})), cellMonitorCode),
-              ElementsAre(trace, "<3>Serving Cell Info: Failed to retrieve LAC\n"));
 }
 
 }  // namespace
