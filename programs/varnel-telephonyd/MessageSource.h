@@ -1,6 +1,7 @@
 #pragma once
 
 #include <chrono>
+#include <functional>
 #include <optional>
 #include <string>
 
@@ -18,17 +19,30 @@ struct StreamMessage {
 class MessageSource {
  public:
   virtual ~MessageSource() = default;
-  /// The next message, no earlier than the one before; nothing when the stream has ended.
+  /// The next message, no earlier than the one before; nothing when there is none now. Calling this means
+  /// that the message before is done with.
   virtual std::optional<StreamMessage> next() = 0;
+  /// After `next` has returned nothing: whether more messages may come. Else the stream has ended.
+  virtual bool isWaiting() const { return false; }
+  /// Gets the function that the source calls, from the main queue, when waiting is over and `next` has news.
+  virtual void setNewsHandler(std::function<void()> /*handler*/) {}
+  /// One sentence for the viewer that waits for something else than the next message; else empty.
+  virtual std::string waitNote() const { return {}; }
   /// The name of the last message for log lines, such as "Record 17 of walk.pcap".
   virtual std::string nameOfLast() const { return "A message"; }
 
   /// What happens to a message when its receiver has no room at the time when it is due.
-  enum class Lateness { Waits, IsDropped };
+  enum class Lateness {
+    Waits,
+    IsDropped,
+    IsHandedOn,  ///< it waits, and when the viewer goes, the next one gets it
+  };
   /// A stream that is not live waits.
   virtual Lateness lateness() const { return Lateness::Waits; }
   /// One sentence for the user about the end of the stream; empty when there is nothing to tell.
   virtual std::string endNote() const { return {}; }
+  /// Whether the server's user knows about the end from another viewer's stream.
+  virtual bool isEndTold() const { return false; }
 };
 
 }  // namespace varnel

@@ -38,7 +38,8 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
   auto* replay =
       app.add_option("--replay", options.replayPath,
                      "send the messages of a capture of any kind that varnel-decode reads, with the pauses "
-                     "between them; every viewer gets them from the start")
+                     "between them; every viewer gets them from the start; - is a pipe, read once, by one "
+                     "viewer at a time")
           ->excludes(simulate)
           ->type_name("CAPTURE");
   app.add_option("--technology", options.replayTechnology,
@@ -80,15 +81,26 @@ FileIdentity identityOfRecording(const std::string& path) {
   return path == "-" ? FileIdentity::ofDescriptor(STDOUT_FILENO) : FileIdentity::ofPath(path);
 }
 
+FileIdentity identityOfCapture(const std::string& path) {
+  return path == "-" ? FileIdentity::ofDescriptor(STDIN_FILENO) : FileIdentity::ofPath(path);
+}
+
+std::optional<std::string> conflictOfPipe(const Options& options) {
+  if (options.replayPath != "-") return std::nullopt;
+  if (options.loops) return "--loop needs a file, for standard input can be read only once";
+  if (::isatty(STDIN_FILENO)) return "--replay - needs a pipe, and standard input is a terminal";
+  return std::nullopt;
+}
+
 // What is wrong with the combination of valid options; nothing when they go together.
 std::optional<std::string> conflict(const Options& options) {
   if (!options.simulatedTechnology && !options.replayPath) return "one of --simulate and --replay is needed";
   if (!options.replayPath) return std::nullopt;
-  if (*options.replayPath == "-") return "--replay needs a file, for it is read once for every viewer";
+  if (const auto found = conflictOfPipe(options)) return found;
   const bool isPlayable = options.speed >= slowest && options.speed <= fastest;  // false for NaN
   if (!isPlayable) return "--speed must lie between 0.001 and 1000000";
   if (options.recordPath &&
-      identityOfRecording(*options.recordPath).isSameFileAs(FileIdentity::ofPath(*options.replayPath)))
+      identityOfRecording(*options.recordPath).isSameFileAs(identityOfCapture(*options.replayPath)))
     return "--record would overwrite the capture that is to be replayed";
   return std::nullopt;
 }

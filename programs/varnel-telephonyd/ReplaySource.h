@@ -6,21 +6,17 @@
 #include <optional>
 #include <string>
 
-#include "base/Time.h"
-#include "host/Subscription.h"
 #include "host/captures/Capture.h"
 #include "programs/varnel-telephonyd/MessageSource.h"
+#include "programs/varnel-telephonyd/ReplayPace.h"
+#include "programs/varnel-telephonyd/ReplaySubscription.h"
 
 namespace varnel {
 
-/// Plays a capture back: its messages in their order and with their distances in time. No wait is longer than
-/// five seconds. A message dated before its predecessor comes together with it. When the capture's clock was
-/// set back, the messages after that keep their distances.
+/// Plays a capture back: its messages in their order, at the pace of `ReplayPace`.
 class ReplaySource final : public MessageSource {
  public:
   enum class AtEnd { Stop, StartOver };
-
-  static constexpr std::chrono::milliseconds longestWait{5000};
 
   /// Plays the capture `speed` times as fast. When it starts over, the first message comes one second of the
   /// capture's time after the last one. If there are several subscriptions, only one is played: the given
@@ -34,32 +30,16 @@ class ReplaySource final : public MessageSource {
   std::string endNote() const override { return _endNote; }
 
  private:
-  /// A moment of the capture, and when it is played.
-  struct Moment {
-    Time time;
-    std::chrono::milliseconds at;  // of the stream
-  };
-
   bool readRecord(CaptureRecord& record);
-  bool readTaken(CaptureRecord& record);
-  void noteOther(std::uint8_t subscription);
-  Moment following(Time time);
-  void tellShortening(Time time);
-  std::chrono::milliseconds playingTime(std::chrono::nanoseconds duration) const;
-  std::unique_ptr<Capture> open() const;
+  static StreamMessage message(std::chrono::milliseconds at, const CaptureRecord& record);
 
   const std::string _path;
-  const double _speed;
   const AtEnd _atEnd;
-  SubscriptionFilter _subscriptions;
-  bool _tellsOthers;  // whether other subscriptions still have to be reported
-  bool _hasOthers = false;
+  ReplaySubscription _subscription;
+  ReplayPace _pace;
   std::unique_ptr<Capture> _capture;  // open while it is played
   std::size_t _recordsRead = 0;       // in this round
-  std::optional<Moment> _last;        // absent before the first record
-  Moment _origin{};                   // from here the distances are measured
-  bool _hasToldShortening = false;
-  std::string _endNote;  // empty before the end
+  std::string _endNote;               // empty before the end
 };
 
 }  // namespace varnel

@@ -81,6 +81,11 @@ void ServedChannel::start(CodeFilter filter) {
   if (_source) return;
   _source = _host.makeSource();
   _startedAt = _host.uptime();
+  _source->setNewsHandler([this] {
+    if (_next || !_ended) return;
+    takeNext();
+    sendLater(0ms);
+  });
   takeNext();
   sendLater(0ms);
 }
@@ -101,15 +106,25 @@ void ServedChannel::sendWhatIsDue() {
 
 void ServedChannel::takeNext() {
   _isReceived = false;
+  const bool isEndTold = _source->isEndTold();
   _next = _source->next();
-  if (_next) return;
+  noteWait();
+  if (_next || _source->isWaiting()) return;
   const std::string sentence = _source->endNote();
   if (sentence.empty()) return;
   note(sentence);
-  _host.tell(sentence);
+  if (!isEndTold) _host.tell(sentence);
+}
+
+// A note about something else stays.
+void ServedChannel::noteWait() {
+  const std::string sentence = _source->waitNote();
+  if (!sentence.empty() || _report.note == _waitNote) note(sentence);
+  _waitNote = sentence;
 }
 
 void ServedChannel::sendLater(std::chrono::milliseconds delay) {
+  if (!_next) return;
   _host.queue.after(delay, [weak = weak_from_this()] {
     if (const auto channel = weak.lock()) channel->sendWhatIsDue();
   });
@@ -141,7 +156,7 @@ ServedChannel::Delivery ServedChannel::waitForRoom() {
     return Delivery::Ended;
   }
   const bool isLate = now - (_startedAt + _next->at) > longestDelay;
-  if (!isLate || _source->lateness() == MessageSource::Lateness::Waits) return Delivery::NoRoom;
+  if (!isLate || _source->lateness() != MessageSource::Lateness::IsDropped) return Delivery::NoRoom;
   ++_counts.dropped;
   return Delivery::Done;
 }
@@ -155,7 +170,14 @@ ServedChannel::Delivery ServedChannel::refuseLength(std::size_t length) {
 }
 
 void ServedChannel::end() {
-  if (_next && _isReceived) ++_counts.dropped;
+  if (_next && _isReceived) {
+    // What is handed on is counted with the viewer that gets it.
+    if (_source->lateness() == MessageSource::Lateness::IsHandedOn) {
+      --_counts.received;
+    } else {
+      ++_counts.dropped;
+    }
+  }
   _next.reset();
   // This must be last: it may release this channel.
   if (const auto ended = std::exchange(_ended, nullptr)) ended();

@@ -66,6 +66,7 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   Delivery waitForRoom();
   Delivery refuseLength(std::size_t length);
   void takeNext();
+  void noteWait();
   void endWithoutCommand();
   void reportToViewer();
 
@@ -83,7 +84,8 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   bool _hasCommand = false;  // true once a command was understood
   bool _isReceived = false;  // true once the next message was due, and counted
   MessageCounts _counts;
-  StreamReport _report;  // without the numbers
+  std::string _waitNote;  // of the source, as it was last
+  StreamReport _report;   // without the numbers
   StreamReport _sentReport;
 };
 

@@ -1,3 +1,5 @@
+#include <unistd.h>
+
 #include <algorithm>
 #include <csignal>
 #include <cstdio>
@@ -19,6 +21,8 @@
 #include "host/captures/Capture.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/Options.h"
+#include "programs/varnel-telephonyd/PipeReader.h"
+#include "programs/varnel-telephonyd/PipedReplay.h"
 #include "programs/varnel-telephonyd/Recorder.h"
 #include "programs/varnel-telephonyd/ReplaySource.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
@@ -76,19 +80,53 @@ std::unique_ptr<MessageSource> makeSource(const Options& options) {
   return std::make_unique<ReplaySource>(*options.replayPath, options.speed, atEnd, options.subscription);
 }
 
+// The reader of standard input, if that is what is replayed.
+std::unique_ptr<PipeReader> makePipeReader(const Options& options) {
+  if (options.replayPath != "-") return nullptr;
+  return std::make_unique<PipeReader>(STDIN_FILENO, captureName("-"));
+}
+
+// The technology that the capture names. Throws CaptureError.
+std::optional<std::string> technologyOfCapture(const Options& options, PipeReader* pipe) {
+  if (!pipe) return openCapture(*options.replayPath)->technology();
+  // A live pipe may begin much later, so its beginning is read only where it is needed.
+  if (options.replayTechnology) return std::nullopt;
+  if (!pipe->isReadable())
+    tell(
+        "waiting for the beginning of standard input, which may name the technology; --technology names it "
+        "at once");
+  return pipe->technology();
+}
+
 // The technology that viewers are told. Opens the capture, if there is one, to ask it. Throws CaptureError.
-std::string technologyOf(const Options& options) {
+std::string technologyOf(const Options& options, PipeReader* pipe) {
   if (options.simulatedTechnology) return *options.simulatedTechnology;
-  const auto named = openCapture(*options.replayPath)->technology();
+  const auto named = technologyOfCapture(options, pipe);
   if (options.replayTechnology) return *options.replayTechnology;
   const auto known = simulatedTechnologies();
   const bool isKnown = named && std::ranges::find(known, *named) != std::ranges::end(known);
   return isKnown ? *named : std::string(technology::kalviLTE);
 }
 
+// The replay of the pipe, which the reader wakes through the queue; none without a reader.
+std::unique_ptr<PipedReplay> makePipedReplay(const Options& options, MainQueue& queue,
+                                             std::unique_ptr<PipeReader> reader) {
+  if (!reader) return nullptr;
+  PipeReader& pipe = *reader;
+  auto replay = std::make_unique<PipedReplay>(PipedReplay::Setup{.reader = std::move(reader),
+                                                                 .queue = queue,
+                                                                 .uptime = uptime,
+                                                                 .name = captureName("-"),
+                                                                 .speed = options.speed,
+                                                                 .subscription = options.subscription});
+  pipe.start([&queue, &replay = *replay] { queue.async([&replay] { replay.recordArrived(); }); });
+  return replay;
+}
+
 int serve(int& argumentCount, char** arguments, const Options& options) {
   // A capture that cannot be replayed is reported now, not when the first viewer comes.
-  const std::string technology = technologyOf(options);
+  std::unique_ptr<PipeReader> reader = makePipeReader(options);
+  const std::string technology = technologyOf(options, reader.get());
 
   raiseDescriptorLimit(mostFiles);
   HostApplication application(argumentCount, arguments);
@@ -97,17 +135,19 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   const std::filesystem::path folder = runtimeFolder(options.runtimeFolder);
   SocketPorts ports(folder);
   EventLoopQueue queue;
+  const std::unique_ptr<PipedReplay> pipedReplay = makePipedReplay(options, queue, std::move(reader));
   std::unique_ptr<Recorder> recorder;
-  TelephonyServer server({.ports = ports,
-                          .queue = queue,
-                          .uptime = uptime,
-                          .technology = technology,
-                          .makeSource = [&] { return makeSource(options); },
-                          .messageSent =
-                              [&](ByteView message) {
-                                if (recorder) recorder->record(message);
-                              },
-                          .tell = tell});
+  TelephonyServer server(
+      {.ports = ports,
+       .queue = queue,
+       .uptime = uptime,
+       .technology = technology,
+       .makeSource = [&] { return pipedReplay ? pipedReplay->makeSource() : makeSource(options); },
+       .messageSent =
+           [&](ByteView message) {
+             if (recorder) recorder->record(message);
+           },
+       .tell = tell});
   const TelephonyListener listener(
       folder, [&](std::string_view viewerPortName) { return server.createLogChannel(viewerPortName); });
   recorder = makeRecorder(options, queue, server, technology);

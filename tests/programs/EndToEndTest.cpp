@@ -1,5 +1,7 @@
+#include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <algorithm>
 #include <filesystem>
@@ -7,6 +9,7 @@
 #include <memory>
 #include <regex>
 
+#include "host/FileDescriptor.h"
 #include "tests/support/Process.h"
 
 namespace varnel {
@@ -124,6 +127,113 @@ TEST_F(EndToEnd, OfSeveralSimCardsAViewerShowsTheOneThatItIsAskedFor) {
   EXPECT_THAT(second, HasSubstr("Average RSRP"));
   EXPECT_THAT(first, Not(testing::ContainsRegex("Num Tx Antennas +4\n")));
   EXPECT_THAT(first, HasSubstr("Average RSRP"));
+}
+
+// A pipe whose reader is the server.
+class ReplayedPipe : public EndToEnd {
+ protected:
+  ReplayedPipe() {
+    if (::mkfifo(path().c_str(), 0600) != 0) ADD_FAILURE() << "no pipe";
+    // With both ends, opening does not wait for the server.
+    _writer = FileDescriptor(::open(path().c_str(), O_RDWR | O_CLOEXEC));
+  }
+  std::string path() const { return _device.file("pipe"); }
+
+  std::unique_ptr<Process> server(const std::vector<std::string>& more = {}) const {
+    std::vector<std::string> arguments{"-c",
+                                       "exec \"$0\" \"$@\" <'" + path() + "'",
+                                       VARNEL_TELEPHONYD_PROGRAM,
+                                       "--replay",
+                                       "-",
+                                       "--runtime-dir",
+                                       _runtime.path()};
+    arguments.insert(arguments.end(), more.begin(), more.end());
+    return std::make_unique<Process>("/bin/sh", arguments);
+  }
+  void write(const std::string& bytes) const {
+    EXPECT_EQ(::write(_writer.number(), bytes.data(), bytes.size()), static_cast<ssize_t>(bytes.size()));
+  }
+  void writeHeader() const {
+    write(std::string("\x4D\x3C\xB2\xA1\x02\0\x04\0\0\0\0\0\0\0\0\0\0\0\x04\0\x93\0\0\0", 24));
+  }
+  // A record that says how many antennas there are.
+  void writeAntennas(char second, char antennas) const {
+    const std::string message = packetOf("", 0xB0C1, std::string(7, '\0') + antennas + '\0');
+    const std::string size{static_cast<char>(message.size()), '\0', '\0', '\0'};
+    write(second + std::string(7, '\0') + size + size + message);
+  }
+  void closeWriter() { _writer = FileDescriptor(); }
+
+  static testing::AssertionResult tells(const Process& program, const std::string& part) {
+    if (eventually([&] { return program.error().find(part) != std::string::npos; }))
+      return testing::AssertionSuccess();
+    return testing::AssertionFailure() << "not told: " << part << ", but:\n" << program.error();
+  }
+  static testing::AssertionResult shows(const Process& viewer, const std::string& antennas) {
+    const std::regex row("Num Tx Antennas +" + antennas + "\n");
+    if (eventually([&] { return std::regex_search(viewer.output(), row); }))
+      return testing::AssertionSuccess();
+    return testing::AssertionFailure() << "not shown: " << antennas << ", but:\n" << viewer.output();
+  }
+
+ private:
+  FileDescriptor _writer;
+};
+
+TEST_F(ReplayedPipe, IsALiveViewForOneViewerAfterAnother) {
+  const auto telephony = server({"--log-level", "5"});
+  ASSERT_TRUE(tells(*telephony, "waiting for the beginning of standard input"));
+  writeHeader();
+  ASSERT_TRUE(tells(*telephony, "serving kalvi-lte in "));
+  auto varnel = viewer();
+  writeAntennas(1, 4);
+  EXPECT_TRUE(shows(*varnel, "4"));
+  writeAntennas(100, 1);
+  EXPECT_TRUE(shows(*varnel, "1"));
+  varnel.reset();
+  ASSERT_TRUE(tells(*telephony, "A log channel is closed"));
+  writeAntennas(101, 2);
+  varnel = viewer();
+  EXPECT_TRUE(shows(*varnel, "2"));
+  EXPECT_THAT(varnel->output(), Not(testing::ContainsRegex("Num Tx Antennas +[14]\n")));
+  closeWriter();
+  ASSERT_TRUE(tells(*telephony, "the replay of standard input has ended\n"));
+  varnel.reset();
+  varnel = viewer();
+  ASSERT_TRUE(eventually([&] {
+    return varnel->output().find("Notice: The replay of standard input has ended") != std::string::npos;
+  })) << varnel->output();
+  telephony->signal(SIGTERM);
+  ASSERT_TRUE(telephony->waitForEnd());
+  EXPECT_EQ(telephony->exitStatus(), 0);
+  EXPECT_EQ(occurrences(telephony->error(), "the replay of standard input has ended"), 1u)
+      << telephony->error();
+  EXPECT_THAT(telephony->error(), HasSubstr("messages: 3 received, 3 delivered, 0 dropped"));
+}
+
+TEST_F(ReplayedPipe, IsServedAtOnceWhenTheTechnologyIsNamedAndTheServerEndsWhileItWaits) {
+  const auto telephony = server({"--technology", "kalvi-utran-2"});
+  ASSERT_TRUE(tells(*telephony, "serving kalvi-utran-2 in "));
+  const auto varnel = viewer();
+  ASSERT_TRUE(logsAgain(*varnel, streaming));
+  telephony->signal(SIGTERM);
+  ASSERT_TRUE(telephony->waitForEnd());
+  EXPECT_EQ(telephony->exitStatus(), 0) << telephony->error();
+}
+
+TEST_F(EndToEnd, AStandardInputThatCannotBeReplayedIsOneLine) {
+  Process empty(VARNEL_TELEPHONYD_PROGRAM, {"--replay", "-", "--runtime-dir", _runtime.path()});
+  ASSERT_TRUE(empty.waitForEnd());
+  EXPECT_EQ(empty.exitStatus(), 1);
+  EXPECT_EQ(empty.error(), "varnel-telephonyd: standard input is empty, and so no capture\n");
+  const Terminal terminal;
+  Process typed(VARNEL_TELEPHONYD_PROGRAM, {"--replay", "-", "--runtime-dir", _runtime.path()}, {},
+                &terminal);
+  ASSERT_TRUE(typed.waitForEnd());
+  EXPECT_EQ(typed.exitStatus(), 2);
+  EXPECT_EQ(typed.error(),
+            "varnel-telephonyd: --replay - needs a pipe, and standard input is a terminal; see "
+            "varnel-telephonyd --help\n");
 }
 
 TEST_F(EndToEnd, AKilledServerIsNoticedAndSoIsItsReturn) {

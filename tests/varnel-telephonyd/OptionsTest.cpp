@@ -81,7 +81,7 @@ TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
       {"--replay", "walk.pcap", "--sim", "0"},
       {"--replay", "walk.pcap", "--sim", "256"},
       {"--simulate", "kalvi-lte", "--sim", "1"},
-      {"--replay", "-"},
+      {"--replay", "-", "--loop"},
       {"--replay", "/etc/passwd", "--record", "/etc/../etc/passwd"},
       {"--replay", "/etc/no-such-file", "--record", "/etc/../etc/no-such-file"},
       {"--simulate", "kalvi-lte", "--overwrite"},
