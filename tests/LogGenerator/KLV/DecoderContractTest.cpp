@@ -441,6 +441,7 @@ TEST_P(PacketContractTest, APacketOfTheMinimumLengthIsTaken) {
     EXPECT_NE(subject.shown(), DecoderInItsIndex::filled(contract.kind));
   } else {
     EXPECT_EQ(subject.shown(), DecoderInItsIndex::filled(contract.kind));
+    EXPECT_EQ(subject.index().subscription(packet.code)->shortestTaken, packet.minimumLength);
   }
 }
 
