@@ -61,7 +61,7 @@ void collect(const Value& value, std::string_view key, std::vector<Value>& found
   }
 }
 
-// The labels of a section's rows, those of lists marked as such.
+// The labels of a section's entries, those of lists marked as such.
 Names rowsOf(const Dictionary& section) {
   Names labels;
   for (const auto& [label, value] : section) labels.insert(label + (value.array() ? " (a list)" : ""));
@@ -139,7 +139,7 @@ TEST_P(DisplayTemplate, HasEachSectionOnce) {
   for (const std::string& name : GetParam().unfilled) EXPECT_EQ(sections(name).size(), 1u) << name;
 }
 
-TEST_P(DisplayTemplate, HasAnEmptyArrayForASectionOfAListAndADictionaryForOneOfRows) {
+TEST_P(DisplayTemplate, HasAnEmptyArrayForASectionOfAListAndADictionaryForOneOfEntries) {
   const Names ofLists = changed([] { return Value::ofArray({"old"}); });
   const Names ofRows = changed([] { return Value::ofDictionary(); });
   for (const std::string& name : filled) {
@@ -153,7 +153,7 @@ TEST_P(DisplayTemplate, HasAnEmptyArrayForASectionOfAListAndADictionaryForOneOfR
   }
 }
 
-TEST_P(DisplayTemplate, HasTheRowsThatDecodersWriteAndNoOthers) {
+TEST_P(DisplayTemplate, HasTheEntriesThatDecodersWriteAndNoOthers) {
   std::map<std::string, Names> written;
   const auto collectRows = [&](const std::string& name, const Value& content) {
     written[name].merge(rowsOf(*content.dictionary()));

@@ -102,7 +102,7 @@ TEST(ListSections, ChangeUnderTheArrayLockAlone) {
   }
 }
 
-TEST(ListSections, AListThatARowHoldsIsMadeAnewWithoutTheLock) {
+TEST(ListSections, AListThatAnEntryHoldsIsMadeAnewWithoutTheLock) {
   std::vector<Decoding> decodings;
   ArrayLock::lockArray();
   decodings.push_back(decodingInto<BLER>(Value::ofDictionary(), PacketBuilder(0x4116, 16).bytes(), 0x4116));

@@ -34,7 +34,7 @@ std::string row(int scramblingCode, int rscp, int energy) {
          " dB\", Energy Per Chip: \"" + std::to_string(energy) + " dB\"}";
 }
 
-TEST_F(ActiveSetTest, EachCellHasThreeRowsInThisOrder) {
+TEST_F(ActiveSetTest, EachCellHasThreeEntriesInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), R"([{Scrambling Code: "4660", RSCP: "-85 dB", Energy Per Chip: "-10 dB"}, )"
                      R"({Scrambling Code: "258", RSCP: "-96 dB", Energy Per Chip: "-21 dB"}])");

@@ -14,7 +14,7 @@ constexpr const char* trace = "<4>BLER";
 class BLERTest : public RowsDecoderTest<BLER, blocksCode> {
  protected:
   const Array& channels() const { return *section.dictionary()->get("Transport Channels").array(); }
-  /// A row of the first channel.
+  /// An entry of the first channel.
   std::string shownOfChannel(std::string_view label) const {
     return described(channels().front().dictionary()->get(label));
   }
@@ -45,7 +45,7 @@ std::string row(const char* identity, const char* received, const char* inError)
          "\", CRC Received in Error: \"" + inError + "\"}";
 }
 
-TEST_F(BLERTest, TheWindowStandsBeforeTheChannelsAndEachChannelHasThreeRowsInThisOrder) {
+TEST_F(BLERTest, TheWindowStandsBeforeTheChannelsAndEachChannelHasThreeEntriesInThisOrder) {
   decode(twoChannels());
   EXPECT_EQ(shown(), R"({Window Size: "300", Transport Channels: [)"
                      R"({Transport Channel ID: "5", CRC Received: "66051", CRC Received in Error: "513"}, )"
@@ -67,7 +67,7 @@ TEST_F(BLERTest, EachPacketSetsANewListAndLeavesTheOldOneAsItWas) {
   EXPECT_EQ(described(before), "[" + row("5", "66051", "513") + ", " + row("254", "7", "258") + "]");
 }
 
-TEST_F(BLERTest, OtherRowsOfTheSectionStayAsTheyAre) {
+TEST_F(BLERTest, OtherEntriesOfTheSectionStayAsTheyAre) {
   putOldContent();
   decode(counted(0, 16).bytes());
   EXPECT_EQ(shown(), R"({Old: "row", Window Size: "0", Transport Channels: []})");
@@ -79,7 +79,7 @@ TEST_F(BLERTest, TheWindowIsUnsignedAndHas16Bits) {
   EXPECT_EQ(shown("Window Size"), R"("65535")");
 }
 
-TEST_F(BLERTest, EachBitOfAChannelCountsInItsOwnRowAlone) {
+TEST_F(BLERTest, EachBitOfAChannelCountsInItsOwnEntryAlone) {
   const Bytes packet = counted(1, 34).bytes();
   const auto textsOf = [&](std::size_t bit, std::size_t runStart,
                            const std::vector<std::string_view>& texts) {

@@ -18,7 +18,7 @@ struct MeasuredCell {
 };
 
 /// A UMTS cell set packet: the signal reading, then all cells, then the energies of all cells. Bytes that no
-/// row may show are 0xEE.
+/// entry may show are 0xEE.
 inline PacketBuilder cellSetPacket(std::int16_t reading, const std::vector<MeasuredCell>& cells) {
   const std::size_t energies = 16 + 15 * cells.size();
   PacketBuilder packet(cellSetCode, energies + 44 * cells.size());

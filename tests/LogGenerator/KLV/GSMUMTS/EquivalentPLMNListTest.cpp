@@ -34,7 +34,7 @@ Bytes twoNetworks() {
   return packet.bytes();
 }
 
-TEST_F(EquivalentPLMNListTest, EachNetworkHasTwoRowsInThisOrder) {
+TEST_F(EquivalentPLMNListTest, EachNetworkHasTwoEntriesInThisOrder) {
   decode(PacketBuilder(networksCode, 23).u8(16, 1).u8(17, 2).u8(19, 6).u8(21, 2).u8(22, 1).bytes());
   EXPECT_EQ(shown(), R"([{Mobile Country Code: "262", Mobile Network Code: "1"}])");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -46,7 +46,7 @@ TEST_F(EquivalentPLMNListTest, SixBytesAreReadOfEachNetworkThoughTheNextBegins3B
                      R"({Mobile Country Code: "257", Mobile Network Code: "468"}])");
 }
 
-TEST_F(EquivalentPLMNListTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(EquivalentPLMNListTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> hundreds = {"100",  "200",  "400",  "800",
                                                   "1600", "3200", "6400", "12800"};
   const std::vector<std::string_view> tens = {"10", "20", "40", "80", "160", "320", "640", "1280"};

@@ -19,7 +19,7 @@ constexpr const char* trace = "<4>GPRSInformation";
 
 class GPRSInformationTest : public RowsDecoderTest<GPRSInformation, accessCode> {
  protected:
-  /// The minimum length shows the rows, one byte more as well, one byte less is dropped.
+  /// The minimum length shows the entries, one byte more as well, one byte less is dropped.
   void expectMinimumLength(std::size_t minimum, std::uint32_t logCode, const std::string& rowsOfZeros) {
     for (const std::size_t size : {minimum, minimum + 1}) {
       *section.dictionary() = {};
@@ -52,7 +52,7 @@ Bytes packetSystem() {
       .bytes();
 }
 
-TEST_F(GPRSInformationTest, APositionPacketShowsItsRowAlone) {
+TEST_F(GPRSInformationTest, APositionPacketShowsItsEntryAlone) {
   decode(PacketBuilder(positionCode, 15).fill(0xEE).u8(14, 1).bytes(), positionCode);
   EXPECT_EQ(shown(), R"({SI13 Position: "Located on Extended BCCH"})");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -68,7 +68,7 @@ TEST_F(GPRSInformationTest, APositionPacketNeeds15Bytes) {
   expectMinimumLength(15, positionCode, R"({SI13 Position: "Located on BCCH"})");
 }
 
-TEST_F(GPRSInformationTest, AnAccessPacketShowsThreeRowsInThisOrder) {
+TEST_F(GPRSInformationTest, AnAccessPacketShowsThreeEntriesInThisOrder) {
   decode(access());
   EXPECT_EQ(shown(), R"({Network Control Order: "NC2", PFC Supported: "Supported", )"
                      R"(Priority Access Threshold: "Allowed"})");
@@ -92,7 +92,7 @@ TEST_F(GPRSInformationTest, AccessThresholdsHaveTextsFor255And0To7AndAllFrom8OnA
                                      "1 Only", "1 to 2", "1 to 3", "1 to 4", "Allowed"}));
 }
 
-TEST_F(GPRSInformationTest, EachBitOfAnAccessPacketCountsInItsOwnRowAlone) {
+TEST_F(GPRSInformationTest, EachBitOfAnAccessPacketCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(
       PacketBuilder(accessCode, 20).bytes(), 13, 20,
       {{"PFC Supported",
@@ -118,7 +118,7 @@ TEST_F(GPRSInformationTest, AnAccessPacketNeeds18Bytes) {
                       R"rows(Priority Access Threshold: "Barred (PKT access not allowed in the Cell)"})rows");
 }
 
-TEST_F(GPRSInformationTest, ATimersPacketShowsThreeRowsInThisOrder) {
+TEST_F(GPRSInformationTest, ATimersPacketShowsThreeEntriesInThisOrder) {
   decode(timers(), timersCode);
   EXPECT_EQ(shown(), R"({T3192: "80 ms", Access Burst Type: "8-bit format", DRX Timer Max: "60"})");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -141,7 +141,7 @@ TEST_F(GPRSInformationTest, AnyAccessBurstTypeBut0IsOf11Bits) {
       [](unsigned value) { return value == 0 ? "8-bit format" : "11-bit format"; }, timersCode);
 }
 
-TEST_F(GPRSInformationTest, EachBitOfATimersPacketCountsInItsOwnRowAlone) {
+TEST_F(GPRSInformationTest, EachBitOfATimersPacketCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(
       PacketBuilder(timersCode, 26).bytes(), 13, 26,
       {{"T3192",
@@ -171,7 +171,7 @@ TEST_F(GPRSInformationTest, ABroadcastPacketNeeds34Bytes) {
   expectMinimumLength(34, broadcastCode, R"({PBCCH Present: "0"})");
 }
 
-TEST_F(GPRSInformationTest, APacketSystemPacketShowsFiveRowsInThisOrder) {
+TEST_F(GPRSInformationTest, APacketSystemPacketShowsFiveEntriesInThisOrder) {
   decode(packetSystem(), packetSystemCode);
   EXPECT_EQ(shown(), R"({Ext Measurement Order: "6", Packet PSI Status: "3", )"
                      R"(Packet SI Status: "Not Supported", Count LR: "4", Count HR: "5"})");
@@ -184,7 +184,7 @@ TEST_F(GPRSInformationTest, AnyPacketSIStatusBut0IsSupported) {
       [](unsigned value) { return value == 0 ? "Not Supported" : "Supported"; }, packetSystemCode);
 }
 
-TEST_F(GPRSInformationTest, EachBitOfAPacketSystemPacketCountsInItsOwnRowAlone) {
+TEST_F(GPRSInformationTest, EachBitOfAPacketSystemPacketCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(
       PacketBuilder(packetSystemCode, 37).bytes(), 13, 37,
       {{"Packet PSI Status", 13, 0, "0", unsignedByteBits},
@@ -244,7 +244,7 @@ TEST_F(GPRSInformationTest, ANetworkPacketNeeds32Bytes) {
   expectMinimumLength(32, networkCode, R"({Network Operating Mode: "Class 1"})");
 }
 
-TEST_F(GPRSInformationTest, EachCodeKeepsTheRowsOfTheOthers) {
+TEST_F(GPRSInformationTest, EachCodeKeepsTheEntriesOfTheOthers) {
   decode(PacketBuilder(measurementCode, 29).bytes(), measurementCode);
   decode(timers(), timersCode);
   decode(PacketBuilder(networkCode, 32).bytes(), networkCode);

@@ -39,7 +39,7 @@ constexpr const char* stateRows =
 constexpr const char* measurementRows =
     R"({Serving Rx Level: "200", Rx Quality Full: "-10", Rx Quality Sub: "66051"})";
 
-TEST_F(GSMRRInfoTest, AStatePacketShowsFourRowsInThisOrder) {
+TEST_F(GSMRRInfoTest, AStatePacketShowsFourEntriesInThisOrder) {
   decode(state(5));
   EXPECT_EQ(shown(), stateRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -83,7 +83,7 @@ TEST_F(GSMRRInfoTest, AnyModeBut0IsData) {
   expectTextOfEachByte(state(0), 16, "RR Mode", [](unsigned mode) { return mode == 0 ? "Voice" : "Data"; });
 }
 
-TEST_F(GSMRRInfoTest, EachBitOfAStatePacketCountsInItsOwnRowAlone) {
+TEST_F(GSMRRInfoTest, EachBitOfAStatePacketCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(PacketBuilder(stateCode, 19).bytes(), 13, 19,
                           {{"RR State",
                             13,
@@ -106,7 +106,7 @@ TEST_F(GSMRRInfoTest, AStatePacketOf18BytesShowsTheSameAsOneOf17) {
   EXPECT_EQ(shown(), stateRows);
 }
 
-TEST_F(GSMRRInfoTest, AMeasurementPacketShowsThreeRowsInThisOrder) {
+TEST_F(GSMRRInfoTest, AMeasurementPacketShowsThreeEntriesInThisOrder) {
   decode(measurement(), measurementCode);
   EXPECT_EQ(shown(), measurementRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -118,7 +118,7 @@ TEST_F(GSMRRInfoTest, AFullQualityOfMinus10ShowsMinus10) {
   EXPECT_EQ(shown("Rx Quality Sub"), R"("0")");
 }
 
-TEST_F(GSMRRInfoTest, EachBitOfAMeasurementCountsInItsOwnRowAlone) {
+TEST_F(GSMRRInfoTest, EachBitOfAMeasurementCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(PacketBuilder(measurementCode, 45).bytes(), 13, 45,
                           {{"Serving Rx Level", 15, 0, "0", unsignedByteBits},
                            {"Rx Quality Full", 16, 0, "0", signedLongBits},
@@ -173,7 +173,7 @@ TEST_F(GSMRRInfoTest, TimersPacketsOf24And25BytesAreDecoded) {
   }
 }
 
-TEST_F(GSMRRInfoTest, EachCodeKeepsTheRowsOfTheOthers) {
+TEST_F(GSMRRInfoTest, EachCodeKeepsTheEntriesOfTheOthers) {
   decode(timers(1), timersCode);
   decode(measurement(), measurementCode);
   decode(transmission(0), transmissionCode);

@@ -46,13 +46,13 @@ Value cell(const char* technology, const char* type, std::int64_t arfcn) {
 
 constexpr const char* cellRows = R"({Cell ID: "40002", ARFCN: "62"})";
 
-TEST_F(GSMServingCellTest, AnIdentityPacketShowsThreeRowsInThisOrder) {
+TEST_F(GSMServingCellTest, AnIdentityPacketShowsThreeEntriesInThisOrder) {
   decode(identity());
   EXPECT_EQ(shown(), identityRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(GSMServingCellTest, EachBitOfAnIdentityCountsInItsOwnRowAlone) {
+TEST_F(GSMServingCellTest, EachBitOfAnIdentityCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(PacketBuilder(identityCode, 28).bytes(), 13, 28,
                           {{"ARFCN", 13, 0, "0", unsignedWordBits},
                            {"BSIC", 15, 0, "0", unsignedWordBits},
@@ -69,7 +69,7 @@ TEST_F(GSMServingCellTest, AnIdentityPacketOf27BytesShowsTheSameAsOneOf26) {
   EXPECT_EQ(shown(), identityRows);
 }
 
-TEST_F(GSMServingCellTest, AMeasurementPacketShowsThreeRowsInThisOrder) {
+TEST_F(GSMServingCellTest, AMeasurementPacketShowsThreeEntriesInThisOrder) {
   decode(measurement(), measurementCode);
   EXPECT_EQ(shown(), measurementRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -86,7 +86,7 @@ TEST_F(GSMServingCellTest, AMeasurementOfAllOnesIsUnsigned) {
   EXPECT_EQ(shown(), R"({RSSI: "255 dBm", C1 Value: "65535", C2 Value: "65535"})");
 }
 
-TEST_F(GSMServingCellTest, EachBitOfAMeasurementCountsInItsOwnRowAloneAndC1AndC2HaveTheLow16) {
+TEST_F(GSMServingCellTest, EachBitOfAMeasurementCountsInItsOwnEntryAloneAndC1AndC2HaveTheLow16) {
   expectTextsOfSingleBits(PacketBuilder(measurementCode, 31).bytes(), 13, 31,
                           {{"RSSI",
                             15,
@@ -124,7 +124,7 @@ TEST_F(GSMServingCellTest, DedicatedPacketsOf17And18BytesAreDecoded) {
   }
 }
 
-TEST_F(GSMServingCellTest, AServingGSMCellShowsTwoRowsInThisOrder) {
+TEST_F(GSMServingCellTest, AServingGSMCellShowsTwoEntriesInThisOrder) {
   decodeCells({cell("GSM", "Serving", 62)});
   EXPECT_EQ(shown(), cellRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -160,7 +160,7 @@ TEST_F(GSMServingCellTest, AnEmptyArrayChangesNothingSilently) {
   expectIgnored(cellMonitorMessage({}), cellMonitorCode, {trace});
 }
 
-TEST_F(GSMServingCellTest, ValuesThatAreMissingAreReportedInOrderAndKeepTheirRows) {
+TEST_F(GSMServingCellTest, ValuesThatAreMissingAreReportedInOrderAndKeepTheirEntries) {
   decode(identity());
   log.take();
   decodeCells({cellRecord("GSM", "Serving")});
@@ -201,7 +201,7 @@ TEST_F(GSMServingCellTest, EveryTruncatedCellMonitorMessageIsAFailedParse) {
   expectIgnoredBelow(message.size(), message, cellMonitorCode, {trace, failedParse, noArray});
 }
 
-TEST_F(GSMServingCellTest, RowsOfTheFourCodesMixAndTheLastValueOfEachStays) {
+TEST_F(GSMServingCellTest, EntriesOfTheFourCodesMixAndTheLastValueOfEachStays) {
   decode(dedicated(62), dedicatedCode);
   decode(measurement(), measurementCode);
   decode(identity());

@@ -39,14 +39,14 @@ std::string row(const char* arfcn, const char* bsic, const char* rssi, const cha
          " dBm\", Ranking Value: \"" + ranking + "\"}";
 }
 
-TEST_F(GSMSetTest, EachCellHasFourRowsInThisOrder) {
+TEST_F(GSMSetTest, EachCellHasFourEntriesInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), R"([{ARFCN: "975", BSIC: "300", RSSI: "-87 dBm", Ranking Value: "-10"}, )"
                      R"({ARFCN: "62", BSIC: "21", RSSI: "5 dBm", Ranking Value: "1000"}])");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(GSMSetTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(GSMSetTest, EachBitCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(counted(1, 29).bytes(), 15, 29,
                           {{"ARFCN", 15, 0, "0", unsignedWordBits},
                            {"BSIC", 17, 0, "0", unsignedWordBits},
@@ -68,7 +68,7 @@ TEST_F(GSMSetTest, AllOnesAreUnsignedButForTheRssiAndTheRanking) {
   EXPECT_EQ(shown(), "[" + row("65535", "65535", "-1", "-1") + "]");
 }
 
-TEST_F(GSMSetTest, TheCountOfUMTSCellsIsNotTheCountOfRows) {
+TEST_F(GSMSetTest, TheCountOfUMTSCellsIsNotTheCountOfRecords) {
   putOldContent();
   decode(PacketBuilder(rankingCode, 50).u8(13, 3).bytes());
   EXPECT_EQ(shown(), "[]");

@@ -30,7 +30,7 @@ void putProcess(PacketBuilder& packet, std::size_t offset, std::uint8_t identity
 }
 
 // Two primary processes and, 324 bytes behind the start of the first, a secondary one, in a sea of bytes that
-// no row may show.
+// no entry may show.
 Bytes threeProcesses() {
   PacketBuilder packet(processesCode, 351);
   packet.fill(0xEE).u8(13, 2).u16(14, 0xF9F4).u8(16, 2).u8(17, 1);
@@ -50,7 +50,7 @@ const std::string second = row("2", "8", "9", "513");
 const std::string third = row("3", "10", "11", "12");
 const std::string heading = R"(Version: "2", Sub Frames: "500", Carrier Info: "Dual Carrier")";
 
-TEST_F(HSDPAInformationTest, ThreeRowsAndTwoListsAreShownInThisOrder) {
+TEST_F(HSDPAInformationTest, ThreeEntriesAndTwoListsAreShownInThisOrder) {
   decode(threeProcesses());
   EXPECT_EQ(shown(), R"({Version: "2", Sub Frames: "500", Carrier Info: "Dual Carrier", )"
                      R"(Primary HARQ Process: [)"
@@ -73,7 +73,7 @@ TEST_F(HSDPAInformationTest, EachCarrierConfigurationHasItsTextAnd3IsReserved) {
   EXPECT_EQ(carrier(0xF3), R"("Single Carrier")");
 }
 
-TEST_F(HSDPAInformationTest, EachBitOfTheHeadingCountsInItsOwnRowAlone) {
+TEST_F(HSDPAInformationTest, EachBitOfTheHeadingCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(
       counted(0, 0, 20).bytes(), 13, 16,
       {{"Version", 13, 0, "0", unsignedByteBits},
@@ -87,7 +87,7 @@ TEST_F(HSDPAInformationTest, AHeadingOfAllOnesIsUnsigned) {
   EXPECT_EQ(shown(), R"({Version: "255", Sub Frames: "1023", Carrier Info: "Reserved"})");
 }
 
-TEST_F(HSDPAInformationTest, EachBitOfAProcessCountsInItsOwnRowAlone) {
+TEST_F(HSDPAInformationTest, EachBitOfAProcessCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> unsignedLongBits = [] {
     std::vector<std::string_view> texts = signedLongBits;
     texts.back() = "2147483648";
@@ -129,7 +129,7 @@ TEST_F(HSDPAInformationTest, WithoutPrimaryProcessesTheSecondaryOnesBeginAtByte1
                          row("1", "2", "3", "4") + ", " + row("5", "6", "7", "8") + "]}");
 }
 
-TEST_F(HSDPAInformationTest, CountsOf0ChangeTheThreeRowsOnly) {
+TEST_F(HSDPAInformationTest, CountsOf0ChangeTheThreeEntriesOnly) {
   decode(threeProcesses());
   decode(counted(0, 0, 351).u8(13, 9).bytes());
   EXPECT_EQ(shown(), R"({Version: "9", Sub Frames: "0", Carrier Info: "Single Carrier", )"

@@ -58,7 +58,7 @@ const std::map<std::string, std::vector<std::string>> rowSections = {
       "EF-LOCI", "EF-MSISDN", "EF-OPERATOR PLMN LIST", "EF-OPLMNAcT", "EF-PLMN NETWORK NAME", "EF-RAT MODE"}},
     {"HSDPA Info", {"Carrier Info", "Sub Frames", "Version"}}};
 
-// The rows that are lists; the template may have them, then without an element.
+// The entries that are lists; the template may have them, then without an element.
 const std::map<std::string, std::vector<std::string>> listRows = {
     {"Mobile Allocation", {"ARFCNs"}},
     {"BLER", {"Transport Channels"}},
@@ -161,7 +161,7 @@ TEST(KLV_GSMTemplate, TheOtherSectionsAreDictionariesWithAnEmptyTextForEachLabel
   }
 }
 
-TEST(KLV_GSMTemplate, SectionsHaveNoRowsButThoseOfTheirDecoders) {
+TEST(KLV_GSMTemplate, SectionsHaveNoEntriesButThoseOfTheirDecoders) {
   const Value root = realTemplate();
   for (const auto& [name, labels] : rowSections) {
     const std::vector<Value> found = allUnder(root, name);
@@ -192,7 +192,7 @@ class KLV_GSMLogGeneratorTest : public testing::Test {
     const std::vector<Value> found = allUnder(generator->generateLogUsingState(state), section);
     return found.size() == 1 ? described(found.front()) : "not once in the display";
   }
-  /// One row of a section of the display.
+  /// One entry of a section of the display.
   std::string shown(std::string_view section, std::string_view label) {
     const std::vector<Value> found = allUnder(generator->generateLogUsingState(state), section);
     const Dictionary* rows = found.size() == 1 ? found.front().dictionary() : nullptr;

@@ -43,7 +43,7 @@ TEST_F(MobileAllocationTest, EachPacketSetsANewListAndLeavesTheOldOneAsItWas) {
   EXPECT_EQ(described(before), R"(["975", "62"])");
 }
 
-TEST_F(MobileAllocationTest, OtherRowsOfTheSectionStayAsTheyAre) {
+TEST_F(MobileAllocationTest, OtherEntriesOfTheSectionStayAsTheyAre) {
   putOldContent();
   decode(allocation(1, {2}));
   EXPECT_EQ(shown(), R"({Old: "row", HSN: "1", ARFCNs: ["2"]})");

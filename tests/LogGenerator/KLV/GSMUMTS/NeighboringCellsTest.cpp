@@ -84,14 +84,14 @@ class NeighboringCellsTest : public ListDecoderTest<NeighboringCells, measuremen
   }
 };
 
-TEST_F(NeighboringCellsTest, EachNeighborHasThreeRowsInThisOrder) {
+TEST_F(NeighboringCellsTest, EachNeighborHasThreeEntriesInThisOrder) {
   decode(twoNeighbors());
   EXPECT_EQ(shown(), R"([{ARFCN: "975", RSSI: "200", C1 Value: "-10"}, )"
                      R"({ARFCN: "62", RSSI: "12", C1 Value: "66051"}])");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(NeighboringCellsTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(NeighboringCellsTest, EachBitCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(counted(1, 57).bytes(), 29, 57,
                           {{"ARFCN", 29, 0, "0", unsignedWordBits},
                            {"RSSI", 31, 0, "0", unsignedByteBits},
@@ -106,7 +106,7 @@ TEST_F(NeighboringCellsTest, ANeighborOfAllOnesIsUnsignedButForC1) {
   EXPECT_EQ(shown(), "[" + row("65535", "255", "-1") + "]");
 }
 
-TEST_F(NeighboringCellsTest, ANeighborOfTheLastBsicListShowsItsBsicBehindTheOtherRows) {
+TEST_F(NeighboringCellsTest, ANeighborOfTheLastBsicListShowsItsBsicBehindTheOtherEntries) {
   decodeColors({{62, 21}});
   decode(twoNeighbors());
   EXPECT_EQ(shown(), R"([{ARFCN: "975", RSSI: "200", C1 Value: "-10"}, )"
@@ -274,7 +274,7 @@ TEST_F(NeighboringCellsTest, EveryTruncatedPacketShowsBothNeighborsWithZerosForW
   });
 }
 
-TEST_F(NeighboringCellsTest, ANeighborGSMCellShowsTwoRowsInThisOrderAndTwiceItsRssi) {
+TEST_F(NeighboringCellsTest, ANeighborGSMCellShowsTwoEntriesInThisOrderAndTwiceItsRssi) {
   decodeCells({cell("GSM", "Neighbor", 62)});
   EXPECT_EQ(shown(), listOf({cellRows}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -330,7 +330,7 @@ TEST_F(NeighboringCellsTest, ValuesAreCutTo16BitsTheArfcnUnsignedTheRssiSigned) 
   EXPECT_EQ(shown(), R"([{ARFCN: "65535", RSSI: "-86 dBm"}])");
 }
 
-TEST_F(NeighboringCellsTest, EachMissingValueHasItsOwnMessageAndNoRow) {
+TEST_F(NeighboringCellsTest, EachMissingValueHasItsOwnMessageAndNoEntry) {
   decodeCells({cellRecord("GSM", "Neighbor", {number("RSSI", -43)})});
   EXPECT_EQ(shown(), R"([{RSSI: "-86 dBm"}])");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace, noArfcn));
@@ -339,7 +339,7 @@ TEST_F(NeighboringCellsTest, EachMissingValueHasItsOwnMessageAndNoRow) {
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace, noRssi));
 }
 
-TEST_F(NeighboringCellsTest, ARowWithoutAnyValueIsAppendedAllTheSame) {
+TEST_F(NeighboringCellsTest, ARecordWithoutAnyValueIsAppendedAllTheSame) {
   decodeCells({cellRecord("GSM", "Neighbor"), cell("GSM", "Neighbor", 62)});
   EXPECT_EQ(shown(), listOf({"{}", cellRows}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace, noArfcn, noRssi));

@@ -40,7 +40,7 @@ TEST_F(ProcessCOTest, TheTraceLineOfProcessCSIsWrittenForEachPacket) {
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(ProcessCOTest, EachCodeKeepsTheRowOfTheOther) {
+TEST_F(ProcessCOTest, EachCodeKeepsTheEntryOfTheOther) {
   decode(registration(1), registrationCode);
   decode(mobility(6));
   EXPECT_EQ(shown(), R"({MM Service State: "REG_STATE_IDLE", MM State: "MM_CONNECTION_ACTIVE"})");

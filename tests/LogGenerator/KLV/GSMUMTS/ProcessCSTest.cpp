@@ -22,7 +22,7 @@ Bytes registration(std::uint8_t state, std::size_t size = 16) {
   return PacketBuilder(registrationCode, size).fill(0xEE).u8(13, state).bytes();
 }
 
-TEST_F(ProcessCSTest, AMobilityPacketShowsThreeRowsInThisOrder) {
+TEST_F(ProcessCSTest, AMobilityPacketShowsThreeEntriesInThisOrder) {
   decode(mobility(19, 8, 0));
   EXPECT_EQ(shown(),
             R"({MM State: "MM_IDLE", MM Sub State: "MM_NORMAL_SERVICE", LU Reject Cause: "UPDATED"})");
@@ -35,7 +35,7 @@ TEST_F(ProcessCSTest, ARegistrationPacketShowsItsStateAlone) {
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(ProcessCSTest, EachCodeKeepsTheRowsOfTheOther) {
+TEST_F(ProcessCSTest, EachCodeKeepsTheEntriesOfTheOther) {
   decode(registration(1), registrationCode);
   decode(mobility(0, 0, 1));
   EXPECT_EQ(shown(), R"({MM Service State: "REG_STATE_IDLE", MM State: "MM_NULL", )"
@@ -45,7 +45,7 @@ TEST_F(ProcessCSTest, EachCodeKeepsTheRowsOfTheOther) {
                      R"(MM Sub State: "MM_NULL_SUBSTATE", LU Reject Cause: "NOT_UPDATED"})");
 }
 
-TEST_F(ProcessCSTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(ProcessCSTest, EachBitCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(PacketBuilder(mobilityCode, 18).bytes(), 13, 18,
                           {{"MM State",
                             13,

@@ -22,7 +22,7 @@ Bytes registration(std::uint8_t state, std::size_t size = 16) {
   return PacketBuilder(registrationCode, size).fill(0xEE).u8(13, state).bytes();
 }
 
-TEST_F(ProcessPSTest, AMobilityPacketShowsThreeRowsInThisOrder) {
+TEST_F(ProcessPSTest, AMobilityPacketShowsThreeEntriesInThisOrder) {
   decode(mobility(3, 0, 0));
   EXPECT_EQ(shown(), R"({MM State: "GMM_REGISTERED", MM Sub State: "GMM_NORMAL_SERVICE", )"
                      R"(Attach Reject Cause: "GMM_GU1_UPDATED"})");
@@ -35,7 +35,7 @@ TEST_F(ProcessPSTest, ARegistrationPacketShowsItsStateAlone) {
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(ProcessPSTest, EachCodeKeepsTheRowsOfTheOther) {
+TEST_F(ProcessPSTest, EachCodeKeepsTheEntriesOfTheOther) {
   decode(registration(1), registrationCode);
   decode(mobility(0, 12, 1));
   EXPECT_EQ(shown(), R"({MM Service State: "REG_STATE_IDLE", MM State: "GMM_NULL", )"
@@ -45,7 +45,7 @@ TEST_F(ProcessPSTest, EachCodeKeepsTheRowsOfTheOther) {
                      R"(MM Sub State: "GMM_NULL_SUBSTATE", Attach Reject Cause: "GMM_GU2_NOT_UPDATED"})");
 }
 
-TEST_F(ProcessPSTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(ProcessPSTest, EachBitCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(PacketBuilder(mobilityCode, 18).bytes(), 13, 18,
                           {{"MM State",
                             13,

@@ -58,7 +58,7 @@ Value cell(const char* technology, const char* type, std::int64_t lac) {
 constexpr const char* cellRows =
     R"({Mobile Country Code: "262", Mobile Network Code: "1", Location Area Code: "40002"})";
 
-TEST_F(ServingPLMNTest, AnIdentityPacketShowsFiveRowsInThisOrder) {
+TEST_F(ServingPLMNTest, AnIdentityPacketShowsFiveEntriesInThisOrder) {
   decode(identity());
   EXPECT_EQ(shown(), identityRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -99,7 +99,7 @@ TEST_F(ServingPLMNTest, AreaCodesAreUnsigned) {
                      R"(Location Area Code: "65535", Routing Area Code: "255", Service Type: "Unknown"})");
 }
 
-TEST_F(ServingPLMNTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(ServingPLMNTest, EachBitCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(
       PacketBuilder(identityCode, 32).bytes(), 13, 32,
       {{"Service Type",
@@ -205,7 +205,7 @@ TEST_F(ServingPLMNTest, AnEmptyArrayChangesNothingSilently) {
   expectIgnored(cellMonitorMessage({}), cellMonitorCode, {trace});
 }
 
-TEST_F(ServingPLMNTest, ValuesThatAreMissingAreReportedInOrderAndKeepTheirRows) {
+TEST_F(ServingPLMNTest, ValuesThatAreMissingAreReportedInOrderAndKeepTheirEntries) {
   decode(identity());
   log.take();
   decodeCells({cellRecord("UMTS", "Serving")});
@@ -263,7 +263,7 @@ TEST_F(ServingPLMNTest, EveryTruncatedCellMonitorMessageIsAFailedParse) {
   expectIgnoredBelow(message.size(), message, cellMonitorCode, {trace, failedParse, noArray});
 }
 
-TEST_F(ServingPLMNTest, WhicheverCameLastIsShownInTheRowsThatTheCodesShare) {
+TEST_F(ServingPLMNTest, WhicheverCameLastIsShownInTheEntriesThatTheCodesShare) {
   decode(selection(0), selectionCode);
   decode(identity());
   decodeCells({cell("GSM", "Serving", 40002)});

@@ -181,7 +181,7 @@ TEST_F(UMTSRRInfoTest, PowerPacketsOf16And17BytesAreDecodedAndOneOf15IsNot) {
   expectIgnored(PacketBuilder(powerCode, 15).bytes(), powerCode, {trace});
 }
 
-TEST_F(UMTSRRInfoTest, ACellPacketShowsFourRowsInThisOrder) {
+TEST_F(UMTSRRInfoTest, ACellPacketShowsFourEntriesInThisOrder) {
   decode(servingCell(), cellCode);
   EXPECT_EQ(shown(), servingCellRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -206,7 +206,7 @@ TEST_F(UMTSRRInfoTest, ValuesOf32BitsAreShownSignedAndTheUraUnsigned) {
   EXPECT_EQ(shown(), R"({Cell ID: "-1", Downlink Frequency: "-1", Uplink Frequency: "-1", URA ID: "65535"})");
 }
 
-TEST_F(UMTSRRInfoTest, EachBitOfACellPacketCountsInItsOwnRowAlone) {
+TEST_F(UMTSRRInfoTest, EachBitOfACellPacketCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(PacketBuilder(cellCode, 31).bytes(), 13, 31,
                           {{"Uplink Frequency", 13, 0, "0", signedLongBits},
                            {"Downlink Frequency", 17, 0, "0", signedLongBits},
@@ -247,7 +247,7 @@ TEST_F(UMTSRRInfoTest, CipheringPacketsOf19And20BytesAreDecoded) {
   }
 }
 
-TEST_F(UMTSRRInfoTest, AServingUMTSCellShowsThreeRowsInThisOrder) {
+TEST_F(UMTSRRInfoTest, AServingUMTSCellShowsThreeEntriesInThisOrder) {
   decodeCells({cell("UMTS", "Serving", 10564)});
   EXPECT_EQ(shown(), cellRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -283,7 +283,7 @@ TEST_F(UMTSRRInfoTest, AnEmptyArrayChangesNothingSilently) {
   expectIgnored(cellMonitorMessage({}), cellMonitorCode, {trace});
 }
 
-TEST_F(UMTSRRInfoTest, ValuesThatAreMissingAreReportedInOrderAndKeepTheirRows) {
+TEST_F(UMTSRRInfoTest, ValuesThatAreMissingAreReportedInOrderAndKeepTheirEntries) {
   decodeCells({cell("UMTS", "Serving", 10564)});
   log.take();
   decodeCells({cellRecord("UMTS", "Serving")});

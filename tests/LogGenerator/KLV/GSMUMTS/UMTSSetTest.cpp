@@ -75,7 +75,7 @@ Value cell(const char* technology, const char* type, std::int64_t uarfcn) {
 constexpr const char* cellRows =
     R"({UARFCN: "10564", Scrambling Code: "77", RSCP: "-95 dBm", Energy Per Chip: "-9 dB"})";
 
-TEST_F(UMTSSetTest, EachRankedCellHasSixRowsInThisOrder) {
+TEST_F(UMTSSetTest, EachRankedCellHasSixEntriesInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), listOf({first, second}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -118,7 +118,7 @@ TEST_F(UMTSSetTest, TheDownlinkFrequencyIsShownSignedAndTheScramblingCodeUnsigne
   EXPECT_EQ(shown("Scrambling Code"), R"("32768")");
 }
 
-TEST_F(UMTSSetTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(UMTSSetTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> signedWordBits = {"1",    "2",    "4",     "8",     "16",   "32",
                                                         "64",   "128",  "256",   "512",   "1024", "2048",
                                                         "4096", "8192", "16384", "-32768"};
@@ -145,7 +145,7 @@ TEST_F(UMTSSetTest, EachBitCountsInItsOwnRowAlone) {
                            {"Ranking Value", 23, 0, "0", signedWordBits}});
 }
 
-TEST_F(UMTSSetTest, TheCountOfGSMCellsIsNotTheCountOfRows) {
+TEST_F(UMTSSetTest, TheCountOfGSMCellsIsNotTheCountOfRecords) {
   putOldContent();
   decode(counted(0, 50).u8(14, 3).bytes());
   EXPECT_EQ(shown(), "[]");
@@ -225,7 +225,7 @@ TEST_F(UMTSSetTest, EveryTruncatedPacketShowsBothCellsWithZerosForWhatIsCutOff) 
   });
 }
 
-TEST_F(UMTSSetTest, ANeighborUMTSCellShowsFourRowsInThisOrder) {
+TEST_F(UMTSSetTest, ANeighborUMTSCellShowsFourEntriesInThisOrder) {
   decodeCells({cell("UMTS", "Neighbor", 10564)});
   EXPECT_EQ(shown(), listOf({cellRows}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -298,7 +298,7 @@ TEST_F(UMTSSetTest, RealsAreTruncatedTowardsZero) {
   EXPECT_EQ(shown(), listOf({cellRows}));
 }
 
-TEST_F(UMTSSetTest, EachMissingValueHasItsOwnMessageAndNoRow) {
+TEST_F(UMTSSetTest, EachMissingValueHasItsOwnMessageAndNoEntry) {
   const auto linesWithout = [&](const char* key) {
     const Value record = cell("UMTS", "Neighbor", 10564);
     record.dictionary()->remove(key);
@@ -316,7 +316,7 @@ TEST_F(UMTSSetTest, EachMissingValueHasItsOwnMessageAndNoRow) {
   EXPECT_EQ(shown(), R"([{UARFCN: "10564", Scrambling Code: "77", RSCP: "-95 dBm"}])");
 }
 
-TEST_F(UMTSSetTest, ARowWithoutAnyValueIsAppendedAllTheSame) {
+TEST_F(UMTSSetTest, ARecordWithoutAnyValueIsAppendedAllTheSame) {
   decodeCells({cellRecord("UMTS", "Neighbor"), cell("UMTS", "Neighbor", 10564)});
   EXPECT_EQ(shown(), listOf({"{}", cellRows}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace, noUarfcn, noScramblingCode, noRscp, noEnergy));

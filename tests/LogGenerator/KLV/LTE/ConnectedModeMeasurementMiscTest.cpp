@@ -29,7 +29,7 @@ constexpr const char* reportRows =
     R"({E-ARFCN: "1300", Serving Physical Cell ID: "301", Subframe Number: "9871", )"
     R"(Serving Filtered RSRP: "-97.25 dBm", Serving Filtered RSRQ: "-11.75 dB"})";
 
-TEST_F(ConnectedModeMeasurementMiscTest, AReportShowsFiveRowsInThisOrder) {
+TEST_F(ConnectedModeMeasurementMiscTest, AReportShowsFiveEntriesInThisOrder) {
   decode(report());
   EXPECT_EQ(shown(), reportRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -52,7 +52,7 @@ TEST_F(ConnectedModeMeasurementMiscTest, AllOnesShowTheHighEndOfEachScale) {
                      R"(Serving Filtered RSRP: "16243.75 dBm", Serving Filtered RSRQ: "8171.88 dB"})");
 }
 
-TEST_F(ConnectedModeMeasurementMiscTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(ConnectedModeMeasurementMiscTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> powersOfTwo = {"1",    "2",    "4",     "8",    "16",   "32",
                                                      "64",   "128",  "256",   "512",  "1024", "2048",
                                                      "4096", "8192", "16384", "32768"};

@@ -23,7 +23,7 @@ PacketBuilder report(std::uint8_t neighbors, std::uint8_t detected, std::size_t 
 // Two neighbors, then three detected cells.
 Bytes threeDetected() { return report(2, 3, 47).u16(41, 301).u16(43, 2).u16(45, 65000).bytes(); }
 
-TEST_F(DetectedCellsTest, EachDetectedCellBehindTheNeighborsHasARow) {
+TEST_F(DetectedCellsTest, EachDetectedCellBehindTheNeighborsHasARecord) {
   decode(threeDetected());
   EXPECT_EQ(shown(), R"([{Physical Cell ID: "301"}, {Physical Cell ID: "2"}, {Physical Cell ID: "65000"}])");
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));

@@ -85,7 +85,7 @@ TEST_F(LTEServingCellInfoTest, TheCodeThatCountsIsTheGivenOneNotTheHeaders) {
   EXPECT_EQ(shown(), R"({Num Tx Antennas: "50"})");
 }
 
-TEST_F(LTEServingCellInfoTest, AnIdentityPacketShowsEightRowsInThisOrder) {
+TEST_F(LTEServingCellInfoTest, AnIdentityPacketShowsEightEntriesInThisOrder) {
   decode(identity(), identityCode);
   EXPECT_EQ(shown(), identityRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -164,7 +164,7 @@ TEST_F(LTEServingCellInfoTest, AnIdentityPacketRemovesTheUarfcnOfACellMonitorMes
   EXPECT_EQ(shown("UARFCN"), R"("3351")");
 }
 
-TEST_F(LTEServingCellInfoTest, AnIdentityPacketRemovesTheUarfcnRowOfTheTemplate) {
+TEST_F(LTEServingCellInfoTest, AnIdentityPacketRemovesTheUarfcnEntryOfTheTemplate) {
   section.dictionary()->set("UARFCN", "");
   decode(identity(), identityCode);
   EXPECT_EQ(shown(), identityRows);
@@ -187,7 +187,7 @@ TEST_F(LTEServingCellInfoTest, AnAntennasPacketOf23BytesShowsTheSameAsOneOf22) {
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace, unknownAntennas));
 }
 
-TEST_F(LTEServingCellInfoTest, ACellMonitorArrayShowsFiveRowsInThisOrder) {
+TEST_F(LTEServingCellInfoTest, ACellMonitorArrayShowsFiveEntriesInThisOrder) {
   decodeCells({cell("LTE", "Serving", 3350)});
   EXPECT_EQ(shown(), cellRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -221,7 +221,7 @@ TEST_F(LTEServingCellInfoTest, AnEmptyArrayChangesNothingSilently) {
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(LTEServingCellInfoTest, EntriesThatAreMissingAreReportedInOrderAndKeepTheirRows) {
+TEST_F(LTEServingCellInfoTest, ValuesThatAreMissingAreReportedInOrderAndKeepTheirEntries) {
   decode(identity(), identityCode);
   log.take();
   decodeCells({dictionaryOf({{"RadioAccessTechnology", "LTE"}, {"CellType", "Serving"}})});
@@ -276,7 +276,7 @@ TEST_F(LTEServingCellInfoTest, EveryTruncatedCellMonitorMessageIsAFailedParse) {
   }
 }
 
-TEST_F(LTEServingCellInfoTest, RowsOfTheThreeCodesMixAndTheLastValueOfEachStays) {
+TEST_F(LTEServingCellInfoTest, EntriesOfTheThreeCodesMixAndTheLastValueOfEachStays) {
   decode(antennas(2), antennasCode);
   decode(identity(), identityCode);
   decodeCells({cell("LTE", "Serving", 3350)});

@@ -45,7 +45,7 @@ constexpr const char* second =
 constexpr const char* third =
     R"({Physical Cell ID: "65000", Filtered RSRP: "-140.00 dBm", Filtered RSRQ: "0.00 dB"})";
 
-TEST_F(MeasuredNeighborCellsTest, EachNeighborIsACellOfThreeRowsInThisOrder) {
+TEST_F(MeasuredNeighborCellsTest, EachNeighborIsACellOfThreeEntriesInThisOrder) {
   decode(threeNeighbors());
   EXPECT_EQ(shown(), listOf({first, second, third}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -72,7 +72,7 @@ TEST_F(MeasuredNeighborCellsTest, AllOnesShowTheHighEndOfEachScale) {
             R"([{Physical Cell ID: "65535", Filtered RSRP: "16243.75 dBm", Filtered RSRQ: "8171.88 dB"}])");
 }
 
-TEST_F(MeasuredNeighborCellsTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(MeasuredNeighborCellsTest, EachBitCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(
       report(1, 0, 41).bytes(), 29, 41,
       {{"Physical Cell ID",

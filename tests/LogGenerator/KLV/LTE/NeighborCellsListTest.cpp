@@ -76,7 +76,7 @@ std::vector<std::string> linesOf(const char* countLine, std::size_t cells) {
 constexpr const char* countOf1 = "<4>Number of neighboring cells being reported: 1\n";
 constexpr const char* countOf2 = "<4>Number of neighboring cells being reported: 2\n";
 
-TEST_F(NeighborCellsListTest, EachCellHasTwelveRowsInThisOrder) {
+TEST_F(NeighborCellsListTest, EachCellHasTwelveEntriesInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), listOf({first, second}));
 }
@@ -139,7 +139,7 @@ TEST_F(NeighborCellsListTest, AntennaOneAlwaysShowsTheOffsetsOfAntennaZero) {
   }
 }
 
-TEST_F(NeighborCellsListTest, EachBitCountsInItsOwnRowsAlone) {
+TEST_F(NeighborCellsListTest, EachBitCountsInItsOwnEntriesAlone) {
   const std::vector<std::string_view> rsrp = {"-139.50 dBm", "-139.00 dBm", "-138.00 dBm",
                                               "-136.00 dBm", "-132.00 dBm", "-124.00 dBm",
                                               "-108.00 dBm", "-76.00 dBm",  "-12.00 dBm"};

@@ -20,7 +20,7 @@ Bytes measurement(std::size_t size = 21) {
 
 constexpr const char* measurementRows = R"({Version: "3", E-ARFCN: "3350", Qrxlevmin: "-128 dBm"})";
 
-TEST_F(NeighborMeasurementMiscTest, AMeasurementShowsThreeRowsInThisOrder) {
+TEST_F(NeighborMeasurementMiscTest, AMeasurementShowsThreeEntriesInThisOrder) {
   decode(measurement());
   EXPECT_EQ(shown(), measurementRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -36,7 +36,7 @@ TEST_F(NeighborMeasurementMiscTest, AllOnesShowTheHighEndOfEachScale) {
   EXPECT_EQ(shown(), R"({Version: "255", E-ARFCN: "65535", Qrxlevmin: "-14 dBm"})");
 }
 
-TEST_F(NeighborMeasurementMiscTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(NeighborMeasurementMiscTest, EachBitCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(PacketBuilder(measurementCode, 21).bytes(), 13, 21,
                           {{"Version", 13, 0, "0", {"1", "2", "4", "8", "16", "32", "64", "128"}},
                            {"E-ARFCN",

@@ -120,7 +120,7 @@ TEST_F(ReselectionCandidatesListTest, AllOnesAreShownUnsigned) {
                      R"(Channel: "65535", Pilot: "65535"}])");
 }
 
-TEST_F(ReselectionCandidatesListTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(ReselectionCandidatesListTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> bytes = {"1", "2", "4", "8", "16", "32", "64", "128"};
   const std::vector<std::string_view> words = {"1",    "2",    "4",     "8",    "16",   "32",
                                                "64",   "128",  "256",   "512",  "1024", "2048",

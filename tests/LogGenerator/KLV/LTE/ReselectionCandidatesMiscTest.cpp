@@ -20,7 +20,7 @@ Bytes reselection(std::size_t size = 21) {
 
 constexpr const char* reselectionRows = R"({Version: "4", Serving EARFCN: "1300", Serving Cell ID: "301"})";
 
-TEST_F(ReselectionCandidatesMiscTest, AReselectionShowsThreeRowsInThisOrder) {
+TEST_F(ReselectionCandidatesMiscTest, AReselectionShowsThreeEntriesInThisOrder) {
   decode(reselection());
   EXPECT_EQ(shown(), reselectionRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -36,7 +36,7 @@ TEST_F(ReselectionCandidatesMiscTest, AllOnesAreShownUnsigned) {
   EXPECT_EQ(shown(), R"({Version: "255", Serving EARFCN: "65535", Serving Cell ID: "65535"})");
 }
 
-TEST_F(ReselectionCandidatesMiscTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(ReselectionCandidatesMiscTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> powersOfTwo = {"1",    "2",    "4",     "8",    "16",   "32",
                                                      "64",   "128",  "256",   "512",  "1024", "2048",
                                                      "4096", "8192", "16384", "32768"};

@@ -46,7 +46,7 @@ constexpr const char* measurementRows =
     R"(S Intra Search: "62 dB", S Non Intra Search: "22 dBm", Measurement Rules Updated: "True", )"
     R"(Measurement Rules: "9"})";
 
-TEST_F(ServingCellMeasurementTest, AMeasurementShowsEighteenRowsInThisOrder) {
+TEST_F(ServingCellMeasurementTest, AMeasurementShowsEighteenEntriesInThisOrder) {
   decode(measurement());
   EXPECT_EQ(shown(), measurementRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -80,7 +80,7 @@ TEST_F(ServingCellMeasurementTest, AllOnesShowTheHighEndOfEachScale) {
             R"(Measurement Rules: "15"})");
 }
 
-TEST_F(ServingCellMeasurementTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(ServingCellMeasurementTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> rsrp = {"-139.75 dBm", "-139.50 dBm", "-139.00 dBm",
                                               "-138.00 dBm", "-136.00 dBm", "-132.00 dBm",
                                               "-124.00 dBm", "-108.00 dBm", "-76.00 dBm"};
@@ -177,7 +177,7 @@ TEST_F(ServingCellMeasurementTest, ARawRsrqOf120Shows0Decibels) {
   EXPECT_EQ(shown("Average RSRQ"), R"("0.00 dB")");
 }
 
-TEST_F(ServingCellMeasurementTest, EachMeasurementOverwritesTheRowsAndKeepsTheirPlaces) {
+TEST_F(ServingCellMeasurementTest, EachMeasurementOverwritesTheEntriesAndKeepsTheirPlaces) {
   section.dictionary()->set("Measurement Rules", "");
   decode(zeros().bytes());
   decode(measurement());

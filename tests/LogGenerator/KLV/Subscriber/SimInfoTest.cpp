@@ -43,7 +43,7 @@ class SimInfoTest : public testing::Test {
   Value section = Value::ofDictionary();
 };
 
-TEST_F(SimInfoTest, EachFileHasItsRowInTheOrderOfTheTableWhateverThatOfThePayload) {
+TEST_F(SimInfoTest, EachFileHasItsEntryInTheOrderOfTheTableWhateverThatOfThePayload) {
   decodeFiles({{"kSimFile_OPLMNAcT", "14"},
                {"kSimFile_OPL", "13"},
                {"kSimFile_PNN", "12"},
@@ -66,7 +66,7 @@ TEST_F(SimInfoTest, EachFileHasItsRowInTheOrderOfTheTableWhateverThatOfThePayloa
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(SimInfoTest, ALaterPayloadReplacesItsRowsAndKeepsTheOthers) {
+TEST_F(SimInfoTest, ALaterPayloadReplacesItsEntriesAndKeepsTheOthers) {
   decodeFiles({{"kSimFile_ICCID", "8949"}, {"kSimFile_LOCI", "262-01"}});
   decodeFiles({{"kSimFile_ICCID", "8950"}});
   EXPECT_EQ(shown(), R"({EF-ICCID: "8950", EF-LOCI: "262-01"})");
@@ -74,7 +74,7 @@ TEST_F(SimInfoTest, ALaterPayloadReplacesItsRowsAndKeepsTheOthers) {
   EXPECT_EQ(shown(), R"({EF-ICCID: "8950", EF-LOCI: "262-01", EF-ACCESS CONTROL CLASS: "0x0200"})");
 }
 
-TEST_F(SimInfoTest, RowsOfTheTemplateKeepTheirPlaces) {
+TEST_F(SimInfoTest, EntriesOfTheTemplateKeepTheirPlaces) {
   section.dictionary()->set("EF-LOCI", "");
   section.dictionary()->set("EF-ICCID", "");
   decodeFiles({{"kSimFile_ICCID", "8949"}, {"kSimFile_LOCI", "262-01"}});

@@ -38,7 +38,7 @@ constexpr const char* second =
     R"({CCTRCH ID: "9", TSNUM: "254", SIR: ["0", "252", "251", "129", "128", "127"]})";
 constexpr const char* zeros = R"({CCTRCH ID: "0", TSNUM: "0", SIR: ["0", "0", "0", "0", "0", "0"]})";
 
-TEST_F(CCTRCHSIRMeasurementTest, EachOfTwoChannelsHasTwoRowsAndAListOfSixRatios) {
+TEST_F(CCTRCHSIRMeasurementTest, EachOfTwoChannelsHasTwoEntriesAndAListOfSixRatios) {
   decode(twoChannels());
   EXPECT_EQ(shown(), listOf({first, second}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -58,7 +58,7 @@ TEST_F(CCTRCHSIRMeasurementTest, EachTransportChannelMovesThemBy34Bytes) {
   EXPECT_EQ(shown(), listOf({first}));
 }
 
-TEST_F(CCTRCHSIRMeasurementTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(CCTRCHSIRMeasurementTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> byte = {"1", "2", "4", "8", "16", "32", "64", "128"};
   expectTextsOfSingleBits(counted(0, 0x10, 305).bytes(), 289, 291,
                           {{"CCTRCH ID", 289, 0, "0", byte}, {"TSNUM", 290, 0, "0", byte}});

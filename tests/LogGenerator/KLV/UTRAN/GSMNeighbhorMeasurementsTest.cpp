@@ -43,7 +43,7 @@ constexpr const char* first =
 constexpr const char* second =
     R"({Cell ID: "7", Band Indicator: "1", BSIC Valid: "0", NCC: "8", BCC: "9", ARFCN: "62", RSSI: "12"})";
 
-TEST_F(GSMNeighbhorMeasurementsTest, EachCellHasSevenRowsInThisOrder) {
+TEST_F(GSMNeighbhorMeasurementsTest, EachCellHasSevenEntriesInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), listOf({first, second}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -66,7 +66,7 @@ TEST_F(GSMNeighbhorMeasurementsTest, TheRssiIsSigned) {
   EXPECT_EQ(rssi(0), R"("0")");
 }
 
-TEST_F(GSMNeighbhorMeasurementsTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(GSMNeighbhorMeasurementsTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> byte = {"1", "2", "4", "8", "16", "32", "64", "128"};
   expectTextsOfSingleBits(
       counted(1, 33).bytes(), 17, 33,

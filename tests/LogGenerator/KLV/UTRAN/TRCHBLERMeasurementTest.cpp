@@ -39,13 +39,13 @@ constexpr const char* first = R"({TRCH ID: "1", TRCH BLER Measurement: "63"})";
 constexpr const char* second = R"({TRCH ID: "254", TRCH BLER Measurement: "0"})";
 constexpr const char* third = R"({TRCH ID: "3", TRCH BLER Measurement: "128"})";
 
-TEST_F(TRCHBLERMeasurementTest, EachChannelHasTwoRowsInThisOrderAndTheTraceLineIsANotice) {
+TEST_F(TRCHBLERMeasurementTest, EachChannelHasTwoEntriesInThisOrderAndTheTraceLineIsANotice) {
   decode(threeChannels());
   EXPECT_EQ(shown(), listOf({first, second, third}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(TRCHBLERMeasurementTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(TRCHBLERMeasurementTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> byte = {"1", "2", "4", "8", "16", "32", "64", "128"};
   expectTextsOfSingleBits(counted(0x40, 0, 21).bytes(), 17, 21,
                           {{"TRCH ID", 17, 0, "0", byte}, {"TRCH BLER Measurement", 18, 0, "0", byte}});

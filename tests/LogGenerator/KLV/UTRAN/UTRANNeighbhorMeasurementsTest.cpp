@@ -38,7 +38,7 @@ constexpr const char* first =
 constexpr const char* second =
     R"({UARFCN: "77", Cell ID: "0", Filter RSCP: "0.496094", Status: "DSET", inJDCS: "FALSE"})";
 
-TEST_F(UTRANNeighbhorMeasurementsTest, EachCellHasFiveRowsInThisOrder) {
+TEST_F(UTRANNeighbhorMeasurementsTest, EachCellHasFiveEntriesInThisOrder) {
   decode(twoCells());
   EXPECT_EQ(shown(), listOf({first, second}));
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -55,7 +55,7 @@ TEST_F(UTRANNeighbhorMeasurementsTest, AllOnesShowTheHighEndOfEachScaleAndNoStat
   EXPECT_EQ(shown(), R"([{UARFCN: "16383", Cell ID: "127", Filter RSCP: "0.996094", inJDCS: "TRUE"}])");
 }
 
-TEST_F(UTRANNeighbhorMeasurementsTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(UTRANNeighbhorMeasurementsTest, EachBitCountsInItsOwnEntryAlone) {
   expectTextsOfSingleBits(
       counted(2, 184).bytes(), 168, 184,
       {{"UARFCN",
@@ -78,7 +78,7 @@ TEST_F(UTRANNeighbhorMeasurementsTest, ARawRscpOf128Shows0Point500000) {
   EXPECT_EQ(shown("Filter RSCP"), R"("0.500000")");
 }
 
-TEST_F(UTRANNeighbhorMeasurementsTest, ASetMembershipOf3HasNoStatusButStillItsJdcsRow) {
+TEST_F(UTRANNeighbhorMeasurementsTest, ASetMembershipOf3HasNoStatusButStillItsJdcsEntry) {
   decode(cellOfByte3(0x60));
   EXPECT_EQ(shown(), R"([{UARFCN: "0", Cell ID: "0", Filter RSCP: "0.000000", inJDCS: "FALSE"}])");
   decode(cellOfByte3(0xE0));

@@ -52,7 +52,7 @@ constexpr const char* cellRows =
     R"({Local Area Code: "40002", Cell ID: "26885892", Freq Band Indicator: "8", )"
     R"(Cell Scrambling Code: "511", Uplink UARFCN: "10564", Downlink UARFCN: "10564"})";
 
-TEST_F(UTRANServingCellInfoTest, AModemPacketShowsSixRowsInThisOrder) {
+TEST_F(UTRANServingCellInfoTest, AModemPacketShowsSixEntriesInThisOrder) {
   decode(servingCell());
   EXPECT_EQ(shown(), servingCellRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -63,13 +63,13 @@ TEST_F(UTRANServingCellInfoTest, AModemPacketOf27BytesShowsTheSameAsOneOf26) {
   EXPECT_EQ(shown(), servingCellRows);
 }
 
-TEST_F(UTRANServingCellInfoTest, AllOnesShowAnUnsignedValueInEachRowButTheIdentity) {
+TEST_F(UTRANServingCellInfoTest, AllOnesShowAnUnsignedValueInEachEntryButTheIdentity) {
   decode(PacketBuilder(cellCode, 26).fill(0xFF).bytes());
   EXPECT_EQ(shown(), R"({Cell Access Restrictions: "255", Cell ID: "-1", Downlink UARFCN: "65535", )"
                      R"(Uplink UARFCN: "65535", URA ID: "255", Allowed Access: "Emergency Calls Only"})");
 }
 
-TEST_F(UTRANServingCellInfoTest, EachBitCountsInItsOwnRowAlone) {
+TEST_F(UTRANServingCellInfoTest, EachBitCountsInItsOwnEntryAlone) {
   const std::vector<std::string_view> byte = {"1", "2", "4", "8", "16", "32", "64", "128"};
   const std::vector<std::string_view> word = {"1",   "2",   "4",    "8",    "16",   "32",   "64",    "128",
                                               "256", "512", "1024", "2048", "4096", "8192", "16384", "32768"};
@@ -95,7 +95,7 @@ TEST_F(UTRANServingCellInfoTest, TheLowestBitOfByte25AloneBarsAccess) {
   EXPECT_EQ(shown("Allowed Access"), R"("All Calls")");
 }
 
-TEST_F(UTRANServingCellInfoTest, ACellMonitorArrayShowsSixRowsInThisOrder) {
+TEST_F(UTRANServingCellInfoTest, ACellMonitorArrayShowsSixEntriesInThisOrder) {
   decodeCells({cell("UTRAN", "Serving", 10564)});
   EXPECT_EQ(shown(), cellRows);
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
@@ -122,7 +122,7 @@ TEST_F(UTRANServingCellInfoTest, TheLastServingUTRANCellWins) {
   EXPECT_THAT(log.takeTexts(), ElementsAre(trace));
 }
 
-TEST_F(UTRANServingCellInfoTest, ALaterServingUTRANCellLeavesTheRowsThatItLacksToTheEarlierOne) {
+TEST_F(UTRANServingCellInfoTest, ALaterServingUTRANCellLeavesTheEntriesThatItLacksToTheEarlierOne) {
   decodeCells({cell("UTRAN", "Serving", 1), dictionaryOf({{"RadioAccessTechnology", "UTRAN"},
                                                           {"CellType", "Serving"},
                                                           {"UARFCN", Value::ofInteger(10564)}})});
@@ -153,7 +153,7 @@ TEST_F(UTRANServingCellInfoTest, AnEmptyArrayChangesNothingSilently) {
   expectIgnored(serverMessage(cellMonitorCode, Value::ofArray()), cellMonitorCode, {trace});
 }
 
-TEST_F(UTRANServingCellInfoTest, EntriesThatAreMissingAreReportedInOrderAndKeepTheirRows) {
+TEST_F(UTRANServingCellInfoTest, ValuesThatAreMissingAreReportedInOrderAndKeepTheirEntries) {
   decode(servingCell());
   log.take();
   decodeCells({dictionaryOf({{"RadioAccessTechnology", "UTRAN"}, {"CellType", "Serving"}})});
@@ -178,7 +178,7 @@ TEST_F(UTRANServingCellInfoTest, AnEntryThatIsNoNumberIsReportedAndTheNextOnesAr
                           "<3>Serving Cell Info: Failed to retrieve Cell Scrambling Code\n"));
 }
 
-TEST_F(UTRANServingCellInfoTest, AUarfcnThatIsNoNumberIsReportedOnceAndKeepsBothRows) {
+TEST_F(UTRANServingCellInfoTest, AUarfcnThatIsNoNumberIsReportedOnceAndKeepsBothEntries) {
   decode(servingCell());
   log.take();
   const Value record = cell("UTRAN", "Serving", 10564);
@@ -216,7 +216,7 @@ TEST_F(UTRANServingCellInfoTest, EveryTruncatedCellMonitorMessageIsAFailedParse)
   }
 }
 
-TEST_F(UTRANServingCellInfoTest, TheLastPacketOfEitherKindIsShownInTheRowsThatTheyShare) {
+TEST_F(UTRANServingCellInfoTest, TheLastPacketOfEitherKindIsShownInTheEntriesThatTheyShare) {
   decode(servingCell());
   decodeCells({cell("UTRAN", "Serving", 10564)});
   EXPECT_EQ(shown(),
