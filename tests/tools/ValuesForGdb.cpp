@@ -9,7 +9,8 @@
 namespace varnel {
 namespace {
 
-[[gnu::noipa]] void stop() {}
+// The empty instruction keeps the compiler from removing the calls.
+[[gnu::noinline]] void stop() { asm volatile(""); }
 
 void makeValues() {
   const Value absent;
