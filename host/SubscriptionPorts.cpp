@@ -1,10 +1,23 @@
 #include "host/SubscriptionPorts.h"
 
+#include <cstddef>
 #include <utility>
 
 #include "host/Subscription.h"
 
 namespace varnel {
+
+namespace {
+
+constexpr std::int32_t logMessageIdentifier = 0;
+// The viewer decodes nothing shorter. Like the viewer, this counts the prefix with the subscription.
+constexpr std::size_t headerSize = 13;
+
+bool isShown(std::int32_t identifier, ByteView message) {
+  return identifier == logMessageIdentifier && message.size() >= headerSize;
+}
+
+}  // namespace
 
 MessagePorts::LocalPortCreation SubscriptionPorts::createLocalPort(std::string_view name,
                                                                    LocalPort::MessageHandler handler) {
@@ -14,7 +27,7 @@ MessagePorts::LocalPortCreation SubscriptionPorts::createLocalPort(std::string_v
                         std::int32_t identifier, ByteView data) mutable -> std::optional<Bytes> {
     const auto subscription = subscriptionOf(data);
     if (filter && !filter->takes(subscription)) return std::nullopt;
-    if (subscription) monitor.subscriptionIsShown(*subscription);
+    if (subscription && isShown(identifier, data)) monitor.subscriptionIsShown(*subscription);
     return handler(identifier, data);
   };
   return _ports.createLocalPort(name, take);

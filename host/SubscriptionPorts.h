@@ -10,7 +10,8 @@
 namespace varnel {
 
 /// Message ports whose local ports get only the messages of one subscription, and those without one. When no
-/// subscription is wanted they get all messages. The monitor learns which subscriptions they got.
+/// subscription is wanted they get all messages. The monitor learns the subscriptions of the log messages
+/// that they got and that are as long as a header.
 class SubscriptionPorts final : public MessagePorts {
  public:
   /// The ports and the monitor must outlive this object.

@@ -88,6 +88,9 @@ TEST(SubscriptionPorts, DeliverOneSubscriptionAndWhatNamesNone) {
   EXPECT_EQ(monitor.linkReport().mixture, "");
 }
 
+// A message as long as a header, of this subscription.
+Bytes headerOf(std::uint8_t subscription) { return {0x81, subscription, 1, 13, 0, 0, 0, 0, 0, 0, 0, 0, 0}; }
+
 TEST(SubscriptionPorts, DeliverAllAndTellOfAMixtureUnlessOneIsWanted) {
   HandedPorts handed;
   LinkMonitor monitor("/run/varnel");
@@ -97,25 +100,44 @@ TEST(SubscriptionPorts, DeliverAllAndTellOfAMixtureUnlessOneIsWanted) {
     delivered.emplace_back(data.begin(), data.end());
     return std::optional<Bytes>(Bytes{static_cast<std::uint8_t>(identifier)});
   });
-  const Bytes first{0x81, 1, 1, 13}, second{0x81, 2, 1, 13}, unnamed{0x81, 0, 1, 13}, plain{1, 13};
-  EXPECT_EQ(handed.deliver(7, second), Bytes{7});
-  EXPECT_EQ(handed.deliver(8, unnamed), Bytes{8});
-  EXPECT_EQ(handed.deliver(9, plain), Bytes{9});
-  EXPECT_EQ(handed.deliver(9, second), Bytes{9});
+  const Bytes first = headerOf(1), second = headerOf(2), unnamed = headerOf(0), plain{1, 13};
+  EXPECT_EQ(handed.deliver(0, second), Bytes{0});
+  EXPECT_EQ(handed.deliver(0, unnamed), Bytes{0});
+  EXPECT_EQ(handed.deliver(0, plain), Bytes{0});
+  EXPECT_EQ(handed.deliver(0, second), Bytes{0});
   EXPECT_EQ(monitor.linkReport().mixture, "");
-  EXPECT_EQ(handed.deliver(9, first), Bytes{9});
+  EXPECT_EQ(handed.deliver(0, first), Bytes{0});
   EXPECT_THAT(delivered, ElementsAre(second, unnamed, plain, second, first));
   const std::string told =
       "The display mixes what the modems of SIM 1 and SIM 2 send; to see one of them alone, start varnel "
       "with --sim 1";
   EXPECT_EQ(monitor.linkReport().mixture, told);
-  EXPECT_EQ(handed.deliver(9, second), Bytes{9});
+  EXPECT_EQ(handed.deliver(0, second), Bytes{0});
   EXPECT_EQ(monitor.linkReport().mixture, told);
   // Another link may be that of another phone.
   monitor.linkIsOpen();
   EXPECT_EQ(monitor.linkReport().mixture, "");
-  EXPECT_EQ(handed.deliver(9, first), Bytes{9});
+  EXPECT_EQ(handed.deliver(0, first), Bytes{0});
   EXPECT_EQ(monitor.linkReport().mixture, "");
+}
+
+TEST(SubscriptionPorts, DeliverWhatIsNotShownButDoNotCountItAsMixed) {
+  HandedPorts handed;
+  LinkMonitor monitor("/run/varnel");
+  SubscriptionPorts ports(handed, monitor, {});
+  std::size_t delivered = 0;
+  ports.createLocalPort("log", [&](std::int32_t, ByteView) {
+    ++delivered;
+    return std::nullopt;
+  });
+  handed.deliver(0, headerOf(1));
+  handed.deliver(1, headerOf(2));
+  const Bytes twelveBytes{0x81, 2, 1, 13, 0, 0, 0, 0, 0, 0, 0, 0};
+  handed.deliver(0, twelveBytes);
+  EXPECT_EQ(delivered, 3u);
+  EXPECT_EQ(monitor.linkReport().mixture, "");
+  handed.deliver(0, headerOf(2));
+  EXPECT_NE(monitor.linkReport().mixture, "");
 }
 
 }  // namespace
