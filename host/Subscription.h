@@ -13,9 +13,9 @@ namespace varnel {
 /// none, or when it is 0.
 std::optional<std::uint8_t> subscriptionOf(ByteView message);
 
-/// Takes the messages of one subscription from a stream that may have several. The displays of one modem
-/// would mix them. Takes the wanted subscription, or else the first one that is met. A message without a
-/// subscription belongs to the whole phone and is always taken.
+/// Takes the messages of one subscription from a stream that may have several. Without it, one display
+/// would mix the messages of several modems. Takes the wanted subscription, or else the first one that is
+/// met. A message without a subscription belongs to the whole phone and is always taken.
 class SubscriptionFilter {
  public:
   explicit SubscriptionFilter(std::optional<std::uint8_t> wanted) : _taken(wanted) {}

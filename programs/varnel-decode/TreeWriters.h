@@ -14,8 +14,8 @@ using DisplayWriter = std::string (*)(const Value& display);
 std::string displayAsText(const Value& display);
 
 /// One line per tree node, in pre-order: its path, and for a leaf a tab and its value. Backslash, tab,
-/// newline, and carriage return are written as `\\`, `\t`, `
-/// `, and `\r`, other control characters like `\u001B`.
+/// newline, and carriage return are written as `\\`, `\t`, `\n`, and `\r`, other control characters like
+/// `\u001B`.
 std::string displayAsPaths(const Value& display);
 
 /// The display tree as one line of JSON, with the names and the order of the tree. A name that occurs twice
