@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <filesystem>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <set>
@@ -111,12 +112,22 @@ class InputDecoding {
     if (_options.output == Output::EveryDisplay)
       add(std::make_unique<EveryDisplay>(stdout, _captureName, _options.style, _formats));
     if (_options.output == Output::ValueTable) {
-      // Several captures share one table, whose header is already written.
-      if (!_captureName)
-        writeOutput(stdout, csvHeader(_options.tablePaths, TableColumns::TimeAndValues, _formats));
       add(std::make_unique<ValueTable>(stdout, _options.tablePaths, _captureName, _options.style, _formats));
+      // Several captures share one table, whose header is already written.
+      if (!_captureName) {
+        feed(_sinks.back(), [this] {
+          writeOutput(stdout, csvHeader(_options.tablePaths, TableColumns::TimeAndValues, _formats));
+        });
+      }
     }
     if (_options.plot) add(std::make_unique<Picture>(*_options.plot));
+  }
+
+  // A sink that has failed gets nothing more; the others go on.
+  void feed(Sink& sink, const std::function<void()>& part) {
+    if (sink.hasFailed) return;
+    sink.hasFailed = !succeeds(part);
+    _isOutputBroken |= sink.hasFailed;
   }
 
   int decodeCapture(Capture& capture, const DecodingServices& services) {
@@ -257,15 +268,10 @@ class InputDecoding {
     return isDone && !_isOutputBroken ? 0 : generalError;
   }
 
-  // A sink that has failed gets no more generations; the others go on.
   void report(Generation generation) {
     generation.dating = _dating;
     generation.elapsed = _elapsed.at(generation.time);
-    for (Sink& sink : _sinks) {
-      if (sink.hasFailed) continue;
-      sink.hasFailed = !succeeds([&] { sink.sink->take(generation); });
-      _isOutputBroken |= sink.hasFailed;
-    }
+    for (Sink& sink : _sinks) feed(sink, [&] { sink.sink->take(generation); });
   }
 
   bool finishSinks() {

@@ -91,6 +91,17 @@ TEST_F(DecodeRecords, MessagesThatAreNoLogRecordsAreLeftOutAndCounted) {
   EXPECT_EQ(contentsOf(pcap).substr(24), contentsOf(source).substr(24)) << "which has a place for each";
 }
 
+TEST_F(DecodeRecords, RecordsAreWrittenEvenIfATableCannotBe) {
+  const std::string source = write("source", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)) +
+                                                 pcapRecord(afternoon + 5, 0, antennas(4)));
+  const std::string stream = folder.file("stream");
+  const Result result = runInShell("--log-level -1 --records " + stream +
+                                   " --csv 'Serving Cell Info/Num Tx Antennas' -- " + source + " >/dev/full");
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(result.error, "varnel-decode: cannot write to standard output: No space left on device\n");
+  EXPECT_EQ(recordsIn(stream).size(), 2u);
+}
+
 TEST_F(DecodeRecords, RecordsAreWrittenBesideWhateverIsDecoded) {
   const std::string source = write("source", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)));
   const std::string stream = folder.file("stream");
