@@ -27,7 +27,7 @@ void decode(benchmark::State& state, const PacketCase& packetCase) {
 
 const bool areRegistered = [] {
   for (const PacketCase& packetCase : packetCases()) {
-    benchmark::RegisterBenchmark(std::string(packetCase.name).c_str(), decode, packetCase);
+    benchmark::RegisterBenchmark(packetCase.name.c_str(), decode, packetCase);
   }
   return true;
 }();

@@ -10,7 +10,7 @@
 int main(int argumentCount, char** arguments) {
   using namespace varnel;
   if (argumentCount < 3) {
-    for (const PacketCase& packetCase : packetCases()) std::puts(packetCase.name.data());
+    for (const PacketCase& packetCase : packetCases()) std::puts(packetCase.name.c_str());
     return 0;
   }
   const auto found = std::ranges::find(packetCases(), std::string_view(arguments[1]), &PacketCase::name);

@@ -1,7 +1,15 @@
 #include "PacketCases.h"
 
+#include <algorithm>
+#include <cstdio>
 #include <cstring>
+#include <ostream>
+#include <vector>
 
+#include "LogGenerator/KLV/GSMUMTS/KLV_GSMClassIndex.h"
+#include "LogGenerator/KLV/LTE/LTEClassIndex.h"
+#include "LogGenerator/KLV/UTRAN/UTRANClassIndex.h"
+#include "LogGenerator/LogMessage.h"
 #include "base/Dictionary.h"
 #include "base/PropertyList.h"
 #include "platform/TelephonyService.h"
@@ -128,10 +136,8 @@ Bytes lteCellMonitor() { return cellMonitorOf16Records(cellMonitor::lte); }
 
 Bytes gsmUMTSCellMonitor() { return cellMonitorOf16Records(cellMonitor::umts); }
 
-}  // namespace
-
-std::span<const PacketCase> packetCases() {
-  static constexpr PacketCase cases[] = {
+std::vector<PacketCase> fullPackets() {
+  return {
       {"LTE 0xB0C2", technology::kalviLTE, lteServingCell},
       {"LTE 0xB17F", technology::kalviLTE, lteServingCellMeasurement},
       {"LTE 0xB180, 8 cells", technology::kalviLTE, lteNeighborsOf8Cells},
@@ -146,6 +152,42 @@ std::span<const PacketCase> packetCases() {
       {"C2K 0x1192", technology::kalviCDMA, c2kForwardLink, advanceForwardLink},
       {"C2K 0x127e", technology::kalviCDMA, c2kReverseLink, advanceReverseLink},
   };
+}
+
+Bytes zeros(std::uint32_t logCode, std::size_t size) {
+  Bytes bytes(std::max(size, Packet::headerSize));
+  bytes[0] = LogMessage::modemLogType;
+  bytes[LogMessage::logCodeOffset] = static_cast<std::uint8_t>(logCode);
+  bytes[LogMessage::logCodeOffset + 1] = static_cast<std::uint8_t>(logCode >> 8);
+  return bytes;
+}
+
+// Messages of the telephony server are left out: their payload is a property list.
+void addShortest(const ClassIndex& index, const std::string& name, std::string_view technology,
+                 std::vector<PacketCase>& cases) {
+  for (const std::uint32_t code : index.logCodes()) {
+    if (code >= LogMessage::extraCodeBase) continue;
+    char text[16];
+    std::snprintf(text, sizeof text, " 0x%04X", static_cast<unsigned>(code));
+    if (std::ranges::find(cases, name + text, &PacketCase::name) != cases.end()) continue;
+    const std::size_t size = index.subscription(code)->shortestTaken;
+    cases.push_back({name + text, technology, [code, size] { return zeros(code, size); }});
+  }
+}
+
+std::vector<PacketCase> allCases() {
+  std::vector<PacketCase> cases = fullPackets();
+  std::ostream nowhere(nullptr);
+  addShortest(LTEClassIndex(nowhere), "LTE", technology::kalviLTE, cases);
+  addShortest(UTRANClassIndex(nowhere), "UTRAN", technology::kalviUTRAN2, cases);
+  addShortest(KLV_GSMClassIndex(nowhere), "GSM/UMTS", technology::kalviGSMUMTS, cases);
+  return cases;
+}
+
+}  // namespace
+
+std::span<const PacketCase> packetCases() {
+  static const std::vector<PacketCase> cases = allCases();
   return cases;
 }
 
