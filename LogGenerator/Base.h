@@ -42,11 +42,12 @@ class Base {
   virtual std::string_view getSectionName() const = 0;
   /// The log codes of the decoder, in order.
   virtual std::vector<std::uint32_t> getLogCodeArray() const = 0;
-  /// Decodes one whole packet, header included, into the section.
+  /// Decodes one whole packet, header included, into the section. It is the last of three steps: the model's
+  /// `updateWithData` passes a message on, the generator's frames it, and this one decodes the packet.
   virtual void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) = 0;
 
-  /// The handlers, one per log code of the array. The class index calls them. Empty when the decoder
-  /// overrides `updateWithData_logCode`, which is then called instead.
+  /// The handlers, one per log code of the array. Empty for a decoder without a table: it gets its packets in
+  /// `updateWithData_logCode`.
   virtual std::span<const PacketHandler> handlers() const { return {}; }
   /// Decodes one whole packet with one of the handlers.
   virtual void decode(const Packet& /*packet*/, const PacketHandler& /*handler*/) {}

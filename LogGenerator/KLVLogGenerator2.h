@@ -30,7 +30,8 @@ class KLVLogGenerator2 : public KLVLogGenerator {
   ~KLVLogGenerator2() override;
 
  private:
-  /// Frames one message and passes it to its decoders.
+  /// Frames a message that the model's `updateWithData` passed on, and gives the packet to its decoders'
+  /// `updateWithData_logCode` or handlers.
   void updateWithData(ByteView data);
   /// The display in the state. Kept: the call that builds it returns nothing; only later calls return it.
   Value getDisplayFromState(Dictionary& state);

@@ -44,8 +44,8 @@ struct EntryPlace {
   std::size_t depth = 0;
 };
 
-/// The formats of a display's entries, from their decoders. Only the formats decide what is a number and what
-/// is a unit, not the look of a value.
+/// The formats of a display's entries, from their decoders. A unit comes from the formats alone, not from the
+/// look of a value. A plain decimal number needs no format.
 class NumberFormats {
  public:
   /// Adds a format of an entry in this section. An entry may have several formats. Ignores formats that

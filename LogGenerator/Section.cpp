@@ -56,7 +56,9 @@ std::size_t Section::indexOf(std::string_view label) {
 }
 
 const std::vector<std::size_t>& Section::entriesOf(std::span<const Field> fields) {
-  const auto known = std::ranges::find(_tables, fields.data(), &Table::fields);
+  const auto known = std::ranges::find_if(_tables, [&](const Table& table) {
+    return table.fields == fields.data() && table.entries.size() == fields.size();
+  });
   if (known != _tables.end()) return known->entries;
   Table table{fields.data(), {}};
   for (const Field& field : fields) table.entries.push_back(indexOf(field.label));

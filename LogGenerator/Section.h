@@ -17,8 +17,8 @@
 namespace varnel {
 
 /// What a decoder writes to: its section of the display. This is a dictionary of entries, or for a list
-/// section an array of records. Nobody sees what is written until a display is built with the decoder, or if
-/// the template has a container of the other kind.
+/// section an array of records. Without a container, or with one of the other kind, what is written is
+/// lost.
 class Section {
  public:
   /// Sets the container to write to from now on.

@@ -10,7 +10,8 @@
 namespace varnel {
 
 /// When packets last wrote what a display shows, by the decoder's clock. Absent for what no packet has
-/// written, and for what has no time of its own: that has the time of the container around it.
+/// written since this generator began, and for what has no time of its own: that has the time of the
+/// container around it.
 class WriteTimes {
  public:
   virtual ~WriteTimes() = default;

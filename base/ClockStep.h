@@ -12,7 +12,8 @@ enum class ClockStep {
   Ahead,       ///< it went forward by more than a day
 };
 
-/// Takes any two moments. After an `Overtaking`, compare the next record with the earlier of the two records.
+/// Takes any two moments. After an `Overtaking`, compare the next record with the same
+/// `earlierRecord` again.
 ClockStep clockStep(Time earlierRecord, Time laterRecord);
 
 }  // namespace varnel

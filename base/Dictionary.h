@@ -37,14 +37,15 @@ class Dictionary {
   /// nothing.
   void setText(std::string_view key, std::string_view text);
   void remove(std::string_view key);
-  /// Adds an entry at the end. The key must not be in the dictionary.
+  /// Adds an entry at the end. The key must not be in the dictionary, and the value not be absent.
   void add(std::string_view key, Value value);
   /// Removes the entries from this position on.
   void truncate(std::size_t size);
   /// Reserves memory for this many keys.
   void reserve(std::size_t size) { _entries.reserve(size); }
 
-  /// The position of the key; `nowhere` when it is missing. A position is valid until a key is removed.
+  /// The position of the key; `nowhere` when it is missing. A position is valid until an
+  /// entry is removed.
   std::size_t find(std::string_view key) const;
   /// Whether the key is at this position.
   bool hasAt(std::size_t position, std::string_view key) const {

@@ -133,7 +133,7 @@ class XmlScan {
   struct Container {
     std::size_t path;          // the length of its own path
     std::size_t keyCount = 0;  // so far
-    std::size_t key = 0;       // the length of the last one, or less
+    std::size_t key = 0;       // at least the length of the last one
   };
 
   std::string_view _rest;
@@ -182,7 +182,7 @@ class BinaryWalk {
   // Where a value stands.
   struct Place {
     std::size_t depth = 0;  // the containers around it
-    std::size_t path = 0;   // the length of its path, or less
+    std::size_t path = 0;   // at least the length of its path
 
     Place below(std::size_t key) const { return {depth + 1, path + key + 1}; }
   };

@@ -6,7 +6,8 @@
 namespace varnel {
 
 /// Makes tasks that can be kept longer than their owner lives. A task does nothing once the owner is gone.
-/// This object must be the last member of the owner, so that no task runs while the owner is being destroyed.
+/// This object must be the last member of the owner, so that no task runs while the owner's other members are
+/// being destroyed. The body of the owner's destructor runs before that.
 /// Owner and tasks must stay on one thread.
 class WhileAlive {
  public:

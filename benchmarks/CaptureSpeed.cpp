@@ -71,7 +71,7 @@ std::vector<Bytes> unknownMessages() {
   return messages;
 }
 
-// In its packets, a modem puts its own time.
+// A modem writes its own time into its packets.
 void setTime(Bytes& message, Time time) {
   constexpr std::size_t timeOffset = 5;
   const ModemTime now = modemTimeOf(time);

@@ -28,8 +28,8 @@ class VarnelModelObserver {
   virtual void linkWasLost() {}
   /// The stream has started, so `isConnected` is true. The tree does not change until data arrives.
   virtual void linkWasOpened() {}
-  /// The model has checked the link, and no data has arrived; or it could not open the link. What there is to
-  /// tell about the link may have changed.
+  /// The model has checked the link, and no data has arrived; or it could not open the link. The state of
+  /// the link may have changed.
   virtual void linkWasLookedAt() {}
 };
 
@@ -82,7 +82,7 @@ class VarnelModel {
   void startMonitor();
   /// Notices that the service has gone away. Updates the observer when new data has arrived.
   void refresh();
-  /// Gives the generator one message of the log channel, which changes the state.
+  /// Gives the generator one message of the log channel, whole, which changes the state.
   void updateWithData(ByteView data);
 
   /// The root of the display tree; null while there is no generator. If no tree is cached, builds one, and
@@ -117,7 +117,7 @@ class VarnelModel {
   bool createRemotePort(const std::string& name);
   void destroyPorts();
   void configureGenerator();
-  /// The answer. Without an answer logs why and returns nothing.
+  /// The technology that the service names. Without an answer logs why and returns nothing.
   std::optional<Value> askForTechnology();
   bool startStream();
   StreamFailure failureToStart();

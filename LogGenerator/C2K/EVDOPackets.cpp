@@ -80,7 +80,7 @@ void decodeFingerC2I(const Packet& packet, State& /*state*/, Lookup& lookup) {
   constexpr std::size_t fingerSize = 14;
   const std::uint8_t count = packet.u8(countOffset);
   if (packet.size() != fingerC2ISize + fingerSize * count) {
-    // Kept: the size in the log line is that of a packet without fingers.
+    // Kept: the size in the log line is that of a packet without fingers, not the expected one.
     logError("Log code 0x108a has bad length of %u bytes, but has %d substructs (size=%u).",
              static_cast<std::uint32_t>(packet.size()), count, fingerC2ISize);
     return;

@@ -24,9 +24,9 @@ class GSMLogGenerator final : public LogGenerator {
   /// The records of the history.
   Value getSaveContentsFromState(const Dictionary& state) const override;
 
-  /// The display form of an object, in new containers. Each array loses its first element. The value of its
-  /// only entry replaces each child dictionary with one entry. Raises AssertionFailure for any value but
-  /// strings, dictionaries, and arrays.
+  /// The display form of an object, in new containers. Each array loses its first element. Each child
+  /// dictionary with one entry is replaced by the value of that entry. Raises AssertionFailure for any value
+  /// but strings, dictionaries, and arrays.
   static Value processObject(const Value& object);
   /// The value of a dictionary's only entry; absent for any other value.
   static Value canCollapse(const Value& object);

@@ -13,12 +13,14 @@ constexpr std::size_t recordSize = 9;
 constexpr Field window[] = {
     {u16(14), "Window Size"},
 };
+static_assert(extent(window) <= minimumSize);
 
 constexpr Field channel[] = {
     {u8(0), "Transport Channel ID"},
     {u32(1), "CRC Received"},
     {u32(5), "CRC Received in Error"},
 };
+static_assert(extent(channel) <= recordSize);
 
 void update(Section& section, const Packet& packet) {
   section.show(packet, window);

@@ -15,6 +15,7 @@ constexpr Field cell[] = {
     {s8(4), "RSSI", integer("%d dBm")},
     {s16(5), "Ranking Value"},
 };
+static_assert(extent(cell) <= recordSize);
 
 void update(Section& section, const Packet& packet) {
   using namespace cellRanking;

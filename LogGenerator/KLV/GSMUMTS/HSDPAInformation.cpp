@@ -21,6 +21,7 @@ constexpr Field configuration[] = {
     {bits(14, 0, 10), "Sub Frames", number},
     {bits(15, 2, 2), "Carrier Info", entry(carriers)},
 };
+static_assert(extent(configuration) <= minimumSize);
 
 // A process of the hybrid automatic repeat request (HARQ).
 constexpr Field process[] = {

@@ -15,6 +15,7 @@ constexpr std::size_t channelSize = 2;
 constexpr Field hopping[] = {
     {u8(13), "HSN"},
 };
+static_assert(extent(hopping) <= minimumSize);
 
 void update(Section& section, const Packet& packet) {
   section.show(packet, hopping);

@@ -21,6 +21,7 @@ constexpr Field cell[] = {
     {u8(2), "RSSI"},
     {u32(3), "C1 Value"},
 };
+static_assert(extent(cell) <= gsmMeasurement::neighborSize);
 
 using Width = CellMonitorColumn::Width;
 constexpr CellMonitorColumn cellMonitorColumns[] = {

@@ -20,6 +20,7 @@ constexpr Field cell[] = {
     {s16(8), "Ranking Value"},
     {s16(5), "Rank Cell RSCP", integer("%d dB")},
 };
+static_assert(extent(cell) <= recordSize);
 
 using Width = CellMonitorColumn::Width;
 constexpr CellMonitorColumn cellMonitorColumns[] = {

@@ -10,6 +10,7 @@ namespace {
 constexpr Field detectedCell[] = {
     {u16(0), "Physical Cell ID"},
 };
+static_assert(extent(detectedCell) <= connectedModeMeasurement::detectedCellSize);
 
 void update(Section& section, const Packet& packet) {
   using namespace connectedModeMeasurement;

@@ -12,6 +12,7 @@ constexpr Field neighbor[] = {
     {u16(2), "Filtered RSRP", real("%4.2f dBm", 0.25, -140.0)},
     {u16(4), "Filtered RSRQ", real("%4.2f dB", 0.125, -20.0)},
 };
+static_assert(extent(neighbor) <= connectedModeMeasurement::neighborSize);
 
 void update(Section& section, const Packet& packet) {
   using namespace connectedModeMeasurement;

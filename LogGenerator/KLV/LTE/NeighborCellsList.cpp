@@ -30,6 +30,7 @@ constexpr Field cell[] = {
     {antennaFrame, "Ant 1 Frame Offset"},
     {antennaSample, "Ant 1 Sample Offset"},
 };
+static_assert(extent(cell) <= recordSize);
 
 // Kept: five values are traced under one label.
 void trace(const Packet& record) {

@@ -17,6 +17,7 @@ constexpr Field channel[] = {
 };
 constexpr std::size_t firstRatio = 2;
 constexpr std::size_t ratioCount = 6;
+static_assert(extent(channel) <= firstRatio && firstRatio + ratioCount == compositeChannelSize);
 
 Value ratios(const Packet& record) {
   Array texts;

@@ -19,6 +19,7 @@ constexpr Field cell[] = {
     {u16(4), "ARFCN"},
     {s16(6), "RSSI"},
 };
+static_assert(extent(cell) <= recordSize);
 
 void update(Section& section, const Packet& packet) {
   section.refill([&](Array& cells) {

@@ -11,6 +11,7 @@ constexpr Field channel[] = {
     {u8(0), "TRCH ID"},
     {u8(1), "TRCH BLER Measurement"},
 };
+static_assert(extent(channel) <= transportChannels::transportChannelSize);
 
 void update(Section& section, const Packet& packet) {
   using namespace transportChannels;

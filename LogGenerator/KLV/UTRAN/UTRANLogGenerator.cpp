@@ -44,7 +44,7 @@ std::unique_ptr<LogGenerator> UTRANLogGenerator::generator(const Services& servi
   return std::make_unique<UTRANLogGenerator>(services);
 }
 
-// This is the template that ships, since it is not known which name was wanted.
+// Without a template there is no name to report, so this names the template that ships.
 std::optional<std::string> UTRANLogGenerator::missingTemplate() const {
   return KLVLogGenerator2::missingTemplate() ? std::optional("UTRAN.plist") : std::nullopt;
 }

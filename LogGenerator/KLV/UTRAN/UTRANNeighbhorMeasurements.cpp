@@ -21,6 +21,7 @@ constexpr Field cell[] = {
     {bits(3, 5, 2), membershipEntry, choice(memberships, "")},
     {bits(3, 7, 1), "inJDCS", choice(truth, "TRUE")},
 };
+static_assert(extent(cell) <= recordSize);
 
 void update(Section& section, const Packet& packet) {
   const std::uint32_t count = packet.bits(16, 1, 7);
