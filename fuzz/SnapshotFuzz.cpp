@@ -23,6 +23,7 @@
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/PlotRecorder.h"
 #include "programs/varnel-decode/SnapshotFile.h"
+#include "programs/varnel-decode/TechnologyGuess.h"
 
 using namespace varnel;
 
@@ -126,7 +127,8 @@ void checkValueTable(const std::vector<Generation>& generations, const std::vect
 
 void checkPlot(const std::vector<Generation>& generations, const std::vector<std::string>& paths) {
   PlotRecorder recorder(paths);
-  SeenPaths seen(paths);
+  const TechnologyGuess guess;  // a snapshot needs none
+  SeenPaths seen(paths, guess);
   for (const Generation& generation : generations) {
     recorder.take(generation);
     seen.take(generation);
