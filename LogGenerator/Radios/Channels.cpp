@@ -28,7 +28,7 @@ struct LTEBand {
 };
 
 // 3GPP TS 36.101, table 5.7.3-1. The offsets N_Offs-DL and N_Offs-UL are the first numbers of the ranges.
-// Bands from 107 on, and those of satellites (TS 36.102), have no row.
+// Bands from 107 on, and those of satellites (TS 36.102), are left out.
 // clang-format off
 constexpr LTEBand lteBands[] = {
     // Band  F_DL_low    N_DL              F_UL_low    N_UL
@@ -159,7 +159,7 @@ struct NRBand {
 
 // 3GPP TS 38.104, tables 5.2-1 and 5.2-2; band 47, which has no base stations: TS 38.101-1, table 5.2-1. The
 // ranges of table 5.4.2.3-1 are these in channel numbers. Bands 68, 87, 88 and 109 to 112, of later releases,
-// and those of satellites (TS 38.108) have no row.
+// and those of satellites (TS 38.108) are left out.
 // clang-format off
 constexpr NRBand nrBands[] = {
     // Band  Uplink                   Downlink
@@ -353,7 +353,7 @@ struct GSMChannels {
 
 // 3GPP TS 45.005, section 2. A 900 MHz band also has the numbers of the rows above its own. In GSM 750 the
 // phone has the upper carrier. Bands whose numbers each network chooses (T-GSM 380, T-GSM 410, GSM 710, T-GSM
-// 810) have no row.
+// 810) are left out.
 // clang-format off
 constexpr GSMChannels gsmChannels[] = {
     // Band                            ARFCN         Uplink    Duplex distance

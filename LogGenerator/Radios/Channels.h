@@ -8,15 +8,15 @@
 
 /// What the channel numbers of LTE, NR, UMTS and GSM stand for: a frequency and the bands it lies in.
 /// Frequencies are those of the carrier's center, in whole kilohertz, which every raster allows. A number
-/// that stands for nothing gives nothing. No function allocates.
+/// that no band has gives an absent result. No function allocates.
 namespace varnel::channels {
 
 /// A frequency in MHz.
 constexpr double megahertz(std::int32_t frequency_khz) { return frequency_khz / 1000.0; }
 
-/// The numbers of the bands that a channel may belong to, the most specific first: the narrowest one, and of
-/// those of one width the one with the lowest number. A receiver cannot tell which of them the network means,
-/// so a display that has no word of the modem's own shows them all.
+/// The numbers of the bands that a channel may belong to, the narrowest first. Bands of equal width come in
+/// the order of their numbers. A receiver cannot tell which of them the network means. A display shows them
+/// all, unless the modem names the band.
 class BandNumbers {
  public:
   static constexpr std::size_t capacity = 8;
@@ -33,8 +33,8 @@ class BandNumbers {
     return false;
   }
 
-  /// Adds a band behind those that are not wider. Bands come in the order of their numbers, `capacity` at
-  /// most.
+  /// Adds a band after those that are as wide or narrower. Add bands in the order of their numbers, at most
+  /// `capacity`.
   constexpr void add(std::uint16_t number, std::int32_t width_khz) {
     std::size_t at = _size++;
     for (; at > 0 && _widths_khz.at(at - 1) > width_khz; --at) {
@@ -116,7 +116,7 @@ struct GSMChannel {
   bool operator==(const GSMChannel&) const = default;
 };
 
-/// The channel of an ARFCN. Numbers that two bands have give nothing while the indicator is not known.
+/// The channel of an ARFCN. Absent for a number that two bands have, while the indicator is not known.
 std::optional<GSMChannel> gsmChannel(std::uint32_t arfcn, GSMBandIndicator indicator);
 
 }  // namespace varnel::channels

@@ -3,7 +3,8 @@
     (gdb) source tools/gdb/printers.py
 
 They read the members as they stand in memory and call no function of the program, so they work on a core file too.
-Whatever gdb's "print elements" limit leaves out is told by dots: what is printed may be a variable without a value yet.
+Dots stand for the elements that gdb's "print elements" limit leaves out. The limit matters: a variable that has no
+value yet can seem to be huge.
 """
 
 import datetime
@@ -12,7 +13,7 @@ import struct
 import gdb
 import gdb.printing
 
-# What stands in a literal in another way than as itself.
+# Characters that a literal writes as escapes.
 ESCAPES = {code: "\\x%02x" % code for code in (*range(0x20), 0x7F)}
 ESCAPES.update({ord('"'): '\\"', ord("\n"): "\\n", ord("\t"): "\\t"})
 
