@@ -1,26 +1,24 @@
 #include "programs/varnel-telephonyd/CodeFilter.h"
 
+#include "LogGenerator/LogMessage.h"
+
 namespace varnel {
 
 namespace {
 
-constexpr std::size_t headerSize = 13, codeOffset = 3;
-constexpr std::uint8_t modemType = 1, serverType = 0xFF;
-constexpr std::uint8_t prefixMark = 0x81;
-constexpr std::size_t prefixSize = 2;
-
-bool holds(const std::optional<CodeFilter::Codes>& codes, int code) { return codes && codes->contains(code); }
+bool holds(const std::optional<CodeFilter::Codes>& codes, std::uint32_t code) {
+  return codes && codes->contains(code);
+}
 
 }  // namespace
 
 bool CodeFilter::takes(ByteView message) const {
   if (!modemCodes && !serverCodes) return true;
-  if (message.size() < headerSize) return true;
-  if (message[0] == prefixMark) message = message.subspan(prefixSize);
-  const int code = message[codeOffset] | message[codeOffset + 1] << 8;
-  if (message[0] == modemType) return holds(modemCodes, code);
-  if (message[0] == serverType) return holds(serverCodes, code);
-  return true;
+  const auto framed = LogMessage::framed(message);
+  if (!framed || !framed->isOfKnownType()) return true;
+  const std::uint32_t code = framed->logCode();
+  if (framed->logType() == LogMessage::modemLogType) return holds(modemCodes, code);
+  return holds(serverCodes, code - LogMessage::extraCodeBase);
 }
 
 }  // namespace varnel

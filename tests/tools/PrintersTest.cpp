@@ -19,13 +19,11 @@ using testing::ElementsAre;
 class Printers : public testing::Test {
  protected:
   static void SetUpTestSuite() {
-    if (installedTool("gdb").empty()) return;
     const auto gdb = gdbAfter({"run"});
     isTracingForbidden = gdb->error().find("Could not trace the inferior process") != std::string::npos;
   }
 
   void SetUp() override {
-    if (installedTool("gdb").empty()) GTEST_SKIP() << "gdb is missing; ./dev setup installs it";
     if (isTracingForbidden) GTEST_SKIP() << "this system forbids gdb to trace a program";
   }
 
