@@ -8,6 +8,7 @@
 #include <string_view>
 #include <vector>
 
+#include "LogGenerator/MessageFate.h"
 #include "LogGenerator/PacketHandler.h"
 #include "LogGenerator/Section.h"
 #include "base/Value.h"
@@ -51,6 +52,14 @@ class Base {
   virtual std::span<const PacketHandler> handlers() const { return {}; }
   /// Decodes one whole packet with one of the handlers.
   virtual void decode(const Packet& /*packet*/, const PacketHandler& /*handler*/) {}
+  /// What becomes of a packet that has one of the decoder's log codes but no handler: it is decoded. A
+  /// decoder of packets with versions may not know the version, or may find the packet too short. Decodes
+  /// nothing.
+  virtual MessageFate fateOf(const Packet& /*packet*/, std::uint32_t logCode) const {
+    return {MessageFate::Outcome::Decoded, logCode};
+  }
+  /// A display is about to be made. A decoder whose entries age removes those that are too old.
+  virtual void prepareDisplay(const Time& /*now*/) {}
   /// Adds the formats of the section's entries that write numbers with a unit or with other texts around
   /// them.
   virtual void listNumberFormats(SectionFormats& /*formats*/) const {}

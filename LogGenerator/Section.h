@@ -29,6 +29,7 @@ class Section {
 
   /// Sets the time of the packets that are decoded from now on.
   void setTime(const Time& now) { _now = now; }
+  const Time& time() const { return _now; }
   /// When a packet last wrote the entry; absent when none did.
   std::optional<Time> writtenAt(std::string_view entry) const;
   /// When a packet last refilled the list; absent when none did.

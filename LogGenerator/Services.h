@@ -2,6 +2,7 @@
 
 #include <iosfwd>
 
+#include "LogGenerator/Identities.h"
 #include "platform/ApplicationInfo.h"
 #include "platform/Clock.h"
 #include "platform/Resources.h"
@@ -13,7 +14,8 @@ struct Services {
   const Resources& resources;
   const Clock& clock;
   const ApplicationInfo& application;
-  std::ostream& standardOutput;  ///< for the few lines that generators write there
+  std::ostream& standardOutput;                ///< for the few lines that generators write there
+  Identities identities = Identities::Hidden;  ///< heeded by the technology of all radios alone
 };
 
 }  // namespace varnel

@@ -16,6 +16,8 @@ inline constexpr std::string_view kalviGSMUMTS = "kalvi-gsm-umts";
 inline constexpr std::string_view kalviCDMA = "kalvi-cdma";
 inline constexpr std::string_view kalviLTE = "kalvi-lte";
 inline constexpr std::string_view kalviUTRAN2 = "kalvi-utran-2";
+/// All radios of a modem in one display.
+inline constexpr std::string_view allRadios = "all-radios";
 }  // namespace technology
 
 /// Keys and constant values of the service's cell-monitor records.

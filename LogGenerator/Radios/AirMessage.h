@@ -1,0 +1,77 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <span>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "LogGenerator/MessageFate.h"
+#include "LogGenerator/Packet.h"
+#include "base/Bytes.h"
+
+namespace varnel {
+
+/// One message of the air interface, with what the modem says about it: RRC and NAS messages of LTE and NR,
+/// RRC messages of UMTS, RR messages of GSM, NAS messages of GSM and UMTS.
+struct AirMessage {
+  enum class Radio : std::uint8_t { LTE, NR, UMTS, GSM };
+  enum class Protocol : std::uint8_t { RRC, NAS, RR };
+  enum class Direction : std::uint8_t { Unknown, Downlink, Uplink };
+
+  Radio radio{};
+  Protocol protocol{};
+  Direction direction = Direction::Unknown;
+  /// The logical channel as the standard writes it, as "DL-DCCH"; empty for NAS messages and for a type that
+  /// no channel carries by itself.
+  std::string_view channel{};
+  /// The message's name as the standard writes it, as "RRCConnectionRelease" or "Attach request"; for one
+  /// that is ciphered or not known, a text that says so.
+  std::string name{};
+  /// The cell: the number of its channel, and its physical identity or scrambling code. Absent when the modem
+  /// does not tell.
+  std::optional<std::uint32_t> channelNumber{};
+  std::optional<std::uint16_t> physicalCell{};
+  std::optional<std::uint16_t> frame{};
+  std::optional<std::uint8_t> subframe{};
+  /// The message itself, without the modem's header.
+  Bytes bytes{};
+};
+
+/// What a packet yields: a message, or why there is none. A part of a longer message yields none yet, but
+/// counts as decoded.
+struct AirMessageReading {
+  MessageFate fate;
+  std::optional<AirMessage> message{};
+  /// The version of the packet; absent for a packet without one.
+  std::optional<PacketVersion> version{};
+};
+
+/// The log codes of the packets that carry such messages.
+std::span<const std::uint32_t> airMessageLogCodes();
+
+/// Reads messages from packets of these codes. Joins the parts of long messages, so one reader must get all
+/// packets of one subscription, in their order. Keeps the parts of one message per log code, at most 64 KiB.
+class AirMessageReader {
+ public:
+  AirMessageReading read(const Packet& packet, std::uint32_t logCode);
+  /// What would become of the packet, without its message.
+  static MessageFate fateOf(const Packet& packet, std::uint32_t logCode);
+
+ private:
+  struct Parts {
+    std::uint32_t logCode;
+    unsigned lastSegment;
+    AirMessage message;
+  };
+  std::vector<Parts> _parts;
+};
+
+/// "LTE", "RRC" and "Downlink", for displays.
+std::string_view nameOf(AirMessage::Radio radio);
+std::string_view nameOf(AirMessage::Protocol protocol);
+std::string_view nameOf(AirMessage::Direction direction);
+
+}  // namespace varnel
