@@ -108,7 +108,7 @@ void LTEModem::sendServingCell() {
   constexpr std::size_t size = 38;
   const Cell& cell = servingCell();
   send(PacketWriter(servingCellCode, now(), size)
-           .u8(13, 3)  // version
+           .u8(13, 2)  // version
            .u16(14, cell.code)
            .u16(16, cell.channel)
            .u16(18, uplinkEARFCN(cell.channel))
@@ -128,7 +128,7 @@ void LTEModem::sendAntennas() {
   constexpr std::size_t size = 22;
   const Cell& cell = servingCell();
   send(PacketWriter(antennasCode, now(), size)
-           .u8(13, 2)  // version
+           .u8(13, 1)  // version
            .u16(14, cell.code)
            .u16(16, cell.channel)
            .u16(18, now().count() / 10 % 1024)  // system frame number
@@ -146,7 +146,7 @@ void LTEModem::sendServingMeasurement() {
   const std::int64_t left_db = aboveMinimum_db(serving.averageRSRP_cdbm);
   const std::int64_t rules = left_db > otherSearch_db ? lteRules : lteRules | otherTechnologiesRule;
   send(PacketWriter(servingMeasurementCode, now(), size)
-           .u8(13, 4)  // version
+           .u8(13, 3)  // version
            .u16(17, cell.channel)
            .bits(19, 0, 9, cell.code)
            .bits(20, 1, 4, priority(cell))
@@ -229,7 +229,7 @@ void LTEModem::sendConnectedMeasurement() {
 
   PacketWriter packet(connectedMeasurementCode, now(), headSize);
   packet
-      .u8(13, 3)  // version
+      .u8(13, 2)  // version
       .u16(17, cell.channel)
       .u16(19, cell.code)
       .u16(21, now().count() % 10'240)  // subframe, counted over all frames
