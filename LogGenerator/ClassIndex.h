@@ -80,6 +80,10 @@ class ClassIndex {
   std::vector<CodeSections> codeSections() const;
   /// Adds the formats of all decoders' sections.
   void listNumberFormats(NumberFormats& formats) const;
+  /// Tells all decoders that a display is about to be made.
+  void prepareDisplay(const Time& now) const {
+    for (const auto& [name, decoder] : classDict) decoder->prepareDisplay(now);
+  }
   /// For debugging: logs the kind of object of the class dictionary.
   void status() const;
 

@@ -5,6 +5,7 @@
 
 #include "LogGenerator/Packet.h"
 #include "base/Bytes.h"
+#include "base/MessagePrefix.h"
 
 namespace varnel {
 
@@ -13,8 +14,6 @@ namespace varnel {
 /// to the packet.
 class LogMessage {
  public:
-  static constexpr std::uint8_t prefixMark = 0x81;
-  static constexpr std::size_t prefixSize = 2;
   /// The log types: packets of the modem, and packets that the telephony server makes itself.
   static constexpr std::uint8_t modemLogType = 1, extraLogType = 0xFF;
   static constexpr std::size_t logCodeOffset = 3;

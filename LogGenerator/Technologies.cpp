@@ -4,6 +4,7 @@
 #include "LogGenerator/KLV/LTE/LTELogGenerator.h"
 #include "LogGenerator/KLV/UTRAN/UTRANLogGenerator.h"
 #include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/Radios/AllRadiosLogGenerator.h"
 #include "platform/TelephonyService.h"
 
 // Only this file knows the generators of all technologies.
@@ -22,6 +23,7 @@ constexpr Registration registry[] = {
     {technology::kalviCDMA, C2KLogGenerator::generator},
     {technology::kalviLTE, LTELogGenerator::generator},
     {technology::kalviUTRAN2, UTRANLogGenerator::generator},
+    {technology::allRadios, AllRadiosLogGenerator::generator},
 };
 
 }  // namespace

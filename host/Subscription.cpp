@@ -2,17 +2,6 @@
 
 namespace varnel {
 
-namespace {
-
-constexpr std::uint8_t prefixMark = 0x81;
-
-}  // namespace
-
-std::optional<std::uint8_t> subscriptionOf(ByteView message) {
-  if (message.size() < 2 || message[0] != prefixMark || message[1] == 0) return std::nullopt;
-  return message[1];
-}
-
 std::string subscriptionName(std::optional<std::uint8_t> subscription) {
   return subscription ? "SIM " + std::to_string(*subscription) : "No SIM";
 }

@@ -5,13 +5,9 @@
 #include <span>
 #include <string>
 
-#include "base/Bytes.h"
+#include "base/MessagePrefix.h"
 
 namespace varnel {
-
-/// The subscription of a message of the log channel, from the byte after a leading 0x81. Absent when there is
-/// none, or when it is 0.
-std::optional<std::uint8_t> subscriptionOf(ByteView message);
 
 /// Takes the messages of one subscription from a stream that may have several. Without it, one display
 /// would mix the messages of several modems. Takes the wanted subscription, or else the first one that is

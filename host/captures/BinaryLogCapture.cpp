@@ -13,7 +13,7 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint8_t prefixMark = 0x81, packetLogType = 1, serverLogType = 0xFF;
+constexpr std::uint8_t packetLogType = 1, serverLogType = 0xFF;
 constexpr std::uint16_t reportCode = 0x1FFD;
 // The upper four bits of a modem's log code name a part of the modem and are never 0.
 constexpr std::uint16_t firstModemCode = 0x1000;

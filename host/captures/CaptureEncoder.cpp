@@ -3,6 +3,7 @@
 #include <cstring>
 #include <limits>
 
+#include "base/MessagePrefix.h"
 #include "host/captures/LittleEndian.h"
 #include "host/captures/LogFrame.h"
 #include "host/captures/ModemTime.h"
@@ -11,8 +12,8 @@ namespace varnel {
 
 namespace {
 
-constexpr std::uint8_t prefixMark = 0x81, packetLogType = 1;
-constexpr std::size_t prefixSize = 2, logTypeSize = 1, timeOffset = 4;
+constexpr std::uint8_t packetLogType = 1;
+constexpr std::size_t logTypeSize = 1, timeOffset = 4;
 constexpr std::size_t longestRecord = std::numeric_limits<std::uint16_t>::max();
 
 ModemTime timeToWrite(ModemTime inHeader, const CaptureRecord& record) {

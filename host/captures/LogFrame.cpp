@@ -2,6 +2,7 @@
 
 #include <optional>
 
+#include "base/MessagePrefix.h"
 #include "host/captures/LittleEndian.h"
 #include "host/captures/ModemTime.h"
 
@@ -12,7 +13,6 @@ namespace {
 constexpr std::size_t timeOffset = 4;
 constexpr std::size_t subscriptionOffset = 4;
 constexpr std::uint8_t packetLogType = 1;
-constexpr std::uint8_t prefixMark = 0x81;
 
 // The log channel has one byte for the subscription, where 0 is none. Larger numbers stand for "any" and the
 // like.

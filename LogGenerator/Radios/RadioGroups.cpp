@@ -1,0 +1,251 @@
+#include "LogGenerator/Radios/RadioGroups.h"
+
+#include <algorithm>
+#include <ostream>
+
+#include "LogGenerator/KLV/GSMUMTS/KLV_GSMClassIndex.h"
+#include "LogGenerator/KLV/UTRAN/UTRANClassIndex.h"
+#include "LogGenerator/Radios/RadioIndexes.h"
+#include "LogGenerator/SortedKey.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr std::string_view c2kGroup = "CDMA2000", c2kStateKey = "CDMA2000 State";
+
+// The lines that class indexes write belong to their own technologies.
+std::ostream& nowhere() {
+  static std::ostream stream(nullptr);
+  return stream;
+}
+
+template <class Index>
+std::unique_ptr<ClassIndex> make(const Services& /*services*/) {
+  return std::make_unique<Index>(nowhere());
+}
+
+// A radio, or another source of sections, and the groups that its sections are in.
+struct Child {
+  std::unique_ptr<ClassIndex> (*make)(const Services& services);
+  std::vector<std::string_view> groups;
+};
+
+// Adding a radio is adding a child. Where two have a section of one name in a group, the first one's counts.
+const std::vector<Child>& children() {
+  static const std::vector<Child> all = {
+      {make<radios::LTEIndex>, {"LTE"}},
+      {make<radios::NRIndex>, {"NR"}},
+      {make<radios::CorrectedIndex>, {"UMTS", "GSM", "PLMN"}},
+      {make<KLV_GSMClassIndex>, {"UMTS", "GSM", "Mobility Management", "PLMN"}},
+      {make<UTRANClassIndex>, {"UMTS"}},
+      {make<radios::SubscriberIndex>, {"Subscriber"}},
+      {make<radios::MessagesIndex>, {"Messages"}},
+  };
+  return all;
+}
+
+bool hasContent(const Value& value) {
+  if (const std::string* text = value.string()) return !text->empty();
+  if (const Array* elements = value.array()) return !elements->empty();
+  const Dictionary* entries = value.dictionary();
+  return !entries || std::ranges::any_of(*entries, [](const Dictionary::Entry& entry) {
+    return entry.key != sortMark && hasContent(entry.value);
+  });
+}
+
+Value copyOf(const Value& object) {
+  if (const Dictionary* entries = object.dictionary()) {
+    Value copy = Value::ofDictionary();
+    copy.dictionary()->reserve(entries->size());
+    for (const auto& [key, value] : *entries) copy.dictionary()->set(key, copyOf(value));
+    return copy;
+  }
+  if (const Array* elements = object.array()) {
+    Value copy = Value::ofArray();
+    for (const Value& element : *elements) copy.array()->push_back(copyOf(element));
+    return copy;
+  }
+  return object;
+}
+
+}  // namespace
+
+RadioGroups::RadioGroups(const Services& services, const Value& displayTemplate)
+    : _services(services), _c2k(services) {
+  _c2k.keepNoRawBytes();
+  const Dictionary* groups = displayTemplate.dictionary();
+  if (!groups) return;
+  const Value command = _c2k.getStartCommand();
+  for (const Value& code : *command.dictionary()->get("SetKalviLogCodes").array())
+    _c2kCodes.push_back(static_cast<std::uint32_t>(code.int32().value_or(0)));
+  for (const Child& child : children()) _indexes.push_back(child.make(_services));
+  for (const auto& [key, value] : *groups) {
+    if (key != sortMark) addGroup(key, value);
+  }
+}
+
+void RadioGroups::addGroup(const std::string& key, const Value& sections) {
+  Group group{key, sections.dictionary(), {}};
+  if (!group.sections) return;
+  const std::string_view name = displayNameOfSortedKey(key);
+  for (std::size_t i = 0; i < children().size(); ++i) {
+    if (std::ranges::find(children()[i].groups, name) != children()[i].groups.end())
+      group.indexes.push_back(_indexes[i].get());
+  }
+  const auto addCode = [this](std::uint32_t code) {
+    if (std::ranges::find(_codes, code) == _codes.end()) _codes.push_back(code);
+  };
+  for (ClassIndex* index : group.indexes) {
+    for (const std::uint32_t code : index->logCodes()) {
+      for (const Subscriber& subscriber : index->subscription(code)->subscribers) {
+        const std::string_view section = subscriber.decoder->getSectionName();
+        if (!group.sections->has(section) || decoderOf(group, section) != subscriber.decoder) continue;
+        _deliveries[code].push_back({_groups.size(), subscriber});
+        addCode(code);
+      }
+    }
+  }
+  if (name == c2kGroup) std::ranges::for_each(_c2kCodes, addCode);
+  _groups.push_back(std::move(group));
+}
+
+Base* RadioGroups::decoderOf(const Group& group, std::string_view section) const {
+  for (const ClassIndex* index : group.indexes) {
+    if (Base* decoder = index->getClass(section)) return decoder;
+  }
+  return nullptr;
+}
+
+void RadioGroups::bind(const Value& memory, const Value& display) {
+  _display = display;
+  _sections.clear();
+  Dictionary& kept = *memory.dictionary();
+  display.dictionary()->set(sortMark, "");
+  if (!kept.get(c2kStateKey).dictionary()) kept.set(c2kStateKey, Value::ofDictionary());
+  _c2kState = kept.get(c2kStateKey);
+  for (Group& group : _groups) {
+    if (!kept.get(group.key).dictionary()) kept.set(group.key, Value::ofDictionary());
+    group.shown = kept.get(group.key);
+    group.isShown = display.dictionary()->has(group.key);
+    bindSections(group);
+  }
+}
+
+void RadioGroups::bindSections(Group& group) {
+  Dictionary& sections = *group.shown.dictionary();
+  for (const auto& [name, value] : *group.sections) {
+    if (!sections.has(name)) sections.set(name, copyOf(value));
+    Base* const decoder = decoderOf(group, name);
+    if (!decoder) continue;
+    const Value& section = sections.get(name);
+    decoder->updateSectionRef(section);
+    const void* const container =
+        section.dictionary() ? static_cast<const void*>(section.dictionary()) : section.array();
+    _sections[container] = &decoder->section();
+  }
+}
+
+bool RadioGroups::isC2K(std::uint32_t logCode) const {
+  return std::ranges::find(_c2kCodes, logCode) != _c2kCodes.end();
+}
+
+bool RadioGroups::take(const LogMessage& message, ByteView bytes) {
+  if (!message.isOfKnownType()) return false;
+  const std::uint32_t logCode = message.logCode();
+  bool isTaken = false;
+  if (const auto found = _deliveries.find(logCode); found != _deliveries.end()) {
+    const Time now = _services.clock.now();
+    for (const auto& [index, subscriber] : found->second) {
+      isTaken |= !subscriber.handler || message.packet().size() >= subscriber.handler->minimumLength;
+      subscriber.decoder->section().setTime(now);
+      subscriber.deliver(message.packet(), logCode);
+      if (!_groups[index].isShown) noteWhetherShown(_groups[index]);
+    }
+  }
+  if (isC2K(logCode)) {
+    isTaken |= _c2k.fateOf(bytes).outcome == MessageFate::Outcome::Decoded;
+    takeC2K(bytes);
+  }
+  return isTaken;
+}
+
+void RadioGroups::takeC2K(ByteView bytes) {
+  _c2k.updateState_withData(*_c2kState.dictionary(), bytes);
+  const auto group = std::ranges::find_if(
+      _groups, [](const Group& candidate) { return displayNameOfSortedKey(candidate.key) == c2kGroup; });
+  const Value& itsDisplay = _c2kState.dictionary()->get(stateKey::display);
+  if (group == _groups.end() || group->isShown || itsDisplay.isAbsent()) return;
+  group->shown = itsDisplay;
+  noteWhetherShown(*group);
+}
+
+void RadioGroups::noteWhetherShown(Group& group) {
+  group.isShown = hasContent(group.shown);
+  if (group.isShown && _display.dictionary()) _display.dictionary()->set(group.key, group.shown);
+}
+
+// Of several decoders, the best that one of them makes of the packet.
+MessageFate RadioGroups::fateOf(const LogMessage& message, ByteView bytes) const {
+  using enum MessageFate::Outcome;
+  if (!message.isOfKnownType()) return {Unknown};
+  const std::uint32_t logCode = message.logCode();
+  if (isC2K(logCode)) return _c2k.fateOf(bytes);
+  const auto found = _deliveries.find(logCode);
+  if (found == _deliveries.end()) return {Unknown, logCode};
+  MessageFate best{TooShort, logCode};
+  for (const auto& [index, subscriber] : found->second) {
+    if (subscriber.handler) {
+      if (message.packet().size() >= subscriber.handler->minimumLength) return {Decoded, logCode};
+      continue;
+    }
+    const MessageFate fate = subscriber.decoder->fateOf(message.packet(), logCode);
+    if (fate.outcome == Decoded) return fate;
+    if (fate.outcome == UnknownVersion) best = fate;
+  }
+  return best;
+}
+
+void RadioGroups::prepareDisplay(const Time& now) const {
+  for (const auto& index : _indexes) index->prepareDisplay(now);
+}
+
+std::vector<std::uint32_t> RadioGroups::logCodes() const { return _codes; }
+
+std::vector<CodeSections> RadioGroups::codeSections() const {
+  std::vector<CodeSections> list;
+  for (const std::uint32_t code : _codes) {
+    CodeSections& entry = list.emplace_back(CodeSections{code, {}});
+    const auto found = _deliveries.find(code);
+    if (found == _deliveries.end()) continue;
+    for (const auto& [index, subscriber] : found->second) {
+      std::string name(subscriber.decoder->getSectionName());
+      if (std::ranges::find(entry.sections, name) == entry.sections.end())
+        entry.sections.push_back(std::move(name));
+    }
+  }
+  for (const CodeSections& c2k : _c2k.codeSections()) {
+    const auto entry = std::ranges::find(list, c2k.logCode, &CodeSections::logCode);
+    if (entry == list.end()) continue;
+    entry->sections.insert(entry->sections.end(), c2k.sections.begin(), c2k.sections.end());
+  }
+  return list;
+}
+
+NumberFormats RadioGroups::numberFormats() const {
+  NumberFormats formats = _c2k.numberFormats();
+  for (const auto& index : _indexes) index->listNumberFormats(formats);
+  return formats;
+}
+
+std::optional<Time> RadioGroups::writtenAt(const Dictionary& entries, std::string_view key) const {
+  const auto found = _sections.find(&entries);
+  return found == _sections.end() ? _c2k.writtenAt(entries, key) : found->second->writtenAt(key);
+}
+
+std::optional<Time> RadioGroups::refilledAt(const Array& list) const {
+  const auto found = _sections.find(&list);
+  return found == _sections.end() ? std::nullopt : found->second->refilledAt();
+}
+
+}  // namespace varnel

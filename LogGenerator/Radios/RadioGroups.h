@@ -1,0 +1,82 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+#include "LogGenerator/C2K/C2KLogGenerator.h"
+#include "LogGenerator/ClassIndex.h"
+#include "LogGenerator/LogMessage.h"
+#include "LogGenerator/Services.h"
+#include "LogGenerator/WriteTimes.h"
+#include "base/Dictionary.h"
+#include "base/Value.h"
+
+namespace varnel {
+
+/// The decoders of all radios for one subscription, and the groups of sections that they fill. A group is an
+/// entry of the template whose value is a dictionary of sections; its decoders are those of its indexes,
+/// found by the names of the sections. The CDMA2000 group is the display of a generator of its own.
+class RadioGroups final : public WriteTimes {
+ public:
+  /// The template must outlive it. Without one, nothing is decoded.
+  RadioGroups(const Services& services, const Value& displayTemplate);
+  RadioGroups(const RadioGroups&) = delete;
+  RadioGroups& operator=(const RadioGroups&) = delete;
+
+  /// Binds the decoders to the groups in a dictionary, which keeps them from one generator to the next.
+  /// Groups and sections that it lacks are copied from the template. A group that has said something is shown
+  /// in the display, from now on or from the message on that says it.
+  void bind(const Value& memory, const Value& display);
+
+  /// Decodes one message. Returns whether a decoder takes it.
+  bool take(const LogMessage& message, ByteView bytes);
+  MessageFate fateOf(const LogMessage& message, ByteView bytes) const;
+  /// A display is about to be made.
+  void prepareDisplay(const Time& now) const;
+
+  /// All codes of the bound sections, the groups in the template's order.
+  std::vector<std::uint32_t> logCodes() const;
+  std::vector<CodeSections> codeSections() const;
+  NumberFormats numberFormats() const;
+  std::optional<Time> writtenAt(const Dictionary& entries, std::string_view key) const override;
+  std::optional<Time> refilledAt(const Array& list) const override;
+
+ private:
+  struct Group {
+    std::string key;  // as in the template: "1;LTE"
+    const Dictionary* sections;
+    std::vector<ClassIndex*> indexes;  // of sections that several have, the first one's decoder counts
+    Value shown{};                     // once bound
+    bool isShown = false;
+  };
+  // What a group does with a log code.
+  struct Delivery {
+    std::size_t group;
+    Subscriber subscriber;
+  };
+
+  void addGroup(const std::string& key, const Value& sections);
+  Base* decoderOf(const Group& group, std::string_view section) const;
+  void bindSections(Group& group);
+  void noteWhetherShown(Group& group);
+  bool isC2K(std::uint32_t logCode) const;
+  void takeC2K(ByteView bytes);
+
+  const Services _services;
+  std::vector<std::unique_ptr<ClassIndex>> _indexes;
+  C2KLogGenerator _c2k;
+  std::vector<std::uint32_t> _c2kCodes;
+  std::vector<Group> _groups;
+  std::vector<std::uint32_t> _codes;
+  std::unordered_map<std::uint32_t, std::vector<Delivery>> _deliveries;
+  std::unordered_map<const void*, const Section*> _sections;  // by container
+  Value _display, _c2kState;
+};
+
+}  // namespace varnel
