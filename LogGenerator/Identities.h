@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <string_view>
 
 namespace varnel {
 
@@ -9,5 +10,8 @@ enum class Identities : std::uint8_t {
   Hidden,  ///< it only says that they are "present"
   Shown,
 };
+
+/// What an entry shows for an identity that is hidden.
+inline constexpr std::string_view presentText = "present";
 
 }  // namespace varnel
