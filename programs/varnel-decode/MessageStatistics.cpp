@@ -24,6 +24,10 @@ constexpr LeftOutKind frameKinds[] = {
 };
 constexpr LeftOutKind noise{"Noise bytes", &LeftOut::noiseBytes};
 
+// A capture may name any version of 32 bits. A real one has a few.
+constexpr std::size_t mostVersions = 32;
+constexpr const char* otherVersions = "other versions";
+
 std::string countLine(const std::string& name, std::uint64_t count) {
   char line[64];
   std::snprintf(line, sizeof line, "%-14s  %8" PRIu64 "\n", name.c_str(), count);
@@ -49,6 +53,19 @@ void MessageStatistics::Counts::add(Outcome outcome) {
     case Outcome::Unknown:
       ++unknown;
       break;
+    case Outcome::UnknownVersion:
+      ++unknownVersion;
+      break;
+  }
+}
+
+void MessageStatistics::UnknownVersions::add(const PacketVersion& version) {
+  if (const auto found = counts.find(version); found != counts.end()) {
+    ++found->second;
+  } else if (counts.size() < mostVersions) {
+    counts.emplace(version, 1);
+  } else {
+    ++others;
   }
 }
 
@@ -72,20 +89,39 @@ void MessageStatistics::add(const MessageFate& fate) {
   const Kind kind =
       fate.logCode ? Kind{false, *fate.logCode} : Kind{true, static_cast<std::uint32_t>(fate.outcome)};
   _counts[kind].add(fate.outcome);
+  if (fate.version) _versions[kind].add(*fate.version);
   _total.add(fate.outcome);
 }
 
 std::string MessageStatistics::tableLine(const std::string& name, const Counts& counts) {
-  char line[160];
-  std::snprintf(
-      line, sizeof line, "%-11s  %11" PRIu64 "  %11" PRIu64 "  %11" PRIu64 "  %11" PRIu64 "  %11" PRIu64 "\n",
-      name.c_str(), counts.received, counts.decoded, counts.tooShort, counts.tooLong, counts.unknown);
+  char line[200];
+  std::snprintf(line, sizeof line,
+                "%-11s  %11" PRIu64 "  %11" PRIu64 "  %11" PRIu64 "  %11" PRIu64 "  %11" PRIu64 "  %15" PRIu64
+                "\n",
+                name.c_str(), counts.received, counts.decoded, counts.tooShort, counts.tooLong,
+                counts.unknown, counts.unknownVersion);
   return line;
 }
 
+// Only the last column has a number.
+std::string MessageStatistics::versionLines(const Kind& kind) const {
+  const auto found = _versions.find(kind);
+  if (found == _versions.end()) return {};
+  std::string lines;
+  const auto add = [&](const std::string& version, std::uint64_t count) {
+    char line[160];
+    std::snprintf(line, sizeof line, "%-30s  %61" PRIu64 "\n", (kind.name() + ' ' + version).c_str(), count);
+    lines += line;
+  };
+  for (const auto& [version, count] : found->second.counts) add('v' + version.text(), count);
+  if (found->second.others > 0) add(otherVersions, found->second.others);
+  return lines;
+}
+
 std::string MessageStatistics::asTable() const {
-  std::string table = "Log code        Received      Decoded    Too short     Too long      Unknown\n";
-  for (const auto& [kind, counts] : _counts) table += tableLine(kind.name(), counts);
+  std::string table =
+      "Log code        Received      Decoded    Too short     Too long      Unknown  Unknown version\n";
+  for (const auto& [kind, counts] : _counts) table += tableLine(kind.name(), counts) + versionLines(kind);
   return table + tableLine("Total", _total) + frameLines() + subscriptionLines();
 }
 
@@ -123,7 +159,23 @@ std::string MessageStatistics::jsonMembers(const Counts& counts) {
   return "\"Received\":" + std::to_string(counts.received) +
          ",\"Decoded\":" + std::to_string(counts.decoded) +
          ",\"Too Short\":" + std::to_string(counts.tooShort) +
-         ",\"Too Long\":" + std::to_string(counts.tooLong) + ",\"Unknown\":" + std::to_string(counts.unknown);
+         ",\"Too Long\":" + std::to_string(counts.tooLong) +
+         ",\"Unknown\":" + std::to_string(counts.unknown) +
+         ",\"Unknown Version\":" + std::to_string(counts.unknownVersion);
+}
+
+// Others than those that are listed have the version null.
+std::string MessageStatistics::versionsAsJson(const Kind& kind) const {
+  std::string json = "\"Unknown Versions\":[";
+  const auto found = _versions.find(kind);
+  if (found == _versions.end()) return json + ']';
+  auto add = [&, separator = std::string_view()](const std::string& version, std::uint64_t count) mutable {
+    json.append(separator).append("{\"Version\":" + version + ",\"Messages\":" + std::to_string(count) + '}');
+    separator = ",";
+  };
+  for (const auto& [version, count] : found->second.counts) add(jsonString(version.text()), count);
+  if (found->second.others > 0) add("null", found->second.others);
+  return json + ']';
 }
 
 std::string MessageStatistics::asJson(const std::optional<std::string>& captureName) const {
@@ -136,7 +188,7 @@ std::string MessageStatistics::asJson(const std::optional<std::string>& captureN
     separator = ",";
     json += "{\"Name\":" + jsonString(kind.name()) +
             ",\"Log Code\":" + (kind.hasNoLogCode ? "null" : std::to_string(kind.number)) + ',' +
-            jsonMembers(counts) + '}';
+            jsonMembers(counts) + ',' + versionsAsJson(kind) + '}';
   }
   return json + "]," + framesAsJson() + ',' + subscriptionsAsJson() + ",\"Total\":{" + jsonMembers(_total) +
          "}}\n";

@@ -6,6 +6,7 @@
 #include <string>
 
 #include "LogGenerator/MessageFate.h"
+#include "LogGenerator/PacketVersion.h"
 #include "host/captures/CaptureRecord.h"
 #include "programs/varnel-decode/Subscriptions.h"
 
@@ -18,9 +19,10 @@ class MessageStatistics {
   /// What else the capture held besides these messages.
   void setCapture(const Subscriptions::Counts& records, const LeftOut& leftOut);
 
-  /// One line per log code in ascending order, then the lines of messages without one, then the sums. If
-  /// frames of the capture were left out, the sum of all frames follows, then one line for the records and
-  /// one per kind of left-out frame. If records name a SIM card, one line per SIM card follows.
+  /// One line per log code in ascending order, then the lines of messages without one, then the sums. One
+  /// line per unknown version follows the line of its log code. If frames of the capture were left out, the
+  /// sum of all frames comes last, then one line for the records and one per kind of left-out frame. If
+  /// records name a SIM card, one line per SIM card follows.
   std::string asTable() const;
   /// The same as one line of JSON: {"Messages": […], "Frames": {…}, "SIM": […], "Total": {…}}. With a
   /// capture's name, "Capture" comes first.
@@ -28,9 +30,17 @@ class MessageStatistics {
 
  private:
   struct Counts {
-    std::uint64_t received = 0, decoded = 0, tooShort = 0, tooLong = 0, unknown = 0;
+    std::uint64_t received = 0, decoded = 0, tooShort = 0, tooLong = 0, unknown = 0, unknownVersion = 0;
 
     void add(MessageFate::Outcome outcome);
+  };
+
+  // How many messages have each unknown version of a log code.
+  struct UnknownVersions {
+    std::map<PacketVersion, std::uint64_t> counts;
+    std::uint64_t others = 0;  // of the versions that found no room in `counts`
+
+    void add(const PacketVersion& version);
   };
 
   // A log code. For messages without a log code, which come after the others, what becomes of them.
@@ -45,6 +55,8 @@ class MessageStatistics {
 
   static std::string tableLine(const std::string& name, const Counts& counts);
   static std::string jsonMembers(const Counts& counts);
+  std::string versionLines(const Kind& kind) const;
+  std::string versionsAsJson(const Kind& kind) const;
   std::uint64_t recordCount() const;
   std::string frameLines() const;
   std::string subscriptionLines() const;
@@ -52,6 +64,7 @@ class MessageStatistics {
   std::string subscriptionsAsJson() const;
 
   std::map<Kind, Counts> _counts;
+  std::map<Kind, UnknownVersions> _versions;
   Counts _total;
   Subscriptions::Counts _records;
   LeftOut _leftOut;

@@ -100,7 +100,8 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
                "with --every and --csv: write only displays that differ from the one before; in JSON only "
                "what differs");
   app.add_flag("--stats", wishes.isStatistics,
-               "count the messages of each log code: received, decoded, too short, too long, unknown")
+               "count the messages of each log code: received, decoded, too short, too long, unknown, of an "
+               "unknown version")
       ->excludes(every)
       ->excludes(table);
   app.add_option("--plot", wishes.plot, "also draw the numbers under these paths over time, as SVG")

@@ -342,19 +342,22 @@ TEST_F(DecodeGenerations, StatisticsCountEveryMessageOnce) {
     capture += pcapRecord(afternoon, 0, message);
   const Result table = decode(capture, {"--stats"});
   EXPECT_EQ(table.status, 0) << table.error;
-  EXPECT_EQ(table.output,
-            "Log code        Received      Decoded    Too short     Too long      Unknown\n"
-            "0xB0C0                 1            0            0            0            1\n"
-            "0xB0C1                 3            2            1            0            0\n"
-            "0xB17F                 1            0            1            0            0\n"
-            "0xFF0002               1            1            0            0            0\n"
-            "no header              2            0            2            0            0\n"
-            "no log type            1            0            0            0            1\n"
-            "Total                  9            3            4            0            2\n");
+  EXPECT_EQ(
+      table.output,
+      "Log code        Received      Decoded    Too short     Too long      Unknown  Unknown version\n"
+      "0xB0C0                 1            0            0            0            1                0\n"
+      "0xB0C1                 3            2            1            0            0                0\n"
+      "0xB17F                 1            0            1            0            0                0\n"
+      "0xFF0002               1            1            0            0            0                0\n"
+      "no header              2            0            2            0            0                0\n"
+      "no log type            1            0            0            0            1                0\n"
+      "Total                  9            3            4            0            2                0\n");
   const Result json = decode(capture, {"--stats", "--format", "json"});
   EXPECT_EQ(linesOf(json.output), 1u) << json.output;
-  EXPECT_THAT(json.output,
-              HasSubstr(R"("Total":{"Received":9,"Decoded":3,"Too Short":4,"Too Long":0,"Unknown":2}})"));
+  EXPECT_THAT(
+      json.output,
+      HasSubstr(
+          R"("Total":{"Received":9,"Decoded":3,"Too Short":4,"Too Long":0,"Unknown":2,"Unknown Version":0}})"));
 }
 
 TEST_F(DecodeGenerations, StatisticsOfATruncatedCaptureCountWhatCameBefore) {

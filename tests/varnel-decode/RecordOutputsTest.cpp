@@ -147,15 +147,16 @@ TEST_F(DecodeRecords, TheExampleIsAWholeWalk) {
   const std::string example = VARNEL_SOURCE_DIR "/docs/examples/lte-walk.framed";
   const Result table = run({"--technology", "kalvi-lte", "--stats", example});
   EXPECT_EQ(table.error, "");
-  EXPECT_EQ(table.output,
-            "Log code        Received      Decoded    Too short     Too long      Unknown\n"
-            "0xB0C1                21           21            0            0            0\n"
-            "0xB0C2                26           26            0            0            0\n"
-            "0xB179                67           67            0            0            0\n"
-            "0xB17F                47           47            0            0            0\n"
-            "0xB180                24           24            0            0            0\n"
-            "0xB186                21           21            0            0            0\n"
-            "Total                206          206            0            0            0\n");
+  EXPECT_EQ(
+      table.output,
+      "Log code        Received      Decoded    Too short     Too long      Unknown  Unknown version\n"
+      "0xB0C1                21           21            0            0            0                0\n"
+      "0xB0C2                26           26            0            0            0                0\n"
+      "0xB179                67           67            0            0            0                0\n"
+      "0xB17F                47           47            0            0            0                0\n"
+      "0xB180                24           24            0            0            0                0\n"
+      "0xB186                21           21            0            0            0                0\n"
+      "Total                206          206            0            0            0                0\n");
   const Result values = run({"--technology", "kalvi-lte", "--numbers", "--csv",
                              "Serving Cell Measurements/Average RSRP", "--", example});
   EXPECT_THAT(values.output, StartsWith("Time,Serving Cell Measurements/Average RSRP [dBm]\n"
@@ -188,9 +189,9 @@ TEST_F(DecodeRecords, SimChoosesOne) {
   EXPECT_EQ(result.status, 0);
   EXPECT_EQ(result.error, "");
   EXPECT_EQ(result.output,
-            "Log code        Received      Decoded    Too short     Too long      Unknown\n"
-            "0xB0C1                 2            2            0            0            0\n"
-            "Total                  2            2            0            0            0\n"
+            "Log code        Received      Decoded    Too short     Too long      Unknown  Unknown version\n"
+            "0xB0C1                 2            2            0            0            0                0\n"
+            "Total                  2            2            0            0            0                0\n"
             "\n"
             "No SIM                 1\n"
             "SIM 1                  1\n"
