@@ -50,8 +50,9 @@ std::unique_ptr<LogGenerator> AllRadiosLogGenerator::generator(const Services& s
 
 void AllRadiosLogGenerator::updateState_withData(Dictionary& state, ByteView data) {
   collect(data);
+  const bool hasDisplay = hasDisplayIn(state);
   const auto message = LogMessage::framed(data);
-  if (!message || !message->isOfKnownType() || !hasDisplayIn(state)) return countMessageNotDecoded();
+  if (!message || !message->isOfKnownType() || !hasDisplay) return countMessageNotDecoded();
   const SubscriptionNumber number = subscriptionOf(data).value_or(0);
   Subscription* const subscription = subscriptionIn(state, number);
   if (!subscription || !subscription->groups.take(*message, data)) return countMessageNotDecoded();

@@ -4,6 +4,7 @@
 #include "LogGenerator/KLV/LTE/ReselectionCandidatesList.h"
 #include "LogGenerator/KLV/LTE/ReselectionCandidatesMisc.h"
 #include "LogGenerator/KLV/Subscriber/PDPContextList.h"
+#include "LogGenerator/Radios/LTE/ServingCell.h"
 
 namespace varnel::radios {
 
@@ -13,6 +14,7 @@ class LTEIndex final : public ClassIndex {
   using ClassIndex::ClassIndex;
 
  private:
+  std::unique_ptr<lte::ServingCell> servingCell = create<lte::ServingCell>();
   std::unique_ptr<ReselectionCandidatesMisc> reselectionCandidates = create<ReselectionCandidatesMisc>();
   std::unique_ptr<ReselectionCandidatesList> reselectionCandidatesList = create<ReselectionCandidatesList>();
 };
