@@ -4,7 +4,6 @@
 #include <cstdint>
 #include <optional>
 #include <span>
-#include <string>
 #include <string_view>
 #include <vector>
 
@@ -27,21 +26,28 @@ struct AirMessage {
   /// The logical channel as the standard writes it, as "DL-DCCH"; empty for NAS messages and for a type that
   /// no channel carries by itself.
   std::string_view channel{};
-  /// The message's name as the standard writes it, as "RRCConnectionRelease" or "Attach request"; for one
-  /// that is ciphered or not known, a text that says so.
-  std::string name{};
+  /// The message's name as the standard writes it, as "RRCConnectionRelease" or "Attach request". One that is
+  /// ciphered is "Security Protected (ciphered)", one that is not known "Unknown", and a choice that the
+  /// standard keeps free is "Spare" or "Extension". The text is a constant of the program, as that of the
+  /// channel is.
+  std::string_view name{};
   /// The cell: the number of its channel, and its physical identity or scrambling code. Absent when the modem
   /// does not tell.
   std::optional<std::uint32_t> channelNumber{};
   std::optional<std::uint16_t> physicalCell{};
   std::optional<std::uint16_t> frame{};
   std::optional<std::uint8_t> subframe{};
-  /// The message itself, without the modem's header.
-  Bytes bytes{};
+  /// The message itself, without the modem's header. The bytes are the packet's, or those that the reader
+  /// joined: valid while the packet is, and until the reader reads again.
+  ByteView bytes{};
+  /// How many of these bytes come before layer 3: the pseudo length of messages on GSM's BCCH, CCCH and SACCH
+  /// (TS 44.006). A packet analyser takes the message without them.
+  std::uint8_t layer2Octets = 0;
 };
 
-/// What a packet yields: a message, or why there is none. A part of a longer message yields none yet, but
-/// counts as decoded.
+/// What a packet yields: a message, or why there is none. A packet whose version is not listed is of an
+/// unknown version. One whose length does not agree with what it says is too short. A part of a longer
+/// message yields none yet, but counts as decoded.
 struct AirMessageReading {
   MessageFate fate;
   std::optional<AirMessage> message{};
@@ -56,20 +62,32 @@ std::span<const std::uint32_t> airMessageLogCodes();
 /// packets of one subscription, in their order. Keeps the parts of one message per log code, at most 64 KiB.
 class AirMessageReader {
  public:
+  static constexpr std::size_t longestJoined = 65536;
+
+  /// Reads a packet with one of the codes. The NAS messages of GSM and UMTS share a log code: the reader
+  /// takes one as of the radio, of these two, whose RRC or RR message it read last, and as of GSM before the
+  /// first.
   AirMessageReading read(const Packet& packet, std::uint32_t logCode);
   /// What would become of the packet, without its message.
   static MessageFate fateOf(const Packet& packet, std::uint32_t logCode);
 
  private:
+  // The parts so far of a message.
   struct Parts {
     std::uint32_t logCode;
-    unsigned lastSegment;
-    AirMessage message;
+    unsigned version, channel;  // the same in all parts
+    unsigned lastSegment = 0;   // 0: none is waiting
+    Bytes bytes{};
   };
+
+  bool join(AirMessage& message, unsigned segment, const Parts& key);
+
   std::vector<Parts> _parts;
+  Bytes _joined;  // the bytes of the message that was joined last
+  AirMessage::Radio _circuitRadio = AirMessage::Radio::GSM;
 };
 
-/// "LTE", "RRC" and "Downlink", for displays.
+/// "LTE", "RRC" and "Downlink", for displays. An unknown direction has an empty text.
 std::string_view nameOf(AirMessage::Radio radio);
 std::string_view nameOf(AirMessage::Protocol protocol);
 std::string_view nameOf(AirMessage::Direction direction);

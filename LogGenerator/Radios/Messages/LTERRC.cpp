@@ -1,0 +1,239 @@
+#include <algorithm>
+#include <cstdint>
+#include <iterator>
+#include <span>
+
+#include "LogGenerator/Radios/Messages/RRCChannels.h"
+
+namespace varnel {
+
+namespace {
+
+using Direction = AirMessage::Direction;
+using Alternative = MessageChoice::Alternative;
+
+// TS 36.331 6.2.1 (the channels) and 6.7.1 (those of NB-IoT). The names are those of the message types
+// without the release in which a type came.
+
+constexpr Alternative bcchDlSchMessages[] = {"SystemInformation", "SystemInformationBlockType1"};
+constexpr MessageChoice bcchDlSchC1 = bcchDlSchMessages;
+constexpr Alternative bcchDlSchClasses[] = {bcchDlSchC1, extensionMessage};
+constexpr MessageChoice bcchDlSch = bcchDlSchClasses;
+
+constexpr Alternative mcchLaterMessages[] = {"MBMSCountingRequest", extensionMessage};
+constexpr MessageChoice mcchLater = mcchLaterMessages;
+constexpr Alternative mcchClasses[] = {"MBSFNAreaConfiguration", mcchLater};
+constexpr MessageChoice mcch = mcchClasses;
+
+constexpr Alternative pcchClasses[] = {"Paging", extensionMessage};
+constexpr MessageChoice pcch = pcchClasses;
+
+constexpr Alternative dlCcchMessages[] = {"RRCConnectionReestablishment",
+                                          "RRCConnectionReestablishmentReject", "RRCConnectionReject",
+                                          "RRCConnectionSetup"};
+constexpr MessageChoice dlCcchC1 = dlCcchMessages;
+constexpr Alternative dlCcchMessages2[] = {"RRCEarlyDataComplete", spareMessage, spareMessage, spareMessage};
+constexpr MessageChoice dlCcchC2 = dlCcchMessages2;
+constexpr Alternative dlCcchExtensions[] = {dlCcchC2, extensionMessage};
+constexpr MessageChoice dlCcchExtension = dlCcchExtensions;
+constexpr Alternative dlCcchClasses[] = {dlCcchC1, dlCcchExtension};
+constexpr MessageChoice dlCcch = dlCcchClasses;
+
+constexpr Alternative dlDcchMessages[] = {
+    "CSFBParametersResponseCDMA2000",
+    "DLInformationTransfer",
+    "HandoverFromEUTRAPreparationRequest",
+    "MobilityFromEUTRACommand",
+    "RRCConnectionReconfiguration",
+    "RRCConnectionRelease",
+    "SecurityModeCommand",
+    "UECapabilityEnquiry",
+    "CounterCheck",
+    "UEInformationRequest",
+    "LoggedMeasurementConfiguration",
+    "RNReconfiguration",
+    "RRCConnectionResume",
+    "DLDedicatedMessageSegment",
+    spareMessage,
+    spareMessage,
+};
+constexpr MessageChoice dlDcchC1 = dlDcchMessages;
+constexpr Alternative dlDcchClasses[] = {dlDcchC1, extensionMessage};
+constexpr MessageChoice dlDcch = dlDcchClasses;
+
+constexpr Alternative ulCcchMessages[] = {"RRCConnectionReestablishmentRequest", "RRCConnectionRequest"};
+constexpr MessageChoice ulCcchC1 = ulCcchMessages;
+constexpr Alternative ulCcchMessages3[] = {"RRCEarlyDataRequest", spareMessage, spareMessage, spareMessage};
+constexpr MessageChoice ulCcchC3 = ulCcchMessages3;
+constexpr Alternative ulCcchLaterMessages[] = {ulCcchC3, extensionMessage};
+constexpr MessageChoice ulCcchLater = ulCcchLaterMessages;
+constexpr Alternative ulCcchExtensions[] = {"RRCConnectionResumeRequest", ulCcchLater};
+constexpr MessageChoice ulCcchExtension = ulCcchExtensions;
+constexpr Alternative ulCcchClasses[] = {ulCcchC1, ulCcchExtension};
+constexpr MessageChoice ulCcch = ulCcchClasses;
+
+constexpr Alternative ulDcchMessages[] = {
+    "CSFBParametersRequestCDMA2000",
+    "MeasurementReport",
+    "RRCConnectionReconfigurationComplete",
+    "RRCConnectionReestablishmentComplete",
+    "RRCConnectionSetupComplete",
+    "SecurityModeComplete",
+    "SecurityModeFailure",
+    "UECapabilityInformation",
+    "ULHandoverPreparationTransfer",
+    "ULInformationTransfer",
+    "CounterCheckResponse",
+    "UEInformationResponse",
+    "ProximityIndication",
+    "RNReconfigurationComplete",
+    "MBMSCountingResponse",
+    "InterFreqRSTDMeasurementIndication",
+};
+constexpr MessageChoice ulDcchC1 = ulDcchMessages;
+constexpr Alternative ulDcchMessages2[] = {
+    "UEAssistanceInformation",     "InDeviceCoexIndication",    "MBMSInterestIndication",
+    "SCGFailureInformation",       "SidelinkUEInformation",     "WLANConnectionStatusReport",
+    "RRCConnectionResumeComplete", "ULInformationTransferMRDC", "SCGFailureInformationNR",
+    "MeasReportAppLayer",          "FailureInformation",        "ULDedicatedMessageSegment",
+    "PURConfigurationRequest",     "FailureInformation",        "MCGFailureInformation",
+    "ULInformationTransferIRAT",
+};
+constexpr MessageChoice ulDcchC2 = ulDcchMessages2;
+constexpr Alternative ulDcchExtensions[] = {ulDcchC2, extensionMessage};
+constexpr MessageChoice ulDcchExtension = ulDcchExtensions;
+constexpr Alternative ulDcchClasses[] = {ulDcchC1, ulDcchExtension};
+constexpr MessageChoice ulDcch = ulDcchClasses;
+
+constexpr Alternative bcchDlSchNBMessages[] = {"SystemInformation-NB", "SystemInformationBlockType1-NB"};
+constexpr MessageChoice bcchDlSchNBC1 = bcchDlSchNBMessages;
+constexpr Alternative bcchDlSchNBClasses[] = {bcchDlSchNBC1, extensionMessage};
+constexpr MessageChoice bcchDlSchNB = bcchDlSchNBClasses;
+
+constexpr Alternative pcchNBClasses[] = {"Paging-NB", extensionMessage};
+constexpr MessageChoice pcchNB = pcchNBClasses;
+
+constexpr Alternative dlCcchNBMessages[] = {
+    "RRCConnectionReestablishment-NB",
+    "RRCConnectionReestablishmentReject",
+    "RRCConnectionReject-NB",
+    "RRCConnectionSetup-NB",
+    "RRCEarlyDataComplete-NB",
+    spareMessage,
+    spareMessage,
+    spareMessage,
+};
+constexpr MessageChoice dlCcchNBC1 = dlCcchNBMessages;
+constexpr Alternative dlCcchNBClasses[] = {dlCcchNBC1, extensionMessage};
+constexpr MessageChoice dlCcchNB = dlCcchNBClasses;
+
+constexpr Alternative dlDcchNBMessages[] = {
+    "DLInformationTransfer-NB", "RRCConnectionReconfiguration-NB",
+    "RRCConnectionRelease-NB",  "SecurityModeCommand",
+    "UECapabilityEnquiry-NB",   "RRCConnectionResume-NB",
+    "UEInformationRequest-NB",  spareMessage,
+};
+constexpr MessageChoice dlDcchNBC1 = dlDcchNBMessages;
+constexpr Alternative dlDcchNBClasses[] = {dlDcchNBC1, extensionMessage};
+constexpr MessageChoice dlDcchNB = dlDcchNBClasses;
+
+constexpr Alternative ulCcchNBMessages[] = {"RRCConnectionReestablishmentRequest-NB",
+                                            "RRCConnectionRequest-NB", "RRCConnectionResumeRequest-NB",
+                                            "RRCEarlyDataRequest-NB"};
+constexpr MessageChoice ulCcchNBC1 = ulCcchNBMessages;
+constexpr Alternative ulCcchNBClasses[] = {ulCcchNBC1, extensionMessage};
+constexpr MessageChoice ulCcchNB = ulCcchNBClasses;
+
+constexpr Alternative ulDcchNBMessages[] = {
+    "RRCConnectionReconfigurationComplete-NB",
+    "RRCConnectionReestablishmentComplete-NB",
+    "RRCConnectionSetupComplete-NB",
+    "SecurityModeComplete",
+    "SecurityModeFailure",
+    "UECapabilityInformation-NB",
+    "ULInformationTransfer-NB",
+    "RRCConnectionResumeComplete-NB",
+    "UEInformationResponse-NB",
+    "PURConfigurationRequest-NB",
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+};
+constexpr MessageChoice ulDcchNBC1 = ulDcchNBMessages;
+constexpr Alternative ulDcchNBClasses[] = {ulDcchNBC1, extensionMessage};
+constexpr MessageChoice ulDcchNB = ulDcchNBClasses;
+
+// In the order of every numbering.
+constexpr MessageChannel channels[] = {
+    {"BCCH-BCH", Direction::Downlink, nullptr, "MasterInformationBlock"},
+    {"BCCH-DL-SCH", Direction::Downlink, &bcchDlSch},
+    {"MCCH", Direction::Downlink, &mcch},
+    {"PCCH", Direction::Downlink, &pcch},
+    {"DL-CCCH", Direction::Downlink, &dlCcch},
+    {"DL-DCCH", Direction::Downlink, &dlDcch},
+    {"UL-CCCH", Direction::Uplink, &ulCcch},
+    {"UL-DCCH", Direction::Uplink, &ulDcch},
+};
+constexpr MessageChannel narrowbandChannels[] = {
+    {"BCCH-BCH-NB", Direction::Downlink, nullptr, "MasterInformationBlock-NB"},
+    {"BCCH-DL-SCH-NB", Direction::Downlink, &bcchDlSchNB},
+    {"PCCH-NB", Direction::Downlink, &pcchNB},
+    {"DL-CCCH-NB", Direction::Downlink, &dlCcchNB},
+    {"DL-DCCH-NB", Direction::Downlink, &dlDcchNB},
+    {"UL-CCCH-NB", Direction::Uplink, &ulCcchNB},
+    {"UL-DCCH-NB", Direction::Uplink, &ulDcchNB},
+};
+
+// A numbering: the numbers of the channels, and the versions that have it.
+struct Numbering {
+  std::uint8_t numbers[std::size(channels)];
+  std::uint32_t versions;  // bit n: version n
+};
+
+consteval std::uint32_t setOf(std::initializer_list<unsigned> versions) {
+  std::uint32_t set = 0;
+  for (const unsigned version : versions) set |= std::uint32_t{1} << version;
+  return set;
+}
+
+constexpr Numbering numberings[] = {
+    {{1, 2, 3, 4, 5, 6, 7, 8}, setOf({2, 3, 4, 5, 6, 7, 8, 13, 22})},
+    {{8, 9, 10, 11, 12, 13, 14, 15}, setOf({9, 12})},
+    {{1, 2, 4, 5, 6, 7, 8, 9}, setOf({14, 15, 16, 20, 24, 25})},
+    {{1, 3, 6, 7, 8, 9, 10, 11}, setOf({19, 26, 27, 29, 30, 31})},
+};
+
+struct NarrowbandNumbering {
+  std::uint8_t numbers[std::size(narrowbandChannels)];
+  std::uint32_t versions;
+};
+
+constexpr NarrowbandNumbering narrowbandNumberings[] = {
+    {{45, 46, 47, 48, 49, 50, 52}, setOf({19, 26, 27, 29, 30, 31})},
+    {{54, 55, 56, 57, 58, 59, 61}, setOf({20, 24, 25})},
+};
+
+template <class Numbering>
+const MessageChannel* find(std::span<const Numbering> numberings, std::span<const MessageChannel> channels,
+                           unsigned version, unsigned number) {
+  for (const Numbering& numbering : numberings) {
+    if ((numbering.versions >> version & 1U) == 0) continue;
+    const auto* const found = std::ranges::find(numbering.numbers, number);
+    if (found != std::end(numbering.numbers))
+      return &channels[static_cast<std::size_t>(found - std::begin(numbering.numbers))];
+  }
+  return nullptr;
+}
+
+}  // namespace
+
+const MessageChannel* lteRRCChannel(unsigned packetVersion, unsigned number) {
+  if (packetVersion > 31) return nullptr;
+  if (const auto* channel = find<Numbering>(numberings, channels, packetVersion, number)) return channel;
+  return find<NarrowbandNumbering>(narrowbandNumberings, narrowbandChannels, packetVersion, number);
+}
+
+}  // namespace varnel
