@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <ostream>
+#include <type_traits>
 
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMClassIndex.h"
 #include "LogGenerator/KLV/UTRAN/UTRANClassIndex.h"
@@ -21,13 +22,17 @@ std::ostream& nowhere() {
 }
 
 template <class Index>
-std::unique_ptr<ClassIndex> make(const Services& /*services*/) {
-  return std::make_unique<Index>(nowhere());
+std::unique_ptr<ClassIndex> make(radios::Shared& shared) {
+  if constexpr (std::is_constructible_v<Index, radios::Shared&>) {
+    return std::make_unique<Index>(shared);
+  } else {
+    return std::make_unique<Index>(shared.standardOutput);
+  }
 }
 
 // A radio, or another source of sections, and the groups that its sections are in.
 struct Child {
-  std::unique_ptr<ClassIndex> (*make)(const Services& services);
+  std::unique_ptr<ClassIndex> (*make)(radios::Shared& shared);
   std::vector<std::string_view> groups;
 };
 
@@ -79,7 +84,8 @@ RadioGroups::RadioGroups(const Services& services, const Value& displayTemplate)
   const Value command = _c2k.getStartCommand();
   for (const Value& code : *command.dictionary()->get("SetKalviLogCodes").array())
     _c2kCodes.push_back(static_cast<std::uint32_t>(code.int32().value_or(0)));
-  for (const Child& child : children()) _indexes.push_back(child.make(_services));
+  radios::Shared shared{nowhere(), services.identities};
+  for (const Child& child : children()) _indexes.push_back(child.make(shared));
   for (const auto& [key, value] : *groups) {
     if (key != sortMark) addGroup(key, value);
   }

@@ -1,20 +1,42 @@
 #pragma once
 
 #include "LogGenerator/ClassIndex.h"
+#include "LogGenerator/Identities.h"
 #include "LogGenerator/KLV/LTE/ReselectionCandidatesList.h"
 #include "LogGenerator/KLV/LTE/ReselectionCandidatesMisc.h"
 #include "LogGenerator/KLV/Subscriber/PDPContextList.h"
+#include "LogGenerator/Radios/LTE/Bearers.h"
+#include "LogGenerator/Radios/LTE/Measurements.h"
+#include "LogGenerator/Radios/LTE/RandomAccess.h"
+#include "LogGenerator/Radios/LTE/Registration.h"
 #include "LogGenerator/Radios/LTE/ServingCell.h"
+#include "LogGenerator/Radios/LTE/TransmitPower.h"
+#include "LogGenerator/Radios/NR/Cells.h"
+#include "LogGenerator/Radios/NR/MasterInformation.h"
+#include "LogGenerator/Radios/NR/Registration.h"
+#include "LogGenerator/Radios/NR/ServingCell.h"
 
 namespace varnel::radios {
 
-/// The LTE sections of all radios.
+/// What the indexes of all radios get: where their base class writes, and what their decoders share.
+struct Shared {
+  std::ostream& standardOutput;
+  Identities identities;
+};
+
+/// The LTE sections of all radios. 0xB186 has the layout of the LTE technology.
 class LTEIndex final : public ClassIndex {
  public:
-  using ClassIndex::ClassIndex;
+  explicit LTEIndex(Shared& shared) : ClassIndex(shared.standardOutput), _identities(shared.identities) {}
 
  private:
+  Identities _identities;
   std::unique_ptr<lte::ServingCell> servingCell = create<lte::ServingCell>();
+  std::unique_ptr<lte::Measurements> measurements = create<lte::Measurements>();
+  std::unique_ptr<lte::Registration> registration = create<lte::Registration>(_identities);
+  std::unique_ptr<lte::Bearers> bearers = create<lte::Bearers>();
+  std::unique_ptr<lte::RandomAccess> randomAccess = create<lte::RandomAccess>();
+  std::unique_ptr<lte::TransmitPower> transmitPower = create<lte::TransmitPower>();
   std::unique_ptr<ReselectionCandidatesMisc> reselectionCandidates = create<ReselectionCandidatesMisc>();
   std::unique_ptr<ReselectionCandidatesList> reselectionCandidatesList = create<ReselectionCandidatesList>();
 };
@@ -22,19 +44,26 @@ class LTEIndex final : public ClassIndex {
 /// The NR sections.
 class NRIndex final : public ClassIndex {
  public:
-  using ClassIndex::ClassIndex;
+  explicit NRIndex(Shared& shared) : ClassIndex(shared.standardOutput), _identities(shared.identities) {}
+
+ private:
+  Identities _identities;
+  std::unique_ptr<nr::MasterInformation> masterInformation = create<nr::MasterInformation>();
+  std::unique_ptr<nr::ServingCell> servingCell = create<nr::ServingCell>();
+  std::unique_ptr<nr::Cells> cells = create<nr::Cells>();
+  std::unique_ptr<nr::Registration> registration = create<nr::Registration>(_identities);
 };
 
 /// The sections of other technologies whose decoders must show wrong values. These show the right ones.
 class CorrectedIndex final : public ClassIndex {
  public:
-  using ClassIndex::ClassIndex;
+  explicit CorrectedIndex(Shared& shared) : ClassIndex(shared.standardOutput) {}
 };
 
 /// The sections about the subscriber, which all radios share.
 class SubscriberIndex final : public ClassIndex {
  public:
-  using ClassIndex::ClassIndex;
+  explicit SubscriberIndex(Shared& shared) : ClassIndex(shared.standardOutput) {}
 
  private:
   std::unique_ptr<PDPContextList> contexts = create<PDPContextList>();
@@ -43,7 +72,7 @@ class SubscriberIndex final : public ClassIndex {
 /// The messages of the air interface.
 class MessagesIndex final : public ClassIndex {
  public:
-  using ClassIndex::ClassIndex;
+  explicit MessagesIndex(Shared& shared) : ClassIndex(shared.standardOutput) {}
 };
 
 }  // namespace varnel::radios
