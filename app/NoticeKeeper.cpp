@@ -69,7 +69,7 @@ bool NoticeKeeper::update() {
       {Matter::Link, linkLine(report)},
       {Matter::MissingTemplate, templateLine()},
       {Matter::StandingDisplay, standingLine()},
-      {Matter::Mixture, report.mixture},
+      {Matter::Mixture, mixtureLine(report)},
       {Matter::Source, report.serverNote},
       {Matter::DroppedByServer, countLine("Messages that the server dropped, since they were read too slowly",
                                           report.droppedByServer)},
@@ -128,6 +128,11 @@ std::string NoticeKeeper::standingLine() const {
                                 : "for it is that of " + quoted(display->technology) +
                                       " and the modem's technology is now " + quoted(_model->technology());
   return "The display stands still since " + since + ", " + cause + "; " + _wayToStartOver + " to start over";
+}
+
+// All radios have a group for each SIM card.
+std::string NoticeKeeper::mixtureLine(const LinkReport& report) const {
+  return _model->technology() == technology::allRadios ? std::string() : report.mixture;
 }
 
 void NoticeKeeper::snapshotWasWritten(const FileWriting& writing) {

@@ -46,6 +46,7 @@ class NoticeKeeper {
   std::string failureLine(const LinkReport& report) const;
   std::string templateLine() const;
   std::string standingLine() const;
+  std::string mixtureLine(const LinkReport& report) const;
 
   ModelServices _services;
   std::string _wayToStartOver;

@@ -1,6 +1,12 @@
 #include "host/Subscription.h"
 
+#include "platform/TelephonyService.h"
+
 namespace varnel {
+
+Unasked unaskedOf(std::string_view technology) {
+  return technology == technology::allRadios ? Unasked::All : Unasked::First;
+}
 
 std::string subscriptionName(std::optional<std::uint8_t> subscription) {
   return subscription ? "SIM " + std::to_string(*subscription) : "No SIM";

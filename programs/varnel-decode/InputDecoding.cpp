@@ -19,6 +19,7 @@
 #include "host/HostLog.h"
 #include "host/Printable.h"
 #include "host/captures/Capture.h"
+#include "platform/TelephonyService.h"
 #include "programs/varnel-decode/ElapsedTime.h"
 #include "programs/varnel-decode/FileOutput.h"
 #include "programs/varnel-decode/GenerationWriters.h"
@@ -42,12 +43,12 @@ namespace {
 constexpr int generalError = 1;
 
 // The user's technology comes before that of the capture.
-std::optional<std::string> technologyOf(const Capture& capture, const Options& options,
-                                        const std::vector<std::string>& technologies) {
-  if (options.technology) return options.technology;
+std::string technologyOf(const Capture& capture, const Options& options,
+                         const std::vector<std::string>& technologies) {
+  if (options.technology) return *options.technology;
   const auto named = capture.technology();
   const bool isKnown = named && std::ranges::find(technologies, *named) != technologies.end();
-  return isKnown ? named : std::nullopt;
+  return isKnown ? *named : std::string(technology::allRadios);
 }
 
 // Absent also for an input that can be read only once, and for anything that is no capture. Decoding reports
@@ -132,12 +133,11 @@ class InputDecoding {
 
   int decodeCapture(Capture& capture, const DecodingServices& services) {
     if (isConvertingAlone()) return convert(capture);
-    const auto technology = technologyOf(capture, _options, services.technologies);
-    if (!technology)
-      return mistake("--technology is needed to decode " + _name + ", a capture that names none").code;
+    const std::string technology = technologyOf(capture, _options, services.technologies);
+    _subscriptions = Subscriptions(_options.subscription, unaskedOf(technology));
     addSinks(technology, services);
-    const int status = decodeCaptureOf(*technology, capture, services);
-    tellGuess(*technology, services);
+    const int status = decodeCaptureOf(technology, capture, services);
+    tellGuess(technology, services);
     return status;
   }
 

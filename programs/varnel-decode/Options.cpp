@@ -28,12 +28,18 @@ constexpr const char* examples =
     "environment\n"
     "variable VARNEL_RESOURCES names, else from the installed one.\n"
     "\n"
+    "Captures, snapshots, and all that is written of their messages hold identities of a person, even where "
+    "the display\n"
+    "hides them: M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI, and others. Give them only to those who may "
+    "know them.\n"
+    "\n"
+    "  varnel-decode drive.bin\n"
+    "  varnel-decode --every drive.bin\n"
     "  varnel-decode --technology kalvi-lte walk.pcap\n"
-    "  varnel-decode --technology kalvi-lte --every walk.pcap\n"
     "  varnel-decode --technology kalvi-lte walk.pcap --csv 'Serving Cell Measurements/Average RSRP'\n"
     "  varnel-decode --technology kalvi-lte --stats --format json walk.pcap\n"
     "  varnel-decode --technology kalvi-lte --jobs 4 --format json monday.pcap tuesday.pcap\n"
-    "  ssh device cat PORT | varnel-decode --technology kalvi-lte --every --numbers --changes -\n"
+    "  ssh device cat PORT | varnel-decode --every --numbers --changes -\n"
     "  varnel-decode --format none --pcap walk.pcap walk.bin\n"
     "  varnel-decode --dlf walk.dlf --format none VarnelSnapshot-1709301914.varnel\n";
 
@@ -46,6 +52,7 @@ struct Wishes {
   bool isNumbers = false;
   bool isChanges = false;
   bool isStatistics = false;
+  bool isShowingIdentities = false;
   std::vector<std::string> plot;
 };
 
@@ -55,13 +62,24 @@ std::vector<std::string> formatNames() {
   return names;
 }
 
+// The values that tell who the user of a phone is. Where they are shown they may look like numbers.
+bool isIdentityPath(std::string_view path) {
+  constexpr std::string_view names[] = {"EF-ICCID",        "EF-MSISDN", "EF-LOCI",
+                                        "EF-GPRS/PS-LOCI", "M-TMSI",    "5G-TMSI"};
+  return std::ranges::any_of(names, [&](std::string_view name) {
+    if (!path.ends_with(name)) return false;
+    return path.size() == name.size() || path[path.size() - name.size() - 1] == '/';
+  });
+}
+
 DisplayWriter writerNamed(std::string_view name) {
   return std::ranges::find(displayFormats, name, &DisplayFormat::name)->write;
 }
 
 void declareInput(CLI::App& app, Options& options, Wishes& wishes,
                   const std::vector<std::string>& technologies) {
-  app.add_option("--technology", options.technology, "the modem that was captured; snapshots need none")
+  app.add_option("--technology", options.technology,
+                 "the modem that was captured; unless given, the one that the capture names, else all-radios")
       ->check(CLI::IsMember(technologies));
   app.add_option("--jobs", options.jobs, "decode up to this many captures at the same time")
       ->check(CLI::Range(1U, mostJobs).description(""))
@@ -72,8 +90,10 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
       ->check(CLI::Range(-1, std::numeric_limits<int>::max()).description(""))
       ->type_name("N")
       ->capture_default_str();
-  app.add_option("--sim", wishes.subscription,
-                 "take the records of this SIM card, and those that name no card; modems count from 1")
+  app.add_option(
+         "--sim", wishes.subscription,
+         "take the records of this SIM card, and those that name no card; modems count from 1. Without "
+         "it all-radios shows all cards side by side, and others show the first")
       ->check(CLI::Range(1U, 255U).description(""))
       ->type_name("N");
   app.add_flag("--follow", wishes.isFollowing, "wait for more at the end of the file, until interrupted");
@@ -107,6 +127,10 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
   app.add_option("--plot", wishes.plot, "also draw the numbers under these paths over time, as SVG")
       ->type_name("FILE PATH")
       ->expected(2, CLI::detail::expected_max_vector_size);
+  app.add_flag(
+      "--identities", wishes.isShowingIdentities,
+      "let all-radios show identities (M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI), not only that they "
+      "are present; --stats and --plot never do");
   app.add_option("--snapshot", options.snapshotPath, "also write a snapshot file")->type_name("FILE");
   app.add_option("--dlf", options.binaryLogPath, "also write the binary log of the last displays")
       ->type_name("FILE");
@@ -146,6 +170,8 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
   }
   if (wishes.isStatistics && !format.empty() && format != "text" && format != "json")
     return "--stats writes --format text or json only";
+  if (const auto identity = std::ranges::find_if(wishes.plot, isIdentityPath); identity != wishes.plot.end())
+    return "--plot never draws identities, and " + *identity + " is one";
   if (std::ranges::any_of(options.captures, &std::string::empty)) return "the name of a capture is empty";
   const auto outputs = namedOutputs(options, wishes);
   for (const auto& [option, path] : outputs)
@@ -194,6 +220,7 @@ void fulfill(Options& options, const Wishes& wishes) {
   options.output = outputFor(options, wishes);
   if (wishes.subscription) options.subscription = static_cast<std::uint8_t>(*wishes.subscription);
   if (wishes.isFollowing) options.atEnd = AtEndOfFile::WaitForMore;
+  if (wishes.isShowingIdentities) options.identities = Identities::Shown;
   if (wishes.isNumbers) options.style.valuesAs = ValuesAs::Numbers;
   if (wishes.isChanges) options.style.displays = Displays::Changed;
   options.writeDisplay = writerNamed(format);

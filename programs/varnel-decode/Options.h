@@ -7,6 +7,7 @@
 #include <variant>
 #include <vector>
 
+#include "LogGenerator/Identities.h"
 #include "base/Log.h"
 #include "host/captures/ByteSource.h"
 #include "programs/varnel-decode/GenerationWriters.h"
@@ -45,11 +46,13 @@ struct Options {
   std::optional<std::string> pcapPath;       ///< as pcap
   std::optional<std::string> framedPath;     ///< as a framed stream
   std::optional<PlotWish> plot;
-  std::optional<std::uint8_t> subscription;  ///< whose records alone are taken; absent for whichever is first
-  AtEndOfFile atEnd = AtEndOfFile::Stop;     ///< what happens where a capture ends
-  unsigned jobs = 1;                         ///< how many captures are decoded at the same time
-  bool namesEachCapture = false;      ///< text of several captures: a line before each says which it is
-  std::vector<std::string> captures;  ///< captures and snapshots, at least one; "-" is standard input
+  Identities identities = Identities::Hidden;
+  /// Whose records alone are taken; absent for whichever is first, or for all, as the technology wants.
+  std::optional<std::uint8_t> subscription;
+  AtEndOfFile atEnd = AtEndOfFile::Stop;  ///< what happens where a capture ends
+  unsigned jobs = 1;                      ///< how many captures are decoded at the same time
+  bool namesEachCapture = false;          ///< text of several captures: a line before each says which it is
+  std::vector<std::string> captures;      ///< captures and snapshots, at least one; "-" is standard input
 };
 
 /// The status to end with when the command line leaves nothing to do: 0 after help, 2 after a mistake.

@@ -19,7 +19,7 @@ std::optional<std::string> Subscriptions::remark(const std::string& captureName)
   if (_wanted && !_counts.contains(_wanted))
     return captureName + " has no records of " + subscriptionName(_wanted) +
            (numbers.empty() ? ", and names no other SIM" : "; it has those of " + subscriptionNames(numbers));
-  if (_wanted || numbers.empty()) return std::nullopt;
+  if (_wanted || _filter.takesAll() || numbers.empty()) return std::nullopt;
   return captureName + " has records of " + subscriptionName(_filter.taken()) +
          ", which are decoded, and of " + subscriptionNames(numbers) + ", which are not; choose by --sim";
 }

@@ -11,13 +11,14 @@
 
 namespace varnel {
 
-/// Counts the records of each subscription, and chooses one subscription like `SubscriptionFilter`.
+/// Counts the records of each subscription, and chooses like `SubscriptionFilter`.
 class Subscriptions {
  public:
   /// The absent key stands for records that name none; it comes first.
   using Counts = std::map<std::optional<std::uint8_t>, std::uint64_t>;
 
-  explicit Subscriptions(std::optional<std::uint8_t> wanted) : _wanted(wanted), _filter(wanted) {}
+  explicit Subscriptions(std::optional<std::uint8_t> wanted, Unasked unasked = Unasked::First)
+      : _wanted(wanted), _filter(wanted, unasked) {}
 
   /// Counts the record. Returns whether it is chosen.
   bool take(const CaptureRecord& record);
@@ -31,7 +32,7 @@ class Subscriptions {
  private:
   std::vector<std::uint8_t> others() const;
 
-  const std::optional<std::uint8_t> _wanted;
+  std::optional<std::uint8_t> _wanted;
   SubscriptionFilter _filter;
   Counts _counts;
 };

@@ -68,13 +68,20 @@ std::vector<std::string> TechnologyGuess::likeliest(const std::vector<std::strin
                                                     const Services& services) const {
   std::vector<std::string> names;
   std::uint64_t most = 1;
+  bool isKnownToAllRadios = false;
   for (const std::string& technology : technologies) {
     const std::uint64_t count = knownTo(technology, services);
+    // It knows what the others know, and more, so it would hide which modem it was.
+    if (technology == technology::allRadios) {
+      isKnownToAllRadios = count > 0;
+      continue;
+    }
     if (count < most) continue;
     if (count > most) names.clear();
     most = count;
     names.push_back(technology);
   }
+  if (isKnownToAllRadios) names.emplace(names.begin(), technology::allRadios);
   return names;
 }
 

@@ -25,8 +25,9 @@ class TechnologyGuess {
   /// Whether there were messages of a modem, and none of them was known.
   bool isNeeded() const { return _count > 0 && !_isAnyKnown; }
 
-  /// One sentence that names the log codes, and the technologies that know most of the messages. It tries all
-  /// technologies, so the log should have no sink.
+  /// One sentence that names the log codes, and the technologies that know most of the messages: first that
+  /// of all radios, if it knows any, then those of one modem. It tries all technologies, so the log should
+  /// have no sink.
   std::string sentence(const std::string& captureName, const std::string& technology,
                        const std::vector<std::string>& technologies, const Services& services) const;
 

@@ -10,7 +10,6 @@
 #include "host/FileResources.h"
 #include "host/ProgramStart.h"
 #include "host/TerminateHandler.h"
-#include "platform/TelephonyService.h"
 #include "programs/varnel-decode/InputDecoding.h"
 #include "programs/varnel-decode/Jobs.h"
 #include "programs/varnel-decode/Options.h"
@@ -24,16 +23,6 @@ namespace varnel {
 namespace {
 
 constexpr int generalError = 1;
-
-// The log has no sink yet, so trying the technologies writes nothing.
-std::vector<std::string> technologiesWithGenerator(const Services& services) {
-  std::vector<std::string> names;
-  for (const auto name : {technology::ifxGSM, technology::kalviGSMUMTS, technology::kalviCDMA,
-                          technology::kalviLTE, technology::kalviUTRAN2}) {
-    if (LogGenerator::generatorFromTechnology(name, services)) names.emplace_back(name);
-  }
-  return names;
-}
 
 int decodeAll(const Options& options, const DecodingServices& services) {
   if (options.technology && !succeeds([] { static_cast<void>(readableResourceFolder()); }))
@@ -56,14 +45,15 @@ int run(int argumentCount, char** arguments) {
   // Generators write some lines to standard output. They would spoil the data there.
   std::ostream nowhere(nullptr);
   const TemplateWatch templates(resources);
-  const Services services{templates, clock, application, nowhere};
 
-  const std::vector<std::string> technologies = technologiesWithGenerator(services);
+  const auto names = LogGenerator::technologies();
+  const std::vector<std::string> technologies(names.begin(), names.end());
   const auto choice =
       readOptions(argumentCount, arguments, technologies, application.version.value_or("(none)"));
   if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
   const auto& options = std::get<Options>(choice);
   if (const auto clash = outputClash(options)) return mistake(*clash).code;
+  const Services services{templates, clock, application, nowhere, options.identities};
   return decodeAll(options, {services, clock, templates, technologies});
 }
 

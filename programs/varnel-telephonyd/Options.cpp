@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <iostream>
 #include <limits>
 #include <vector>
@@ -21,8 +22,8 @@ constexpr int usageError = 2;
 constexpr double slowest = 0.001, fastest = 1'000'000;
 
 void declare(CLI::App& app, Options& options, const std::string& version) {
-  std::vector<std::string> technologies;
-  for (const auto name : simulatedTechnologies()) technologies.emplace_back(name);
+  const auto simulated = simulatedTechnologies();
+  const std::vector<std::string> technologies(simulated.begin(), simulated.end());
 
   app.description(
       "Serves the log channel to viewers, from a simulated modem or from a capture. One of --simulate and "
@@ -43,9 +44,9 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
           ->excludes(simulate)
           ->type_name("CAPTURE");
   app.add_option("--technology", options.replayTechnology,
-                 "the modem that was captured; unless given, the one that the capture names, else kalvi-lte")
+                 "the modem that was captured; unless given, the one that the capture names, else all-radios")
       ->needs(replay)
-      ->check(CLI::IsMember(technologies))
+      ->check(CLI::IsMember(replayedTechnologies()))
       ->type_name("TECHNOLOGY");
   app.add_option("--speed", options.speed, "replay this many times as fast")
       ->needs(replay)
@@ -53,15 +54,16 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
       ->capture_default_str();
   app.add_flag("--loop", options.loops, "start the capture over at its end")->needs(replay);
   app.add_option("--sim", options.subscription,
-                 "replay the messages of this SIM card, and those that name no card; unless given, the first "
-                 "card that a message names")
+                 "replay the messages of this SIM card, and those that name no card; unless given, all cards "
+                 "for all-radios, else the first card that a message names")
       ->needs(replay)
       ->check(CLI::Range(1U, 255U).description(""))
       ->type_name("N");
   auto* record =
       app.add_option("--record", options.recordPath,
                      "write what is sent to viewers to a capture that can be replayed and decoded; refuses a "
-                     "file that exists and is not empty")
+                     "file that exists and is not empty. It holds identities of a person, such as the "
+                     "numbers of the SIM card")
           ->type_name("CAPTURE");
   app.add_flag_callback(
          "--overwrite", [&options] { options.existingRecording = ExistingRecording::Replaced; },
@@ -111,6 +113,14 @@ ExitStatus mistake(const std::string& text) {
 }
 
 }  // namespace
+
+std::vector<std::string> replayedTechnologies() {
+  const auto simulated = simulatedTechnologies();
+  std::vector<std::string> names(simulated.begin(), simulated.end());
+  if (std::ranges::find(names, technology::allRadios) == names.end())
+    names.emplace_back(technology::allRadios);
+  return names;
+}
 
 std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
                                               const std::string& version) {

@@ -4,6 +4,7 @@
 #include <optional>
 #include <string>
 #include <variant>
+#include <vector>
 
 #include "base/Log.h"
 #include "host/RecordingFile.h"
@@ -16,11 +17,11 @@ struct Options {
   std::uint64_t seed = 1;
 
   std::optional<std::string> replayPath;
-  /// The technology that viewers are told; absent: the one that the capture names.
+  /// The technology that viewers are told; absent: the one that the capture names, else all radios.
   std::optional<std::string> replayTechnology;
   double speed = 1;
   bool loops = false;
-  std::optional<unsigned> subscription;  ///< 1 to 255; absent: the first one in the capture
+  std::optional<unsigned> subscription;  ///< 1 to 255; absent: the first one in the capture, or all
 
   std::optional<std::string> recordPath;  ///< absent: nothing is recorded
   ExistingRecording existingRecording = ExistingRecording::Refused;
@@ -32,6 +33,9 @@ struct Options {
 struct ExitStatus {
   int code;
 };
+
+/// Every technology that a replayed capture can be of.
+std::vector<std::string> replayedTechnologies();
 
 /// Reads the command line. Help and version go to standard output; a mistake is one line on standard error.
 std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,

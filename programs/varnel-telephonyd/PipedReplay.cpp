@@ -44,7 +44,7 @@ class PipedReplay::Source final : public MessageSource {
 
 PipedReplay::PipedReplay(Setup setup)
     : _setup(std::move(setup)),
-      _subscription(_setup.name, _setup.subscription),
+      _subscription(_setup.name, _setup.subscription, _setup.unasked),
       _pace(_setup.name, _setup.speed) {}
 
 std::unique_ptr<MessageSource> PipedReplay::makeSource() { return std::make_unique<Source>(*this); }

@@ -32,6 +32,7 @@ class PipedReplay final {
     std::string name;  ///< of the capture, for users
     double speed = 1;
     std::optional<std::uint8_t> subscription{};
+    Unasked unasked = Unasked::First;
   };
 
   explicit PipedReplay(Setup setup);

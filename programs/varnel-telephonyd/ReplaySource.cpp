@@ -7,8 +7,11 @@
 namespace varnel {
 
 ReplaySource::ReplaySource(std::string path, double speed, AtEnd atEnd,
-                           std::optional<std::uint8_t> subscription)
-    : _path(std::move(path)), _atEnd(atEnd), _subscription(_path, subscription), _pace(_path, speed) {}
+                           std::optional<std::uint8_t> subscription, Unasked unasked)
+    : _path(std::move(path)),
+      _atEnd(atEnd),
+      _subscription(_path, subscription, unasked),
+      _pace(_path, speed) {}
 
 std::optional<StreamMessage> ReplaySource::next() {
   CaptureRecord record;

@@ -19,9 +19,10 @@ class ReplaySource final : public MessageSource {
   enum class AtEnd { Stop, StartOver };
 
   /// Plays the capture `speed` times as fast. When it starts over, the first message comes one second of the
-  /// capture's time after the last one. If there are several subscriptions, only one is played: the given
-  /// one, else the first.
-  ReplaySource(std::string path, double speed, AtEnd atEnd, std::optional<std::uint8_t> subscription = {});
+  /// capture's time after the last one. If there are several subscriptions, the given one is played, else the
+  /// first one or all.
+  ReplaySource(std::string path, double speed, AtEnd atEnd, std::optional<std::uint8_t> subscription = {},
+               Unasked unasked = Unasked::First);
 
   /// A fault of the capture writes a log line and ends the stream. A log line also tells, once, that a wait
   /// was shortened, and once, that there are other subscriptions.

@@ -8,13 +8,13 @@
 
 namespace varnel {
 
-/// Chooses the records of a replay by their subscription: those of the given one, else of the first one, and
-/// those of none. A log line tells, once, that there are others, unless one was given.
+/// Chooses the records of a replay like `SubscriptionFilter`. A log line tells, once, that there are other
+/// subscriptions, unless one was given.
 class ReplaySubscription {
  public:
   /// The name of the capture is for the log.
-  ReplaySubscription(std::string name, std::optional<std::uint8_t> wanted)
-      : _name(std::move(name)), _filter(wanted), _tellsOthers(!wanted) {}
+  ReplaySubscription(std::string name, std::optional<std::uint8_t> wanted, Unasked unasked = Unasked::First)
+      : _name(std::move(name)), _filter(wanted, unasked), _tellsOthers(!wanted) {}
 
   bool takes(std::optional<std::uint8_t> subscription);
   /// The sentence that the replay has ended, with the reason when no record was played for want of one of the

@@ -72,12 +72,13 @@ std::chrono::milliseconds uptime() {
       std::chrono::steady_clock::now().time_since_epoch());
 }
 
-std::unique_ptr<MessageSource> makeSource(const Options& options) {
+std::unique_ptr<MessageSource> makeSource(const Options& options, Unasked unasked) {
   if (options.simulatedTechnology) {
     return std::make_unique<SimulationSource>(simulatedModem(*options.simulatedTechnology, options.seed));
   }
   const auto atEnd = options.loops ? ReplaySource::AtEnd::StartOver : ReplaySource::AtEnd::Stop;
-  return std::make_unique<ReplaySource>(*options.replayPath, options.speed, atEnd, options.subscription);
+  return std::make_unique<ReplaySource>(*options.replayPath, options.speed, atEnd, options.subscription,
+                                        unasked);
 }
 
 // The reader of standard input, if that is what is replayed.
@@ -103,14 +104,14 @@ std::string technologyOf(const Options& options, PipeReader* pipe) {
   if (options.simulatedTechnology) return *options.simulatedTechnology;
   const auto named = technologyOfCapture(options, pipe);
   if (options.replayTechnology) return *options.replayTechnology;
-  const auto known = simulatedTechnologies();
-  const bool isKnown = named && std::ranges::find(known, *named) != std::ranges::end(known);
-  return isKnown ? *named : std::string(technology::kalviLTE);
+  const auto known = replayedTechnologies();
+  const bool isKnown = named && std::ranges::find(known, *named) != known.end();
+  return isKnown ? *named : std::string(technology::allRadios);
 }
 
 // The replay of the pipe, which the reader wakes through the queue; none without a reader.
 std::unique_ptr<PipedReplay> makePipedReplay(const Options& options, MainQueue& queue,
-                                             std::unique_ptr<PipeReader> reader) {
+                                             std::unique_ptr<PipeReader> reader, Unasked unasked) {
   if (!reader) return nullptr;
   PipeReader& pipe = *reader;
   auto replay = std::make_unique<PipedReplay>(PipedReplay::Setup{.reader = std::move(reader),
@@ -118,7 +119,8 @@ std::unique_ptr<PipedReplay> makePipedReplay(const Options& options, MainQueue& 
                                                                  .uptime = uptime,
                                                                  .name = captureName("-"),
                                                                  .speed = options.speed,
-                                                                 .subscription = options.subscription});
+                                                                 .subscription = options.subscription,
+                                                                 .unasked = unasked});
   pipe.start([&queue, &replay = *replay] { queue.async([&replay] { replay.recordArrived(); }); });
   return replay;
 }
@@ -127,6 +129,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   // A capture that cannot be replayed is reported now, not when the first viewer comes.
   std::unique_ptr<PipeReader> reader = makePipeReader(options);
   const std::string technology = technologyOf(options, reader.get());
+  const Unasked unasked = unaskedOf(technology);
 
   raiseDescriptorLimit(mostFiles);
   HostApplication application(argumentCount, arguments);
@@ -135,14 +138,15 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   const std::filesystem::path folder = runtimeFolder(options.runtimeFolder);
   SocketPorts ports(folder);
   EventLoopQueue queue;
-  const std::unique_ptr<PipedReplay> pipedReplay = makePipedReplay(options, queue, std::move(reader));
+  const std::unique_ptr<PipedReplay> pipedReplay =
+      makePipedReplay(options, queue, std::move(reader), unasked);
   std::unique_ptr<Recorder> recorder;
   TelephonyServer server(
       {.ports = ports,
        .queue = queue,
        .uptime = uptime,
        .technology = technology,
-       .makeSource = [&] { return pipedReplay ? pipedReplay->makeSource() : makeSource(options); },
+       .makeSource = [&] { return pipedReplay ? pipedReplay->makeSource() : makeSource(options, unasked); },
        .messageSent =
            [&](ByteView message) {
              if (recorder) recorder->record(message);

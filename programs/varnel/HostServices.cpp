@@ -15,11 +15,16 @@ HostServices::HostServices(const Options& options, const ApplicationInfo& applic
       _resources(readableResourceFolder()),
       _files(options.deviceRoot),
       _preferences(options.deviceRoot),
-      _application(application) {}
+      _application(application),
+      _identities(options.showsIdentities ? Identities::Shown : Identities::Hidden) {}
 
 ModelServices HostServices::model(std::ostream& standardOutput) {
-  return {_portsOfSubscription, _telephony, _queue, {_resources, _clock, _application, standardOutput},
-          writeXmlPropertyList, &_link};
+  return {_portsOfSubscription,
+          _telephony,
+          _queue,
+          {_resources, _clock, _application, standardOutput, _identities},
+          writeXmlPropertyList,
+          &_link};
 }
 
 }  // namespace varnel

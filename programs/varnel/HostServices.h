@@ -42,6 +42,7 @@ class HostServices final {
   RootedFiles _files;
   FilePreferences _preferences;
   const ApplicationInfo& _application;
+  const Identities _identities;
 };
 
 }  // namespace varnel

@@ -18,6 +18,7 @@ struct Options {
   int logLevel = -1;  ///< the highest priority number that goes to standard error; -1 for none
   std::optional<unsigned> updates;
   std::optional<unsigned> subscription;  ///< 1 to 255; absent: all
+  bool showsIdentities = false;
 };
 
 /// Declares the options to the parser of the command line, which fills them. They must outlive the parser.

@@ -136,7 +136,7 @@ TEST_F(NoticeKeeperTest, AnUnknownTechnologyIsNamedAndThoseThatAreKnown) {
       keeper.text(),
       "The telephony server in /run/varnel has a modem of the technology \"kalvi-7g\", which this viewer "
       "does not know; start varnel-telephonyd anew with one of ifx-gsm, kalvi-gsm-umts, kalvi-cdma, "
-      "kalvi-lte, kalvi-utran-2");
+      "kalvi-lte, kalvi-utran-2, all-radios");
 }
 
 TEST_F(NoticeKeeperTest, AServerThatTellsNoTechnologyIsToldOfThoughTheHostKnowsNothing) {
@@ -233,6 +233,16 @@ TEST_F(NoticeKeeperTest, AMixtureOfSimCardsIsToldAsLongAsItIsOne) {
   link.report.mixture.clear();
   queue.advance(2s);
   EXPECT_EQ(keeper.text(), "");
+}
+
+TEST_F(NoticeKeeperTest, AllRadiosKeepSimCardsApartSoTheyAreNoMixture) {
+  host.resources.add("AllRadios", dictionaryOf({{"1;LTE", Value::ofDictionary()}}));
+  answerWith("all-radios");
+  start();
+  receive();
+  link.report.mixture = "The display mixes SIM 1 and SIM 2";
+  queue.advance(4s);
+  EXPECT_THAT(keeper.text(), testing::Not(testing::HasSubstr("mixes")));
 }
 
 TEST_F(NoticeKeeperTest, MessagesThatAreNotShownAreCountedALineForEachReason) {

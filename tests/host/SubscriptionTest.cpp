@@ -33,6 +33,18 @@ TEST(SubscriptionFilter, TakesTheOneThatIsWantedAndWhatNamesNone) {
   EXPECT_EQ(filter.taken(), 2);
 }
 
+TEST(SubscriptionFilter, TakesAllOfAllRadiosUnlessOneIsWanted) {
+  SubscriptionFilter all({}, unaskedOf("all-radios"));
+  EXPECT_TRUE(all.takes(2));
+  EXPECT_TRUE(all.takes(1));
+  EXPECT_TRUE(all.takes({}));
+  EXPECT_EQ(all.taken(), std::nullopt);
+  SubscriptionFilter one(2, unaskedOf("all-radios"));
+  EXPECT_FALSE(one.takes(1));
+  EXPECT_TRUE(one.takes(2));
+  EXPECT_EQ(unaskedOf("kalvi-lte"), Unasked::First);
+}
+
 TEST(SubscriptionFilter, TakesTheFirstUnlessOneIsWanted) {
   SubscriptionFilter filter({});
   EXPECT_TRUE(filter.takes(std::nullopt));

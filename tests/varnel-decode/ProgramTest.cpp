@@ -100,7 +100,8 @@ TEST_F(DecodeProgram, ACaptureOfAnotherTechnologyIsToldByItsLogCodes) {
     EXPECT_EQ(result.status, 0);
     EXPECT_THAT(result.error, StartsWith(std::string("varnel-decode: ") + technology +
                                          " knows none of the 2 modem messages"));
-    EXPECT_THAT(result.error, HasSubstr(path + " (log codes 0xB0C1); try --technology kalvi-lte\n"));
+    EXPECT_THAT(result.error,
+                HasSubstr(path + " (log codes 0xB0C1); try --technology all-radios or kalvi-lte\n"));
     EXPECT_EQ(linesOf(result.error), 1u) << result.error;
   }
   EXPECT_EQ(run({"--technology", "kalvi-lte", "--format", "none", path}).error, "");
@@ -120,6 +121,42 @@ TEST_F(DecodeProgram, ACaptureThatNoTechnologyKnowsIsToldAndItsPathsAreNot) {
   EXPECT_EQ(result.status, 0);
   EXPECT_EQ(linesOf(result.error), 1u) << result.error;
   EXPECT_THAT(result.error, HasSubstr("(log codes 0xFFFE); nor does any other technology\n"));
+}
+
+// A serving cell of LTE on EARFCN 5230.
+std::string servingCell(std::uint16_t physicalCell, std::uint8_t version = 3) {
+  return packet(1, 0xB0C2,
+                littleEndian(version, 1) + littleEndian(physicalCell, 2) + littleEndian(5230, 4) +
+                    littleEndian(23230, 4) + std::string(18, '\0'));
+}
+
+TEST_F(DecodeProgram, ACaptureThatNamesNoTechnologyIsThatOfAllRadios) {
+  const std::string path = write("drive.pcap", pcapHeader() + pcapRecord(afternoon, 0, servingCell(16)));
+  const Result result = run({path, "--format", "paths"});
+  EXPECT_EQ(result.status, 0);
+  EXPECT_EQ(result.error, "");
+  EXPECT_THAT(result.output, HasSubstr("\n/LTE/Serving Cell/Physical Cell ID\t16\n"));
+  EXPECT_THAT(run({path, path, "--numbers", "--csv", "LTE/Serving Cell/Downlink Frequency"}).output,
+              StartsWith("Capture,Time,"));
+}
+
+TEST_F(DecodeProgram, WhatAllRadiosDoNotKnowIsToldAsOfAnotherTechnology) {
+  const std::string path =
+      write("walk.pcap", pcapHeader() + pcapRecord(afternoon, 0, list("<string>an object</string>")));
+  EXPECT_EQ(run({"--format", "none", path}).error,
+            "varnel-decode: all-radios knows none of the 1 modem messages of " + path +
+                "; try --technology ifx-gsm\n");
+}
+
+TEST_F(DecodeProgram, VersionsThatNobodyKnowsAreNamed) {
+  const std::string path = write("drive.pcap", pcapHeader() + pcapRecord(afternoon, 0, servingCell(16)) +
+                                                   pcapRecord(afternoon, 0, servingCell(17, 99)));
+  EXPECT_EQ(
+      run({path, "--stats"}).output,
+      "Log code        Received      Decoded    Too short     Too long      Unknown  Unknown version\n"
+      "0xB0C2                 2            1            0            0            0                1\n"
+      "0xB0C2 v99                                                                                  1\n"
+      "Total                  2            1            0            0            0                1\n");
 }
 
 TEST_F(DecodeProgram, AMissingTemplateEndsItWithALineThatNamesTheFile) {
@@ -172,7 +209,7 @@ TEST_F(DecodeProgram, HeadingsAndMessagesShowNamesOfFilesPrintable) {
   const std::string shown = folder.file("walk\\u000A\\u001B[2J.pcap");
   EXPECT_THAT(run({"--technology", "kalvi-lte", path, path}).output, StartsWith("==> " + shown + " <==\n"));
   EXPECT_THAT(run({"--technology", "kalvi-lte", path + "x"}).error, HasSubstr(shown + "x"));
-  EXPECT_THAT(run({path}).error, HasSubstr(shown));
+  EXPECT_THAT(run({"--technology", "kalvi-cdma", path}).error, HasSubstr(shown));
 }
 
 TEST_F(DecodeProgram, ADisplayThatNoPropertyListHoldsIsAnError) {
@@ -320,7 +357,6 @@ TEST_F(DecodeProgram, AWrongCommandLineIsOneLineAndStatusTwo) {
   const std::string path = write("capture", pcapHeader());
   const std::vector<std::vector<std::string>> wrong = {
       {},
-      {path},
       {"--technology", "kalvi-lte"},
       {"--technology", "kalvi-lte", "--format", "yaml", path},
       {"--technology", "kalvi-lte", "--log-level", "many", path},
@@ -344,6 +380,12 @@ TEST_F(DecodeProgram, AWrongCommandLineIsOneLineAndStatusTwo) {
       {"--technology", "kalvi-lte", "--snapshot", "", path},
       {"--technology", "kalvi-lte", "--dlf", "", path},
       {"--technology", "kalvi-lte", path, "--plot", "", "A/B"},
+      {"--identities", path, "--plot", folder.file("plot.svg"), "LTE/Registration/M-TMSI"},
+      {path, "--plot", folder.file("plot.svg"), "A/B", "NR/Registration/5G-TMSI"},
+      {path, "--plot", folder.file("plot.svg"), "SIM 1/Subscriber/SIM Info/EF-ICCID"},
+      {path, "--plot", folder.file("plot.svg"), "Subscriber/SIM Info/EF-MSISDN"},
+      {path, "--plot", folder.file("plot.svg"), "/Subscriber/SIM Info/EF-LOCI"},
+      {path, "--plot", folder.file("plot.svg"), "Subscriber/SIM Info/EF-GPRS/PS-LOCI"},
   };
   for (const auto& arguments : wrong) {
     const Result result = run(arguments);
@@ -354,12 +396,20 @@ TEST_F(DecodeProgram, AWrongCommandLineIsOneLineAndStatusTwo) {
   }
 }
 
+TEST_F(DecodeProgram, IdentitiesAreNeverDrawn) {
+  const Result result = run({"--identities", write("capture", pcapHeader()), "--plot",
+                             folder.file("plot.svg"), "LTE/Registration/M-TMSI"});
+  EXPECT_EQ(result.error,
+            "varnel-decode: --plot never draws identities, and LTE/Registration/M-TMSI is one; see "
+            "varnel-decode --help\n");
+}
+
 TEST_F(DecodeProgram, AnUnknownTechnologyNamesThoseThatExist) {
   const Result result = run({"--technology", "kalvi-5g", write("capture", pcapHeader())});
   EXPECT_EQ(result.status, 2);
   EXPECT_EQ(linesOf(result.error), 1u) << result.error;
   for (const char* technology :
-       {"kalvi-5g", "ifx-gsm", "kalvi-gsm-umts", "kalvi-cdma", "kalvi-lte", "kalvi-utran-2"}) {
+       {"kalvi-5g", "ifx-gsm", "kalvi-gsm-umts", "kalvi-cdma", "kalvi-lte", "kalvi-utran-2", "all-radios"}) {
     EXPECT_THAT(result.error, HasSubstr(technology));
   }
 }

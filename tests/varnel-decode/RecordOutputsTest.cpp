@@ -184,6 +184,30 @@ TEST_F(DecodeRecords, OfTwoSimsTheFirstIsDecodedWhichIsTold) {
                 "--sim\n");
 }
 
+// A serving cell of LTE on EARFCN 5230.
+std::string servingCell(std::uint16_t physicalCell) {
+  return packet(1, 0xB0C2,
+                littleEndian(3, 1) + littleEndian(physicalCell, 2) + littleEndian(5230, 4) +
+                    littleEndian(23230, 4) + std::string(18, '\0'));
+}
+
+TEST_F(DecodeRecords, AllRadiosShowBothSimsSideBySide) {
+  const std::string path = folder.file("capture");
+  std::ofstream(path, std::ios::binary)
+      << pcapHeader() << pcapRecord(afternoon, 0, "\x81\x02" + servingCell(4))
+      << pcapRecord(afternoon, 0, "\x81\x01" + servingCell(8)) << pcapRecord(afternoon, 0, servingCell(2));
+  const std::vector<std::string> all = {path, "--csv", "LTE/Serving Cell/Physical Cell ID",
+                                        "SIM 1/LTE/Serving Cell/Physical Cell ID",
+                                        "SIM 2/LTE/Serving Cell/Physical Cell ID"};
+  const Result both = run(all);
+  EXPECT_EQ(both.status, 0);
+  EXPECT_EQ(both.error, "");
+  EXPECT_THAT(both.output, HasSubstr("\n2024-03-01T14:05:09.000Z,2,8,4\n"));
+  std::vector<std::string> one = {"--sim", "1"};
+  one.insert(one.end(), all.begin(), all.end());
+  EXPECT_THAT(run(one).output, HasSubstr("\n2024-03-01T14:05:09.000Z,2,8,\n"));
+}
+
 TEST_F(DecodeRecords, SimChoosesOne) {
   const Result result = decode(twoSims(), {"--sim", "1", "--stats"});
   EXPECT_EQ(result.status, 0);

@@ -180,13 +180,5 @@ TEST_F(DecodeSnapshot, WhatNeedsMessagesIsAMistake) {
   }
 }
 
-TEST_F(DecodeSnapshot, ACaptureWithoutATechnologyIsAMistakeThatTellsWhatIsMissing) {
-  const Result result = run({write("capture", pcapHeader())});
-  EXPECT_EQ(result.status, 2);
-  EXPECT_EQ(linesOf(result.error), 1u) << result.error;
-  EXPECT_THAT(result.error, HasSubstr("--technology"));
-  EXPECT_THAT(result.error, Not(HasSubstr("snapshot")));
-}
-
 }  // namespace
 }  // namespace varnel

@@ -32,6 +32,20 @@ TEST(Subscriptions, OfOneOrNoneThereIsNothingToSay) {
   EXPECT_EQ(subscriptions.remark("a"), std::nullopt);
 }
 
+TEST(Subscriptions, WhereAllAreTakenThereIsNothingToSay) {
+  Subscriptions subscriptions({}, Unasked::All);
+  EXPECT_TRUE(subscriptions.take(recordOf(2)));
+  EXPECT_TRUE(subscriptions.take(recordOf(1)));
+  EXPECT_EQ(subscriptions.counts(), (Subscriptions::Counts{{1, 1}, {2, 1}}));
+  EXPECT_EQ(subscriptions.remark("a"), std::nullopt);
+}
+
+TEST(Subscriptions, TheWantedOneIsChosenEvenWhereAllWouldBeTaken) {
+  Subscriptions subscriptions(2, Unasked::All);
+  EXPECT_FALSE(subscriptions.take(recordOf(1)));
+  EXPECT_TRUE(subscriptions.take(recordOf(2)));
+}
+
 TEST(Subscriptions, TheWantedOneIsChosenWhicheverComesFirst) {
   Subscriptions subscriptions(2);
   EXPECT_FALSE(subscriptions.take(recordOf(1)));

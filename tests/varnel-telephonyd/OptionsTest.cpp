@@ -60,6 +60,8 @@ TEST(TelephonydOptions, AReplayMayBeFasterAndStartOver) {
 TEST(TelephonydOptions, AReplayMayBeOfOneSubscription) {
   EXPECT_EQ(read({"--replay", "walk.pcap", "--sim", "2"}).options().subscription, 2u);
   EXPECT_EQ(read({"--replay", "walk.pcap"}).options().subscription, std::nullopt);
+  EXPECT_EQ(read({"--replay", "walk.pcap", "--technology", "all-radios"}).options().replayTechnology,
+            "all-radios");
 }
 
 TEST(TelephonydOptions, ARecordingMayReplaceAnEarlierOneWhereThatIsSaid) {
