@@ -40,30 +40,32 @@ constexpr Field reason[] = {
     {u16(17), "C-RNTI"},
 };
 
+constexpr std::size_t resultOffset = 1;
+constexpr Field attempt[] = {
+    {u8(0), "Attempt"},
+    {u8(resultOffset), "Result", choice(results, unknown)},
+    {u8(2), "Contention", entry(contention, unknown)},
+    {u8(4), "Preamble"},
+};
+constexpr Field response[] = {
+    {u16(0), "Backoff", milliseconds},
+    {u16(3), "Temporary C-RNTI"},
+    {u16(5), "Timing Advance"},
+    {u16(5), "Distance", distance},
+};
+// With the grant, which is not shown.
+constexpr std::size_t responseSize = 14;
+
 // Newer versions put the subscription and the cell in front of the attempt. The newest one has a longer
 // preamble part between the attempt and the response.
-template <std::uint16_t start>
-constexpr Field attempt[] = {
-    {u8(start), "Attempt"},
-    {u8(start + 1), "Result", choice(results, unknown)},
-    {u8(start + 2), "Contention", entry(contention, unknown)},
-    {u8(start + 4), "Preamble"},
-};
-template <std::uint16_t start>
-constexpr Field response[] = {
-    {u16(start), "Backoff", milliseconds},
-    {u16(start + 3), "Temporary C-RNTI"},
-    {u16(start + 5), "Timing Advance"},
-    {u16(start + 5), "Distance", distance},
-};
-
-template <std::uint16_t attemptStart, std::uint16_t responseStart>
+template <std::size_t attemptOffset, std::size_t responseOffset>
 void updateAttempt(Section& section, const Packet& subpacket) {
-  section.show(subpacket, attempt<attemptStart>);
-  if (subpacket.u8(attemptStart + 1) != failureAtMessage2)
-    return section.show(subpacket, response<responseStart>);
+  const Packet attemptPart = subpacket.from(attemptOffset);
+  section.show(attemptPart, attempt);
+  if (attemptPart.u8(resultOffset) != failureAtMessage2)
+    return section.show(subpacket.from(responseOffset), response);
   // Message 2 is the response. What an earlier procedure got would be taken for the one of this attempt.
-  for (const Field& field : response<responseStart>) section.setText(field.label, "");
+  for (const Field& field : response) section.setText(field.label, "");
 }
 
 constexpr Field rootSequence[] = {
@@ -90,10 +92,10 @@ constexpr Field contentionResolution[] = {
 constexpr PacketLayout layouts[] = {
     PacketLayout(0xB061, 1, 28, configuration).inSubpacket(3, 2),
     PacketLayout(0xB061, 1, 20, reason).inSubpacket(5, 1),
-    PacketLayout(0xB062, 1, 26, updateAttempt<4, 12>).inSubpacket(6, 2),
-    PacketLayout(0xB062, 1, 28, updateAttempt<6, 14>).inSubpacket(6, 3),
-    PacketLayout(0xB062, 1, 28, updateAttempt<6, 14>).inSubpacket(6, 49),
-    PacketLayout(0xB062, 1, 31, updateAttempt<6, 17>).inSubpacket(6, 50),
+    PacketLayout(0xB062, 1, 12 + responseSize, updateAttempt<4, 12>).inSubpacket(6, 2),
+    PacketLayout(0xB062, 1, 14 + responseSize, updateAttempt<6, 14>).inSubpacket(6, 3),
+    PacketLayout(0xB062, 1, 14 + responseSize, updateAttempt<6, 14>).inSubpacket(6, 49),
+    PacketLayout(0xB062, 1, 17 + responseSize, updateAttempt<6, 17>).inSubpacket(6, 50),
     {0xB166, 3, 4, rootSequence},
     {0xB167, 5, 28, transmission},
     {0xB168, 1, 12, receivedResponse},
@@ -106,8 +108,8 @@ RandomAccess::RandomAccess() : VersionedDecoder("Random Access", layouts) {}
 
 void RandomAccess::listNumberFormats(SectionFormats& formats) const {
   VersionedDecoder::listNumberFormats(formats);
-  formats.add(attempt<4>);
-  formats.add(response<12>);
+  formats.add(attempt);
+  formats.add(response);
 }
 
 }  // namespace varnel::lte

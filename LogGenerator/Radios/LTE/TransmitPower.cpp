@@ -21,10 +21,13 @@ consteval Source signedRun(unsigned word, unsigned firstBit, std::uint8_t width)
   return source;
 }
 
-template <std::uint16_t blockSize>
-constexpr Field transmission[] = {
+constexpr Field transmission43[] = {
     {signedRun(6, 0, 7), "PUSCH Power", dBm},
-    {u16(blockSize), "Transport Block Size"},
+    {u16(12), "Transport Block Size"},
+};
+constexpr Field transmission102[] = {
+    {signedRun(6, 0, 7), "PUSCH Power", dBm},
+    {u16(8), "Transport Block Size"},
 };
 
 constexpr Field sharedChannel4[] = {
@@ -66,8 +69,8 @@ void showLast(Section& section, const Packet& payload) {
 }
 
 constexpr PacketLayout layouts[] = {
-    {0xB139, 43, transmissions43.first, showLast<transmissions43, transmission<12>>},
-    {0xB139, 102, transmissions102.first, showLast<transmissions102, transmission<8>>},
+    {0xB139, 43, transmissions43.first, showLast<transmissions43, transmission43>},
+    {0xB139, 102, transmissions102.first, showLast<transmissions102, transmission102>},
     {0xB16E, 4, powers.first, showLast<powers, sharedChannel4>},
     {0xB16E, 5, powers.first, showLast<powers, sharedChannel5>},
     {0xB16E, 25, powers.first, showLast<powers, sharedChannel25>},

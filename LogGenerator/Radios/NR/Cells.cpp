@@ -178,16 +178,16 @@ class Walk {
   bool _isPlausible = true;
 };
 
-template <std::uint16_t countOffset>
+// Behind the number of layers.
 constexpr Field database[] = {
-    {u8(countOffset + 1), "SSB Period"},
+    {u8(1), "SSB Period"},
 };
 
-template <std::uint16_t countOffset, std::size_t firstLayer, const LayerLayout& layer, const BeamLayout& beam>
+template <std::size_t countOffset, std::size_t firstLayer, const LayerLayout& layer, const BeamLayout& beam>
 void update(Section& section, const Packet& payload) {
   auto layers = Walk(payload.from(firstLayer), layer, beam).layers(payload.u8(countOffset));
   if (!layers) return;
-  section.show(payload, database<countOffset>);
+  section.show(payload.from(countOffset), database);
   section.set("Layers", Value::ofArray(*std::move(layers)));
 }
 

@@ -13,35 +13,40 @@ constexpr std::string_view spacings[] = {"15 kHz", "30 kHz", "60 kHz", "120 kHz"
 
 constexpr Format spacing = integer("%u kHz");  // for the list of units
 
-// The versions differ in the place of the subcarrier spacing: bit 30 or bit 31 of the properties.
-template <std::uint8_t spacingBit>
 constexpr Field entries[] = {
     {u16(cell), "Physical Cell ID"},
     {u32(channel), "NR-ARFCN"},
     {bits(10, 0, 10), "System Frame Number"},
-    {bits(13, spacingBit, 2), "Subcarrier Spacing", entry(spacings)},
+};
+// Bits 30 and 31 of the properties, or bits 31 and 32.
+constexpr Field shortSpacing[] = {
+    {bits(13, 6, 2), "Subcarrier Spacing", entry(spacings)},
+};
+constexpr Field longSpacing[] = {
+    {bits(13, 7, 2), "Subcarrier Spacing", entry(spacings)},
 };
 
-template <std::uint8_t spacingBit>
+template <const auto& spacingEntry>
 void update(Section& section, const Packet& payload) {
   const std::uint32_t nrArfcn = payload.u32(channel);
   if (!isPhysicalCell(payload.u16(cell)) || !isChannel(nrArfcn)) return;
-  section.show(payload, entries<spacingBit>);
+  section.show(payload, entries);
+  section.show(payload, spacingEntry);
   section.setText("Frequency", channels::nrFrequency(nrArfcn));
 }
 
 constexpr PacketLayout layouts[] = {
-    {0xB822, 3, 14, update<6>},
-    {0xB822, 0x20000, 15, update<7>},
+    {0xB822, 3, 14, update<shortSpacing>},
+    {0xB822, 0x20000, 15, update<longSpacing>},
 };
+static_assert(extent(shortSpacing) == 14 && extent(longSpacing) == 15);
 
 }  // namespace
 
 MasterInformation::MasterInformation() : VersionedDecoder("MIB", layouts) {}
 
 void MasterInformation::listNumberFormats(SectionFormats& formats) const {
-  VersionedDecoder::listNumberFormats(formats);
-  formats.add(entries<6>);
+  formats.add(entries);
   formats.add("Frequency", channels::nrFrequencyFormat);
   // Texts of a table, which are numbers with one unit.
   formats.add("Subcarrier Spacing", spacing);
