@@ -235,7 +235,7 @@ std::optional<MeasuredCell> measuredCellAt(const ServingCellLayout& layout, cons
   if (index >= count || !subpacket.holds(offset, layout.cellSize)) return std::nullopt;
   MeasuredCell cell{.bytes = subpacket.from(offset), .physicalCell = 0, .servingIndex = std::nullopt};
   cell.physicalCell = static_cast<std::uint16_t>(rawValue(cell.bytes, layout.physicalCell));
-  if (layout.isServing.width == 0) {
+  if (!layout.tellsServing()) {
     if (index == 0) cell.servingIndex = 0;
   } else if (rawValue(cell.bytes, layout.isServing) != 0) {
     cell.servingIndex = static_cast<std::uint8_t>(rawValue(cell.bytes, layout.servingIndex));

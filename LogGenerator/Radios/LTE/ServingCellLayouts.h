@@ -49,6 +49,7 @@ struct ServingCellLayout {
   std::array<Field, 10> fields{};  ///< physical cell; RSRP, RSRQ, RSSI of all antennas together; others
   std::size_t fieldCount = 0;
 
+  bool tellsServing() const { return isServing.width > 0; }
   std::span<const Field> cellFields() const { return std::span(fields).first(fieldCount); }
   /// RSRP, RSRQ and RSSI of all antennas together.
   std::span<const Field> levels() const { return std::span(fields).subspan(1, 3); }
