@@ -224,7 +224,7 @@ struct FieldRow {
   std::uint64_t number;
   TextOf text;
 };
-/// A row that comes from more than one run.
+/// A row that comes from more than one run. It replaces a field of the same path.
 struct DerivedRow {
   std::string path;
   std::function<std::string(ByteView payload)> text;
@@ -261,6 +261,7 @@ struct DescribedLayout {
     Rows rows;
     if (!isPlausible(bytes)) return rows;
     const auto add = [&](const std::string& path, const std::string& text) {
+      rows.erase(path);
       if (!text.empty()) rows[path] = text;
     };
     for (const FieldRow& field : fields) add(field.path, field.text(numberIn(bytes, field.run)));
