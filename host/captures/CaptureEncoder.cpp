@@ -28,6 +28,14 @@ void store(Bytes& bytes, std::size_t offset, Number number) {
 
 }  // namespace
 
+std::optional<std::string> CaptureEncoder::remark(const std::string& captureName,
+                                                  const std::string& path) const {
+  if (_leftOut == 0) return std::nullopt;
+  return std::to_string(_leftOut) + (_leftOut == 1 ? " message of " : " messages of ") + captureName +
+         " did not come from a modem as log records (of log type 1), so " + path + " is without " +
+         (_leftOut == 1 ? "it" : "them");
+}
+
 bool appendLogRecord(Bytes& bytes, const CaptureRecord& record) {
   ByteView found = record.message;
   if (found.size() > prefixSize && found[0] == prefixMark) found = found.subspan(prefixSize);

@@ -1,6 +1,8 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
+#include <string>
 
 #include "base/Bytes.h"
 #include "host/captures/CaptureRecord.h"
@@ -24,6 +26,10 @@ class CaptureEncoder {
 
   /// How many messages were left out so far.
   std::uint64_t leftOut() const { return _leftOut; }
+
+  /// One sentence for users about what the file with this path lacks of the capture; nothing when it is
+  /// whole.
+  virtual std::optional<std::string> remark(const std::string& captureName, const std::string& path) const;
 
  protected:
   ByteView leaveOut() {

@@ -245,7 +245,8 @@ class InputDecoding {
   // The option that only captures can fulfill; nothing when there is none.
   std::optional<std::string> wishForCapture() const {
     if (countsMessages()) return "--stats counts the messages of captures";
-    if (!_outputs.areNone()) return "--records, --pcap and --framed write the records of captures";
+    if (!_outputs.areNone())
+      return "--records, --pcap, --framed and --messages write the records of captures";
     if (_options.subscription) return "--sim chooses among the records of captures";
     if (_options.snapshotPath) return "--snapshot saves what was decoded of a capture";
     return std::nullopt;

@@ -41,6 +41,7 @@ constexpr const char* examples =
     "  varnel-decode --technology kalvi-lte --jobs 4 --format json monday.pcap tuesday.pcap\n"
     "  ssh device cat PORT | varnel-decode --every --numbers --changes -\n"
     "  varnel-decode --format none --pcap walk.pcap walk.bin\n"
+    "  varnel-decode --format none --messages walk-messages.pcapng walk.bin\n"
     "  varnel-decode --dlf walk.dlf --format none VarnelSnapshot-1709301914.varnel\n";
 
 // The command line as it was typed, before the program checks whether it makes sense.
@@ -54,7 +55,12 @@ struct Wishes {
   bool isStatistics = false;
   bool isShowingIdentities = false;
   std::vector<std::string> plot;
+  std::string messagesAs;
 };
+
+// The values of --messages-as.
+constexpr const char* upperPduName = "upper-pdu";
+constexpr const char* gsmtapName = "gsmtap";
 
 std::vector<std::string> formatNames() {
   std::vector<std::string> names;
@@ -141,6 +147,12 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
   app.add_option("--framed", options.framedPath,
                  "also write the records of log type 1 as a diagnostic port sends them")
       ->type_name("FILE");
+  app.add_option("--messages", options.messagesPath,
+                 "also write the RRC and NAS messages as pcapng for a packet analyzer")
+      ->type_name("FILE");
+  app.add_option("--messages-as", wishes.messagesAs,
+                 "with --messages: the form of the packets; upper-pdu unless given")
+      ->check(CLI::IsMember({upperPduName, gsmtapName}));
 }
 
 // The options that name an output file, with the names.
@@ -154,6 +166,7 @@ std::vector<std::pair<std::string, std::string>> namedOutputs(const Options& opt
   add("--records", options.recordsPath);
   add("--pcap", options.pcapPath);
   add("--framed", options.framedPath);
+  add("--messages", options.messagesPath);
   if (!wishes.plot.empty()) add("--plot", wishes.plot.front());
   return outputs;
 }
@@ -172,6 +185,7 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
     return "--stats writes --format text or json only";
   if (const auto identity = std::ranges::find_if(wishes.plot, isIdentityPath); identity != wishes.plot.end())
     return "--plot never draws identities, and " + *identity + " is one";
+  if (!wishes.messagesAs.empty() && !options.messagesPath) return "--messages-as goes with --messages";
   if (std::ranges::any_of(options.captures, &std::string::empty)) return "the name of a capture is empty";
   const auto outputs = namedOutputs(options, wishes);
   for (const auto& [option, path] : outputs)
@@ -224,6 +238,7 @@ void fulfill(Options& options, const Wishes& wishes) {
   if (wishes.isNumbers) options.style.valuesAs = ValuesAs::Numbers;
   if (wishes.isChanges) options.style.displays = Displays::Changed;
   options.writeDisplay = writerNamed(format);
+  if (wishes.messagesAs == gsmtapName) options.messagesAs = MessageForm::Gsmtap;
   const bool isForReading = (options.output == Output::Display && (format == "text" || format == "paths")) ||
                             options.output == Output::StatisticsTable;
   options.namesEachCapture = options.captures.size() > 1 && isForReading;

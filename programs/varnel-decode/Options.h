@@ -11,6 +11,7 @@
 #include "base/Log.h"
 #include "host/captures/ByteSource.h"
 #include "programs/varnel-decode/GenerationWriters.h"
+#include "programs/varnel-decode/MessagePackets.h"
 #include "programs/varnel-decode/TreeWriters.h"
 
 namespace varnel {
@@ -45,6 +46,8 @@ struct Options {
   std::optional<std::string> recordsPath;    ///< where to write the records as a record stream
   std::optional<std::string> pcapPath;       ///< as pcap
   std::optional<std::string> framedPath;     ///< as a framed stream
+  std::optional<std::string> messagesPath;   ///< where to write the RRC and NAS messages
+  MessageForm messagesAs = MessageForm::UpperPdu;
   std::optional<PlotWish> plot;
   Identities identities = Identities::Hidden;
   /// Whose records alone are taken; absent for whichever is first, or for all, as the technology wants.

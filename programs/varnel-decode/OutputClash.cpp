@@ -42,6 +42,7 @@ std::vector<NamedFile> outputsOf(const Options& options) {
   if (options.recordsPath) add("--records", *options.recordsPath);
   if (options.pcapPath) add("--pcap", *options.pcapPath);
   if (options.framedPath) add("--framed", *options.framedPath);
+  if (options.messagesPath) add("--messages", *options.messagesPath);
   if (options.plot) add("--plot", options.plot->file);
   return outputs;
 }

@@ -2,6 +2,7 @@
 
 #include "host/captures/PcapEncoders.h"
 #include "host/captures/StreamEncoders.h"
+#include "programs/varnel-decode/MessageEncoder.h"
 #include "programs/varnel-decode/ProgramError.h"
 
 namespace varnel {
@@ -10,6 +11,7 @@ RecordOutputs::RecordOutputs(const Options& options) {
   add(options.recordsPath, std::make_unique<RecordStreamWriter>());
   add(options.pcapPath, std::make_unique<PcapWriter>());
   add(options.framedPath, std::make_unique<FramedWriter>());
+  add(options.messagesPath, std::make_unique<MessageEncoder>(options.messagesAs));
 }
 
 void RecordOutputs::add(const std::optional<std::string>& path, std::unique_ptr<CaptureEncoder> encoder) {
@@ -44,11 +46,8 @@ bool RecordOutputs::finish(const std::string& captureName) {
   for (Target& target : _targets) {
     if (target.file) check(target, target.file->finish());
     isDone &= target.file != nullptr;
-    const std::uint64_t leftOut = target.encoder->leftOut();
-    if (target.file && leftOut > 0)
-      tell(std::to_string(leftOut) + (leftOut == 1 ? " message of " : " messages of ") + captureName +
-           " did not come from a modem as log records (of log type 1), so " + target.path + " is without " +
-           (leftOut == 1 ? "it" : "them"));
+    if (!target.file) continue;
+    if (const auto remark = target.encoder->remark(captureName, target.path)) tell(*remark);
   }
   return isDone;
 }

@@ -10,8 +10,8 @@
 
 namespace varnel {
 
-/// The files that get the records of a capture as they are, each in its own form. A file that fails is
-/// reported and gets no more records; the others go on.
+/// The files that get the records of a capture as they are, or the messages in them, each in its own form. A
+/// file that fails is reported and gets no more records; the others go on.
 class RecordOutputs {
  public:
   /// The outputs that the options name.
@@ -22,7 +22,7 @@ class RecordOutputs {
   /// Opens the files. They appear when `finish` is called.
   void open();
   void write(const CaptureRecord& record);
-  /// Completes the files, and reports how many records of the capture they cannot hold. False when one of
+  /// Completes the files, and reports what of the capture they cannot hold. False when one of
   /// them has failed.
   bool finish(const std::string& captureName);
 

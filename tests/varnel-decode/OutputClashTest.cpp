@@ -32,7 +32,7 @@ class OutputClash : public DecodeProgram {
 };
 
 TEST_F(OutputClash, NoOutputTakesThePlaceOfAnInputByWhateverName) {
-  for (const char* option : {"--dlf", "--snapshot", "--records", "--pcap", "--framed"}) {
+  for (const char* option : {"--dlf", "--snapshot", "--records", "--pcap", "--framed", "--messages"}) {
     for (const char* name : {"walk.pcap", "./walk.pcap", "hard.pcap", "soft.pcap"}) {
       const Result result = run({"--technology", "kalvi-lte", option, folder.file(name), capture});
       expectRefusal(result);
