@@ -20,9 +20,9 @@ constexpr MessageChoice bcchDlSchC1 = bcchDlSchMessages;
 constexpr Alternative bcchDlSchClasses[] = {bcchDlSchC1, extensionMessage};
 constexpr MessageChoice bcchDlSch = bcchDlSchClasses;
 
-constexpr Alternative mcchLaterMessages[] = {"MBMSCountingRequest", extensionMessage};
+constexpr Alternative mcchLaterMessages[] = {"MBMSCountingRequest-r10", extensionMessage};
 constexpr MessageChoice mcchLater = mcchLaterMessages;
-constexpr Alternative mcchClasses[] = {"MBSFNAreaConfiguration", mcchLater};
+constexpr Alternative mcchClasses[] = {"MBSFNAreaConfiguration-r9", mcchLater};
 constexpr MessageChoice mcch = mcchClasses;
 
 constexpr Alternative pcchClasses[] = {"Paging", extensionMessage};
@@ -32,7 +32,8 @@ constexpr Alternative dlCcchMessages[] = {"RRCConnectionReestablishment",
                                           "RRCConnectionReestablishmentReject", "RRCConnectionReject",
                                           "RRCConnectionSetup"};
 constexpr MessageChoice dlCcchC1 = dlCcchMessages;
-constexpr Alternative dlCcchMessages2[] = {"RRCEarlyDataComplete", spareMessage, spareMessage, spareMessage};
+constexpr Alternative dlCcchMessages2[] = {"RRCEarlyDataComplete-r15", spareMessage, spareMessage,
+                                           spareMessage};
 constexpr MessageChoice dlCcchC2 = dlCcchMessages2;
 constexpr Alternative dlCcchExtensions[] = {dlCcchC2, extensionMessage};
 constexpr MessageChoice dlCcchExtension = dlCcchExtensions;
@@ -49,11 +50,11 @@ constexpr Alternative dlDcchMessages[] = {
     "SecurityModeCommand",
     "UECapabilityEnquiry",
     "CounterCheck",
-    "UEInformationRequest",
-    "LoggedMeasurementConfiguration",
-    "RNReconfiguration",
-    "RRCConnectionResume",
-    "DLDedicatedMessageSegment",
+    "UEInformationRequest-r9",
+    "LoggedMeasurementConfiguration-r10",
+    "RNReconfiguration-r10",
+    "RRCConnectionResume-r13",
+    "DLDedicatedMessageSegment-r16",
     spareMessage,
     spareMessage,
 };
@@ -63,11 +64,12 @@ constexpr MessageChoice dlDcch = dlDcchClasses;
 
 constexpr Alternative ulCcchMessages[] = {"RRCConnectionReestablishmentRequest", "RRCConnectionRequest"};
 constexpr MessageChoice ulCcchC1 = ulCcchMessages;
-constexpr Alternative ulCcchMessages3[] = {"RRCEarlyDataRequest", spareMessage, spareMessage, spareMessage};
+constexpr Alternative ulCcchMessages3[] = {"RRCEarlyDataRequest-r15", spareMessage, spareMessage,
+                                           spareMessage};
 constexpr MessageChoice ulCcchC3 = ulCcchMessages3;
 constexpr Alternative ulCcchLaterMessages[] = {ulCcchC3, extensionMessage};
 constexpr MessageChoice ulCcchLater = ulCcchLaterMessages;
-constexpr Alternative ulCcchExtensions[] = {"RRCConnectionResumeRequest", ulCcchLater};
+constexpr Alternative ulCcchExtensions[] = {"RRCConnectionResumeRequest-r13", ulCcchLater};
 constexpr MessageChoice ulCcchExtension = ulCcchExtensions;
 constexpr Alternative ulCcchClasses[] = {ulCcchC1, ulCcchExtension};
 constexpr MessageChoice ulCcch = ulCcchClasses;
@@ -84,20 +86,20 @@ constexpr Alternative ulDcchMessages[] = {
     "ULHandoverPreparationTransfer",
     "ULInformationTransfer",
     "CounterCheckResponse",
-    "UEInformationResponse",
-    "ProximityIndication",
-    "RNReconfigurationComplete",
-    "MBMSCountingResponse",
-    "InterFreqRSTDMeasurementIndication",
+    "UEInformationResponse-r9",
+    "ProximityIndication-r9",
+    "RNReconfigurationComplete-r10",
+    "MBMSCountingResponse-r10",
+    "InterFreqRSTDMeasurementIndication-r10",
 };
 constexpr MessageChoice ulDcchC1 = ulDcchMessages;
 constexpr Alternative ulDcchMessages2[] = {
-    "UEAssistanceInformation",     "InDeviceCoexIndication",    "MBMSInterestIndication",
-    "SCGFailureInformation",       "SidelinkUEInformation",     "WLANConnectionStatusReport",
-    "RRCConnectionResumeComplete", "ULInformationTransferMRDC", "SCGFailureInformationNR",
-    "MeasReportAppLayer",          "FailureInformation",        "ULDedicatedMessageSegment",
-    "PURConfigurationRequest",     "FailureInformation",        "MCGFailureInformation",
-    "ULInformationTransferIRAT",
+    "UEAssistanceInformation-r11",     "InDeviceCoexIndication-r11",    "MBMSInterestIndication-r11",
+    "SCGFailureInformation-r12",       "SidelinkUEInformation-r12",     "WLANConnectionStatusReport-r13",
+    "RRCConnectionResumeComplete-r13", "ULInformationTransferMRDC-r15", "SCGFailureInformationNR-r15",
+    "MeasReportAppLayer-r15",          "FailureInformation-r15",        "ULDedicatedMessageSegment-r16",
+    "PURConfigurationRequest-r16",     "FailureInformation-r16",        "MCGFailureInformation-r16",
+    "ULInformationTransferIRAT-r16",
 };
 constexpr MessageChoice ulDcchC2 = ulDcchMessages2;
 constexpr Alternative ulDcchExtensions[] = {ulDcchC2, extensionMessage};
@@ -118,7 +120,7 @@ constexpr Alternative dlCcchNBMessages[] = {
     "RRCConnectionReestablishmentReject",
     "RRCConnectionReject-NB",
     "RRCConnectionSetup-NB",
-    "RRCEarlyDataComplete-NB",
+    "RRCEarlyDataComplete-NB-r15",
     spareMessage,
     spareMessage,
     spareMessage,
@@ -128,10 +130,10 @@ constexpr Alternative dlCcchNBClasses[] = {dlCcchNBC1, extensionMessage};
 constexpr MessageChoice dlCcchNB = dlCcchNBClasses;
 
 constexpr Alternative dlDcchNBMessages[] = {
-    "DLInformationTransfer-NB", "RRCConnectionReconfiguration-NB",
-    "RRCConnectionRelease-NB",  "SecurityModeCommand",
-    "UECapabilityEnquiry-NB",   "RRCConnectionResume-NB",
-    "UEInformationRequest-NB",  spareMessage,
+    "DLInformationTransfer-NB",    "RRCConnectionReconfiguration-NB",
+    "RRCConnectionRelease-NB",     "SecurityModeCommand",
+    "UECapabilityEnquiry-NB",      "RRCConnectionResume-NB",
+    "UEInformationRequest-NB-r16", spareMessage,
 };
 constexpr MessageChoice dlDcchNBC1 = dlDcchNBMessages;
 constexpr Alternative dlDcchNBClasses[] = {dlDcchNBC1, extensionMessage};
@@ -139,7 +141,7 @@ constexpr MessageChoice dlDcchNB = dlDcchNBClasses;
 
 constexpr Alternative ulCcchNBMessages[] = {"RRCConnectionReestablishmentRequest-NB",
                                             "RRCConnectionRequest-NB", "RRCConnectionResumeRequest-NB",
-                                            "RRCEarlyDataRequest-NB"};
+                                            "RRCEarlyDataRequest-NB-r15"};
 constexpr MessageChoice ulCcchNBC1 = ulCcchNBMessages;
 constexpr Alternative ulCcchNBClasses[] = {ulCcchNBC1, extensionMessage};
 constexpr MessageChoice ulCcchNB = ulCcchNBClasses;
@@ -153,8 +155,8 @@ constexpr Alternative ulDcchNBMessages[] = {
     "UECapabilityInformation-NB",
     "ULInformationTransfer-NB",
     "RRCConnectionResumeComplete-NB",
-    "UEInformationResponse-NB",
-    "PURConfigurationRequest-NB",
+    "UEInformationResponse-NB-r16",
+    "PURConfigurationRequest-NB-r16",
     spareMessage,
     spareMessage,
     spareMessage,

@@ -12,7 +12,8 @@ namespace {
 using Direction = AirMessage::Direction;
 using Alternative = MessageChoice::Alternative;
 
-// TS 38.331 6.2.1. The names are those of the message types without the release in which a type came.
+// TS 38.331 6.2.1. The names are those of the message types, some of which end in the release that
+// brought them.
 
 constexpr Alternative bcchBchClasses[] = {"MIB", extensionMessage};
 constexpr MessageChoice bcchBch = bcchBchClasses;
@@ -37,10 +38,10 @@ constexpr Alternative dlDcchMessages[] = {
     "UECapabilityEnquiry",
     "CounterCheck",
     "MobilityFromNRCommand",
-    "DLDedicatedMessageSegment",
-    "UEInformationRequest",
-    "DLInformationTransferMRDC",
-    "LoggedMeasurementConfiguration",
+    "DLDedicatedMessageSegment-r16",
+    "UEInformationRequest-r16",
+    "DLInformationTransferMRDC-r16",
+    "LoggedMeasurementConfiguration-r16",
     spareMessage,
     spareMessage,
     spareMessage,
@@ -49,7 +50,7 @@ constexpr MessageChoice dlDcchC1 = dlDcchMessages;
 constexpr Alternative dlDcchClasses[] = {dlDcchC1, extensionMessage};
 constexpr MessageChoice dlDcch = dlDcchClasses;
 
-constexpr Alternative mcchMessages[] = {"MBSBroadcastConfiguration", spareMessage};
+constexpr Alternative mcchMessages[] = {"MBSBroadcastConfiguration-r17", spareMessage};
 constexpr MessageChoice mcchC1 = mcchMessages;
 constexpr Alternative mcchClasses[] = {mcchC1, extensionMessage};
 constexpr MessageChoice mcch = mcchClasses;
@@ -80,16 +81,16 @@ constexpr Alternative ulDcchMessages[] = {
 };
 constexpr MessageChoice ulDcchC1 = ulDcchMessages;
 constexpr Alternative ulDcchMessages2[] = {
-    "ULDedicatedMessageSegment",
-    "DedicatedSIBRequest",
-    "MCGFailureInformation",
-    "UEInformationResponse",
-    "SidelinkUEInformationNR",
-    "ULInformationTransferIRAT",
-    "IABOtherInformation",
-    "MBSInterestIndication",
-    "UEPositioningAssistanceInfo",
-    "MeasurementReportAppLayer",
+    "ULDedicatedMessageSegment-r16",
+    "DedicatedSIBRequest-r16",
+    "MCGFailureInformation-r16",
+    "UEInformationResponse-r16",
+    "SidelinkUEInformationNR-r16",
+    "ULInformationTransferIRAT-r16",
+    "IABOtherInformation-r16",
+    "MBSInterestIndication-r17",
+    "UEPositioningAssistanceInfo-r17",
+    "MeasurementReportAppLayer-r17",
     spareMessage,
     spareMessage,
     spareMessage,

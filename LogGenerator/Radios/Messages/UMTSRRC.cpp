@@ -50,6 +50,26 @@ constexpr Alternative dlDcchMessages[] = {
 };
 constexpr MessageChoice dlDcch = dlDcchMessages;
 
+constexpr Alternative ulDcchLaterMessages[] = {
+    "UEInformationResponse",
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+    spareMessage,
+};
+constexpr MessageChoice ulDcchLater = ulDcchLaterMessages;
+
 constexpr Alternative ulDcchMessages[] = {
     "ActiveSetUpdateComplete",
     "ActiveSetUpdateFailure",
@@ -82,18 +102,26 @@ constexpr Alternative ulDcchMessages[] = {
     "UTRANMobilityInformationConfirm",
     "UTRANMobilityInformationFailure",
     "MBMSModificationRequest",
-    extensionMessage,
+    ulDcchLater,
 };
 constexpr MessageChoice ulDcch = ulDcchMessages;
 
 constexpr Alternative dlCcchMessages[] = {
-    "CellUpdateConfirm", "RRCConnectionReject", "RRCConnectionRelease", "RRCConnectionSetup",
-    "URAUpdateConfirm",  spareMessage,          spareMessage,           spareMessage,
+    "CellUpdateConfirm-CCCH",
+    "RRCConnectionReject",
+    "RRCConnectionRelease-CCCH",
+    "RRCConnectionSetup",
+    "URAUpdateConfirm-CCCH",
+    "ETWSPrimaryNotificationWithSecurity",
+    spareMessage,
+    spareMessage,
 };
 constexpr MessageChoice dlCcch = dlCcchMessages;
 
+constexpr Alternative ulCcchLaterMessages[] = {"CellUpdateFDD-r11", spareMessage, spareMessage, spareMessage};
+constexpr MessageChoice ulCcchLater = ulCcchLaterMessages;
 constexpr Alternative ulCcchMessages[] = {"CellUpdate", "RRCConnectionRequest", "URAUpdate",
-                                          extensionMessage};
+                                          ulCcchLater};
 constexpr MessageChoice ulCcch = ulCcchMessages;
 
 constexpr Alternative pcchMessages[] = {"PagingType1", spareMessage};
