@@ -2,11 +2,9 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
-#include <initializer_list>
 #include <string>
 
-#include "tests/support/PacketBuilder.h"
+#include "tests/support/AirMessages.h"
 
 namespace varnel {
 
@@ -17,61 +15,13 @@ using Protocol = AirMessage::Protocol;
 using Radio = AirMessage::Radio;
 using enum MessageFate::Outcome;
 
-Bytes packetOf(std::uint32_t logCode, std::initializer_list<unsigned> header, ByteView message) {
-  Bytes packet = PacketBuilder(logCode, Packet::headerSize + header.size() + message.size()).bytes();
-  auto next = std::ranges::transform(header, packet.begin() + Packet::headerSize, [](unsigned byte) {
-                return static_cast<std::uint8_t>(byte);
-              }).out;
-  std::ranges::copy(message, next);
-  return packet;
-}
-
-// Version 26: cell 411, channel 66536, the frame word, and a message on the channel with this number.
-Bytes lteRRC(unsigned channel, const Bytes& message, unsigned frameWord = 0) {
-  const auto length = static_cast<unsigned>(message.size());
-  return packetOf(0xB0C0,
-                  {26,
-                   15,
-                   0x10,
-                   15,
-                   2,
-                   0,
-                   0x9B,
-                   0x01,
-                   0xE8,
-                   0x03,
-                   0x01,
-                   0x00,
-                   frameWord & 0xFF,
-                   frameWord >> 8,
-                   channel,
-                   0,
-                   0,
-                   0,
-                   0,
-                   length & 0xFF,
-                   length >> 8},
-                  message);
-}
-
-// Version 30 of a packet with a part of a message on DL-DCCH.
-Bytes ltePart(unsigned segment, const Bytes& part, unsigned channel = 9) {
-  const auto length = static_cast<unsigned>(part.size());
-  return packetOf(0xB0C0, {30,          16, 0, 16,     0,       0, 1, 0, 0x64, 0,
-                           0,           0,  0, 0,      channel, 0, 0, 0, 0,    length & 0xFF,
-                           length >> 8, 0,  0, segment},
-                  part);
-}
-
-Bytes lteNAS(std::uint32_t logCode, const Bytes& message) { return packetOf(logCode, {1, 9, 5, 0}, message); }
-
 AirMessageReading readAlone(const Bytes& packet, std::uint32_t logCode) {
   AirMessageReader reader;
   return reader.read(Packet(packet), logCode);
 }
 
 std::string nameOfNAS(const Bytes& message) {
-  const Bytes packet = lteNAS(0xB0EC, message);
+  const Bytes packet = lteNASPacket(0xB0EC, message);
   const auto reading = readAlone(packet, 0xB0EC);
   return reading.message ? std::string(reading.message->name) : "none";
 }
@@ -80,7 +30,7 @@ std::string nameOfNAS(const Bytes& message) {
 
 TEST(AirMessageReader, AnRRCMessageOfLTEHasItsCellAndFrame) {
   // Frame 0x2AB = 683, subframe 5, and the two bits above the frame.
-  const Bytes packet = lteRRC(9, {0x20, 0x01, 0x02}, 0xC000 | 683U << 4 | 5U);
+  const Bytes packet = lteRRCPacket(9, {0x20, 0x01, 0x02}, 0xC000 | 683U << 4 | 5U);
   const auto reading = readAlone(packet, 0xB0C0);
   EXPECT_EQ(reading.fate, (MessageFate{Decoded, 0xB0C0}));
   EXPECT_EQ(reading.version, PacketVersion{26});
@@ -99,7 +49,7 @@ TEST(AirMessageReader, AnRRCMessageOfLTEHasItsCellAndFrame) {
 }
 
 TEST(AirMessageReader, AFrameWordOf0IsNoFrame) {
-  const Bytes packet = lteRRC(11, {0x20});
+  const Bytes packet = lteRRCPacket(11, {0x20});
   const auto reading = readAlone(packet, 0xB0C0);
   ASSERT_TRUE(reading.message);
   EXPECT_FALSE(reading.message->frame);
@@ -108,7 +58,7 @@ TEST(AirMessageReader, AFrameWordOf0IsNoFrame) {
 }
 
 TEST(AirMessageReader, ALengthThatDisagreesIsABrokenPacket) {
-  Bytes packet = lteRRC(9, {0x20, 0x01});
+  Bytes packet = lteRRCPacket(9, {0x20, 0x01});
   for (const unsigned length : {0U, 1U, 3U, 0x102U}) {
     packet.at(32) = static_cast<std::uint8_t>(length);
     packet.at(33) = static_cast<std::uint8_t>(length >> 8);
@@ -118,7 +68,7 @@ TEST(AirMessageReader, ALengthThatDisagreesIsABrokenPacket) {
 }
 
 TEST(AirMessageReader, EveryTruncationIsABrokenPacket) {
-  const Bytes packet = lteRRC(9, {0x20, 0x01});
+  const Bytes packet = lteRRCPacket(9, {0x20, 0x01});
   for (std::size_t size = 0; size < packet.size(); ++size) {
     const auto reading = readAlone(Bytes(packet.data(), packet.data() + size), 0xB0C0);
     EXPECT_EQ(reading.fate.outcome, TooShort) << size;
@@ -128,7 +78,7 @@ TEST(AirMessageReader, EveryTruncationIsABrokenPacket) {
 
 TEST(AirMessageReader, AVersionThatIsNotListedIsNotKnown) {
   for (const unsigned version : {0U, 1U, 28U, 32U, 255U}) {
-    Bytes packet = lteRRC(9, {0x20});
+    Bytes packet = lteRRCPacket(9, {0x20});
     packet.at(13) = static_cast<std::uint8_t>(version);
     EXPECT_EQ(readAlone(packet, 0xB0C0).fate, (MessageFate{UnknownVersion, 0xB0C0, PacketVersion{version}}));
   }
@@ -136,7 +86,8 @@ TEST(AirMessageReader, AVersionThatIsNotListedIsNotKnown) {
 
 TEST(AirMessageReader, PartsAreJoinedInTheirOrder) {
   AirMessageReader reader;
-  const Bytes first = ltePart(1, {0x20, 0x01}), second = ltePart(2, {0x02}), last = ltePart(7, {0x03, 0x04});
+  const Bytes first = lteRRCPart(1, {0x20, 0x01}), second = lteRRCPart(2, {0x02}),
+              last = lteRRCPart(7, {0x03, 0x04});
   EXPECT_FALSE(reader.read(Packet(first), 0xB0C0).message);
   const auto middle = reader.read(Packet(second), 0xB0C0);
   EXPECT_FALSE(middle.message);
@@ -151,7 +102,7 @@ TEST(AirMessageReader, PartsAreJoinedInTheirOrder) {
 
 TEST(AirMessageReader, PartsOutOfOrderAreDropped) {
   AirMessageReader reader;
-  const Bytes first = ltePart(1, {0x20}), third = ltePart(3, {0x02}), last = ltePart(7, {0x03});
+  const Bytes first = lteRRCPart(1, {0x20}), third = lteRRCPart(3, {0x02}), last = lteRRCPart(7, {0x03});
   reader.read(Packet(first), 0xB0C0);
   reader.read(Packet(third), 0xB0C0);
   EXPECT_FALSE(reader.read(Packet(last), 0xB0C0).message);
@@ -159,15 +110,15 @@ TEST(AirMessageReader, PartsOutOfOrderAreDropped) {
 
 TEST(AirMessageReader, PartsOfAnotherChannelDoNotBelongToAMessage) {
   AirMessageReader reader;
-  const Bytes first = ltePart(1, {0x20}), other = ltePart(7, {0x02}, 11);
+  const Bytes first = lteRRCPart(1, {0x20}), other = lteRRCPart(7, {0x02}, 11);
   reader.read(Packet(first), 0xB0C0);
   EXPECT_FALSE(reader.read(Packet(other), 0xB0C0).message);
 }
 
 TEST(AirMessageReader, AMessageOfMoreThan64KiBIsDropped) {
   AirMessageReader reader;
-  const Bytes first = ltePart(1, Bytes(40000, 0x20)), last = ltePart(7, Bytes(25537, 0x20)),
-              fitting = ltePart(7, Bytes(25536, 0x20));
+  const Bytes first = lteRRCPart(1, Bytes(40000, 0x20)), last = lteRRCPart(7, Bytes(25537, 0x20)),
+              fitting = lteRRCPart(7, Bytes(25536, 0x20));
   reader.read(Packet(first), 0xB0C0);
   EXPECT_FALSE(reader.read(Packet(last), 0xB0C0).message);
   reader.read(Packet(first), 0xB0C0);
@@ -190,13 +141,163 @@ TEST(AirMessageReader, ANASMessageOfLTEIsNamedByItsType) {
 }
 
 TEST(AirMessageReader, TheCodeOfANASMessageTellsItsDirection) {
-  EXPECT_EQ(readAlone(lteNAS(0xB0E3, {0x02, 1, 0xD0}), 0xB0E3).message->direction, Direction::Uplink);
-  EXPECT_EQ(readAlone(lteNAS(0xB0E2, {0x02, 1, 0xD1}), 0xB0E2).message->direction, Direction::Downlink);
+  EXPECT_EQ(readAlone(lteNASPacket(0xB0E3, {0x02, 1, 0xD0}), 0xB0E3).message->direction, Direction::Uplink);
+  EXPECT_EQ(readAlone(lteNASPacket(0xB0E2, {0x02, 1, 0xD1}), 0xB0E2).message->direction, Direction::Downlink);
 }
 
 TEST(AirMessageReader, AnotherVersionOfANASPacketIsNotKnown) {
-  const Bytes packet = packetOf(0xB0EC, {2, 9, 5, 0}, Bytes{0x07, 0x41});
+  const Bytes packet = packetOfMessage(0xB0EC, {2, 9, 5, 0}, Bytes{0x07, 0x41});
   EXPECT_EQ(readAlone(packet, 0xB0EC).fate, (MessageFate{UnknownVersion, 0xB0EC, PacketVersion{2}}));
+}
+
+TEST(AirMessageReader, TheNumbersOfANarrowbandCellAreRead) {
+  // Version 5: a channel number of 16 bits, and the length at 15.
+  const Bytes packet = packetOfMessage(
+      0xB0C0, {5, 13, 0, 1, 0x2C, 0x01, 0x34, 0x12, 0x15, 0x00, 8, 0, 0, 0, 0, 2, 0}, Bytes{0x20, 0x00});
+  const auto reading = readAlone(packet, 0xB0C0);
+  ASSERT_TRUE(reading.message);
+  EXPECT_EQ(reading.message->physicalCell, 300);
+  EXPECT_EQ(reading.message->channelNumber, 4660U);
+  EXPECT_EQ(reading.message->frame, 1);
+  EXPECT_EQ(reading.message->subframe, 5);
+  EXPECT_EQ(reading.message->name, "RRCConnectionSetupComplete");
+}
+
+TEST(AirMessageReader, AChannelThatIsNotKnownHasAnUnknownMessage) {
+  const Bytes packet = lteRRCPacket(200, {0x20});
+  const auto reading = readAlone(packet, 0xB0C0);
+  ASSERT_TRUE(reading.message);
+  EXPECT_EQ(reading.message->channel, "");
+  EXPECT_EQ(reading.message->name, "Unknown");
+  EXPECT_EQ(reading.message->direction, Direction::Unknown);
+}
+
+TEST(AirMessageReader, AnRRCMessageOfNRHasItsCellAndFrame) {
+  // Version 8: cell 700, channel 504990 (0x7B49E), frame 683 in bits 16 to 25, subframe 5 in bits 3 to 6.
+  const Bytes packet = packetOfMessage(
+      0xB821,
+      {8, 0, 0, 0, 15, 0x60, 1, 0xBC, 0x02, 0x9E, 0xB4, 0x07, 0x00, 0x28, 0, 0xAB, 0x02, 8, 0, 0, 0, 0, 2, 0},
+      Bytes{0x00, 0x01});
+  const auto reading = readAlone(packet, 0xB821);
+  ASSERT_TRUE(reading.message);
+  EXPECT_EQ(reading.version, PacketVersion{8});
+  EXPECT_EQ(reading.message->radio, Radio::NR);
+  EXPECT_EQ(reading.message->physicalCell, 700);
+  EXPECT_EQ(reading.message->channelNumber, 504990U);
+  EXPECT_EQ(reading.message->frame, 683);
+  EXPECT_EQ(reading.message->subframe, 5);
+  EXPECT_EQ(reading.message->channel, "UL-DCCH");
+  EXPECT_EQ(reading.message->direction, Direction::Uplink);
+  EXPECT_EQ(reading.message->name, "MeasurementReport");
+}
+
+TEST(AirMessageReader, BeforeAnNRCellIsAddedTheMessageHasNone) {
+  const Bytes packet = packetOfMessage(
+      0xB821, {8, 0, 0, 0, 15, 0x60, 1, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 9, 0, 0, 0, 0, 1, 0}, Bytes{0x00});
+  const auto reading = readAlone(packet, 0xB821);
+  ASSERT_TRUE(reading.message);
+  EXPECT_FALSE(reading.message->physicalCell);
+  EXPECT_FALSE(reading.message->channelNumber);
+  EXPECT_EQ(reading.message->channel, "");
+  EXPECT_EQ(reading.message->name, "RRCReconfiguration");
+  EXPECT_EQ(reading.message->direction, Direction::Downlink);
+}
+
+TEST(AirMessageReader, APacketOfUMTSMayNameItsCell) {
+  // UL-CCCH of UARFCN 10638 (0x298E) and scrambling code 291.
+  const Bytes packet = packetOfMessage(0x412F, {0x80, 1, 2, 0, 0x8E, 0x29, 0x23, 0x01}, Bytes{0x20, 0x00});
+  const auto reading = readAlone(packet, 0x412F);
+  ASSERT_TRUE(reading.message);
+  EXPECT_EQ(reading.message->radio, Radio::UMTS);
+  EXPECT_EQ(reading.message->channel, "UL-CCCH");
+  EXPECT_EQ(reading.message->name, "RRCConnectionRequest");
+  EXPECT_EQ(reading.message->channelNumber, 10638U);
+  EXPECT_EQ(reading.message->physicalCell, 291);
+  EXPECT_EQ(reading.message->bytes.size(), 2U);
+}
+
+TEST(AirMessageReader, ASystemInformationBlockOfUMTSIsATypeByItself) {
+  const Bytes alone = packetOfMessage(0x412F, {9, 0, 2, 0, 5}, Bytes{0x42});
+  const auto reading = readAlone(alone, 0x412F);
+  ASSERT_TRUE(reading.message);
+  EXPECT_EQ(reading.message->channel, "");
+  EXPECT_EQ(reading.message->name, "SysInfoType5");
+  EXPECT_EQ(reading.message->bytes.size(), 1U);
+  const Bytes ofCell = packetOfMessage(0x412F, {0x89, 0, 1, 0, 0x8E, 0x29, 0x23, 0x01, 31}, Bytes{0x42});
+  const auto other = readAlone(ofCell, 0x412F);
+  ASSERT_TRUE(other.message);
+  EXPECT_EQ(other.message->name, "SysInfoType19");
+  EXPECT_EQ(other.message->physicalCell, 291);
+}
+
+TEST(AirMessageReader, ARRMessageOfTheBCCHBeginsWithItsPseudoLength) {
+  const Bytes packet = packetOfMessage(0x512F, {0x81, 0x1B, 4}, Bytes{0x49, 0x06, 0x1B, 0x00});
+  const auto reading = readAlone(packet, 0x512F);
+  ASSERT_TRUE(reading.message);
+  EXPECT_EQ(reading.message->radio, Radio::GSM);
+  EXPECT_EQ(reading.message->protocol, Protocol::RR);
+  EXPECT_EQ(reading.message->direction, Direction::Downlink);
+  EXPECT_EQ(reading.message->channel, "BCCH");
+  EXPECT_EQ(reading.message->name, "System Information Type 3");
+  EXPECT_EQ(reading.message->bytes.size(), 4U);
+  EXPECT_EQ(reading.message->layer2Octets, 1);
+  const Bytes dedicated = gsmRRPacket(0x0D);
+  const auto release = readAlone(dedicated, 0x512F);
+  ASSERT_TRUE(release.message);
+  EXPECT_EQ(release.message->name, "Channel Release");
+  EXPECT_EQ(release.message->layer2Octets, 0);
+}
+
+TEST(AirMessageReader, SystemInformationOnTheSACCHHasAPseudoLengthAndReportsHaveNone) {
+  const Bytes information = packetOfMessage(0x512F, {0x84, 0x1D, 3}, Bytes{0x49, 0x06, 0x1D});
+  EXPECT_EQ(readAlone(information, 0x512F).message->layer2Octets, 1);
+  const Bytes report = packetOfMessage(0x512F, {0x04, 0x15, 3}, Bytes{0x06, 0x15, 0x00});
+  EXPECT_EQ(readAlone(report, 0x512F).message->layer2Octets, 0);
+}
+
+TEST(AirMessageReader, PacketsWithASubscriptionHaveItInFront) {
+  const Bytes rr = packetOfMessage(0x5B2F, {1, 0x80, 0x0D, 2}, Bytes{0x06, 0x0D});
+  EXPECT_EQ(readAlone(rr, 0x5B2F).message->name, "Channel Release");
+  const Bytes nas = packetOfMessage(0x7B3A, {1, 1, 2, 0, 0, 0}, Bytes{0x05, 0x08});
+  const auto reading = readAlone(nas, 0x7B3A);
+  EXPECT_EQ(reading.message->name, "Location Updating Request");
+  EXPECT_EQ(reading.message->direction, Direction::Uplink);
+}
+
+TEST(AirMessageReader, ANASMessageIsOfTheRadioThatSpokeLast) {
+  AirMessageReader reader;
+  const Bytes nas = packetOfMessage(0x713A, {0, 2, 0, 0, 0}, Bytes{0x05, 0x02});
+  EXPECT_EQ(reader.read(Packet(nas), 0x713A).message->radio, Radio::GSM);
+  const Bytes umts = packetOfMessage(0x412F, {6, 1, 1, 0}, Bytes{0x00});
+  reader.read(Packet(umts), 0x412F);
+  EXPECT_EQ(reader.read(Packet(nas), 0x713A).message->radio, Radio::UMTS);
+  const Bytes gsm = gsmRRPacket(0x0D);
+  reader.read(Packet(gsm), 0x512F);
+  EXPECT_EQ(reader.read(Packet(nas), 0x713A).message->radio, Radio::GSM);
+}
+
+TEST(AirMessageReader, LongMessagesOfNRComeInPartsToo) {
+  AirMessageReader reader;
+  const auto part = [](unsigned segment, const Bytes& bytes) {
+    const auto length = static_cast<unsigned>(bytes.size());
+    return packetOfMessage(0xB821, {26, 0, 0, 0, 16, 0, 1, 5, 0, 0, 0, 0,      0, 0, 0, 0, 0,      100,
+                                    0,  0, 0, 0, 0,  0, 4, 0, 0, 0, 0, length, 0, 0, 0, 0, segment},
+                           bytes);
+  };
+  const Bytes first = part(1, {0x10}), last = part(7, {0x22, 0x33});
+  EXPECT_FALSE(reader.read(Packet(first), 0xB821).message);
+  const auto whole = reader.read(Packet(last), 0xB821);
+  ASSERT_TRUE(whole.message);
+  EXPECT_EQ(whole.message->name, "RRCRelease");
+  EXPECT_EQ(whole.message->bytes.size(), 3U);
+  EXPECT_FALSE(whole.message->frame);
+}
+
+TEST(AirMessageReader, EachCodeOfTheListIsRead) {
+  for (const std::uint32_t code : airMessageLogCodes()) {
+    const Bytes empty = PacketBuilder(code, Packet::headerSize).bytes();
+    EXPECT_EQ(AirMessageReader::fateOf(Packet(empty), code), (MessageFate{TooShort, code})) << code;
+  }
 }
 
 }  // namespace varnel

@@ -1,0 +1,66 @@
+#include "LogGenerator/Radios/MessageCounts.h"
+
+#include <array>
+#include <charconv>
+#include <cstdint>
+#include <string>
+
+#include "LogGenerator/SortedKey.h"
+
+namespace varnel {
+
+namespace {
+
+// Of a text that is no number, 0.
+std::uint64_t numberIn(const Value& value) {
+  std::uint64_t number = 0;
+  if (const std::string* text = value.string())
+    std::from_chars(text->data(), text->data() + text->size(), number);
+  return number;
+}
+
+std::string keyOf(const AirMessage& message) {
+  std::string key(nameOf(message.radio));
+  for (const std::string_view part : {nameOf(message.protocol), message.name}) key.append(" ").append(part);
+  return key;
+}
+
+}  // namespace
+
+void MessageCounts::take(const AirMessageReading& reading) {
+  Dictionary* const entries = sectionRef.container().dictionary();
+  if (!reading.message || !entries) return;
+  const AirMessage& message = *reading.message;
+  const Kind kind{message.radio, message.protocol, message.name.data()};
+  auto found = _counts.find(kind);
+  if (found == _counts.end()) found = _counts.emplace(kind, Count{BoundEntry(keyOf(message))}).first;
+  Count& count = found->second;
+  const auto names = [&] {
+    return entries->size() - (entries->has(_others.entry.key()) ? 1 : 0) - (entries->has(sortMark) ? 1 : 0);
+  };
+  const bool hasRoom = !count.entry.get(*entries).isAbsent() || names() < greatestCount;
+  increase(hasRoom ? count : _others, *entries);
+}
+
+void MessageCounts::increase(Count& count, Dictionary& entries) {
+  std::array<char, 20> room;
+  const std::uint64_t number = numberIn(count.entry.get(entries)) + 1;
+  const auto end = std::to_chars(room.data(), room.data() + room.size(), number).ptr;
+  count.entry.setText(entries, std::string_view(room.data(), end));
+  count.isWritten = true;
+}
+
+void MessageCounts::prepareDisplay(const Time& /*now*/) {
+  const Dictionary* const entries = sectionRef.container().dictionary();
+  if (!entries) return;
+  const auto note = [&](Count& count) {
+    if (!count.isWritten) return;
+    count.isWritten = false;
+    if (const std::string* text = count.entry.get(*entries).string())
+      sectionRef.setText(count.entry.key(), std::string(*text));
+  };
+  for (auto& [kind, count] : _counts) note(count);
+  note(_others);
+}
+
+}  // namespace varnel
