@@ -1,0 +1,38 @@
+#include "LogGenerator/Radios/LTE/Connection.h"
+
+#include <charconv>
+#include <string>
+
+namespace varnel::lte {
+
+namespace {
+
+constexpr std::string_view stateEntry = "RRC State", countEntry = "RRC Connections";
+
+// Whether the name is the message's, also in the variant of NB-IoT and of the release that brought it.
+bool is(std::string_view name, std::string_view message) {
+  return name.starts_with(message) && (name.size() == message.size() || name[message.size()] == '-');
+}
+
+std::uint32_t numberIn(const Value& value) {
+  std::uint32_t number = 0;
+  if (const std::string* text = value.string())
+    std::from_chars(text->data(), text->data() + text->size(), number);
+  return number;
+}
+
+}  // namespace
+
+void Connection::take(const AirMessageReading& reading) {
+  const Dictionary* const entries = sectionRef.container().dictionary();
+  if (!reading.message || !entries) return;
+  const auto& [name, channel] = std::pair(reading.message->name, reading.message->channel);
+  if (is(name, "RRCConnectionRelease") || is(name, "RRCConnectionReject"))
+    return sectionRef.setText(stateEntry, "Idle");
+  if (!is(channel, "DL-DCCH") && !is(channel, "UL-DCCH")) return;
+  sectionRef.setText(stateEntry, "Connected");
+  if (is(name, "RRCConnectionSetupComplete") || is(name, "RRCConnectionResumeComplete"))
+    sectionRef.setText(countEntry, std::to_string(numberIn(entries->get(countEntry)) + 1));
+}
+
+}  // namespace varnel::lte
