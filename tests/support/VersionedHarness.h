@@ -211,6 +211,22 @@ class DecoderAlone {
   std::string everything() const { return described(_section); }
   Decoder& decoder() { return _decoder; }
   const Value& section() const { return _section; }
+  /// A new decoder takes over the section, as after a reconnection, and decodes the packet.
+  void decodeByAnother(std::uint32_t logCode, ByteView payload, Time time = versionedTestTime) {
+    Decoder another;
+    another.section().setTime(time);
+    another.updateSectionRef(_section);
+    const Bytes packet = packetOf(logCode, payload);
+    another.updateWithData_logCode(Packet(packet), logCode);
+  }
+  /// What is decoded without a section is lost.
+  static void decodeWithoutSection(std::uint32_t logCode, ByteView payload) {
+    Decoder unbound;
+    unbound.section().setTime(versionedTestTime);
+    const Bytes packet = packetOf(logCode, payload);
+    unbound.updateWithData_logCode(Packet(packet), logCode);
+    unbound.prepareDisplay(versionedTestTime);
+  }
 
  private:
   Decoder _decoder;
@@ -331,6 +347,7 @@ class LayoutRules {
     SCOPED_TRACE(layout.name());
     auto decoder = _make();
     decoder.decode(layout.logCode, layout.payload());
+    decoder.decodeWithoutSection(layout.logCode, layout.payload());
     EXPECT_EQ(decoder.version(), layout.version.text());
     EXPECT_EQ(decoder.fateOf(layout.logCode, layout.payload()),
               (MessageFate{MessageFate::Outcome::Decoded, layout.logCode}));

@@ -229,5 +229,16 @@ TEST(LTEBearersLayouts, ABearerThatComesBackHasNothingOfItsFormerSelf) {
             "");
 }
 
+TEST(LTEBearersLayouts, BearersOfASectionThatIsBoundAgainStay) {
+  auto decoder = newDecoder();
+  decoder.decode(informationCode, informationOf(5, 2));
+  decoder.decode(informationCode, informationOf(7, 2));
+  decoder.decodeByAnother(stateCode, stateOf(6, 1));
+  EXPECT_EQ(bearersOf(decoder), (std::vector<std::string>{"5", "6", "7"}));
+  EXPECT_EQ(decoder.text(first + "QCI"), "9");
+  decoder.decodeByAnother(stateCode, stateOf(5, 0));
+  EXPECT_EQ(bearersOf(decoder), (std::vector<std::string>{"6", "7"}));
+}
+
 }  // namespace
 }  // namespace varnel::lte

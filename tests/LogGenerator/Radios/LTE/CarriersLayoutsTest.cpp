@@ -202,5 +202,27 @@ TEST(LTECarriersLayouts, AnImplausibleCellOrChannelShowsNothing) {
   }
 }
 
+TEST(LTECarriersLayouts, TheFirstCellOfVersion60IsThePrimaryOne) {
+  const MeasurementDescription layout = measurementDescription(60);
+  auto decoder = newDecoder();
+  decoder.decode(measurementCode,
+                 packetOfSubpackets({measurementSubpacket(layout, {{13, 0, 0}, {14, 0, 0}}, 2)}));
+  EXPECT_EQ(decoder.text("Cells/0/Carrier"), "Primary");
+  EXPECT_EQ(decoder.text("Cells/0/Physical Cell ID"), "13");
+  EXPECT_EQ(decoder.text("Cells/1/Carrier"), "");
+}
+
+TEST(LTECarriersLayouts, CarriersOfASectionThatIsBoundAgainStay) {
+  const MeasurementDescription layout = measurementDescription(36);
+  auto decoder = newDecoder();
+  decoder.decode(measurementCode,
+                 packetOfSubpackets({measurementSubpacket(layout, {{13, 0, 1}, {14, 1, 1}}, 2)}));
+  decoder.decodeByAnother(measurementCode,
+                          packetOfSubpackets({measurementSubpacket(layout, {{15, 1, 1}}, 1)}));
+  EXPECT_EQ(decoder.text("Cells/0/Physical Cell ID"), "13");
+  EXPECT_EQ(decoder.text("Cells/1/Physical Cell ID"), "15");
+  EXPECT_EQ(decoder.text("Cells/2/Physical Cell ID"), "");
+}
+
 }  // namespace
 }  // namespace varnel::lte

@@ -412,5 +412,33 @@ TEST(LTEMeasurementsLayouts, EvaluationInLiterals) {
             "");
 }
 
+TEST(LTEMeasurementsLayouts, ADecoderThatTakesTheSectionOverKnowsItsCell) {
+  auto decoder = newDecoder();
+  decoder.decode(measurementCode, connectedLayout(measurementDescription(36)).payload());
+  const std::string before = decoder.text("RSRP Rx3");
+  decoder.decodeByAnother(evaluation, idleLayout(5).payload());
+  EXPECT_EQ(decoder.text("RSRP Rx3"), before);
+  Bytes payload = idleLayout(5).payload();
+  put(payload, {8, 0, 9}, 302);
+  decoder.decodeByAnother(evaluation, payload);
+  for (const char* row : antennaRows) EXPECT_EQ(decoder.text(row), "") << row;
+}
+
+TEST(LTEMeasurementsLayouts, TheVersionIsThatOfTheLastSubpacket) {
+  const Bytes known = subpacketOf(connectedLayout(measurementDescription(36)).payload());
+  Bytes unknown = known;
+  unknown[1] = 99;
+  auto decoder = newDecoder();
+  const Bytes unknownLast = packetOfSubpackets({known, unknown});
+  decoder.decode(measurementCode, unknownLast);
+  EXPECT_EQ(decoder.version(), "25.99 (not known)");
+  EXPECT_EQ(decoder.text("Physical Cell ID"), "301");
+  EXPECT_EQ(decoder.fateOf(measurementCode, unknownLast).outcome, MessageFate::Outcome::Decoded);
+  const Bytes knownLast = packetOfSubpackets({unknown, known});
+  decoder.decode(measurementCode, knownLast);
+  EXPECT_EQ(decoder.version(), "25.36");
+  EXPECT_EQ(decoder.fateOf(measurementCode, knownLast).outcome, MessageFate::Outcome::Decoded);
+}
+
 }  // namespace
 }  // namespace varnel::lte

@@ -319,5 +319,28 @@ TEST(LTEServingCellLayouts, CellMonitorShowsItsServingCell) {
   EXPECT_EQ(rows.at("Cell"), "231");
 }
 
+TEST(LTEServingCellLayouts, CellMonitorShowsAPLMNOfBothNumbersOnly) {
+  const auto shown = [](std::initializer_list<Dictionary::Entry> entries) {
+    auto decoder = newDecoder();
+    decoder.decodePacket(
+        0xFF0001, cellMonitorMessage({cellRecord("LTE", "Neighbor", {number("MCC", 1), number("MNC", 1)}),
+                                      cellRecord("LTE", "Serving", entries)}));
+    return decoder.text("PLMN");
+  };
+  EXPECT_EQ(shown({number("MCC", 1), number("MNC", 99)}), "001-99");
+  EXPECT_EQ(shown({number("MCC", 310), number("MNC", 100)}), "310-100");
+  EXPECT_EQ(shown({number("MCC", 310)}), "");
+  EXPECT_EQ(shown({number("MNC", 10)}), "");
+}
+
+TEST(LTEServingCellLayouts, ADecoderThatTakesTheSectionOverKnowsItsCell) {
+  auto decoder = newDecoder();
+  decoder.decode(servingCell, servingCellPacket());
+  decoder.decodeByAnother(masterInformation, masterInformationPacket(77, channel));
+  EXPECT_EQ(decoder.text("PLMN"), "262-007");
+  decoder.decodeByAnother(masterInformation, masterInformationPacket(78, channel));
+  for (const char* row : rowsOfServingCellOnly) EXPECT_EQ(decoder.text(row), "") << row;
+}
+
 }  // namespace
 }  // namespace varnel::lte
