@@ -56,9 +56,15 @@ void AllRadiosLogGenerator::updateState_withData(Dictionary& state, ByteView dat
   const SubscriptionNumber number = subscriptionOf(data).value_or(0);
   Subscription* const subscription = subscriptionIn(state, number);
   if (!subscription || !subscription->groups.take(*message, data)) return countMessageNotDecoded();
-  if (subscription->isShown || subscription->display.dictionary()->size() == 1) return;  // one is the mark
-  state.get(stateKey::display).dictionary()->set(nameOf(number), subscription->display);
-  subscription->isShown = true;
+  showIfAny(*subscription, number, state);
+}
+
+void AllRadiosLogGenerator::showIfAny(Subscription& subscription, SubscriptionNumber number,
+                                      Dictionary& state) {
+  const std::size_t marks = 1;
+  if (subscription.isShown || subscription.display.dictionary()->size() == marks) return;
+  state.get(stateKey::display).dictionary()->set(nameOf(number), subscription.display);
+  subscription.isShown = true;
 }
 
 bool AllRadiosLogGenerator::hasDisplayIn(Dictionary& state) {
@@ -93,7 +99,10 @@ AllRadiosLogGenerator::Subscription* AllRadiosLogGenerator::subscriptionIn(Dicti
 Value AllRadiosLogGenerator::generateLogUsingState(Dictionary& state) {
   if (hasDisplayIn(state)) {
     const Time now = services().clock.now();
-    for (const auto& [number, subscription] : _subscriptions) subscription.groups.prepareDisplay(now);
+    for (auto& [number, subscription] : _subscriptions) {
+      subscription.groups.prepareDisplay(now);
+      showIfAny(subscription, number, state);
+    }
   }
   storeBinDataInState(state);
   updateHistoryInState(state);

@@ -53,6 +53,8 @@ class AllRadiosLogGenerator final : public KLVLogGenerator {
 
   /// The groups of a subscription, bound to the state's display; null when there are too many.
   Subscription* subscriptionIn(Dictionary& state, SubscriptionNumber number);
+  /// Adds a subscription to the display once one of its groups is shown.
+  static void showIfAny(Subscription& subscription, SubscriptionNumber number, Dictionary& state);
   /// The template; absent when it cannot be loaded.
   const Value& displayTemplate() const;
   /// Answers what needs no display.

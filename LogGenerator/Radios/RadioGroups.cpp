@@ -212,8 +212,11 @@ MessageFate RadioGroups::fateOf(const LogMessage& message, ByteView bytes) const
   return best;
 }
 
-void RadioGroups::prepareDisplay(const Time& now) const {
+void RadioGroups::prepareDisplay(const Time& now) {
   for (const auto& index : _indexes) index->prepareDisplay(now);
+  for (Group& group : _groups) {
+    if (!group.isShown) noteWhetherShown(group);
+  }
 }
 
 std::vector<std::uint32_t> RadioGroups::logCodes() const { return _codes; }

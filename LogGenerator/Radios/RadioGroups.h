@@ -38,7 +38,7 @@ class RadioGroups final : public WriteTimes {
   bool take(const LogMessage& message, ByteView bytes);
   MessageFate fateOf(const LogMessage& message, ByteView bytes) const;
   /// A display is about to be made.
-  void prepareDisplay(const Time& now) const;
+  void prepareDisplay(const Time& now);
 
   /// All codes of the bound sections, the groups in the template's order.
   std::vector<std::uint32_t> logCodes() const;

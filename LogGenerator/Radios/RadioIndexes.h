@@ -6,7 +6,9 @@
 #include "LogGenerator/KLV/LTE/ReselectionCandidatesMisc.h"
 #include "LogGenerator/KLV/Subscriber/PDPContextList.h"
 #include "LogGenerator/Radios/LTE/Bearers.h"
+#include "LogGenerator/Radios/LTE/Carriers.h"
 #include "LogGenerator/Radios/LTE/Measurements.h"
+#include "LogGenerator/Radios/LTE/Neighbors.h"
 #include "LogGenerator/Radios/LTE/RandomAccess.h"
 #include "LogGenerator/Radios/LTE/Registration.h"
 #include "LogGenerator/Radios/LTE/ServingCell.h"
@@ -15,6 +17,7 @@
 #include "LogGenerator/Radios/NR/MasterInformation.h"
 #include "LogGenerator/Radios/NR/Registration.h"
 #include "LogGenerator/Radios/NR/ServingCell.h"
+#include "LogGenerator/Radios/SubscriberFiles.h"
 
 namespace varnel::radios {
 
@@ -33,6 +36,8 @@ class LTEIndex final : public ClassIndex {
   Identities _identities;
   std::unique_ptr<lte::ServingCell> servingCell = create<lte::ServingCell>();
   std::unique_ptr<lte::Measurements> measurements = create<lte::Measurements>();
+  std::unique_ptr<lte::Carriers> carriers = create<lte::Carriers>();
+  std::unique_ptr<lte::Neighbors> neighbors = create<lte::Neighbors>();
   std::unique_ptr<lte::Registration> registration = create<lte::Registration>(_identities);
   std::unique_ptr<lte::Bearers> bearers = create<lte::Bearers>();
   std::unique_ptr<lte::RandomAccess> randomAccess = create<lte::RandomAccess>();
@@ -63,9 +68,12 @@ class CorrectedIndex final : public ClassIndex {
 /// The sections about the subscriber, which all radios share.
 class SubscriberIndex final : public ClassIndex {
  public:
-  explicit SubscriberIndex(Shared& shared) : ClassIndex(shared.standardOutput) {}
+  explicit SubscriberIndex(Shared& shared)
+      : ClassIndex(shared.standardOutput), _identities(shared.identities) {}
 
  private:
+  Identities _identities;
+  std::unique_ptr<SubscriberFiles> files = create<SubscriberFiles>(_identities);
   std::unique_ptr<PDPContextList> contexts = create<PDPContextList>();
 };
 
