@@ -132,6 +132,11 @@ bool hasSecurityHeader(ByteView message) {
   return !message.empty() && (message[0] & 0xF) == mobility && message[0] >> 4 != 0;
 }
 
+bool isSessionMessage(ByteView message) {
+  constexpr std::uint8_t sessionManagement = 2;
+  return !message.empty() && (message[0] & 0xF) == sessionManagement;
+}
+
 // TS 24.501 9.2: a message begins with the discriminator.
 bool beginsLikeNasOfNR(ByteView message) {
   return !message.empty() && (message[0] == 0x7E || message[0] == 0x2E);
@@ -140,7 +145,8 @@ bool beginsLikeNasOfNR(ByteView message) {
 std::optional<MessageDissector> nasDissector(const AirMessage& message) {
   switch (message.radio) {
     case Radio::LTE:
-      return MessageDissector{"nas-eps", gsmtap::lteNAS,
+      // "nas-eps" takes the bearer identity of a session message for a security header.
+      return MessageDissector{isSessionMessage(message.bytes) ? "nas-eps_plain" : "nas-eps", gsmtap::lteNAS,
                               hasSecurityHeader(message.bytes) ? gsmtap::withSecurityHeader : gsmtap::plain};
     case Radio::NR:
       if (!beginsLikeNasOfNR(message.bytes)) return std::nullopt;

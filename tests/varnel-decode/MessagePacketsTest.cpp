@@ -121,6 +121,14 @@ TEST(UpperPdu, ASystemInformationBlockOfUMTSHasItsDissector) {
   EXPECT_EQ(tapped(block), (Tapped{0x0C, 16, {0}}));
 }
 
+TEST(UpperPdu, ASessionMessageOfLTEHasNoSecurityHeader) {
+  const auto nas = [](Bytes bytes) {
+    return Message(Radio::LTE, Protocol::NAS, Direction::Downlink, "", std::move(bytes));
+  };
+  EXPECT_EQ(dissectorName(nas({0x52, 0x01, 0xC1})), "nas-eps_plain") << "5 is the bearer identity";
+  EXPECT_EQ(dissectorName(nas({0x27, 0x11, 0x12})), "nas-eps");
+}
+
 TEST(UpperPdu, ANasMessageOfNRBeginsWithItsDiscriminator) {
   const auto nas = [](Bytes bytes) {
     return Message(Radio::NR, Protocol::NAS, Direction::Uplink, "", std::move(bytes));
