@@ -2,6 +2,7 @@
 
 #include <array>
 #include <charconv>
+#include <cmath>
 #include <limits>
 #include <optional>
 #include <utility>
@@ -51,7 +52,7 @@ std::optional<CellPlace> placeOf(const Dictionary& record) {
   const auto physicalCell = numberIn<std::uint32_t>(record, cellEntry);
   if (!earfcn || !physicalCell || *physicalCell > largestPhysicalCell) return std::nullopt;
   const auto level = numberIn<double>(record, levelEntry);
-  return CellPlace{level ? -*level : last, keyOf(*earfcn, *physicalCell)};
+  return CellPlace{level && std::isfinite(*level) ? -*level : last, keyOf(*earfcn, *physicalCell)};
 }
 
 // Calls `take(cell)` for each neighbor whose fields lie wholly in the body.
@@ -92,7 +93,8 @@ constinit const std::array<PacketLayout, servingCellVersions + Neighbors::Packet
         servingCellPacketsAnd(calling<&Neighbors::updateFromServingCells>,
                               Packets::ofLayouts(std::make_index_sequence<Packets::layouts>()));
 
-Neighbors::Neighbors() : Neighbors(_ownCellMonitor) {}
+Neighbors::Neighbors()
+    : VersionedDecoder("Neighbors", Packets::all), _cellMonitor(_ownCellMonitor), _cells(placeOf) {}
 
 Neighbors::Neighbors(CellMonitorReader& cellMonitor)
     : VersionedDecoder("Neighbors", Packets::all), _cellMonitor(cellMonitor), _cells(placeOf) {}
