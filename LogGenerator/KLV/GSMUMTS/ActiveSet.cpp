@@ -14,26 +14,13 @@ constexpr Field identity[] = {
 // Kept: the value is a power and should be in dBm.
 constexpr Format level = integer("%d dB");
 
-std::uint32_t energyPerChip(const Packet& record) {
-  for (const Source& source : cellSet::energies) {
-    if (const std::uint32_t energy = rawValue(record, source)) return energy;
-  }
-  return 0;
-}
-
-// The sum over all cells, in dBm.
-std::int32_t receivedSignalStrength(const Packet& packet) {
-  const auto reading = static_cast<std::int32_t>(rawValue(packet, cellSet::receivedSignal));
-  return (reading + 512) / 10 - 106;
-}
-
 void update(Section& section, const Packet& packet) {
-  const std::int32_t strength = receivedSignalStrength(packet);
+  const std::int32_t strength = cellSet::receivedSignalStrength(packet);
   section.refill([&](Array& cells) {
     for (std::size_t i = 0; i < packet.u8(cellSet::countOffset); ++i) {
       const Packet cell = cellSet::cell(packet, i);
       if (rawValue(cell, cellSet::membership) != cellSet::activeSet) continue;
-      const std::int16_t ecNo = Base::lookUpECNO(energyPerChip(cellSet::energy(packet, i)));
+      const std::int16_t ecNo = Base::lookUpECNO(cellSet::firstEnergy(cellSet::energy(packet, i)));
       const Value& record = cells.emplace_back(recordOf(cell, identity));
       setInteger(*record.dictionary(), "RSCP", level, strength + ecNo);
       setInteger(*record.dictionary(), "Energy Per Chip", level, ecNo);

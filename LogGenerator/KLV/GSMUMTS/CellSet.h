@@ -35,6 +35,20 @@ inline Packet energy(const Packet& packet, std::size_t index) {
   return packet.from(firstCell + cellSize * packet.u8(countOffset) + energySize * index);
 }
 
+/// The energy that counts in an energy record; 0 when there is none.
+inline std::uint32_t firstEnergy(const Packet& record) {
+  for (const Source& source : energies) {
+    if (const std::uint32_t energy = rawValue(record, source)) return energy;
+  }
+  return 0;
+}
+
+/// The sum over all cells, in dBm.
+inline std::int32_t receivedSignalStrength(const Packet& packet) {
+  const auto reading = static_cast<std::int32_t>(rawValue(packet, receivedSignal));
+  return (reading + 512) / 10 - 106;
+}
+
 }  // namespace cellSet
 
 /// A set of cells with a section, but without records.

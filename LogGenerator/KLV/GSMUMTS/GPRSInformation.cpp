@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Field.h"
 #include "LogGenerator/KLV/GSMUMTS/GPRSCellOptions.h"
+#include "LogGenerator/KLV/GSMUMTS/GPRSPacketControl.h"
 #include "LogGenerator/KLV/GSMUMTS/GSMMeasurement.h"
 #include "LogGenerator/KLV/GSMUMTS/MobilityManagement.h"
 
@@ -9,29 +10,16 @@ namespace varnel {
 
 namespace {
 
-constexpr Choice controlOrders[] = {
-    {0xFF, "Not Available"},
-    {0, "NC0"},
-    {1, "NC1"},
-    {2, "NC2"},
-};
 // Kept: "Available", although the other tables have "Not Available".
 constexpr Choice flowContextSupport[] = {
     {0xFF, "Available"},
     {0, "Not Supported"},
     {1, "Supported"},
 };
-constexpr Choice accessThresholds[] = {
-    {0xFF, "Not Available"}, {0, "Barred (PKT access not allowed in the Cell)"},
-    {1, "Barred"},           {2, "Barred"},
-    {3, "1 Only"},           {4, "1 to 2"},
-    {5, "1 to 3"},           {6, "1 to 4"},
-    {7, "Allowed"},
-};
 constexpr Field packetControl[] = {
-    {u8(15), "Network Control Order", choice(controlOrders, "Unknown")},
-    {u8(13), "PFC Supported", choice(flowContextSupport, "Unknown")},
-    {u8(14), "Priority Access Threshold", choice(accessThresholds, "Unknown")},
+    gprsPacketControl::controlOrder,
+    {gprsPacketControl::flowContexts, "PFC Supported", choice(flowContextSupport, "Unknown")},
+    gprsPacketControl::accessThreshold,
 };
 
 constexpr std::string_view operatingModes[] = {"Class 1", "Class 2", "Class 3"};
@@ -77,7 +65,7 @@ constexpr Field reselection[] = {
 };
 
 constexpr PacketHandler packets[] = {
-    {0x51F5, 18, packetControl},
+    {gprsPacketControl::logCode, gprsPacketControl::minimumSize, packetControl},
     {networkIdentity::logCode, networkIdentity::minimumSize, operatingMode},
     {gprsCellOptions::logCode, gprsCellOptions::minimumSize, cellOptions},
     {0x51FB, 34, controlChannel},

@@ -43,8 +43,12 @@ constinit const PacketHandler GSMServingCell::packets[] = {
     {cellMonitorLogCode, 0, calling<&GSMServingCell::updateFromCellMonitor>},
 };
 
-GSMServingCell::GSMServingCell(CellMonitorReader& cellMonitor)
-    : SectionDecoder("GSM Serving Cell", "GSMServingCell", packets), _cellMonitor(cellMonitor) {}
+GSMServingCell::GSMServingCell(CellMonitorReader& cellMonitor) : GSMServingCell(cellMonitor, packets) {}
+
+GSMServingCell::GSMServingCell(CellMonitorReader& cellMonitor, std::span<const PacketHandler> handlers)
+    : SectionDecoder("GSM Serving Cell", "GSMServingCell", handlers), _cellMonitor(cellMonitor) {}
+
+std::span<const PacketHandler> GSMServingCell::ownHandlers() { return packets; }
 
 void GSMServingCell::updateFromCellMonitor(const Packet& packet) {
   const Array* records = _cellMonitor.read(packet);

@@ -3,14 +3,13 @@
 #include <limits>
 
 #include "LogGenerator/Field.h"
+#include "LogGenerator/KLV/GSMUMTS/UMTSTransmitPower.h"
 #include "LogGenerator/NumberFormats.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
 
 namespace {
-
-constexpr std::size_t transmitPowerSize = 16;
 
 // 3GPP TS 25.331, 7.1.
 constexpr std::string_view states[] = {
@@ -19,11 +18,6 @@ constexpr std::string_view states[] = {
 constexpr Field state[] = {
     {u8(13), "RRC State", entry(states)},
 };
-
-constexpr std::size_t sampleCountOffset = 14;
-constexpr std::size_t firstSample = transmitPowerSize;
-constexpr std::size_t sampleSize = 14;
-constexpr Source samplePower = s16(4);
 
 constexpr std::size_t servingCellSize = 29;
 constexpr Field servingCell[] = {
@@ -40,8 +34,6 @@ constexpr Field ciphering[] = {
 };
 
 constexpr std::string_view channelEntry = "UARFCN";
-constexpr std::string_view transmitPowerEntry = "Transmit Power";
-constexpr Format transmitPower = real("%4.2f dBm");
 
 constexpr CellMonitorEntry cellMonitorEntries[] = {
     {cellMonitor::cellIdentity, "Cell ID", "UMTSRRInfo: Failed to retrieve Cell ID\n"},
@@ -49,24 +41,11 @@ constexpr CellMonitorEntry cellMonitorEntries[] = {
     {cellMonitor::scramblingCode, "Scrambling Code", "UMTSRRInfo: Failed to retrieve Scrambling Code\n"},
 };
 
-// The mean in dBm of the samples that are not 0; NaN when there is none.
-double meanTransmitPower(const Packet& packet) {
-  double sum = 0;
-  int used = 0;
-  for (std::size_t i = 0; i < packet.u8(sampleCountOffset); ++i) {
-    const Packet sample = packet.from(firstSample + sampleSize * i);
-    const auto power = static_cast<std::int32_t>(rawValue(sample, samplePower));
-    if (power == 0) continue;
-    const std::int32_t wholeDBm = (power + 512) / 10 - 70;
-    sum += wholeDBm;
-    ++used;
-  }
-  return used > 0 ? sum / used : std::numeric_limits<double>::quiet_NaN();
-}
-
 void showTransmitPower(Section& section, const Packet& packet) {
+  const auto mean_dbm = umtsTransmitPower::mean_dbm(packet);
   // Kept: without samples the text is " nan dBm".
-  section.setReal(transmitPowerEntry, transmitPower, meanTransmitPower(packet));
+  section.setReal(umtsTransmitPower::label, umtsTransmitPower::levelFormat,
+                  mean_dbm.value_or(std::numeric_limits<double>::quiet_NaN()));
 }
 
 // Kept: a modem packet removes "UARFCN"; only the cell monitor writes it.
@@ -79,17 +58,21 @@ void showServingCell(Section& section, const Packet& packet) {
 
 constinit const PacketHandler UMTSRRInfo::packets[] = {
     {0x4125, 14, state},
-    {0x4031, transmitPowerSize, showTransmitPower},
+    {umtsTransmitPower::logCode, umtsTransmitPower::minimumSize, showTransmitPower},
     {0x4127, servingCellSize, showServingCell},
     {0x4157, 19, ciphering},
     {cellMonitorLogCode, 0, calling<&UMTSRRInfo::updateFromCellMonitor>},
 };
 
-UMTSRRInfo::UMTSRRInfo(CellMonitorReader& cellMonitor)
-    : SectionDecoder("UMTS RR Info", "UMTSRRInfo", packets), _cellMonitor(cellMonitor) {}
+UMTSRRInfo::UMTSRRInfo(CellMonitorReader& cellMonitor) : UMTSRRInfo(cellMonitor, packets) {}
+
+UMTSRRInfo::UMTSRRInfo(CellMonitorReader& cellMonitor, std::span<const PacketHandler> handlers)
+    : SectionDecoder("UMTS RR Info", "UMTSRRInfo", handlers), _cellMonitor(cellMonitor) {}
+
+std::span<const PacketHandler> UMTSRRInfo::ownHandlers() { return packets; }
 
 void UMTSRRInfo::listNumberFormats(SectionFormats& formats) const {
-  formats.add(transmitPowerEntry, transmitPower);
+  formats.add(umtsTransmitPower::label, umtsTransmitPower::levelFormat);
 }
 
 void UMTSRRInfo::updateFromCellMonitor(const Packet& packet) {

@@ -9,8 +9,6 @@ namespace varnel {
 
 namespace {
 
-constexpr std::size_t recordSize = 10;
-
 constexpr Field cell[] = {
     {u16(2), "Scrambling Code"},
     {s8(4), "RSCP", integer("%d dB", 1, -21)},
@@ -20,7 +18,7 @@ constexpr Field cell[] = {
     {s16(8), "Ranking Value"},
     {s16(5), "Rank Cell RSCP", integer("%d dB")},
 };
-static_assert(extent(cell) <= recordSize);
+static_assert(extent(cell) <= cellRanking::umtsRecordSize);
 
 using Width = CellMonitorColumn::Width;
 constexpr CellMonitorColumn cellMonitorColumns[] = {
@@ -35,7 +33,7 @@ constexpr CellMonitorColumn cellMonitorColumns[] = {
 void showRanking(Section& section, const Packet& packet) {
   using namespace cellRanking;
   section.refill([&](Array& cells) {
-    addCountedRecords(cells, packet, {firstRecord, recordSize, packet.u8(umtsCountOffset)}, cell);
+    addCountedRecords(cells, packet, {firstRecord, umtsRecordSize, packet.u8(umtsCountOffset)}, cell);
   });
 }
 
@@ -46,8 +44,12 @@ constinit const PacketHandler UMTSSet::packets[] = {
     {cellMonitorLogCode, 0, calling<&UMTSSet::updateFromCellMonitor>},
 };
 
-UMTSSet::UMTSSet(CellMonitorReader& cellMonitor)
-    : SectionDecoder("UMTS Set", "UMTSSet", packets), _cellMonitor(cellMonitor) {}
+UMTSSet::UMTSSet(CellMonitorReader& cellMonitor) : UMTSSet(cellMonitor, packets) {}
+
+UMTSSet::UMTSSet(CellMonitorReader& cellMonitor, std::span<const PacketHandler> handlers)
+    : SectionDecoder("UMTS Set", "UMTSSet", handlers), _cellMonitor(cellMonitor) {}
+
+std::span<const PacketHandler> UMTSSet::ownHandlers() { return packets; }
 
 void UMTSSet::listNumberFormats(SectionFormats& formats) const {
   SectionDecoder::listNumberFormats(formats);
