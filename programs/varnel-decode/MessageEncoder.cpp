@@ -28,6 +28,7 @@ pcapng::Direction directionOf(const AirMessage& message) {
 std::string reasonFor(const AirMessage& message) {
   std::string reason = " of ";
   reason.append(nameOf(message.radio)).append(" ").append(nameOf(message.protocol));
+  if (message.bytes.size() <= message.layer2Octets) return reason + " without contents";
   if (dissectorOf(message)) return reason + ", which GSMTAP cannot hold";
   if (!message.channel.empty()) reason.append(" ").append(message.channel);
   return reason + ", which no dissector reads";

@@ -83,5 +83,15 @@ TEST(MessageEncoder, OneMessageThatIsLeftOutIsOne) {
             "1 message of walk.bin is not in out: 1 of versions that are not known");
 }
 
+TEST(MessageEncoder, TheReasonNamesWhatTheMessageIs) {
+  MessageEncoder encoder(MessageForm::UpperPdu);
+  // Of the BCCH, with nothing behind the pseudo length; of the RACH.
+  encoded(encoder, PacketBuilder(0x512F, 17).u8(13, 0x81).u8(14, 0x1B).u8(15, 1).u8(16, 0x01).bytes());
+  encoded(encoder, PacketBuilder(0x512F, 17).u8(13, 0x02).u8(15, 1).u8(16, 0x01).bytes());
+  EXPECT_EQ(encoder.remark("walk.bin", "out"),
+            "2 messages of walk.bin are not in out: 1 of GSM RR RACH, which no dissector reads, 1 of GSM RR "
+            "without contents");
+}
+
 }  // namespace
 }  // namespace varnel
