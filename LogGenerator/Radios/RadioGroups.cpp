@@ -6,7 +6,6 @@
 
 #include "LogGenerator/KLV/GSMUMTS/KLV_GSMClassIndex.h"
 #include "LogGenerator/KLV/UTRAN/UTRANClassIndex.h"
-#include "LogGenerator/Radios/RadioIndexes.h"
 #include "LogGenerator/SortedKey.h"
 
 namespace varnel {
@@ -77,15 +76,14 @@ Value copyOf(const Value& object) {
 }  // namespace
 
 RadioGroups::RadioGroups(const Services& services, const Value& displayTemplate)
-    : _services(services), _c2k(services) {
+    : _services(services), _shared{nowhere(), services.identities, _messages}, _c2k(services) {
   _c2k.keepNoRawBytes();
   const Dictionary* groups = displayTemplate.dictionary();
   if (!groups) return;
   const Value command = _c2k.getStartCommand();
   for (const Value& code : *command.dictionary()->get("SetKalviLogCodes").array())
     _c2kCodes.push_back(static_cast<std::uint32_t>(code.int32().value_or(0)));
-  radios::Shared shared{nowhere(), services.identities};
-  for (const Child& child : children()) _indexes.push_back(child.make(shared));
+  for (const Child& child : children()) _indexes.push_back(child.make(_shared));
   for (const auto& [key, value] : *groups) {
     if (key != sortMark) addGroup(key, value);
   }

@@ -12,6 +12,7 @@
 #include "LogGenerator/C2K/C2KLogGenerator.h"
 #include "LogGenerator/ClassIndex.h"
 #include "LogGenerator/LogMessage.h"
+#include "LogGenerator/Radios/RadioIndexes.h"
 #include "LogGenerator/Services.h"
 #include "LogGenerator/WriteTimes.h"
 #include "base/Dictionary.h"
@@ -69,6 +70,8 @@ class RadioGroups final : public WriteTimes {
   void takeC2K(ByteView bytes);
 
   const Services _services;
+  MessageFeed _messages;
+  radios::Shared _shared;
   std::vector<std::unique_ptr<ClassIndex>> _indexes;
   C2KLogGenerator _c2k;
   std::vector<std::uint32_t> _c2kCodes;

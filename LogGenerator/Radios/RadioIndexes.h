@@ -7,12 +7,16 @@
 #include "LogGenerator/KLV/Subscriber/PDPContextList.h"
 #include "LogGenerator/Radios/LTE/Bearers.h"
 #include "LogGenerator/Radios/LTE/Carriers.h"
+#include "LogGenerator/Radios/LTE/Connection.h"
 #include "LogGenerator/Radios/LTE/Measurements.h"
 #include "LogGenerator/Radios/LTE/Neighbors.h"
 #include "LogGenerator/Radios/LTE/RandomAccess.h"
 #include "LogGenerator/Radios/LTE/Registration.h"
 #include "LogGenerator/Radios/LTE/ServingCell.h"
 #include "LogGenerator/Radios/LTE/TransmitPower.h"
+#include "LogGenerator/Radios/LastMessages.h"
+#include "LogGenerator/Radios/MessageCounts.h"
+#include "LogGenerator/Radios/MessageFeed.h"
 #include "LogGenerator/Radios/NR/Cells.h"
 #include "LogGenerator/Radios/NR/MasterInformation.h"
 #include "LogGenerator/Radios/NR/Registration.h"
@@ -21,24 +25,26 @@
 
 namespace varnel::radios {
 
-/// What the indexes of all radios get: where their base class writes, and what their decoders share.
+/// What the indexes of one subscription share. It must outlive them.
 struct Shared {
-  std::ostream& standardOutput;
+  std::ostream& standardOutput;  ///< for their base class
   Identities identities;
+  MessageFeed& messages;
 };
 
 /// The LTE sections of all radios. 0xB186 has the layout of the LTE technology.
 class LTEIndex final : public ClassIndex {
  public:
-  explicit LTEIndex(Shared& shared) : ClassIndex(shared.standardOutput), _identities(shared.identities) {}
+  explicit LTEIndex(Shared& shared) : ClassIndex(shared.standardOutput), _shared(shared) {}
 
  private:
-  Identities _identities;
+  Shared& _shared;
   std::unique_ptr<lte::ServingCell> servingCell = create<lte::ServingCell>();
   std::unique_ptr<lte::Measurements> measurements = create<lte::Measurements>();
   std::unique_ptr<lte::Carriers> carriers = create<lte::Carriers>();
   std::unique_ptr<lte::Neighbors> neighbors = create<lte::Neighbors>();
-  std::unique_ptr<lte::Registration> registration = create<lte::Registration>(_identities);
+  std::unique_ptr<lte::Registration> registration = create<lte::Registration>(_shared.identities);
+  std::unique_ptr<lte::Connection> connection = create<lte::Connection>(_shared.messages);
   std::unique_ptr<lte::Bearers> bearers = create<lte::Bearers>();
   std::unique_ptr<lte::RandomAccess> randomAccess = create<lte::RandomAccess>();
   std::unique_ptr<lte::TransmitPower> transmitPower = create<lte::TransmitPower>();
@@ -49,14 +55,14 @@ class LTEIndex final : public ClassIndex {
 /// The NR sections.
 class NRIndex final : public ClassIndex {
  public:
-  explicit NRIndex(Shared& shared) : ClassIndex(shared.standardOutput), _identities(shared.identities) {}
+  explicit NRIndex(Shared& shared) : ClassIndex(shared.standardOutput), _shared(shared) {}
 
  private:
-  Identities _identities;
+  Shared& _shared;
   std::unique_ptr<nr::MasterInformation> masterInformation = create<nr::MasterInformation>();
   std::unique_ptr<nr::ServingCell> servingCell = create<nr::ServingCell>();
   std::unique_ptr<nr::Cells> cells = create<nr::Cells>();
-  std::unique_ptr<nr::Registration> registration = create<nr::Registration>(_identities);
+  std::unique_ptr<nr::Registration> registration = create<nr::Registration>(_shared.identities);
 };
 
 /// The sections of other technologies whose decoders must show wrong values. These show the right ones.
@@ -68,19 +74,23 @@ class CorrectedIndex final : public ClassIndex {
 /// The sections about the subscriber, which all radios share.
 class SubscriberIndex final : public ClassIndex {
  public:
-  explicit SubscriberIndex(Shared& shared)
-      : ClassIndex(shared.standardOutput), _identities(shared.identities) {}
+  explicit SubscriberIndex(Shared& shared) : ClassIndex(shared.standardOutput), _shared(shared) {}
 
  private:
-  Identities _identities;
-  std::unique_ptr<SubscriberFiles> files = create<SubscriberFiles>(_identities);
+  Shared& _shared;
+  std::unique_ptr<SubscriberFiles> files = create<SubscriberFiles>(_shared.identities);
   std::unique_ptr<PDPContextList> contexts = create<PDPContextList>();
 };
 
 /// The messages of the air interface.
 class MessagesIndex final : public ClassIndex {
  public:
-  explicit MessagesIndex(Shared& shared) : ClassIndex(shared.standardOutput) {}
+  explicit MessagesIndex(Shared& shared) : ClassIndex(shared.standardOutput), _shared(shared) {}
+
+ private:
+  Shared& _shared;
+  std::unique_ptr<LastMessages> lastMessages = create<LastMessages>(_shared.messages);
+  std::unique_ptr<MessageCounts> counts = create<MessageCounts>(_shared.messages);
 };
 
 }  // namespace varnel::radios

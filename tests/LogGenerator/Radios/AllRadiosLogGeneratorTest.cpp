@@ -6,6 +6,7 @@
 #include <fstream>
 #include <iterator>
 #include <map>
+#include <set>
 
 #include "base/PropertyList.h"
 #include "model/VarnelModelNode.h"
@@ -222,6 +223,23 @@ TEST_F(AllRadiosLogGeneratorTest, WithoutItsTemplateNothingIsDecoded) {
   take(servingCell(17));
   EXPECT_EQ(generator->missingTemplate(), "AllRadios.plist");
   EXPECT_TRUE(generator->generateLogUsingState(state).isAbsent());
+}
+
+// Each section of the template but those of the CDMA2000 group, which has a template of its own, gets
+// packets.
+TEST_F(AllRadiosLogGeneratorTest, EverySectionOfTheTemplateHasADecoder) {
+  std::set<std::string> fed;
+  for (const CodeSections& code : generator->codeSections())
+    fed.insert(code.sections.begin(), code.sections.end());
+  // The decoders of these have no log codes.
+  const std::set<std::string> unfed = {"Cell Change Counters", "Coding Scheme", "UMTS RR Measurement",
+                                       "Non-Ranked UMTS Set", "Non-Ranked GSM Set"};
+  const Value all = shipped("AllRadios");
+  for (const auto& [key, group] : *all.dictionary()) {
+    if (!group.dictionary()) continue;
+    for (const auto& [section, value] : *group.dictionary())
+      EXPECT_EQ(fed.contains(section), !unfed.contains(section)) << key << ": " << section;
+  }
 }
 
 }  // namespace
