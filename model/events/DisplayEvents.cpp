@@ -22,7 +22,7 @@ std::vector<DisplayEvent> DisplayEvents::lookAt(const Value& display, Time time)
   return events;
 }
 
-// Groups are only added, never replaced, while the display is the same.
+// While the display is the same, groups are only added, and a group has all its sections from the beginning.
 bool DisplayEvents::isBoundTo(const Value& display) const {
   if (_subscriptions.empty() || _subscriptions[0].groups.dictionary() != display.dictionary()) return false;
   return std::ranges::all_of(_subscriptions, [](const Subscription& subscription) {

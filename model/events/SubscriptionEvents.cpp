@@ -119,6 +119,12 @@ bool isIn(std::span<const std::string_view> texts, std::string_view text) {
   return std::ranges::find(texts, text) != texts.end();
 }
 
+// "37" of "37 (not known)", and of "37".
+std::string numberOfVersion(std::string_view text) {
+  if (text.ends_with(notKnown)) text.remove_suffix(notKnown.size());
+  return std::string(text);
+}
+
 std::string pathOf(std::string_view group, std::string_view section) {
   return std::string(group).append("/").append(section);
 }
@@ -259,8 +265,7 @@ void SubscriptionEvents::lookAtVersion(VersionWatch& watch) {
   if (now.ends_with(notKnown) && watch.told.size() < mostVersionsTold &&
       std::ranges::find(watch.told, now) == watch.told.end()) {
     watch.told.push_back(now);
-    add(EventKind::UnknownVersion, watch.path, watch.version.before,
-        now.substr(0, now.size() - notKnown.size()));
+    add(EventKind::UnknownVersion, watch.path, numberOfVersion(watch.version.before), numberOfVersion(now));
   }
   watch.version.before = now;
 }

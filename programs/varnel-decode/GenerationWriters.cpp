@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
-#include "host/Printable.h"
 #include "model/VarnelModelNode.h"
+#include "programs/varnel-decode/CsvField.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/StandardOutput.h"
 #include "programs/varnel-decode/Timestamps.h"
@@ -13,27 +13,10 @@ namespace varnel {
 
 namespace {
 
-std::string csvField(std::string_view value) {
-  std::string text = printable(value, "\t\r\n");
-  if (text.find_first_of(",\"\r\n") == std::string::npos) return text;
-  std::string quoted = "\"";
-  for (const char character : text) {
-    if (character == '"') quoted += '"';
-    quoted += character;
-  }
-  return quoted + '"';
-}
-
-std::string seconds(std::chrono::nanoseconds duration) {
-  char text[32];
-  std::snprintf(text, sizeof text, "%.3f", std::chrono::duration<double>(duration).count());
-  return text;
-}
-
 // Without a date, the time is null, and the elapsed seconds follow.
 std::string timeAsJson(const Generation& generation) {
   if (generation.dating == Dating::Known) return jsonString(timestamp(generation.time));
-  return "null,\"Elapsed\":" + seconds(generation.elapsed);
+  return "null,\"Elapsed\":" + secondsText(generation.elapsed);
 }
 
 }  // namespace
@@ -108,7 +91,7 @@ void ValueTable::finish(const std::string& inputName) {
 
 std::string ValueTable::valueIn(const Column& column, const Generation& generation) const {
   const auto value = leafValueUnderPath(generation.display, column.path);
-  if (!value) return column.path == elapsedPath ? seconds(generation.elapsed) : std::string();
+  if (!value) return column.path == elapsedPath ? secondsText(generation.elapsed) : std::string();
   if (_style.valuesAs == ValuesAs::Texts) return std::string(*value);
   if (isAbsent(*value)) return {};
   const std::string_view number = column.formats.number(*value);

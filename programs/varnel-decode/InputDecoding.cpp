@@ -19,8 +19,10 @@
 #include "host/HostLog.h"
 #include "host/Printable.h"
 #include "host/captures/Capture.h"
+#include "model/events/DisplayEvents.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-decode/ElapsedTime.h"
+#include "programs/varnel-decode/EventWriter.h"
 #include "programs/varnel-decode/FileOutput.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/MessageStatistics.h"
@@ -78,10 +80,10 @@ class InputDecoding {
         _path(options.captures[index]),
         _name(captureName(_path)),
         _isFirst(index == 0),
+        _captureName(options.captures.size() > 1 ? std::optional(_path) : std::nullopt),
         _subscriptions(options.subscription),
-        _outputs(options) {
-    if (options.captures.size() > 1) _captureName = _path;
-  }
+        _outputs(options),
+        _eventWriter(stdout, _captureName, options.eventFormat) {}
 
   int run(const DecodingServices& services) {
     std::optional<ByteWindow> bytes;
@@ -147,6 +149,7 @@ class InputDecoding {
     const auto generator = LogGenerator::generatorFromTechnology(technology, services.services);
     OfflineDecoder decoder(*generator, services.clock, isSaving() ? RawBytes::Kept : RawBytes::NotKept);
 
+    _isOutputBroken |= !succeeds([&] { beginEvents(); });
     bool isDone = succeeds([&] { read(capture, *generator, decoder, log, services.templates); });
     if (services.templates.missing()) return failWithout(*services.templates.missing());
     _statistics.setCapture(_subscriptions.counts(), capture.leftOut());
@@ -213,7 +216,8 @@ class InputDecoding {
 
   void read(Capture& capture, const LogGenerator& generator, OfflineDecoder& decoder, HostLog& log,
             const TemplateWatch& templates) {
-    const bool isStreaming = _options.output == Output::EveryDisplay || _options.output == Output::ValueTable;
+    const bool isStreaming = _options.output == Output::EveryDisplay ||
+                             _options.output == Output::ValueTable || _options.output == Output::Events;
     ProgressBar progress(
         capture,
         isStreaming ? ProgressBar::Output::GoesToTerminalAlongside : ProgressBar::Output::LeavesTerminalAlone,
@@ -228,6 +232,23 @@ class InputDecoding {
       _elapsed.record(record.time);
       _dating = record.dating;
       decoder.deliver(record.time, record.message);
+      if (_options.output == Output::Events) writeEvents(decoder);
+    }
+  }
+
+  void beginEvents() {
+    if (_options.output != Output::Events) return;
+    if (_options.isEventTable() && !_captureName)
+      writeOutput(stdout, eventTableHeader(EventColumns::WithoutCapture));
+    writeOutput(stdout, heading());
+  }
+
+  // Writes what the last record has brought about. Without a reader of the output, nothing more is looked at.
+  void writeEvents(const OfflineDecoder& decoder) {
+    if (_isOutputBroken) return;
+    for (const DisplayEvent& event : _events.lookAt(decoder.display(), decoder.now())) {
+      _isOutputBroken |= !succeeds([&] { _eventWriter.write(event, _dating, _elapsed.at(decoder.now())); });
+      if (_isOutputBroken) return;
     }
   }
 
@@ -245,6 +266,7 @@ class InputDecoding {
   // The option that only captures can fulfill; nothing when there is none.
   std::optional<std::string> wishForCapture() const {
     if (countsMessages()) return "--stats counts the messages of captures";
+    if (_options.output == Output::Events) return "--events tells what happened in captures";
     if (!_outputs.areNone())
       return "--records, --pcap, --framed and --messages write the records of captures";
     if (_options.subscription) return "--sim chooses among the records of captures";
@@ -332,6 +354,7 @@ class InputDecoding {
         break;
       case Output::EveryDisplay:
       case Output::ValueTable:
+      case Output::Events:
         break;
     }
   }
@@ -356,6 +379,8 @@ class InputDecoding {
   MessageStatistics _statistics;
   TechnologyGuess _guess;
   std::vector<Sink> _sinks;
+  DisplayEvents _events;
+  EventWriter _eventWriter;
   ElapsedTime _elapsed;
   Dating _dating = Dating::Known;  // of the last record
   bool _isOutputBroken = false;

@@ -46,6 +46,12 @@ class OfflineDecoder {
   /// Generates the last display at the time of the last record; the absent value when there is no display.
   Value finish();
 
+  /// What the messages so far have made of the display; absent while there is none. Unlike a generation, it
+  /// lacks what decoders prepare only when a display is due.
+  const Value& display() const { return _state.get(stateKey::display); }
+  /// The time that the last record counts as.
+  Time now() const { return _now; }
+
   /// True once a message has been delivered.
   bool hasStarted() const { return _start.has_value(); }
 

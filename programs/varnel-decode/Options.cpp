@@ -8,6 +8,7 @@
 #include <system_error>
 #include <utility>
 
+#include "platform/TelephonyService.h"
 #include "programs/varnel-decode/ProgramError.h"
 
 namespace varnel {
@@ -16,6 +17,7 @@ namespace {
 
 constexpr int usageError = 2;
 constexpr unsigned mostJobs = 256;
+constexpr std::string_view eventTableFormat = "csv";  // of events alone, as values have --csv
 
 constexpr const char* examples =
     "PATH names a value as --format paths shows it: 'Serving Cell Measurements/Average RSRP'. --csv and "
@@ -34,6 +36,7 @@ constexpr const char* examples =
     "know them.\n"
     "\n"
     "  varnel-decode drive.bin\n"
+    "  varnel-decode --events drive.bin\n"
     "  varnel-decode --every drive.bin\n"
     "  varnel-decode --technology kalvi-lte walk.pcap\n"
     "  varnel-decode --technology kalvi-lte walk.pcap --csv 'Serving Cell Measurements/Average RSRP'\n"
@@ -53,6 +56,7 @@ struct Wishes {
   bool isNumbers = false;
   bool isChanges = false;
   bool isStatistics = false;
+  bool isEvents = false;
   bool isShowingIdentities = false;
   std::vector<std::string> plot;
   std::string messagesAs;
@@ -65,6 +69,7 @@ constexpr const char* gsmtapName = "gsmtap";
 std::vector<std::string> formatNames() {
   std::vector<std::string> names;
   for (const DisplayFormat& format : displayFormats) names.emplace_back(format.name);
+  names.emplace_back(eventTableFormat);
   return names;
 }
 
@@ -79,7 +84,13 @@ bool isIdentityPath(std::string_view path) {
 }
 
 DisplayWriter writerNamed(std::string_view name) {
-  return std::ranges::find(displayFormats, name, &DisplayFormat::name)->write;
+  const auto* const found = std::ranges::find(displayFormats, name, &DisplayFormat::name);
+  return found == std::end(displayFormats) ? displayAsText : found->write;
+}
+
+EventFormat eventFormatNamed(std::string_view name) {
+  if (name == eventTableFormat) return EventFormat::Csv;
+  return name == "json" ? EventFormat::Json : EventFormat::Text;
 }
 
 void declareInput(CLI::App& app, Options& options, Wishes& wishes,
@@ -120,16 +131,23 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
                                "Elapsed gives the seconds since the first record")
                     ->type_name("PATH")
                     ->excludes(every);
+  auto* statistics =
+      app.add_flag("--stats", wishes.isStatistics,
+                   "count the messages of each log code: received, decoded, too short, too long, unknown, of "
+                   "an unknown version")
+          ->excludes(every)
+          ->excludes(table);
+  app.add_flag("--events", wishes.isEvents,
+               "write what happened to the phone, a line per event: cell changes, handovers, registration, "
+               "service, RRC connections, unknown versions; also as --format json or csv")
+      ->excludes(every)
+      ->excludes(table)
+      ->excludes(statistics);
   app.add_flag("--numbers", wishes.isNumbers,
                "with --every and --csv: write plain numbers, and their units separately");
   app.add_flag("--changes", wishes.isChanges,
                "with --every and --csv: write only displays that differ from the one before; in JSON only "
                "what differs");
-  app.add_flag("--stats", wishes.isStatistics,
-               "count the messages of each log code: received, decoded, too short, too long, unknown, of an "
-               "unknown version")
-      ->excludes(every)
-      ->excludes(table);
   app.add_option("--plot", wishes.plot, "also draw the numbers under these paths over time, as SVG")
       ->type_name("FILE PATH")
       ->expected(2, CLI::detail::expected_max_vector_size);
@@ -171,6 +189,18 @@ std::vector<std::pair<std::string, std::string>> namedOutputs(const Options& opt
   return outputs;
 }
 
+std::optional<std::string> conflictOfEvents(const Options& options, const Wishes& wishes) {
+  const std::string& format = wishes.format;
+  if (!wishes.isEvents && format == eventTableFormat)
+    return "--format csv goes with --events; --csv writes values";
+  if (!wishes.isEvents) return std::nullopt;
+  if (!format.empty() && format != "text" && format != "json" && format != eventTableFormat)
+    return "--events writes --format text, json or csv only";
+  if (options.technology && *options.technology != technology::allRadios)
+    return "--events are those of all-radios; leave out --technology";
+  return std::nullopt;
+}
+
 // What is wrong with the combination of valid options; nothing when they go together.
 std::optional<std::string> conflict(const Options& options, const Wishes& wishes) {
   const std::string& format = wishes.format;
@@ -181,6 +211,7 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
     if (wishes.isNumbers) return "--numbers goes with --every or --csv";
     if (wishes.isChanges) return "--changes goes with --every or --csv";
   }
+  if (const auto found = conflictOfEvents(options, wishes)) return found;
   if (wishes.isStatistics && !format.empty() && format != "text" && format != "json")
     return "--stats writes --format text or json only";
   if (const auto identity = std::ranges::find_if(wishes.plot, isIdentityPath); identity != wishes.plot.end())
@@ -190,8 +221,8 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
   const auto outputs = namedOutputs(options, wishes);
   for (const auto& [option, path] : outputs)
     if (path.empty()) return option + ": the name of the file is empty";
-  if (wishes.isFollowing && !wishes.isEvery && options.tablePaths.empty())
-    return "--follow needs --every or --csv, for all else is written at the end";
+  if (wishes.isFollowing && !wishes.isEvery && !wishes.isEvents && options.tablePaths.empty())
+    return "--follow needs --every, --csv or --events, for all else is written at the end";
   if (wishes.isFollowing && !outputs.empty())
     return "--follow has no end, at which " + outputs.front().first + " is written; leave one of them out";
   if (options.captures.size() < 2) return std::nullopt;
@@ -225,6 +256,7 @@ std::optional<std::string> fileTakenForPath(const Options& options, const Wishes
 Output outputFor(const Options& options, const Wishes& wishes) {
   if (wishes.isEvery) return Output::EveryDisplay;
   if (!options.tablePaths.empty()) return Output::ValueTable;
+  if (wishes.isEvents) return Output::Events;
   if (!wishes.isStatistics) return Output::Display;
   return wishes.format == "json" ? Output::StatisticsJson : Output::StatisticsTable;
 }
@@ -239,8 +271,11 @@ void fulfill(Options& options, const Wishes& wishes) {
   if (wishes.isChanges) options.style.displays = Displays::Changed;
   options.writeDisplay = writerNamed(format);
   if (wishes.messagesAs == gsmtapName) options.messagesAs = MessageForm::Gsmtap;
+  options.eventFormat = eventFormatNamed(format);
+  if (wishes.isEvents) options.technology = technology::allRadios;
   const bool isForReading = (options.output == Output::Display && (format == "text" || format == "paths")) ||
-                            options.output == Output::StatisticsTable;
+                            options.output == Output::StatisticsTable ||
+                            (options.output == Output::Events && format == "text");
   options.namesEachCapture = options.captures.size() > 1 && isForReading;
   if (!wishes.plot.empty())
     options.plot = PlotWish{wishes.plot.front(), {wishes.plot.begin() + 1, wishes.plot.end()}};

@@ -10,6 +10,7 @@
 #include "LogGenerator/Identities.h"
 #include "base/Log.h"
 #include "host/captures/ByteSource.h"
+#include "programs/varnel-decode/EventWriter.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/MessagePackets.h"
 #include "programs/varnel-decode/TreeWriters.h"
@@ -21,6 +22,7 @@ enum class Output {
   Display,          ///< the last display; of a snapshot all displays in it
   EveryDisplay,     ///< a line of JSON for each display
   ValueTable,       ///< comma-separated values, a line for each display
+  Events,           ///< a line for each event
   StatisticsTable,  ///< what became of the messages
   StatisticsJson,
 };
@@ -36,6 +38,7 @@ struct Options {
   std::optional<std::string> technology;
   Output output = Output::Display;
   DisplayWriter writeDisplay = displayAsText;
+  EventFormat eventFormat = EventFormat::Text;
   std::vector<std::string> tablePaths;  ///< the columns of a value table
   WritingStyle style;                   ///< of every display and of a value table
   /// The highest priority number that goes to standard error; -1 for none. The decoders' own remarks, such as
@@ -56,6 +59,9 @@ struct Options {
   unsigned jobs = 1;                      ///< how many captures are decoded at the same time
   bool namesEachCapture = false;          ///< text of several captures: a line before each says which it is
   std::vector<std::string> captures;      ///< captures and snapshots, at least one; "-" is standard input
+
+  /// Whether events are written as a table, which begins with a header.
+  bool isEventTable() const { return output == Output::Events && eventFormat == EventFormat::Csv; }
 };
 
 /// The status to end with when the command line leaves nothing to do: 0 after help, 2 after a mistake.

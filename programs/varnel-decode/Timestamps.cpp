@@ -28,6 +28,12 @@ std::string timestamp(Time time) {
   return text;
 }
 
+std::string secondsText(std::chrono::nanoseconds duration) {
+  char text[32];
+  std::snprintf(text, sizeof text, "%.3f", std::chrono::duration<double>(duration).count());
+  return text;
+}
+
 std::optional<Time> timeOfDescription(std::string_view text) {
   constexpr std::size_t length = std::string_view("YYYY-MM-DD hh:mm:ss +0000").size();
   if (text.size() != length) return std::nullopt;

@@ -33,6 +33,8 @@ int decodeAll(const Options& options, const DecodingServices& services) {
     const bool areSeveral = options.captures.size() > 1;
     if (areSeveral && options.output == Output::ValueTable)
       writeOutput(stdout, commonCsvHeader(options, services));
+    if (areSeveral && options.isEventTable())
+      writeOutput(stdout, eventTableHeader(EventColumns::WithCapture));
     status = areSeveral ? runJobs(options.captures, options.jobs, decodeOne) : decodeOne(0);
   });
   return isPassedOn ? status : generalError;

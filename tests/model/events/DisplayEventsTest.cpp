@@ -219,7 +219,7 @@ TEST_F(DisplayEventsTest, AVersionThatIsNotKnownIsToldOncePerSection) {
   EXPECT_THAT(version("Serving Cell", "3"), IsEmpty());
   EXPECT_THAT(version("Serving Cell", "37 (not known)"), IsEmpty());
   EXPECT_THAT(version("Serving Cell", "38 (not known)"),
-              ElementsAre("LTE/Serving Cell: unknown version: 37 (not known) -> 38"));
+              ElementsAre("LTE/Serving Cell: unknown version: 37 -> 38"));
   EXPECT_THAT(version("Measurements", "25.99 (not known)"),
               ElementsAre("LTE/Measurements: unknown version:  -> 25.99"));
 }
