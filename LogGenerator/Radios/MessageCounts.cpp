@@ -38,13 +38,13 @@ void MessageCounts::take(const AirMessageReading& reading) {
   const auto names = [&] {
     return entries->size() - (entries->has(_others.entry.key()) ? 1 : 0) - (entries->has(sortMark) ? 1 : 0);
   };
-  const bool hasRoom = !count.entry.get(*entries).isAbsent() || names() < greatestCount;
-  increase(hasRoom ? count : _others, *entries);
+  const Value& shown = count.entry.get(*entries);
+  if (!shown.isAbsent() || names() < greatestCount) return set(count, *entries, numberIn(shown) + 1);
+  set(_others, *entries, numberIn(_others.entry.get(*entries)) + 1);
 }
 
-void MessageCounts::increase(Count& count, Dictionary& entries) {
+void MessageCounts::set(Count& count, Dictionary& entries, std::uint64_t number) {
   std::array<char, 20> room;
-  const std::uint64_t number = numberIn(count.entry.get(entries)) + 1;
   const auto end = std::to_chars(room.data(), room.data() + room.size(), number).ptr;
   count.entry.setText(entries, std::string_view(room.data(), end));
   count.isWritten = true;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <functional>
 #include <string_view>
 #include <unordered_map>
@@ -47,7 +48,7 @@ class MessageCounts final : public MessageSection {
   };
 
   void take(const AirMessageReading& reading) override;
-  static void increase(Count& count, Dictionary& entries);
+  static void set(Count& count, Dictionary& entries, std::uint64_t number);
 
   std::unordered_map<Kind, Count, Hash> _counts;
   Count _others{BoundEntry("Other")};

@@ -1,7 +1,8 @@
-#include <algorithm>
+#include <array>
+#include <cstddef>
 #include <cstdint>
+#include <initializer_list>
 #include <iterator>
-#include <span>
 
 #include "LogGenerator/Radios/Messages/RRCChannels.h"
 
@@ -218,24 +219,31 @@ constexpr NarrowbandNumbering narrowbandNumberings[] = {
     {{54, 55, 56, 57, 58, 59, 61}, setOf({20, 24, 25})},
 };
 
-template <class Numbering>
-const MessageChannel* find(std::span<const Numbering> numberings, std::span<const MessageChannel> channels,
-                           unsigned version, unsigned number) {
-  for (const Numbering& numbering : numberings) {
-    if ((numbering.versions >> version & 1U) == 0) continue;
-    const auto* const found = std::ranges::find(numbering.numbers, number);
-    if (found != std::end(numbering.numbers))
-      return &channels[static_cast<std::size_t>(found - std::begin(numbering.numbers))];
-  }
-  return nullptr;
-}
+constexpr std::size_t versionCount = 32, numberCount = 64;
+
+// By version and number: 1 and up are the channels, then come those of NB-IoT; 0: not known.
+constexpr auto channelIndexes = [] {
+  std::array<std::array<std::uint8_t, numberCount>, versionCount> indexes{};
+  const auto add = [&](const auto& numbering, std::size_t first) {
+    for (std::size_t version = 0; version < versionCount; ++version) {
+      if ((numbering.versions >> version & 1U) == 0) continue;
+      for (std::size_t i = 0; i < std::size(numbering.numbers); ++i)
+        indexes.at(version).at(numbering.numbers[i]) = static_cast<std::uint8_t>(first + i);
+    }
+  };
+  for (const Numbering& numbering : numberings) add(numbering, 1);
+  for (const NarrowbandNumbering& numbering : narrowbandNumberings) add(numbering, 1 + std::size(channels));
+  return indexes;
+}();
 
 }  // namespace
 
 const MessageChannel* lteRRCChannel(unsigned packetVersion, unsigned number) {
-  if (packetVersion > 31) return nullptr;
-  if (const auto* channel = find<Numbering>(numberings, channels, packetVersion, number)) return channel;
-  return find<NarrowbandNumbering>(narrowbandNumberings, narrowbandChannels, packetVersion, number);
+  if (packetVersion >= versionCount || number >= numberCount) return nullptr;
+  const std::size_t index = channelIndexes[packetVersion][number];
+  if (index == 0) return nullptr;
+  constexpr std::size_t wideCount = std::size(channels);
+  return index <= wideCount ? &channels[index - 1] : &narrowbandChannels[index - 1 - wideCount];
 }
 
 }  // namespace varnel

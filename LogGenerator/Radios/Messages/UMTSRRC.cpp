@@ -120,8 +120,7 @@ constexpr MessageChoice dlCcch = dlCcchMessages;
 
 constexpr Alternative ulCcchLaterMessages[] = {"CellUpdateFDD-r11", spareMessage, spareMessage, spareMessage};
 constexpr MessageChoice ulCcchLater = ulCcchLaterMessages;
-constexpr Alternative ulCcchMessages[] = {"CellUpdate", "RRCConnectionRequest", "URAUpdate",
-                                          ulCcchLater};
+constexpr Alternative ulCcchMessages[] = {"CellUpdate", "RRCConnectionRequest", "URAUpdate", ulCcchLater};
 constexpr MessageChoice ulCcch = ulCcchMessages;
 
 constexpr Alternative pcchMessages[] = {"PagingType1", spareMessage};
