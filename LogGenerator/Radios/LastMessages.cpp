@@ -1,6 +1,7 @@
 #include "LogGenerator/Radios/LastMessages.h"
 
 #include <algorithm>
+#include <cstdio>
 #include <string>
 
 #include "LogGenerator/ArrayLock.h"
@@ -10,6 +11,16 @@ namespace varnel {
 namespace {
 
 constexpr std::string_view listEntry = "Messages", versionEntry = "Version";
+
+// A modem sends many messages per second, so the text has milliseconds before its time zone.
+std::string timeText(Time time) {
+  constexpr std::string_view zone = " +0000";
+  constexpr int nanosecondsPerMillisecond = 1'000'000;
+  char fraction[16];
+  std::snprintf(fraction, sizeof fraction, ".%03d", time.nanoseconds / nanosecondsPerMillisecond);
+  std::string text = dateDescription(time);
+  return text.insert(text.size() - zone.size(), fraction);
+}
 
 std::string_view channelNumberLabel(AirMessage::Radio radio) {
   using enum AirMessage::Radio;
@@ -80,7 +91,7 @@ Value LastMessages::recordOf(const Received& received) {
   Value record = Value::ofDictionary();
   Dictionary& entries = *record.dictionary();
   entries.reserve(entryCount);
-  entries.add("Time", dateDescription(time));
+  entries.add("Time", timeText(time));
   entries.add("Radio", nameOf(message.radio));
   entries.add("Protocol", nameOf(message.protocol));
   if (message.direction != AirMessage::Direction::Unknown)

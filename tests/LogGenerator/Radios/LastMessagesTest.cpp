@@ -22,7 +22,7 @@ class LastMessagesTest : public testing::Test {
   void bind(LastMessages& to, const Value& newSection) {
     section = newSection;
     to.updateSectionRef(section);
-    to.section().setTime({1588958709, 0});
+    to.section().setTime({1588958709, 250'000'000});
   }
   void decode(const Bytes& packet, std::uint32_t logCode) {
     decoder.updateWithData_logCode(Packet(packet), logCode);
@@ -43,7 +43,7 @@ TEST_F(LastMessagesTest, AMessageOfLTEShowsItsCellAndFrame) {
   decode(lteRRCPacket(9, {0x20, 0x01, 0x02}, 683U << 4 | 5U), 0xB0C0);
   ASSERT_EQ(list().size(), 1U);
   EXPECT_EQ(described(list().front()),
-            R"({Time: "2020-05-08 17:25:09 +0000", Radio: "LTE", Protocol: "RRC", Direction: "Downlink", )"
+            R"({Time: "2020-05-08 17:25:09.250 +0000", Radio: "LTE", Protocol: "RRC", Direction: "Downlink", )"
             R"(Channel: "DL-DCCH", Name: "RRCConnectionReconfiguration", EARFCN: "66536", )"
             R"(Physical Cell ID: "411", System Frame Number: "683", Length: "3"})");
   EXPECT_EQ(described(section.dictionary()->get("Version")), R"("26")");
@@ -52,14 +52,14 @@ TEST_F(LastMessagesTest, AMessageOfLTEShowsItsCellAndFrame) {
 TEST_F(LastMessagesTest, WhatAMessageDoesNotTellIsLeftOut) {
   decode(lteNASPacket(0xB0ED, {0x07, 0x41}), 0xB0ED);
   EXPECT_EQ(described(list().front()),
-            R"({Time: "2020-05-08 17:25:09 +0000", Radio: "LTE", Protocol: "NAS", Direction: "Uplink", )"
+            R"({Time: "2020-05-08 17:25:09.250 +0000", Radio: "LTE", Protocol: "NAS", Direction: "Uplink", )"
             R"(Name: "Attach request", Length: "2"})");
 }
 
 TEST_F(LastMessagesTest, AMessageOfUMTSShowsItsScramblingCode) {
   decode(packetOfMessage(0x412F, {0x80, 1, 1, 0, 0x8E, 0x29, 0x23, 0x01}, Bytes{0x20}), 0x412F);
   EXPECT_EQ(described(list().front()),
-            R"({Time: "2020-05-08 17:25:09 +0000", Radio: "UMTS", Protocol: "RRC", Direction: "Uplink", )"
+            R"({Time: "2020-05-08 17:25:09.250 +0000", Radio: "UMTS", Protocol: "RRC", Direction: "Uplink", )"
             R"(Channel: "UL-CCCH", Name: "RRCConnectionRequest", UARFCN: "10638", Scrambling Code: "291", )"
             R"(Length: "1"})");
 }
