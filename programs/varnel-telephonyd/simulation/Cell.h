@@ -18,13 +18,13 @@ inline constexpr Network homeNetwork{1, 1, 2}, partnerNetwork{1, 100, 3}, distan
 
 /// A radio access technology. UMTS is the frequency-division mode. UTRAN is the time-division mode, as in the
 /// names of the telephony service.
-enum class Access { GSM, UMTS, LTE, UTRAN, CDMA1xRTT, HRPD };
+enum class Access { GSM, UMTS, LTE, UTRAN, CDMA1xRTT, HRPD, NR };
 
 /// One cell beside the street along which people walk. Levels are in hundredths of a decibel.
 struct Cell {
   Access access = Access::LTE;
   int band = 0;            ///< the band number of the technology; CDMA: the band class
-  int channel = 0;         ///< ARFCN, downlink UARFCN or EARFCN, CDMA channel number
+  int channel = 0;         ///< ARFCN, downlink UARFCN or EARFCN, CDMA channel number, NR-ARFCN
   int resourceBlocks = 0;  ///< LTE: the bandwidth; else 0
   int antennas = 1;        ///< transmit antennas
   int code = 0;            ///< BSIC, scrambling code, physical cell identity or pilot offset

@@ -23,6 +23,7 @@ std::string_view name(Access access) {
       return cellMonitor::utran;
     case Access::CDMA1xRTT:
     case Access::HRPD:
+    case Access::NR:
       break;
   }
   return {};
@@ -94,6 +95,7 @@ class RecordList {
         break;
       case Access::CDMA1xRTT:
       case Access::HRPD:
+      case Access::NR:
         break;
     }
   }
@@ -106,7 +108,7 @@ class RecordList {
 
 Value cellMonitorRecords(const Walk& walk, const Cell& serving) {
   RecordList list(walk);
-  list.addServing(serving);
+  if (!name(serving.access).empty()) list.addServing(serving);
   for (const Access access : {Access::LTE, Access::UTRAN, Access::UMTS, Access::GSM})
     list.addNeighbors(serving, access);
   return list.records();

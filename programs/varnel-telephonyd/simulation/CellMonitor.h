@@ -5,8 +5,8 @@
 
 namespace varnel::simulation {
 
-/// The telephony server's list of cells: the serving cell, then its strongest neighbors in every technology.
-/// There are fewer neighbors of another technology.
+/// The telephony server's list of cells: the serving cell unless the server does not know its technology,
+/// then its strongest neighbors in every technology. There are fewer neighbors of another technology.
 Value cellMonitorRecords(const Walk& walk, const Cell& serving);
 
 }  // namespace varnel::simulation

@@ -51,6 +51,8 @@ int priority(const Cell& cell) {
       return 2;
     case Access::CDMA1xRTT:
       return 1;
+    case Access::NR:
+      return 7;
   }
   return 0;
 }
@@ -290,6 +292,8 @@ void LTEModem::sendReselectionCandidate(const Cell& serving, const Cell& candida
           .u16(8, candidate.channel)
           .u16(10, candidate.code);
       break;
+    case Access::NR:
+      break;  // this packet knows no NR
   }
   send(packet.finish());
 }

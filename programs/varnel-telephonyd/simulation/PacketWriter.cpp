@@ -29,6 +29,12 @@ PacketWriter& PacketWriter::record(std::size_t size) {
   return *this;
 }
 
+PacketWriter& PacketWriter::append(ByteView bytes) {
+  _start = _bytes.size();
+  _bytes.insert(_bytes.end(), bytes.begin(), bytes.end());
+  return *this;
+}
+
 PacketWriter& PacketWriter::padTo(std::size_t size) { return record(size - _bytes.size()); }
 
 Bytes PacketWriter::finish() {

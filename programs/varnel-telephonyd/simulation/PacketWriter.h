@@ -36,6 +36,8 @@ class PacketWriter {
 
   /// Appends a record of this many bytes, which are all 0.
   PacketWriter& record(std::size_t size);
+  /// Appends a record of these bytes.
+  PacketWriter& append(ByteView bytes);
   /// Appends bytes of 0 until the packet has this size. The next record begins there.
   PacketWriter& padTo(std::size_t size);
 

@@ -5,7 +5,7 @@
 namespace varnel::simulation {
 
 namespace {
-constexpr std::uint8_t linkPrefix[] = {0x81, 0x00};
+constexpr std::uint8_t prefixMark = 0x81, noSubscription = 0;
 constexpr int messagesPerPrefix = 8;
 }  // namespace
 
@@ -21,10 +21,11 @@ void ScheduledModem::repeat(Pace pace, std::function<void()> task) {
 }
 
 void ScheduledModem::send(Bytes packet) {
-  if (_random.oneIn(messagesPerPrefix))
-    packet.insert(packet.begin(), std::begin(linkPrefix), std::end(linkPrefix));
+  if (hasPrefix()) packet.insert(packet.begin(), {prefixMark, _subscription.value_or(noSubscription)});
   sendBare(std::move(packet));
 }
+
+bool ScheduledModem::hasPrefix() { return _subscription || _random.oneIn(messagesPerPrefix); }
 
 void ScheduledModem::sendBare(Bytes message) { _sent.push_back({_now, std::move(message)}); }
 

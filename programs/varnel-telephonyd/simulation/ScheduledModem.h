@@ -3,6 +3,7 @@
 #include <chrono>
 #include <deque>
 #include <functional>
+#include <optional>
 #include <vector>
 
 #include "programs/varnel-telephonyd/simulation/Random.h"
@@ -23,10 +24,13 @@ class ScheduledModem : public SimulatedModem {
   };
 
   explicit ScheduledModem(Random random) : _random(random) {}
+  /// A modem whose packets all name this subscription.
+  ScheduledModem(Random random, std::uint8_t subscription) : _random(random), _subscription(subscription) {}
 
   /// Repeats a task. Tasks that are due at the same moment run in the order of these calls.
   void repeat(Pace pace, std::function<void()> task);
-  /// Sends a packet now. As on a real link, some packets have a prefix of two bytes.
+  /// Sends a packet now. A prefix of two bytes names the subscription. As on a real link, some packets of a
+  /// modem without subscriptions have a prefix too.
   void send(Bytes packet);
   /// Sends a message that is no packet, unchanged.
   void sendBare(Bytes message);
@@ -40,9 +44,11 @@ class ScheduledModem : public SimulatedModem {
     std::function<void()> run;
   };
 
+  bool hasPrefix();
   void runNextTask();
 
   Random _random;
+  std::optional<std::uint8_t> _subscription;
   std::chrono::milliseconds _now{0};
   std::vector<Task> _tasks;
   std::deque<SimulatedMessage> _sent;

@@ -19,9 +19,17 @@ char checkDigit(const std::string& digits) {
   return static_cast<char>('0' + (10 - sum % 10) % 10);
 }
 
-// Numbers of telecom cards begin with 89. Then come the test network's country and issuer.
-std::string cardNumber(Random& random) {
-  std::string digits = "8900101";
+std::string codeText(const Network& network) {
+  char text[16];
+  std::snprintf(text, sizeof text, "%03d-%0*d", network.countryCode, network.networkCodeDigits,
+                network.networkCode);
+  return text;
+}
+
+// Numbers of telecom cards begin with 89. Then come the country and the issuer.
+std::string cardNumber(Random& random, const Network& home) {
+  std::string digits = "89" + codeText(home);
+  std::erase(digits, '-');
   while (digits.size() < 18) digits += static_cast<char>('0' + random.between(0, 9));
   return digits + checkDigit(digits);
 }
@@ -45,7 +53,8 @@ std::string accessClassText(const std::string& cardNumber) {
 
 }  // namespace
 
-SimCard::SimCard(Random random, const Cell& cell) : _random(random), _number(cardNumber(_random)) {
+SimCard::SimCard(Random random, const Cell& cell, Network home)
+    : _random(random), _home(home), _number(cardNumber(_random, home)) {
   // Numbers in this range are reserved for fiction.
   _subscriberNumber = "+1212555" + std::to_string(_random.between(1000100, 1000199)).substr(3);
   registerIn(cell);
@@ -68,13 +77,14 @@ Value SimCard::files() const {
   texts.set("kSimFile_LOCI", locationText("TMSI", _temporaryIdentity, "LAI", _network, _area));
   texts.set("kSimFile_PSLOCI", locationText("P-TMSI", _packetTemporaryIdentity, "RAI", _network, _area));
   texts.set("kSimFile_ACC", accessClassText(_number));
-  texts.set("kSimFile_AD", "Normal operation, MNC of 2 digits");
+  const std::string home = codeText(_home);
+  texts.set("kSimFile_AD", "Normal operation, MNC of " + std::to_string(_home.networkCodeDigits) + " digits");
   texts.set("kSimFile_FPLMN", "001-02, 001-03");
-  texts.set("kSimFile_AHPLMN", "001-01");
+  texts.set("kSimFile_AHPLMN", home);
   texts.set("kSimFile_RATMODE", "LTE, UMTS, GSM");
-  texts.set("kSimFile_PNN", "Test Network");
-  texts.set("kSimFile_OPL", "001-01, areas 0000 to FFFE, name 1");
-  texts.set("kSimFile_OPLMNAcT", "001-01 (LTE, UMTS, GSM)");
+  texts.set("kSimFile_PNN", _home == homeNetwork ? "Test Network" : "Partner Network");
+  texts.set("kSimFile_OPL", home + ", areas 0000 to FFFE, name 1");
+  texts.set("kSimFile_OPLMNAcT", home + " (LTE, UMTS, GSM)");
   return files;
 }
 

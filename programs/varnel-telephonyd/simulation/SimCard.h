@@ -9,10 +9,10 @@
 
 namespace varnel::simulation {
 
-/// The SIM card in the phone. Each seed has a card with another number.
+/// The SIM card in the phone, which its home network has issued. Each seed has a card with another number.
 class SimCard {
  public:
-  SimCard(Random random, const Cell& cell);
+  SimCard(Random random, const Cell& cell, Network home = homeNetwork);
 
   /// The phone has registered in the area of this cell and got new temporary identities.
   void registerIn(const Cell& cell);
@@ -22,6 +22,7 @@ class SimCard {
 
  private:
   Random _random;
+  Network _home;
   std::string _number;  // the card's number with its check digit
   std::string _subscriberNumber;
   int _area;

@@ -17,6 +17,19 @@ WalkingModem::WalkingModem(Random& random, Access access)
       _selection(_walk, access),
       _card(random.fork(), servingCell()),
       _packetData(random.fork()) {
+  startTasks();
+}
+
+WalkingModem::WalkingModem(Random walk, Random& random, const Phone& phone)
+    : ScheduledModem(random.fork(), phone.subscription),
+      _walk{phone.town(walk.fork()), walk.fork()},
+      _selection(_walk, phone.access),
+      _card(random.fork(), servingCell(), phone.home),
+      _packetData(random.fork()) {
+  startTasks();
+}
+
+void WalkingModem::startTasks() {
   using namespace std::chrono_literals;
   repeat({.first = 0ms, .interval = Walk::stepTime}, [this] { step(); });
   repeat({.first = 0ms, .interval = 1s}, [this] { _packetData.step(); });

@@ -15,6 +15,16 @@ class WalkingModem : public ScheduledModem {
   /// Draws from the source what the world needs. The modem starts with this technology.
   WalkingModem(Random& random, Access access);
 
+  /// What sets the phone of one subscription apart.
+  struct Phone {
+    Town (*town)(Random random);  ///< builds the town with the cells that the phone may use
+    Network home;                 ///< of the SIM card
+    std::uint8_t subscription;
+    Access access;  ///< at the start
+  };
+  /// Phones that draw their walk from the same source go side by side, if their towns have as many cells.
+  WalkingModem(Random walk, Random& random, const Phone& phone);
+
   const Walk& walk() const { return _walk; }
   const Cell& servingCell() const { return _selection.servingCell(); }
 
@@ -27,6 +37,7 @@ class WalkingModem : public ScheduledModem {
   virtual void servingCellChanged(const Cell& previous) = 0;
 
  private:
+  void startTasks();
   void step();
   void cellChanged(const Cell& previous);
   void sendSimFiles();
