@@ -22,8 +22,8 @@ using testing::Gt;
 using testing::Le;
 
 TEST(SimulatedModems, OnlyWhatIsSimulatedIsMade) {
-  EXPECT_THAT(simulatedTechnologies(),
-              testing::ElementsAre("ifx-gsm", "kalvi-gsm-umts", "kalvi-cdma", "kalvi-lte", "kalvi-utran-2"));
+  EXPECT_THAT(simulatedTechnologies(), testing::ElementsAre("ifx-gsm", "kalvi-gsm-umts", "kalvi-cdma",
+                                                            "kalvi-lte", "kalvi-utran-2", "all-radios"));
   EXPECT_EQ(simulatedModem("kalvi-5g", 1), nullptr);
 }
 

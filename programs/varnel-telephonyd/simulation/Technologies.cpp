@@ -6,6 +6,7 @@
 #include "programs/varnel-telephonyd/simulation/LTEModem.h"
 #include "programs/varnel-telephonyd/simulation/ObjectStreamModem.h"
 #include "programs/varnel-telephonyd/simulation/UTRANModem.h"
+#include "programs/varnel-telephonyd/simulation/radios/AllRadiosModem.h"
 
 namespace varnel {
 
@@ -27,6 +28,7 @@ constexpr Simulation simulations[] = {
     {technology::kalviCDMA, make<simulation::CDMAModem>},
     {technology::kalviLTE, make<simulation::LTEModem>},
     {technology::kalviUTRAN2, make<simulation::UTRANModem>},
+    {technology::allRadios, make<simulation::AllRadiosModem>},
 };
 
 }  // namespace
