@@ -62,10 +62,11 @@ void UMTSRadio::stateChanged() {
     _link.send(olderNASMessage(situation.now, NASDirection::ToNetwork,
                                gsmMessages::serviceRequest(_temporaryIdentity)));
     _link.send(olderNASMessage(situation.now, NASDirection::FromNetwork, gsmMessages::serviceAccept()));
-  } else if (_connection.state() == State::Disconnected) {
+  } else if (_connection.state() == State::Disconnected && _isConnected) {
     _link.send(
         umtsMessage(situation.now, UMTSChannel::UplinkDedicated, umtsMessages::connectionReleaseComplete()));
   }
+  _isConnected = _connection.state() != State::Disconnected;
   sendState();
 }
 

@@ -31,6 +31,7 @@ class UMTSRadio {
   UTRANConnection _connection;
   UMTSChannels _channels;
   std::uint32_t _temporaryIdentity;
+  bool _isConnected = false;
   int _reports = 0;
 };
 
