@@ -74,12 +74,12 @@ TEST_F(AllRadiosStream, PacketsOfLTEHaveSeveralVersions) {
   EXPECT_THAT(versions(0xB17F, 2), ElementsAre(4));
   EXPECT_THAT(versions(0xB180, 1), ElementsAre(5));
   EXPECT_THAT(versions(0xB180, 2), ElementsAre(4));
-  EXPECT_THAT(versions(0xB179, 1), ElementsAre(4));
+  EXPECT_THAT(versions(0xB179, 1), ElementsAre(3, 4));
   EXPECT_THAT(versions(0xB0C0, 1), ElementsAre(26));
   EXPECT_THAT(versions(0xB0C0, 2), ElementsAre(8, 15, 30));
-  EXPECT_THAT(versions(0xB139, 1), ElementsAre(102));
-  EXPECT_THAT(versions(0xB16E, 1), ElementsAre(25));
-  EXPECT_THAT(versions(0xB16F, 1), ElementsAre(24));
+  EXPECT_THAT(versions(0xB139, 1), ElementsAre(43, 102));
+  EXPECT_THAT(versions(0xB16E, 1), ElementsAre(5, 25));
+  EXPECT_THAT(versions(0xB16F, 1), ElementsAre(4, 24));
   EXPECT_THAT(versions(0xB0EE, 1), ElementsAre(2));
   EXPECT_THAT(versions(0xB0EE, 2), ElementsAre(2));
 }
@@ -96,6 +96,9 @@ TEST_F(AllRadiosStream, SubpacketsOfMeasurementsHaveSeveralVersions) {
   std::set<unsigned> found;
   for (const RadioMessage& message : messagesOf(0xB193, 1)) found.insert(message.u8(5));
   EXPECT_THAT(found, ElementsAre(19, 36, 48));
+  found.clear();
+  for (const RadioMessage& message : messagesOf(0xB195, 1)) found.insert(message.u8(5));
+  EXPECT_THAT(found, ElementsAre(3, 4, 24));
 }
 
 TEST_F(AllRadiosStream, TheFirstSubscriptionUsesEveryRadio) {
@@ -325,9 +328,11 @@ TEST_F(AllRadiosStream, FrameNumbersFollowTheClock) {
     expectTheClock(starts, message, {message.u32(8), message.u16(cell) & 0x1FF},
                    message.bits(cell + 4, 0, 10), message.bits(cell + 4, 10, 4));
   }
-  for (const RadioMessage& message : messagesOf(0xB179, 1))
-    expectTheClock(starts, message, {message.u32(8), message.u16(12)}, message.u16(14) / 10,
-                   message.u16(14) % 10);
+  for (const RadioMessage& message : messagesOf(0xB179, 1)) {
+    const bool isOld = message.u8(0) == 3;
+    const unsigned channel = isOld ? message.u16(8) : message.u32(8), subframe = message.u16(isOld ? 12 : 14);
+    expectTheClock(starts, message, {channel, message.u16(isOld ? 10 : 12)}, subframe / 10, subframe % 10);
+  }
   for (const RadioMessage& message : messagesOf(0xB0C0, 1)) {
     if (message.u16(12) != 0)
       expectTheClock(starts, message, {message.u32(8), message.u16(6)}, message.bits(12, 4, 10),
@@ -354,11 +359,14 @@ TEST_F(AllRadiosStream, IdleLevelsFitEachOther) {
 
 TEST_F(AllRadiosStream, NeighborsAreOtherCellsThanTheServingOne) {
   for (const RadioMessage& message : messagesOf(0xB179, 1)) {
-    EXPECT_EQ(message.size(), 28 + 12 * message.u8(24) + 16 * message.u8(25));
-    for (unsigned i = 0; i < message.u8(24); ++i) EXPECT_NE(message.u16(28 + 12 * i), message.u16(12));
+    const std::size_t shift = message.u8(0) == 3 ? 2 : 0, first = message.u8(0) == 3 ? 24 : 28;
+    const unsigned neighbors = message.u8(24 - shift);
+    EXPECT_EQ(message.size(), first + 12 * neighbors + 16 * message.u8(25 - shift));
+    for (unsigned i = 0; i < neighbors; ++i) EXPECT_NE(message.u16(first + 12 * i), message.u16(12 - shift));
   }
   for (const RadioMessage& message : messagesOf(0xB195, 1)) {
-    EXPECT_EQ(message.size(), 4 + 12 + 52 * (message.u8(12) & 0x3F));
+    const bool isOld = message.u8(5) == 3;
+    EXPECT_EQ(message.size(), 4 + (isOld ? 8 : 12) + 52 * (message.u8(isOld ? 10 : 12) & 0x3F));
     EXPECT_EQ(message.u16(6), message.size() - 4);
   }
 }

@@ -14,23 +14,26 @@ constexpr int firstTimeDivisionChannel = 36000;
 }  // namespace
 
 Bytes lteConnectedMeasurement(std::chrono::milliseconds now, std::span<const AntennaLevels> cells,
-                              std::span<const Cell* const> detected, int servingIndex) {
-  constexpr std::size_t headSize = 41, neighborSize = 12, detectedSize = 16;
+                              std::span<const Cell* const> detected, int servingIndex, ChannelWidth width) {
+  constexpr std::size_t narrowHead = 37, wideHead = 41, neighborSize = 12, detectedSize = 16;
+  const bool isWide = width == ChannelWidth::Bits32;
   const AntennaLevels& serving = cells.front();
   const FrameClock clock(*serving.cell, now);
-  PacketWriter packet(measurementCode, now, headSize);
-  packet
-      .u8(13, 4)  // version
-      .bits(17, 0, 3, servingIndex)
-      .u32(21, serving.cell->channel)
-      .u16(25, serving.cell->code)
-      .u16(27, 10 * clock.frame + clock.subframe)
-      .u16(29, rsrpField(serving.filtered.rsrp))
-      .u16(31, rsrpField(serving.filtered.rsrp))
-      .u16(33, rsrqField(serving.filtered.rsrq))
-      .u16(35, rsrqField(serving.filtered.rsrq))
-      .u8(37, std::ssize(cells) - 1)
-      .u8(38, std::ssize(detected));
+  PacketWriter packet(measurementCode, now, isWide ? wideHead : narrowHead);
+  packet.u8(13, isWide ? 4 : 3).bits(17, 0, 3, servingIndex);
+  if (isWide)
+    packet.u32(21, serving.cell->channel);
+  else
+    packet.u16(21, serving.cell->channel);
+  const std::size_t rest = isWide ? 25 : 23;
+  packet.u16(rest, serving.cell->code)
+      .u16(rest + 2, 10 * clock.frame + clock.subframe)
+      .u16(rest + 4, rsrpField(serving.filtered.rsrp))
+      .u16(rest + 6, rsrpField(serving.filtered.rsrp))
+      .u16(rest + 8, rsrqField(serving.filtered.rsrq))
+      .u16(rest + 10, rsrqField(serving.filtered.rsrq))
+      .u8(rest + 12, std::ssize(cells) - 1)
+      .u8(rest + 13, std::ssize(detected));
   for (const AntennaLevels& neighbor : cells.subspan(1))
     packet.record(neighborSize)
         .u16(0, neighbor.cell->code)
@@ -49,21 +52,23 @@ Bytes lteConnectedMeasurement(std::chrono::milliseconds now, std::span<const Ant
 }
 
 Bytes lteConnectedNeighbors(std::chrono::milliseconds now, std::span<const AntennaLevels> cells,
-                            int servingIndex) {
-  constexpr std::size_t headSize = 17, subpacketHead = 12, cellSize = 52;
-  constexpr int resultID = 31, resultVersion = 4;
+                            int servingIndex, ConnectedNeighborsLayout layout) {
+  constexpr std::size_t headSize = 17, narrowHead = 8, wideHead = 12, cellSize = 52;
+  constexpr int resultID = 31, versions[] = {3, 4, 24};
+  const bool isNarrow = layout == ConnectedNeighborsLayout::Version3;
+  const std::size_t subpacketHead = isNarrow ? narrowHead : wideHead, counts = isNarrow ? 6 : 8;
   const Cell& serving = *cells.front().cell;
   const auto neighbors = cells.subspan(1);
   PacketWriter packet(neighborsCode, now, headSize);
   packet.u8(13, 1).u8(14, 1);  // version, subpackets
   packet.record(subpacketHead)
       .u8(0, resultID)
-      .u8(1, resultVersion)
+      .u8(1, versions[static_cast<std::size_t>(layout)])
       .u16(2, static_cast<std::int64_t>(subpacketHead + cellSize * neighbors.size()))
-      .u32(4, serving.channel)
-      .bits(8, 0, 6, std::ssize(neighbors))
-      .bits(8, 7, 2, serving.channel >= firstTimeDivisionChannel)
-      .bits(8, 9, 4, servingIndex);
+      .bits(4, 0, isNarrow ? 16 : 32, serving.channel)
+      .bits(counts, 0, 6, std::ssize(neighbors))
+      .bits(counts, 7, 2, serving.channel >= firstTimeDivisionChannel)
+      .bits(counts, 9, 4, servingIndex);
   // The packet has room for two antennas.
   for (const AntennaLevels& neighbor : neighbors) {
     const AntennaLevel &first = neighbor.antennas[0], &second = neighbor.antennas[1];

@@ -100,9 +100,10 @@ void LTERadio::reportConnected() {
   for (std::size_t index = 0; index < cells.size(); ++index)
     reportCarrier(*cells[index], static_cast<int>(index));
   const Situation situation = _link.situation();
-  _link.send(lteUplinkTransmissions(situation, _random));
-  _link.send(lteSharedChannelPower(situation, _random));
-  _link.send(lteControlChannelPower(situation, _random));
+  const auto power = _reports % 2 == 0 ? TransmitPowerLayouts::Older : TransmitPowerLayouts::Newer;
+  _link.send(lteUplinkTransmissions(situation, power, _random));
+  _link.send(lteSharedChannelPower(situation, power, _random));
+  _link.send(lteControlChannelPower(situation, power, _random));
 }
 
 // The serving cell, and the strongest cells of other carriers.
@@ -126,8 +127,15 @@ void LTERadio::reportCarrier(const Cell& serving, int servingIndex) {
   _link.send(lteServingMeasurement(situation.now, layout, cells, servingIndex));
   if (isResting) return;
   const auto detected = detectedOn(serving.channel);
-  _link.send(lteConnectedMeasurement(situation.now, cells, detected, servingIndex));
-  if (cells.size() > 1) _link.send(lteConnectedNeighbors(situation.now, cells, servingIndex));
+  _link.send(lteConnectedMeasurement(situation.now, cells, detected, servingIndex,
+                                     _reports % 2 == 0 ? ChannelWidth::Bits16 : ChannelWidth::Bits32));
+  if (cells.size() > 1) {
+    constexpr ConnectedNeighborsLayout neighborLayouts[] = {ConnectedNeighborsLayout::Version3,
+                                                            ConnectedNeighborsLayout::Version4,
+                                                            ConnectedNeighborsLayout::Version24};
+    _link.send(lteConnectedNeighbors(situation.now, cells, servingIndex,
+                                     neighborLayouts[_reports % std::ssize(neighborLayouts)]));
+  }
   if (servingIndex == 0)
     _signaling.sendMeasurementReport(cells.front().filtered.rsrp, cells.front().filtered.rsrq);
 }

@@ -46,12 +46,13 @@ FrameClock clockOf(const Situation& situation, int record) {
 
 }  // namespace
 
-Bytes lteUplinkTransmissions(const Situation& situation, Random& random) {
-  constexpr std::size_t headSize = 21, recordSize = 68;
+Bytes lteUplinkTransmissions(const Situation& situation, TransmitPowerLayouts layouts, Random& random) {
+  constexpr std::size_t headSize = 21, olderSize = 64, newerSize = 68;
+  const bool isOld = layouts == TransmitPowerLayouts::Older;
   const FrameClock now(situation.serving, situation.now);
   PacketWriter packet(uplinkCode, situation.now, headSize);
   packet
-      .u8(13, 102)  // version
+      .u8(13, isOld ? 43 : 102)  // version
       .bits(14, 0, 9, situation.serving.code)
       .bits(14, 9, 5, records)
       .u16(17, 10 * now.frame + now.subframe);
@@ -60,42 +61,44 @@ Bytes lteUplinkTransmissions(const Situation& situation, Random& random) {
     const FrameClock clock = clockOf(situation, i);
     const std::int64_t power =
         std::min(power_dbm(sharedBase_dbm, pathLoss_db(situation), sent.blocks_db), maximumPower_dbm);
-    packet.record(recordSize)
+    packet.record(isOld ? olderSize : newerSize)
         .u16(0, 10 * clock.frame + clock.subframe)
-        .u16(8, sent.bytes)
+        .u16(isOld ? 12 : 8, sent.bytes)
         .bits(24, 0, 7, signedBits(power, 7));
   }
   return packet.finish();
 }
 
-Bytes lteSharedChannelPower(const Situation& situation, Random& random) {
+Bytes lteSharedChannelPower(const Situation& situation, TransmitPowerLayouts layouts, Random& random) {
   constexpr std::size_t headSize = 17, recordSize = 12;
   constexpr std::int64_t noChange = 1;
+  const bool isOld = layouts == TransmitPowerLayouts::Older;
+  // Newer modems tell the carrier first, and at the end their highest power.
+  const unsigned carrierWidth = isOld ? 0 : 3;
   PacketWriter packet(sharedChannelCode, situation.now, headSize);
-  packet.u8(13, 25).u8(16, records);
+  packet.u8(13, isOld ? 5 : 25).u8(16, records);
   for (int i = 0; i < records; ++i) {
     const Allocation& sent = allocation(random);
     const FrameClock clock = clockOf(situation, i);
     const std::int64_t wanted = power_dbm(sharedBase_dbm, pathLoss_db(situation), sent.blocks_db);
     packet.record(recordSize)
-        .bits(0, 0, 3, 0)  // the primary cell
-        .bits(0, 3, 10, clock.frame)
-        .bits(0, 13, 4, clock.subframe)
-        .bits(0, 17, 8, signedBits(wanted, 8))
+        .bits(0, carrierWidth, 10, clock.frame)
+        .bits(0, carrierWidth + 10, 4, clock.subframe)
+        .bits(0, carrierWidth + 14, 8, signedBits(wanted, 8))
         .bits(4, 0, 8, sent.blocks)
         .bits(4, 8, 14, sent.bytes)
         .bits(4, 22, 8, pathLoss_db(situation))
         .bits(8, 10, 5, noChange)
         .bits(8, 15, 8, signedBits(std::min(wanted, maximumPower_dbm), 8))
-        .bits(8, 23, 8, maximumPower_dbm);
+        .bits(8, 23, 8, isOld ? 0 : maximumPower_dbm);
   }
   return packet.finish();
 }
 
-Bytes lteControlChannelPower(const Situation& situation, Random& random) {
+Bytes lteControlChannelPower(const Situation& situation, TransmitPowerLayouts layouts, Random& random) {
   constexpr std::size_t headSize = 17, recordSize = 12;
   PacketWriter packet(controlChannelCode, situation.now, headSize);
-  packet.u8(13, 24).u8(16, records);
+  packet.u8(13, layouts == TransmitPowerLayouts::Older ? 4 : 24).u8(16, records);
   for (int i = 0; i < records; ++i) {
     const FrameClock clock = clockOf(situation, i);
     const std::int64_t wanted = power_dbm(controlBase_dbm, pathLoss_db(situation), 0) + random.between(-1, 1);
