@@ -50,7 +50,8 @@ constexpr Rate rates[] = {
 };
 constexpr Format rateFormat = integer("%d kbit/s");
 
-constexpr std::int32_t rate_kbps(std::uint8_t coded) {
+// Rates are in kbit/s.
+constexpr std::int32_t kilobits(std::uint8_t coded) {
   if (coded < 64) return coded;
   if (coded < 128) return 64 + 8 * (coded - 64);
   if (coded < 255) return 576 + 64 * (coded - 128);
@@ -58,7 +59,7 @@ constexpr std::int32_t rate_kbps(std::uint8_t coded) {
 }
 
 // Absent for values that the standard does not define.
-constexpr std::optional<std::int32_t> extendedRate_kbps(std::uint8_t coded) {
+constexpr std::optional<std::int32_t> extendedKilobits(std::uint8_t coded) {
   if (coded == 0 || coded > 250) return std::nullopt;
   if (coded <= 74) return 8'600 + 100 * coded;
   if (coded <= 186) return 16'000 + 1'000 * (coded - 74);
@@ -73,16 +74,15 @@ std::uint8_t qualityByte(const Packet& body, std::size_t offset) {
 // An extension counts instead of the byte that it extends.
 std::optional<std::int32_t> rateOf(const Packet& body, const Rate& rate) {
   const std::uint8_t extension = qualityByte(body, rate.offset + extensionDistance);
-  if (extension != 0) return extendedRate_kbps(extension);
-  const std::int32_t plain_kbps = rate_kbps(qualityByte(body, rate.offset));
-  return plain_kbps > 0 ? std::optional(plain_kbps) : std::nullopt;
+  if (extension != 0) return extendedKilobits(extension);
+  const std::int32_t plain = kilobits(qualityByte(body, rate.offset));
+  return plain > 0 ? std::optional(plain) : std::nullopt;
 }
 
 void addQuality(Dictionary& record, const Packet& body) {
   if (body.u8(qualityLength) > 0) setFields(record, body, qualityClass);
   for (const Rate& rate : rates) {
-    if (const auto itsRate_kbps = rateOf(body, rate))
-      setInteger(record, rate.entry, rateFormat, *itsRate_kbps);
+    if (const auto itsRate = rateOf(body, rate)) setInteger(record, rate.entry, rateFormat, *itsRate);
   }
 }
 
