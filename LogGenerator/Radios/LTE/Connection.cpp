@@ -26,12 +26,14 @@ std::uint32_t numberIn(const Value& value) {
 void Connection::take(const AirMessageReading& reading) {
   const Dictionary* const entries = sectionRef.container().dictionary();
   if (!reading.message || !entries) return;
-  const auto& [name, channel] = std::pair(reading.message->name, reading.message->channel);
-  if (is(name, "RRCConnectionRelease") || is(name, "RRCConnectionReject"))
+  const std::string_view name = reading.message->name;
+  // Most messages are of other kinds.
+  const bool mayChange = name.starts_with("RRCConnection");
+  if (mayChange && (is(name, "RRCConnectionRelease") || is(name, "RRCConnectionReject")))
     return sectionRef.setText(stateEntry, "Idle");
-  if (!is(channel, "DL-DCCH") && !is(channel, "UL-DCCH")) return;
+  if (!is(reading.message->channel, "DL-DCCH") && !is(reading.message->channel, "UL-DCCH")) return;
   sectionRef.setText(stateEntry, "Connected");
-  if (is(name, "RRCConnectionSetupComplete") || is(name, "RRCConnectionResumeComplete"))
+  if (mayChange && (is(name, "RRCConnectionSetupComplete") || is(name, "RRCConnectionResumeComplete")))
     sectionRef.setText(countEntry, std::to_string(numberIn(entries->get(countEntry)) + 1));
 }
 

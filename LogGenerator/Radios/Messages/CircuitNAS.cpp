@@ -8,7 +8,7 @@ namespace varnel {
 
 namespace {
 
-// TS 24.008 table 9.2.1.
+// TS 24.008 table 10.2.
 constexpr NamesByType mobilityNames = {
     {0x01, "IMSI Detach Indication"},
     {0x02, "Location Updating Accept"},
@@ -34,7 +34,7 @@ constexpr NamesByType mobilityNames = {
     {0x32, "MM Information"},
 };
 
-// TS 24.008 table 9.3.
+// TS 24.008 table 10.3.
 constexpr NamesByType callNames = {
     {0x01, "Alerting"},
     {0x02, "Call Proceeding"},
@@ -73,7 +73,7 @@ constexpr NamesByType callNames = {
     {0x3E, "Notify"},
 };
 
-// TS 24.008 table 9.4.
+// TS 24.008 table 10.4.
 constexpr NamesByType packetMobilityNames = {
     {0x01, "Attach Request"},
     {0x02, "Attach Accept"},
@@ -100,7 +100,7 @@ constexpr NamesByType packetMobilityNames = {
     {0x21, "GMM Information"},
 };
 
-// TS 24.008 table 9.4a.
+// TS 24.008 table 10.4a.
 constexpr NamesByType sessionNames = {
     {0x41, "Activate PDP Context Request"},
     {0x42, "Activate PDP Context Accept"},
@@ -135,7 +135,7 @@ constexpr NamesByType shortMessageNames = {
     {0x10, "CP-ERROR"},
 };
 
-// TS 24.080 table 3.1.
+// TS 24.080 3.4.
 constexpr NamesByType supplementaryNames = {
     {0x2A, "Release Complete"},
     {0x3A, "Facility"},

@@ -1,6 +1,6 @@
 #pragma once
 
-#include <bit>
+#include <cstddef>
 #include <span>
 #include <string_view>
 
@@ -40,7 +40,7 @@ struct MessageChannel {
   /// What a message on the channel begins with: a choice, or else always this message.
   const MessageChoice* choice = nullptr;
   std::string_view message{};
-  /// An optional information for the integrity check comes first (TS 25.331 10.2).
+  /// An optional information for the integrity check comes first (TS 25.331 10.3.3.16).
   enum class IntegrityCheck { None, Optional } integrityCheck = IntegrityCheck::None;
 };
 
