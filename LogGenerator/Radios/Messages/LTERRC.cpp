@@ -171,23 +171,23 @@ constexpr MessageChoice ulDcchNB = ulDcchNBClasses;
 
 // In the order of every numbering.
 constexpr MessageChannel channels[] = {
-    {"BCCH-BCH", Direction::Downlink, nullptr, "MasterInformationBlock"},
-    {"BCCH-DL-SCH", Direction::Downlink, &bcchDlSch},
-    {"MCCH", Direction::Downlink, &mcch},
-    {"PCCH", Direction::Downlink, &pcch},
-    {"DL-CCCH", Direction::Downlink, &dlCcch},
-    {"DL-DCCH", Direction::Downlink, &dlDcch},
-    {"UL-CCCH", Direction::Uplink, &ulCcch},
-    {"UL-DCCH", Direction::Uplink, &ulDcch},
+    {"BCCH-BCH", nullptr, "MasterInformationBlock", Direction::Downlink},
+    {"BCCH-DL-SCH", &bcchDlSch, {}, Direction::Downlink},
+    {"MCCH", &mcch, {}, Direction::Downlink},
+    {"PCCH", &pcch, {}, Direction::Downlink},
+    {"DL-CCCH", &dlCcch, {}, Direction::Downlink},
+    {"DL-DCCH", &dlDcch, {}, Direction::Downlink},
+    {"UL-CCCH", &ulCcch, {}, Direction::Uplink},
+    {"UL-DCCH", &ulDcch, {}, Direction::Uplink},
 };
 constexpr MessageChannel narrowbandChannels[] = {
-    {"BCCH-BCH-NB", Direction::Downlink, nullptr, "MasterInformationBlock-NB"},
-    {"BCCH-DL-SCH-NB", Direction::Downlink, &bcchDlSchNB},
-    {"PCCH-NB", Direction::Downlink, &pcchNB},
-    {"DL-CCCH-NB", Direction::Downlink, &dlCcchNB},
-    {"DL-DCCH-NB", Direction::Downlink, &dlDcchNB},
-    {"UL-CCCH-NB", Direction::Uplink, &ulCcchNB},
-    {"UL-DCCH-NB", Direction::Uplink, &ulDcchNB},
+    {"BCCH-BCH-NB", nullptr, "MasterInformationBlock-NB", Direction::Downlink},
+    {"BCCH-DL-SCH-NB", &bcchDlSchNB, {}, Direction::Downlink},
+    {"PCCH-NB", &pcchNB, {}, Direction::Downlink},
+    {"DL-CCCH-NB", &dlCcchNB, {}, Direction::Downlink},
+    {"DL-DCCH-NB", &dlDcchNB, {}, Direction::Downlink},
+    {"UL-CCCH-NB", &ulCcchNB, {}, Direction::Uplink},
+    {"UL-DCCH-NB", &ulDcchNB, {}, Direction::Uplink},
 };
 
 // A numbering: the numbers of the channels, and the versions that have it.

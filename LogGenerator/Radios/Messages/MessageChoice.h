@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <span>
 #include <string_view>
 
@@ -35,13 +36,15 @@ struct MessageChoice {
 
 /// A logical channel of RRC messages, or a type of message that no channel carries by itself.
 struct MessageChannel {
+  /// Whether an information for the integrity check may come first (TS 25.331 10.3.3.16).
+  enum class IntegrityCheck : std::uint8_t { None, Optional };
+
   std::string_view name;  ///< empty for a type of message
-  AirMessage::Direction direction;
   /// What a message on the channel begins with: a choice, or else always this message.
-  const MessageChoice* choice = nullptr;
-  std::string_view message{};
-  /// An optional information for the integrity check comes first (TS 25.331 10.3.3.16).
-  enum class IntegrityCheck { None, Optional } integrityCheck = IntegrityCheck::None;
+  const MessageChoice* choice;
+  std::string_view message;
+  AirMessage::Direction direction;
+  IntegrityCheck integrityCheck = IntegrityCheck::None;
 };
 
 /// The name of the message that these bytes are on the channel. A message that ends within its choice is

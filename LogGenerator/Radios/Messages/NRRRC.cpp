@@ -107,22 +107,22 @@ constexpr MessageChoice ulDcch = ulDcchClasses;
 // The order of the numberings below. The last five are types of messages by themselves, which LTE messages
 // carry to a phone that has NR beside LTE.
 constexpr MessageChannel channels[] = {
-    {"BCCH-BCH", Direction::Downlink, &bcchBch},
-    {"BCCH-DL-SCH", Direction::Downlink, &bcchDlSch},
-    {"DL-CCCH", Direction::Downlink, &dlCcch},
-    {"DL-DCCH", Direction::Downlink, &dlDcch},
-    {"MCCH", Direction::Downlink, &mcch},
-    {"PCCH", Direction::Downlink, &pcch},
-    {"UL-CCCH", Direction::Uplink, &ulCcch},
-    {"UL-CCCH1", Direction::Uplink, &ulCcch1},
-    {"UL-DCCH", Direction::Uplink, &ulDcch},
-    {"UL-DCCH", Direction::Uplink, &ulDcch},
-    {"", Direction::Downlink, nullptr, "RRCReconfiguration"},
-    {"", Direction::Uplink, nullptr, "RRCReconfigurationComplete"},
-    {"", Direction::Downlink, nullptr, "RadioBearerConfig"},
-    {"", Direction::Uplink, nullptr, "UE-MRDC-Capability"},
-    {"", Direction::Uplink, nullptr, "UE-NR-Capability"},
-    {"", Direction::Uplink, nullptr, "UE-NR-Capability"},
+    {"BCCH-BCH", &bcchBch, {}, Direction::Downlink},
+    {"BCCH-DL-SCH", &bcchDlSch, {}, Direction::Downlink},
+    {"DL-CCCH", &dlCcch, {}, Direction::Downlink},
+    {"DL-DCCH", &dlDcch, {}, Direction::Downlink},
+    {"MCCH", &mcch, {}, Direction::Downlink},
+    {"PCCH", &pcch, {}, Direction::Downlink},
+    {"UL-CCCH", &ulCcch, {}, Direction::Uplink},
+    {"UL-CCCH1", &ulCcch1, {}, Direction::Uplink},
+    {"UL-DCCH", &ulDcch, {}, Direction::Uplink},
+    {"UL-DCCH", &ulDcch, {}, Direction::Uplink},
+    {"", nullptr, "RRCReconfiguration", Direction::Downlink},
+    {"", nullptr, "RRCReconfigurationComplete", Direction::Uplink},
+    {"", nullptr, "RadioBearerConfig", Direction::Downlink},
+    {"", nullptr, "UE-MRDC-Capability", Direction::Uplink},
+    {"", nullptr, "UE-NR-Capability", Direction::Uplink},
+    {"", nullptr, "UE-NR-Capability", Direction::Uplink},
 };
 
 // The numbers of the channels in some versions; 0: they have none.

@@ -154,16 +154,16 @@ constexpr Alternative mschMessages[] = {"MBMSSchedulingInformation", spareMessag
                                         spareMessage};
 constexpr MessageChoice msch = mschMessages;
 
-constexpr MessageChannel ulCcchChannel = {"UL-CCCH", Direction::Uplink, &ulCcch, {}, optionalCheck};
-constexpr MessageChannel ulDcchChannel = {"UL-DCCH", Direction::Uplink, &ulDcch, {}, optionalCheck};
-constexpr MessageChannel dlCcchChannel = {"DL-CCCH", Direction::Downlink, &dlCcch, {}, optionalCheck};
-constexpr MessageChannel dlDcchChannel = {"DL-DCCH", Direction::Downlink, &dlDcch, {}, optionalCheck};
-constexpr MessageChannel bcchBchChannel = {"BCCH-BCH", Direction::Downlink, nullptr, "SystemInformation-BCH"};
-constexpr MessageChannel bcchFachChannel = {"BCCH-FACH", Direction::Downlink, &bcchFach};
-constexpr MessageChannel pcchChannel = {"PCCH", Direction::Downlink, &pcch};
-constexpr MessageChannel mcchChannel = {"MCCH", Direction::Downlink, &mcch};
-constexpr MessageChannel mschChannel = {"MSCH", Direction::Downlink, &msch};
-constexpr MessageChannel containerType = {"", Direction::Downlink, nullptr, "System-Information-Container"};
+constexpr MessageChannel ulCcchChannel = {"UL-CCCH", &ulCcch, {}, Direction::Uplink, optionalCheck};
+constexpr MessageChannel ulDcchChannel = {"UL-DCCH", &ulDcch, {}, Direction::Uplink, optionalCheck};
+constexpr MessageChannel dlCcchChannel = {"DL-CCCH", &dlCcch, {}, Direction::Downlink, optionalCheck};
+constexpr MessageChannel dlDcchChannel = {"DL-DCCH", &dlDcch, {}, Direction::Downlink, optionalCheck};
+constexpr MessageChannel bcchBchChannel = {"BCCH-BCH", nullptr, "SystemInformation-BCH", Direction::Downlink};
+constexpr MessageChannel bcchFachChannel = {"BCCH-FACH", &bcchFach, {}, Direction::Downlink};
+constexpr MessageChannel pcchChannel = {"PCCH", &pcch, {}, Direction::Downlink};
+constexpr MessageChannel mcchChannel = {"MCCH", &mcch, {}, Direction::Downlink};
+constexpr MessageChannel mschChannel = {"MSCH", &msch, {}, Direction::Downlink};
+constexpr MessageChannel containerType = {"", nullptr, "System-Information-Container", Direction::Downlink};
 
 // By the packet's number; 9 stands for a system information block.
 constexpr const MessageChannel* channels[] = {
@@ -171,7 +171,7 @@ constexpr const MessageChannel* channels[] = {
     &pcchChannel,   &mcchChannel,   &mschChannel,   nullptr,        &containerType,
 };
 
-constexpr MessageChannel blockOf(std::string_view name) { return {"", Direction::Downlink, nullptr, name}; }
+constexpr MessageChannel blockOf(std::string_view name) { return {"", nullptr, name, Direction::Downlink}; }
 
 struct Block {
   std::uint8_t number;
