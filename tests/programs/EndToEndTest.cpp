@@ -116,8 +116,8 @@ TEST_F(EndToEnd, OfSeveralSimCardsAViewerShowsTheOneThatItIsAskedFor) {
   }
   file.close();
   const auto shown = [&](const char* card) {
-    const Process telephony(VARNEL_TELEPHONYD_PROGRAM,
-                            {"--replay", capture, "--runtime-dir", _runtime.path()});
+    const Process telephony(VARNEL_TELEPHONYD_PROGRAM, {"--replay", capture, "--technology", "kalvi-lte",
+                                                        "--runtime-dir", _runtime.path()});
     const auto varnel = viewer({"--sim", card, "--updates", "1"});
     EXPECT_TRUE(varnel->waitForEnd());
     return varnel->output();
@@ -156,9 +156,9 @@ class ReplayedPipe : public EndToEnd {
   void writeHeader() const {
     write(std::string("\x4D\x3C\xB2\xA1\x02\0\x04\0\0\0\0\0\0\0\0\0\0\0\x04\0\x93\0\0\0", 24));
   }
-  // A record that says how many antennas there are.
+  // A record of version 1 that says how many antennas there are.
   void writeAntennas(char second, char antennas) const {
-    const std::string message = packetOf("", 0xB0C1, std::string(7, '\0') + antennas + '\0');
+    const std::string message = packetOf("", 0xB0C1, '\1' + std::string(6, '\0') + antennas + '\0');
     const std::string size{static_cast<char>(message.size()), '\0', '\0', '\0'};
     write(second + std::string(7, '\0') + size + size + message);
   }
@@ -170,7 +170,7 @@ class ReplayedPipe : public EndToEnd {
     return testing::AssertionFailure() << "not told: " << part << ", but:\n" << program.error();
   }
   static testing::AssertionResult shows(const Process& viewer, const std::string& antennas) {
-    const std::regex row("Num Tx Antennas +" + antennas + "\n");
+    const std::regex row(" Antennas +" + antennas + "\n");
     if (eventually([&] { return std::regex_search(viewer.output(), row); }))
       return testing::AssertionSuccess();
     return testing::AssertionFailure() << "not shown: " << antennas << ", but:\n" << viewer.output();
@@ -184,7 +184,7 @@ TEST_F(ReplayedPipe, IsALiveViewForOneViewerAfterAnother) {
   const auto telephony = server({"--log-level", "5"});
   ASSERT_TRUE(tells(*telephony, "waiting for the beginning of standard input"));
   writeHeader();
-  ASSERT_TRUE(tells(*telephony, "serving kalvi-lte in "));
+  ASSERT_TRUE(tells(*telephony, "serving all-radios in "));
   auto varnel = viewer();
   writeAntennas(1, 4);
   EXPECT_TRUE(shows(*varnel, "4"));
@@ -195,7 +195,7 @@ TEST_F(ReplayedPipe, IsALiveViewForOneViewerAfterAnother) {
   writeAntennas(101, 2);
   varnel = viewer();
   EXPECT_TRUE(shows(*varnel, "2"));
-  EXPECT_THAT(varnel->output(), Not(testing::ContainsRegex("Num Tx Antennas +[14]\n")));
+  EXPECT_THAT(varnel->output(), Not(testing::ContainsRegex(" Antennas +[14]\n")));
   closeWriter();
   ASSERT_TRUE(tells(*telephony, "the replay of standard input has ended\n"));
   varnel.reset();

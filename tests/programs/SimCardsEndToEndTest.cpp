@@ -55,11 +55,12 @@ std::chrono::milliseconds sinceStart() {
 // A server in this process, and a viewer that ends after two refreshes.
 class SimCards : public testing::Test {
  protected:
-  std::string shownOf(const std::vector<std::uint8_t>& cards, const std::vector<std::string>& more = {}) {
+  std::string shownOf(const std::vector<std::uint8_t>& cards, const std::vector<std::string>& more = {},
+                      std::string_view technology = technology::kalviLTE) {
     TelephonyServer server({.ports = _ports,
                             .queue = _queue,
                             .uptime = sinceStart,
-                            .technology = std::string(technology::kalviLTE),
+                            .technology = std::string(technology),
                             .makeSource = [&] { return std::make_unique<CardsByTurns>(cards); },
                             .messageSent = [](ByteView) {},
                             .tell = [](const std::string&) {}});
@@ -92,6 +93,13 @@ TEST_F(SimCards, ThatAreMixedAreShownAllAndToldOf) { EXPECT_THAT(shownOf({1, 2})
 TEST_F(SimCards, OfWhichOneSendsAreNotToldOf) {
   const std::string shown = shownOf({2});
   EXPECT_THAT(shown, testing::ContainsRegex("Num Tx Antennas +2\n"));
+  EXPECT_THAT(shown, Not(HasSubstr("The display mixes")));
+}
+
+TEST_F(SimCards, OfAllRadiosStandSideBySide) {
+  const std::string shown = shownOf({1, 2}, {}, technology::allRadios);
+  EXPECT_THAT(shown, testing::ContainsRegex("SIM 1\n +LTE\n"));
+  EXPECT_THAT(shown, testing::ContainsRegex("SIM 2\n +LTE\n"));
   EXPECT_THAT(shown, Not(HasSubstr("The display mixes")));
 }
 

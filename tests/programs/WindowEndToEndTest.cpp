@@ -200,7 +200,8 @@ TEST_F(WindowEndToEnd, APaneGoesWithTheContextThatItShows) {
   const Bytes both = serverMessage(0xFF0002, Value::ofArray({internet, ims}));
   const Bytes one = serverMessage(0xFF0002, Value::ofArray({internet}));
   // Both for three seconds, then only one for three seconds.
-  startServer({"--replay", captureOf({{0, both}, {3, one}, {5, one}}), "--loop"});
+  startServer(
+      {"--replay", captureOf({{0, both}, {3, one}, {5, one}}), "--technology", "kalvi-lte", "--loop"});
   launch();
   ASSERT_TRUE(runUntil([this] { return hasRow(contexts); }, patience)) << status();
   openWithMouse(contexts);

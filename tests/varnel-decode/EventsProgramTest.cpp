@@ -3,6 +3,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "tests/support/AirMessages.h"
 #include "tests/varnel-decode/DecodeProgram.h"
 
 // Runs the whole program with --events.
@@ -25,6 +26,12 @@ std::string registration(std::uint8_t state, std::uint16_t substate) {
   return packet(
       1, 0xB0EE,
       littleEndian(2, 1) + littleEndian(state, 1) + littleEndian(substate, 2) + std::string(15, '\0'));
+}
+
+// A message of RRC on the channel of that number: 9 is DL-DCCH, 11 is UL-DCCH.
+std::string rrcMessage(unsigned channel, std::uint8_t firstByte) {
+  const Bytes message = lteRRCPacket(channel, {firstByte});
+  return {message.begin(), message.end()};
 }
 
 const std::string firstCell =
@@ -58,6 +65,23 @@ TEST_F(DecodeEvents, EachEventIsALineWithTheTimeOfItsRecord) {
                 "2024-03-01T14:05:13.000Z  loss of service    LTE/Registration                Normal Service "
                 "-> PLMN Search\n"
                 "2024-03-01T14:05:14.000Z  unknown version    LTE/Serving Cell                3 -> 99\n");
+}
+
+TEST_F(DecodeEvents, ACellChangeWithinAConnectionIsAHandover) {
+  const std::string setupComplete = rrcMessage(11, 0x20), release = rrcMessage(9, 0x28);
+  const std::string path = captureOf("drive.pcap", {servingCell(5230, 16), setupComplete,
+                                                    servingCell(1300, 17), release, servingCell(1300, 18)});
+  EXPECT_EQ(
+      run({"--events", "--format", "csv", path}).output,
+      "Time,Kind,From,To,Section,Elapsed\n"
+      "2024-03-01T14:05:09.000Z,cell change,,\"EARFCN 5230, Physical Cell ID 16, Cell Identity "
+      "0\",LTE/Serving Cell,0.000\n"
+      "2024-03-01T14:05:10.000Z,RRC connection,,Connected,LTE/Connection,1.000\n"
+      "2024-03-01T14:05:11.000Z,handover,\"EARFCN 5230, Physical Cell ID 16, Cell Identity 0\",\"EARFCN "
+      "1300, Physical Cell ID 17, Cell Identity 0\",LTE/Serving Cell,2.000\n"
+      "2024-03-01T14:05:12.000Z,RRC connection,Connected,Idle,LTE/Connection,3.000\n"
+      "2024-03-01T14:05:13.000Z,cell change,\"EARFCN 1300, Physical Cell ID 17, Cell Identity "
+      "0\",\"EARFCN 1300, Physical Cell ID 18, Cell Identity 0\",LTE/Serving Cell,4.000\n");
 }
 
 TEST_F(DecodeEvents, JsonAndCsvHaveTheSame) {

@@ -140,6 +140,18 @@ TEST_F(DecodeProgram, ACaptureThatNamesNoTechnologyIsThatOfAllRadios) {
               StartsWith("Capture,Time,"));
 }
 
+TEST_F(DecodeProgram, IdentitiesAreShownOnlyWhenTheyAreAskedFor) {
+  // A registration with the GUTI of 001-01, whose M-TMSI is 0x12345678.
+  const std::string registered = littleEndian(2, 1) + littleEndian(3, 1) + littleEndian(0, 2) +
+                                 "\x11\xF1\x10" + '\x01' + '\0' + "\x11\xF1\x10" + littleEndian(0x8001, 2) +
+                                 littleEndian(1, 1) + littleEndian(0x12345678, 4);
+  const std::string path =
+      write("drive.pcap", pcapHeader() + pcapRecord(afternoon, 0, packet(1, 0xB0EE, registered)));
+  EXPECT_THAT(run({path, "--format", "paths"}).output, HasSubstr("\n/LTE/Registration/M-TMSI\tpresent\n"));
+  EXPECT_THAT(run({path, "--format", "paths", "--identities"}).output,
+              HasSubstr("\n/LTE/Registration/M-TMSI\t0x12345678\n"));
+}
+
 TEST_F(DecodeProgram, WhatAllRadiosDoNotKnowIsToldAsOfAnotherTechnology) {
   const std::string path =
       write("walk.pcap", pcapHeader() + pcapRecord(afternoon, 0, list("<string>an object</string>")));
