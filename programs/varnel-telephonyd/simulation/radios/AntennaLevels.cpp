@@ -3,12 +3,13 @@
 #include <algorithm>
 
 #include "programs/varnel-telephonyd/simulation/LTEMeasurement.h"
+#include "programs/varnel-telephonyd/simulation/radios/LevelFields.h"
 
 namespace varnel::simulation {
 
 namespace {
 
-constexpr std::int64_t lowestRSRQ = -30 * 16;
+constexpr std::int64_t lowestRSRQ = -30 * perDecibel;
 constexpr std::int64_t antennaLoss_cdb[] = {0, 1'20, 2'10, 2'90};
 constexpr std::int64_t fastNoise_cdb = 40, totalNoise_cdb = 15;
 
@@ -35,9 +36,9 @@ constexpr std::int64_t sixteenths(std::int64_t level_cdb) { return level_cdb * 1
 AntennaLevel level(std::int64_t rsrp, std::int64_t rssi, int resourceBlocks) {
   const std::int64_t rsrq = std::max(blocksInSixteenths(resourceBlocks) + rsrp - rssi, lowestRSRQ);
   // A cell that is alone has -4 dB of quality; one as strong as all others together, about -13 dB.
-  constexpr std::int64_t evenRSRQ = -13 * 16, weakest_tenths = -190, strongest_tenths = 300;
-  const std::int64_t snr_tenths = (rsrq - evenRSRQ) * 20 / 16;
-  return {rsrp, rsrq, rssi, std::clamp(snr_tenths, weakest_tenths, strongest_tenths)};
+  constexpr std::int64_t evenRSRQ = -13 * perDecibel, weakestTenths = -190, strongestTenths = 300;
+  const std::int64_t snrTenths = (rsrq - evenRSRQ) * 20 / 16;
+  return {rsrp, rsrq, rssi, std::clamp(snrTenths, weakestTenths, strongestTenths)};
 }
 
 }  // namespace
@@ -59,7 +60,7 @@ AntennaLevels measureOnAntennas(const Walk& walk, const Cell& cell, int antennas
     levels.combined.rsrp = std::max(levels.combined.rsrp, antenna.rsrp);
     levels.combined.rsrq = std::max(levels.combined.rsrq, antenna.rsrq);
     levels.combined.rssi = std::max(levels.combined.rssi, antenna.rssi);
-    levels.combined.snr_tenths = std::max(levels.combined.snr_tenths, antenna.snr_tenths);
+    levels.combined.snrTenths = std::max(levels.combined.snrTenths, antenna.snrTenths);
   }
   levels.filtered = level(sixteenths(rsrp_cdbm), sixteenths(rssi_cdbm), cell.resourceBlocks);
   return levels;

@@ -10,7 +10,7 @@ namespace varnel::simulation {
 /// of a decibel, in which packets send levels.
 struct AntennaLevel {
   std::int64_t rsrp, rsrq, rssi;
-  std::int64_t snr_tenths;  ///< in tenths of a decibel
+  std::int64_t snrTenths;  ///< in tenths of a decibel
 };
 
 /// An LTE cell as a phone measures it on several antennas.

@@ -38,7 +38,7 @@ void putDigits(PerWriter& message, int number, int digits) {
 }  // namespace
 
 Bytes systemInformationBlock1(const Cell& cell) {
-  constexpr int firstTimeDivisionBand = 33, tdd_subframes = 2, tdd_special = 7;
+  constexpr int firstTimeDivisionBand = 33, tddSubframes = 2, tddSpecial = 7;
   constexpr int minimumLevel_dbm = -124, lowest_dbm = -140, maximumPower_dbm = 23, lowestPower_dbm = -30;
   const bool isTimeDivision = cell.band >= firstTimeDivisionBand;
   PerWriter block = message(1, 1);
@@ -55,7 +55,7 @@ Bytes systemInformationBlock1(const Cell& cell) {
   block.bits(6, maximumPower_dbm - lowestPower_dbm).bits(6, static_cast<unsigned>(cell.band) - 1);
   // One further message, with block 3, every 160 ms.
   block.bits(5, 0).bits(3, 1).bits(5, 1).bits(1, 0).bits(4, 0);
-  if (isTimeDivision) block.bits(3, tdd_subframes).bits(4, tdd_special);
+  if (isTimeDivision) block.bits(3, tddSubframes).bits(4, tddSpecial);
   block.bits(3, 4).bits(5, cell.identity % 32);  // 15 ms, the number of changes
   return block.finish();
 }

@@ -51,8 +51,8 @@ Bytes attachRequest(const TemporaryName& name) {
 }
 
 Bytes attachAccept(const TemporaryName& name, int area) {
-  constexpr std::uint8_t period_54min = 0x49, nameFollows = 0x50, oneNetworkWithAreas = 0x00;
-  Bytes message{Mobility, 0x42, 0x01, period_54min};
+  constexpr std::uint8_t periodOf54Minutes = 0x49, nameFollows = 0x50, oneNetworkWithAreas = 0x00;
+  Bytes message{Mobility, 0x42, 0x01, periodOf54Minutes};
   Bytes areas{oneNetworkWithAreas};
   append(areas, packedNetwork(name.network));
   appendNumber(areas, static_cast<std::uint64_t>(area), 2);
@@ -133,8 +133,8 @@ Bytes activateDefaultBearerRequest() {
 
 Bytes activateDefaultBearerAccept() { return session(defaultBearer, 0, 0xC2); }
 
-Bytes activateDedicatedBearerRequest(int guaranteedRate_code) {
-  const auto rate = static_cast<std::uint8_t>(guaranteedRate_code);
+Bytes activateDedicatedBearerRequest(int guaranteedRateCode) {
+  const auto rate = static_cast<std::uint8_t>(guaranteedRateCode);
   Bytes message = session(dedicatedBearer, 0, 0xC5);
   message.push_back(defaultBearer);
   appendCounted(message, Bytes{1, rate, rate, rate, rate});

@@ -25,7 +25,7 @@ Bytes integrityProtected(ByteView message, int sequence);
 Bytes connectivityRequest();
 Bytes activateDefaultBearerRequest();
 Bytes activateDefaultBearerAccept();
-Bytes activateDedicatedBearerRequest(int guaranteedRate_code);
+Bytes activateDedicatedBearerRequest(int guaranteedRateCode);
 Bytes activateDedicatedBearerAccept();
 Bytes deactivateBearerRequest();
 Bytes deactivateBearerAccept();

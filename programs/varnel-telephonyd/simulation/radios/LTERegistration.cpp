@@ -43,10 +43,10 @@ Bytes lteBearerInformation(std::chrono::milliseconds now, const Bearer& bearer, 
       .u8(16, static_cast<std::int64_t>(state))
       .u8(23, bearer.isDedicated() ? classAndRates : classAlone)
       .u8(24, bearer.qualityClass)
-      .u8(25, bearer.guaranteedRate_code)
-      .u8(26, bearer.guaranteedRate_code)
-      .u8(27, bearer.guaranteedRate_code)
-      .u8(28, bearer.guaranteedRate_code)
+      .u8(25, bearer.guaranteedRateCode)
+      .u8(26, bearer.guaranteedRateCode)
+      .u8(27, bearer.guaranteedRateCode)
+      .u8(28, bearer.guaranteedRateCode)
       .finish();
 }
 

@@ -22,9 +22,9 @@ Bytes lteRegistration(const Situation& situation, EMMState state, int substate, 
 struct Bearer {
   enum class State { Inactive, ActivePending, Active, ModifyPending };
   int identity;
-  int qualityClass;         ///< TS 23.203 table 6.1.7
-  int guaranteedRate_code;  ///< TS 24.301 9.9.4.3; 0 for a default bearer
-  bool isDedicated() const { return guaranteedRate_code != 0; }
+  int qualityClass;        ///< TS 23.203 table 6.1.7
+  int guaranteedRateCode;  ///< TS 24.301 9.9.4.3; 0 for a default bearer
+  bool isDedicated() const { return guaranteedRateCode != 0; }
 };
 
 /// 0xB0E5 and 0xB0E4: what the bearer gives, and its state.

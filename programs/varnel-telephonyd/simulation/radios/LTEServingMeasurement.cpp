@@ -98,7 +98,7 @@ void putAntennas(PacketWriter& record, const Layout& layout, const AntennaLevels
     put(record, layout.rsrp[i], rsrpWidth, rsrpField(antenna.rsrp));
     put(record, layout.rsrq[i], rsrqWidth, rsrqField(antenna.rsrq));
     put(record, layout.rssi[i], rssiWidth, rssiField(antenna.rssi));
-    put(record, layout.snr[i], snrWidth, snrField(antenna.snr_tenths));
+    put(record, layout.snr[i], snrWidth, snrField(antenna.snrTenths));
   }
 }
 
@@ -125,7 +125,7 @@ void putCell(PacketWriter& record, const Layout& layout, const AntennaLevels& le
   put(record, layout.rsrpOfAll, rsrpWidth, layout.rsrpOfAllField(levels.combined.rsrp));
   put(record, layout.rsrqOfAll, rsrqWidth, rsrqField(levels.combined.rsrq));
   put(record, layout.rssiOfAll, rssiWidth, rssiField(levels.combined.rssi));
-  record.u32(layout.sir, levels.combined.snr_tenths * 16 / 10)
+  record.u32(layout.sir, levels.combined.snrTenths * 16 / 10)
       .u32(layout.rsrqAfterCancellation, rsrqField(levels.combined.rsrq));
 }
 

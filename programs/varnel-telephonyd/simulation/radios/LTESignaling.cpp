@@ -17,8 +17,8 @@ enum Deregistered { SearchingNetwork = 1, AboutToAttach = 7 };
 enum Registering { WaitingForNetwork = 0, WaitingForSession = 1 };
 enum Registered { NormalService = 0 };
 
-constexpr Bearer dataBearer{.identity = 5, .qualityClass = 9, .guaranteedRate_code = 0};
-constexpr Bearer voiceBearer{.identity = 7, .qualityClass = 1, .guaranteedRate_code = 49};
+constexpr Bearer dataBearer{.identity = 5, .qualityClass = 9, .guaranteedRateCode = 0};
+constexpr Bearer voiceBearer{.identity = 7, .qualityClass = 1, .guaranteedRateCode = 49};
 
 constexpr int mobilityGroup = 0x8003, mobilityCode = 17;
 
@@ -164,7 +164,7 @@ void LTESignaling::finishAreaUpdate() {
 void LTESignaling::call(Milliseconds duration) {
   setBearer(voiceBearer, Bearer::State::Inactive);
   sendPlain(NASKind::SessionFromNetwork,
-            lteNAS::activateDedicatedBearerRequest(voiceBearer.guaranteedRate_code));
+            lteNAS::activateDedicatedBearerRequest(voiceBearer.guaranteedRateCode));
   setBearer(voiceBearer, Bearer::State::ActivePending);
   after(60ms, [this] {
     sendPlain(NASKind::SessionToNetwork, lteNAS::activateDedicatedBearerAccept());

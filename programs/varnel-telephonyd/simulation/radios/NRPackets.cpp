@@ -14,7 +14,7 @@ namespace {
 constexpr std::uint16_t masterInformationCode = 0xB822, servingCellCode = 0xB823, measurementsCode = 0xB97F,
                         registrationCode = 0xB80C;
 
-constexpr int spacing30kHz = 1, bandwidth_MHz = 60;
+constexpr int spacing30kHz = 1, bandwidthInMegahertz = 60;
 constexpr int noServingCell = 65535, noBeam = 65535;
 constexpr std::int64_t weakest_cdbm = -118'00, noise_cdb = 50, secondAntennaLoss_cdb = 1'40;
 constexpr std::size_t mostCells = 4;
@@ -110,8 +110,8 @@ Bytes nrServingCell(std::chrono::milliseconds now, const Cell& cell, NRServingCe
   if (!isOld) packet.u64(identity + 2, globalIdentity(cell));
   return packet.u32(rest, cell.channel)
       .u32(rest + 4, cell.channel)  // both directions share the carrier
-      .u16(rest + 8, bandwidth_MHz)
-      .u16(rest + 10, bandwidth_MHz)
+      .u16(rest + 8, bandwidthInMegahertz)
+      .u16(rest + 10, bandwidthInMegahertz)
       .u64(rest + 12, cell.identity)
       .u16(rest + 20, cell.network.countryCode)
       .u8(rest + 22, cell.network.networkCodeDigits)
@@ -125,8 +125,8 @@ Bytes nrServingCell(std::chrono::milliseconds now, const Cell& cell, NRServingCe
 Bytes nrMeasurements(std::chrono::milliseconds now, std::span<const NRMeasurement> cells, const Cell* serving,
                      NRMeasurementLayout layout) {
   constexpr std::size_t headSize = 33, oldLayerSize = 32, newLayerSize = 40;
-  constexpr std::int64_t period_20ms = 20;
-  const bool isOld = layout == NRMeasurementLayout::Version2_9;
+  constexpr std::int64_t periodOf20Milliseconds = 20;
+  const bool isOld = layout == NRMeasurementLayout::Version2Minor9;
   const auto count = std::ssize(cells);
   const std::int64_t servingCode = serving ? serving->code : noServingCell;
   const auto found =
@@ -135,7 +135,7 @@ Bytes nrMeasurements(std::chrono::milliseconds now, std::span<const NRMeasuremen
   const NRMeasurement& best = cells.front();
 
   PacketWriter packet(measurementsCode, now, headSize);
-  packet.u32(13, isOld ? version(2, 9) : version(3, 0)).u8(21, 1).u8(22, period_20ms);
+  packet.u32(13, isOld ? version(2, 9) : version(3, 0)).u8(21, 1).u8(22, periodOf20Milliseconds);
   PacketWriter& layer = packet.record(isOld ? oldLayerSize : newLayerSize).u32(0, best.cell->channel);
   if (isOld)
     layer.u8(4, count).u8(5, servingIndex).u16(6, servingCode).u8(8, beamOf(*best.cell));

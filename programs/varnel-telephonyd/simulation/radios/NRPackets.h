@@ -22,22 +22,22 @@ struct NRMeasurement {
 std::vector<NRMeasurement> measureNRCells(const Walk& walk, Random& random);
 
 /// 0xB822, in its two layouts: what the master information block of a cell says.
-enum class NRMasterInformationLayout { Version3, Version2_0 };
+enum class NRMasterInformationLayout { Version3, Version2Minor0 };
 Bytes nrMasterInformation(std::chrono::milliseconds now, const Cell& cell, NRMasterInformationLayout layout);
 
 /// 0xB823: the identity of a cell, its channels, and its network.
-enum class NRServingCellLayout { Version4, Version3_2 };
+enum class NRServingCellLayout { Version4, Version3Minor2 };
 Bytes nrServingCell(std::chrono::milliseconds now, const Cell& cell, NRServingCellLayout layout);
 
 /// 0xB97F: the measured cells of one carrier with a beam each. Without a serving cell there is none of NR.
-enum class NRMeasurementLayout { Version2_9, Version3_0 };
+enum class NRMeasurementLayout { Version2Minor9, Version3Minor0 };
 Bytes nrMeasurements(std::chrono::milliseconds now, std::span<const NRMeasurement> cells, const Cell* serving,
                      NRMeasurementLayout layout);
 
 /// TS 24.501 5.1.3.2, numbered as in the packets.
 enum class FiveGMMState { Deregistered = 1, Registering = 2, Registered = 3 };
 /// 0xB80C, in its two layouts.
-enum class NRRegistrationLayout { Version1, Version3_0 };
+enum class NRRegistrationLayout { Version1, Version3Minor0 };
 Bytes nrRegistration(const Situation& situation, FiveGMMState state, const TemporaryName& name,
                      NRRegistrationLayout layout);
 

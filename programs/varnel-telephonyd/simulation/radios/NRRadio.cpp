@@ -99,8 +99,9 @@ void NRRadio::report() {
   const auto cells = measureNRCells(situation.walk, _random);
   if (cells.empty()) return;
   const Cell* serving = servingCell(cells);
-  _link.send(nrMeasurements(situation.now, cells, serving,
-                            isEven ? NRMeasurementLayout::Version2_9 : NRMeasurementLayout::Version3_0));
+  _link.send(
+      nrMeasurements(situation.now, cells, serving,
+                     isEven ? NRMeasurementLayout::Version2Minor9 : NRMeasurementLayout::Version3Minor0));
   if (_reports % 5 == 0) {
     const NRMeasurement& best = cells.front();
     _link.send(nrMessage(situation.now, *best.cell, isAlone() ? alone : besideLTE, NRChannel::UplinkDedicated,
@@ -113,15 +114,15 @@ void NRRadio::reportCell() {
   const bool isEven = _reports % 2 == 0;
   _link.send(nrMasterInformation(
       situation.now, situation.serving,
-      isEven ? NRMasterInformationLayout::Version3 : NRMasterInformationLayout::Version2_0));
+      isEven ? NRMasterInformationLayout::Version3 : NRMasterInformationLayout::Version2Minor0));
   _link.send(nrServingCell(situation.now, situation.serving,
-                           isEven ? NRServingCellLayout::Version4 : NRServingCellLayout::Version3_2));
+                           isEven ? NRServingCellLayout::Version4 : NRServingCellLayout::Version3Minor2));
 }
 
 void NRRadio::reportRegistration() {
-  _link.send(
-      nrRegistration(_link.situation(), _state, _name,
-                     _reports % 2 == 0 ? NRRegistrationLayout::Version1 : NRRegistrationLayout::Version3_0));
+  _link.send(nrRegistration(
+      _link.situation(), _state, _name,
+      _reports % 2 == 0 ? NRRegistrationLayout::Version1 : NRRegistrationLayout::Version3Minor0));
 }
 
 }  // namespace varnel::simulation
