@@ -341,6 +341,13 @@ TEST(LTEMeasurementsLayouts, AnImplausibleCellOrChannelShowsNothing) {
         EXPECT_EQ(differences({}, rowsOf(1, channel)), "") << channel;
     }
   }
+  Bytes last = idleLayout(5).payload();
+  put(last, {8, 0, 9}, 503);
+  put(last, longAt(4), 262143);
+  auto idle = newDecoder();
+  idle.decode(evaluation, last);
+  EXPECT_EQ(idle.text("Physical Cell ID"), "503");
+  EXPECT_EQ(idle.text("EARFCN"), "262143");
   for (const unsigned cell : {504u, 511u}) {
     Bytes payload = idleLayout(5).payload();
     put(payload, {8, 0, 9}, cell);

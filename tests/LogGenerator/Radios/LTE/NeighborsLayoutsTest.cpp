@@ -453,5 +453,27 @@ TEST(LTENeighborsLayouts, TheCellMonitorsNeighborsHaveNoLevels) {
             "");
 }
 
+// A modem that finds no neighbors says so with a header alone.
+TEST(LTENeighborsLayouts, AHeaderAloneIsDecoded) {
+  const auto expectDecoded = [](DescribedLayout layout, std::size_t size) {
+    SCOPED_TRACE(layout.name());
+    Bytes payload = layout.payload();
+    for (const FixedRun& run : layout.fixed)
+      if (run.number == 1) put(payload, run.run, 0);
+    payload.resize(size);
+    auto decoder = newDecoder();
+    EXPECT_EQ(decoder.fateOf(layout.logCode, payload).outcome, MessageFate::Outcome::Decoded);
+    decoder.decode(layout.logCode, payload);
+    EXPECT_EQ(decoder.version(), layout.version.text());
+    EXPECT_EQ(cellCount(decoder), 0u);
+    payload.resize(size - 1);
+    EXPECT_EQ(decoder.fateOf(layout.logCode, payload).outcome, MessageFate::Outcome::TooShort);
+  };
+  expectDecoded(connectedMeasurement(3), 24);
+  expectDecoded(connectedMeasurement(4), 28);
+  expectDecoded(idleNeighbors(4), 8);
+  expectDecoded(idleNeighbors(5), 12);
+}
+
 }  // namespace
 }  // namespace varnel::lte
