@@ -270,6 +270,18 @@ Found find(const Packet& packet, std::uint32_t logCode) {
   return findNAS(payload, *nas);
 }
 
+// A message with a protocol discriminator that is not of EPS (TS 24.007 11.2.3.1.1) may begin with ciphered
+// octets, but not under the codes of plain messages.
+std::string_view epsNASNameIn(ByteView message, std::uint32_t logCode) {
+  constexpr std::uint32_t plainCodes[] = {0xB0E2, 0xB0E3, 0xB0EC, 0xB0ED};
+  constexpr unsigned session = 2, mobility = 7;
+  const unsigned discriminator = Packet(message).u8(0) & 0xFU;
+  if (discriminator != session && discriminator != mobility &&
+      std::ranges::find(plainCodes, logCode) != std::end(plainCodes))
+    return unknownMessage;
+  return epsNASName(message);
+}
+
 std::string_view nameIn(const Found& found, std::uint32_t logCode) {
   const AirMessage& message = found.message;
   if (message.protocol == Protocol::RRC)
@@ -279,7 +291,7 @@ std::string_view nameIn(const Found& found, std::uint32_t logCode) {
     return message.channel == randomAccess ? "Channel Request" : gsmRRName(found.type);
   if (logCode == circuitNASCode || logCode == circuitNASOfSubscriptionCode)
     return circuitNASName(message.bytes);
-  return message.radio == Radio::LTE ? epsNASName(message.bytes) : fiveGNASName(message.bytes);
+  return message.radio == Radio::LTE ? epsNASNameIn(message.bytes, logCode) : fiveGNASName(message.bytes);
 }
 
 }  // namespace

@@ -559,6 +559,11 @@ TEST(AirMessageNames, AProtectedSessionMessageWithoutADiscriminatorIsSecurityPro
   EXPECT_EQ(nameIn(lteNAS(0xB0E1, {0x9B, 0x01, 0xC1, 0x55}), 0xB0E1), "Security Protected (ciphered)");
 }
 
+TEST(AirMessageNames, APlainMessageOfAnotherProtocolIsUnknown) {
+  for (const std::uint32_t logCode : {0xB0E2U, 0xB0E3U, 0xB0ECU, 0xB0EDU})
+    EXPECT_EQ(nameIn(lteNAS(logCode, {0x05, 0x41, 0xC1}), logCode), "Unknown") << logCode;
+}
+
 TEST(AirMessageNames, AProtectedSessionMessageThatCanBeReadHasItsName) {
   EXPECT_EQ(nameIn(lteNAS(0xB0E0, {0x62, 0x07, 0xC5, 0x55}), 0xB0E0),
             "Activate dedicated EPS bearer context request");

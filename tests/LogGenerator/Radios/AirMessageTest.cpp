@@ -134,7 +134,8 @@ TEST(AirMessageReader, ANASMessageOfLTEIsNamedByItsType) {
   EXPECT_EQ(nameOfNAS({0x17, 1, 2, 3, 4, 5, 0x07, 0x48}), "Tracking area update request");
   EXPECT_EQ(nameOfNAS({0x27, 1, 2, 3, 4, 5, 0x07, 0x48}), "Security Protected (ciphered)");
   EXPECT_EQ(nameOfNAS({0x37, 1, 2, 3, 4, 5, 0x07, 0x5D}), "Security mode command");
-  EXPECT_EQ(nameOfNAS({0x95, 0x13}), "Security Protected (ciphered)");
+  EXPECT_EQ(readAlone(lteNASPacket(0xB0E0, {0x95, 0x13}), 0xB0E0).message->name,
+            "Security Protected (ciphered)");
   EXPECT_EQ(nameOfNAS({0x07, 0x40}), "Unknown");
   EXPECT_EQ(nameOfNAS({0x07}), "Unknown");
   EXPECT_EQ(nameOfNAS({}), "none");
