@@ -245,6 +245,18 @@ TEST_F(LastMessagesSection, ANewDecoderGoesOnWithAFullList) {
   EXPECT_EQ(described(list.back().dictionary()->get("Length")), quoted("2"));
 }
 
+TEST_F(LastMessagesSection, AnotherSectionStartsWithItsOwnMessages) {
+  give(decoder, reconfiguration(5), 0xB0C0);
+  EXPECT_EQ(lengths(), "5 ");
+  const Value first = section;
+  section = Value::ofDictionary();
+  decoder.updateSectionRef(section);
+  give(decoder, reconfiguration(6), 0xB0C0);
+  EXPECT_EQ(lengths(), "6 ");
+  EXPECT_EQ(shown(section, "Version"), quoted("26"));
+  EXPECT_EQ(first.dictionary()->get("Messages").array()->size(), 1U);
+}
+
 // Counts
 
 namespace {
@@ -333,6 +345,16 @@ TEST_F(CountsSection, ANewDecoderGoesOnWithOthersToo) {
 TEST_F(CountsSection, ManyMessagesAreCountedOneByOne) {
   for (unsigned i = 0; i < 70000; ++i) give(decoder, gsmRR(0x85, 0x0D, {0x06, 0x0D}), 0x512F);
   EXPECT_EQ(described(section), R"({GSM RR Channel Release: "70000"})");
+}
+
+TEST_F(CountsSection, AnotherSectionStartsAnew) {
+  give(decoder, reconfiguration(5), 0xB0C0);
+  give(decoder, reconfiguration(5), 0xB0C0);
+  const Value second = Value::ofDictionary();
+  decoder.updateSectionRef(second);
+  give(decoder, reconfiguration(5), 0xB0C0);
+  EXPECT_EQ(shown(second, "LTE RRC RRCConnectionReconfiguration"), quoted("1"));
+  EXPECT_EQ(shown(section, "LTE RRC RRCConnectionReconfiguration"), quoted("2"));
 }
 
 // Connection
