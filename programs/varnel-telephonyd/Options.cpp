@@ -3,7 +3,6 @@
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
-#include <algorithm>
 #include <iostream>
 #include <limits>
 #include <vector>
@@ -46,7 +45,7 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
   app.add_option("--technology", options.replayTechnology,
                  "the modem that was captured; unless given, the one that the capture names, else all-radios")
       ->needs(replay)
-      ->check(CLI::IsMember(replayedTechnologies()))
+      ->check(CLI::IsMember(technologies))
       ->type_name("TECHNOLOGY");
   app.add_option("--speed", options.speed, "replay this many times as fast")
       ->needs(replay)
@@ -113,14 +112,6 @@ ExitStatus mistake(const std::string& text) {
 }
 
 }  // namespace
-
-std::vector<std::string> replayedTechnologies() {
-  const auto simulated = simulatedTechnologies();
-  std::vector<std::string> names(simulated.begin(), simulated.end());
-  if (std::ranges::find(names, technology::allRadios) == names.end())
-    names.emplace_back(technology::allRadios);
-  return names;
-}
 
 std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
                                               const std::string& version) {

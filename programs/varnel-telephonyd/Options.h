@@ -4,7 +4,6 @@
 #include <optional>
 #include <string>
 #include <variant>
-#include <vector>
 
 #include "base/Log.h"
 #include "host/RecordingFile.h"
@@ -33,9 +32,6 @@ struct Options {
 struct ExitStatus {
   int code;
 };
-
-/// Every technology that a replayed capture can be of.
-std::vector<std::string> replayedTechnologies();
 
 /// Reads the command line. Help and version go to standard output; a mistake is one line on standard error.
 std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,

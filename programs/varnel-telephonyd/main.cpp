@@ -104,8 +104,8 @@ std::string technologyOf(const Options& options, PipeReader* pipe) {
   if (options.simulatedTechnology) return *options.simulatedTechnology;
   const auto named = technologyOfCapture(options, pipe);
   if (options.replayTechnology) return *options.replayTechnology;
-  const auto known = replayedTechnologies();
-  const bool isKnown = named && std::ranges::find(known, *named) != known.end();
+  const auto known = simulatedTechnologies();
+  const bool isKnown = named && std::ranges::find(known, *named) != std::ranges::end(known);
   return isKnown ? *named : std::string(technology::allRadios);
 }
 
