@@ -241,7 +241,12 @@ std::vector<CodeSections> RadioGroups::codeSections() const {
 
 NumberFormats RadioGroups::numberFormats() const {
   NumberFormats formats = _c2k.numberFormats();
-  for (const auto& index : _indexes) index->listNumberFormats(formats);
+  for (const Group& group : _groups) {
+    for (const auto& [name, value] : *group.sections) {
+      SectionFormats section(formats, name);
+      if (const Base* decoder = decoderOf(group, name)) decoder->listNumberFormats(section);
+    }
+  }
   return formats;
 }
 

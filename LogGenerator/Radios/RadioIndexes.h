@@ -5,6 +5,9 @@
 #include "LogGenerator/KLV/LTE/ReselectionCandidatesList.h"
 #include "LogGenerator/KLV/LTE/ReselectionCandidatesMisc.h"
 #include "LogGenerator/KLV/Subscriber/PDPContextList.h"
+#include "LogGenerator/Radios/GSM/GPRSInformation.h"
+#include "LogGenerator/Radios/GSM/GSMServingCell.h"
+#include "LogGenerator/Radios/GSM/GSMSet.h"
 #include "LogGenerator/Radios/LTE/Bearers.h"
 #include "LogGenerator/Radios/LTE/Carriers.h"
 #include "LogGenerator/Radios/LTE/Connection.h"
@@ -22,6 +25,10 @@
 #include "LogGenerator/Radios/NR/Registration.h"
 #include "LogGenerator/Radios/NR/ServingCell.h"
 #include "LogGenerator/Radios/SubscriberFiles.h"
+#include "LogGenerator/Radios/UMTS/ActiveSet.h"
+#include "LogGenerator/Radios/UMTS/EquivalentPLMNs.h"
+#include "LogGenerator/Radios/UMTS/UMTSRRInfo.h"
+#include "LogGenerator/Radios/UMTS/UMTSSet.h"
 
 namespace varnel::radios {
 
@@ -69,6 +76,16 @@ class NRIndex final : public ClassIndex {
 class CorrectedIndex final : public ClassIndex {
  public:
   explicit CorrectedIndex(Shared& shared) : ClassIndex(shared.standardOutput) {}
+
+ private:
+  CellMonitorReader _cellMonitor;
+  std::unique_ptr<ActiveSet> activeSet = create<ActiveSet>();
+  std::unique_ptr<UMTSSet> umtsSet = create<UMTSSet>(_cellMonitor);
+  std::unique_ptr<UMTSRRInfo> umtsRRInfo = create<UMTSRRInfo>(_cellMonitor);
+  std::unique_ptr<EquivalentPLMNs> equivalentPLMNs = create<EquivalentPLMNs>();
+  std::unique_ptr<GSMServingCell> gsmServingCell = create<GSMServingCell>(_cellMonitor);
+  std::unique_ptr<GSMSet> gsmSet = create<GSMSet>();
+  std::unique_ptr<GPRSInformation> gprsInformation = create<GPRSInformation>();
 };
 
 /// The sections about the subscriber, which all radios share.
