@@ -43,6 +43,15 @@ std::span<std::uint8_t> unescaped(std::span<std::uint8_t> segment) {
 }
 
 std::optional<std::span<std::uint8_t>> FrameScanner::next() {
+  for (;;) {
+    if (const auto contents = nextAtHand()) return contents;
+    if (_bytes.more()) continue;
+    endStream();
+    return std::nullopt;
+  }
+}
+
+std::optional<std::span<std::uint8_t>> FrameScanner::nextAtHand() {
   while (const auto segment = nextSegment()) {
     const std::span<std::uint8_t> frame = unescaped(*segment);
     if (frame.size() >= smallestSegment && isSound(frame)) {
@@ -54,7 +63,7 @@ std::optional<std::span<std::uint8_t>> FrameScanner::next() {
   return std::nullopt;
 }
 
-// The bytes between two frame ends, if their number fits a frame.
+// The bytes between two frame ends, if their number fits a frame; nothing when more must be read.
 std::optional<std::span<std::uint8_t>> FrameScanner::nextSegment() {
   for (;;) {
     const auto unread = _bytes.unread();
@@ -67,8 +76,6 @@ std::optional<std::span<std::uint8_t>> FrameScanner::nextSegment() {
         _searched = 0;
         _isWithinNoise = true;
       }
-      if (_bytes.more()) continue;
-      endStream();
       return std::nullopt;
     }
     const auto length = static_cast<std::size_t>(end - unread.data());
@@ -87,6 +94,8 @@ void FrameScanner::endStream() {
   if (rest > 0) ++_leftOut.torn;
   _bytes.drop(rest);
   _searched = 0;
+  _isWithinNoise = false;
+  _mayBeTorn = true;
 }
 
 void FrameScanner::countUnsound() {

@@ -18,10 +18,13 @@ class FrameScanner {
   /// The contents of the next sound frame, without its checksum; nothing at the end. The caller may change
   /// the bytes. Frames that are not sound are counted. Valid until the next call. Throws CaptureError.
   std::optional<std::span<std::uint8_t>> next();
+  /// The same among the bytes that were read already; nothing when no more frames end in them.
+  std::optional<std::span<std::uint8_t>> nextAtHand();
+  /// Counts what was read after the last frame end as a torn frame. The stream may begin anew after this.
+  void endStream();
 
  private:
   std::optional<std::span<std::uint8_t>> nextSegment();
-  void endStream();
   void countUnsound();
 
   ByteWindow& _bytes;

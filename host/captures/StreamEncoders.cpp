@@ -1,22 +1,12 @@
 #include "host/captures/StreamEncoders.h"
 
-#include "host/captures/FrameChecksum.h"
+#include "host/captures/FrameEncoding.h"
 #include "host/captures/LittleEndian.h"
 #include "host/captures/LogFrame.h"
 
 namespace varnel {
 
 namespace {
-
-constexpr std::uint8_t frameEnd = 0x7E, escape = 0x7D, escapeBit = 0x20;
-
-void appendEscaped(Bytes& frame, ByteView bytes) {
-  for (const std::uint8_t byte : bytes) {
-    const bool isSpecial = byte == frameEnd || byte == escape;
-    if (isSpecial) frame.push_back(escape);
-    frame.push_back(isSpecial ? byte ^ escapeBit : byte);
-  }
-}
 
 void appendSubscription(Bytes& contents, std::uint8_t subscription) {
   contents.insert(contents.end(), {frameCommand::ofSubscription, 1, 0, 0});
@@ -34,10 +24,8 @@ ByteView FramedWriter::encode(const CaptureRecord& record) {
   _contents.insert(_contents.end(), {frameCommand::log, 0});
   appendLittleEndian(_contents, length);
   _contents.insert(_contents.end(), log.begin(), log.end());
-  appendLittleEndian(_contents, frameChecksum(_contents));
   _frame.clear();
-  appendEscaped(_frame, _contents);
-  _frame.push_back(frameEnd);
+  appendFramed(_frame, _contents);
   return _frame;
 }
 
