@@ -1,11 +1,14 @@
 #pragma once
 
 #include <chrono>
+#include <cstddef>
+#include <cstdint>
 #include <functional>
 #include <optional>
 #include <string>
 
 #include "base/Bytes.h"
+#include "programs/varnel-telephonyd/CodeFilter.h"
 
 namespace varnel {
 
@@ -19,6 +22,9 @@ struct StreamMessage {
 class MessageSource {
  public:
   virtual ~MessageSource() = default;
+  /// Gets what the viewer has asked for, before the first `next` and whenever it changes. The source may
+  /// still have other messages.
+  virtual void setFilter(const CodeFilter& /*filter*/) {}
   /// The next message, no earlier than the one before; nothing when there is none now. Calling this means
   /// that the message before is done with.
   virtual std::optional<StreamMessage> next() = 0;
@@ -39,6 +45,10 @@ class MessageSource {
   };
   /// A stream that is not live waits.
   virtual Lateness lateness() const { return Lateness::Waits; }
+  /// How many messages were lost since the last call because the receiver took too few.
+  virtual std::uint64_t takeLost() { return 0; }
+  /// How many messages wait in a source that is live.
+  virtual std::size_t waiting() const { return 0; }
   /// One sentence for the user about the end of the stream; empty when there is nothing to tell.
   virtual std::string endNote() const { return {}; }
   /// Whether the server's user knows about the end from another viewer's stream.

@@ -25,10 +25,16 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
   const std::vector<std::string> technologies(simulated.begin(), simulated.end());
 
   app.description(
-      "Serves the log channel to viewers, from a simulated modem or from a capture. One of --simulate and "
-      "--replay is needed. SIGINT and SIGTERM end it.");
+      "Serves the log channel to viewers, from a modem's diagnostic port, from a simulated modem, or from a "
+      "capture. One of --port, --simulate, and --replay is needed. SIGINT and SIGTERM end it.");
   app.set_version_flag("--version", programName + (" " + version));
+  auto* port =
+      app.add_option("--port", options.portPath,
+                     "show what a modem's diagnostic port sends, such as /dev/ttyUSB0; the modem sends "
+                     "only what viewers ask for, and nothing any more at the end")
+          ->type_name("DEVICE");
   auto* simulate = app.add_option("--simulate", options.simulatedTechnology, "simulate a modem")
+                       ->excludes(port)
                        ->check(CLI::IsMember(technologies))
                        ->type_name("TECHNOLOGY");
   app.add_option("--seed", options.seed, "the same seed makes the modem send the same messages")
@@ -41,6 +47,7 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
                      "between them; every viewer gets them from the start; - is a pipe, read once, by one "
                      "viewer at a time")
           ->excludes(simulate)
+          ->excludes(port)
           ->type_name("CAPTURE");
   app.add_option("--technology", options.replayTechnology,
                  "the modem that was captured; unless given, the one that the capture names, else all-radios")
@@ -95,7 +102,8 @@ std::optional<std::string> conflictOfPipe(const Options& options) {
 
 // What is wrong with the combination of valid options; nothing when they go together.
 std::optional<std::string> conflict(const Options& options) {
-  if (!options.simulatedTechnology && !options.replayPath) return "one of --simulate and --replay is needed";
+  if (!options.portPath && !options.simulatedTechnology && !options.replayPath)
+    return "one of --port, --simulate, and --replay is needed";
   if (!options.replayPath) return std::nullopt;
   if (const auto found = conflictOfPipe(options)) return found;
   const bool isPlayable = options.speed >= slowest && options.speed <= fastest;  // false for NaN

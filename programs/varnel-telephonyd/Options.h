@@ -10,8 +10,10 @@
 
 namespace varnel {
 
-/// What the program is asked to do. Either `simulatedTechnology` or `replayPath` is set.
+/// What the program is asked to do. One of `portPath`, `simulatedTechnology`, and `replayPath` is set.
 struct Options {
+  std::optional<std::string> portPath;
+
   std::optional<std::string> simulatedTechnology;
   std::uint64_t seed = 1;
 

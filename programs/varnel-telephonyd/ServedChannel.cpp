@@ -14,7 +14,7 @@ namespace {
 using namespace std::chrono_literals;
 
 // After this many, other channels get a turn.
-constexpr int messagesAtATime = 64;
+constexpr int messagesAtATime = 1024;
 constexpr std::chrono::milliseconds retryInterval = 20ms;
 constexpr std::chrono::milliseconds patience = 5s;
 // A capture that is played again and again must not fill the log.
@@ -78,9 +78,10 @@ std::optional<Bytes> ServedChannel::takeCommand(ByteView data) {
 // If the stream already runs, it goes on with the new codes.
 void ServedChannel::start(CodeFilter filter) {
   _filter = std::move(filter);
-  if (_source) return;
+  if (_source) return _source->setFilter(_filter);
   _source = _host.makeSource();
   _startedAt = _host.uptime();
+  _source->setFilter(_filter);
   _source->setNewsHandler([this] {
     if (_next || !_ended) return;
     takeNext();
@@ -108,6 +109,7 @@ void ServedChannel::takeNext() {
   _isReceived = false;
   const bool isEndTold = _source->isEndTold();
   _next = _source->next();
+  countLost(_source->takeLost());
   noteWait();
   if (_next || _source->isWaiting()) return;
   const std::string sentence = _source->endNote();
@@ -169,7 +171,13 @@ ServedChannel::Delivery ServedChannel::refuseLength(std::size_t length) {
   return Delivery::Done;
 }
 
+void ServedChannel::countLost(std::uint64_t messages) {
+  _counts.received += messages;
+  _counts.dropped += messages;
+}
+
 void ServedChannel::end() {
+  if (_source && _ended) countLost(_source->takeLost() + _source->waiting());
   if (_next && _isReceived) {
     // What is handed on is counted with the viewer that gets it.
     if (_source->lateness() == MessageSource::Lateness::IsHandedOn) {

@@ -67,6 +67,7 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   Delivery refuseLength(std::size_t length);
   void takeNext();
   void noteWait();
+  void countLost(std::uint64_t messages);
   void endWithoutCommand();
   void reportToViewer();
 

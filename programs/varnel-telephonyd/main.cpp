@@ -28,6 +28,8 @@
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "programs/varnel-telephonyd/TelephonyServer.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
+#include "programs/varnel-telephonyd/sources/DiagnosticPort.h"
+#include "programs/varnel-telephonyd/sources/LivePort.h"
 
 namespace varnel {
 
@@ -101,6 +103,7 @@ std::optional<std::string> technologyOfCapture(const Options& options, PipeReade
 
 // The technology that viewers are told. Opens the capture, if there is one, to ask it. Throws CaptureError.
 std::string technologyOf(const Options& options, PipeReader* pipe) {
+  if (options.portPath) return std::string(technology::allRadios);
   if (options.simulatedTechnology) return *options.simulatedTechnology;
   const auto named = technologyOfCapture(options, pipe);
   if (options.replayTechnology) return *options.replayTechnology;
@@ -125,6 +128,34 @@ std::unique_ptr<PipedReplay> makePipedReplay(const Options& options, MainQueue& 
   return replay;
 }
 
+// The port, if a modem's port is what is served. Its device is not open yet.
+std::unique_ptr<LivePort> makeLivePort(const Options& options, MainQueue& queue, HostApplication& application,
+                                       const std::function<void()>& tellServing) {
+  if (!options.portPath) return nullptr;
+  const std::string& path = *options.portPath;
+  const auto tellModem = [path, tellServing](const std::string& build) {
+    tell(path + " is the diagnostic port of a modem" + (build.empty() ? "" : ", build " + build));
+    tellServing();
+  };
+  const auto giveUp = [&application](const std::string& why) {
+    tell(why);
+    application.end(generalError);
+  };
+  return std::make_unique<LivePort>(LivePort::Setup{.device = std::make_unique<DiagnosticPort>(path),
+                                                    .queue = queue,
+                                                    .uptime = uptime,
+                                                    .name = path,
+                                                    .tell = tell,
+                                                    .ready = tellModem,
+                                                    .failed = giveUp});
+}
+
+// Ends the program. A modem is made quiet first, unless the user asks twice.
+void end(HostApplication& application, LivePort* port) {
+  if (!port || port->isEnding()) return application.end(0);
+  port->end([&application] { application.end(0); });
+}
+
 int serve(int& argumentCount, char** arguments, const Options& options) {
   // A capture that cannot be replayed is reported now, not when the first viewer comes.
   std::unique_ptr<PipeReader> reader = makePipeReader(options);
@@ -133,33 +164,47 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
 
   raiseDescriptorLimit(mostFiles);
   HostApplication application(argumentCount, arguments);
-  const SignalWatcher signals({SIGINT, SIGTERM}, [&](int /*signal*/) { application.end(0); });
+  std::unique_ptr<LivePort> livePort;
+  const SignalWatcher signals({SIGINT, SIGTERM}, [&](int /*signal*/) { end(application, livePort.get()); });
   const HostLog log({.programName = programName, .standardErrorLevel = options.logLevel});
   const std::filesystem::path folder = runtimeFolder(options.runtimeFolder);
   SocketPorts ports(folder);
   EventLoopQueue queue;
   const std::unique_ptr<PipedReplay> pipedReplay =
       makePipedReplay(options, queue, std::move(reader), unasked);
+  const auto tellServing = [&] {
+    tell("serving " + technology + " in " + folder.string() + "; now start varnel" +
+         (options.runtimeFolder ? " --runtime-dir " + *options.runtimeFolder : ""));
+  };
+  livePort = makeLivePort(options, queue, application, tellServing);
+  const auto makeAnySource = [&] {
+    if (livePort) return livePort->makeSource();
+    return pipedReplay ? pipedReplay->makeSource() : makeSource(options, unasked);
+  };
   std::unique_ptr<Recorder> recorder;
-  TelephonyServer server(
-      {.ports = ports,
-       .queue = queue,
-       .uptime = uptime,
-       .technology = technology,
-       .makeSource = [&] { return pipedReplay ? pipedReplay->makeSource() : makeSource(options, unasked); },
-       .messageSent =
-           [&](ByteView message) {
-             if (recorder) recorder->record(message);
-           },
-       .tell = tell});
+  TelephonyServer server({.ports = ports,
+                          .queue = queue,
+                          .uptime = uptime,
+                          .technology = technology,
+                          .makeSource = makeAnySource,
+                          .messageSent =
+                              [&](ByteView message) {
+                                if (recorder) recorder->record(message);
+                              },
+                          .tell = tell});
   const TelephonyListener listener(
       folder, [&](std::string_view viewerPortName) { return server.createLogChannel(viewerPortName); });
   recorder = makeRecorder(options, queue, server, technology);
-  tell("serving " + technology + " in " + folder.string() + "; now start varnel" +
-       (options.runtimeFolder ? " --runtime-dir " + *options.runtimeFolder : ""));
+  if (livePort) {
+    livePort->open();
+  } else {
+    tellServing();
+  }
   const int status = application.run();
   server.end();
+  if (status != 0) return status;
   tell(inWords(server.counts()));
+  if (livePort) tell(inWords(livePort->records(), livePort->leftOut()));
   return status;
 }
 

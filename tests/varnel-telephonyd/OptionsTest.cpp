@@ -37,6 +37,14 @@ TEST(TelephonydOptions, ASimulation) {
   EXPECT_EQ(reading.options().recordPath, std::nullopt);
 }
 
+TEST(TelephonydOptions, AModemsPort) {
+  const Reading reading = read({"--port", "/dev/ttyUSB0", "--record", "a"});
+  EXPECT_EQ(reading.error, "");
+  EXPECT_EQ(reading.options().portPath, "/dev/ttyUSB0");
+  EXPECT_EQ(reading.options().recordPath, "a");
+  EXPECT_FALSE(reading.options().simulatedTechnology);
+}
+
 TEST(TelephonydOptions, AReplayAndItsDefaults) {
   const Reading reading = read({"--replay", "walk.pcap"});
   EXPECT_EQ(reading.error, "");
@@ -73,6 +81,10 @@ TEST(TelephonydOptions, ARecordingMayReplaceAnEarlierOneWhereThatIsSaid) {
 TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
   const std::vector<std::vector<const char*>> mistakes = {
       {},
+      {"--port"},
+      {"--port", "/dev/ttyUSB0", "--simulate", "kalvi-lte"},
+      {"--port", "/dev/ttyUSB0", "--replay", "walk.pcap"},
+      {"--port", "/dev/ttyUSB0", "--technology", "kalvi-lte"},
       {"--simulate", "kalvi-5g"},
       {"--replay", "walk.pcap", "--technology", "kalvi-5g"},
       {"--simulate", "kalvi-lte", "--replay", "walk.pcap"},
@@ -103,8 +115,9 @@ TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
 TEST(TelephonydOptions, HelpAndVersionGoToStandardOutput) {
   const Reading help = read({"--help"});
   EXPECT_EQ(std::get<ExitStatus>(help.choice).code, 0);
-  for (const char* option : {"--simulate", "--seed", "--replay", "--technology", "--speed", "--loop",
-                             "--record", "--overwrite", "--runtime-dir", "--log-level", "--version"})
+  for (const char* option :
+       {"--port", "--simulate", "--seed", "--replay", "--technology", "--speed", "--loop", "--record",
+        "--overwrite", "--runtime-dir", "--log-level", "--version"})
     EXPECT_THAT(help.output, HasSubstr(option));
   const Reading version = read({"--version"});
   EXPECT_EQ(std::get<ExitStatus>(version.choice).code, 0);

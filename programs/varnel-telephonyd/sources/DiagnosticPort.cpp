@@ -1,0 +1,143 @@
+#include "programs/varnel-telephonyd/sources/DiagnosticPort.h"
+
+#include <fcntl.h>
+#include <grp.h>
+#include <sys/file.h>
+#include <sys/ioctl.h>
+#include <sys/stat.h>
+#include <termios.h>
+#include <unistd.h>
+
+#include <array>
+#include <cerrno>
+#include <cstddef>
+
+#include "programs/varnel-telephonyd/sources/PortHolders.h"
+#include "programs/varnel-telephonyd/sources/PortTrouble.h"
+
+namespace varnel {
+
+namespace {
+
+// Per turn of the event loop. The viewers' channels can send more messages in a turn than these bytes hold.
+constexpr std::size_t mostPerTurn = 1 << 14;
+// A port that takes nothing gets no more. Requests are few and short.
+constexpr std::size_t mostOutgoing = 1 << 16;
+
+// The group whose members may read and write the device; empty when there is none.
+std::string groupOf(const struct stat& status) {
+  constexpr mode_t both = S_IRGRP | S_IWGRP;
+  if ((status.st_mode & both) != both) return {};
+  std::array<char, 4096> text{};
+  group entry{};
+  group* found = nullptr;
+  if (::getgrgid_r(status.st_gid, &entry, text.data(), text.size(), &found) == 0 && found)
+    return entry.gr_name;
+  return std::to_string(status.st_gid);
+}
+
+std::string troubleOfOpening(const std::string& path, const struct stat& status, int error) {
+  switch (error) {
+    case ENOENT:
+    case ENXIO:
+    case ENODEV:
+      return troubleOfMissing(path);
+    case EACCES:
+    case EPERM:
+      return troubleOfPermission(path, groupOf(status));
+    case EBUSY:
+      return troubleOfBusy(path, holdersOf(status.st_rdev));
+    default:
+      return troubleOfSystem(path, error);
+  }
+}
+
+// Raw, eight bits, no parity, one stop bit. What is no serial line has no such settings and needs none. The
+// speed of a line over USB has no meaning.
+void makeRaw(int device) {
+  termios settings{};
+  if (::tcgetattr(device, &settings) != 0) return;
+  ::cfmakeraw(&settings);
+  settings.c_cflag &= ~static_cast<tcflag_t>(CSTOPB | CRTSCTS);
+  settings.c_cflag |= CLOCAL | CREAD;
+  settings.c_cc[VMIN] = 1;
+  settings.c_cc[VTIME] = 0;
+  ::tcsetattr(device, TCSANOW, &settings);
+}
+
+bool hasNothingNow(int error) { return error == EAGAIN || error == EINTR; }
+
+}  // namespace
+
+std::optional<std::string> DiagnosticPort::open(Handlers handlers) {
+  struct stat status {};
+  if (::stat(_path.c_str(), &status) != 0)
+    return troubleOfOpening(_path, status, errno == ENOTDIR ? ENOENT : errno);
+  if (!S_ISCHR(status.st_mode)) return troubleOfNoDevice(_path);
+  FileDescriptor device(::open(_path.c_str(), O_RDWR | O_NOCTTY | O_NONBLOCK | O_CLOEXEC));
+  if (!device.isOpen()) return troubleOfOpening(_path, status, errno);
+  if (const std::string holders = holdersOf(status.st_rdev); !holders.empty())
+    return troubleOfBusy(_path, holders);
+  // Other programs of this kind respect the lock, and others than root the exclusive use.
+  if (::flock(device.number(), LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK)
+    return troubleOfBusy(_path, {});
+  ::ioctl(device.number(), TIOCEXCL);
+  makeRaw(device.number());
+  _handlers = std::move(handlers);
+  _device = std::move(device);
+  _room.resize(mostPerTurn);
+  _readable = std::make_unique<QSocketNotifier>(_device.number(), QSocketNotifier::Read);
+  QObject::connect(_readable.get(), &QSocketNotifier::activated, _readable.get(), [this] { readBytes(); });
+  _writable = std::make_unique<QSocketNotifier>(_device.number(), QSocketNotifier::Write);
+  _writable->setEnabled(false);
+  QObject::connect(_writable.get(), &QSocketNotifier::activated, _writable.get(), [this] { writeBytes(); });
+  return std::nullopt;
+}
+
+void DiagnosticPort::send(ByteView bytes) {
+  if (!_device.isOpen() || bytes.size() > mostOutgoing - _outgoing.size()) return;
+  _outgoing.insert(_outgoing.end(), bytes.begin(), bytes.end());
+  writeBytes();
+}
+
+void DiagnosticPort::close() {
+  for (auto* const notifier : {&_readable, &_writable}) {
+    if (!*notifier) continue;
+    (*notifier)->setEnabled(false);
+    notifier->release()->deleteLater();  // it may be at work now
+  }
+  _outgoing.clear();
+  if (_device.isOpen()) ::ioctl(_device.number(), TIOCNXCL);
+  _device = FileDescriptor();
+}
+
+void DiagnosticPort::readBytes() noexcept {
+  for (std::size_t total = 0; total < mostPerTurn && _device.isOpen();) {
+    const ssize_t count = ::read(_device.number(), _room.data(), _room.size() - total);
+    if (count < 0 && hasNothingNow(errno)) return;
+    if (count <= 0) return goAway();
+    total += static_cast<std::size_t>(count);
+    _handlers.bytesCame(ByteView(_room).first(static_cast<std::size_t>(count)));
+  }
+}
+
+// An error that lasts is met by the reader too.
+void DiagnosticPort::writeBytes() noexcept {
+  while (!_outgoing.empty() && _device.isOpen()) {
+    const ssize_t count = ::write(_device.number(), _outgoing.data(), _outgoing.size());
+    if (count < 0 && hasNothingNow(errno)) break;
+    if (count < 0) {
+      _outgoing.clear();
+    } else {
+      _outgoing.erase(_outgoing.begin(), _outgoing.begin() + count);
+    }
+  }
+  if (_writable) _writable->setEnabled(!_outgoing.empty());
+}
+
+void DiagnosticPort::goAway() {
+  close();
+  _handlers.wentAway();
+}
+
+}  // namespace varnel

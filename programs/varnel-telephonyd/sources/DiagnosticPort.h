@@ -1,0 +1,44 @@
+#pragma once
+
+#include <QSocketNotifier>
+#include <memory>
+#include <optional>
+#include <string>
+#include <utility>
+
+#include "host/FileDescriptor.h"
+#include "programs/varnel-telephonyd/sources/PortDevice.h"
+
+namespace varnel {
+
+/// The character device of a modem's diagnostic port: a serial line, which is made raw (8N1), or a device
+/// that is none. The event loop reads it, a limited number of bytes per turn.
+class DiagnosticPort final : public PortDevice {
+ public:
+  explicit DiagnosticPort(std::string path) : _path(std::move(path)) {}
+  DiagnosticPort(const DiagnosticPort&) = delete;
+  DiagnosticPort& operator=(const DiagnosticPort&) = delete;
+  ~DiagnosticPort() override {
+    _readable.reset();
+    _writable.reset();
+    close();
+  }
+
+  std::optional<std::string> open(Handlers handlers) override;
+  void send(ByteView bytes) override;
+  void close() override;
+
+ private:
+  void readBytes() noexcept;
+  void writeBytes() noexcept;
+  void goAway();
+
+  const std::string _path;
+  Handlers _handlers;
+  FileDescriptor _device;
+  Bytes _room;      // for what is read
+  Bytes _outgoing;  // what the device has not taken yet
+  std::unique_ptr<QSocketNotifier> _readable, _writable;
+};
+
+}  // namespace varnel

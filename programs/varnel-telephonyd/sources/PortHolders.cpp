@@ -1,0 +1,67 @@
+#include "programs/varnel-telephonyd/sources/PortHolders.h"
+
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <fstream>
+#include <string_view>
+#include <system_error>
+
+namespace varnel {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+// Looks only at files in /dev: others may be in file systems that do not answer.
+bool isDevice(const fs::path& openFile, dev_t device) {
+  std::error_code ignored;
+  const std::string target = fs::read_symlink(openFile, ignored).string();
+  struct stat status {};
+  return target.starts_with("/dev/") && ::stat(openFile.c_str(), &status) == 0 && S_ISCHR(status.st_mode) &&
+         status.st_rdev == device;
+}
+
+bool holds(const fs::path& process, dev_t device) {
+  std::error_code error;
+  for (fs::directory_iterator file(process / "fd", error), end; !error && file != end; file.increment(error))
+    if (isDevice(file->path(), device)) return true;
+  return false;
+}
+
+// The system cuts the short name off after 15 characters, so the command line is asked first.
+std::string nameOf(const fs::path& process) {
+  constexpr std::size_t longest = 64;
+  std::string name;
+  std::ifstream commandLine(process / "cmdline");
+  std::getline(commandLine, name, '\0');
+  name = fs::path(name).filename().string();
+  if (name.empty()) {
+    std::ifstream shortName(process / "comm");
+    std::getline(shortName, name);
+  }
+  return name.empty() ? "a program" : name.substr(0, longest);
+}
+
+bool isNumber(std::string_view text) {
+  return !text.empty() &&
+         std::ranges::all_of(text, [](char letter) { return letter >= '0' && letter <= '9'; });
+}
+
+}  // namespace
+
+std::string holdersOf(dev_t device, const fs::path& processes) {
+  const std::string self = std::to_string(::getpid());
+  std::string holders;
+  std::error_code error;
+  for (fs::directory_iterator process(processes, error), end; !error && process != end;
+       process.increment(error)) {
+    const std::string number = process->path().filename().string();
+    if (!isNumber(number) || number == self || !holds(process->path(), device)) continue;
+    holders += (holders.empty() ? "" : " and ") + nameOf(process->path()) + " (process " + number + ")";
+  }
+  return holders;
+}
+
+}  // namespace varnel

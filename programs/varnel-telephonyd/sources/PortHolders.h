@@ -1,0 +1,14 @@
+#pragma once
+
+#include <sys/types.h>
+
+#include <filesystem>
+#include <string>
+
+namespace varnel {
+
+/// The other processes that have the device open, as "ModemManager (process 812)"; several are joined by
+/// "and". Empty when there are none, or when the system does not show them to this user.
+std::string holdersOf(dev_t device, const std::filesystem::path& processes = "/proc");
+
+}  // namespace varnel

@@ -1,0 +1,68 @@
+#include "programs/varnel-telephonyd/sources/PortTrouble.h"
+
+#include <system_error>
+
+namespace varnel {
+
+namespace {
+
+constexpr std::string_view otherPorts =
+    "a modem has several ports, so try the next one (ls -l /dev/serial/by-id)";
+
+}  // namespace
+
+std::string troubleOf(const PortFailure& failure, const std::string& name) {
+  switch (failure.kind) {
+    case PortFailure::Kind::AnswersText:
+      return name + " takes AT commands and is no diagnostic port; " + std::string(otherPorts);
+    case PortFailure::Kind::AnswersNothing:
+      return name + " does not answer as a diagnostic port; " + std::string(otherPorts) +
+             ", or unplug the modem and plug it in again";
+    case PortFailure::Kind::Refuses:
+      return name + " refuses to switch on its logs (" + failure.detail +
+             "); allow it in the settings of the modem, or use another modem";
+    case PortFailure::Kind::FallsSilent:
+      return name + " answers no more; if this goes on, unplug the modem and plug it in again";
+  }
+  return {};
+}
+
+std::string troubleOfUnplugged(const std::string& name) {
+  return name + " is unplugged; plug it in again, and the display goes on";
+}
+
+std::string troubleOfRefusedCodes(const std::string& name, std::size_t equipment, const std::string& detail) {
+  constexpr char digits[] = "0123456789ABCDEF";
+  return name + " refuses to switch on the log codes from 0x" + digits[equipment % 16] + "000 on (" + detail +
+         "); sections that need them stay empty";
+}
+
+std::string troubleOfMissing(const std::string& name) {
+  return "there is no device " + name +
+         "; plug the modem in, or look for its ports with ls /dev/tty* /dev/wwan*";
+}
+
+std::string troubleOfNoDevice(const std::string& name) {
+  return name + " is no device; to play a file back, type --replay " + name;
+}
+
+std::string troubleOfPermission(const std::string& name, const std::string& group) {
+  if (group.empty()) return "you may not open " + name + ", and no group may; start the server with sudo";
+  return "you may not open " + name + ", which belongs to the group " + group + "; type sudo usermod -aG " +
+         group + " $USER, log out, and log in again";
+}
+
+std::string troubleOfBusy(const std::string& name, std::string_view holders) {
+  if (holders.empty())
+    return "another program uses " + name + "; find it with sudo fuser -v " + name + ", and end it";
+  const bool isModemManager = holders.starts_with("ModemManager ");
+  return std::string(holders) + " uses " + name + "; " +
+         (isModemManager ? "type sudo systemctl stop ModemManager" : "end it first");
+}
+
+std::string troubleOfSystem(const std::string& name, int error) {
+  return "cannot open " + name + ": " + std::generic_category().message(error) +
+         "; unplug the modem and plug it in again";
+}
+
+}  // namespace varnel

@@ -1,0 +1,29 @@
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+
+#include "programs/varnel-telephonyd/sources/PortSession.h"
+
+namespace varnel {
+
+// Each is one sentence for the user: what is wrong with a port, and what to do.
+
+std::string troubleOf(const PortFailure& failure, const std::string& name);
+std::string troubleOfUnplugged(const std::string& name);
+/// The modem does not switch on the codes of one equipment, 0 to 15.
+std::string troubleOfRefusedCodes(const std::string& name, std::size_t equipment, const std::string& detail);
+
+/// There is no such device.
+std::string troubleOfMissing(const std::string& name);
+/// It is a file, a folder, or the like.
+std::string troubleOfNoDevice(const std::string& name);
+/// The user may not open it. The group is the one that may; empty when no group may.
+std::string troubleOfPermission(const std::string& name, const std::string& group);
+/// Others have it open, as "ModemManager (process 812)"; empty when they are not known.
+std::string troubleOfBusy(const std::string& name, std::string_view holders);
+/// The system's error is none of the above.
+std::string troubleOfSystem(const std::string& name, int error);
+
+}  // namespace varnel

@@ -1,0 +1,146 @@
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "tests/support/Process.h"
+#include "tests/support/PtyModem.h"
+
+namespace varnel {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::Not;
+using testing::StartsWith;
+
+const Bytes eventsOff{0x60, 0x00}, debugTextOff{0x7D, 5, 0, 0, 0, 0, 0, 0};
+const Bytes allCodesOff{0x73, 0, 0, 0, 0, 0, 0, 0};
+
+// The serving cell of LTE, version 1 of its master information block: the cell, and its antennas.
+Bytes masterInformation(std::uint8_t physicalCell, std::uint8_t antennas) {
+  return {1, physicalCell, 0, 0x2A, 0x14, 0x10, 0, antennas, 50};
+}
+
+// A server at a modem's port, and viewers as text.
+class PortEndToEnd : public testing::Test {
+ protected:
+  std::unique_ptr<Process> server(const std::string& device) const {
+    return std::make_unique<Process>(
+        VARNEL_TELEPHONYD_PROGRAM,
+        std::vector<std::string>{"--port", device, "--runtime-dir", _runtime.path()});
+  }
+  std::unique_ptr<Process> server() const { return server(_modem.link()); }
+  std::unique_ptr<Process> viewer() const {
+    return std::make_unique<Process>(
+        VARNEL_PROGRAM, std::vector<std::string>{"--ui", "text", "--runtime-dir", _runtime.path(),
+                                                 "--device-root", _folder.path(), "--log-level", "3"});
+  }
+  static testing::AssertionResult says(const Process& program, const std::string& part) {
+    if (eventually([&] { return (program.output() + program.error()).find(part) != std::string::npos; }))
+      return testing::AssertionSuccess();
+    return testing::AssertionFailure() << "not said: " << part << ", but:\n"
+                                       << program.output() << program.error();
+  }
+  // Sends the record again and again until the viewer shows the text: a record may come before its link.
+  testing::AssertionResult shows(const Process& viewer, const Bytes& payload, const std::string& text) {
+    if (eventually([&] {
+          _modem.sendLog(0xB0C1, payload);
+          ::usleep(50'000);
+          return viewer.output().find(text) != std::string::npos;
+        }))
+      return testing::AssertionSuccess();
+    return testing::AssertionFailure() << "not shown: " << text << ", but:\n"
+                                       << viewer.output() << viewer.error();
+  }
+  std::vector<Bytes> lastThreeRequests() {
+    const auto all = _modem.requests();
+    return {all.end() - std::min<std::ptrdiff_t>(3, std::ssize(all)), all.end()};
+  }
+
+  TemporaryFolder _runtime, _folder;
+  PtyModem _modem{_folder.file("port")};
+};
+
+TEST_F(PortEndToEnd, AViewerShowsWhatTheModemSendsAndTheModemIsQuietAgainAfterIt) {
+  const auto telephony = server();
+  ASSERT_TRUE(says(*telephony, _modem.link() + " is the diagnostic port of a modem, build TEST.1.0-42\n"));
+  ASSERT_TRUE(says(*telephony, "serving all-radios in "));
+  EXPECT_FALSE(_modem.isOn(0xB0C1));
+  auto varnel = viewer();
+  ASSERT_TRUE(eventually([&] { return _modem.isOn(0xB0C1); })) << telephony->error();
+  EXPECT_FALSE(_modem.isOn(0xB0FF));
+  EXPECT_TRUE(shows(*varnel, masterInformation(77, 2), " 77\n"));
+  varnel.reset();
+  EXPECT_TRUE(eventually([&] { return !_modem.isOn(0xB0C1); }));
+  EXPECT_TRUE(eventually([&] { return lastThreeRequests().back() == debugTextOff; }));
+  EXPECT_THAT(lastThreeRequests(), ElementsAre(eventsOff, allCodesOff, debugTextOff));
+}
+
+TEST_F(PortEndToEnd, TheModemIsQuietAgainWhenTheServerIsAskedToEnd) {
+  const auto telephony = server();
+  const auto varnel = viewer();
+  ASSERT_TRUE(eventually([&] { return _modem.isOn(0xB0C1); })) << telephony->error();
+  telephony->signal(SIGTERM);
+  ASSERT_TRUE(telephony->waitForEnd());
+  EXPECT_EQ(telephony->exitStatus(), 0) << telephony->error();
+  EXPECT_FALSE(_modem.isOn(0xB0C1));
+  EXPECT_THAT(lastThreeRequests(), ElementsAre(eventsOff, allCodesOff, debugTextOff));
+  EXPECT_THAT(telephony->error(), HasSubstr("\nvarnel-telephonyd: port: 0 records, 0 frames left out\n"));
+}
+
+TEST_F(PortEndToEnd, AfterTheModemWasUnpluggedTheDisplayGoesOn) {
+  const auto telephony = server();
+  const auto varnel = viewer();
+  ASSERT_TRUE(eventually([&] { return _modem.isOn(0xB0C1); })) << telephony->error();
+  ASSERT_TRUE(shows(*varnel, masterInformation(77, 2), " 77\n"));
+  const std::string sentence = _modem.link() + " is unplugged; plug it in again, and the display goes on";
+  _modem.unplug();
+  EXPECT_TRUE(says(*telephony, sentence + "\n"));
+  EXPECT_TRUE(says(*varnel, "Notice: " + sentence));
+  _modem.plugIn();
+  ASSERT_TRUE(says(*telephony, _modem.link() + " is back\n"));
+  EXPECT_TRUE(eventually([&] { return _modem.isOn(0xB0C1); }));
+  EXPECT_TRUE(shows(*varnel, masterInformation(88, 4), " 88\n"));
+  EXPECT_THAT(varnel->error(), Not(HasSubstr("INVALIDATED")));
+}
+
+TEST_F(PortEndToEnd, APortThatCannotBeServedIsOneLineThatSaysWhatToDo) {
+  const std::string missing = _folder.file("none");
+  const auto telephony = server(missing);
+  ASSERT_TRUE(telephony->waitForEnd());
+  EXPECT_EQ(telephony->exitStatus(), 1);
+  EXPECT_EQ(telephony->error(), "varnel-telephonyd: there is no device " + missing +
+                                    "; plug the modem in, or look for its ports with ls /dev/tty* "
+                                    "/dev/wwan*\n");
+}
+
+TEST_F(PortEndToEnd, APortThatTakesATCommandsIsToldFromOneThatIsSilent) {
+  _modem.answer = [](ByteView bytes) -> Bytes {
+    const std::string error = "\r\nERROR\r\n";
+    return bytes.back() == '\r' ? Bytes(error.begin(), error.end()) : Bytes();
+  };
+  const auto telephony = server();
+  ASSERT_TRUE(telephony->waitForEnd());
+  EXPECT_EQ(telephony->exitStatus(), 1);
+  EXPECT_THAT(telephony->error(), StartsWith("varnel-telephonyd: " + _modem.link() +
+                                             " takes AT commands and is no diagnostic port; "));
+}
+
+TEST_F(PortEndToEnd, APortThatAnotherServerServesIsBusyAndItsHolderIsNamed) {
+  const auto first = server();
+  ASSERT_TRUE(says(*first, "serving all-radios in "));
+  const TemporaryFolder runtime;
+  Process second(VARNEL_TELEPHONYD_PROGRAM,
+                 {"--port", _modem.link(), "--runtime-dir", runtime.path().string()});
+  ASSERT_TRUE(second.waitForEnd());
+  EXPECT_EQ(second.exitStatus(), 1);
+  EXPECT_THAT(second.error(),
+              testing::MatchesRegex("varnel-telephonyd: varnel-telephonyd \\(process [0-9]+\\) "
+                                    "uses .*/port; end it first\n"));
+}
+
+}  // namespace
+}  // namespace varnel

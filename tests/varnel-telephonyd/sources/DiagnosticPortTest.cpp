@@ -1,0 +1,178 @@
+#include "programs/varnel-telephonyd/sources/DiagnosticPort.h"
+
+#include <fcntl.h>
+#include <gmock/gmock.h>
+#include <grp.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <termios.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <fstream>
+#include <string>
+
+#include "host/FileDescriptor.h"
+#include "programs/varnel-telephonyd/sources/PortHolders.h"
+#include "programs/varnel-telephonyd/sources/PortTrouble.h"
+#include "tests/support/EventLoop.h"
+#include "tests/support/Process.h"
+
+namespace varnel {
+namespace {
+
+using testing::HasSubstr;
+using testing::StartsWith;
+
+class DiagnosticPortTest : public testing::Test {
+ protected:
+  DiagnosticPortTest() : _line(::posix_openpt(O_RDWR | O_NOCTTY | O_CLOEXEC)) {
+    if (::grantpt(_line.number()) != 0 || ::unlockpt(_line.number()) != 0)
+      ADD_FAILURE() << "no pseudo-terminal";
+    _name = ::ptsname(_line.number());
+  }
+  std::optional<std::string> open(DiagnosticPort& port) {
+    return port.open({.bytesCame = [this](ByteView bytes) { _came.append(bytes.begin(), bytes.end()); },
+                      .wentAway = [this] { _hasGone = true; }});
+  }
+  void write(const std::string& bytes) const {
+    EXPECT_EQ(::write(_line.number(), bytes.data(), bytes.size()), static_cast<ssize_t>(bytes.size()));
+  }
+
+  FileDescriptor _line;
+  std::string _name;
+  std::string _came;
+  bool _hasGone = false;
+};
+
+TEST_F(DiagnosticPortTest, BytesPassUnchangedInBothDirections) {
+  DiagnosticPort port(_name);
+  ASSERT_EQ(open(port), std::nullopt);
+  const std::string bytes("\x03\r\n\x11\x13\x7F\x04\0\xFF\x1A", 10);
+  write(bytes);
+  ASSERT_TRUE(runUntil([&] { return _came.size() >= bytes.size(); }));
+  EXPECT_EQ(_came, bytes);
+  port.send(Bytes(bytes.begin(), bytes.end()));
+  std::string got(20, '\0');
+  got.resize(static_cast<std::size_t>(::read(_line.number(), got.data(), got.size())));
+  EXPECT_EQ(got, bytes);
+}
+
+TEST_F(DiagnosticPortTest, TellsWhenItIsUnpluggedAndMayBeOpenedAgain) {
+  DiagnosticPort port(_name);
+  ASSERT_EQ(open(port), std::nullopt);
+  _line = FileDescriptor();
+  ASSERT_TRUE(runUntil([&] { return _hasGone; }));
+  EXPECT_TRUE(open(port));
+}
+
+TEST_F(DiagnosticPortTest, IsForOneProgramAloneUntilItIsClosed) {
+  DiagnosticPort first(_name), second(_name);
+  ASSERT_EQ(open(first), std::nullopt);
+  EXPECT_EQ(open(second),
+            "another program uses " + _name + "; find it with sudo fuser -v " + _name + ", and end it");
+  first.close();
+  EXPECT_EQ(open(second), std::nullopt);
+}
+
+TEST_F(DiagnosticPortTest, ADeviceThatIsNoSerialLineNeedsNoSettings) {
+  DiagnosticPort port("/dev/zero");
+  ASSERT_EQ(open(port), std::nullopt);
+  EXPECT_TRUE(runUntil([&] { return _came.size() > 100'000; }));
+  EXPECT_FALSE(_hasGone);
+}
+
+TEST_F(DiagnosticPortTest, SaysWhatIsNotThere) {
+  DiagnosticPort missing("/dev/no-such-device"), below("/dev/null/port");
+  EXPECT_EQ(
+      open(missing),
+      "there is no device /dev/no-such-device; plug the modem in, or look for its ports with ls /dev/tty* "
+      "/dev/wwan*");
+  EXPECT_THAT(open(below).value_or(""), StartsWith("there is no device /dev/null/port; "));
+}
+
+TEST_F(DiagnosticPortTest, AFileIsNoDevice) {
+  const TemporaryFolder folder;
+  std::ofstream(folder.file("walk.pcap")) << "x";
+  DiagnosticPort port(folder.file("walk.pcap"));
+  EXPECT_EQ(open(port), folder.file("walk.pcap") + " is no device; to play a file back, type --replay " +
+                            folder.file("walk.pcap"));
+}
+
+TEST_F(DiagnosticPortTest, WhoMayNotOpenItLearnsWhichGroupMay) {
+  const uid_t user = ::geteuid();
+  if (user == 0) {
+    ASSERT_EQ(::chown(_name.c_str(), 65534, 65534), 0);
+  }
+  ASSERT_EQ(::chmod(_name.c_str(), 0060), 0);
+  struct stat status {};
+  ASSERT_EQ(::stat(_name.c_str(), &status), 0);
+  if (user == 0) {
+    ASSERT_EQ(::seteuid(65534), 0);  // root may open everything
+  }
+  DiagnosticPort port(_name);
+  const std::string ofGroup = open(port).value_or("");
+  ASSERT_EQ(::seteuid(user), 0);
+  const group* const owner = ::getgrgid(status.st_gid);
+  const std::string name = owner ? owner->gr_name : std::to_string(status.st_gid);
+  EXPECT_EQ(ofGroup, "you may not open " + _name + ", which belongs to the group " + name +
+                         "; type sudo usermod -aG " + name + " $USER, log out, and log in again");
+}
+
+// A folder of processes as the system shows them: process 7 has the device open.
+TEST_F(DiagnosticPortTest, HoldersAreNamedAsFarAsTheSystemShowsThem) {
+  const TemporaryFolder folder;
+  for (const char* process : {"7", "8", "self"})
+    std::filesystem::create_directories(folder.path() / process / "fd");
+  std::ofstream(folder.path() / "7" / "comm") << "ModemManager\n";
+  std::filesystem::create_symlink("/dev/null", folder.path() / "7" / "fd" / "3");
+  std::filesystem::create_symlink(_name, folder.path() / "7" / "fd" / "4");
+  std::filesystem::create_symlink("/dev/null", folder.path() / "8" / "fd" / "3");
+  std::filesystem::create_symlink(_name, folder.path() / "self" / "fd" / "3");
+  std::filesystem::create_directories(folder.path() / "9" / "fd");
+  std::ofstream(folder.path() / "9" / "cmdline") << "/usr/bin/a-program-of-long-name" << '\0' << "-x";
+  std::ofstream(folder.path() / "9" / "comm") << "a-program-of-lo\n";
+  struct stat status {};
+  ASSERT_EQ(::stat(_name.c_str(), &status), 0);
+  EXPECT_EQ(holdersOf(status.st_rdev, folder.path()), "ModemManager (process 7)");
+  std::filesystem::create_symlink(_name, folder.path() / "8" / "fd" / "4");
+  EXPECT_THAT(holdersOf(status.st_rdev, folder.path()), HasSubstr(" and "));
+  EXPECT_THAT(holdersOf(status.st_rdev, folder.path()), HasSubstr("a program (process 8)"));
+  std::filesystem::create_symlink(_name, folder.path() / "9" / "fd" / "4");
+  EXPECT_THAT(holdersOf(status.st_rdev, folder.path()), HasSubstr("a-program-of-long-name (process 9)"));
+  EXPECT_EQ(holdersOf(status.st_rdev, folder.path() / "none"), "");
+}
+
+TEST_F(DiagnosticPortTest, AnotherProcessThatHoldsItIsNamed) {
+  const Process holder("/bin/sh", {"-c", "exec sleep 600 <" + _name});
+  struct stat status {};
+  ASSERT_EQ(::stat(_name.c_str(), &status), 0);
+  ASSERT_TRUE(eventually([&] { return holdersOf(status.st_rdev).starts_with("sleep (process "); }))
+      << holdersOf(status.st_rdev);
+  DiagnosticPort port(_name);
+  EXPECT_THAT(open(port).value_or(""),
+              testing::MatchesRegex("sleep \\(process [0-9]+\\) uses .*; end it first"));
+}
+
+TEST(PortTroubles, SayWhatToDo) {
+  EXPECT_EQ(
+      troubleOfPermission("/dev/ttyUSB0", "dialout"),
+      "you may not open /dev/ttyUSB0, which belongs to the group dialout; type sudo usermod -aG dialout "
+      "$USER, log out, and log in again");
+  EXPECT_EQ(troubleOfPermission("/dev/ttyUSB0", ""),
+            "you may not open /dev/ttyUSB0, and no group may; start the server with sudo");
+  EXPECT_EQ(troubleOfBusy("/dev/ttyUSB0", "ModemManager (process 812)"),
+            "ModemManager (process 812) uses /dev/ttyUSB0; type sudo systemctl stop ModemManager");
+  EXPECT_EQ(troubleOfBusy("/dev/ttyUSB0", "minicom (process 812)"),
+            "minicom (process 812) uses /dev/ttyUSB0; end it first");
+  EXPECT_EQ(troubleOf({PortFailure::Kind::AnswersText}, "/dev/ttyUSB2"),
+            "/dev/ttyUSB2 takes AT commands and is no diagnostic port; a modem has several ports, so try the "
+            "next one (ls -l /dev/serial/by-id)");
+  EXPECT_EQ(
+      troubleOf({PortFailure::Kind::AnswersNothing}, "/dev/ttyUSB1"),
+      "/dev/ttyUSB1 does not answer as a diagnostic port; a modem has several ports, so try the next one "
+      "(ls -l /dev/serial/by-id), or unplug the modem and plug it in again");
+}
+
+}  // namespace
+}  // namespace varnel
