@@ -29,7 +29,9 @@ void Connection::take(const AirMessageReading& reading) {
   const std::string_view name = reading.message->name;
   // Most messages are of other kinds.
   const bool mayChange = name.starts_with("RRCConnection");
-  if (mayChange && (is(name, "RRCConnectionRelease") || is(name, "RRCConnectionReject")))
+  // A phone that may not re-establish its connection has lost it (3GPP TS 36.331, 5.3.7.8).
+  if (mayChange && (is(name, "RRCConnectionRelease") || is(name, "RRCConnectionReject") ||
+                    is(name, "RRCConnectionReestablishmentReject")))
     return sectionRef.setText(stateEntry, "Idle");
   if (!is(reading.message->channel, "DL-DCCH") && !is(reading.message->channel, "UL-DCCH")) return;
   sectionRef.setText(stateEntry, "Connected");

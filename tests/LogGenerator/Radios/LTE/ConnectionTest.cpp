@@ -51,6 +51,13 @@ TEST_F(ConnectionTest, ReleaseAndRejectEndTheConnection) {
   EXPECT_EQ(shownAfter(8, {0x40}), R"({RRC State: "Idle", RRC Connections: "1"})");
 }
 
+TEST_F(ConnectionTest, RejectedReestablishmentEndsTheConnection) {
+  shownAfter(11, {0x20});
+  EXPECT_EQ(shownAfter(8, {0x20}), R"({RRC State: "Idle", RRC Connections: "1"})");  // 0 01
+  EXPECT_EQ(shownAfter(11, {0x18}), R"({RRC State: "Connected", RRC Connections: "1"})");
+  EXPECT_EQ(shownAfter(48, {0x20}), R"({RRC State: "Idle", RRC Connections: "1"})");  // 0 01, narrow-band
+}
+
 TEST_F(ConnectionTest, MessagesOfCommonChannelsTellNothing) {
   for (const unsigned channel : {3U, 7U, 8U, 10U})
     EXPECT_EQ(shownAfter(channel, {0x00}), R"({RRC State: "", RRC Connections: ""})") << channel;
