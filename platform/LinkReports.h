@@ -16,7 +16,8 @@ struct LinkReport {
   /// Empty when it has sent none since the link was opened.
   std::string serverNote;
   /// One sentence: that messages of several SIM cards have arrived since the link was opened, that the
-  /// display mixes them, and how to see one card. Empty when there are not several.
+  /// display mixes them, and how to see one card. Empty when there are not several. The sentence is not true
+  /// of a display that keeps the cards apart, as that of all radios does.
   std::string mixture;
   /// How many messages the server could not deliver since the link was opened, because this viewer reads too
   /// slowly.
