@@ -42,6 +42,11 @@ void SeenCells::removeOld() {
   if (removed > 0) _isChanged = _listIsOld = true;
 }
 
+void SeenCells::remove(std::uint64_t key) {
+  const std::size_t removed = std::erase_if(_cells, [&](const Cell& cell) { return cell.place.key == key; });
+  if (removed > 0) _isChanged = _listIsOld = true;
+}
+
 SeenCells::Cell* SeenCells::find(std::uint64_t key) {
   for (Cell& cell : _cells) {
     if (cell.place.key == key) return &cell;

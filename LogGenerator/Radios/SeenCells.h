@@ -47,6 +47,8 @@ class SeenCells {
   /// A cell is seen: its record, to be written. Null when there is no room for it. Another cell may lose its
   /// record, so write the record before the next call.
   Dictionary* see(const CellPlace& place);
+  /// Removes a cell, if the list has it.
+  void remove(std::uint64_t key);
   /// The text of the time of `begin`, for the entry "Last Seen".
   std::string_view lastSeen() const { return _nowText; }
   /// Shows the list in the section that `begin` got, if a cell was seen or removed since then.

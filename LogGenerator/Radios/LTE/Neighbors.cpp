@@ -141,11 +141,17 @@ void Neighbors::add(std::uint32_t physicalCell, const Packet& cell, std::span<co
 
 void Neighbors::updateFromServingCells(const Packet& subpacket) {
   const ServingCellLayout& layout = servingCellLayoutOf(subpacket);
-  if (!layout.tellsServing() || !isPlausible(layout, subpacket)) return;
+  if (!isPlausible(layout, subpacket)) return;
+  constexpr std::uint8_t primary = 0;
   showAfter([&] {
     _channel.setChannel(rawValue(subpacket, layout.channel.source));
     forEachMeasuredCell(layout, subpacket, [&](const MeasuredCell& cell) {
-      if (!cell.servingIndex) add(cell.physicalCell, cell.bytes, layout.levels(), "0xB193");
+      if (cell.servingIndex == primary) {
+        // After a handover, the cell is a neighbor no more.
+        _cells.remove(keyOf(_channel.earfcn(), cell.physicalCell));
+      } else if (!cell.servingIndex && layout.tellsServing()) {
+        add(cell.physicalCell, cell.bytes, layout.levels(), "0xB193");
+      }
     });
   });
 }

@@ -15,7 +15,8 @@
 namespace varnel::lte {
 
 /// The cells around the serving cell, from every packet that lists them: a record per channel and cell, the
-/// strongest first. The levels of a record are those of the packet that it names as its source.
+/// strongest first. The levels of a record are those of the packet that it names as its source. A cell that
+/// becomes the primary serving cell leaves the list.
 class Neighbors final : public VersionedDecoder {
  public:
   Neighbors();

@@ -76,6 +76,29 @@ TEST_F(LTENeighbors, ServingCarrierWithoutNeighborsShowsNoList) {
   EXPECT_EQ(shown(), R"({Version: "25.36"})");
 }
 
+TEST_F(LTENeighbors, NeighborThatBecomesThePrimaryCellLeavesTheList) {
+  decodeCells({{2, 640}, {3, 650}});
+  BodyBuilder carrier = carrierOf(2);
+  putCell(carrier, 0, {.physicalCell = 2, .rsrp = 900, .isServing = true});
+  putCell(carrier, 1, {.physicalCell = 1, .rsrp = 660});
+  decode(packetWith(0xB193, carrier));
+  EXPECT_EQ(places(), "1300/1 1300/3");
+}
+
+TEST_F(LTENeighbors, LastNeighborThatBecomesThePrimaryCellLeavesAnEmptyList) {
+  decodeCells({{2, 640}});
+  decode(packetWith(0xB193, subpacketOf(25, 60, 12 + 148).u32(4, 1300).u32(8, 1).bits(12 + 8, 0, 9, 2)));
+  EXPECT_EQ(shown("Cells"), "[]");
+}
+
+TEST_F(LTENeighbors, PrimaryCellOfAnotherChannelLeavesTheListAlone) {
+  decodeCells({{2, 640}});
+  BodyBuilder carrier = carrierOf(1, 1400);
+  putCell(carrier, 0, {.physicalCell = 2, .rsrp = 900, .isServing = true});
+  decode(packetWith(0xB193, carrier));
+  EXPECT_EQ(places(), "1300/2");
+}
+
 TEST_F(LTENeighbors, Version60TellsNoNeighbors) {
   decode(packetWith(0xB193, subpacketOf(25, 60, 12 + 2 * 148).u32(4, 1300).u32(8, 2)));
   EXPECT_EQ(shown(), R"({Version: "25.60"})");
