@@ -58,7 +58,7 @@ void LivePort::updateCodesLater() {
 }
 
 std::optional<std::string> LivePort::connect() {
-  const auto trouble = _setup.device->open(
+  auto trouble = _setup.device->open(
       {.bytesCame = [this](ByteView bytes) { takeBytes(bytes); }, .wentAway = [this] { beUnplugged(); }});
   if (trouble) return trouble;
   _session = std::make_unique<PortSession>(PortSession::Setup{

@@ -49,7 +49,7 @@ class LivePort final {
   /// The stream for one more viewer, which starts now.
   std::unique_ptr<MessageSource> makeSource();
   /// Makes the modem quiet, closes the device, and then calls the function. A modem that does not answer
-  /// takes 2 s.
+  /// takes 4 s.
   void end(std::function<void()> ended);
   bool isEnding() const { return _isEnding; }
 

@@ -1,10 +1,13 @@
 #include "programs/varnel-telephonyd/sources/PortHolders.h"
 
 #include <sys/stat.h>
+#include <sys/sysmacros.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <fstream>
+#include <optional>
+#include <string>
 #include <string_view>
 #include <system_error>
 
@@ -23,11 +26,38 @@ bool isDevice(const fs::path& openFile, dev_t device) {
          status.st_rdev == device;
 }
 
-bool holds(const fs::path& process, dev_t device) {
-  std::error_code error;
-  for (fs::directory_iterator file(process / "fd", error), end; !error && file != end; file.increment(error))
-    if (isDevice(file->path(), device)) return true;
+// The other end of the pseudo-terminal whose number is given.
+bool isOtherEnd(const fs::path& process, const fs::path& openFile, unsigned number) {
+  std::error_code ignored;
+  const std::string target = fs::read_symlink(openFile, ignored).string();
+  if (target != "/dev/ptmx" && target != "/dev/pts/ptmx") return false;
+  std::ifstream information(process / "fdinfo" / openFile.filename());
+  std::string key;
+  for (unsigned index = 0; information >> key;)
+    if (key == "tty-index:") return information >> index && index == number;
   return false;
+}
+
+// Majors of the devices in /dev/pts, each with 256 of them.
+constexpr unsigned firstTerminalMajor = 136, lastTerminalMajor = 143, devicesOfMajor = 256;
+
+std::optional<unsigned> terminalNumber(dev_t device) {
+  const unsigned number = major(device);
+  if (number < firstTerminalMajor || number > lastTerminalMajor) return std::nullopt;
+  return (number - firstTerminalMajor) * devicesOfMajor + minor(device);
+}
+
+// What plays a modem on a pseudo-terminal may have both its ends open, and is no holder then.
+bool holds(const fs::path& process, dev_t device) {
+  const auto terminal = terminalNumber(device);
+  bool hasDevice = false;
+  std::error_code error;
+  for (fs::directory_iterator file(process / "fd", error), end; !error && file != end;
+       file.increment(error)) {
+    if (terminal && isOtherEnd(process, file->path(), *terminal)) return false;
+    hasDevice = hasDevice || isDevice(file->path(), device);
+  }
+  return hasDevice;
 }
 
 // The system cuts the short name off after 15 characters, so the command line is asked first.

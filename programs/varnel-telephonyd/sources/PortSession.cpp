@@ -28,9 +28,8 @@ bool isLog(ByteView contents) {
 }
 
 bool contains(ByteView bytes, std::string_view part) {
-  return !std::ranges::search(bytes, part, {}, [](std::uint8_t byte) {
-            return static_cast<char>(byte);
-          }).empty();
+  const auto isSame = [](std::uint8_t byte, char letter) { return static_cast<char>(byte) == letter; };
+  return std::search(bytes.begin(), bytes.end(), part.begin(), part.end(), isSame) != bytes.end();
 }
 
 }  // namespace
@@ -253,7 +252,7 @@ void PortSession::answered(Step step, ByteView answer) {
 }
 
 void PortSession::unanswered(Request request) {
-  if (_ended) {
+  if (_ended && request.step == Step::AllCodesOff) {
     for (const Request& rest : _requests) send(rest);
     return finish();
   }

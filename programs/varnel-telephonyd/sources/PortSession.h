@@ -63,7 +63,7 @@ class PortSession final {
   void takeEnd() { _scanner.endStream(); }
   /// Switches these codes on, and no others. Without any, the port becomes quiet. May be called at any time.
   void setWanted(WantedCodes wanted);
-  /// Makes the port quiet and then calls the function: after 2 s at the latest when it does not answer.
+  /// Makes the port quiet and then calls the function: after 4 s at the latest when it does not answer.
   void end(std::function<void()> ended);
 
   /// Whether the numbers of log codes are known.

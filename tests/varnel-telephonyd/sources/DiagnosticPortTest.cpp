@@ -143,6 +143,21 @@ TEST_F(DiagnosticPortTest, HoldersAreNamedAsFarAsTheSystemShowsThem) {
   EXPECT_EQ(holdersOf(status.st_rdev, folder.path() / "none"), "");
 }
 
+TEST_F(DiagnosticPortTest, WhatPlaysAModemOnAPseudoTerminalDoesNotHoldIt) {
+  struct stat status {};
+  ASSERT_EQ(::stat(_name.c_str(), &status), 0);
+  const TemporaryFolder folder;
+  std::filesystem::create_directories(folder.path() / "7" / "fd");
+  std::filesystem::create_directories(folder.path() / "7" / "fdinfo");
+  std::filesystem::create_symlink(_name, folder.path() / "7" / "fd" / "4");
+  std::filesystem::create_symlink("/dev/ptmx", folder.path() / "7" / "fd" / "5");
+  const std::string number = _name.substr(_name.rfind('/') + 1);
+  std::ofstream(folder.path() / "7" / "fdinfo" / "5") << "pos:\t0\ntty-index:\t" + number + "1\n";
+  EXPECT_EQ(holdersOf(status.st_rdev, folder.path()), "a program (process 7)");
+  std::ofstream(folder.path() / "7" / "fdinfo" / "5") << "pos:\t0\ntty-index:\t" + number + "\n";
+  EXPECT_EQ(holdersOf(status.st_rdev, folder.path()), "");
+}
+
 TEST_F(DiagnosticPortTest, AnotherProcessThatHoldsItIsNamed) {
   const Process holder("/bin/sh", {"-c", "exec sleep 600 <" + _name});
   struct stat status {};

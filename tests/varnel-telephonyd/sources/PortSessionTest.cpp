@@ -3,6 +3,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -345,17 +347,54 @@ TEST_F(PortSessionTest, AtTheEndItWaitsForNoOlderAnswer) {
   EXPECT_TRUE(_hasEnded);
 }
 
-TEST_F(PortSessionTest, AtTheEndASilentModemTakesTwoSecondsAndGetsAllRequests) {
+TEST_F(PortSessionTest, AtTheEndASilentModemTakesFourSecondsAndGetsAllRequests) {
   begin();
   want({0xB002});
   requests();
   _modem.otherAnswers = {{eventsOff, {}}, {allCodesOff, {}}, {debugTextOff, {}}};
   end();
-  advance(1999ms);
+  advance(3999ms);
   EXPECT_FALSE(_hasEnded);
   advance(1ms);
   EXPECT_TRUE(_hasEnded);
   EXPECT_EQ(requests(), (Requests{eventsOff, allCodesOff, debugTextOff}));
+}
+
+TEST_F(PortSessionTest, AtTheEndAModemThatKeepsSilentAboutEventsStillAnswersThatAllCodesAreOff) {
+  _modem.otherAnswers = {{eventsOff, {}}, {debugTextOff, {}}};
+  begin();
+  advance(4s);
+  want({0xB002});
+  EXPECT_TRUE(_modem.isOn(0xB002));
+  end();
+  advance(2s);
+  EXPECT_FALSE(_modem.isOn(0xB002));
+  EXPECT_FALSE(_hasEnded);
+  advance(2s);
+  EXPECT_TRUE(_hasEnded);
+}
+
+// Bytes of no modem, and sound frames with any contents, at any time.
+TEST_F(PortSessionTest, TakesAnyBytesAndKeepsWithinItsCommands) {
+  std::minstd_rand random(17);
+  const auto byte = [&] { return static_cast<std::uint8_t>(random() >> 8); };
+  const Bytes starts{0x00, 0x10, 0x13, 0x60, 0x73, 0x7C, 0x7D, 0x98, 0x9E};
+  begin();
+  for (int i = 0; i < 20'000; ++i) {
+    Bytes bytes(random() % 40);
+    std::ranges::generate(bytes, byte);
+    if (i % 4 != 0 && !bytes.empty()) {
+      bytes[0] = starts[i % starts.size()];
+      bytes = framed(bytes);
+    }
+    _session.take(bytes);
+    if (i % 7 == 0) want({0xB000 + i % 0x400});
+    if (i % 11 == 0) advance(1s);
+  }
+  end();
+  advance(10s);
+  EXPECT_TRUE(_hasEnded);
+  EXPECT_LT(_all.size(), 1'000'000u);
 }
 
 TEST_F(PortSessionTest, WhatIsNoDiagnosticPortEndsAtOnceWithoutARequest) {
