@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <initializer_list>
+#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -17,12 +18,20 @@ namespace {
 
 using Outcome = MessageFate::Outcome;
 
-AirMessage read(const Bytes& packet, std::uint32_t logCode) {
+// A message that keeps its bytes: those of an AirMessage are the packet's or the reader's.
+struct ReadMessage : AirMessage {
+  std::shared_ptr<const Bytes> kept;
+};
+
+ReadMessage read(const Bytes& packet, std::uint32_t logCode) {
   AirMessageReader reader;
-  AirMessageReading reading = reader.read(Packet(packet), logCode);
+  const AirMessageReading reading = reader.read(Packet(packet), logCode);
   EXPECT_EQ(reading.fate.outcome, Outcome::Decoded);
   EXPECT_TRUE(reading.message);
-  return reading.message.value_or(AirMessage{});
+  ReadMessage message{reading.message.value_or(AirMessage{}), nullptr};
+  message.kept = std::make_shared<const Bytes>(message.bytes.begin(), message.bytes.end());
+  message.bytes = *message.kept;
+  return message;
 }
 
 // A text for an optional number.
@@ -99,7 +108,7 @@ TEST(AirMessageLayouts, EachFieldOfEachVersionOfLTEStandsByItself) {
       result.channel(lteRRCDownlinkDedicated(header.version)).message(message);
       return result;
     };
-    const AirMessage none = read(packet().packet(), 0xB0C0);
+    const ReadMessage none = read(packet().packet(), 0xB0C0);
     EXPECT_EQ(none.name, "RRCConnectionReconfiguration");
     EXPECT_EQ(none.radio, AirMessage::Radio::LTE);
     EXPECT_EQ(none.protocol, AirMessage::Protocol::RRC);
@@ -147,7 +156,7 @@ TEST(AirMessageLayouts, WhatNoFieldOfLTEHoldsChangesNothing) {
       }
       Bytes changed = plain;
       changed.at(Packet::headerSize + offset) = 0xFF;
-      const AirMessage read = varnel::read(changed, 0xB0C0);
+      const ReadMessage read = varnel::read(changed, 0xB0C0);
       EXPECT_EQ(place(read), "channel 1300, cell 77, frame 291") << offset;
       EXPECT_EQ(read.name, "RRCConnectionRelease") << offset;
       EXPECT_EQ(described(read.bytes), "<2811>") << offset;
@@ -416,7 +425,7 @@ TEST(AirMessageLayouts, EachFieldOfEachVersionOfNRStandsByItself) {
       result.channel(nrDownlinkDedicated(header.version)).message({0x00, 0x11, 0x22});
       return result;
     };
-    const AirMessage first = read(packet().cell(0x0321).channelNumber(0x0007B49E).packet(), 0xB821);
+    const ReadMessage first = read(packet().cell(0x0321).channelNumber(0x0007B49E).packet(), 0xB821);
     EXPECT_EQ(first.radio, AirMessage::Radio::NR);
     EXPECT_EQ(first.protocol, AirMessage::Protocol::RRC);
     EXPECT_EQ(first.name, header.version == 8 ? "MeasurementReport" : "RRCReconfiguration");
@@ -444,25 +453,25 @@ TEST(AirMessageLayouts, NoCellAndNoChannelOfNRAreNotTold) {
 // Versions 8 and 9: the frame in the bits 16 to 25, the subframe in the bits 3 to 6.
 TEST(AirMessageLayouts, EarlyVersionsOfNRTellTheFrame) {
   for (const unsigned version : {8U, 9U}) {
-    const AirMessage message = read(nrRRC(version)
-                                        .channel(1)
-                                        .cell(1)
-                                        .channelNumber(1)
-                                        .number(13, 0x02AB0038, 4)
-                                        .message({0, 0, 0, 0})
-                                        .packet(),
-                                    0xB821);
+    const ReadMessage message = read(nrRRC(version)
+                                         .channel(1)
+                                         .cell(1)
+                                         .channelNumber(1)
+                                         .number(13, 0x02AB0038, 4)
+                                         .message({0, 0, 0, 0})
+                                         .packet(),
+                                     0xB821);
     EXPECT_EQ(text(message.frame), "683");
     EXPECT_EQ(text(message.subframe), "7");
     // All other bits.
-    const AirMessage others = read(nrRRC(version)
-                                       .channel(1)
-                                       .cell(1)
-                                       .channelNumber(1)
-                                       .number(13, 0xFEAAFFBF, 4)
-                                       .message({0, 0, 0, 0})
-                                       .packet(),
-                                   0xB821);
+    const ReadMessage others = read(nrRRC(version)
+                                        .channel(1)
+                                        .cell(1)
+                                        .channelNumber(1)
+                                        .number(13, 0xFEAAFFBF, 4)
+                                        .message({0, 0, 0, 0})
+                                        .packet(),
+                                    0xB821);
     EXPECT_EQ(text(others.frame), "682");
     EXPECT_EQ(text(others.subframe), "7");
   }
@@ -471,14 +480,14 @@ TEST(AirMessageLayouts, EarlyVersionsOfNRTellTheFrame) {
 TEST(AirMessageLayouts, LaterVersionsOfNRDoNotTellTheFrame) {
   for (const RRCHeader& header : nrRRCHeaders) {
     if (header.version <= 9) continue;
-    const AirMessage message = read(RRCPacket(0xB821, header)
-                                        .channel(1)
-                                        .cell(1)
-                                        .channelNumber(1)
-                                        .number(header.frameAt, 0xFFFFFF, 3)
-                                        .message({0, 0, 0, 0})
-                                        .packet(),
-                                    0xB821);
+    const ReadMessage message = read(RRCPacket(0xB821, header)
+                                         .channel(1)
+                                         .cell(1)
+                                         .channelNumber(1)
+                                         .number(header.frameAt, 0xFFFFFF, 3)
+                                         .message({0, 0, 0, 0})
+                                         .packet(),
+                                     0xB821);
     EXPECT_EQ(text(message.frame), "absent") << header.version;
   }
 }
@@ -502,7 +511,7 @@ TEST(AirMessageLayouts, WhatNoFieldOfNRHoldsChangesNothing) {
       }
       Bytes changed = plain;
       changed.at(Packet::headerSize + offset) = 0xFF;
-      const AirMessage message = read(changed, 0xB821);
+      const ReadMessage message = read(changed, 0xB821);
       EXPECT_EQ(text(message.channelNumber) + " " + text(message.physicalCell), "504990 77") << offset;
       EXPECT_EQ(described(message.bytes), "<0011>") << offset;
     }
@@ -581,7 +590,7 @@ TEST(AirMessageLayouts, EachNumberingOfTheChannelsOfNR) {
 }
 
 TEST(AirMessageLayouts, BareTypesOfNRHaveNoChannel) {
-  const AirMessage message = read(nrRRC(8).channel(9).message({0x08, 0x11}).packet(), 0xB821);
+  const ReadMessage message = read(nrRRC(8).channel(9).message({0x08, 0x11}).packet(), 0xB821);
   EXPECT_EQ(message.channel, "");
   EXPECT_EQ(message.direction, AirMessage::Direction::Downlink);
   EXPECT_EQ(read(nrRRC(8).channel(10).message({0x08, 0x11}).packet(), 0xB821).direction,
@@ -596,7 +605,7 @@ TEST(AirMessageLayouts, NASMessagesOfLTEAreFromTheNetworkUnderEvenCodes) {
     SCOPED_TRACE(logCode);
     const bool isSession = logCode < 0xB0EA;
     const Bytes packet = lteNAS(logCode, isSession ? Bytes{0x52, 0x01, 0xC1, 0x09} : Bytes{0x07, 0x42, 0x09});
-    const AirMessage message = read(packet, logCode);
+    const ReadMessage message = read(packet, logCode);
     EXPECT_EQ(message.radio, AirMessage::Radio::LTE);
     EXPECT_EQ(message.protocol, AirMessage::Protocol::NAS);
     EXPECT_EQ(message.direction,
@@ -632,7 +641,7 @@ TEST(AirMessageLayouts, NASMessagesOfNRAreFromTheNetworkUnderTheirCodes) {
   for (const auto& code : codes) {
     SCOPED_TRACE(code.logCode);
     const bool isSession = code.logCode < 0xB808;
-    const AirMessage message =
+    const ReadMessage message =
         read(nrNAS(code.logCode, isSession ? Bytes{0x2E, 0x05, 0x01, 0xC2} : Bytes{0x7E, 0x00, 0x42}),
              code.logCode);
     EXPECT_EQ(message.radio, AirMessage::Radio::NR);
@@ -670,7 +679,7 @@ TEST(AirMessageLayouts, MessagesOfGSMTellTheirChannelAndDirection) {
   constexpr std::string_view channels[] = {"DCCH", "BCCH", "RACH", "CCCH", "SACCH", "SDCCH", "FACCH"};
   for (unsigned number = 0; number < 7; ++number) {
     for (const unsigned downlink : {0x00U, 0x80U}) {
-      const AirMessage message = read(gsmRR(downlink | number, 0x0D, {0x06, 0x0D, 0x00}), 0x512F);
+      const ReadMessage message = read(gsmRR(downlink | number, 0x0D, {0x06, 0x0D, 0x00}), 0x512F);
       EXPECT_EQ(message.radio, AirMessage::Radio::GSM);
       EXPECT_EQ(message.protocol, AirMessage::Protocol::RR);
       EXPECT_EQ(message.channel.substr(0, channels[number].size()), channels[number]);
@@ -685,7 +694,7 @@ TEST(AirMessageLayouts, MessagesOfGSMTellTheirChannelAndDirection) {
 
 TEST(AirMessageLayouts, MessagesOfGSMBroadcastAndCommonChannelsHaveAPseudoLength) {
   for (const unsigned number : {1U, 3U}) {
-    const AirMessage message = read(gsmRR(0x80 | number, 0x1B, {0x49, 0x06, 0x1B, 0x00}), 0x512F);
+    const ReadMessage message = read(gsmRR(0x80 | number, 0x1B, {0x49, 0x06, 0x1B, 0x00}), 0x512F);
     EXPECT_EQ(message.name, "System Information Type 3");
     EXPECT_EQ(unsigned{message.layer2Octets}, 1U);
     EXPECT_EQ(message.bytes.size(), 4U);
@@ -697,7 +706,7 @@ TEST(AirMessageLayouts, MessagesOfGSMBroadcastAndCommonChannelsHaveAPseudoLength
 
 TEST(AirMessageLayouts, ASubscriptionComesBeforeAMessageOfGSM) {
   for (const unsigned subscription : {0U, 1U, 2U}) {
-    const AirMessage message =
+    const ReadMessage message =
         read(containerOf(0x5B2F, {subscription, 0x80, 0x0D, 3}, {0x06, 0x0D, 0x00}), 0x5B2F);
     EXPECT_EQ(message.name, "Channel Release");
     EXPECT_EQ(message.channel, "DCCH");
@@ -715,7 +724,7 @@ TEST(AirMessageLayouts, EveryTruncationOfAMessageOfGSMIsBroken) {
 // 0x713A, 0x7B3A
 
 TEST(AirMessageLayouts, NASMessagesOfGSMTellTheirDirection) {
-  const AirMessage down = read(circuitNAS(0, {0x05, 0x02, 0x62}), 0x713A);
+  const ReadMessage down = read(circuitNAS(0, {0x05, 0x02, 0x62}), 0x713A);
   EXPECT_EQ(down.radio, AirMessage::Radio::GSM);
   EXPECT_EQ(down.protocol, AirMessage::Protocol::NAS);
   EXPECT_EQ(down.direction, AirMessage::Direction::Downlink);
@@ -723,7 +732,7 @@ TEST(AirMessageLayouts, NASMessagesOfGSMTellTheirDirection) {
   EXPECT_EQ(down.channel, "");
   EXPECT_EQ(described(down.bytes), "<050262>");
   EXPECT_EQ(read(circuitNAS(1, {0x05, 0x08}), 0x713A).direction, AirMessage::Direction::Uplink);
-  const AirMessage second = read(containerOf(0x7B3A, {1, 0, 3, 0, 0, 0}, {0x05, 0x02, 0x62}), 0x7B3A);
+  const ReadMessage second = read(containerOf(0x7B3A, {1, 0, 3, 0, 0, 0}, {0x05, 0x02, 0x62}), 0x7B3A);
   EXPECT_EQ(second.direction, AirMessage::Direction::Downlink);
   EXPECT_EQ(described(second.bytes), "<050262>");
   EXPECT_EQ(read(containerOf(0x7B3A, {0, 1, 2, 0, 0, 0}, {0x05, 0x08}), 0x7B3A).direction,
@@ -763,14 +772,14 @@ TEST(AirMessageLayouts, EachChannelOfUMTS) {
       {3, "DL-DCCH Downlink"}, {4, "BCCH-BCH Downlink"}, {5, "BCCH-FACH Downlink"},
       {6, "PCCH Downlink"},    {7, "MCCH Downlink"},     {8, "MSCH Downlink"}};
   for (const Numbered& numbered : channels) {
-    const AirMessage message = read(umtsRRC(numbered.number, {0, 0x11, 0x22}), 0x412F);
+    const ReadMessage message = read(umtsRRC(numbered.number, {0, 0x11, 0x22}), 0x412F);
     EXPECT_EQ(message.radio, AirMessage::Radio::UMTS);
     EXPECT_EQ(message.protocol, AirMessage::Protocol::RRC);
     EXPECT_EQ(std::string(message.channel) + " " + std::string(nameOf(message.direction)), numbered.channel);
     EXPECT_EQ(described(message.bytes), "<001122>");
     EXPECT_EQ(place(message), "channel absent, cell absent, frame absent");
 
-    const AirMessage withCell =
+    const ReadMessage withCell =
         read(umtsRRCWithCell(numbered.number | 0x80U, 10638, 291, {0, 0x11, 0x22}), 0x412F);
     EXPECT_EQ(std::string(withCell.channel) + " " + std::string(nameOf(withCell.direction)),
               numbered.channel);
@@ -787,13 +796,13 @@ TEST(AirMessageLayouts, TheSystemInformationContainerOfUMTSComesDown) {
 
 TEST(AirMessageLayouts, ASystemInformationBlockBeginsBehindItsType) {
   for (const unsigned channel : {0x09U, 0xFEU, 0xFFU}) {
-    const AirMessage message = read(umtsRRC(channel, {5, 0x11, 0x22}), 0x412F);
+    const ReadMessage message = read(umtsRRC(channel, {5, 0x11, 0x22}), 0x412F);
     EXPECT_EQ(message.name, "SysInfoType5");
     EXPECT_EQ(message.direction, AirMessage::Direction::Downlink);
     EXPECT_EQ(described(message.bytes), "<1122>");
   }
   for (const unsigned channel : {0x89U, 0xF0U}) {
-    const AirMessage message = read(umtsBlockWithCell(channel, 10638, 291, 5, {0x11, 0x22}), 0x412F);
+    const ReadMessage message = read(umtsBlockWithCell(channel, 10638, 291, 5, {0x11, 0x22}), 0x412F);
     EXPECT_EQ(message.name, "SysInfoType5");
     EXPECT_EQ(described(message.bytes), "<1122>");
     EXPECT_EQ(place(message), "channel 10638, cell 291, frame absent");
