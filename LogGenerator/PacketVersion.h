@@ -3,8 +3,13 @@
 #include <compare>
 #include <cstdint>
 #include <string>
+#include <string_view>
 
 namespace varnel {
+
+/// The entry of a section that shows the version of its last packet, and what it adds to a version that is
+/// not known.
+inline constexpr std::string_view versionEntry = "Version", unknownVersionMark = " (not known)";
 
 /// The version of a packet's layout, as the packet itself tells it.
 struct PacketVersion {
@@ -19,6 +24,8 @@ struct PacketVersion {
     if (number > 0xFFFF) return std::to_string(number >> 16) + '.' + std::to_string(number & 0xFFFF);
     return std::to_string(number);
   }
+  /// "37 (not known)".
+  std::string unknownText() const { return text().append(unknownVersionMark); }
 
   friend auto operator<=>(const PacketVersion&,
                           const PacketVersion&) = default;  // NOLINT(modernize-use-nullptr): no pointer here

@@ -364,4 +364,9 @@ std::string_view nameOf(AirMessage::Direction direction) {
   return names[static_cast<std::size_t>(direction)];
 }
 
+std::string_view channelNumberName(AirMessage::Radio radio) {
+  constexpr std::string_view names[] = {"EARFCN", "NR-ARFCN", "UARFCN", "ARFCN"};
+  return names[static_cast<std::size_t>(radio)];
+}
+
 }  // namespace varnel

@@ -41,7 +41,7 @@ struct AirMessage {
   /// joined: valid while the packet is, and until the reader reads again.
   ByteView bytes{};
   /// How many of these bytes come before layer 3: the pseudo length of messages on GSM's BCCH, CCCH and SACCH
-  /// (TS 44.018 10.5.2.19). A packet analyser takes the message without them.
+  /// (TS 44.018 10.5.2.19). A packet analyzer takes the message without them.
   std::uint8_t layer2Octets = 0;
 };
 
@@ -91,5 +91,7 @@ class AirMessageReader {
 std::string_view nameOf(AirMessage::Radio radio);
 std::string_view nameOf(AirMessage::Protocol protocol);
 std::string_view nameOf(AirMessage::Direction direction);
+/// What the radio calls the numbers of its channels: "EARFCN".
+std::string_view channelNumberName(AirMessage::Radio radio);
 
 }  // namespace varnel

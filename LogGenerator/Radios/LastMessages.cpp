@@ -5,12 +5,13 @@
 #include <string>
 
 #include "LogGenerator/ArrayLock.h"
+#include "LogGenerator/PacketVersion.h"
 
 namespace varnel {
 
 namespace {
 
-constexpr std::string_view listEntry = "Messages", versionEntry = "Version";
+constexpr std::string_view listEntry = "Messages";
 
 // A modem sends many messages per second, so the text has milliseconds before its time zone.
 std::string timeText(Time time) {
@@ -20,12 +21,6 @@ std::string timeText(Time time) {
   std::snprintf(fraction, sizeof fraction, ".%03d", time.nanoseconds / nanosecondsPerMillisecond);
   std::string text = dateDescription(time);
   return text.insert(text.size() - zone.size(), fraction);
-}
-
-std::string_view channelNumberLabel(AirMessage::Radio radio) {
-  using enum AirMessage::Radio;
-  if (radio == UMTS) return "UARFCN";
-  return radio == NR ? "NR-ARFCN" : "EARFCN";
 }
 
 std::string_view cellLabel(AirMessage::Radio radio) {
@@ -59,7 +54,7 @@ bool LastMessages::showsVersion() const {
 void LastMessages::showVersion() {
   if (!_version) return;
   const auto& [number, isKnown] = *_version;
-  sectionRef.setText(versionEntry, isKnown ? number.text() : number.text() + " (not known)");
+  sectionRef.setText(versionEntry, isKnown ? number.text() : number.unknownText());
 }
 
 void LastMessages::prepareDisplay(const Time& /*now*/) {
@@ -99,7 +94,7 @@ Value LastMessages::recordOf(const Received& received) {
   if (!message.channel.empty()) entries.add("Channel", message.channel);
   entries.add("Name", message.name);
   if (message.channelNumber)
-    entries.add(channelNumberLabel(message.radio), std::to_string(*message.channelNumber));
+    entries.add(channelNumberName(message.radio), std::to_string(*message.channelNumber));
   if (message.physicalCell) entries.add(cellLabel(message.radio), std::to_string(*message.physicalCell));
   if (message.frame) entries.add("System Frame Number", std::to_string(*message.frame));
   entries.add("Length", std::to_string(length));

@@ -4,6 +4,7 @@
 #include <optional>
 
 #include "LogGenerator/NumberFormats.h"
+#include "LogGenerator/PacketVersion.h"
 #include "LogGenerator/Radios/Subpackets.h"
 
 namespace varnel {
@@ -66,7 +67,7 @@ void VersionedDecoder::updateWithData_logCode(const Packet& packet, std::uint32_
   if (!version) return;
   forEachPart(layouts, payload, *version,
               [&](const PacketVersion& partVersion, const PacketLayout* layout, const Packet& body) {
-                if (!layout) return sectionRef.setText(versionEntry, partVersion.text() + " (not known)");
+                if (!layout) return sectionRef.setText(versionEntry, partVersion.unknownText());
                 if (body.size() < layout->minimumLength) return;
                 sectionRef.setText(versionEntry, partVersion.text());
                 decodeAs(*layout, body);

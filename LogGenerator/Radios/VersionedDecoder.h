@@ -19,8 +19,6 @@ namespace varnel {
 /// 32 bits there.
 class VersionedDecoder : public Base {
  public:
-  static constexpr std::string_view versionEntry = "Version";
-
   std::string_view getSectionName() const final { return _sectionName; }
   /// Each log code of the layouts once, in their order.
   std::vector<std::uint32_t> getLogCodeArray() const final;

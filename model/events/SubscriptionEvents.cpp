@@ -5,6 +5,7 @@
 #include <span>
 #include <utility>
 
+#include "LogGenerator/PacketVersion.h"
 #include "LogGenerator/SortedKey.h"
 #include "base/Dictionary.h"
 
@@ -99,7 +100,6 @@ constexpr std::string_view servedTexts[] = {
     "CS_ONLY",        "PS_ONLY",           "CS_PS_SERVICE",
 };
 
-constexpr std::string_view versionEntry = "Version", notKnown = " (not known)";
 // NR packets have versions of 32 bits.
 constexpr std::size_t mostVersionsTold = 32;
 
@@ -121,7 +121,7 @@ bool isIn(std::span<const std::string_view> texts, std::string_view text) {
 
 // "37" of "37 (not known)", and of "37".
 std::string numberOfVersion(std::string_view text) {
-  if (text.ends_with(notKnown)) text.remove_suffix(notKnown.size());
+  if (text.ends_with(unknownVersionMark)) text.remove_suffix(unknownVersionMark.size());
   return std::string(text);
 }
 
@@ -262,7 +262,7 @@ void SubscriptionEvents::lookAtService(StateWatch& watch, const std::string& tex
 void SubscriptionEvents::lookAtVersion(VersionWatch& watch) {
   const std::string& now = watch.version.now(watch.section);
   if (now == watch.version.before) return;
-  if (now.ends_with(notKnown) && watch.told.size() < mostVersionsTold &&
+  if (now.ends_with(unknownVersionMark) && watch.told.size() < mostVersionsTold &&
       std::ranges::find(watch.told, now) == watch.told.end()) {
     watch.told.push_back(now);
     add(EventKind::UnknownVersion, watch.path, numberOfVersion(watch.version.before), numberOfVersion(now));

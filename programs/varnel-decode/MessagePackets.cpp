@@ -121,20 +121,6 @@ std::optional<Bytes> gsmtapPacket(const AirMessage& message, const MessageDissec
   return packet;
 }
 
-std::string_view channelNumberName(Radio radio) {
-  switch (radio) {
-    case Radio::LTE:
-      return "EARFCN ";
-    case Radio::NR:
-      return "NR-ARFCN ";
-    case Radio::UMTS:
-      return "UARFCN ";
-    case Radio::GSM:
-      break;
-  }
-  return "ARFCN ";
-}
-
 }  // namespace
 
 std::uint16_t linkTypeOf(MessageForm form) {
@@ -152,7 +138,10 @@ std::string messageComment(const AirMessage& message) {
   text.append(" ").append(nameOf(message.protocol));
   if (!message.channel.empty()) text.append(" ").append(message.channel);
   if (message.channelNumber)
-    text.append(", ").append(channelNumberName(message.radio)).append(std::to_string(*message.channelNumber));
+    text.append(", ")
+        .append(channelNumberName(message.radio))
+        .append(" ")
+        .append(std::to_string(*message.channelNumber));
   if (message.physicalCell)
     text.append(message.radio == Radio::UMTS ? ", scrambling code " : ", cell ")
         .append(std::to_string(*message.physicalCell));
