@@ -5,19 +5,14 @@
 #include <cstdint>
 #include <string>
 
+#include "LogGenerator/Radios/ShownNumber.h"
 #include "LogGenerator/SortedKey.h"
 
 namespace varnel {
 
 namespace {
 
-// Of a text that is no number, 0.
-std::uint64_t numberIn(const Value& value) {
-  std::uint64_t number = 0;
-  if (const std::string* text = value.string())
-    std::from_chars(text->data(), text->data() + text->size(), number);
-  return number;
-}
+std::uint64_t countIn(const Value& shown) { return shownNumber<std::uint64_t>(shown).value_or(0); }
 
 std::string keyOf(const AirMessage& message) {
   std::string key(nameOf(message.radio));
@@ -39,8 +34,8 @@ void MessageCounts::take(const AirMessageReading& reading) {
     return entries->size() - (entries->has(_others.entry.key()) ? 1 : 0) - (entries->has(sortMark) ? 1 : 0);
   };
   const Value& shown = count.entry.get(*entries);
-  if (!shown.isAbsent() || names() < greatestCount) return set(count, *entries, numberIn(shown) + 1);
-  set(_others, *entries, numberIn(_others.entry.get(*entries)) + 1);
+  if (!shown.isAbsent() || names() < greatestCount) return set(count, *entries, countIn(shown) + 1);
+  set(_others, *entries, countIn(_others.entry.get(*entries)) + 1);
 }
 
 void MessageCounts::set(Count& count, Dictionary& entries, std::uint64_t number) {

@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "LogGenerator/NumberFormats.h"
+#include "LogGenerator/Radios/ShownNumber.h"
 #include "base/Dictionary.h"
 #include "base/Value.h"
 
@@ -91,11 +92,7 @@ void addQuality(Dictionary& record, const Packet& body) {
 // A record without its identity counts as one of 0.
 unsigned identityOf(const Value& record) {
   const Dictionary* const fields = record.dictionary();
-  const std::string* const text = fields ? fields->get(identityEntry).string() : nullptr;
-  unsigned identity = 0;
-  for (const char digit : text ? std::string_view(*text) : std::string_view())
-    identity = identity * 10 + static_cast<unsigned>(digit - '0');
-  return identity;
+  return fields ? shownNumber<unsigned>(fields->get(identityEntry)).value_or(0) : 0;
 }
 
 // Lets `change(Value&)` make a record from the one that is shown, which is absent for a new bearer. The

@@ -1,7 +1,8 @@
 #include "LogGenerator/Radios/LTE/Connection.h"
 
-#include <charconv>
 #include <string>
+
+#include "LogGenerator/Radios/ShownNumber.h"
 
 namespace varnel::lte {
 
@@ -12,13 +13,6 @@ constexpr std::string_view stateEntry = "RRC State", countEntry = "RRC Connectio
 // Whether the name is the message's, also in the variant of NB-IoT and of the release that brought it.
 bool is(std::string_view name, std::string_view message) {
   return name.starts_with(message) && (name.size() == message.size() || name[message.size()] == '-');
-}
-
-std::uint32_t numberIn(const Value& value) {
-  std::uint32_t number = 0;
-  if (const std::string* text = value.string())
-    std::from_chars(text->data(), text->data() + text->size(), number);
-  return number;
 }
 
 }  // namespace
@@ -36,7 +30,8 @@ void Connection::take(const AirMessageReading& reading) {
   if (!is(reading.message->channel, "DL-DCCH") && !is(reading.message->channel, "UL-DCCH")) return;
   sectionRef.setText(stateEntry, "Connected");
   if (mayChange && (is(name, "RRCConnectionSetupComplete") || is(name, "RRCConnectionResumeComplete")))
-    sectionRef.setText(countEntry, std::to_string(numberIn(entries->get(countEntry)) + 1));
+    sectionRef.setText(countEntry,
+                       std::to_string(shownNumber<std::uint32_t>(entries->get(countEntry)).value_or(0) + 1));
 }
 
 }  // namespace varnel::lte

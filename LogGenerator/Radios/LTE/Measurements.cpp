@@ -1,11 +1,11 @@
 #include "LogGenerator/Radios/LTE/Measurements.h"
 
 #include <array>
-#include <charconv>
 #include <string_view>
 
 #include "LogGenerator/NumberFormats.h"
 #include "LogGenerator/Radios/LTE/ServingCellLayouts.h"
+#include "LogGenerator/Radios/ShownNumber.h"
 
 namespace varnel::lte {
 
@@ -56,24 +56,14 @@ static_assert(extent(idle4) <= idle4Size && extent(idle5) <= idle5Size);
 constexpr Format blank = choice({}, "");
 
 // What an antenna shows that is not used.
-constexpr std::array<ServingCellLayout::Antenna, ServingCellLayout::mostAntennas> unusedAntennas = {{
-    {{{u8(0), "RSRP Rx0", blank},
-      {u8(0), "RSRQ Rx0", blank},
-      {u8(0), "RSSI Rx0", blank},
-      {u8(0), "SNR Rx0", blank}}},
-    {{{u8(0), "RSRP Rx1", blank},
-      {u8(0), "RSRQ Rx1", blank},
-      {u8(0), "RSSI Rx1", blank},
-      {u8(0), "SNR Rx1", blank}}},
-    {{{u8(0), "RSRP Rx2", blank},
-      {u8(0), "RSRQ Rx2", blank},
-      {u8(0), "RSSI Rx2", blank},
-      {u8(0), "SNR Rx2", blank}}},
-    {{{u8(0), "RSRP Rx3", blank},
-      {u8(0), "RSRQ Rx3", blank},
-      {u8(0), "RSSI Rx3", blank},
-      {u8(0), "SNR Rx3", blank}}},
-}};
+constexpr auto unusedAntennas = [] {
+  std::array<ServingCellLayout::Antenna, ServingCellLayout::mostAntennas> antennas{};
+  for (std::size_t i = 0; i < antennas.size(); ++i) {
+    for (std::size_t kind = 0; kind < antennas[i].size(); ++kind)
+      antennas[i][kind] = {u8(0), antennaLabels[i][kind], blank};
+  }
+  return antennas;
+}();
 
 // What only some of the packets carry. These entries are wrong for another cell.
 constexpr std::string_view entriesOfSomePackets[] = {
@@ -81,15 +71,6 @@ constexpr std::string_view entriesOfSomePackets[] = {
     "Subframe",      "Average RSRP",    "Average RSRQ",  "Cell Priority",           "Qrxlevmin",
     "P-Max",         "Max UE Tx Power", "Srxlev",        "S Intra Search",          "S Non Intra Search",
 };
-
-// Whether an entry shows another number. One that shows nothing does not.
-bool showsAnother(const Dictionary& entries, std::string_view entry, std::uint32_t number) {
-  const std::string* const text = entries.get(entry).string();
-  if (!text || text->empty()) return false;
-  std::array<char, 10> room;
-  const auto end = std::to_chars(room.begin(), room.end(), number).ptr;
-  return *text != std::string_view(room.begin(), end);
-}
 
 }  // namespace
 
@@ -138,9 +119,8 @@ void Measurements::updateIdle(const Packet& payload) {
 }
 
 Measurements::Cell Measurements::beginCell(std::uint32_t earfcn, std::uint32_t physicalCell) {
-  const Dictionary* const entries = sectionRef.container().dictionary();
-  if (!entries) return Cell::Same;
-  if (!showsAnother(*entries, "EARFCN", earfcn) && !showsAnother(*entries, "Physical Cell ID", physicalCell))
+  if (!showsAnotherNumber(sectionRef, "EARFCN", earfcn) &&
+      !showsAnotherNumber(sectionRef, "Physical Cell ID", physicalCell))
     return Cell::Same;
   for (const std::string_view entry : entriesOfSomePackets) sectionRef.setText(entry, "");
   return Cell::Another;

@@ -1,7 +1,6 @@
 #include "LogGenerator/Radios/LTE/Neighbors.h"
 
 #include <array>
-#include <charconv>
 #include <cmath>
 #include <limits>
 #include <optional>
@@ -9,6 +8,7 @@
 
 #include "LogGenerator/NumberFormats.h"
 #include "LogGenerator/Radios/RecordWriter.h"
+#include "LogGenerator/Radios/ShownNumber.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel::lte {
@@ -37,21 +37,11 @@ double rankOf(const Packet& cell, const Field& level) {
   return -(number * level.format.realFactor + level.format.realSummand);
 }
 
-// The number at the beginning of a text.
-template <class Number>
-std::optional<Number> numberIn(const Dictionary& record, std::string_view entry) {
-  const std::string* const text = record.get(entry).string();
-  Number number{};
-  if (!text || std::from_chars(text->data(), text->data() + text->size(), number).ec != std::errc())
-    return std::nullopt;
-  return number;
-}
-
 std::optional<CellPlace> placeOf(const Dictionary& record) {
-  const auto earfcn = numberIn<std::uint32_t>(record, channelEntry);
-  const auto physicalCell = numberIn<std::uint32_t>(record, cellEntry);
+  const auto earfcn = shownNumber<std::uint32_t>(record.get(channelEntry));
+  const auto physicalCell = shownNumber<std::uint32_t>(record.get(cellEntry));
   if (!earfcn || !physicalCell || *physicalCell > largestPhysicalCell) return std::nullopt;
-  const auto level = numberIn<double>(record, levelEntry);
+  const auto level = shownNumber<double>(record.get(levelEntry));
   return CellPlace{level && std::isfinite(*level) ? -*level : last, keyOf(*earfcn, *physicalCell)};
 }
 

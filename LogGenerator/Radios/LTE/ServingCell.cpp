@@ -9,6 +9,7 @@
 #include "LogGenerator/NumberFormats.h"
 #include "LogGenerator/Radios/ChannelText.h"
 #include "LogGenerator/Radios/Plmn.h"
+#include "LogGenerator/Radios/ShownNumber.h"
 #include "base/Dictionary.h"
 #include "platform/TelephonyService.h"
 
@@ -121,17 +122,11 @@ consteval Source sourceOf(std::span<const Field> fields, std::string_view label)
   throw "the table has no such entry";
 }
 
-bool showsOther(const Section& section, std::string_view entry, std::uint32_t number) {
-  const Dictionary* const entries = section.container().dictionary();
-  const std::string* const shown = entries ? entries->get(entry).string() : nullptr;
-  return shown && !shown->empty() && *shown != std::to_string(number);
-}
-
 // What is known of another cell says nothing about this one.
 void forgetOtherCell(Section& section, std::optional<std::uint32_t> physicalCell,
                      std::optional<std::uint32_t> earfcn) {
-  const bool isOther = (physicalCell && showsOther(section, physicalCellEntry, *physicalCell)) ||
-                       (earfcn && showsOther(section, channelEntry, *earfcn));
+  const bool isOther = (physicalCell && showsAnotherNumber(section, physicalCellEntry, *physicalCell)) ||
+                       (earfcn && showsAnotherNumber(section, channelEntry, *earfcn));
   if (!isOther) return;
   for (const std::string_view entry : entriesOfACell) section.setText(entry, {});
 }

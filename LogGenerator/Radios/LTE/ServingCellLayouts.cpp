@@ -45,9 +45,8 @@ constexpr TwoAntennas forTwoAntennas[] = {
 };
 // clang-format on
 
-// The versions for four antennas, in the same way. The RSRP of all antennas together is in the word of
-// antenna
-// 3. The filtered RSRQ is in the word of the RSRQ of all antennas.
+// The versions for four antennas, in the same way. The RSRP of all antennas together shares the word of
+// antenna 3. The filtered RSRQ is in the word of the RSRQ of all antennas.
 struct FourAntennas {
   std::uint8_t version;
   std::uint16_t first, stride;
@@ -73,11 +72,6 @@ constexpr FourAntennas forFourAntennas[] = {
 // clang-format on
 
 constexpr std::uint8_t versionWithoutServingBits = 60;
-
-constexpr std::string_view rsrpLabels[] = {"RSRP Rx0", "RSRP Rx1", "RSRP Rx2", "RSRP Rx3"};
-constexpr std::string_view rsrqLabels[] = {"RSRQ Rx0", "RSRQ Rx1", "RSRQ Rx2", "RSRQ Rx3"};
-constexpr std::string_view rssiLabels[] = {"RSSI Rx0", "RSSI Rx1", "RSSI Rx2", "RSSI Rx3"};
-constexpr std::string_view snrLabels[] = {"SNR Rx0", "SNR Rx1", "SNR Rx2", "SNR Rx3"};
 
 // A run of bits of a word; the first bit may lie behind the word's first byte.
 consteval Source inWord(std::uint16_t word, unsigned firstBit, std::uint8_t width) {
@@ -124,15 +118,15 @@ class Builder {
   }
   consteval void addAntenna(Source rsrp, Source rsrq, Source rssi) {
     const std::size_t index = _layout.antennaCount++;
-    addOfAntenna(index, 0, {rsrp, rsrpLabels[index], rsrpFormat});
-    addOfAntenna(index, 1, {rsrq, rsrqLabels[index], rsrqFormat});
-    addOfAntenna(index, 2, {rssi, rssiLabels[index], rssiFormat});
+    addOfAntenna(index, 0, rsrp, rsrpFormat);
+    addOfAntenna(index, 1, rsrq, rsrqFormat);
+    addOfAntenna(index, 2, rssi, rssiFormat);
   }
   // Two antennas share a word.
   consteval void addSNR(std::size_t firstAntenna, std::uint16_t word) {
     if (word == none) return;
-    addOfAntenna(firstAntenna, 3, {inWord(word, 0, 9), snrLabels[firstAntenna], snrFormat});
-    addOfAntenna(firstAntenna + 1, 3, {inWord(word, 9, 9), snrLabels[firstAntenna + 1], snrFormat});
+    addOfAntenna(firstAntenna, 3, inWord(word, 0, 9), snrFormat);
+    addOfAntenna(firstAntenna + 1, 3, inWord(word, 9, 9), snrFormat);
   }
 
   consteval ServingCellLayout layout() const {
@@ -142,10 +136,11 @@ class Builder {
   }
 
  private:
-  consteval void addOfAntenna(std::size_t antenna, std::size_t quantity, const Field& field) {
-    _layout.antennas[antenna][quantity] = field;
+  consteval void addOfAntenna(std::size_t antenna, std::size_t quantity, Source source,
+                              const Format& format) {
+    _layout.antennas[antenna][quantity] = {source, antennaLabels[antenna][quantity], format};
     _layout.antennaFieldCount = std::max(_layout.antennaFieldCount, quantity + 1);
-    include(field.source);
+    include(source);
   }
   // A word is wholly there or not at all.
   consteval void include(const Source& source) {

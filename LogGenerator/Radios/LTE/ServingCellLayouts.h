@@ -6,6 +6,7 @@
 #include <iterator>
 #include <optional>
 #include <span>
+#include <string_view>
 #include <utility>
 
 #include "LogGenerator/Field.h"
@@ -27,11 +28,19 @@ inline constexpr Format rsrpFormat = real("%.2f dBm", 1.0 / 16, -180.0);
 inline constexpr Format rsrqFormat = real("%.2f dB", 1.0 / 16, -30.0);
 inline constexpr Format rssiFormat = real("%.2f dBm", 1.0 / 16, -110.0);
 
+/// The entries that show what an antenna measures: RSRP, RSRQ, RSSI and SNR.
+inline constexpr std::string_view antennaLabels[][4] = {
+    {"RSRP Rx0", "RSRQ Rx0", "RSSI Rx0", "SNR Rx0"},
+    {"RSRP Rx1", "RSRQ Rx1", "RSSI Rx1", "SNR Rx1"},
+    {"RSRP Rx2", "RSRQ Rx2", "RSSI Rx2", "SNR Rx2"},
+    {"RSRP Rx3", "RSRQ Rx3", "RSSI Rx3", "SNR Rx3"},
+};
+
 /// One version of the subpacket. The offsets of its cells' fields count from the cell's first byte.
 struct ServingCellLayout {
-  static constexpr std::size_t mostAntennas = 4;
+  static constexpr std::size_t mostAntennas = std::size(antennaLabels);
 
-  /// What one antenna measures: RSRP, RSRQ, RSSI and SNR.
+  /// In the order of the labels.
   using Antenna = std::array<Field, 4>;
 
   std::uint8_t version = 0;
