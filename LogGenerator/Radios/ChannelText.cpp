@@ -1,8 +1,5 @@
 #include "LogGenerator/Radios/ChannelText.h"
 
-#include <algorithm>
-#include <iterator>
-
 #include "LogGenerator/Radios/Channels.h"
 
 namespace varnel::channels {
@@ -29,11 +26,6 @@ std::string lteUplinkFrequency(std::uint32_t earfcn) {
 std::string lteBand(std::uint32_t earfcn) {
   const auto channel = lteDownlink(earfcn);
   return channel ? std::to_string(channel->band) : std::string();
-}
-
-std::string_view lteBandwidth(std::uint32_t resourceBlocks) {
-  const auto found = std::ranges::find(lteBandwidths, resourceBlocks, &Choice::raw);
-  return found == std::end(lteBandwidths) ? lteBandwidthFormat.otherwise : found->text;
 }
 
 std::string nrFrequency(std::uint32_t nrArfcn) {

@@ -26,8 +26,6 @@ std::string lteDownlinkFrequency(std::uint32_t earfcn);
 std::string lteUplinkFrequency(std::uint32_t earfcn);
 /// "13": the band of a downlink EARFCN.
 std::string lteBand(std::uint32_t earfcn);
-/// "10 MHz" for 50 resource blocks; "Unknown" for a number that LTE does not have.
-std::string_view lteBandwidth(std::uint32_t resourceBlocks);
 
 std::string nrFrequency(std::uint32_t nrArfcn);
 

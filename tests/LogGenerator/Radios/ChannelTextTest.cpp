@@ -25,15 +25,20 @@ TEST(ChannelText, ANumberOfNoBandMakesAnEmptyText) {
 
 TEST(ChannelText, TheBandIsThatOfTheDownlink) { EXPECT_EQ(lteBand(5230), "13"); }
 
+std::string bandwidthText(std::uint8_t resourceBlocks) {
+  Formatter formatter;
+  return std::string(formatter.text(Packet(ByteView(&resourceBlocks, 1)), u8(0), lteBandwidthFormat));
+}
+
 TEST(ChannelText, LTEBandwidthsAreThoseOfTheStandard) {
-  EXPECT_EQ(lteBandwidth(6), "1.4 MHz");
-  EXPECT_EQ(lteBandwidth(15), "3 MHz");
-  EXPECT_EQ(lteBandwidth(25), "5 MHz");
-  EXPECT_EQ(lteBandwidth(50), "10 MHz");
-  EXPECT_EQ(lteBandwidth(75), "15 MHz");
-  EXPECT_EQ(lteBandwidth(100), "20 MHz");
-  EXPECT_EQ(lteBandwidth(0), "Unknown");
-  EXPECT_EQ(lteBandwidth(101), "Unknown");
+  EXPECT_EQ(bandwidthText(6), "1.4 MHz");
+  EXPECT_EQ(bandwidthText(15), "3 MHz");
+  EXPECT_EQ(bandwidthText(25), "5 MHz");
+  EXPECT_EQ(bandwidthText(50), "10 MHz");
+  EXPECT_EQ(bandwidthText(75), "15 MHz");
+  EXPECT_EQ(bandwidthText(100), "20 MHz");
+  EXPECT_EQ(bandwidthText(0), "Unknown");
+  EXPECT_EQ(bandwidthText(101), "Unknown");
 }
 
 TEST(ChannelText, NRFrequenciesHaveThreeDecimals) {
