@@ -31,8 +31,9 @@ constexpr Field identityEntries[] = {
     {u16(5), "AMF Set"},
     {u8(7), "AMF Pointer"},
 };
+constexpr std::string_view temporaryIdentityEntry = "5G-TMSI";
 constexpr Field temporaryIdentity[] = {
-    {u32(8), "5G-TMSI", hexadecimal("0x%08x")},
+    {u32(8), temporaryIdentityEntry, hexadecimal("0x%08x")},
 };
 
 }  // namespace
@@ -59,7 +60,7 @@ void Registration::showIdentity(const Packet& identity) {
   if (identity.bits(0, 0, 3) != typeOf5GGUTI) {
     sectionRef.setText("AMF PLMN", "");
     for (const Field& field : identityEntries) sectionRef.setText(field.label, "");
-    sectionRef.setText("5G-TMSI", "");
+    sectionRef.setText(temporaryIdentityEntry, "");
     return;
   }
   sectionRef.setText("AMF PLMN", plmnText(identity, 1));
@@ -67,7 +68,7 @@ void Registration::showIdentity(const Packet& identity) {
   if (_identities == Identities::Shown) {
     sectionRef.show(identity, temporaryIdentity);
   } else {
-    sectionRef.setText("5G-TMSI", "present");
+    sectionRef.setText(temporaryIdentityEntry, presentText);
   }
 }
 

@@ -7,7 +7,7 @@ namespace varnel::nr {
 
 /// Fills the section "Registration" of NR: how far 5G mobility management (5GMM) is registered, and under
 /// which identity (5G-GUTI).
-class Registration : public VersionedDecoder {
+class Registration final : public VersionedDecoder {
  public:
   explicit Registration(Identities identities = Identities::Hidden);
 

@@ -5,7 +5,7 @@
 namespace varnel::nr {
 
 /// Fills the section "Serving Cell" of NR: the cell that the modem camps on, its channels, and its network.
-class ServingCell : public VersionedDecoder {
+class ServingCell final : public VersionedDecoder {
  public:
   ServingCell();
   void listNumberFormats(SectionFormats& formats) const override;
