@@ -35,6 +35,7 @@ constexpr Technology technologies[] = {
     {technology::kalviGSMUMTS, "GSM and UMTS"},
     {technology::kalviUTRAN2, "UTRAN"},
     {technology::kalviCDMA, "CDMA2000"},
+    {technology::allRadios, "All radios"},
 };
 
 constexpr std::string_view tableMark = "@SECTIONS_OF_CODE@";

@@ -243,28 +243,36 @@ TEST_F(Dissector, AnUnknownLogCodeIsTold) {
 }
 
 TEST_F(Dissector, ALogCodeNamesTheTechnologiesAndSectionsThatItFeeds) {
-  EXPECT_THAT(
-      shown({packet(1, 0xB17F), packet(1, 0xB180), packet(1, 0xD00C), packet(1, 0x417A), packet(1, 0x7132),
-             packet(1, 0x119C), packet(1, 0x12B6), packet(1, 0x134F), packet(0xFF, 0), packet(0xFF, 2)},
-            {"varnel.section"}),
-      ElementsAre("LTE: Serving Cell Measurements", "LTE: Neighbor Measurements|LTE: Neighbor Cells List",
-                  "UTRAN: TRCH BLER|UTRAN: CCTRCH SIR",
-                  "GSM and UMTS: Active Set|GSM and UMTS: Detected Set|GSM and UMTS: Monitored Set|"
-                  "GSM and UMTS: Virtual Active Set",
-                  "GSM and UMTS: Process PS|GSM and UMTS: Process CO|GSM and UMTS: Serving PLMN|"
-                  "GSM and UMTS: Process CS",
-                  "CDMA2000: 1x", "CDMA2000: EV-DO", "CDMA2000: Network",
-                  "LTE: SIM Info|GSM and UMTS: SIM Info|UTRAN: SIM Info",
-                  "LTE: PDP Context Info|GSM and UMTS: PDP Context Info|UTRAN: PDP Context Info"));
+  EXPECT_THAT(shown({packet(1, 0xB17F), packet(1, 0xB193), packet(1, 0xB180), packet(1, 0xD00C),
+                     packet(1, 0x417A), packet(1, 0x7132), packet(1, 0x119C), packet(1, 0x12B6),
+                     packet(1, 0x134F), packet(0xFF, 0), packet(0xFF, 2)},
+                    {"varnel.section"}),
+              ElementsAre("LTE: Serving Cell Measurements|All radios: Measurements",
+                          "All radios: Measurements|All radios: Carriers|All radios: Neighbors",
+                          "LTE: Neighbor Measurements|LTE: Neighbor Cells List|All radios: Neighbors",
+                          "UTRAN: TRCH BLER|UTRAN: CCTRCH SIR|All radios: TRCH BLER|All radios: CCTRCH SIR",
+                          "GSM and UMTS: Active Set|GSM and UMTS: Detected Set|GSM and UMTS: Monitored Set|"
+                          "GSM and UMTS: Virtual Active Set|All radios: Active Set|All radios: Detected Set|"
+                          "All radios: Monitored Set|All radios: Virtual Active Set",
+                          "GSM and UMTS: Process PS|GSM and UMTS: Process CO|GSM and UMTS: Serving PLMN|"
+                          "GSM and UMTS: Process CS|All radios: Process PS|All radios: Process CO|"
+                          "All radios: Process CS|All radios: Serving PLMN",
+                          "CDMA2000: 1x|All radios: 1x", "CDMA2000: EV-DO|All radios: EV-DO",
+                          "CDMA2000: Network|All radios: Network",
+                          "LTE: SIM Info|GSM and UMTS: SIM Info|UTRAN: SIM Info|All radios: SIM Info",
+                          "LTE: PDP Context Info|GSM and UMTS: PDP Context Info|UTRAN: PDP Context Info|"
+                          "All radios: PDP Context Info"));
 }
 
 TEST_F(Dissector, TheListOfMessagesNamesEachOne) {
   EXPECT_THAT(
       shown({servingCell, packet(0xFF, 1), Bytes{1}}, {"_ws.col.Protocol", "_ws.col.Info"}),
       ElementsAre(
-          "VARNEL\t0xB17F  LTE: Serving Cell Measurements",
+          "VARNEL\t0xB17F  LTE: Serving Cell Measurements; All radios: Measurements",
           "VARNEL\t0xFF0001  LTE: Serving Cell Info; GSM and UMTS: GSM Serving Cell, Neighboring Cells, "
-          "Serving PLMN, UMTS Set, UMTS RR Info; UTRAN: Serving Cell Info",
+          "Serving PLMN, UMTS Set, UMTS RR Info; UTRAN: Serving Cell Info; All radios: Serving Cell, "
+          "Neighbors, "
+          "UMTS Set, UMTS RR Info, Serving Cell Info, GSM Serving Cell, Neighboring Cells, Serving PLMN",
           "VARNEL\tMessage without a header"));
 }
 

@@ -94,8 +94,9 @@ TEST_F(Installation, TheDesktopFileNamesAProgramAndAnIconThatAreThere) {
 }
 
 TEST_F(Installation, TheDissectorIsThereWithItsTableOfLogCodes) {
-  EXPECT_THAT(contentsOf(installed("share/varnel/wireshark/varnel.lua")),
-              HasSubstr("[0xB17F] = {{\"LTE\", \"Serving Cell Measurements\"}}"));
+  EXPECT_THAT(
+      contentsOf(installed("share/varnel/wireshark/varnel.lua")),
+      HasSubstr("[0xB17F] = {{\"LTE\", \"Serving Cell Measurements\"}, {\"All radios\", \"Measurements\"}}"));
 }
 
 TEST_F(Installation, ManualPagesHaveNoWarnings) {
