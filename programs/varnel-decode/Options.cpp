@@ -8,6 +8,7 @@
 #include <system_error>
 #include <utility>
 
+#include "LogGenerator/KLV/Subscriber/SimFiles.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-decode/ProgramError.h"
 
@@ -75,12 +76,13 @@ std::vector<std::string> formatNames() {
 
 // The values that tell who the user of a phone is. Where they are shown they may look like numbers.
 bool isIdentityPath(std::string_view path) {
-  constexpr std::string_view names[] = {"EF-ICCID",        "EF-MSISDN", "EF-LOCI",
-                                        "EF-GPRS/PS-LOCI", "M-TMSI",    "5G-TMSI"};
-  return std::ranges::any_of(names, [&](std::string_view name) {
+  const auto endsIn = [&](std::string_view name) {
     if (!path.ends_with(name)) return false;
     return path.size() == name.size() || path[path.size() - name.size() - 1] == '/';
-  });
+  };
+  return endsIn("M-TMSI") || endsIn("5G-TMSI") || std::ranges::any_of(simFiles, [&](const SimFile& file) {
+           return file.namesPerson && endsIn(file.entry);
+         });
 }
 
 DisplayWriter writerNamed(std::string_view name) {
@@ -153,8 +155,8 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
       ->expected(2, CLI::detail::expected_max_vector_size);
   app.add_flag(
       "--identities", wishes.isShowingIdentities,
-      "let all-radios show identities (M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI), not only that they "
-      "are present; --stats and --plot never do");
+      "let all-radios show identities (M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI, EF-GPRS/PS-LOCI), not "
+      "only that they are present; --stats and --plot never do");
   app.add_option("--snapshot", options.snapshotPath, "also write a snapshot file")->type_name("FILE");
   app.add_option("--dlf", options.binaryLogPath, "also write the binary log of the last displays")
       ->type_name("FILE");

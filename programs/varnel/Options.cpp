@@ -46,8 +46,8 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       ->check(CLI::Range(1U, 255U).description(""))
       ->type_name("N");
   parser.add_flag("--identities", options.showsIdentities,
-                  "let all-radios show identities (M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI), not only "
-                  "that they are present; snapshots hold them in any case");
+                  "let all-radios show identities (M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI, "
+                  "EF-GPRS/PS-LOCI), not only that they are present; snapshots hold them in any case");
   parser.add_option("--updates", options.updates, "end after this many refreshes")
       ->check(CLI::Range(1U, std::numeric_limits<unsigned>::max()).description(""))
       ->type_name("N");
