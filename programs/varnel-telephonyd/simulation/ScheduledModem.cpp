@@ -2,10 +2,12 @@
 
 #include <algorithm>
 
+#include "base/MessagePrefix.h"
+
 namespace varnel::simulation {
 
 namespace {
-constexpr std::uint8_t prefixMark = 0x81, noSubscription = 0;
+constexpr std::uint8_t noSubscription = 0;
 constexpr int messagesPerPrefix = 8;
 }  // namespace
 
