@@ -20,9 +20,9 @@ class MessageStatistics {
   void setCapture(const Subscriptions::Counts& records, const LeftOut& leftOut);
 
   /// One line per log code in ascending order, then the lines of messages without one, then the sums. One
-  /// line per unknown version follows the line of its log code. If frames of the capture were left out, the
-  /// sum of all frames comes last, then one line for the records and one per kind of left-out frame. If
-  /// records name a SIM card, one line per SIM card follows.
+  /// line per unknown version follows the line of its log code. If frames of the capture were left out, then
+  /// come the sum of all frames, one line for the records, and one per kind of left-out frame. If records
+  /// name a SIM card, one line per SIM card ends the table.
   std::string asTable() const;
   /// The same as one line of JSON: {"Messages": […], "Frames": {…}, "SIM": […], "Total": {…}}. With a
   /// capture's name, "Capture" comes first.
