@@ -31,6 +31,7 @@ class MessageSource {
   /// After `next` has returned nothing: whether more messages may come. Else the stream has ended.
   virtual bool isWaiting() const { return false; }
   /// Gets the function that the source calls, from the main queue, when waiting is over and `next` has news.
+  // NOLINTNEXTLINE(performance-unnecessary-value-param): sources that have news keep it
   virtual void setNewsHandler(std::function<void()> /*handler*/) {}
   /// One sentence for the viewer that waits for something else than the next message; else empty.
   virtual std::string waitNote() const { return {}; }

@@ -88,7 +88,34 @@ TEST_F(PortEndToEnd, TheModemIsQuietAgainWhenTheServerIsAskedToEnd) {
   EXPECT_EQ(telephony->exitStatus(), 0) << telephony->error();
   EXPECT_FALSE(_modem.isOn(0xB0C1));
   EXPECT_THAT(lastThreeRequests(), ElementsAre(eventsOff, allCodesOff, debugTextOff));
-  EXPECT_THAT(telephony->error(), HasSubstr("\nvarnel-telephonyd: port: 0 records, 0 frames left out\n"));
+  EXPECT_THAT(telephony->error(), HasSubstr("\nvarnel-telephonyd: port: 0 records, "));
+}
+
+// The answers to the last requests come after everything else, so the server has read all when it ends.
+TEST_F(PortEndToEnd, EveryRecordArrivesAndWhatIsNoneIsCounted) {
+  const auto telephony = server();
+  const auto varnel = viewer();
+  ASSERT_TRUE(eventually([&] { return _modem.isOn(0xB0C1); })) << telephony->error();
+  const Bytes log = logContents(0xB0C1, masterInformation(77, 2));
+  Bytes wrapped{0x98, 1, 0, 0, 2, 0, 0, 0};
+  wrapped.insert(wrapped.end(), log.begin(), log.end());
+  Bytes unsound = framed(log);
+  unsound[20] ^= 1;
+  for (int i = 0; i < 1000; ++i) {
+    _modem.send(framed(log));
+    _modem.send(framed(wrapped));
+    if (i % 100 != 0) continue;
+    _modem.send(unsound);
+    _modem.send(framed({0x9E, 1, 2, 3}));
+    _modem.send(framed({0x79, 1, 2, 3}));
+  }
+  ASSERT_TRUE(eventually([&] { return _modem.hasSentAll(); }));
+  telephony->signal(SIGTERM);
+  ASSERT_TRUE(telephony->waitForEnd());
+  EXPECT_THAT(telephony->error(), HasSubstr("\nvarnel-telephonyd: messages: 2000 received, "));
+  EXPECT_THAT(telephony->error(), HasSubstr("\nvarnel-telephonyd: port: 2000 records, "));
+  EXPECT_THAT(telephony->error(), HasSubstr("(10 with a wrong checksum, "));
+  EXPECT_THAT(telephony->error(), HasSubstr(" of other commands, 10 encrypted)\n"));
 }
 
 TEST_F(PortEndToEnd, AfterTheModemWasUnpluggedTheDisplayGoesOn) {

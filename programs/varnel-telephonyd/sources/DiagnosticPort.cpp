@@ -10,6 +10,7 @@
 
 #include <array>
 #include <cerrno>
+#include <chrono>
 #include <cstddef>
 
 #include "programs/varnel-telephonyd/sources/PortHolders.h"
@@ -21,6 +22,10 @@ namespace {
 
 // Per turn of the event loop. The viewers' channels can send more messages in a turn than these bytes hold.
 constexpr std::size_t mostPerTurn = 1 << 14;
+// After a turn with few bytes the next one waits a little, so that a modem's records are taken several at a
+// time: each turn costs more than a record. The system holds what comes meanwhile.
+constexpr std::size_t fewBytes = 1 << 10;
+constexpr std::chrono::milliseconds pause(10);
 // A port that takes nothing gets no more. Requests are few and short.
 constexpr std::size_t mostOutgoing = 1 << 16;
 
@@ -88,6 +93,8 @@ std::optional<std::string> DiagnosticPort::open(Handlers handlers) {
   _room.resize(mostPerTurn);
   _readable = std::make_unique<QSocketNotifier>(_device.number(), QSocketNotifier::Read);
   QObject::connect(_readable.get(), &QSocketNotifier::activated, _readable.get(), [this] { readBytes(); });
+  _rest.setSingleShot(true);
+  _rest.callOnTimeout(_readable.get(), [this] { _readable->setEnabled(true); });
   _writable = std::make_unique<QSocketNotifier>(_device.number(), QSocketNotifier::Write);
   _writable->setEnabled(false);
   QObject::connect(_writable.get(), &QSocketNotifier::activated, _writable.get(), [this] { writeBytes(); });
@@ -101,6 +108,7 @@ void DiagnosticPort::send(ByteView bytes) {
 }
 
 void DiagnosticPort::close() {
+  _rest.stop();
   for (auto* const notifier : {&_readable, &_writable}) {
     if (!*notifier) continue;
     (*notifier)->setEnabled(false);
@@ -118,7 +126,14 @@ void DiagnosticPort::readBytes() noexcept {
     if (count <= 0) return goAway();
     total += static_cast<std::size_t>(count);
     _handlers.bytesCame(ByteView(_room).first(static_cast<std::size_t>(count)));
+    if (static_cast<std::size_t>(count) < fewBytes) return restAWhile();
   }
+}
+
+void DiagnosticPort::restAWhile() {
+  if (!_readable) return;
+  _readable->setEnabled(false);
+  _rest.start(pause);
 }
 
 // An error that lasts is met by the reader too.

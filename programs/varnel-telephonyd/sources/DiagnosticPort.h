@@ -1,6 +1,7 @@
 #pragma once
 
 #include <QSocketNotifier>
+#include <QTimer>
 #include <memory>
 #include <optional>
 #include <string>
@@ -30,6 +31,7 @@ class DiagnosticPort final : public PortDevice {
 
  private:
   void readBytes() noexcept;
+  void restAWhile();
   void writeBytes() noexcept;
   void goAway();
 
@@ -39,6 +41,7 @@ class DiagnosticPort final : public PortDevice {
   Bytes _room;      // for what is read
   Bytes _outgoing;  // what the device has not taken yet
   std::unique_ptr<QSocketNotifier> _readable, _writable;
+  QTimer _rest;  // runs while the device is not read
 };
 
 }  // namespace varnel
