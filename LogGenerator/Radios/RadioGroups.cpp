@@ -58,21 +58,6 @@ bool hasContent(const Value& value) {
   });
 }
 
-Value copyOf(const Value& object) {
-  if (const Dictionary* entries = object.dictionary()) {
-    Value copy = Value::ofDictionary();
-    copy.dictionary()->reserve(entries->size());
-    for (const auto& [key, value] : *entries) copy.dictionary()->set(key, copyOf(value));
-    return copy;
-  }
-  if (const Array* elements = object.array()) {
-    Value copy = Value::ofArray();
-    for (const Value& element : *elements) copy.array()->push_back(copyOf(element));
-    return copy;
-  }
-  return object;
-}
-
 }  // namespace
 
 RadioGroups::RadioGroups(const Services& services, const Value& displayTemplate)
@@ -139,7 +124,7 @@ void RadioGroups::bind(const Value& memory, const Value& display) {
 void RadioGroups::bindSections(Group& group) {
   Dictionary& sections = *group.shown.dictionary();
   for (const auto& [name, value] : *group.sections) {
-    if (!sections.has(name)) sections.set(name, copyOf(value));
+    if (!sections.has(name)) sections.set(name, value.deepCopy());
     Base* const decoder = decoderOf(group, name);
     if (!decoder) continue;
     const Value& section = sections.get(name);
