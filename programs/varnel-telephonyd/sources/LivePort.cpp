@@ -46,6 +46,7 @@ void LivePort::updateCodes() {
   WantedCodes wanted;
   for (const PortSource* source : _sources)
     if (source->filter()) wanted.add(*source->filter());
+  if (_session->isReady()) setNote("");  // other codes may not be refused
   _session->setWanted(std::move(wanted));
   tellMissingCodes();
 }

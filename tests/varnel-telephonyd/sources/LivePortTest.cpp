@@ -277,6 +277,11 @@ TEST_F(LivePortTest, CodesThatAreRefusedAreTold) {
   EXPECT_EQ(_told.at(0),
             "/dev/modem refuses to switch on the log codes from 0xB000 on (error 0x15); sections that need "
             "them stay empty");
+  _device.modem.otherAnswers.clear();
+  source->setFilter({.modemCodes = CodeFilter::Codes{0xB0C2}, .serverCodes = {}});
+  run();
+  EXPECT_EQ(source->waitNote(), "");
+  EXPECT_TRUE(_device.modem.isOn(0xB0C2));
 }
 
 TEST_F(LivePortTest, AtTheEndTheModemIsQuietAndTheDeviceIsClosed) {
