@@ -5,6 +5,7 @@
 #include <string>
 #include <utility>
 
+#include "LogGenerator/LogMessage.h"
 #include "base/Log.h"
 
 namespace varnel {
@@ -116,6 +117,22 @@ void KLVLogGenerator::keepNoRawBytes() {
 
 void KLVLogGenerator::leaveOut() {
   if (_roomForRawBytes > 0) ++_leftOut;
+}
+
+Value KLVLogGenerator::startCommandFor(std::span<const std::uint32_t> logCodes) {
+  Value modemCodes = Value::ofArray();
+  Value extraCodes = Value::ofArray();
+  for (const std::uint32_t code : logCodes) {
+    const bool isExtra = code >= LogMessage::extraCodeBase;
+    (isExtra ? extraCodes : modemCodes)
+        .array()
+        ->push_back(Value::ofInteger(isExtra ? code - LogMessage::extraCodeBase : code));
+  }
+  Value command = Value::ofDictionary();
+  command.dictionary()->set("SetState", "Streaming");
+  command.dictionary()->set("SetKalviLogCodes", modemCodes);
+  command.dictionary()->set("SetTkExtraCodes", extraCodes);
+  return command;
 }
 
 void KLVLogGenerator::storeBinDataInState(Dictionary& state) {

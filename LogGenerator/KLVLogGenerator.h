@@ -56,6 +56,10 @@ class KLVLogGenerator : public LogGenerator {
   /// holds something else.
   std::optional<Bytes> generateDlfFromState(const Dictionary& state) const;
 
+  /// The command that asks the telephony server for the packets of these log codes, the modem's and its own
+  /// in a list each.
+  static Value startCommandFor(std::span<const std::uint32_t> logCodes);
+
   /// Moves the collected bytes into the state's "DisplayState". If this interval lacks messages, logs how
   /// many.
   void storeBinDataInState(Dictionary& state);

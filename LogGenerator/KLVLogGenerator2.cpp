@@ -164,19 +164,7 @@ Value KLVLogGenerator2::generateLogUsingState(Dictionary& state) {
 }
 
 Value KLVLogGenerator2::getStartCommand() const {
-  Value logCodes = Value::ofArray();
-  Value extraCodes = Value::ofArray();
-  for (const std::uint32_t code : cIndex ? cIndex->logCodes() : std::span<const std::uint32_t>()) {
-    const bool isExtra = code >= LogMessage::extraCodeBase;
-    (isExtra ? extraCodes : logCodes)
-        .array()
-        ->push_back(Value::ofInteger(isExtra ? code - LogMessage::extraCodeBase : code));
-  }
-  Value command = Value::ofDictionary();
-  command.dictionary()->set("SetState", "Streaming");
-  command.dictionary()->set("SetKalviLogCodes", logCodes);
-  command.dictionary()->set("SetTkExtraCodes", extraCodes);
-  return command;
+  return startCommandFor(cIndex ? cIndex->logCodes() : std::span<const std::uint32_t>());
 }
 
 }  // namespace varnel

@@ -109,21 +109,7 @@ Value AllRadiosLogGenerator::generateLogUsingState(Dictionary& state) {
   return state.get(stateKey::display);
 }
 
-Value AllRadiosLogGenerator::getStartCommand() const {
-  Value logCodes = Value::ofArray();
-  Value extraCodes = Value::ofArray();
-  for (const std::uint32_t code : unbound().logCodes()) {
-    const bool isExtra = code >= LogMessage::extraCodeBase;
-    (isExtra ? extraCodes : logCodes)
-        .array()
-        ->push_back(Value::ofInteger(isExtra ? code - LogMessage::extraCodeBase : code));
-  }
-  Value command = Value::ofDictionary();
-  command.dictionary()->set("SetState", "Streaming");
-  command.dictionary()->set("SetKalviLogCodes", logCodes);
-  command.dictionary()->set("SetTkExtraCodes", extraCodes);
-  return command;
-}
+Value AllRadiosLogGenerator::getStartCommand() const { return startCommandFor(unbound().logCodes()); }
 
 MessageFate AllRadiosLogGenerator::fateOf(ByteView data) const {
   const auto message = LogMessage::framed(data);
