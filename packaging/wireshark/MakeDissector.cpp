@@ -31,10 +31,8 @@ struct Technology {
 };
 // Those whose messages are packets.
 constexpr Technology technologies[] = {
-    {technology::kalviLTE, "LTE"},
-    {technology::kalviGSMUMTS, "GSM and UMTS"},
-    {technology::kalviUTRAN2, "UTRAN"},
-    {technology::kalviCDMA, "CDMA2000"},
+    {technology::kalviLTE, "LTE"},         {technology::kalviGSMUMTS, "GSM and UMTS"},
+    {technology::kalviUTRAN2, "UTRAN"},    {technology::kalviCDMA, "CDMA2000"},
     {technology::allRadios, "All radios"},
 };
 

@@ -42,10 +42,11 @@ class LastMessagesTest : public testing::Test {
 TEST_F(LastMessagesTest, AMessageOfLTEShowsItsCellAndFrame) {
   decode(lteRRCPacket(9, {0x20, 0x01, 0x02}, 683U << 4 | 5U), 0xB0C0);
   ASSERT_EQ(list().size(), 1U);
-  EXPECT_EQ(described(list().front()),
-            R"({Time: "2020-05-08 17:25:09.250 +0000", Radio: "LTE", Protocol: "RRC", Direction: "Downlink", )"
-            R"(Channel: "DL-DCCH", Name: "RRCConnectionReconfiguration", EARFCN: "66536", )"
-            R"(Physical Cell ID: "411", System Frame Number: "683", Length: "3"})");
+  EXPECT_EQ(
+      described(list().front()),
+      R"({Time: "2020-05-08 17:25:09.250 +0000", Radio: "LTE", Protocol: "RRC", Direction: "Downlink", )"
+      R"(Channel: "DL-DCCH", Name: "RRCConnectionReconfiguration", EARFCN: "66536", )"
+      R"(Physical Cell ID: "411", System Frame Number: "683", Length: "3"})");
   EXPECT_EQ(described(section.dictionary()->get("Version")), R"("26")");
 }
 
