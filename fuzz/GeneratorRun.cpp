@@ -68,8 +68,9 @@ class GeneratorRun {
   /// Returns the display.
   Value generate() {
     Value display = _generator->generateLogUsingState(_state);
-    require(_hasDisplay == !display.isAbsent() || isCDMA(), "there is a display once it has been built");
-    require(!isCDMA() || display.dictionary(), "the CDMA2000 display is there from the first");
+    require(_hasDisplay == !display.isAbsent() || isThereFromTheFirst(),
+            "there is a display once it has been built");
+    require(!isThereFromTheFirst() || display.dictionary(), "the display is there from the first");
     if (isObjectStream())
       require(display.isAbsent() || isCollapsed(display),
               "an object is shown without dictionaries of one entry");
@@ -100,7 +101,9 @@ class GeneratorRun {
 
  private:
   bool isObjectStream() const { return _technology == technology::ifxGSM; }
-  bool isCDMA() const { return _technology == technology::kalviCDMA; }
+  bool isThereFromTheFirst() const {
+    return _technology == technology::kalviCDMA || _technology == technology::allRadios;
+  }
 
   Outcome outcomeOf(ByteView message) {
     try {

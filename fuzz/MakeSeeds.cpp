@@ -42,7 +42,7 @@ struct Technology {
 constexpr Technology technologies[] = {
     {technology::ifxGSM, "GSMFuzz"},        {technology::kalviGSMUMTS, "GSMUMTSFuzz"},
     {technology::kalviCDMA, "C2KFuzz"},     {technology::kalviLTE, "LTEFuzz"},
-    {technology::kalviUTRAN2, "UTRANFuzz"},
+    {technology::kalviUTRAN2, "UTRANFuzz"}, {technology::allRadios, "AllRadiosFuzz"},
 };
 
 // The seeds of one target, numbered per kind.

@@ -50,7 +50,8 @@ bool isStrangeToXml(const std::string& text) {
 
 Outcome requiredOutcome(std::string_view technology, ByteView message) {
   if (technology == technology::ifxGSM) return outcomeOfObject(message);
-  if (technology == technology::kalviCDMA || message.size() < headerSize) return Outcome::Accepted;
+  const bool takesAnyFiles = technology == technology::kalviCDMA || technology == technology::allRadios;
+  if (takesAnyFiles || message.size() < headerSize) return Outcome::Accepted;
   const ByteView packet = packetOf(message);
   if (packet[0] != 0xFF || logCodeOf(packet) != 0) return Outcome::Accepted;
   const auto files = readPropertyList(packet.subspan(std::min(headerSize, packet.size())));
