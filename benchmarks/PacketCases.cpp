@@ -13,6 +13,7 @@
 #include "base/Dictionary.h"
 #include "base/PropertyList.h"
 #include "platform/TelephonyService.h"
+#include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 namespace varnel {
 
@@ -175,12 +176,36 @@ void addShortest(const ClassIndex& index, const std::string& name, std::string_v
   }
 }
 
+// The version of a packet's layout; 0 for codes whose packets have none.
+std::uint32_t versionOf(const LogMessage& message) {
+  const Packet payload = message.packet().from(Packet::headerSize);
+  if (message.logCode() >= 0xB800 && message.logCode() <= 0xBFFF) return payload.u32(0);
+  return message.logCode() >= 0xB000 && message.logCode() < 0xB800 ? payload.u8(0) : 0;
+}
+
+// The first packet of each log code and version that the simulated modem of all radios sends.
+void addAllRadios(std::vector<PacketCase>& cases) {
+  constexpr int messagesOfAWalk = 20'000;
+  const auto modem = simulatedModem(technology::allRadios, 1);
+  for (int i = 0; i < messagesOfAWalk; ++i) {
+    const Bytes bytes = modem->next().bytes;
+    const auto message = LogMessage::framed(bytes);
+    if (!message || message->logCode() >= LogMessage::extraCodeBase) continue;
+    char name[48];
+    std::snprintf(name, sizeof name, "All radios 0x%04X v%s", static_cast<unsigned>(message->logCode()),
+                  PacketVersion{versionOf(*message)}.text().c_str());
+    if (std::ranges::find(cases, name, &PacketCase::name) != cases.end()) continue;
+    cases.push_back({name, technology::allRadios, [bytes] { return bytes; }});
+  }
+}
+
 std::vector<PacketCase> allCases() {
   std::vector<PacketCase> cases = fullPackets();
   std::ostream nowhere(nullptr);
   addShortest(LTEClassIndex(nowhere), "LTE", technology::kalviLTE, cases);
   addShortest(UTRANClassIndex(nowhere), "UTRAN", technology::kalviUTRAN2, cases);
   addShortest(KLV_GSMClassIndex(nowhere), "GSM/UMTS", technology::kalviGSMUMTS, cases);
+  addAllRadios(cases);
   return cases;
 }
 

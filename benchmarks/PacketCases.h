@@ -20,7 +20,8 @@ struct PacketCase {
 };
 
 /// Packets with much content; then, for each other log code that a class index has handlers for, the shortest
-/// packet that a decoder takes, of zeros.
+/// packet that a decoder takes, of zeros; then a packet of each log code and version that the simulated modem
+/// of all radios sends.
 std::span<const PacketCase> packetCases();
 
 }  // namespace varnel
