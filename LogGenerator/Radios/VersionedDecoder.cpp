@@ -21,14 +21,19 @@ std::optional<std::uint32_t> versionIn(const Packet& payload, std::uint32_t logC
 }
 
 // Calls `take` with each part of the payload that a layout may describe: (version, the layout or null, body).
-// These are the payload itself, or its subpackets whose ids the layouts list.
+// These are the payload itself, or its subpackets whose ids the layouts list. Returns whether there was a
+// part or another subpacket.
 template <class Take>
-void forEachPart(std::span<const PacketLayout> layouts, const Packet& payload, std::uint32_t version,
+bool forEachPart(std::span<const PacketLayout> layouts, const Packet& payload, std::uint32_t version,
                  Take take) {
   const auto known = std::ranges::find(layouts, version, &PacketLayout::version);
-  if (known == layouts.end()) return take(PacketVersion{version}, nullptr, payload);
-  if (known->subpacket == 0) return take(PacketVersion{version}, &*known, payload);
+  if (known == layouts.end() || known->subpacket == 0) {
+    take(PacketVersion{version}, known == layouts.end() ? nullptr : &*known, payload);
+    return true;
+  }
+  bool hasSubpackets = false;
   forEachSubpacket(payload, [&](const Subpacket& subpacket) {
+    hasSubpackets = true;
     const auto hasItsId = [&](const PacketLayout& layout) {
       return layout.version == version && layout.subpacket == subpacket.id;
     };
@@ -39,6 +44,7 @@ void forEachPart(std::span<const PacketLayout> layouts, const Packet& payload, s
     take(PacketVersion{version, subpacket.id, subpacket.version},
          layout == layouts.end() ? nullptr : &*layout, subpacket.bytes);
   });
+  return hasSubpackets;
 }
 
 }  // namespace
@@ -84,25 +90,28 @@ void VersionedDecoder::decodeAs(const PacketLayout& layout, const Packet& body) 
   }
 }
 
-// The best that becomes of any part: a packet is decoded if one part is.
+// The best that becomes of any part: a packet is decoded if one part is, or if it has nothing but subpackets
+// that no layout is about.
 MessageFate VersionedDecoder::fateOf(const Packet& packet, std::uint32_t logCode) const {
   using enum MessageFate::Outcome;
   const auto layouts = layoutsOf(logCode);
   if (layouts.empty()) return {Decoded, logCode};
   const Packet payload = packet.from(Packet::headerSize);
   const auto version = versionIn(payload, logCode);
-  MessageFate fate{TooShort, logCode};
-  if (!version) return fate;
-  forEachPart(layouts, payload, *version,
-              [&](const PacketVersion& partVersion, const PacketLayout* layout, const Packet& body) {
-                if (fate.outcome == Decoded) return;
-                if (layout && body.size() >= layout->minimumLength) {
-                  fate = {Decoded, logCode};
-                } else if (!layout && !fate.version) {
-                  fate = {UnknownVersion, logCode, partVersion};
-                }
-              });
-  return fate;
+  if (!version) return {TooShort, logCode};
+  std::optional<MessageFate> best;
+  const bool isWhole =
+      forEachPart(layouts, payload, *version,
+                  [&](const PacketVersion& partVersion, const PacketLayout* layout, const Packet& body) {
+                    if (layout && body.size() >= layout->minimumLength) {
+                      best = {Decoded, logCode};
+                    } else if (!layout && (!best || best->outcome == TooShort)) {
+                      best = {UnknownVersion, logCode, partVersion};
+                    } else if (!best) {
+                      best = {TooShort, logCode};
+                    }
+                  });
+  return best.value_or(MessageFate{isWhole ? Decoded : TooShort, logCode});
 }
 
 void VersionedDecoder::listNumberFormats(SectionFormats& formats) const {
