@@ -48,11 +48,13 @@ void Section::remove(std::string_view entry) {
   if (Dictionary* const entries = _container.dictionary()) entries->remove(entry);
 }
 
+// Decoders write their entries in the same order each time, so the next one is tried first.
 std::size_t Section::indexOf(std::string_view label) {
+  if (_next < _entries.size() && _entries[_next].key() == label) return _next++;
   const auto found = std::ranges::find(_entries, label, &BoundEntry::key);
-  if (found != _entries.end()) return static_cast<std::size_t>(found - _entries.begin());
-  _entries.emplace_back(label);
-  return _entries.size() - 1;
+  _next = static_cast<std::size_t>(found - _entries.begin()) + 1;
+  if (found == _entries.end()) _entries.emplace_back(label);
+  return _next - 1;
 }
 
 const std::vector<std::size_t>& Section::entriesOf(std::span<const Field> fields) {

@@ -74,6 +74,7 @@ class Section {
   Value _container;
   Time _now;
   std::vector<BoundEntry> _entries;
+  std::size_t _next = 0;  // the entry after the one that was looked for last
   std::vector<Table> _tables;
   std::optional<Time> _refilledAt;
 };

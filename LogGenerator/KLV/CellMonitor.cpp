@@ -48,7 +48,7 @@ std::optional<Value> readCellMonitorArray(const Packet& packet) {
   return records;
 }
 
-const Array* CellMonitorReader::read(const Packet& packet) {
+const Array* CellMonitorReader::parse(const Packet& packet) {
   const ByteView payload = packet.payload();
   if (!_payload || !std::ranges::equal(payload, *_payload)) {
     if (!_payload) _payload.emplace();
@@ -58,8 +58,13 @@ const Array* CellMonitorReader::read(const Packet& packet) {
   }
   if (_records) return _records->array();
   logError(notConstructed);
-  logError("Failed to get Cell Array\n");
   return nullptr;
+}
+
+const Array* CellMonitorReader::read(const Packet& packet) {
+  const Array* const cells = parse(packet);
+  if (!cells) logError("Failed to get Cell Array\n");
+  return cells;
 }
 
 const Dictionary* cellOfKind(const Value& record, std::string_view radioAccessTechnology,

@@ -24,9 +24,11 @@ std::optional<Value> readCellMonitorArray(const Packet& packet);
 /// it is parsed only once.
 class CellMonitorReader {
  public:
-  /// Like `readCellMonitorArray`, including the log line. The array is valid until another packet is read. If
-  /// there is none, logs "Failed to get Cell Array
-  /// " too and returns null.
+  /// Like `readCellMonitorArray`, including the log line. The array is valid until another packet is read;
+  /// null when there is none.
+  const Array* parse(const Packet& packet);
+  /// The same. If there is no array, logs "Failed to get Cell Array
+  /// " too.
   const Array* read(const Packet& packet);
 
  private:

@@ -68,21 +68,25 @@ void AllRadiosLogGenerator::showIfAny(Subscription& subscription, SubscriptionNu
 }
 
 bool AllRadiosLogGenerator::hasDisplayIn(Dictionary& state) {
+  if (_isBound) return true;
   if (!changesDisplayOf(state)) return false;
-  if (!state.get(stateKey::display).isAbsent()) return true;
-  if (!displayTemplate().dictionary()) return false;
-  Value display = Value::ofDictionary();
-  display.dictionary()->set(sortMark, "");
-  state.set(stateKey::display, std::move(display));
-  state.set(groupsKey, Value::ofDictionary());
-  state.set(stateKey::extraInfo, Value::ofDictionary());
+  if (state.get(stateKey::display).isAbsent()) {
+    if (!displayTemplate().dictionary()) return false;
+    Value display = Value::ofDictionary();
+    display.dictionary()->set(sortMark, "");
+    state.set(stateKey::display, std::move(display));
+    state.set(groupsKey, Value::ofDictionary());
+    state.set(stateKey::extraInfo, Value::ofDictionary());
+  }
+  _isBound = true;
   return true;
 }
 
 AllRadiosLogGenerator::Subscription* AllRadiosLogGenerator::subscriptionIn(Dictionary& state,
                                                                            SubscriptionNumber number) {
   if (const auto known = _subscriptions.find(number); known != _subscriptions.end()) return &known->second;
-  if (_subscriptions.size() > mostSubscriptions) return nullptr;
+  const std::size_t numbered = _subscriptions.size() - _subscriptions.count(0);
+  if (number != 0 && numbered == mostSubscriptions) return nullptr;
   Subscription& subscription = _subscriptions
                                    .emplace(std::piecewise_construct, std::forward_as_tuple(number),
                                             std::forward_as_tuple(services(), displayTemplate()))

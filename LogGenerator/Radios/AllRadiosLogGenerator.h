@@ -15,7 +15,8 @@ namespace varnel {
 /// nothing yet is left out. What is said for one subscription (the SIM card that the prefix of a message
 /// names) is in groups of its own, under "SIM 1", "SIM 2", and so on.
 ///
-/// The decoders go on with the display that an earlier generator of this kind has left in the state.
+/// The decoders go on with the display that an earlier generator of this kind has left in the state. A
+/// generator works with one state only.
 class AllRadiosLogGenerator final : public KLVLogGenerator {
  public:
   /// Messages that name yet another subscription are not decoded.
@@ -60,6 +61,7 @@ class AllRadiosLogGenerator final : public KLVLogGenerator {
   /// Answers what needs no display.
   const RadioGroups& unbound() const;
 
+  bool _isBound = false;                   // the state has a display of this kind
   mutable std::optional<Value> _template;  // loaded when it is needed first
   mutable std::optional<RadioGroups> _unbound;
   std::map<SubscriptionNumber, Subscription> _subscriptions;

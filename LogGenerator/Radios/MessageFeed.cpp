@@ -1,7 +1,5 @@
 #include "LogGenerator/Radios/MessageFeed.h"
 
-#include <algorithm>
-
 namespace varnel {
 
 MessageFeed::Taker MessageFeed::addTaker() {
@@ -11,16 +9,17 @@ MessageFeed::Taker MessageFeed::addTaker() {
 }
 
 const AirMessageReading& MessageFeed::read(Taker taker, const Packet& packet, std::uint32_t logCode) {
+  const ByteView bytes = packet.bytes();
   const bool isRead = _taken != 0 && (_taken & taker) == 0 && _logCode == logCode &&
-                      std::ranges::equal(_packet, packet.bytes());
+                      _packet.data() == bytes.data() && _packet.size() == bytes.size();
   if (isRead) {
     _taken |= taker;
     return _reading;
   }
-  _packet.assign(packet.bytes().begin(), packet.bytes().end());
+  _packet = bytes;
   _logCode = logCode;
   _taken = taker;
-  _reading = _reader.read(Packet(_packet), logCode);
+  _reading = _reader.read(packet, logCode);
   return _reading;
 }
 

@@ -16,14 +16,15 @@ class MessageFeed {
 
   /// At most 32 sections may share a feed.
   Taker addTaker();
-  /// Reads a packet, unless another section has just had the same one read. A section that comes again with
-  /// the same bytes has another packet. The reading is valid until the next call.
+  /// Reads a packet, unless another section has just had the same one read: bytes at the same place, with the
+  /// same log code. A section that comes again with them has another packet. All sections that take a log
+  /// code must get each of its packets. The reading is valid until the next call, and while the packet is.
   const AirMessageReading& read(Taker taker, const Packet& packet, std::uint32_t logCode);
 
  private:
   AirMessageReader _reader;
   AirMessageReading _reading{};
-  Bytes _packet;  // the one that was read
+  ByteView _packet;  // the one that was read; it may be gone
   std::uint32_t _logCode = 0;
   Taker _taken = 0;  // the sections that have taken the reading
   Taker _next = 1;

@@ -24,6 +24,8 @@ template <class Index>
 std::unique_ptr<ClassIndex> make(radios::Shared& shared) {
   if constexpr (std::is_constructible_v<Index, radios::Shared&>) {
     return std::make_unique<Index>(shared);
+  } else if constexpr (std::is_constructible_v<Index, std::ostream&, CellMonitorReader&>) {
+    return std::make_unique<Index>(shared.standardOutput, shared.cellMonitor);
   } else {
     return std::make_unique<Index>(shared.standardOutput);
   }
@@ -61,13 +63,10 @@ bool hasContent(const Value& value) {
 }  // namespace
 
 RadioGroups::RadioGroups(const Services& services, const Value& displayTemplate)
-    : _services(services), _shared{nowhere(), services.identities, _messages}, _c2k(services) {
+    : _services(services), _shared{nowhere(), services.identities, _messages, _cellMonitor}, _c2k(services) {
   _c2k.keepNoRawBytes();
   const Dictionary* groups = displayTemplate.dictionary();
   if (!groups) return;
-  const Value command = _c2k.getStartCommand();
-  for (const Value& code : *command.dictionary()->get("SetKalviLogCodes").array())
-    _c2kCodes.push_back(static_cast<std::uint32_t>(code.int32().value_or(0)));
   for (const Child& child : children()) _indexes.push_back(child.make(_shared));
   for (const auto& [key, value] : *groups) {
     if (key != sortMark) addGroup(key, value);
@@ -82,21 +81,28 @@ void RadioGroups::addGroup(const std::string& key, const Value& sections) {
     if (std::ranges::find(children()[i].groups, name) != children()[i].groups.end())
       group.indexes.push_back(_indexes[i].get());
   }
-  const auto addCode = [this](std::uint32_t code) {
-    if (std::ranges::find(_codes, code) == _codes.end()) _codes.push_back(code);
-  };
   for (ClassIndex* index : group.indexes) {
     for (const std::uint32_t code : index->logCodes()) {
       for (const Subscriber& subscriber : index->subscription(code)->subscribers) {
         const std::string_view section = subscriber.decoder->getSectionName();
         if (!group.sections->has(section) || decoderOf(group, section) != subscriber.decoder) continue;
-        _deliveries[code].push_back({_groups.size(), subscriber});
-        addCode(code);
+        takersOf(code).deliveries.push_back({_groups.size(), subscriber});
       }
     }
   }
-  if (name == c2kGroup) std::ranges::for_each(_c2kCodes, addCode);
+  if (name == c2kGroup) {
+    // Its other lists of log codes need its template.
+    const Value command = _c2k.getStartCommand();
+    for (const Value& code : *command.dictionary()->get("SetKalviLogCodes").array())
+      takersOf(static_cast<std::uint32_t>(code.int32().value_or(0))).isC2K = true;
+  }
   _groups.push_back(std::move(group));
+}
+
+RadioGroups::Takers& RadioGroups::takersOf(std::uint32_t logCode) {
+  const auto [takers, isNew] = _takers.try_emplace(logCode);
+  if (isNew) _codes.push_back(logCode);
+  return takers->second;
 }
 
 Base* RadioGroups::decoderOf(const Group& group, std::string_view section) const {
@@ -135,24 +141,20 @@ void RadioGroups::bindSections(Group& group) {
   }
 }
 
-bool RadioGroups::isC2K(std::uint32_t logCode) const {
-  return std::ranges::find(_c2kCodes, logCode) != _c2kCodes.end();
-}
-
 bool RadioGroups::take(const LogMessage& message, ByteView bytes) {
   if (!message.isOfKnownType()) return false;
   const std::uint32_t logCode = message.logCode();
+  const auto found = _takers.find(logCode);
+  if (found == _takers.end()) return false;
   bool isTaken = false;
-  if (const auto found = _deliveries.find(logCode); found != _deliveries.end()) {
-    const Time now = _services.clock.now();
-    for (const auto& [index, subscriber] : found->second) {
-      isTaken |= !subscriber.handler || message.packet().size() >= subscriber.handler->minimumLength;
-      subscriber.decoder->section().setTime(now);
-      subscriber.deliver(message.packet(), logCode);
-      if (!_groups[index].isShown) noteWhetherShown(_groups[index]);
-    }
+  const Time now = _services.clock.now();
+  for (const auto& [index, subscriber] : found->second.deliveries) {
+    isTaken |= !subscriber.handler || message.packet().size() >= subscriber.handler->minimumLength;
+    subscriber.decoder->section().setTime(now);
+    subscriber.deliver(message.packet(), logCode);
+    if (!_groups[index].isShown) noteWhetherShown(_groups[index]);
   }
-  if (isC2K(logCode)) {
+  if (found->second.isC2K) {
     isTaken |= _c2k.fateOf(bytes).outcome == MessageFate::Outcome::Decoded;
     takeC2K(bytes);
   }
@@ -179,11 +181,11 @@ MessageFate RadioGroups::fateOf(const LogMessage& message, ByteView bytes) const
   using enum MessageFate::Outcome;
   if (!message.isOfKnownType()) return {Unknown};
   const std::uint32_t logCode = message.logCode();
-  if (isC2K(logCode)) return _c2k.fateOf(bytes);
-  const auto found = _deliveries.find(logCode);
-  if (found == _deliveries.end()) return {Unknown, logCode};
+  const auto found = _takers.find(logCode);
+  if (found == _takers.end()) return {Unknown, logCode};
+  if (found->second.isC2K) return _c2k.fateOf(bytes);
   MessageFate best{TooShort, logCode};
-  for (const auto& [index, subscriber] : found->second) {
+  for (const auto& [index, subscriber] : found->second.deliveries) {
     if (subscriber.handler) {
       if (message.packet().size() >= subscriber.handler->minimumLength) return {Decoded, logCode};
       continue;
@@ -208,9 +210,7 @@ std::vector<CodeSections> RadioGroups::codeSections() const {
   std::vector<CodeSections> list;
   for (const std::uint32_t code : _codes) {
     CodeSections& entry = list.emplace_back(CodeSections{code, {}});
-    const auto found = _deliveries.find(code);
-    if (found == _deliveries.end()) continue;
-    for (const auto& [index, subscriber] : found->second) {
+    for (const auto& [index, subscriber] : _takers.at(code).deliveries) {
       std::string name(subscriber.decoder->getSectionName());
       if (std::ranges::find(entry.sections, name) == entry.sections.end())
         entry.sections.push_back(std::move(name));

@@ -56,28 +56,33 @@ class RadioGroups final : public WriteTimes {
     Value shown{};                     // once bound
     bool isShown = false;
   };
-  // What a group does with a log code.
+  // A decoder that takes a log code, and its group.
   struct Delivery {
     std::size_t group;
     Subscriber subscriber;
   };
+  // Who takes a log code.
+  struct Takers {
+    std::vector<Delivery> deliveries;
+    bool isC2K = false;  // the CDMA2000 generator takes it too
+  };
 
   void addGroup(const std::string& key, const Value& sections);
+  Takers& takersOf(std::uint32_t logCode);
   Base* decoderOf(const Group& group, std::string_view section) const;
   void bindSections(Group& group);
   void noteWhetherShown(Group& group);
-  bool isC2K(std::uint32_t logCode) const;
   void takeC2K(ByteView bytes);
 
   const Services _services;
   MessageFeed _messages;
+  CellMonitorReader _cellMonitor;
   radios::Shared _shared;
   std::vector<std::unique_ptr<ClassIndex>> _indexes;
   C2KLogGenerator _c2k;
-  std::vector<std::uint32_t> _c2kCodes;
   std::vector<Group> _groups;
   std::vector<std::uint32_t> _codes;
-  std::unordered_map<std::uint32_t, std::vector<Delivery>> _deliveries;
+  std::unordered_map<std::uint32_t, Takers> _takers;
   std::unordered_map<const void*, const Section*> _sections;  // by container
   Value _display, _c2kState;
 };

@@ -37,6 +37,7 @@ struct Shared {
   std::ostream& standardOutput;  ///< for their base class
   Identities identities;
   MessageFeed& messages;
+  CellMonitorReader& cellMonitor;
 };
 
 /// The LTE sections of all radios. 0xB186 has the layout of the LTE technology.
@@ -46,10 +47,10 @@ class LTEIndex final : public ClassIndex {
 
  private:
   Shared& _shared;
-  std::unique_ptr<lte::ServingCell> servingCell = create<lte::ServingCell>();
+  std::unique_ptr<lte::ServingCell> servingCell = create<lte::ServingCell>(_shared.cellMonitor);
   std::unique_ptr<lte::Measurements> measurements = create<lte::Measurements>();
   std::unique_ptr<lte::Carriers> carriers = create<lte::Carriers>();
-  std::unique_ptr<lte::Neighbors> neighbors = create<lte::Neighbors>();
+  std::unique_ptr<lte::Neighbors> neighbors = create<lte::Neighbors>(_shared.cellMonitor);
   std::unique_ptr<lte::Registration> registration = create<lte::Registration>(_shared.identities);
   std::unique_ptr<lte::Connection> connection = create<lte::Connection>(_shared.messages);
   std::unique_ptr<lte::Bearers> bearers = create<lte::Bearers>();
@@ -75,15 +76,15 @@ class NRIndex final : public ClassIndex {
 /// The sections of other technologies whose decoders must show wrong values. These show the right ones.
 class CorrectedIndex final : public ClassIndex {
  public:
-  explicit CorrectedIndex(Shared& shared) : ClassIndex(shared.standardOutput) {}
+  explicit CorrectedIndex(Shared& shared) : ClassIndex(shared.standardOutput), _shared(shared) {}
 
  private:
-  CellMonitorReader _cellMonitor;
+  Shared& _shared;
   std::unique_ptr<ActiveSet> activeSet = create<ActiveSet>();
-  std::unique_ptr<UMTSSet> umtsSet = create<UMTSSet>(_cellMonitor);
-  std::unique_ptr<UMTSRRInfo> umtsRRInfo = create<UMTSRRInfo>(_cellMonitor);
+  std::unique_ptr<UMTSSet> umtsSet = create<UMTSSet>(_shared.cellMonitor);
+  std::unique_ptr<UMTSRRInfo> umtsRRInfo = create<UMTSRRInfo>(_shared.cellMonitor);
   std::unique_ptr<EquivalentPLMNs> equivalentPLMNs = create<EquivalentPLMNs>();
-  std::unique_ptr<GSMServingCell> gsmServingCell = create<GSMServingCell>(_cellMonitor);
+  std::unique_ptr<GSMServingCell> gsmServingCell = create<GSMServingCell>(_shared.cellMonitor);
   std::unique_ptr<GSMSet> gsmSet = create<GSMSet>();
   std::unique_ptr<GPRSInformation> gprsInformation = create<GPRSInformation>();
 };

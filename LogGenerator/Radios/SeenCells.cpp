@@ -1,6 +1,7 @@
 #include "LogGenerator/Radios/SeenCells.h"
 
 #include <algorithm>
+#include <limits>
 
 #include "LogGenerator/ArrayLock.h"
 
@@ -37,8 +38,11 @@ void SeenCells::adopt(const Section& section) {
 void SeenCells::removeOld() {
   // After a clock has stepped back, a cell was last seen now.
   for (Cell& cell : _cells) cell.lastSeen = std::min(cell.lastSeen, _now);
-  const std::size_t removed = std::erase_if(
-      _cells, [this](const Cell& cell) { return durationBetween(cell.lastSeen, _now) >= lifetime; });
+  // A capture can say any time.
+  if (_now.seconds < std::numeric_limits<std::int64_t>::min() + lifetime.count()) return;
+  const Time latest{_now.seconds - lifetime.count(), _now.nanoseconds};
+  const std::size_t removed =
+      std::erase_if(_cells, [&](const Cell& cell) { return cell.lastSeen <= latest; });
   if (removed > 0) _isChanged = _listIsOld = true;
 }
 
@@ -75,14 +79,24 @@ void SeenCells::makeRoom(const CellPlace& place) {
   if (place < last->place) _cells.erase(last);
 }
 
+// Few cells change their places, and each is moved only as far as it must. Returns whether one was moved.
+bool SeenCells::sort() {
+  const auto isBefore = [](const Cell& a, const Cell& b) { return a.place < b.place; };
+  bool isMoved = false;
+  for (std::size_t i = 1; i < _cells.size(); ++i) {
+    const auto cell = _cells.begin() + static_cast<std::ptrdiff_t>(i);
+    if (!isBefore(*cell, *(cell - 1))) continue;
+    std::rotate(std::upper_bound(_cells.begin(), cell, *cell, isBefore), cell, cell + 1);
+    isMoved = true;
+  }
+  return isMoved;
+}
+
 void SeenCells::show(Section& section) {
   if (!_isChanged) return;
   _isChanged = false;
   const ArrayLock::Scope lock;
-  if (!std::ranges::is_sorted(_cells, std::less<>(), &Cell::place)) {
-    std::ranges::sort(_cells, std::less<>(), &Cell::place);
-    _listIsOld = true;
-  }
+  _listIsOld |= sort();
   Array& list = *_list.array();
   // Whoever clears a display clears this list too.
   if (_listIsOld || list.size() != _cells.size()) {

@@ -66,6 +66,7 @@ class SeenCells {
   void removeOld();
   Cell* find(std::uint64_t key);
   void makeRoom(const CellPlace& place);
+  bool sort();
 
   const ReadPlace _readPlace;
   Value _container;  // the section's, when its cells were adopted

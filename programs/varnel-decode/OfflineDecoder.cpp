@@ -45,6 +45,7 @@ Value OfflineDecoder::finish() { return _generator.generateLogUsingState(_state)
 
 std::optional<Generation> OfflineDecoder::fireTicks(Time now) {
   if (!_start) startAnew(now);
+  if (now == _now) return std::nullopt;
   switch (clockStep(_now, now)) {
     case ClockStep::Overtaking:
       return std::nullopt;

@@ -36,11 +36,14 @@ namespace varnel {
 class KLV_GSMClassIndex final : public ClassIndex {
  public:
   explicit KLV_GSMClassIndex(std::ostream& standardOutput);
+  /// With a reader of cell-monitor packets that decoders of other indexes use too.
+  KLV_GSMClassIndex(std::ostream& standardOutput, CellMonitorReader& cellMonitor);
   /// Writes "Deallocing KLV_GSMClassIndex" to standard output.
   ~KLV_GSMClassIndex() override;
 
  private:
-  CellMonitorReader _cellMonitor;
+  CellMonitorReader _ownCellMonitor;
+  CellMonitorReader& _cellMonitor;
 
   std::unique_ptr<ActiveSet> objActiveSet = create<ActiveSet>();
   std::unique_ptr<CodingScheme> objCodingScheme = create<CodingScheme>();

@@ -15,11 +15,15 @@ namespace varnel {
 /// The section decoders of the UTRAN technology, in the order in which they are created and receive packets.
 class UTRANClassIndex final : public ClassIndex {
  public:
-  using ClassIndex::ClassIndex;
+  explicit UTRANClassIndex(std::ostream& standardOutput)
+      : ClassIndex(standardOutput), servingCellInfo(create<UTRANServingCellInfo>()) {}
+  /// With a reader of cell-monitor packets that decoders of other indexes use too.
+  UTRANClassIndex(std::ostream& standardOutput, CellMonitorReader& cellMonitor)
+      : ClassIndex(standardOutput), servingCellInfo(create<UTRANServingCellInfo>(cellMonitor)) {}
 
  private:
   std::unique_ptr<RRC_State> rrc_state = create<RRC_State>();
-  std::unique_ptr<UTRANServingCellInfo> servingCellInfo = create<UTRANServingCellInfo>();
+  std::unique_ptr<UTRANServingCellInfo> servingCellInfo;
   std::unique_ptr<UTRANNeighbhorMeasurements> tdMeasurements = create<UTRANNeighbhorMeasurements>();
   std::unique_ptr<GSMNeighbhorMeasurements> gsmMeasurements = create<GSMNeighbhorMeasurements>();
   std::unique_ptr<TRCHBLERMeasurement> trchMeasurements = create<TRCHBLERMeasurement>();

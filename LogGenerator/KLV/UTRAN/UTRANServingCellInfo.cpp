@@ -29,11 +29,9 @@ constexpr CellMonitorEntry cellMonitorEntries[] = {
     {cellMonitor::uarfcn, "Uplink UARFCN", "Serving Cell Info: Failed to retrieve UARFCN\n"},
 };
 
-void showCells(Section& section, const Packet& packet) {
-  const auto cells = readCellMonitorArray(packet);
-  if (!cells) return;
+void showCells(Section& section, const Array& cells) {
   // Shows every serving cell in turn, so the last one stays.
-  for (const Value& record : *cells->array()) {
+  for (const Value& record : cells) {
     const Dictionary* cell = cellOfKind(record, cellMonitor::utran, cellMonitor::serving);
     if (!cell) continue;
     showCell(section, *cell, cellMonitorEntries);
@@ -43,14 +41,23 @@ void showCells(Section& section, const Packet& packet) {
   }
 }
 
-constexpr PacketHandler packets[] = {
-    {0xD0E2, 26, servingCell},
-    {cellMonitorLogCode, 0, showCells},
-};
-
 }  // namespace
 
-UTRANServingCellInfo::UTRANServingCellInfo()
-    : SectionDecoder("Serving Cell Info", "Serving Cell Info", packets, UnknownCodes::Ignored) {}
+constexpr PacketHandler UTRANServingCellInfo::packets[] = {
+    {0xD0E2, 26, servingCell},
+    {cellMonitorLogCode, 0, calling<&UTRANServingCellInfo::showCellMonitor>},
+};
+
+UTRANServingCellInfo::UTRANServingCellInfo(CellMonitorReader* cellMonitor)
+    : SectionDecoder("Serving Cell Info", "Serving Cell Info", packets, UnknownCodes::Ignored),
+      _cellMonitor(cellMonitor) {}
+
+void UTRANServingCellInfo::showCellMonitor(const Packet& packet) {
+  if (_cellMonitor) {
+    if (const Array* const cells = _cellMonitor->parse(packet)) showCells(sectionRef, *cells);
+  } else if (const auto cells = readCellMonitorArray(packet)) {
+    showCells(sectionRef, *cells->array());
+  }
+}
 
 }  // namespace varnel

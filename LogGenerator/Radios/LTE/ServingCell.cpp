@@ -203,7 +203,10 @@ void showMonitoredCell(Section& section, const Dictionary& cell) {
 
 }  // namespace
 
-ServingCell::ServingCell() : VersionedDecoder("Serving Cell", layouts) {}
+ServingCell::ServingCell() : VersionedDecoder("Serving Cell", layouts), _cellMonitor(_ownCellMonitor) {}
+
+ServingCell::ServingCell(CellMonitorReader& cellMonitor)
+    : VersionedDecoder("Serving Cell", layouts), _cellMonitor(cellMonitor) {}
 
 void ServingCell::listNumberFormats(SectionFormats& formats) const {
   formats.add(frequencyEntry, channels::frequencyFormat);
@@ -216,9 +219,9 @@ void ServingCell::listNumberFormats(SectionFormats& formats) const {
 std::vector<std::uint32_t> ServingCell::otherLogCodes() const { return {cellMonitorLogCode}; }
 
 void ServingCell::updateWithOther(const Packet& packet, std::uint32_t /*logCode*/) {
-  const auto cells = readCellMonitorArray(packet);
+  const Array* const cells = _cellMonitor.read(packet);
   if (!cells) return;
-  const Dictionary* const cell = firstCellOfKind(*cells->array(), cellMonitor::lte, cellMonitor::serving);
+  const Dictionary* const cell = firstCellOfKind(*cells, cellMonitor::lte, cellMonitor::serving);
   if (cell) showMonitoredCell(sectionRef, *cell);
 }
 

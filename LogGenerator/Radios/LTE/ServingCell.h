@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <vector>
 
+#include "LogGenerator/KLV/CellMonitor.h"
 #include "LogGenerator/Radios/VersionedDecoder.h"
 
 namespace varnel::lte {
@@ -12,6 +13,8 @@ namespace varnel::lte {
 class ServingCell final : public VersionedDecoder {
  public:
   ServingCell();
+  /// With a reader of cell-monitor packets that other decoders use too.
+  explicit ServingCell(CellMonitorReader& cellMonitor);
 
   void listNumberFormats(SectionFormats& formats) const override;
 
@@ -20,6 +23,9 @@ class ServingCell final : public VersionedDecoder {
   /// A list of the cell monitor. Only its serving LTE cell counts. A number that it lacks, or that is
   /// negative, leaves its entry as it is.
   void updateWithOther(const Packet& packet, std::uint32_t logCode) override;
+
+  CellMonitorReader _ownCellMonitor;
+  CellMonitorReader& _cellMonitor;
 };
 
 }  // namespace varnel::lte
