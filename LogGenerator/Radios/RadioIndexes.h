@@ -47,17 +47,17 @@ class LTEIndex final : public ClassIndex {
 
  private:
   Shared& _shared;
-  std::unique_ptr<lte::ServingCell> servingCell = create<lte::ServingCell>(_shared.cellMonitor);
-  std::unique_ptr<lte::Measurements> measurements = create<lte::Measurements>();
-  std::unique_ptr<lte::Carriers> carriers = create<lte::Carriers>();
-  std::unique_ptr<lte::Neighbors> neighbors = create<lte::Neighbors>(_shared.cellMonitor);
-  std::unique_ptr<lte::Registration> registration = create<lte::Registration>(_shared.identities);
-  std::unique_ptr<lte::Connection> connection = create<lte::Connection>(_shared.messages);
-  std::unique_ptr<lte::Bearers> bearers = create<lte::Bearers>();
-  std::unique_ptr<lte::RandomAccess> randomAccess = create<lte::RandomAccess>();
-  std::unique_ptr<lte::TransmitPower> transmitPower = create<lte::TransmitPower>();
-  std::unique_ptr<ReselectionCandidatesMisc> reselectionCandidates = create<ReselectionCandidatesMisc>();
-  std::unique_ptr<ReselectionCandidatesList> reselectionCandidatesList = create<ReselectionCandidatesList>();
+  std::unique_ptr<lte::ServingCell> _servingCell = create<lte::ServingCell>(_shared.cellMonitor);
+  std::unique_ptr<lte::Measurements> _measurements = create<lte::Measurements>();
+  std::unique_ptr<lte::Carriers> _carriers = create<lte::Carriers>();
+  std::unique_ptr<lte::Neighbors> _neighbors = create<lte::Neighbors>(_shared.cellMonitor);
+  std::unique_ptr<lte::Registration> _registration = create<lte::Registration>(_shared.identities);
+  std::unique_ptr<lte::Connection> _connection = create<lte::Connection>(_shared.messages);
+  std::unique_ptr<lte::Bearers> _bearers = create<lte::Bearers>();
+  std::unique_ptr<lte::RandomAccess> _randomAccess = create<lte::RandomAccess>();
+  std::unique_ptr<lte::TransmitPower> _transmitPower = create<lte::TransmitPower>();
+  std::unique_ptr<ReselectionCandidatesMisc> _reselectionCandidates = create<ReselectionCandidatesMisc>();
+  std::unique_ptr<ReselectionCandidatesList> _reselectionCandidatesList = create<ReselectionCandidatesList>();
 };
 
 /// The NR sections.
@@ -67,10 +67,10 @@ class NRIndex final : public ClassIndex {
 
  private:
   Shared& _shared;
-  std::unique_ptr<nr::MasterInformation> masterInformation = create<nr::MasterInformation>();
-  std::unique_ptr<nr::ServingCell> servingCell = create<nr::ServingCell>();
-  std::unique_ptr<nr::Cells> cells = create<nr::Cells>();
-  std::unique_ptr<nr::Registration> registration = create<nr::Registration>(_shared.identities);
+  std::unique_ptr<nr::MasterInformation> _masterInformation = create<nr::MasterInformation>();
+  std::unique_ptr<nr::ServingCell> _servingCell = create<nr::ServingCell>();
+  std::unique_ptr<nr::Cells> _cells = create<nr::Cells>();
+  std::unique_ptr<nr::Registration> _registration = create<nr::Registration>(_shared.identities);
 };
 
 /// The sections of other technologies whose decoders must show wrong values. These show the right ones.
@@ -80,13 +80,13 @@ class CorrectedIndex final : public ClassIndex {
 
  private:
   Shared& _shared;
-  std::unique_ptr<ActiveSet> activeSet = create<ActiveSet>();
-  std::unique_ptr<UMTSSet> umtsSet = create<UMTSSet>(_shared.cellMonitor);
-  std::unique_ptr<UMTSRRInfo> umtsRRInfo = create<UMTSRRInfo>(_shared.cellMonitor);
-  std::unique_ptr<EquivalentPLMNs> equivalentPLMNs = create<EquivalentPLMNs>();
-  std::unique_ptr<GSMServingCell> gsmServingCell = create<GSMServingCell>(_shared.cellMonitor);
-  std::unique_ptr<GSMSet> gsmSet = create<GSMSet>();
-  std::unique_ptr<GPRSInformation> gprsInformation = create<GPRSInformation>();
+  std::unique_ptr<ActiveSet> _activeSet = create<ActiveSet>();
+  std::unique_ptr<UMTSSet> _umtsSet = create<UMTSSet>(_shared.cellMonitor);
+  std::unique_ptr<UMTSRRInfo> _umtsRRInfo = create<UMTSRRInfo>(_shared.cellMonitor);
+  std::unique_ptr<EquivalentPLMNs> _equivalentPLMNs = create<EquivalentPLMNs>();
+  std::unique_ptr<GSMServingCell> _gsmServingCell = create<GSMServingCell>(_shared.cellMonitor);
+  std::unique_ptr<GSMSet> _gsmSet = create<GSMSet>();
+  std::unique_ptr<GPRSInformation> _gprsInformation = create<GPRSInformation>();
 };
 
 /// The sections about the subscriber, which all radios share.
@@ -96,8 +96,8 @@ class SubscriberIndex final : public ClassIndex {
 
  private:
   Shared& _shared;
-  std::unique_ptr<SubscriberFiles> files = create<SubscriberFiles>(_shared.identities);
-  std::unique_ptr<PDPContextList> contexts = create<PDPContextList>();
+  std::unique_ptr<SubscriberFiles> _files = create<SubscriberFiles>(_shared.identities);
+  std::unique_ptr<PDPContextList> _contexts = create<PDPContextList>();
 };
 
 /// The messages of the air interface.
@@ -107,8 +107,8 @@ class MessagesIndex final : public ClassIndex {
 
  private:
   Shared& _shared;
-  std::unique_ptr<LastMessages> lastMessages = create<LastMessages>(_shared.messages);
-  std::unique_ptr<MessageCounts> counts = create<MessageCounts>(_shared.messages);
+  std::unique_ptr<LastMessages> _lastMessages = create<LastMessages>(_shared.messages);
+  std::unique_ptr<MessageCounts> _counts = create<MessageCounts>(_shared.messages);
 };
 
 }  // namespace varnel::radios
