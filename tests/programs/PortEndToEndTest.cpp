@@ -144,16 +144,32 @@ TEST_F(PortEndToEnd, APortThatCannotBeServedIsOneLineThatSaysWhatToDo) {
                                     "/dev/wwan*\n");
 }
 
-TEST_F(PortEndToEnd, APortThatTakesATCommandsIsToldFromOneThatIsSilent) {
-  _modem.answer = [](ByteView bytes) -> Bytes {
+TEST_F(PortEndToEnd, APortThatRepeatsWhatItGetsTakesATCommands) {
+  _modem.answer = [](ByteView bytes) { return Bytes(bytes.begin(), bytes.end()); };
+  const auto telephony = server();
+  ASSERT_TRUE(telephony->waitForEnd());
+  EXPECT_EQ(telephony->exitStatus(), 1);
+  EXPECT_THAT(telephony->error(), StartsWith("varnel-telephonyd: " + _modem.link() +
+                                             " takes AT commands and is no diagnostic port; "));
+}
+
+// It would answer a line of text. It gets none, for it could be anything.
+TEST_F(PortEndToEnd, APortThatIsSilentGetsTheProbeTwiceAndNothingElse) {
+  Bytes got;
+  _modem.answer = [&](ByteView bytes) -> Bytes {
+    got.insert(got.end(), bytes.begin(), bytes.end());
     const std::string error = "\r\nERROR\r\n";
     return bytes.back() == '\r' ? Bytes(error.begin(), error.end()) : Bytes();
   };
   const auto telephony = server();
   ASSERT_TRUE(telephony->waitForEnd());
   EXPECT_EQ(telephony->exitStatus(), 1);
-  EXPECT_THAT(telephony->error(), StartsWith("varnel-telephonyd: " + _modem.link() +
-                                             " takes AT commands and is no diagnostic port; "));
+  EXPECT_THAT(
+      telephony->error(),
+      StartsWith("varnel-telephonyd: " + _modem.link() +
+                 " does not answer as a diagnostic port, and may be the modem's port for AT commands; "));
+  _modem.unplug();
+  EXPECT_EQ(got, (Bytes{0x00, 0x78, 0xF0, 0x7E, 0x00, 0x78, 0xF0, 0x7E}));
 }
 
 TEST_F(PortEndToEnd, APortThatAnotherServerServesIsBusyAndItsHolderIsNamed) {

@@ -81,8 +81,7 @@ std::optional<std::string> DiagnosticPort::open(Handlers handlers) {
   if (!S_ISCHR(status.st_mode)) return troubleOfNoDevice(_path);
   FileDescriptor device(::open(_path.c_str(), O_RDWR | O_NOCTTY | O_NONBLOCK | O_CLOEXEC));
   if (!device.isOpen()) return troubleOfOpening(_path, status, errno);
-  if (const std::string holders = holdersOf(status.st_rdev); !holders.empty())
-    return troubleOfBusy(_path, holders);
+  if (const auto holders = holdersOf(status.st_rdev); !holders.empty()) return troubleOfBusy(_path, holders);
   // Other programs of this kind respect the lock, and others than root the exclusive use.
   if (::flock(device.number(), LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK)
     return troubleOfBusy(_path, {});

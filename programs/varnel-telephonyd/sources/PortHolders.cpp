@@ -4,12 +4,13 @@
 #include <sys/sysmacros.h>
 #include <unistd.h>
 
-#include <algorithm>
+#include <charconv>
 #include <fstream>
+#include <map>
 #include <optional>
 #include <string>
-#include <string_view>
 #include <system_error>
+#include <utility>
 
 namespace varnel {
 
@@ -74,24 +75,27 @@ std::string nameOf(const fs::path& process) {
   return name.empty() ? "a program" : name.substr(0, longest);
 }
 
-bool isNumber(std::string_view text) {
-  return !text.empty() &&
-         std::ranges::all_of(text, [](char letter) { return letter >= '0' && letter <= '9'; });
+// Nothing for a name that is no number, as that of other files among the processes.
+std::optional<int> processNumber(const std::string& name) {
+  int number = 0;
+  const auto [end, error] = std::from_chars(name.data(), name.data() + name.size(), number);
+  return error == std::errc() && end == name.data() + name.size() ? std::optional(number) : std::nullopt;
 }
 
 }  // namespace
 
-std::string holdersOf(dev_t device, const fs::path& processes) {
-  const std::string self = std::to_string(::getpid());
-  std::string holders;
+std::vector<std::string> holdersOf(dev_t device, const fs::path& processes) {
+  std::map<int, std::string> holders;
   std::error_code error;
   for (fs::directory_iterator process(processes, error), end; !error && process != end;
        process.increment(error)) {
-    const std::string number = process->path().filename().string();
-    if (!isNumber(number) || number == self || !holds(process->path(), device)) continue;
-    holders += (holders.empty() ? "" : " and ") + nameOf(process->path()) + " (process " + number + ")";
+    const auto number = processNumber(process->path().filename().string());
+    if (!number || *number == ::getpid() || !holds(process->path(), device)) continue;
+    holders[*number] = nameOf(process->path()) + " (process " + std::to_string(*number) + ")";
   }
-  return holders;
+  std::vector<std::string> names;
+  for (auto& [number, name] : holders) names.push_back(std::move(name));
+  return names;
 }
 
 }  // namespace varnel

@@ -18,8 +18,10 @@ constexpr std::chrono::milliseconds answerTime = 2s;
 // An answer may be lost, and the first request may follow the half of one that another program has sent.
 constexpr int mostAttempts = 2;
 constexpr std::size_t mostHeard = 1024;
-// Is sent only when no answer has come. A port that takes AT commands replies to it.
-constexpr std::string_view textCommand = "AT\r";
+// A port for AT commands may repeat what it gets, some without the byte 0 at its beginning.
+constexpr std::string_view repeatedVersion = "x\xF0~";
+// What such a port replies, or says of its own accord.
+constexpr std::string_view textReplies[] = {"\r\nOK\r", "\r\nERROR\r", "\r\nRING\r"};
 
 bool isLog(ByteView contents) {
   return !contents.empty() &&
@@ -32,33 +34,19 @@ bool contains(ByteView bytes, std::string_view part) {
   return std::search(bytes.begin(), bytes.end(), part.begin(), part.end(), isSame) != bytes.end();
 }
 
+// A line that begins with + or ^ and a letter, such as "+CREG: 1".
+bool hasReport(ByteView bytes) {
+  for (std::size_t i = 3; i < bytes.size(); ++i) {
+    const bool isLetter = bytes[i] >= 'A' && bytes[i] <= 'Z';
+    const bool isMarked = bytes[i - 1] == '+' || bytes[i - 1] == '^';
+    if (isLetter && isMarked && bytes[i - 2] == '\n' && bytes[i - 3] == '\r') return true;
+  }
+  return false;
+}
+
 }  // namespace
 
-class PortSession::GivenBytes final : public ByteSource {
- public:
-  void give(ByteView bytes) { _bytes = bytes; }
-  bool isEmpty() const { return _bytes.empty(); }
-
-  std::size_t read(std::span<std::uint8_t> room) override {
-    const std::size_t count = std::min(room.size(), _bytes.size());
-    std::copy_n(_bytes.begin(), count, room.begin());
-    _bytes = _bytes.subspan(count);
-    _bytesRead += count;
-    return count;
-  }
-  std::uint64_t bytesRead() const override { return _bytesRead; }
-  std::optional<std::uint64_t> fileSize() const override { return std::nullopt; }
-
- private:
-  ByteView _bytes;
-  std::uint64_t _bytesRead = 0;
-};
-
-PortSession::PortSession(Setup setup)
-    : _setup(std::move(setup)),
-      _given(new GivenBytes),
-      _window(std::unique_ptr<ByteSource>(_given)),
-      _scanner(_window, _setup.leftOut) {}
+PortSession::PortSession(Setup setup) : _setup(std::move(setup)), _frameStream(_setup.leftOut) {}
 
 void PortSession::begin() {
   plan(Step::Version);
@@ -67,11 +55,7 @@ void PortSession::begin() {
 
 void PortSession::take(ByteView bytes) {
   if (_frames == 0) listenForText(bytes);
-  _given->give(bytes);
-  while (!_given->isEmpty()) {
-    _window.more();
-    while (const auto contents = _scanner.nextAtHand()) takeFrame(*contents);
-  }
+  _frameStream.take(bytes, [this](std::span<std::uint8_t> contents) { takeFrame(contents); });
 }
 
 void PortSession::setWanted(WantedCodes wanted) {
@@ -107,8 +91,6 @@ void PortSession::plan(Step step) {
     switch (step) {
       case Step::Version:
         return portRequest::version();
-      case Step::TextCommand:
-        return Bytes(textCommand.begin(), textCommand.end());
       case Step::Build:
         return portRequest::build();
       case Step::EventsOff:
@@ -178,7 +160,6 @@ void PortSession::transmit() {
 }
 
 void PortSession::send(const Request& request) const {
-  if (request.step == Step::TextCommand) return _setup.send(request.contents);
   Bytes frame;
   appendFramed(frame, request.contents);
   _setup.send(frame);
@@ -195,7 +176,7 @@ void PortSession::timeIsUp(std::uint64_t number) {
 
 void PortSession::takeFrame(std::span<std::uint8_t> contents) {
   const bool isEcho = !contents.empty() && std::ranges::equal(contents, portRequest::version());
-  ++(isEcho ? _echoes : _frames);
+  if (!isEcho) ++_frames;
   if (isLog(contents)) {
     CaptureRecord record;
     if (takeLogFrame(contents, record, _setup.leftOut)) _setup.record(record);
@@ -216,14 +197,11 @@ void PortSession::listenForText(ByteView bytes) {
   _heard.insert(_heard.end(), bytes.begin(), bytes.end());
   if (_heard.size() > mostHeard)
     _heard.erase(_heard.begin(), _heard.end() - static_cast<std::ptrdiff_t>(mostHeard));
-  if (!_isWaiting || _requests.front().step != Step::TextCommand || !hasHeardText()) return;
-  _isWaiting = false;
-  fail({PortFailure::Kind::AnswersText});
 }
 
-// A port that takes AT commands replies with one of these words, or repeats what it gets.
 bool PortSession::hasHeardText() const {
-  return _echoes > 0 || contains(_heard, "OK\r") || contains(_heard, "ERROR\r");
+  return contains(_heard, repeatedVersion) || hasReport(_heard) ||
+         std::ranges::any_of(textReplies, [&](std::string_view reply) { return contains(_heard, reply); });
 }
 
 void PortSession::answered(Step step, ByteView answer) {
@@ -246,7 +224,6 @@ void PortSession::answered(Step step, ByteView answer) {
       return codesSet(detail);
     case Step::EventsOff:
     case Step::DebugTextOff:
-    case Step::TextCommand:
       return;
   }
 }
@@ -262,8 +239,6 @@ void PortSession::unanswered(Request request) {
       if (request.attempt < mostAttempts) return repeat(std::move(request));
       // A port that sends frames is one, even when its answer was lost twice among them.
       if (_frames > 0) return planBeginning();
-      return plan(Step::TextCommand);
-    case Step::TextCommand:
       return fail({PortFailure::Kind::AnswersNothing});
     case Step::AllCodesOff:
     case Step::CodeNumbers:

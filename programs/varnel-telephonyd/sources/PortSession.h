@@ -11,8 +11,9 @@
 #include <span>
 #include <string>
 
-#include "host/captures/FramedCapture.h"
+#include "host/captures/CaptureRecord.h"
 #include "platform/MainQueue.h"
+#include "programs/varnel-telephonyd/sources/FrameStream.h"
 #include "programs/varnel-telephonyd/sources/PortCommands.h"
 #include "programs/varnel-telephonyd/sources/WantedCodes.h"
 
@@ -22,7 +23,7 @@ namespace varnel {
 struct PortFailure {
   enum class Kind {
     AnswersNothing,  ///< nothing that a diagnostic port would say
-    AnswersText,     ///< it takes AT commands
+    AnswersText,     ///< it repeats what it gets, or speaks as a port for AT commands does
     Refuses,         ///< it is a diagnostic port that does not let its logs be read
     FallsSilent,     ///< it was a diagnostic port, and answers no more
   };
@@ -60,7 +61,7 @@ class PortSession final {
   /// Takes bytes that the port has sent.
   void take(ByteView bytes);
   /// The port will send no more.
-  void takeEnd() { _scanner.endStream(); }
+  void takeEnd() { _frameStream.end(); }
   /// Switches these codes on, and no others. Without any, the port becomes quiet. May be called at any time.
   void setWanted(WantedCodes wanted);
   /// Makes the port quiet and then calls the function: after 4 s at the latest when it does not answer.
@@ -76,19 +77,7 @@ class PortSession final {
   bool refusesAll() const;
 
  private:
-  enum class Step {
-    Version,
-    TextCommand,
-    Build,
-    EventsOff,
-    DebugTextOff,
-    AllCodesOff,
-    CodeNumbers,
-    SetCodes
-  };
-  /// Hands on the bytes that were given to it.
-  class GivenBytes;
-
+  enum class Step { Version, Build, EventsOff, DebugTextOff, AllCodesOff, CodeNumbers, SetCodes };
   struct Request {
     Step step;
     Bytes contents;
@@ -116,16 +105,13 @@ class PortSession final {
   void finish();
 
   const Setup _setup;
-  GivenBytes* _given;  // of the window
-  ByteWindow _window;
-  FrameScanner _scanner;
+  FrameStream _frameStream;
 
   std::deque<Request> _requests;  // the first one is on its way when `_isWaiting`
   bool _isWaiting = false;
   std::uint64_t _sent = 0;  // requests so far, to tell old time limits from that of the last one
 
-  std::uint64_t _frames = 0;  // sound ones, without echoes
-  std::uint64_t _echoes = 0;  // sound frames that repeat the request for the version
+  std::uint64_t _frames = 0;  // sound ones, without those that repeat the request for the version
   Bytes _heard;               // the last bytes while there is no frame
   std::string _build;
   std::optional<CodeNumbers> _numbers;

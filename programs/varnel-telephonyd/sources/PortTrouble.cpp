@@ -1,5 +1,6 @@
 #include "programs/varnel-telephonyd/sources/PortTrouble.h"
 
+#include <string_view>
 #include <system_error>
 
 namespace varnel {
@@ -9,6 +10,21 @@ namespace {
 constexpr std::string_view otherPorts =
     "a modem has several ports, so try the next one (ls -l /dev/serial/by-id)";
 
+// Such as "a, b, c, and 2 more". There is at least one name.
+std::string inWords(std::vector<std::string> names) {
+  constexpr std::size_t most = 3;
+  if (names.size() > most) {
+    const std::size_t more = names.size() - most;
+    names.resize(most);
+    names.push_back(std::to_string(more) + " more");
+  }
+  const std::string beforeLast = names.size() == 2 ? " and " : ", and ";
+  std::string words = names[0];
+  for (std::size_t i = 1; i < names.size(); ++i)
+    words += (i + 1 < names.size() ? ", " : beforeLast) + names[i];
+  return words;
+}
+
 }  // namespace
 
 std::string troubleOf(const PortFailure& failure, const std::string& name) {
@@ -16,8 +32,8 @@ std::string troubleOf(const PortFailure& failure, const std::string& name) {
     case PortFailure::Kind::AnswersText:
       return name + " takes AT commands and is no diagnostic port; " + std::string(otherPorts);
     case PortFailure::Kind::AnswersNothing:
-      return name + " does not answer as a diagnostic port; " + std::string(otherPorts) +
-             ", or unplug the modem and plug it in again";
+      return name + " does not answer as a diagnostic port, and may be the modem's port for AT commands; " +
+             std::string(otherPorts) + ", or unplug the modem and plug it in again";
     case PortFailure::Kind::Refuses:
       return name + " refuses to switch on its logs (" + failure.detail +
              "); allow it in the settings of the modem, or use another modem";
@@ -52,11 +68,12 @@ std::string troubleOfPermission(const std::string& name, const std::string& grou
          group + " $USER, log out, and log in again";
 }
 
-std::string troubleOfBusy(const std::string& name, std::string_view holders) {
+std::string troubleOfBusy(const std::string& name, const std::vector<std::string>& holders) {
   if (holders.empty())
     return "another program uses " + name + "; find it with sudo fuser -v " + name + ", and end it";
-  const bool isModemManager = holders.starts_with("ModemManager ");
-  return std::string(holders) + " uses " + name + "; " +
+  if (holders.size() > 1) return inWords(holders) + " use " + name + "; end them first";
+  const bool isModemManager = holders[0].starts_with("ModemManager ");
+  return holders[0] + " uses " + name + "; " +
          (isModemManager ? "type sudo systemctl stop ModemManager" : "end it first");
 }
 

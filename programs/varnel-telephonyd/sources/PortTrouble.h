@@ -2,7 +2,7 @@
 
 #include <cstddef>
 #include <string>
-#include <string_view>
+#include <vector>
 
 #include "programs/varnel-telephonyd/sources/PortSession.h"
 
@@ -21,8 +21,9 @@ std::string troubleOfMissing(const std::string& name);
 std::string troubleOfNoDevice(const std::string& name);
 /// The user may not open it. The group is the one that may; empty when no group may.
 std::string troubleOfPermission(const std::string& name, const std::string& group);
-/// Others have it open, as "ModemManager (process 812)"; empty when they are not known.
-std::string troubleOfBusy(const std::string& name, std::string_view holders);
+/// Others have it open, each as "ModemManager (process 812)"; empty when they are not known. The sentence
+/// names three at most.
+std::string troubleOfBusy(const std::string& name, const std::vector<std::string>& holders);
 /// The system's error is none of the above.
 std::string troubleOfSystem(const std::string& name, int error);
 
