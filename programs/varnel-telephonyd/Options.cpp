@@ -41,6 +41,10 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
       ->needs(simulate)
       ->type_name("N")
       ->capture_default_str();
+  auto* pty = app.add_flag("--pty", options.playsPort,
+                           "play the simulated modem's diagnostic port on a pseudo-terminal, whose name is "
+                           "printed, and serve nothing: another server shows it with --port")
+                  ->needs(simulate);
   auto* replay =
       app.add_option("--replay", options.replayPath,
                      "send the messages of a capture of any kind that varnel-decode reads, with the pauses "
@@ -70,6 +74,7 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
                      "write what is sent to viewers to a capture that can be replayed and decoded; refuses a "
                      "file that exists and is not empty. It holds identities of a person, such as the "
                      "numbers of the SIM card")
+          ->excludes(pty)
           ->type_name("CAPTURE");
   app.add_flag_callback(
          "--overwrite", [&options] { options.existingRecording = ExistingRecording::Replaced; },
@@ -104,6 +109,8 @@ std::optional<std::string> conflictOfPipe(const Options& options) {
 std::optional<std::string> conflict(const Options& options) {
   if (!options.portPath && !options.simulatedTechnology && !options.replayPath)
     return "one of --port, --simulate, and --replay is needed";
+  if (options.playsPort && options.simulatedTechnology == technology::ifxGSM)
+    return "the modem of ifx-gsm sends no log packets, so it has no diagnostic port to play";
   if (!options.replayPath) return std::nullopt;
   if (const auto found = conflictOfPipe(options)) return found;
   const bool isPlayable = options.speed >= slowest && options.speed <= fastest;  // false for NaN

@@ -16,6 +16,7 @@ struct Options {
 
   std::optional<std::string> simulatedTechnology;
   std::uint64_t seed = 1;
+  bool playsPort = false;  ///< on a pseudo-terminal, instead of serving the log channel
 
   std::optional<std::string> replayPath;
   /// The technology that viewers are told; absent: the one that the capture names, else all radios.

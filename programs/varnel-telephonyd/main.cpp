@@ -28,6 +28,8 @@
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "programs/varnel-telephonyd/TelephonyServer.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
+#include "programs/varnel-telephonyd/simulation/pty/PseudoTerminal.h"
+#include "programs/varnel-telephonyd/simulation/pty/SimulatedPort.h"
 #include "programs/varnel-telephonyd/sources/DiagnosticPort.h"
 #include "programs/varnel-telephonyd/sources/LivePort.h"
 
@@ -208,11 +210,38 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   return status;
 }
 
+// Plays the diagnostic port of a simulated modem for servers of other processes.
+int playPort(int& argumentCount, char** arguments, const Options& options) {
+  HostApplication application(argumentCount, arguments);
+  const SignalWatcher signals({SIGINT, SIGTERM}, [&](int /*signal*/) { application.end(0); });
+  EventLoopQueue queue;
+  std::unique_ptr<SimulatedPort> port;
+  PseudoTerminal terminal([&](ByteView bytes) { port->take(bytes); });
+  port = std::make_unique<SimulatedPort>(
+      SimulatedPort::Setup{.modem = simulatedModem(*options.simulatedTechnology, options.seed),
+                           .queue = queue,
+                           .uptime = uptime,
+                           .now = [] { return SystemClock().now(); },
+                           .send = [&](ByteView frame) { return terminal.send(frame); },
+                           .build = "simulated " + *options.simulatedTechnology});
+  // Scripts read the name; it stands alone on standard output.
+  std::printf("%s\n", terminal.name().c_str());
+  std::fflush(stdout);
+  tell("playing a modem's diagnostic port; now start " + std::string(programName) + " --port " +
+       terminal.name());
+  const int status = application.run();
+  tell("port: " + std::to_string(port->sent()) + " records sent, " + std::to_string(port->dropped()) +
+       " not taken");
+  return status;
+}
+
 int run(int argumentCount, char** arguments) {
   const auto choice = readOptions(argumentCount, arguments, applicationInfo().version.value_or("(none)"));
   if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
   try {
-    return serve(argumentCount, arguments, std::get<Options>(choice));
+    const auto& options = std::get<Options>(choice);
+    return options.playsPort ? playPort(argumentCount, arguments, options)
+                             : serve(argumentCount, arguments, options);
   } catch (const std::runtime_error& error) {
     return fail(error);
   }

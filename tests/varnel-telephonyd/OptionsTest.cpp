@@ -45,6 +45,15 @@ TEST(TelephonydOptions, AModemsPort) {
   EXPECT_FALSE(reading.options().simulatedTechnology);
 }
 
+TEST(TelephonydOptions, ASimulatedModemMayHaveAPortThatIsServedElsewhere) {
+  EXPECT_TRUE(read({"--simulate", "kalvi-lte", "--pty"}).options().playsPort);
+  EXPECT_FALSE(read({"--simulate", "kalvi-lte"}).options().playsPort);
+  EXPECT_THAT(read({"--replay", "walk.pcap", "--pty"}).error, HasSubstr("--pty requires --simulate"));
+  EXPECT_THAT(read({"--simulate", "kalvi-lte", "--pty", "--record", "a"}).error,
+              HasSubstr("--pty excludes --record"));
+  EXPECT_THAT(read({"--simulate", "ifx-gsm", "--pty"}).error, HasSubstr("has no diagnostic port to play"));
+}
+
 TEST(TelephonydOptions, AReplayAndItsDefaults) {
   const Reading reading = read({"--replay", "walk.pcap"});
   EXPECT_EQ(reading.error, "");
