@@ -256,6 +256,10 @@ std::optional<std::string> VarnelModel::missingTemplate() const {
   return _logGenerator ? _logGenerator->missingTemplate() : std::nullopt;
 }
 
+NumberFormats VarnelModel::numberFormats() const {
+  return _logGenerator ? _logGenerator->numberFormats() : NumberFormats();
+}
+
 std::uint64_t VarnelModel::messagesNotDecoded() const {
   return _logGenerator ? _logGenerator->messagesNotDecoded() : 0;
 }

@@ -106,6 +106,8 @@ class VarnelModel {
   bool hasHistory() const;
   /// The template file, when it could not be loaded and so there is no display; absent otherwise.
   std::optional<std::string> missingTemplate() const;
+  /// The formats of the display's numbers; none while there is no generator. They are made anew by each call.
+  NumberFormats numberFormats() const;
   /// How many messages since the link was opened no decoder took, because of their log code or length.
   std::uint64_t messagesNotDecoded() const;
 
