@@ -19,6 +19,7 @@ class Notice {
     Source,           ///< what the server says about where its messages come from
     DroppedByServer,
     TooLong,
+    History,  ///< that the value history has lost some values before their time
     LeftOutOfLog,
     NotDecoded,
   };

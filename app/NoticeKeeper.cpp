@@ -51,6 +51,7 @@ void NoticeKeeper::end() {
   _patience.reset();
   _endOfSaving.reset();
   _notice.clear();
+  _historyLine.clear();
 }
 
 void NoticeKeeper::awaitLink() {
@@ -74,6 +75,7 @@ bool NoticeKeeper::update() {
       {Matter::DroppedByServer, countLine("Messages that the server dropped, since they were read too slowly",
                                           report.droppedByServer)},
       {Matter::TooLong, countLine("Messages too long for the log channel", report.tooLongForChannel)},
+      {Matter::History, _historyLine},
       {Matter::LeftOutOfLog,
        countLine("Messages that a snapshot's binary log lacks, since too many came at a time",
                  _model->messagesLeftOutOfLog())},

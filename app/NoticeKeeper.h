@@ -3,6 +3,7 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 
 #include "app/Notice.h"
 #include "model/VarnelModel.h"
@@ -27,6 +28,8 @@ class NoticeKeeper {
   /// before.
   bool update();
 
+  /// What the value history has to tell, or an empty line. `update` shows it.
+  void tellOfHistory(std::string line) { _historyLine = std::move(line); }
   /// A snapshot was written, or could not be written. Calls the observer.
   void snapshotWasWritten(const FileWriting& writing);
   /// The user wanted a snapshot on a device that allows none. Calls the observer.
@@ -52,6 +55,7 @@ class NoticeKeeper {
   std::string _wayToStartOver;
   std::function<void()> _observer;
   Notice _notice;
+  std::string _historyLine;
   const VarnelModel* _model = nullptr;
   bool _wasConnected = false;
   std::unique_ptr<RepeatingTimer> _patience;     // set while it is too early to say why nothing arrives

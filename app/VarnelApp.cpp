@@ -59,6 +59,7 @@ void VarnelApp::startOver() {
   closeSaveView();
   setUpdateMessage(std::string(notConnectedStatus));
   _notices.end();
+  if (_host.history) _host.history->clear();
   _model.reset();  // only one model at a time can have the log channel
   _model = std::make_unique<VarnelModel>(_host.model, *this);
   _notices.begin(*_model);
@@ -91,6 +92,7 @@ void VarnelApp::afterUpdates(unsigned count, std::function<void()> task) {
 }
 
 void VarnelApp::updateViewControllerFromModel() {
+  keepNumbers();
   reloadPanes();
   if (isConnected()) setUpdateMessage(updateMessageForNow());
   _showsFirstStatus = false;
@@ -113,6 +115,18 @@ void VarnelApp::linkWasOpened() {
 
 void VarnelApp::linkWasLookedAt() {
   if (_notices.update()) showNotice();
+}
+
+// Before the panes are reloaded: their rows ask the history for their courses.
+void VarnelApp::keepNumbers() {
+  if (!_host.history) return;
+  // A display that stands still is that of another generator.
+  if (_technologyOfFormats != _model->technology() && !_model->standingDisplay()) {
+    _technologyOfFormats = _model->technology();
+    _host.history->setFormats(_model->numberFormats());
+  }
+  _host.history->add(_model->topLevelNodes(), _host.model.generator.clock.now());
+  _notices.tellOfHistory(_host.history->notice());
 }
 
 VarnelPaneController& VarnelApp::topPane() const { return varnelPane(*_navController->topController()); }

@@ -9,6 +9,7 @@
 #include "app/DateFormatter.h"
 #include "app/NoticeKeeper.h"
 #include "app/SaveControl.h"
+#include "app/ValueHistory.h"
 #include "app/VarnelPaneController.h"
 #include "app/VarnelSaveViewController.h"
 #include "base/WhileAlive.h"
@@ -31,6 +32,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
     UserInterface& userInterface;
     /// What users do to start over, as the notice tells them.
     std::string wayToStartOver = "press Ctrl+R";
+    /// Gets the numbers of each display; null when nobody shows their courses.
+    ValueHistory* history = nullptr;
   };
 
   explicit VarnelApp(const Host& host);
@@ -83,6 +86,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void showFirstStatus(VarnelPaneController& root);
   bool isConnected() const { return _model && _model->isConnected(); }
   void reloadPanes();
+  void keepNumbers();
   VarnelPaneController& topPane() const;
   void showNotice();
   void showWindowTitle();
@@ -97,6 +101,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   AwaitedUpdates _awaitedUpdates;
   NoticeKeeper _notices;
   bool _showsFirstStatus = true;
+  std::string _technologyOfFormats;  // of those that the history has
   std::unique_ptr<VarnelModel> _model;
   std::shared_ptr<VarnelSaveViewController> _saveViewController;
   std::unique_ptr<NavigationStack> _navController;

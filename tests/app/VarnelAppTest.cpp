@@ -96,10 +96,12 @@ class VarnelAppTest : public testing::Test {
   FakeLinkReports link;
   RecordingPreferences preferences;
   RecordingUserInterface userInterface;
-  VarnelApp app{{{ports, telephony, queue, host.services, writeXmlPropertyList, &link},
-                 files,
-                 preferences,
-                 userInterface}};
+  ValueHistory history;
+  VarnelApp app{{.model = {ports, telephony, queue, host.services, writeXmlPropertyList, &link},
+                 .files = files,
+                 .preferences = preferences,
+                 .userInterface = userInterface,
+                 .history = &history}};
 };
 
 TEST_F(VarnelAppTest, LaunchShowsAWindowAsLargeAsTheScreen) {
@@ -622,6 +624,61 @@ TEST_F(VarnelAppTest, CallsTheTaskOnceWhenThatManyRefreshesHaveBeenShown) {
   receive(1);
   receive(1);
   EXPECT_THAT(statuses, ElementsAre(updated));
+}
+
+// ---- The value history ----
+
+TEST_F(VarnelAppTest, EachRefreshGoesIntoTheHistoryBeforeThePanesShowIt) {
+  launch();
+  queue.run();
+  ports.deliver(channel, 0, PacketBuilder(0xB0C2, 38).bytes());
+  queue.advance(2s);
+  host.clock.set({1709294711, 0});
+  ports.deliver(channel, 0, PacketBuilder(0xB0C2, 38).bytes());
+  queue.advance(2s);
+  const auto series = history.seriesOfKey("/Serving Cell Info/Physical Cell ID");
+  ASSERT_TRUE(series);
+  const auto samples = history.samples(*series, history.whole());
+  ASSERT_EQ(samples.size(), 2u);
+  EXPECT_EQ(samples[1].time, (Time{1709294711, 0}));
+  EXPECT_TRUE(samples[1].isRenewed);
+}
+
+TEST_F(VarnelAppTest, TheHistoryKnowsTheUnitsOfTheModemsTechnology) {
+  host.resources.add("LTE", dictionaryOf({{"Serving Cell Measurements", Value::ofDictionary()}}));
+  launch();
+  queue.run();
+  ports.deliver(channel, 0, PacketBuilder(0xB17F, 33).bytes());
+  queue.advance(2s);
+  const auto series = history.seriesOfKey("/Serving Cell Measurements/Average RSRP");
+  ASSERT_TRUE(series);
+  EXPECT_EQ(history.unit(*series), "dBm");
+}
+
+TEST_F(VarnelAppTest, StartingOverForgetsTheHistory) {
+  launch();
+  queue.run();
+  ports.deliver(channel, 0, PacketBuilder(0xB0C2, 38).bytes());
+  queue.advance(2s);
+  ASSERT_FALSE(history.series().empty());
+  app.startOver();
+  EXPECT_TRUE(history.series().empty());
+}
+
+TEST_F(VarnelAppTest, WhatTheHistoryHadToForgetIsInTheNotice) {
+  ValueHistory small({}, {.bytes = 1000});
+  VarnelApp viewer{{.model = {ports, telephony, queue, host.services, writeXmlPropertyList, &link},
+                    .files = files,
+                    .preferences = preferences,
+                    .userInterface = userInterface,
+                    .history = &small}};
+  viewer.applicationDidFinishLaunching();
+  queue.run();
+  ports.deliver(channel, 0, PacketBuilder(0xB0C2, 38).bytes());
+  queue.advance(2s);
+  EXPECT_EQ(stack().notice,
+            "The courses of all values do not fit into 0 MiB: those of the values that were silent longest "
+            "are gone");
 }
 
 }  // namespace
