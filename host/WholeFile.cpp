@@ -79,6 +79,11 @@ std::error_code WholeFileWriter::open() {
   return _file.make();
 }
 
+std::error_code WholeFileWriter::dateTo(const timespec& time) {
+  const timespec times[] = {time, time};
+  return ::futimens(_file.descriptor(), times) == 0 ? std::error_code() : lastSystemError();
+}
+
 std::error_code WholeFileWriter::finish() {
   const bool keepsMode = _mode == ReplacedMode::Kept && _oldMode != ownerAlone;
   if (keepsMode && ::fchmod(_file.descriptor(), _oldMode) != 0) return lastSystemError();

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <sys/types.h>
+#include <time.h>
 
 #include <filesystem>
 #include <optional>
@@ -39,6 +40,8 @@ class WholeFileWriter final {
   /// Call this first, and the other functions only when it returns no error.
   std::error_code open();
   std::error_code write(ByteView bytes) { return writeAll(_file.descriptor(), bytes); }
+  /// Gives the file this time of its last change, after everything was written.
+  std::error_code dateTo(const timespec& time);
   /// Replaces the old file. Without this call the old file stays.
   std::error_code finish();
 

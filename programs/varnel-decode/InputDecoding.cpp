@@ -43,6 +43,7 @@ namespace varnel {
 namespace {
 
 constexpr int generalError = 1;
+constexpr std::uint64_t recordsBetweenNotes = 256;
 
 // The user's technology comes before that of the capture.
 std::string technologyOf(const Capture& capture, const Options& options,
@@ -75,17 +76,30 @@ std::vector<std::string> possibleTechnologies(const std::optional<std::string>& 
 // Does everything that the options ask for with one capture or snapshot.
 class InputDecoding {
  public:
-  InputDecoding(const Options& options, std::size_t index)
+  InputDecoding(const Options& options, std::size_t index, DecodingNotes* notes)
       : _options(options),
+        _notes(notes),
         _path(options.captures[index]),
         _name(captureName(_path)),
         _isFirst(index == 0),
-        _captureName(options.captures.size() > 1 ? std::optional(_path) : std::nullopt),
+        _captureName(options.sharesOutput() ? std::optional(_path) : std::nullopt),
         _subscriptions(options.subscription),
         _outputs(options),
         _eventWriter(stdout, _captureName, options.eventFormat) {}
 
   int run(const DecodingServices& services) {
+    const int status = decode(services);
+    if (isCountedForOthers()) *_notes->statistics = std::move(_statistics);
+    return status;
+  }
+
+ private:
+  struct Sink {
+    std::unique_ptr<GenerationSink> sink;
+    bool hasFailed = false;
+  };
+
+  int decode(const DecodingServices& services) {
     std::optional<ByteWindow> bytes;
     bool isSnapshot = false;
     const bool isOpen = succeeds([&] {
@@ -98,12 +112,6 @@ class InputDecoding {
     if (!succeeds([&] { capture = openCapture({std::move(*bytes), _name, tell}); })) return generalError;
     return decodeCapture(*capture, services);
   }
-
- private:
-  struct Sink {
-    std::unique_ptr<GenerationSink> sink;
-    bool hasFailed = false;
-  };
 
   void addSinks(const std::optional<std::string>& technology, const DecodingServices& services) {
     if (_options.style.valuesAs == ValuesAs::Numbers)
@@ -223,9 +231,12 @@ class InputDecoding {
         isStreaming ? ProgressBar::Output::GoesToTerminalAlongside : ProgressBar::Output::LeavesTerminalAlone,
         log, _options.logLevel);
     const bool isCounting = countsMessages();
+    std::uint64_t recordsRead = 0;
     CaptureRecord record;
     while (!isPointless() && !templates.missing() && capture.next(record)) {
       progress.recordRead();
+      if (_notes && _notes->bytesRead && recordsRead++ % recordsBetweenNotes == 0)
+        *_notes->bytesRead = capture.bytesRead();
       if (!pass(record)) continue;
       if (isCounting || !_guess.isAnyKnown()) count(record.message, generator.fateOf(record.message));
       if (const auto generation = decoder.fireTicks(record.time)) report(*generation);
@@ -265,7 +276,7 @@ class InputDecoding {
 
   // The option that only captures can fulfill; nothing when there is none.
   std::optional<std::string> wishForCapture() const {
-    if (countsMessages()) return "--stats counts the messages of captures";
+    if (writesStatistics()) return "--stats counts the messages of captures";
     if (_options.output == Output::Events) return "--events tells what happened in captures";
     if (!_outputs.areNone())
       return "--records, --pcap, --framed and --messages write the records of captures";
@@ -364,11 +375,16 @@ class InputDecoding {
     return (_isFirst ? "==> " : "\n==> ") + printable(_name) + " <==\n";
   }
 
-  bool countsMessages() const {
+  bool writesStatistics() const {
     return _options.output == Output::StatisticsTable || _options.output == Output::StatisticsJson;
   }
 
+  bool isCountedForOthers() const { return _notes && _notes->statistics; }
+
+  bool countsMessages() const { return isCountedForOthers() || writesStatistics(); }
+
   const Options& _options;
+  DecodingNotes* const _notes;  // null when nobody wants to know
   const std::string _path;
   const std::string _name;  // for errors and headings
   const bool _isFirst;
@@ -402,8 +418,9 @@ std::string commonCsvHeader(const Options& options, const DecodingServices& serv
   return csvHeader(options.tablePaths, TableColumns::CaptureTimeAndValues, formats);
 }
 
-int decodeInput(const Options& options, std::size_t index, const DecodingServices& services) {
-  return InputDecoding(options, index).run(services);
+int decodeInput(const Options& options, std::size_t index, const DecodingServices& services,
+                DecodingNotes* notes) {
+  return InputDecoding(options, index, notes).run(services);
 }
 
 }  // namespace varnel

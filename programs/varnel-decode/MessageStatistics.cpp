@@ -203,6 +203,47 @@ std::string MessageStatistics::framesAsJson() const {
   return json + "},\"Noise Bytes\":" + std::to_string(_leftOut.noiseBytes);
 }
 
+std::string MessageStatistics::asReportMembers() const {
+  std::string json = "\"Records\":" + std::to_string(recordCount()) + ",\"Left Out\":{";
+  for (const LeftOutKind& kind : frameKinds)
+    json += jsonString(kind.name) + ':' + std::to_string(_leftOut.*kind.count) + ',';
+  json += jsonString(noise.name) + ':' + std::to_string(_leftOut.noiseBytes) + "},\"Unknown Versions\":[";
+  auto add = [&, separator = std::string_view()](const Kind& kind, const std::string& version,
+                                                 std::uint64_t count) mutable {
+    json.append(separator).append("{\"Name\":" + jsonString(kind.name()) + ",\"Version\":" + version);
+    json.append(",\"Messages\":" + std::to_string(count) + '}');
+    separator = ",";
+  };
+  for (const auto& [kind, versions] : _versions) {
+    for (const auto& [version, count] : versions.counts) add(kind, jsonString(version.text()), count);
+    if (versions.others > 0) add(kind, "null", versions.others);
+  }
+  return json + ']';
+}
+
+std::vector<MessageStatistics::Row> MessageStatistics::rows() const {
+  std::vector<Row> rows;
+  for (const auto& [kind, counts] : _counts) {
+    Row row{.name = kind.name(),
+            .counts = {counts.received, counts.decoded, counts.tooShort, counts.tooLong, counts.unknown,
+                       counts.unknownVersion}};
+    if (const auto found = _versions.find(kind); found != _versions.end()) {
+      for (const auto& [version, count] : found->second.counts)
+        row.unknownVersions.emplace_back(version.text(), count);
+      if (found->second.others > 0) row.unknownVersions.emplace_back(otherVersions, found->second.others);
+    }
+    rows.push_back(std::move(row));
+  }
+  return rows;
+}
+
+std::vector<std::pair<std::string, std::uint64_t>> MessageStatistics::leftOut() const {
+  std::vector<std::pair<std::string, std::uint64_t>> counts;
+  for (const LeftOutKind& kind : frameKinds) counts.emplace_back(kind.name, _leftOut.*kind.count);
+  counts.emplace_back(noise.name, _leftOut.noiseBytes);
+  return counts;
+}
+
 std::string MessageStatistics::subscriptionsAsJson() const {
   std::string json = "\"SIM\":[";
   std::string_view separator;

@@ -1,9 +1,12 @@
 #pragma once
 
+#include <array>
 #include <cstdint>
 #include <map>
 #include <optional>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "LogGenerator/MessageFate.h"
 #include "LogGenerator/PacketVersion.h"
@@ -27,6 +30,23 @@ class MessageStatistics {
   /// The same as one line of JSON: {"Messages": […], "Frames": {…}, "SIM": […], "Total": {…}}. With a
   /// capture's name, "Capture" comes first.
   std::string asJson(const std::optional<std::string>& captureName) const;
+  /// What a report of many captures says of one: "Records":…,"Left Out":{…},"Unknown Versions":[{"Name":…,
+  /// "Version":…,"Messages":…},…].
+  std::string asReportMembers() const;
+
+  /// A line of the table for other writers.
+  struct Row {
+    std::string name;
+    /// Received, decoded, too short, too long, unknown, of an unknown version.
+    std::array<std::uint64_t, 6> counts{};
+    std::vector<std::pair<std::string, std::uint64_t>> unknownVersions{};
+  };
+  /// The lines without the sums.
+  std::vector<Row> rows() const;
+  /// What was left out, by kind; 0 where there is none.
+  std::vector<std::pair<std::string, std::uint64_t>> leftOut() const;
+  /// The number of records, decoded or not.
+  std::uint64_t recordCount() const;
 
  private:
   struct Counts {
@@ -57,7 +77,6 @@ class MessageStatistics {
   static std::string jsonMembers(const Counts& counts);
   std::string versionLines(const Kind& kind) const;
   std::string versionsAsJson(const Kind& kind) const;
-  std::uint64_t recordCount() const;
   std::string frameLines() const;
   std::string subscriptionLines() const;
   std::string framesAsJson() const;

@@ -17,6 +17,7 @@ namespace varnel {
 namespace {
 
 constexpr int usageError = 2;
+constexpr const char* listOption = "--files-from";
 constexpr unsigned mostJobs = 256;
 constexpr std::string_view eventTableFormat = "csv";  // of events alone, as values have --csv
 
@@ -44,6 +45,8 @@ constexpr const char* examples =
     "  varnel-decode --technology kalvi-lte --stats --format json walk.pcap\n"
     "  varnel-decode --technology kalvi-lte --jobs 4 --format json monday.pcap tuesday.pcap\n"
     "  ssh device cat PORT | varnel-decode --every --numbers --changes -\n"
+    "  varnel-decode --files-from captures.txt --output decoded --every --jobs 4 --report report.jsonl "
+    "--resume\n"
     "  varnel-decode --format none --pcap walk.pcap walk.bin\n"
     "  varnel-decode --format none --messages walk-messages.pcapng walk.bin\n"
     "  varnel-decode --dlf walk.dlf --format none VarnelSnapshot-1709301914.varnel\n";
@@ -61,6 +64,7 @@ struct Wishes {
   bool isShowingIdentities = false;
   std::vector<std::string> plot;
   std::string messagesAs;
+  std::string part;
 };
 
 // The values of --messages-as.
@@ -95,8 +99,17 @@ EventFormat eventFormatNamed(std::string_view name) {
   return name == "json" ? EventFormat::Json : EventFormat::Text;
 }
 
+enum class CaptureIs { Required, NamedByList };
+
+CaptureIs captureIsIn(std::span<const char* const> arguments) {
+  const bool hasList = std::ranges::any_of(arguments, [](std::string_view argument) {
+    return argument == listOption || argument.starts_with(std::string(listOption) + '=');
+  });
+  return hasList ? CaptureIs::NamedByList : CaptureIs::Required;
+}
+
 void declareInput(CLI::App& app, Options& options, Wishes& wishes,
-                  const std::vector<std::string>& technologies) {
+                  const std::vector<std::string>& technologies, CaptureIs captureIs) {
   app.add_option("--technology", options.technology,
                  "the modem that was captured; unless given, the one that the capture names, else all-radios")
       ->check(CLI::IsMember(technologies));
@@ -116,14 +129,31 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
       ->check(CLI::Range(1U, 255U).description(""))
       ->type_name("N");
   app.add_flag("--follow", wishes.isFollowing, "wait for more at the end of the file, until interrupted");
-  app.add_option("CAPTURE", options.captures,
-                 "a stream of a diagnostic port, log records, pcap of link type USER0, or a snapshot; - is "
+  auto* captures = app.add_option(
+      "CAPTURE", options.captures,
+      "a stream of a diagnostic port, log records, pcap of link type USER0, or a snapshot; - is "
+      "standard input");
+  captures->type_name("");
+  // An option that takes many arguments leaves the last one to a capture only if there must be one.
+  captures->required(captureIs == CaptureIs::Required);
+  app.add_option(listOption, options.listPath,
+                 "decode the captures that this list names, separated by newlines or NUL characters; - is "
                  "standard input")
-      ->required()
-      ->type_name("");
+      ->type_name("LIST");
+  app.add_option("--part", wishes.part,
+                 "decode only this part of the captures; all parts have about the same size")
+      ->type_name("K/N");
+  app.add_flag("--resume", options.isResuming,
+               "with --output: leave each capture whose output is there and newer than the capture");
 }
 
 void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
+  app.add_option("--output", options.outputFolder,
+                 "write a file per capture into this folder, which gets the tree of their names, instead of "
+                 "standard output")
+      ->type_name("DIR");
+  app.add_option("--report", options.reportPath, "also write what became of each capture, as a line of JSON")
+      ->type_name("FILE");
   app.add_option("--format", wishes.format, "the form of the display; text unless given")
       ->check(CLI::IsMember(formatNames()));
   auto* every = app.add_flag("--every", wishes.isEvery,
@@ -203,6 +233,24 @@ std::optional<std::string> conflictOfEvents(const Options& options, const Wishes
   return std::nullopt;
 }
 
+// What is wrong with the options for many captures.
+std::optional<std::string> conflictOfMany(const Options& options, const Wishes& wishes) {
+  if (options.listPath && !options.captures.empty())
+    return "--files-from names all captures; put " + options.captures.front() + " into the list";
+  if (!wishes.part.empty() && !partNamed(wishes.part))
+    return "--part takes a number and how many parts there are, such as 2/8, not " + wishes.part;
+  const std::pair<const char*, const std::optional<std::string>*> files[] = {
+      {"--files-from", &options.listPath},
+      {"--output", &options.outputFolder},
+      {"--report", &options.reportPath}};
+  for (const auto& [option, path] : files)
+    if (*path && (*path)->empty()) return std::string(option) + ": the name of the file is empty";
+  if (options.outputFolder && wishes.format == "none")
+    return "--output has nothing to write with --format none";
+  if (options.isResuming && !options.outputFolder) return "--resume goes with --output";
+  return std::nullopt;
+}
+
 // What is wrong with the combination of valid options; nothing when they go together.
 std::optional<std::string> conflict(const Options& options, const Wishes& wishes) {
   const std::string& format = wishes.format;
@@ -220,6 +268,7 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
     return "--plot never draws identities, and " + *identity + " is one";
   if (!wishes.messagesAs.empty() && !options.messagesPath) return "--messages-as goes with --messages";
   if (std::ranges::any_of(options.captures, &std::string::empty)) return "the name of a capture is empty";
+  if (const auto found = conflictOfMany(options, wishes)) return found;
   const auto outputs = namedOutputs(options, wishes);
   for (const auto& [option, path] : outputs)
     if (path.empty()) return option + ": the name of the file is empty";
@@ -227,9 +276,11 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
     return "--follow needs --every, --csv or --events, for all else is written at the end";
   if (wishes.isFollowing && !outputs.empty())
     return "--follow has no end, at which " + outputs.front().first + " is written; leave one of them out";
-  if (options.captures.size() < 2) return std::nullopt;
+  if (wishes.isFollowing && (options.outputFolder || options.reportPath))
+    return "--follow has no end, at which --output and --report are written; leave them out";
+  if (options.captures.size() < 2 && !options.listPath) return std::nullopt;
   if (wishes.isFollowing) return "--follow takes one capture at a time";
-  if (format == "plist") return "--format plist takes one capture at a time";
+  if (format == "plist" && !options.outputFolder) return "--format plist takes one capture at a time";
   if (!outputs.empty())
     return outputs.front().first + " takes one capture at a time, for each would overwrite the one before";
   if (std::ranges::count(options.captures, "-") > 1) return "standard input can be read only once";
@@ -278,7 +329,9 @@ void fulfill(Options& options, const Wishes& wishes) {
   const bool isForReading = (options.output == Output::Display && (format == "text" || format == "paths")) ||
                             options.output == Output::StatisticsTable ||
                             (options.output == Output::Events && format == "text");
-  options.namesEachCapture = options.captures.size() > 1 && isForReading;
+  if (!wishes.part.empty()) options.part = partNamed(wishes.part);
+  options.areSeveral = options.captures.size() > 1 || options.listPath;
+  options.namesEachCapture = options.sharesOutput() && isForReading;
   if (!wishes.plot.empty())
     options.plot = PlotWish{wishes.plot.front(), {wishes.plot.begin() + 1, wishes.plot.end()}};
 }
@@ -299,7 +352,7 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
                programName);
   app.footer(examples);
   app.set_version_flag("--version", programName + (" " + version));
-  declareInput(app, options, wishes, technologies);
+  declareInput(app, options, wishes, technologies, captureIsIn({arguments, arguments + argumentCount}));
   declareOutput(app, options, wishes);
   try {
     app.parse(argumentCount, arguments);
@@ -312,6 +365,11 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
   if (const auto found = conflict(options, wishes)) return mistake(*found);
   fulfill(options, wishes);
   return options;
+}
+
+void takeList(Options& options) {
+  if (options.listPath) options.captures = readCaptureList(*options.listPath);
+  if (options.part) options.captures = shareOf(options.captures, sizesOf(options.captures), *options.part);
 }
 
 }  // namespace varnel

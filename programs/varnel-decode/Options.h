@@ -10,6 +10,7 @@
 #include "LogGenerator/Identities.h"
 #include "base/Log.h"
 #include "host/captures/ByteSource.h"
+#include "programs/varnel-decode/CaptureList.h"
 #include "programs/varnel-decode/EventWriter.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/MessagePackets.h"
@@ -58,10 +59,22 @@ struct Options {
   AtEndOfFile atEnd = AtEndOfFile::Stop;  ///< what happens where a capture ends
   unsigned jobs = 1;                      ///< how many captures are decoded at the same time
   bool namesEachCapture = false;          ///< text of several captures: a line before each says which it is
-  std::vector<std::string> captures;      ///< captures and snapshots, at least one; "-" is standard input
+  /// Captures and snapshots, at least one unless there is a list; "-" is standard input. `takeList` adds
+  /// those of the list, and takes away those of other parts.
+  std::vector<std::string> captures;
+  std::optional<std::string> listPath;      ///< a list of captures; "-" is standard input
+  std::optional<Part> part;                 ///< the only part of the captures that is decoded
+  std::optional<std::string> outputFolder;  ///< each capture has an output of its own in this folder
+  std::optional<std::string> reportPath;    ///< where to write what became of each capture
+  bool isResuming = false;                  ///< what is there, and newer than its capture, is left
+  bool areSeveral = false;                  ///< several captures, or a list with any number of them
 
   /// Whether events are written as a table, which begins with a header.
   bool isEventTable() const { return output == Output::Events && eventFormat == EventFormat::Csv; }
+  /// Whether each capture is decoded in a process of its own.
+  bool areMany() const { return areSeveral || part || outputFolder || reportPath; }
+  /// Whether several captures write to standard output, so that each of them must be named there.
+  bool sharesOutput() const { return areSeveral && !outputFolder; }
 };
 
 /// The status to end with when the command line leaves nothing to do: 0 after help, 2 after a mistake.
@@ -77,5 +90,9 @@ ExitStatus mistake(const std::string& text);
 std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* const* arguments,
                                               const std::vector<std::string>& technologies,
                                               const std::string& version);
+
+/// Reads the list of captures, if there is one, and leaves the part of the captures that is to be decoded.
+/// Throws std::runtime_error when the list cannot be read or is no list.
+void takeList(Options& options);
 
 }  // namespace varnel

@@ -15,18 +15,13 @@ struct NamedFile {
   FileIdentity identity;
 };
 
-std::vector<NamedFile> inputsOf(const Options& options) {
-  std::vector<NamedFile> inputs;
-  for (const std::string& path : options.captures) {
-    if (path == "-")
-      inputs.push_back({"standard input", FileIdentity::ofDescriptor(STDIN_FILENO)});
-    else
-      inputs.push_back({path, FileIdentity::ofPath(path)});
-  }
-  return inputs;
+NamedFile inputNamed(const std::string& path) {
+  if (path == "-") return {"standard input", FileIdentity::ofDescriptor(STDIN_FILENO)};
+  return {path, FileIdentity::ofPath(path)};
 }
 
 bool writesToStandardOutput(const Options& options) {
+  if (options.outputFolder) return false;
   return options.output != Output::Display || options.writeDisplay != displayAsNothing;
 }
 
@@ -44,25 +39,30 @@ std::vector<NamedFile> outputsOf(const Options& options) {
   if (options.framedPath) add("--framed", *options.framedPath);
   if (options.messagesPath) add("--messages", *options.messagesPath);
   if (options.plot) add("--plot", options.plot->file);
+  if (options.reportPath) add("--report", *options.reportPath);
   return outputs;
 }
 
 }  // namespace
 
 std::optional<std::string> outputClash(const Options& options) {
-  const std::vector<NamedFile> inputs = inputsOf(options);
-  std::vector<NamedFile> earlier;
-  for (const NamedFile& output : outputsOf(options)) {
-    for (const NamedFile& input : inputs) {
+  const std::vector<NamedFile> outputs = outputsOf(options);
+  for (std::size_t i = 0; i < outputs.size(); ++i)
+    for (std::size_t other = 0; other < i; ++other)
+      if (outputs[i].identity.isSameFileAs(outputs[other].identity))
+        return outputs[other].name + " and " + outputs[i].name + " are one file; name another one";
+  const auto clashWith = [&](const NamedFile& input, const char* use) -> std::optional<std::string> {
+    for (const NamedFile& output : outputs)
       if (output.identity.isSameFileAs(input.identity))
-        return output.name + " would overwrite " + input.name + ", which is to be decoded; name another file";
-    }
-    for (const NamedFile& other : earlier) {
-      if (output.identity.isSameFileAs(other.identity))
-        return other.name + " and " + output.name + " are one file; name another one";
-    }
-    earlier.push_back(output);
-  }
+        return output.name + " would overwrite " + input.name + ", which is to be " + use +
+               "; name another file";
+    return std::nullopt;
+  };
+  if (options.listPath)
+    if (auto clash = clashWith(inputNamed(*options.listPath), "read")) return clash;
+  // There may be very many captures, so only one of them is looked at at a time.
+  for (const std::string& path : options.captures)
+    if (auto clash = clashWith(inputNamed(path), "decoded")) return clash;
   return std::nullopt;
 }
 

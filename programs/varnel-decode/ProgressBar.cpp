@@ -17,12 +17,12 @@ constexpr auto interval = 100ms;
 constexpr std::size_t width = 40;
 constexpr double mebibyte = 1 << 20;
 
+}  // namespace
+
 bool isTerminalThatErases(int file) {
   const char* const terminal = std::getenv("TERM");
   return ::isatty(file) && terminal && std::string_view(terminal) != "dumb";
 }
-
-}  // namespace
 
 ProgressBar::ProgressBar(const Capture& capture, Output output, LogSink& log, int logLevel,
                          std::chrono::milliseconds delay)

@@ -9,6 +9,9 @@
 
 namespace varnel {
 
+/// Whether an open file is a terminal on which a line can be erased.
+bool isTerminalThatErases(int file);
+
 /// Shows on standard error how far a capture has been read: only on a terminal, only for a file, and only
 /// after a while. It disappears with the object. While it is visible, it is the log's sink, so that log lines
 /// do not run into it.

@@ -11,7 +11,7 @@
 #include "host/ProgramStart.h"
 #include "host/TerminateHandler.h"
 #include "programs/varnel-decode/InputDecoding.h"
-#include "programs/varnel-decode/Jobs.h"
+#include "programs/varnel-decode/ManyCaptures.h"
 #include "programs/varnel-decode/Options.h"
 #include "programs/varnel-decode/OutputClash.h"
 #include "programs/varnel-decode/ProgramError.h"
@@ -28,14 +28,12 @@ int decodeAll(const Options& options, const DecodingServices& services) {
   if (options.technology && !succeeds([] { static_cast<void>(readableResourceFolder()); }))
     return generalError;
   int status = generalError;
-  const auto decodeOne = [&](std::size_t index) { return decodeInput(options, index, services); };
   const bool isPassedOn = succeeds([&] {
-    const bool areSeveral = options.captures.size() > 1;
-    if (areSeveral && options.output == Output::ValueTable)
+    if (options.sharesOutput() && options.output == Output::ValueTable)
       writeOutput(stdout, commonCsvHeader(options, services));
-    if (areSeveral && options.isEventTable())
+    if (options.sharesOutput() && options.isEventTable())
       writeOutput(stdout, eventTableHeader(EventColumns::WithCapture));
-    status = areSeveral ? runJobs(options.captures, options.jobs, decodeOne) : decodeOne(0);
+    status = options.areMany() ? decodeMany(options, services) : decodeInput(options, 0, services);
   });
   return isPassedOn ? status : generalError;
 }
@@ -50,10 +48,10 @@ int run(int argumentCount, char** arguments) {
 
   const auto names = LogGenerator::technologies();
   const std::vector<std::string> technologies(names.begin(), names.end());
-  const auto choice =
-      readOptions(argumentCount, arguments, technologies, application.version.value_or("(none)"));
+  auto choice = readOptions(argumentCount, arguments, technologies, application.version.value_or("(none)"));
   if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
-  const auto& options = std::get<Options>(choice);
+  auto& options = std::get<Options>(choice);
+  if (!succeeds([&] { takeList(options); })) return generalError;
   if (const auto clash = outputClash(options)) return mistake(*clash).code;
   const Services services{templates, clock, application, nowhere, options.identities};
   return decodeAll(options, {services, clock, templates, technologies});

@@ -1,0 +1,163 @@
+#include "programs/varnel-decode/ManyCaptures.h"
+
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <cstring>
+#include <optional>
+#include <stdexcept>
+#include <string>
+#include <system_error>
+
+#include "host/OutputFile.h"
+#include "programs/varnel-decode/CaptureReport.h"
+#include "programs/varnel-decode/Jobs.h"
+#include "programs/varnel-decode/OutputTree.h"
+#include "programs/varnel-decode/ProgramError.h"
+#include "programs/varnel-decode/ProgressBar.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr int generalError = 1;
+
+ByteView bytesOf(std::string_view text) {
+  return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
+}
+
+// A file of lines that appears when it is whole.
+class Report {
+ public:
+  explicit Report(const std::string& path) : _path(path), _file(path) { check(_file.open()); }
+
+  void write(const CaptureEntry& entry) { check(_file.write(bytesOf(reportLine(entry)))); }
+  void finish() { check(_file.finish()); }
+
+ private:
+  void check(std::error_code failure) const {
+    if (failure) throw std::system_error(failure, "cannot write " + _path);
+  }
+
+  const std::string _path;
+  OutputFile _file;
+};
+
+// Copies standard output, which is a temporary file of this process, to the output of the capture.
+void writeOutputOf(const std::string& capture, const std::filesystem::path& output, bool isWhole) {
+  const auto check = [&](std::error_code failure) {
+    if (failure) throw std::system_error(failure, "cannot write " + output.string());
+  };
+  std::error_code failure;
+  std::filesystem::create_directories(output.parent_path(), failure);
+  check(failure);
+  WholeFileWriter file(output);
+  check(file.open());
+  std::uint8_t piece[1 << 16];
+  off_t offset = 0;
+  while (true) {
+    const ssize_t count = ::pread(STDOUT_FILENO, piece, sizeof piece, offset);
+    if (count < 0) throw std::system_error(errno, std::generic_category(), "cannot read a temporary file");
+    if (count == 0) break;
+    check(file.write({piece, static_cast<std::size_t>(count)}));
+    offset += count;
+  }
+  struct stat status {};
+  if (!isWhole && ::stat(capture.c_str(), &status) == 0) {
+    --status.st_mtim.tv_sec;
+    check(file.dateTo(status.st_mtim));
+  }
+  check(file.finish());
+}
+
+bool hasOutput() {
+  struct stat status {};
+  return ::fstat(STDOUT_FILENO, &status) == 0 && status.st_size > 0;
+}
+
+class ManyCaptures {
+ public:
+  ManyCaptures(const Options& options, const DecodingServices& services)
+      : _options(options),
+        _services(services),
+        _progress(isTerminalThatErases(STDERR_FILENO) ? sizesOf(options.captures)
+                                                      : std::vector<std::uint64_t>(options.captures.size()),
+                  options.jobs) {
+    if (options.outputFolder) _tree.emplace(*options.outputFolder, outputEnding(options));
+    if (options.reportPath) _report.emplace(*options.reportPath);
+  }
+
+  int run() {
+    if (const auto clash = _tree ? _tree->clash(_options.captures) : std::nullopt)
+      return mistake(*clash).code;
+    const int status =
+        runJobs({.names = _options.captures,
+                 .mostAtATime = _options.jobs,
+                 .work = [this](std::size_t i, JobContext& context) { return decodeOne(i, context); },
+                 .isLeft = [this](std::size_t i) { return isLeft(i); },
+                 .ended = [this](const JobEnd& end) { note(end); },
+                 .progress = &_progress});
+    if (_report) _report->finish();
+    return status;
+  }
+
+ private:
+  bool isLeft(std::size_t index) const {
+    return _options.isResuming && _tree->hasNewer(_options.captures[index]);
+  }
+
+  // Runs in a process of its own, whose standard output and standard error are temporary files.
+  int decodeOne(std::size_t index, JobContext& context) const {
+    MessageStatistics statistics;
+    DecodingNotes notes{.bytesRead = context.bytesRead, .statistics = _report ? &statistics : nullptr};
+    int status = decodeInput(_options, index, _services, &notes);
+    if (_tree && !succeeds([&] { keepOutput(_options.captures[index], status); }))
+      status = std::max(status, generalError);
+    // The rest goes to standard output.
+    if (_tree && ::ftruncate(STDOUT_FILENO, 0) != 0) status = std::max(status, generalError);
+    if (_report) {
+      const std::string details = statistics.asReportMembers();
+      std::fwrite(details.data(), 1, details.size(), context.details);
+    }
+    return status;
+  }
+
+  // What could be read of a damaged capture is kept. Its output is older than the capture, so that it is made
+  // again when the work is resumed.
+  void keepOutput(const std::string& capture, int status) const {
+    if (std::ferror(stdout)) throw std::runtime_error("the output of " + capture + " was not written");
+    if (status == 0 || hasOutput()) writeOutputOf(capture, _tree->outputOf(capture), status == 0);
+  }
+
+  void note(const JobEnd& end) {
+    if (!_report) return;
+    CaptureEntry entry{.path = _options.captures[end.piece], .details = end.details, .time = end.time};
+    if (end.wasLeft) entry.fate = CaptureFate::Present;
+    if (end.status != 0) {
+      entry.fate = CaptureFate::Failed;
+      entry.why = end.lastError;
+    }
+    if (end.signal) {
+      entry.fate = CaptureFate::Aborted;
+      entry.why = std::string(::strsignal(*end.signal));
+      if (!end.lastError.empty()) entry.why += ": " + end.lastError;
+    }
+    _report->write(entry);
+  }
+
+  const Options& _options;
+  const DecodingServices& _services;
+  ListProgress _progress;
+  std::optional<OutputTree> _tree;
+  std::optional<Report> _report;
+};
+
+}  // namespace
+
+int decodeMany(const Options& options, const DecodingServices& services) {
+  return ManyCaptures(options, services).run();
+}
+
+}  // namespace varnel

@@ -1,0 +1,188 @@
+#include <gmock/gmock.h>
+
+#include <chrono>
+#include <filesystem>
+
+#include "tests/varnel-decode/DecodeProgram.h"
+
+namespace varnel {
+namespace {
+
+namespace fs = std::filesystem;
+using ::testing::EndsWith;
+using ::testing::HasSubstr;
+using ::testing::Not;
+using ::testing::StartsWith;
+
+// The program, in a folder that is the current one.
+class ManyCaptures : public DecodeProgram {
+ protected:
+  ManyCaptures() { fs::current_path(folder.path()); }
+  ~ManyCaptures() override { fs::current_path(before); }
+
+  static void make(const std::string& name, const std::string& contents) {
+    if (const fs::path parent = fs::path(name).parent_path(); !parent.empty()) fs::create_directories(parent);
+    std::ofstream(name, std::ios::binary) << contents;
+  }
+  static void makeCapture(const std::string& name, char count) {
+    make(name, pcapHeader() + pcapRecord(afternoon, 0, antennas(count)));
+  }
+  // Its decoder ends by an exception.
+  static void makeBadCapture(const std::string& name) {
+    make(name, pcapHeader() + pcapRecord(afternoon, 0, packet(0xFF, 0, "?")));
+  }
+
+  static Result runLte(std::vector<std::string> arguments) {
+    arguments.insert(arguments.begin(), {"--technology", "kalvi-lte", "--log-level", "-1"});
+    return run(std::move(arguments));
+  }
+
+  const fs::path before = fs::current_path();
+};
+
+TEST_F(ManyCaptures, AListNamesThemWithNewlinesOrNulCharacters) {
+  makeCapture("a", 2);
+  makeCapture("b", 4);
+  make("newlines", "a\nb\n");
+  make("nul", std::string("a\0b", 3));
+  const Result expected = runLte({"a", "b"});
+  EXPECT_THAT(expected.output, StartsWith("==> a <==\n"));
+  EXPECT_EQ(runLte({"--files-from", "newlines"}).output, expected.output);
+  EXPECT_EQ(runLte({"--files-from", "nul"}).output, expected.output);
+  EXPECT_EQ(runInShell("--log-level -1 --files-from - <newlines").output, expected.output);
+}
+
+TEST_F(ManyCaptures, EvenAListOfOneNamesTheCapture) {
+  makeCapture("a", 2);
+  make("list", "a");
+  EXPECT_THAT(runLte({"--files-from", "list", "--every"}).output, StartsWith("{\"Capture\":\"a\","));
+}
+
+TEST_F(ManyCaptures, AnEmptyListIsDoneAtOnce) {
+  make("list", "");
+  const Result result = runLte({"--files-from", "list", "--report", "report"});
+  EXPECT_EQ(result.status, 0);
+  EXPECT_EQ(result.output, "");
+  EXPECT_EQ(contentsOf("report"), "");
+}
+
+TEST_F(ManyCaptures, AListThatIsMissingIsStatusOne) {
+  const Result result = runLte({"--files-from", "nowhere"});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(result.error, "varnel-decode: cannot read the list nowhere: No such file or directory\n");
+}
+
+TEST_F(ManyCaptures, ThePartsTogetherAreTheWhole) {
+  for (const char* name : {"a", "b", "c"}) makeCapture(name, 2);
+  make("list", "a\nb\nc\n");
+  EXPECT_EQ(runLte({"--files-from", "list", "--part", "1/2", "--stats", "--format", "json"}).output,
+            runLte({"--stats", "--format", "json", "a", "c"}).output);
+  EXPECT_THAT(runLte({"--files-from", "list", "--part", "2/2", "--every"}).output,
+              StartsWith("{\"Capture\":\"b\","));
+  EXPECT_EQ(runLte({"--files-from", "list", "--part", "4/4", "--every"}).output, "");
+}
+
+TEST_F(ManyCaptures, EachHasAnOutputOfItsOwnAsIfItWereAlone) {
+  makeCapture("monday/a", 2);
+  makeCapture("b", 4);
+  makeBadCapture("bad");
+  const Result result =
+      runLte({"--output", "out", "--every", "--jobs", "2", "monday/a", "b", "bad", "missing"});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(result.output, "");
+  EXPECT_EQ(contentsOf("out/monday/a.jsonl"), runLte({"--every", "monday/a"}).output);
+  EXPECT_EQ(contentsOf("out/b.jsonl"), runLte({"--every", "b"}).output);
+  EXPECT_EQ(std::distance(fs::recursive_directory_iterator("out"), {}), 3)
+      << "monday, its file, and one file: nothing else is left behind";
+}
+
+TEST_F(ManyCaptures, WhatIsThereAndNewerIsLeft) {
+  makeCapture("a", 2);
+  makeCapture("b", 4);
+  EXPECT_EQ(runLte({"--output", "out", "--format", "json", "a", "b"}).status, 0);
+  make("out/a.json", "kept");
+  fs::last_write_time("out/b.json", fs::last_write_time("b"));
+  make("out/b.json.txt", "");
+  const Result result =
+      runLte({"--output", "out", "--format", "json", "--resume", "--report", "report", "a", "b"});
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_EQ(contentsOf("out/a.json"), "kept");
+  EXPECT_THAT(contentsOf("out/b.json"), StartsWith("{"));
+  EXPECT_THAT(contentsOf("report"),
+              StartsWith(R"({"Path":"a","Status":"present","Why":null,"Records":null,)"));
+  EXPECT_THAT(contentsOf("report"), HasSubstr(R"({"Path":"b","Status":"decoded","Why":null,"Records":1,)"));
+}
+
+TEST_F(ManyCaptures, WhatCouldBeReadOfADamagedOneIsKeptButMadeAgain) {
+  make("damaged", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)) + "half");
+  const std::vector<std::string> arguments = {"--output", "out",    "--every", "--resume",
+                                              "--report", "report", "damaged"};
+  for (int round = 0; round < 2; ++round) {
+    EXPECT_EQ(runLte(arguments).status, 1);
+    EXPECT_THAT(contentsOf("out/damaged.jsonl"), HasSubstr("\"Num Tx Antennas\":\"2\""));
+    EXPECT_THAT(contentsOf("report"), StartsWith(R"({"Path":"damaged","Status":"failed","Why":"damaged, )"));
+    EXPECT_THAT(contentsOf("report"), HasSubstr("\"Records\":1,"));
+  }
+}
+
+TEST_F(ManyCaptures, TheReportHasALinePerCaptureInTheirOrder) {
+  makeCapture("a", 2);
+  makeBadCapture("bad");
+  // 0xB0E4 has no version 255; two bytes of noise come before the frame of another command.
+  make("list", "a\nbad\nmissing\n");
+  const Result result =
+      runLte({"--files-from", "list", "--jobs", "3", "--format", "json", "--report", "report"});
+  EXPECT_EQ(result.status, 1);
+  const std::string report = contentsOf("report");
+  EXPECT_EQ(linesOf(report), 3u) << report;
+  EXPECT_THAT(
+      report,
+      StartsWith(
+          R"({"Path":"a","Status":"decoded","Why":null,"Records":1,"Left Out":{"Bad checksum":0,"Torn":0,"Other commands":0,"Encrypted":0,"Broken":0,"Too long":0,"Noise bytes":0},"Unknown Versions":[],"Seconds":)"));
+  EXPECT_THAT(report, HasSubstr(R"({"Path":"bad","Status":"aborted","Why":"Aborted: ended by )"));
+  EXPECT_THAT(report, HasSubstr(R"({"Path":"missing","Status":"failed","Why":"cannot open missing: )"));
+  EXPECT_LT(report.find("\"bad\""), report.find("\"missing\""));
+}
+
+TEST_F(ManyCaptures, TheReportCountsUnknownVersions) {
+  make("a", pcapHeader() + pcapRecord(afternoon, 0, packet(1, 0xB0C1, std::string(40, '\x63'))));
+  EXPECT_EQ(run({"--report", "report", "--format", "none", "a"}).status, 0);
+  EXPECT_THAT(contentsOf("report"),
+              HasSubstr(R"("Unknown Versions":[{"Name":"0xB0C1","Version":"99","Messages":1}])"));
+}
+
+TEST_F(ManyCaptures, OutputsThatWouldOverwriteAreMistakes) {
+  makeCapture("a", 2);
+  make("list", "a\n");
+  for (const std::vector<std::string>& arguments :
+       std::vector<std::vector<std::string>>{{"--output", "out", "a", "./a"},
+                                             {"--report", "a", "a"},
+                                             {"--report", "list", "--files-from", "list"},
+                                             {"--files-from", "list", "a"},
+                                             {"--files-from", ""},
+                                             {"--part", "3/2", "a"},
+                                             {"--resume", "a"},
+                                             {"--output", "out", "--format", "none", "a"},
+                                             {"--files-from", "list", "--pcap", "x"},
+                                             {"--files-from", "list", "--follow", "--every"},
+                                             {}}) {
+    const Result result = runLte(arguments);
+    EXPECT_EQ(result.status, 2) << ::testing::PrintToString(arguments) << result.error;
+    EXPECT_EQ(linesOf(result.error), 1u) << result.error;
+  }
+  EXPECT_THAT(contentsOf("a"), Not(HasSubstr("Path")));
+}
+
+TEST_F(ManyCaptures, AnOutputThatCannotBeWrittenIsOneLineOfTheReport) {
+  makeCapture("a", 2);
+  makeCapture("b/c", 2);
+  make("out/b", "in the way");
+  const Result result = runLte({"--output", "out", "--every", "--report", "report", "a", "b/c"});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_THAT(contentsOf("report"),
+              HasSubstr(R"({"Path":"b/c","Status":"failed","Why":"cannot write out/b/c.jsonl)"));
+  EXPECT_THAT(contentsOf("out/a.jsonl"), EndsWith("}\n"));
+}
+
+}  // namespace
+}  // namespace varnel
