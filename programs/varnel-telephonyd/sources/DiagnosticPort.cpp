@@ -57,17 +57,18 @@ std::string troubleOfOpening(const std::string& path, const struct stat& status,
   }
 }
 
-// Raw, eight bits, no parity, one stop bit. What is no serial line has no such settings and needs none. The
-// speed of a line over USB has no meaning.
-void makeRaw(int device) {
+// Raw, eight bits, no parity, one stop bit. The speed of a line over USB has no meaning. False when the
+// device is no serial line, which has no such settings and needs none.
+bool makeRaw(int device) {
   termios settings{};
-  if (::tcgetattr(device, &settings) != 0) return;
+  if (::tcgetattr(device, &settings) != 0) return false;
   ::cfmakeraw(&settings);
   settings.c_cflag &= ~static_cast<tcflag_t>(CSTOPB | CRTSCTS);
   settings.c_cflag |= CLOCAL | CREAD;
   settings.c_cc[VMIN] = 1;
   settings.c_cc[VTIME] = 0;
   ::tcsetattr(device, TCSANOW, &settings);
+  return true;
 }
 
 bool hasNothingNow(int error) { return error == EAGAIN || error == EINTR; }
@@ -86,7 +87,7 @@ std::optional<std::string> DiagnosticPort::open(Handlers handlers) {
   if (::flock(device.number(), LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK)
     return troubleOfBusy(_path, {});
   ::ioctl(device.number(), TIOCEXCL);
-  makeRaw(device.number());
+  _isSerialLine = makeRaw(device.number());
   _handlers = std::move(handlers);
   _device = std::move(device);
   _room.resize(mostPerTurn);
@@ -121,11 +122,14 @@ void DiagnosticPort::close() {
 void DiagnosticPort::readBytes() noexcept {
   for (std::size_t total = 0; total < mostPerTurn && _device.isOpen();) {
     const ssize_t count = ::read(_device.number(), _room.data(), _room.size() - total);
-    if (count < 0 && hasNothingNow(errno)) return;
+    // Some devices are always said to be readable.
+    if (count < 0 && hasNothingNow(errno)) return total == 0 ? restAWhile() : void();
     if (count <= 0) return goAway();
     total += static_cast<std::size_t>(count);
     _handlers.bytesCame(ByteView(_room).first(static_cast<std::size_t>(count)));
     if (static_cast<std::size_t>(count) < fewBytes) return restAWhile();
+    // What is no serial line may refuse to give less than a whole message.
+    if (!_isSerialLine) return;
   }
 }
 

@@ -26,6 +26,7 @@ class DiagnosticPort final : public PortDevice {
   }
 
   std::optional<std::string> open(Handlers handlers) override;
+  bool isSerialLine() const override { return _isSerialLine; }
   void send(ByteView bytes) override;
   void close() override;
 
@@ -38,6 +39,7 @@ class DiagnosticPort final : public PortDevice {
   const std::string _path;
   Handlers _handlers;
   FileDescriptor _device;
+  bool _isSerialLine = false;
   Bytes _room;      // for what is read
   Bytes _outgoing;  // what the device has not taken yet
   std::unique_ptr<QSocketNotifier> _readable, _writable;

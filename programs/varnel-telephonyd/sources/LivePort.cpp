@@ -62,6 +62,7 @@ std::optional<std::string> LivePort::connect() {
   auto trouble = _setup.device->open(
       {.bytesCame = [this](ByteView bytes) { takeBytes(bytes); }, .wentAway = [this] { beUnplugged(); }});
   if (trouble) return trouble;
+  _reads.begin(_setup.device->isSerialLine() ? DeviceReads::Device::SerialLine : DeviceReads::Device::Other);
   _session = std::make_unique<PortSession>(PortSession::Setup{
       .queue = _setup.queue,
       .send = [this](ByteView bytes) { _setup.device->send(bytes); },
@@ -112,7 +113,7 @@ void LivePort::becomeReady() {
 
 void LivePort::takeBytes(ByteView bytes) {
   if (!_session) return;
-  _session->take(bytes);
+  _reads.take(bytes, [this](ByteView stream) { _session->take(stream); });
   for (const PortSource* source : _sources)
     if (source->waiting() > 0) source->callHandler();
 }
@@ -187,7 +188,9 @@ std::string inWords(std::uint64_t records, const LeftOut& leftOut) {
     if (leftOut.*kind.count == 0) continue;
     words += std::exchange(separator, ", ") + std::to_string(leftOut.*kind.count) + ' ' + kind.name;
   }
-  return leftOut.frames() > 0 ? words + ')' : words;
+  if (leftOut.frames() > 0) words += ')';
+  return leftOut.noiseBytes > 0 ? words + ", " + std::to_string(leftOut.noiseBytes) + " bytes in no frame"
+                                : words;
 }
 
 }  // namespace varnel

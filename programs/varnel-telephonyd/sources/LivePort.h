@@ -11,6 +11,7 @@
 #include "host/captures/CaptureRecord.h"
 #include "platform/MainQueue.h"
 #include "programs/varnel-telephonyd/MessageSource.h"
+#include "programs/varnel-telephonyd/sources/DeviceReads.h"
 #include "programs/varnel-telephonyd/sources/PortDevice.h"
 #include "programs/varnel-telephonyd/sources/PortSession.h"
 
@@ -88,6 +89,7 @@ class LivePort final {
   std::list<PortSource*> _sources;
   LeftOut _leftOut;
   std::uint64_t _records = 0;
+  DeviceReads _reads{_leftOut};
   std::unique_ptr<PortSession> _session;  // null while the device is closed
   bool _hasBeenReady = false;
   bool _isEnding = false;

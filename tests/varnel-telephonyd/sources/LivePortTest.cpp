@@ -10,6 +10,7 @@
 #include "programs/varnel-telephonyd/TelephonyServer.h"
 #include "programs/varnel-telephonyd/sources/PortSource.h"
 #include "tests/support/FakeQueue.h"
+#include "tests/support/MemoryDevice.h"
 #include "tests/support/MemoryPorts.h"
 #include "tests/support/ScriptedModem.h"
 
@@ -19,46 +20,6 @@ namespace {
 using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::IsEmpty;
-
-// A device in memory with a modem behind it.
-struct MemoryDevice {
-  ScriptedModem modem;
-  std::optional<std::string> trouble;
-  bool isOpen = false;
-  int openings = 0;
-  PortDevice::Handlers handlers;
-  Bytes sent;
-
-  // Lets the modem answer until it has nothing more to say.
-  void run() {
-    while (isOpen && !sent.empty()) {
-      const Bytes answer = modem.take(std::exchange(sent, {}));
-      if (!answer.empty()) handlers.bytesCame(answer);
-    }
-  }
-  void unplug() {
-    isOpen = false;
-    handlers.wentAway();
-  }
-};
-
-class MemoryPortDevice final : public PortDevice {
- public:
-  explicit MemoryPortDevice(MemoryDevice& device) : _device(device) {}
-  std::optional<std::string> open(Handlers handlers) override {
-    ++_device.openings;
-    if (_device.trouble) return _device.trouble;
-    _device.isOpen = true;
-    _device.sent.clear();
-    _device.handlers = std::move(handlers);
-    return std::nullopt;
-  }
-  void send(ByteView bytes) override { _device.sent.insert(_device.sent.end(), bytes.begin(), bytes.end()); }
-  void close() override { _device.isOpen = false; }
-
- private:
-  MemoryDevice& _device;
-};
 
 class LivePortTest : public testing::Test {
  protected:
@@ -118,6 +79,21 @@ TEST_F(LivePortTest, AViewersCodesAreSwitchedOnAndItsMessagesComeInOrder) {
   EXPECT_EQ(_port.records(), 2u);
   EXPECT_EQ(source->lateness(), MessageSource::Lateness::IsDropped);
   EXPECT_EQ(source->nameOfLast(), "A record of /dev/modem");
+}
+
+TEST_F(LivePortTest, ADeviceThatIsNoSerialLineMayGiveSeveralRecordsPerReadAndShortReads) {
+  _device.isSerialLine = false;
+  open();
+  EXPECT_THAT(_builds, ElementsAre("TEST.1.0-42"));
+  const auto source = viewer({0xB0C1});
+  EXPECT_TRUE(_device.modem.isOn(0xB0C1));
+  const Bytes read = MemoryDevice::message(
+      {framed(logContents(0xB0C1, {1})), framed(logContents(0xB0C1, {2})), framed(logContents(0xB0C1, {3}))});
+  _device.handlers.bytesCame(read);
+  for (const std::uint8_t byte : read) _device.handlers.bytesCame(Bytes{byte});
+  const Bytes one = logMessage(0xB0C1, {1}), two = logMessage(0xB0C1, {2}), three = logMessage(0xB0C1, {3});
+  EXPECT_THAT(taken(*source), ElementsAre(one, two, three, one, two, three));
+  EXPECT_EQ(_port.leftOut(), LeftOut{});
 }
 
 TEST_F(LivePortTest, AMessageIsDueWhenItHasCome) {
@@ -355,6 +331,8 @@ TEST(PortCounts, TellEachKindOfFrameThatWasLeftOut) {
   EXPECT_EQ(inWords(0, {.badChecksum = 1, .torn = 2, .otherCommands = 3, .encrypted = 4, .broken = 5}),
             "port: 0 records, 15 frames left out (1 with a wrong checksum, 2 torn, 3 of other commands, 4 "
             "encrypted, 5 broken)");
+  EXPECT_EQ(inWords(7, {.torn = 1, .noiseBytes = 13}),
+            "port: 7 records, 1 frames left out (1 torn), 13 bytes in no frame");
 }
 
 }  // namespace
