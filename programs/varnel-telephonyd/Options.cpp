@@ -31,8 +31,12 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
   auto* port =
       app.add_option("--port", options.portPath,
                      "show what a modem's diagnostic port sends, such as /dev/ttyUSB0; the modem sends "
-                     "only what viewers ask for, and nothing any more at the end")
+                     "only what viewers ask for, and nothing any more at the end; auto looks for such a port")
           ->type_name("DEVICE");
+  app.add_flag("--inhibit", options.inhibitsModemManager,
+               "ask ModemManager to leave the modem alone while the server runs, which cuts the modem's data "
+               "connection")
+      ->needs(port);
   auto* simulate = app.add_option("--simulate", options.simulatedTechnology, "simulate a modem")
                        ->excludes(port)
                        ->check(CLI::IsMember(technologies))

@@ -10,9 +10,13 @@
 
 namespace varnel {
 
+/// In place of a device's path.
+inline constexpr const char* automaticPort = "auto";
+
 /// What the program is asked to do. One of `portPath`, `simulatedTechnology`, and `replayPath` is set.
 struct Options {
-  std::optional<std::string> portPath;
+  std::optional<std::string> portPath;  ///< automaticPort: the server looks for one
+  bool inhibitsModemManager = false;
 
   std::optional<std::string> simulatedTechnology;
   std::uint64_t seed = 1;

@@ -32,6 +32,7 @@
 #include "programs/varnel-telephonyd/simulation/pty/SimulatedPort.h"
 #include "programs/varnel-telephonyd/sources/DiagnosticPort.h"
 #include "programs/varnel-telephonyd/sources/LivePort.h"
+#include "programs/varnel-telephonyd/sources/PortChooser.h"
 
 namespace varnel {
 
@@ -130,11 +131,38 @@ std::unique_ptr<PipedReplay> makePipedReplay(const Options& options, MainQueue& 
   return replay;
 }
 
-// The port, if a modem's port is what is served. Its device is not open yet.
-std::unique_ptr<LivePort> makeLivePort(const Options& options, MainQueue& queue, HostApplication& application,
+// Looks for a port, or keeps ModemManager away from one, if that is asked for.
+std::unique_ptr<PortChooser> makePortChooser(const Options& options, MainQueue& queue) {
+  if (options.portPath != automaticPort && !options.inhibitsModemManager) return nullptr;
+  using Use = PortChooser::ModemManagers;
+  return std::make_unique<PortChooser>(PortChooser::Setup{
+      .queue = queue, .use = options.inhibitsModemManager ? Use::IsInhibited : Use::Stays, .tell = tell});
+}
+
+// The device's path, for which the event loop may have to run. Else the exit status: 0 when the program was
+// asked to end meanwhile. Throws std::runtime_error.
+std::variant<std::string, ExitStatus> choosePort(const Options& options, PortChooser* chooser,
+                                                 MainQueue& queue, HostApplication& application) {
+  if (options.portPath != automaticPort) {
+    if (chooser) chooser->inhibitModemOf(*options.portPath);
+    return *options.portPath;
+  }
+  std::optional<std::string> chosen;
+  queue.async([&] {
+    chooser->search([&](const std::optional<std::string>& path) {
+      chosen = path;
+      application.end(path ? 0 : generalError);
+    });
+  });
+  const int status = application.run();
+  if (!chosen) return ExitStatus{status};
+  return *chosen;
+}
+
+// The port of a modem. Its device is not open yet.
+std::unique_ptr<LivePort> makeLivePort(const std::string& path, MainQueue& queue,
+                                       HostApplication& application,
                                        const std::function<void()>& tellServing) {
-  if (!options.portPath) return nullptr;
-  const std::string& path = *options.portPath;
   const auto tellModem = [path, tellServing](const std::string& build) {
     tell(path + " is the diagnostic port of a modem" + (build.empty() ? "" : ", build " + build));
     tellServing();
@@ -178,7 +206,12 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
     tell("serving " + technology + " in " + folder.string() + "; now start varnel" +
          (options.runtimeFolder ? " --runtime-dir " + *options.runtimeFolder : ""));
   };
-  livePort = makeLivePort(options, queue, application, tellServing);
+  const std::unique_ptr<PortChooser> chooser = makePortChooser(options, queue);
+  if (options.portPath) {
+    const auto choice = choosePort(options, chooser.get(), queue, application);
+    if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
+    livePort = makeLivePort(std::get<std::string>(choice), queue, application, tellServing);
+  }
   const auto makeAnySource = [&] {
     if (livePort) return livePort->makeSource();
     return pipedReplay ? pipedReplay->makeSource() : makeSource(options, unasked);

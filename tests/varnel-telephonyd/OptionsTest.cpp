@@ -43,6 +43,12 @@ TEST(TelephonydOptions, AModemsPort) {
   EXPECT_EQ(reading.options().portPath, "/dev/ttyUSB0");
   EXPECT_EQ(reading.options().recordPath, "a");
   EXPECT_FALSE(reading.options().simulatedTechnology);
+  EXPECT_FALSE(reading.options().inhibitsModemManager);
+}
+
+TEST(TelephonydOptions, ModemManagerCanBeInhibitedForAPort) {
+  EXPECT_TRUE(read({"--port", "auto", "--inhibit"}).options().inhibitsModemManager);
+  EXPECT_THAT(read({"--replay", "a", "--inhibit"}).error, HasSubstr("--inhibit requires --port"));
 }
 
 TEST(TelephonydOptions, ASimulatedModemMayHaveAPortThatIsServedElsewhere) {

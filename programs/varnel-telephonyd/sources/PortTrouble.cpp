@@ -74,12 +74,38 @@ std::string troubleOfBusy(const std::string& name, const std::vector<std::string
   if (holders.size() > 1) return inWords(holders) + " use " + name + "; end them first";
   const bool isModemManager = holders[0].starts_with("ModemManager ");
   return holders[0] + " uses " + name + "; " +
-         (isModemManager ? "type sudo systemctl stop ModemManager" : "end it first");
+         (isModemManager
+              ? "type --inhibit too, which cuts the modem's data connection, or sudo systemctl stop "
+                "ModemManager"
+              : "end it first");
+}
+
+std::string troubleOfNoPort(bool hasModemManager) {
+  return std::string("ModemManager ") + (hasModemManager ? "knows no diagnostic port" : "does not run") +
+         ", and udev marks no port as a modem's; plug the modem in, or name its port with --port DEVICE";
+}
+
+std::string troubleOfNoFreePort() {
+  return "no port of a modem is a diagnostic port that is free; name another one with --port DEVICE";
 }
 
 std::string troubleOfSystem(const std::string& name, int error) {
   return "cannot open " + name + ": " + std::generic_category().message(error) +
          "; unplug the modem and plug it in again";
+}
+
+std::string noteOfModemManager() {
+  return "ModemManager goes on using this modem; if the two disturb each other, type --port auto --inhibit, "
+         "which cuts the modem's data connection while the server runs";
+}
+
+std::string noteOfInhibition(const std::string& name) {
+  return "ModemManager leaves the modem of " + name +
+         " alone until the server ends; until then the modem has no data connection";
+}
+
+std::string noteOfNothingToInhibit(const std::string& name) {
+  return "ModemManager does not use the modem of " + name + ", so --inhibit does nothing";
 }
 
 }  // namespace varnel

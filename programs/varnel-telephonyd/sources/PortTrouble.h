@@ -24,7 +24,20 @@ std::string troubleOfPermission(const std::string& name, const std::string& grou
 /// Others have it open, each as "ModemManager (process 812)"; empty when they are not known. The sentence
 /// names three at most.
 std::string troubleOfBusy(const std::string& name, const std::vector<std::string>& holders);
+/// No device may be a diagnostic port. ModemManager runs or does not.
+std::string troubleOfNoPort(bool hasModemManager);
+/// Of the devices that may be one, none is and is free.
+std::string troubleOfNoFreePort();
 /// The system's error is none of the above.
 std::string troubleOfSystem(const std::string& name, int error);
+
+// Each is one sentence about ModemManager and the port that is served.
+
+/// It goes on using the modem.
+std::string noteOfModemManager();
+/// It leaves the modem alone.
+std::string noteOfInhibition(const std::string& name);
+/// It does not use the modem, or does not run.
+std::string noteOfNothingToInhibit(const std::string& name);
 
 }  // namespace varnel

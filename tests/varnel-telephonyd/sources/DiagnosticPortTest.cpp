@@ -179,7 +179,8 @@ TEST(PortTroubles, SayWhatToDo) {
   EXPECT_EQ(troubleOfPermission("/dev/ttyUSB0", ""),
             "you may not open /dev/ttyUSB0, and no group may; start the server with sudo");
   EXPECT_EQ(troubleOfBusy("/dev/ttyUSB0", {"ModemManager (process 812)"}),
-            "ModemManager (process 812) uses /dev/ttyUSB0; type sudo systemctl stop ModemManager");
+            "ModemManager (process 812) uses /dev/ttyUSB0; type --inhibit too, which cuts the modem's data "
+            "connection, or sudo systemctl stop ModemManager");
   EXPECT_EQ(troubleOfBusy("/dev/ttyUSB0", {"minicom (process 812)"}),
             "minicom (process 812) uses /dev/ttyUSB0; end it first");
   EXPECT_EQ(troubleOfBusy("/dev/ttyUSB0", {"a (process 1)", "b (process 2)"}),

@@ -1,0 +1,129 @@
+#include "programs/varnel-telephonyd/sources/ModemManager.h"
+
+#include <QDBusArgument>
+#include <QDBusMessage>
+#include <QDBusObjectPath>
+#include <QMap>
+#include <QString>
+#include <QVariantMap>
+#include <algorithm>
+#include <chrono>
+#include <cstdint>
+#include <string_view>
+#include <utility>
+
+namespace varnel {
+
+namespace {
+
+using namespace std::chrono_literals;
+
+constexpr const char* connectionName = "varnel-modem-manager";
+const QString service = QStringLiteral("org.freedesktop.ModemManager1");
+const QString path = QStringLiteral("/org/freedesktop/ModemManager1");
+const QString objectManager = QStringLiteral("org.freedesktop.DBus.ObjectManager");
+const QString modemInterface = QStringLiteral("org.freedesktop.ModemManager1.Modem");
+
+// In the service's enumeration of port types.
+constexpr std::uint32_t diagnosticPort = 4;  // diagnostic port
+
+constexpr std::chrono::milliseconds timeLimit = 10s;
+// The service ends connections and closes ports first.
+constexpr std::chrono::milliseconds inhibitTimeLimit = 60s;
+constexpr std::size_t mostPorts = 256, longestName = 100;
+
+using Interfaces = QMap<QString, QVariantMap>;
+
+// A name below /dev, such as "ttyUSB0".
+bool isName(std::string_view name) {
+  const auto isPlain = [](char letter) {
+    return (letter >= '0' && letter <= '9') || (letter >= 'A' && letter <= 'Z') ||
+           (letter >= 'a' && letter <= 'z') || letter == '_' || letter == '-' || letter == '/';
+  };
+  return !name.empty() && name.size() <= longestName && std::ranges::all_of(name, isPlain);
+}
+
+// The property is an array of (name, type).
+void appendPorts(std::vector<ModemManager::Port>& ports, const QVariantMap& modem) {
+  const auto device = modem.value(QStringLiteral("Device")).toString().toStdString();
+  const QVariant property = modem.value(QStringLiteral("Ports"));
+  if (!property.canConvert<QDBusArgument>()) return;
+  const auto list = property.value<QDBusArgument>();
+  if (list.currentSignature() != QStringLiteral("a(su)")) return;
+  list.beginArray();
+  while (!list.atEnd()) {
+    QString name;
+    std::uint32_t type = 0;
+    list.beginStructure();
+    list >> name >> type;
+    list.endStructure();
+    if (ports.size() < mostPorts && isName(name.toStdString()))
+      ports.push_back({"/dev/" + name.toStdString(), device, type == diagnosticPort});
+  }
+  list.endArray();
+}
+
+std::vector<ModemManager::Port> portsIn(const QDBusArgument& objects) {
+  std::vector<ModemManager::Port> ports;
+  objects.beginMap();
+  while (!objects.atEnd()) {
+    QDBusObjectPath object;
+    Interfaces interfaces;
+    objects.beginMapEntry();
+    objects >> object >> interfaces;
+    objects.endMapEntry();
+    if (interfaces.contains(modemInterface)) appendPorts(ports, interfaces.value(modemInterface));
+  }
+  objects.endMap();
+  return ports;
+}
+
+QDBusMessage callTo(const QString& interface, const char* method) {
+  return QDBusMessage::createMethodCall(service, path, interface, QString::fromLatin1(method));
+}
+
+QDBusMessage inhibitDevice(const std::string& modem, bool isInhibited) {
+  QDBusMessage call = callTo(service, "InhibitDevice");
+  call << QString::fromStdString(modem) << isInhibited;
+  return call;
+}
+
+int inMilliseconds(std::chrono::milliseconds duration) { return static_cast<int>(duration.count()); }
+
+}  // namespace
+
+ModemManager::ModemManager()
+    : _bus(QDBusConnection::connectToBus(QDBusConnection::SystemBus, QString::fromLatin1(connectionName))) {}
+
+ModemManager::~ModemManager() {
+  release();
+  QDBusConnection::disconnectFromBus(QString::fromLatin1(connectionName));
+}
+
+std::optional<std::vector<ModemManager::Port>> ModemManager::ports() {
+  if (!_bus.isConnected()) return std::nullopt;
+  const QDBusMessage answer =
+      _bus.call(callTo(objectManager, "GetManagedObjects"), QDBus::Block, inMilliseconds(timeLimit));
+  if (answer.type() != QDBusMessage::ReplyMessage || answer.signature() != QStringLiteral("a{oa{sa{sv}}}"))
+    return std::nullopt;
+  return portsIn(answer.arguments().value(0).value<QDBusArgument>());
+}
+
+std::optional<std::string> ModemManager::inhibit(const std::string& modem) {
+  release();
+  const QDBusMessage answer =
+      _bus.call(inhibitDevice(modem, true), QDBus::Block, inMilliseconds(inhibitTimeLimit));
+  if (answer.type() != QDBusMessage::ReplyMessage)
+    return "ModemManager does not leave the modem alone (" + answer.errorMessage().toStdString() +
+           "); start the server with sudo, or type sudo systemctl stop ModemManager";
+  _inhibited = modem;
+  return std::nullopt;
+}
+
+void ModemManager::release() {
+  if (_inhibited.empty()) return;
+  const std::string modem = std::exchange(_inhibited, {});
+  _bus.call(inhibitDevice(modem, false), QDBus::Block, inMilliseconds(timeLimit));
+}
+
+}  // namespace varnel
