@@ -73,6 +73,17 @@ std::vector<std::string> possibleTechnologies(const std::optional<std::string>& 
   return technology ? std::vector{*technology} : services.technologies;
 }
 
+// For a sink that outlives the decoding.
+class ForwardingSink final : public GenerationSink {
+ public:
+  explicit ForwardingSink(GenerationSink& sink) : _sink(sink) {}
+  void take(const Generation& generation) override { _sink.take(generation); }
+  void finish(const std::string& inputName) override { _sink.finish(inputName); }
+
+ private:
+  GenerationSink& _sink;
+};
+
 // Does everything that the options ask for with one capture or snapshot.
 class InputDecoding {
  public:
@@ -114,7 +125,7 @@ class InputDecoding {
   }
 
   void addSinks(const std::optional<std::string>& technology, const DecodingServices& services) {
-    if (_options.style.valuesAs == ValuesAs::Numbers)
+    if (_options.style.valuesAs == ValuesAs::Numbers || isGatheringChanges())
       _formats = numberFormatsOf(possibleTechnologies(technology, services), services.services);
     const auto add = [this](auto sink) { _sinks.push_back({std::move(sink)}); };
     std::vector<std::string> paths = _options.tablePaths;
@@ -132,7 +143,13 @@ class InputDecoding {
       }
     }
     if (_options.plot) add(std::make_unique<Picture>(*_options.plot));
+    if (isGatheringChanges()) {
+      _notes->changes->setFormats(_formats);
+      add(std::make_unique<ForwardingSink>(*_notes->changes));
+    }
   }
+
+  bool isGatheringChanges() const { return _notes && _notes->changes; }
 
   // A sink that has failed gets nothing more; the others go on.
   void feed(Sink& sink, const std::function<void()>& part) {
@@ -316,7 +333,9 @@ class InputDecoding {
   }
 
   // Whether nobody would see the rest of the capture.
-  bool isPointless() const { return _isOutputBroken && !_options.plot && !isSaving() && _outputs.areNone(); }
+  bool isPointless() const {
+    return _isOutputBroken && !_options.plot && !isSaving() && _outputs.areNone() && !isGatheringChanges();
+  }
 
   bool isSaving() const { return _options.snapshotPath || _options.binaryLogPath; }
 

@@ -11,6 +11,7 @@
 #include "programs/varnel-decode/MessageStatistics.h"
 #include "programs/varnel-decode/Options.h"
 #include "programs/varnel-decode/TemplateWatch.h"
+#include "programs/varnel-decode/database/ValueChanges.h"
 
 namespace varnel {
 
@@ -30,6 +31,7 @@ std::string commonCsvHeader(const Options& options, const DecodingServices& serv
 struct DecodingNotes {
   std::atomic<std::uint64_t>* bytesRead = nullptr;  ///< gets how far the capture was read; may be null
   MessageStatistics* statistics = nullptr;          ///< gets what became of the messages; may be null
+  ValueChanges* changes = nullptr;                  ///< gets the displays; may be null
 };
 
 /// Does everything that the options ask for with one of the captures or snapshots. Returns the exit status:

@@ -6,10 +6,12 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
+#include <functional>
 #include <optional>
 #include <stdexcept>
 #include <string>
 #include <system_error>
+#include <vector>
 
 #include "host/OutputFile.h"
 #include "programs/varnel-decode/CaptureReport.h"
@@ -17,6 +19,7 @@
 #include "programs/varnel-decode/OutputTree.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/ProgressBar.h"
+#include "programs/varnel-decode/database/CaptureDatabase.h"
 
 namespace varnel {
 
@@ -92,6 +95,8 @@ class ManyCaptures {
   int run() {
     if (const auto clash = _tree ? _tree->clash(_options.captures) : std::nullopt)
       return mistake(*clash).code;
+    const bool isUsable = succeeds([this] { lookIntoDatabase(); });
+    if (!isUsable) return generalError;
     const int status =
         runJobs({.names = _options.captures,
                  .mostAtATime = _options.jobs,
@@ -100,23 +105,46 @@ class ManyCaptures {
                  .ended = [this](const JobEnd& end) { note(end); },
                  .progress = &_progress});
     if (_report) _report->finish();
-    return status;
+    return _hasFailed ? std::max(status, generalError) : status;
   }
 
  private:
+  // The connection must not be open when other processes are started.
+  void lookIntoDatabase() {
+    if (!_options.databasePath) return;
+    CaptureDatabase database(*_options.databasePath);
+    if (_options.isResuming) _isInDatabase = database.present(_options.captures);
+  }
+
   bool isLeft(std::size_t index) const {
-    return _options.isResuming && _tree->hasNewer(_options.captures[index]);
+    if (!_options.isResuming) return false;
+    if (_tree && !_tree->hasNewer(_options.captures[index])) return false;
+    return _isInDatabase.empty() || _isInDatabase[index];
   }
 
   // Runs in a process of its own, whose standard output and standard error are temporary files.
   int decodeOne(std::size_t index, JobContext& context) const {
+    const bool isStoring = _options.databasePath.has_value();
     MessageStatistics statistics;
-    DecodingNotes notes{.bytesRead = context.bytesRead, .statistics = _report ? &statistics : nullptr};
+    ValueChanges changes;
+    DecodingNotes notes{.bytesRead = context.bytesRead,
+                        .statistics = _report || isStoring ? &statistics : nullptr,
+                        .changes = isStoring ? &changes : nullptr};
     int status = decodeInput(_options, index, _services, &notes);
-    if (_tree && !succeeds([&] { keepOutput(_options.captures[index], status); }))
-      status = std::max(status, generalError);
+    const auto also = [&](const std::function<void()>& part) {
+      if (!succeeds(part)) status = std::max(status, generalError);
+    };
+    if (_tree) also([&] { keepOutput(_options.captures[index], status); });
     // The rest goes to standard output.
     if (_tree && ::ftruncate(STDOUT_FILENO, 0) != 0) status = std::max(status, generalError);
+    if (isStoring) {
+      CaptureEntry entry{.path = _options.captures[index]};
+      if (status != 0) {
+        entry.fate = CaptureFate::Failed;
+        entry.why = lastLineOf(STDERR_FILENO);
+      }
+      also([&] { CaptureDatabase(*_options.databasePath).store(entry, &statistics, &changes); });
+    }
     if (_report) {
       const std::string details = statistics.asReportMembers();
       std::fwrite(details.data(), 1, details.size(), context.details);
@@ -132,7 +160,7 @@ class ManyCaptures {
   }
 
   void note(const JobEnd& end) {
-    if (!_report) return;
+    if (!_report && !end.signal) return;
     CaptureEntry entry{.path = _options.captures[end.piece], .details = end.details, .time = end.time};
     if (end.wasLeft) entry.fate = CaptureFate::Present;
     if (end.status != 0) {
@@ -144,7 +172,11 @@ class ManyCaptures {
       entry.why = std::string(::strsignal(*end.signal));
       if (!end.lastError.empty()) entry.why += ": " + end.lastError;
     }
-    _report->write(entry);
+    // The process that ended could not do it itself.
+    if (_options.databasePath && end.signal)
+      _hasFailed |=
+          !succeeds([&] { CaptureDatabase(*_options.databasePath).store(entry, nullptr, nullptr); });
+    if (_report) _report->write(entry);
   }
 
   const Options& _options;
@@ -152,6 +184,8 @@ class ManyCaptures {
   ListProgress _progress;
   std::optional<OutputTree> _tree;
   std::optional<Report> _report;
+  std::vector<bool> _isInDatabase;  // by capture; empty unless the work is resumed
+  bool _hasFailed = false;
 };
 
 }  // namespace

@@ -18,6 +18,8 @@ namespace {
 
 constexpr int usageError = 2;
 constexpr const char* listOption = "--files-from";
+constexpr const char* mergeOption = "--merge";
+constexpr const char* databaseOption = "--sqlite";
 constexpr unsigned mostJobs = 256;
 constexpr std::string_view eventTableFormat = "csv";  // of events alone, as values have --csv
 
@@ -47,6 +49,8 @@ constexpr const char* examples =
     "  ssh device cat PORT | varnel-decode --every --numbers --changes -\n"
     "  varnel-decode --files-from captures.txt --output decoded --every --jobs 4 --report report.jsonl "
     "--resume\n"
+    "  varnel-decode --files-from captures.txt --part 2/8 --sqlite part2.db\n"
+    "  varnel-decode --sqlite all.db --merge part1.db part2.db\n"
     "  varnel-decode --format none --pcap walk.pcap walk.bin\n"
     "  varnel-decode --format none --messages walk-messages.pcapng walk.bin\n"
     "  varnel-decode --dlf walk.dlf --format none VarnelSnapshot-1709301914.varnel\n";
@@ -99,13 +103,14 @@ EventFormat eventFormatNamed(std::string_view name) {
   return name == "json" ? EventFormat::Json : EventFormat::Text;
 }
 
-enum class CaptureIs { Required, NamedByList };
+enum class CaptureIs { Required, NamedElsewhere };
 
 CaptureIs captureIsIn(std::span<const char* const> arguments) {
-  const bool hasList = std::ranges::any_of(arguments, [](std::string_view argument) {
-    return argument == listOption || argument.starts_with(std::string(listOption) + '=');
+  const bool isElsewhere = std::ranges::any_of(arguments, [](std::string_view argument) {
+    const std::string_view name = argument.substr(0, argument.find('='));
+    return name == listOption || name == mergeOption;
   });
-  return hasList ? CaptureIs::NamedByList : CaptureIs::Required;
+  return isElsewhere ? CaptureIs::NamedElsewhere : CaptureIs::Required;
 }
 
 void declareInput(CLI::App& app, Options& options, Wishes& wishes,
@@ -144,7 +149,13 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
                  "decode only this part of the captures; all parts have about the same size")
       ->type_name("K/N");
   app.add_flag("--resume", options.isResuming,
-               "with --output: leave each capture whose output is there and newer than the capture");
+               "leave each capture whose output is there and newer than the capture; with --sqlite, each "
+               "that the database has and that has not changed");
+  app.add_option(
+         mergeOption, options.mergedParts,
+         "add up reports of --stats --format json, or databases into that of --sqlite, and do nothing "
+         "else")
+      ->type_name("PART");
 }
 
 void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
@@ -152,6 +163,11 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
                  "write a file per capture into this folder, which gets the tree of their names, instead of "
                  "standard output")
       ->type_name("DIR");
+  app.add_option(
+         databaseOption, options.databasePath,
+         "also add the captures to this database: what became of them, their counts, cells and values; "
+         "standard output gets only what another option asks for")
+      ->type_name("FILE");
   app.add_option("--report", options.reportPath, "also write what became of each capture, as a line of JSON")
       ->type_name("FILE");
   app.add_option("--format", wishes.format, "the form of the display; text unless given")
@@ -242,12 +258,14 @@ std::optional<std::string> conflictOfMany(const Options& options, const Wishes& 
   const std::pair<const char*, const std::optional<std::string>*> files[] = {
       {"--files-from", &options.listPath},
       {"--output", &options.outputFolder},
-      {"--report", &options.reportPath}};
+      {"--report", &options.reportPath},
+      {databaseOption, &options.databasePath}};
   for (const auto& [option, path] : files)
     if (*path && (*path)->empty()) return std::string(option) + ": the name of the file is empty";
   if (options.outputFolder && wishes.format == "none")
     return "--output has nothing to write with --format none";
-  if (options.isResuming && !options.outputFolder) return "--resume goes with --output";
+  if (options.isResuming && !options.outputFolder && !options.databasePath)
+    return "--resume goes with --output or --sqlite";
   return std::nullopt;
 }
 
@@ -276,8 +294,8 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
     return "--follow needs --every, --csv or --events, for all else is written at the end";
   if (wishes.isFollowing && !outputs.empty())
     return "--follow has no end, at which " + outputs.front().first + " is written; leave one of them out";
-  if (wishes.isFollowing && (options.outputFolder || options.reportPath))
-    return "--follow has no end, at which --output and --report are written; leave them out";
+  if (wishes.isFollowing && (options.outputFolder || options.reportPath || options.databasePath))
+    return "--follow has no end, at which --output, --report and --sqlite are written; leave them out";
   if (options.captures.size() < 2 && !options.listPath) return std::nullopt;
   if (wishes.isFollowing) return "--follow takes one capture at a time";
   if (format == "plist" && !options.outputFolder) return "--format plist takes one capture at a time";
@@ -314,8 +332,17 @@ Output outputFor(const Options& options, const Wishes& wishes) {
   return wishes.format == "json" ? Output::StatisticsJson : Output::StatisticsTable;
 }
 
+// An option that was given and means nothing when parts are merged.
+std::optional<std::string> optionBesideMerge(const CLI::App& app) {
+  for (const CLI::Option* option : app.get_options())
+    if (option->count() > 0 && !option->check_name(mergeOption) && !option->check_name(databaseOption))
+      return option->get_name();
+  return std::nullopt;
+}
+
 void fulfill(Options& options, const Wishes& wishes) {
-  const std::string format = wishes.format.empty() ? "text" : wishes.format;
+  const bool isForDatabaseAlone = options.databasePath && !options.outputFolder;
+  const std::string format = !wishes.format.empty() ? wishes.format : isForDatabaseAlone ? "none" : "text";
   options.output = outputFor(options, wishes);
   if (wishes.subscription) options.subscription = static_cast<std::uint8_t>(*wishes.subscription);
   if (wishes.isFollowing) options.atEnd = AtEndOfFile::WaitForMore;
@@ -328,7 +355,7 @@ void fulfill(Options& options, const Wishes& wishes) {
   if (wishes.isEvents) options.technology = technology::allRadios;
   const bool isForReading = (options.output == Output::Display && (format == "text" || format == "paths")) ||
                             options.output == Output::StatisticsTable ||
-                            (options.output == Output::Events && format == "text");
+                            (options.output == Output::Events && options.eventFormat == EventFormat::Text);
   if (!wishes.part.empty()) options.part = partNamed(wishes.part);
   options.areSeveral = options.captures.size() > 1 || options.listPath;
   options.namesEachCapture = options.sharesOutput() && isForReading;
@@ -360,6 +387,11 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
     return ExitStatus{app.exit(wish)};
   } catch (const CLI::ParseError& error) {
     return mistake(fileTakenForPath(options, wishes).value_or(error.what()));
+  }
+  if (!options.mergedParts.empty()) {
+    if (const auto other = optionBesideMerge(app))
+      return mistake(*other + " does not go with --merge, which takes only --sqlite");
+    return options;
   }
   if (const auto taken = fileTakenForPath(options, wishes)) return mistake(*taken);
   if (const auto found = conflict(options, wishes)) return mistake(*found);

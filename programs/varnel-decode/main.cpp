@@ -12,6 +12,7 @@
 #include "host/TerminateHandler.h"
 #include "programs/varnel-decode/InputDecoding.h"
 #include "programs/varnel-decode/ManyCaptures.h"
+#include "programs/varnel-decode/MergeParts.h"
 #include "programs/varnel-decode/Options.h"
 #include "programs/varnel-decode/OutputClash.h"
 #include "programs/varnel-decode/ProgramError.h"
@@ -51,6 +52,7 @@ int run(int argumentCount, char** arguments) {
   auto choice = readOptions(argumentCount, arguments, technologies, application.version.value_or("(none)"));
   if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
   auto& options = std::get<Options>(choice);
+  if (!options.mergedParts.empty()) return mergeParts(options.mergedParts, options.databasePath);
   if (!succeeds([&] { takeList(options); })) return generalError;
   if (const auto clash = outputClash(options)) return mistake(*clash).code;
   const Services services{templates, clock, application, nowhere, options.identities};
