@@ -62,11 +62,21 @@ std::string_view EntryFormats::Surroundings::unit() const {
 }
 
 std::string_view EntryFormats::unit() const {
-  if (!_formats) return {};
-  const std::string_view unit = _formats->front().unit();
-  const bool areAlike = std::ranges::all_of(
-      *_formats, [&](const Surroundings& surroundings) { return surroundings.unit() == unit; });
-  return areAlike ? unit : std::string_view();
+  return !_formats || haveSeveralUnits() ? std::string_view() : _formats->front().unit();
+}
+
+bool EntryFormats::haveSeveralUnits() const {
+  return _formats && std::ranges::any_of(*_formats, [this](const Surroundings& surroundings) {
+           return surroundings.unit() != _formats->front().unit();
+         });
+}
+
+std::string_view EntryFormats::unitOf(std::string_view value) const {
+  if (!haveSeveralUnits()) return unit();
+  const auto found = std::ranges::find_if(*_formats, [&](const Surroundings& surroundings) {
+    return !numberBetween(surroundings.before, surroundings.after, value).empty();
+  });
+  return found == _formats->end() ? std::string_view() : found->unit();
 }
 
 std::string_view EntryFormats::number(std::string_view value) const {

@@ -28,6 +28,11 @@ class EntryFormats {
   /// The unit of the values, such as "dBm". Empty when their formats name no unit, or different ones.
   std::string_view unit() const;
 
+  /// Whether the formats name different units, so that each value may have another one.
+  bool haveSeveralUnits() const;
+  /// The unit of this value.
+  std::string_view unitOf(std::string_view value) const;
+
   /// The number in a value, in decimal and without a leading plus. Empty when the value is no number: another
   /// text, a number that is not finite, or more digits than a 32-bit number has.
   std::string_view number(std::string_view value) const;

@@ -58,6 +58,7 @@ const std::unordered_map<std::string_view, Naming>& namings() {
       {"Cell ID", {Part::CellNumber, "Cell"}},
       {"Serving Cell", {Part::ServingCell, "Serving PCI"}},
       {"Bearer ID", {Part::Other, "Bearer"}},
+      {"Context ID", {Part::Other, "Context"}},
       {"Transport Channel ID", {Part::Other, "Transport Channel"}},
       {"TRCH ID", {Part::Other, "TrCH"}},
       {"CCTRCH ID", {Part::Other, "CCTrCH"}},

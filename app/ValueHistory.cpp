@@ -169,61 +169,70 @@ class ValueHistory::Walk {
       const auto* const withTime = dynamic_cast<const VarnelModelLeafNode*>(&leaf);
       if (withTime) writtenAt = stampOf(withTime->writtenAt());
     }
-    const std::size_t nameStart = _key.size() - leaf.displayName().size();
+    const Row row{leaf, _key.size() - leaf.displayName().size(), writtenAt};
+    if (visitRow(row, Key::Plain)) return;
     const std::size_t length = _key.size();
-    for (unsigned place = 1; place <= mostOfOneKey; ++place) {
-      if (place > 1) {
-        _key.resize(length);
-        _key.append(" (").append(std::to_string(place)).append(")");
-      }
-      if (visitFirst(leaf, nameStart, writtenAt)) break;
+    for (unsigned place = 2; place <= mostOfOneKey; ++place) {
+      _key.append(" (").append(std::to_string(place)).append(")");
+      const bool isDone = visitRow(row, Key::Plain);
+      _key.resize(length);
+      if (isDone) return;
     }
-    _key.resize(length);
   }
 
+  struct Row {
+    const VarnelModelNode& leaf;
+    std::size_t nameStart;  // in the key
+    Stamp writtenAt;
+  };
+  enum class Key { Plain, WithUnit };
+
   // False when an earlier row of this display has the key.
-  bool visitFirst(const VarnelModelNode& leaf, std::size_t nameStart, Stamp writtenAt) {
+  bool visitRow(const Row& row, Key kind) {
+    const std::string& text = *row.leaf.value();
     const auto found = _history._byKey.find(_key);
-    if (found == _history._byKey.end()) {
-      const EntryFormats formats = _history._formats.at(path()).formats;
-      const auto sample = StoredSample::ofNumber(formats.number(*leaf.value()));
-      if (!sample) return true;
-      const auto made = _history.makeSeries(_key, nameStart, leaf.displayName().size());
-      if (!made) return true;
-      setFormats(**made, formats);
-      keep(leaf, *made, *sample, writtenAt);
-      return true;
-    }
-    Series& series = *found->second;
-    if (series.lastGeneration == _history.newest()) return false;
-    if (series.formatsEdition != _history._formatsEdition)
-      setFormats(series, _history._formats.at(path()).formats);
-    if (const auto sample = StoredSample::ofNumber(series.formats.number(*leaf.value())))
-      keep(leaf, found->second, *sample, writtenAt);
+    const bool isKnown = found != _history._byKey.end();
+    if (isKnown && found->second->formatsEdition != _history._formatsEdition)
+      setFormats(*found->second, formats());
+    const EntryFormats formats = isKnown ? found->second->formats : this->formats();
+    if (kind == Key::Plain && formats.haveSeveralUnits()) return visitRowWithUnit(row, formats.unitOf(text));
+    if (isKnown && found->second->lastGeneration == _history.newest()) return false;
+    const auto sample = StoredSample::ofNumber(formats.number(text));
+    if (!sample) return true;
+    const auto series =
+        isKnown ? found->second : _history.makeSeries(_key, row.nameStart, row.leaf.displayName().size());
+    if (series == _history._series.end()) return true;
+    if (!isKnown) setFormats(*series, formats);
+    series->unit = formats.unitOf(text);
+    keep(row, series, *sample);
     return true;
+  }
+
+  bool visitRowWithUnit(const Row& row, std::string_view unit) {
+    const Part part(_key, " in ", unit.empty() ? "1" : unit);
+    return visitRow(row, Key::WithUnit);
+  }
+
+  EntryFormats formats() const {
+    std::vector<std::string> path;
+    path.reserve(_names.size());
+    for (const std::string* const name : _names) path.push_back(*name);
+    return _history._formats.at(path).formats;
   }
 
   void setFormats(Series& series, const EntryFormats& formats) const {
     series.formats = formats;
     series.formatsEdition = _history._formatsEdition;
-    series.unit = formats.unit();
   }
 
-  void keep(const VarnelModelNode& leaf, SeriesList::iterator series, StoredSample sample, Stamp writtenAt) {
+  void keep(const Row& row, SeriesList::iterator series, StoredSample sample) {
     const std::size_t count = series->samples.size();
     const bool isOther = count == 0 || series->samples[count - 1].digits != sample.digits ||
                          series->samples[count - 1].decimals != sample.decimals;
-    sample.isRenewed = isOther || (writtenAt != 0 && writtenAt != series->writtenAt);
-    series->writtenAt = writtenAt;
+    sample.isRenewed = isOther || (row.writtenAt != 0 && row.writtenAt != series->writtenAt);
+    series->writtenAt = row.writtenAt;
     _history.append(series, sample);
-    _history.addRow(leaf, series->number);
-  }
-
-  std::vector<std::string> path() const {
-    std::vector<std::string> names;
-    names.reserve(_names.size());
-    for (const std::string* const name : _names) names.push_back(*name);
-    return names;
+    _history.addRow(row.leaf, series->number);
   }
 
   ValueHistory& _history;
@@ -317,11 +326,11 @@ void ValueHistory::erase(SeriesList::iterator series) {
 }
 
 auto ValueHistory::makeSeries(const std::string& key, std::size_t nameStart, std::size_t nameLength)
-    -> std::optional<SeriesList::iterator> {
+    -> SeriesList::iterator {
   std::size_t bytesWanted = Series::bytesWithKey(key.size()) + ValueSeries().bytesOfOneMore();
   // Old and new buckets exist at the same time.
   if (_byKey.size() + 1 > _byKey.bucket_count()) bytesWanted += 2 * 3 * bytesOfBuckets(_byKey.bucket_count());
-  if (!makeRoom(bytesWanted)) return std::nullopt;
+  if (!makeRoom(bytesWanted)) return _series.end();
   const auto series = _series.insert(_series.end(), Series{.key = std::string(key),
                                                            .nameStart = nameStart,
                                                            .nameLength = nameLength,

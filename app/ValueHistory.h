@@ -25,7 +25,9 @@ namespace varnel {
 /// A series has a key. This is the path of its row, but a record of a list is named by what it is about
 /// instead of its place: "/LTE/Neighbors/Cells[EARFCN 1300, PCI 16]/RSRP" (`RecordIdentity`). Where several
 /// rows of a display have the same key, the second one gets " (2)" after its key, the third one " (3)", and
-/// so on. Records of a list that say nothing about their identity have no series, nor has a list of texts.
+/// so on. Where the values of one row may have different units, there is a series for each, with the unit in
+/// its key: " in dBm", and " in 1" without a unit. Records of a list that say nothing about their identity
+/// have no series, nor has a list of texts.
 ///
 /// The times of samples are on an axis that only goes forward. It follows the clock of the generations, but
 /// not when that clock was set: a step back, and a leap of more than a day, take no time on the axis.
@@ -144,9 +146,8 @@ class ValueHistory {
   /// The places in the series of the first sample of a stretch, and of the first one behind it.
   std::pair<std::size_t, std::size_t> placesOf(const Series& series, const Stretch& stretch) const;
 
-  /// Nothing when there is no room for it.
-  std::optional<SeriesList::iterator> makeSeries(const std::string& key, std::size_t nameStart,
-                                                 std::size_t nameLength);
+  /// The end of the list when there is no room for it.
+  SeriesList::iterator makeSeries(const std::string& key, std::size_t nameStart, std::size_t nameLength);
   void addRow(const VarnelModelNode& row, Number number);
   /// Keeps the sample, and less of the oldest ones when there is no room for it.
   void append(SeriesList::iterator series, StoredSample sample);

@@ -74,6 +74,22 @@ TEST(NumberFormats, OfSeveralTechnologiesAnEntryHasTheUnitThatAllShow) {
   EXPECT_EQ(one.unit(Path{"Set", "Power"}), "dB");
 }
 
+TEST(NumberFormats, OfAnEntryWithTwoUnitsEachValueHasItsOwn) {
+  NumberFormats formats;
+  formats.add("Neighbors", "RSSI", integer("%d dBm"));
+  formats.add("Neighbors", "RSSI", integer());
+  formats.add("Neighbors", "RSRP", integer("%d dBm"));
+  const EntryFormats level = formats.at(Path{"Neighbors", "RSSI"}).formats;
+  EXPECT_TRUE(level.haveSeveralUnits());
+  EXPECT_EQ(level.unitOf("-80 dBm"), "dBm");
+  EXPECT_EQ(level.unitOf("30"), "");
+  EXPECT_EQ(level.unitOf("none"), "");
+  const EntryFormats power = formats.at(Path{"Neighbors", "RSRP"}).formats;
+  EXPECT_FALSE(power.haveSeveralUnits());
+  EXPECT_EQ(power.unitOf("-80 dBm"), "dBm");
+  EXPECT_EQ(EntryFormats().unitOf("-80 dBm"), "");
+}
+
 TEST(NumberFormats, AnEntryWithTwoUnitsHasNone) {
   NumberFormats formats;
   formats.add("UMTS Set", "RSCP", integer("%d dB"));

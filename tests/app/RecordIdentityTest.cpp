@@ -105,6 +105,7 @@ TEST(RecordIdentity, OnlyTheRowsOfAnNRChannelBelongToItsServingCell) {
 
 TEST(RecordIdentity, OfOtherRecordsIsTheirOwnNumber) {
   EXPECT_EQ(textIn("Contexts", {{"Bearer ID", "5"}, {"State", "Active"}}), "Bearer 5");
+  EXPECT_EQ(textIn("PDP Context Info", {{"Context ID", "2"}, {"Bytes Sent", "1200"}}), "Context 2");
   EXPECT_EQ(textIn("Transport Channels", {{"Transport Channel ID", "2"}}), "Transport Channel 2");
   EXPECT_EQ(textIn("TRCH BLER", {{"TRCH ID", "2"}}), "TrCH 2");
   EXPECT_EQ(textIn("CCTRCH SIR", {{"CCTRCH ID", "2"}, {"TSNUM", "6"}}), "CCTrCH 2, Timeslot 6");

@@ -134,6 +134,26 @@ TEST_F(ValueHistoryTest, AnotherGeneratorHasOtherFormatsAndTheSeriesGoOn) {
   EXPECT_EQ(history.unit(number("/Cell/RSRP")), "asu");
 }
 
+TEST_F(ValueHistoryTest, ValuesOfDifferentUnitsAreNeverInOneSeries) {
+  NumberFormats formats;
+  formats.add("Cell", "RSSI", integer("%d dBm"));
+  formats.add("Cell", "RSSI", integer());
+  history.setFormats(formats);
+  const auto showLevelOf = [&](std::string_view text, std::int64_t second) {
+    show(dictionaryOf({{"Cell", dictionaryOf({{"RSSI", text}})}}), second);
+  };
+  showLevelOf("-80 dBm", 0);
+  showLevelOf("30", 2);
+  EXPECT_EQ(history.seriesOf(*paths.at("/Cell/RSSI")), number("/Cell/RSSI in 1"));
+  showLevelOf("-82 dBm", 4);
+  EXPECT_EQ(history.seriesOf(*paths.at("/Cell/RSSI")), number("/Cell/RSSI in dBm"));
+  EXPECT_THAT(course("/Cell/RSSI in dBm"), ElementsAre("|0:-80!", "|4:-82!"));
+  EXPECT_THAT(course("/Cell/RSSI in 1"), ElementsAre("|2:30!"));
+  EXPECT_EQ(history.unit(number("/Cell/RSSI in dBm")), "dBm");
+  EXPECT_EQ(history.unit(number("/Cell/RSSI in 1")), "");
+  EXPECT_EQ(history.name(number("/Cell/RSSI in dBm")), "RSSI");
+}
+
 TEST_F(ValueHistoryTest, AfterClearNothingIsLeft) {
   showLevel("-84.00 dBm", 0);
   history.clear();
