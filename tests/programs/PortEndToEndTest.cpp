@@ -13,6 +13,7 @@ namespace {
 
 using testing::ElementsAre;
 using testing::HasSubstr;
+using testing::IsSupersetOf;
 using testing::Not;
 using testing::StartsWith;
 
@@ -58,6 +59,12 @@ class PortEndToEnd : public testing::Test {
   std::vector<Bytes> lastThreeRequests() {
     const auto all = _modem.requests();
     return {all.end() - std::min<std::ptrdiff_t>(3, std::ssize(all)), all.end()};
+  }
+
+  // The requests that got an answer, if all others than this one do.
+  std::size_t answered() {
+    const auto all = _modem.requests();
+    return all.size() - static_cast<std::size_t>(std::ranges::count(all, debugTextOff));
   }
 
   TemporaryFolder _runtime, _folder;
@@ -116,6 +123,73 @@ TEST_F(PortEndToEnd, EveryRecordArrivesAndWhatIsNoneIsCounted) {
   EXPECT_THAT(telephony->error(), HasSubstr("\nvarnel-telephonyd: port: 2000 records, "));
   EXPECT_THAT(telephony->error(), HasSubstr("(10 with a wrong checksum, "));
   EXPECT_THAT(telephony->error(), HasSubstr(" of other commands, 10 encrypted)\n"));
+}
+
+// The modem has 1024 codes of LTE and NR, which are fewer than the viewer knows.
+TEST_F(PortEndToEnd, EachEquipmentGetsOneMaskAndCodesBeyondItsNumberAreLeftOutAndCounted) {
+  _modem.unplug();
+  _modem.equipments = {1, 4, 5, 7};
+  _modem.plugIn();
+  const auto telephony = server();
+  const auto varnel = viewer();
+  ASSERT_TRUE(eventually([&] { return _modem.isOn(0xB0C1); })) << telephony->error();
+  auto requests = _modem.requests();
+  ASSERT_GT(requests.size(), 6u);
+  requests.erase(requests.begin(), requests.begin() + 6);
+  std::vector<int> equipments;
+  for (const Bytes& request : requests) {
+    ASSERT_GT(request.size(), 16u);
+    EXPECT_EQ(Bytes(request.begin(), request.begin() + 8), (Bytes{0x73, 0, 0, 0, 3, 0, 0, 0}));
+    equipments.push_back(request[8]);
+    EXPECT_LE(request[12] + request[13] * 256, request[8] == 11 ? 0x400 : 0x1000);
+  }
+  EXPECT_THAT(equipments, IsSupersetOf({4, 5, 7, 11}));
+  EXPECT_TRUE(std::ranges::is_sorted(equipments));
+  EXPECT_THAT(std::ranges::adjacent_find(equipments), equipments.end());
+  EXPECT_TRUE(_modem.isOn(0x512F));
+  EXPECT_FALSE(_modem.isOn(0xB821));
+  EXPECT_THAT(telephony->error(), HasSubstr(" of the log codes that viewers ask for; they are left out\n"));
+}
+
+// A log comes before each answer. The last request for quiet gets none, so all that was sent before it has
+// been read when it comes.
+TEST_F(PortEndToEnd, EveryRecordArrivesAlsoBetweenAnswersAndBeforeAndAfterAnUnplugging) {
+  const Bytes log = logContents(0xB0C1, {1, 0x7E, 0x7D, 0x2A, 0x14, 0x10, 0, 2, 50});
+  _modem.unplug();
+  _modem.beforeAnswers = framed(log);
+  _modem.otherAnswers = {{debugTextOff, {}}};
+  _modem.plugIn();
+  const auto telephony = server();
+  auto varnel = viewer();
+  ASSERT_TRUE(eventually([&] { return _modem.isOn(0xB0C1); })) << telephony->error();
+  for (int i = 0; i < 1000; ++i) _modem.send(framed(log));
+  // A frame that breaks off, in which another one begins.
+  Bytes broken = framed(log);
+  broken.resize(9);
+  for (int i = 0; i < 10; ++i) {
+    _modem.send(broken);
+    _modem.send(framed(log));
+  }
+  ASSERT_TRUE(eventually([&] { return _modem.hasSentAll(); }));
+  varnel.reset();
+  ASSERT_TRUE(
+      eventually([&] { return lastThreeRequests().back() == debugTextOff && _modem.requests().size() > 6; }));
+  std::size_t answers = answered();
+  _modem.send(broken);
+  _modem.unplug();
+  ASSERT_TRUE(says(*telephony, " is unplugged; "));
+  _modem.plugIn();
+  ASSERT_TRUE(says(*telephony, " is back\n"));
+  varnel = viewer();
+  ASSERT_TRUE(eventually([&] { return _modem.isOn(0xB0C1); })) << telephony->error();
+  for (int i = 0; i < 500; ++i) _modem.send(framed(log));
+  ASSERT_TRUE(eventually([&] { return _modem.hasSentAll(); }));
+  telephony->signal(SIGTERM);
+  ASSERT_TRUE(telephony->waitForEnd());
+  answers += answered();
+  EXPECT_THAT(telephony->error(),
+              HasSubstr("\nvarnel-telephonyd: port: " + std::to_string(1500 + answers) + " records, "));
+  EXPECT_THAT(telephony->error(), HasSubstr("(10 with a wrong checksum"));
 }
 
 TEST_F(PortEndToEnd, AfterTheModemWasUnpluggedTheDisplayGoesOn) {

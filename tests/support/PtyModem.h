@@ -37,6 +37,7 @@ class PtyModem {
     _modem = {};
     _modem.otherAnswers = otherAnswers;
     _modem.beforeAnswers = beforeAnswers;
+    for (const std::uint8_t equipment : equipments) _modem.numbers[equipment] = 0x1000;
     _line = FileDescriptor(::posix_openpt(O_RDWR | O_NOCTTY | O_CLOEXEC | O_NONBLOCK));
     if (::grantpt(_line.number()) != 0 || ::unlockpt(_line.number()) != 0)
       ADD_FAILURE() << "no pseudo-terminal";
@@ -49,6 +50,7 @@ class PtyModem {
     if (_thread.joinable()) _thread.join();
     std::filesystem::remove(_link);
     _line = FileDescriptor();
+    _outgoing.clear();
   }
 
   const std::string& link() const { return _link; }
@@ -78,6 +80,8 @@ class PtyModem {
   /// For the script, from the next time on that the modem is plugged in.
   std::vector<std::pair<Bytes, Bytes>> otherAnswers;
   Bytes beforeAnswers;
+  /// Of which it has all log codes, besides those of the script.
+  std::vector<std::uint8_t> equipments;
   /// When there is one, it makes the answers in place of the script.
   std::function<Bytes(ByteView)> answer;
 

@@ -227,19 +227,19 @@ TEST_F(SimulatedPortTest, WhatIsNotTakenIsCounted) {
 }
 
 // Each technology that sends packets has only log codes of the equipments that the port tells, and its first
-// hour has some.
+// minutes have some.
 TEST_F(SimulatedPortTest, EveryTechnologysLogCodesCanBeSwitchedOn) {
   for (const std::string_view technology : simulatedTechnologies()) {
     if (technology == technology::ifxGSM) continue;
     const auto modem = simulatedModem(technology, 1);
     int packets = 0;
-    for (SimulatedMessage message = modem->next(); message.at < 1h; message = modem->next()) {
+    for (SimulatedMessage message = modem->next(); message.at < 5min; message = modem->next()) {
       const std::size_t begin = message.bytes.at(0) == 0x81 ? 2 : 0;
       if (message.bytes.at(begin) != 1) continue;
       ++packets;
       EXPECT_THAT(message.bytes.at(begin + 4) >> 4, testing::AnyOf(1, 4, 5, 7, 11, 13)) << technology;
     }
-    EXPECT_GT(packets, 1000) << technology;
+    EXPECT_GT(packets, 100) << technology;
   }
 }
 
