@@ -65,7 +65,7 @@ void ValueSeries::addBlock() {
 }
 
 void ValueSeries::reuseOldestBlock() {
-  std::ranges::rotate(_blocks, _blocks.begin() + 1);
+  std::rotate(_blocks.begin(), _blocks.begin() + 1, _blocks.end());
   _first = _used = 0;
 }
 
