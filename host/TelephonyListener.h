@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <filesystem>
 #include <functional>
 #include <memory>
@@ -30,6 +31,8 @@ class TelephonyListener final {
 
   /// Sends a notification to every open connection.
   void notifyAll();
+  /// How many connections are open.
+  std::size_t clients() const { return _clients.size(); }
 
  private:
   using Client = std::shared_ptr<SocketConnection>;

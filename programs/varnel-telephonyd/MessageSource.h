@@ -9,6 +9,7 @@
 
 #include "base/Bytes.h"
 #include "programs/varnel-telephonyd/CodeFilter.h"
+#include "programs/varnel-telephonyd/StreamPlace.h"
 
 namespace varnel {
 
@@ -37,6 +38,24 @@ class MessageSource {
   virtual std::string waitNote() const { return {}; }
   /// The name of the last message for log lines, such as "Record 17 of walk.pcap".
   virtual std::string nameOfLast() const { return "A message"; }
+
+  /// Where the stream is, by the last message that is done with. Absent for a live stream.
+  virtual std::optional<StreamPosition> position() const { return std::nullopt; }
+  /// Plays what comes after this time of the stream this many times as fast as at speed 1. Returns when the
+  /// message that `next` returned last is due now. Does nothing for a live stream.
+  virtual std::chrono::milliseconds setSpeed(double /*speed*/, std::chrono::milliseconds now) { return now; }
+  /// What `seek` did.
+  enum class Seeking {
+    GoesOn,      ///< the message that `next` returned last is due now
+    StartsOver,  ///< that message is no longer the next one; `next` begins at the start of the stream
+  };
+  /// Makes all messages before this place due at once, from the start of the stream if the place has been
+  /// passed. The first message at the place is the next one that is not. Does nothing for a live stream.
+  virtual Seeking seek(const StreamPlace& /*place*/, std::chrono::milliseconds /*now*/) {
+    return Seeking::GoesOn;
+  }
+  /// Whether the message that `next` returned last is due at once because it is before the place of a seek.
+  virtual bool isSeeking() const { return false; }
 
   /// What happens to a message when its receiver has no room at the time when it is due.
   enum class Lateness {

@@ -7,6 +7,7 @@
 #include <limits>
 #include <vector>
 
+#include "host/ControlProtocol.h"
 #include "host/FileIdentity.h"
 #include "host/Printable.h"
 #include "platform/TelephonyService.h"
@@ -18,7 +19,6 @@ namespace {
 
 constexpr const char* programName = "varnel-telephonyd";
 constexpr int usageError = 2;
-constexpr double slowest = 0.001, fastest = 1'000'000;
 
 void declare(CLI::App& app, Options& options, const std::string& version) {
   const auto simulated = simulatedTechnologies();
@@ -26,7 +26,8 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
 
   app.description(
       "Serves the log channel to viewers, from a modem's diagnostic port, from a simulated modem, or from a "
-      "capture. One of --port, --simulate, and --replay is needed. SIGINT and SIGTERM end it.");
+      "capture. One of --port, --simulate, and --replay is needed. SIGINT and SIGTERM end it. A "
+      "running server can be asked and told things: see \"varnel-telephonyd ctl --help\".");
   app.set_version_flag("--version", programName + (" " + version));
   auto* port =
       app.add_option("--port", options.portPath,
@@ -117,8 +118,7 @@ std::optional<std::string> conflict(const Options& options) {
     return "the modem of ifx-gsm sends no log packets, so it has no diagnostic port to play";
   if (!options.replayPath) return std::nullopt;
   if (const auto found = conflictOfPipe(options)) return found;
-  const bool isPlayable = options.speed >= slowest && options.speed <= fastest;  // false for NaN
-  if (!isPlayable) return "--speed must lie between 0.001 and 1000000";
+  if (!isPlayable(options.speed)) return "--speed must lie between 0.001 and 1000000";
   if (options.recordPath &&
       identityOfRecording(*options.recordPath).isSameFileAs(identityOfCapture(*options.replayPath)))
     return "--record would overwrite the capture that is to be replayed";

@@ -26,7 +26,23 @@ ReplayPace::Milliseconds ReplayPace::arriving(Time time, Milliseconds now) {
 
 ReplayPace::Milliseconds ReplayPace::startOver(Time time) {
   const auto pause = std::min(playingTime(std::chrono::seconds(1)), longestWait);
-  _last = _origin = {time, _last->at + pause};
+  return jump(time, _last->at + pause);
+}
+
+ReplayPace::Milliseconds ReplayPace::jump(Time time, Milliseconds at) {
+  _last = _origin = {time, at};
+  return at;
+}
+
+ReplayPace::Milliseconds ReplayPace::setSpeed(double speed, Milliseconds now) {
+  const double oldSpeed = std::exchange(_speed, speed);
+  if (!_last) return now;
+  if (_last->at > now) {
+    const std::chrono::duration<double, std::milli> wait = (_last->at - now) * (oldSpeed / speed);
+    const auto longest = std::chrono::duration<double, std::milli>(longestWait);
+    _last->at = now + std::chrono::round<Milliseconds>(std::min(wait, longest));
+  }
+  _origin = *_last;
   return _last->at;
 }
 

@@ -27,6 +27,10 @@ class ReplayPace {
   Milliseconds arriving(Time time, Milliseconds now);
   /// The same for the first record of a round.
   Milliseconds startOver(Time time);
+  /// Plays a record at this time, whatever its own. The records that follow keep their distances from it.
+  Milliseconds jump(Time time, Milliseconds at);
+  /// Changes the speed of everything after `now`. Returns when the last record is played.
+  Milliseconds setSpeed(double speed, Milliseconds now);
   /// Plays everything after this later.
   void delay(Milliseconds by);
 
@@ -45,7 +49,7 @@ class ReplayPace {
   Milliseconds playingTime(std::chrono::nanoseconds duration) const;
 
   const std::string _name;
-  const double _speed;
+  double _speed;
   std::optional<Moment> _last;  // absent before the first record
   Moment _origin{};             // from here the distances are measured
   bool _hasToldShortening = false;

@@ -81,6 +81,8 @@ void ServedChannel::start(CodeFilter filter) {
   if (_source) return _source->setFilter(_filter);
   _source = _host.makeSource();
   _startedAt = _host.uptime();
+  if (_pausedAt) _pausedAt = _startedAt;
+  if (_speed) _source->setSpeed(*_speed, 0ms);
   _source->setFilter(_filter);
   _source->setNewsHandler([this] {
     if (_next || !_ended) return;
@@ -93,12 +95,15 @@ void ServedChannel::start(CodeFilter filter) {
 
 void ServedChannel::sendWhatIsDue() {
   for (int count = 0; count < messagesAtATime; ++count) {
-    if (!_next) return;
-    const auto wait = _startedAt + _next->at - _host.uptime();
+    if (!_next || (_pausedAt && !_source->isSeeking())) return;
+    const auto wait = _next->at - streamTime();
     if (wait.count() > 0) return sendLater(wait);
     if (!std::exchange(_isReceived, true)) ++_counts.received;
     const Delivery delivery = deliver(_next->bytes);
-    if (delivery == Delivery::NoRoom) return sendLater(retryInterval);
+    if (delivery == Delivery::NoRoom) {
+      countLost(_source->takeLost());
+      return sendLater(retryInterval);
+    }
     if (delivery == Delivery::Ended) return end();
     takeNext();
   }
@@ -108,12 +113,16 @@ void ServedChannel::sendWhatIsDue() {
 void ServedChannel::takeNext() {
   _isReceived = false;
   const bool isEndTold = _source->isEndTold();
+  const bool wasSeeking = _source->isSeeking();
   _next = _source->next();
+  // The stream goes on from here now, however long the seek has taken.
+  if (wasSeeking && !_source->isSeeking() && _next) _startedAt = clock() - _next->at;
   countLost(_source->takeLost());
   noteWait();
   if (_next || _source->isWaiting()) return;
   const std::string sentence = _source->endNote();
   if (sentence.empty()) return;
+  _endNote = sentence;
   note(sentence);
   if (!isEndTold) _host.tell(sentence);
 }
@@ -127,9 +136,58 @@ void ServedChannel::noteWait() {
 
 void ServedChannel::sendLater(std::chrono::milliseconds delay) {
   if (!_next) return;
-  _host.queue.after(delay, [weak = weak_from_this()] {
-    if (const auto channel = weak.lock()) channel->sendWhatIsDue();
+  _host.queue.after(delay, [weak = weak_from_this(), turn = ++_turn] {
+    const auto channel = weak.lock();
+    if (channel && channel->_turn == turn) channel->sendWhatIsDue();
   });
+}
+
+void ServedChannel::pause() {
+  if (!_pausedAt) _pausedAt = _host.uptime();
+}
+
+void ServedChannel::goOn() {
+  if (!_pausedAt) return;
+  _startedAt += _host.uptime() - *std::exchange(_pausedAt, std::nullopt);
+  _withoutRoomSince.reset();
+  sendLater(0ms);
+}
+
+void ServedChannel::setSpeed(double speed) {
+  _speed = speed;
+  if (!_source) return;
+  const auto due = _source->setSpeed(speed, streamTime());
+  if (_next) _next->at = due;
+  sendLater(0ms);
+}
+
+void ServedChannel::seek(const StreamPlace& place) {
+  if (!_source) return;
+  const auto now = streamTime();
+  const auto seeking = _source->seek(place, now);
+  if (_report.note == std::exchange(_endNote, {})) note("");
+  if (seeking == MessageSource::Seeking::StartsOver) {
+    // A message that has waited for room until now is left out.
+    if (_next && _isReceived) ++_counts.dropped;
+    takeNext();
+  } else if (_next) {
+    _next->at = now;
+  }
+  sendLater(0ms);
+}
+
+std::optional<StreamPosition> ServedChannel::position() const {
+  return _source ? _source->position() : std::nullopt;
+}
+
+MessageCounts ServedChannel::counts() const {
+  MessageCounts counts = _counts;
+  if (!_ended) return counts;
+  if (_next && _isReceived) ++counts.waiting;
+  if (!_source) return counts;
+  counts.received += _source->waiting();
+  counts.waiting += _source->waiting();
+  return counts;
 }
 
 ServedChannel::Delivery ServedChannel::deliver(ByteView message) {
@@ -157,6 +215,7 @@ ServedChannel::Delivery ServedChannel::waitForRoom() {
     logError("A viewer that does not read is dropped");
     return Delivery::Ended;
   }
+  if (_source->isSeeking()) return Delivery::NoRoom;
   const bool isLate = now - (_startedAt + _next->at) > longestDelay;
   if (!isLate || _source->lateness() != MessageSource::Lateness::IsDropped) return Delivery::NoRoom;
   ++_counts.dropped;

@@ -53,10 +53,25 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
 
   /// Sends this sentence to the viewer with the next report.
   void note(const std::string& sentence) { _report.note = sentence; }
-  const MessageCounts& counts() const { return _counts; }
+  MessageCounts counts() const;
+
+  /// Sends nothing until `goOn`, but for what a seek sends. Not for a live stream.
+  void pause();
+  void goOn();
+  /// Plays a stream that is not live this many times as fast as at speed 1.
+  void setSpeed(double speed);
+  /// Sends all messages before this place at once, from the start of the stream if the place was passed. Does
+  /// nothing before the stream is started, and for a live stream.
+  void seek(const StreamPlace& place);
+  /// Where the stream is; absent before it is started, and for a live stream.
+  std::optional<StreamPosition> position() const;
 
  private:
   enum class Delivery { Done, NoRoom, Ended };
+
+  // The time of the stream stands still during a pause.
+  std::chrono::milliseconds clock() const { return _pausedAt ? *_pausedAt : _host.uptime(); }
+  std::chrono::milliseconds streamTime() const { return clock() - _startedAt; }
 
   std::optional<Bytes> takeCommand(ByteView data);
   void start(CodeFilter filter);
@@ -77,16 +92,20 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   std::function<void()> _ended;  // empty once it was called
 
   CodeFilter _filter;
-  std::unique_ptr<MessageSource> _source;  // null until the stream is started
-  std::chrono::milliseconds _startedAt{0};
+  std::unique_ptr<MessageSource> _source;   // null until the stream is started
+  std::optional<double> _speed;             // absent until one was set
+  std::chrono::milliseconds _startedAt{0};  // the start of the stream; pauses and seeks move it
+  std::optional<std::chrono::milliseconds> _pausedAt;
+  std::uint64_t _turn = 0;  // the newest call that `sendLater` has put off
   std::optional<StreamMessage> _next;
   std::optional<std::chrono::milliseconds> _withoutRoomSince;
 
   bool _hasCommand = false;  // true once a command was understood
   bool _isReceived = false;  // true once the next message was due, and counted
-  MessageCounts _counts;
-  std::string _waitNote;  // of the source, as it was last
-  StreamReport _report;   // without the numbers
+  MessageCounts _counts;     // without those that wait in the source
+  std::string _waitNote;     // of the source, as it was last
+  std::string _endNote;      // of the source, that was sent last
+  StreamReport _report;      // without the numbers
   StreamReport _sentReport;
 };
 

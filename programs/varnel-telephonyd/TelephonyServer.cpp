@@ -45,6 +45,8 @@ TelephonyConnection::LogChannel TelephonyServer::createLogChannel(std::string_vi
     return {protocol::commandPortNotMade, std::nullopt};
   }
   channel->note(_note);
+  if (_isPaused) channel->pause();
+  if (_speed) channel->setSpeed(*_speed);
   _channels.emplace(number, channel);
   logLine(logNoticePriority, "A log channel to port \"%s\" is open", viewerPortName);
   return {0, portName};
@@ -58,7 +60,7 @@ unsigned TelephonyServer::freeNumber() const {
 
 void TelephonyServer::close(unsigned number) {
   const auto ended = _channels.extract(number);
-  const MessageCounts& counts = ended.mapped()->counts();
+  const MessageCounts counts = ended.mapped()->counts();
   _endedCounts += counts;
   logLine(logNoticePriority, "A log channel is closed: %s", inWords(counts));
 }
@@ -71,6 +73,36 @@ void TelephonyServer::end() {
 void TelephonyServer::note(const std::string& sentence) {
   _note = sentence;
   for (const auto& [number, channel] : _channels) channel->note(sentence);
+}
+
+void TelephonyServer::pause() {
+  _isPaused = true;
+  for (const auto& [number, channel] : _channels) channel->pause();
+}
+
+void TelephonyServer::goOn() {
+  _isPaused = false;
+  for (const auto& [number, channel] : _channels) channel->goOn();
+}
+
+void TelephonyServer::setSpeed(double speed) {
+  _speed = speed;
+  for (const auto& [number, channel] : _channels) channel->setSpeed(speed);
+}
+
+void TelephonyServer::seek(const StreamPlace& place) {
+  for (const auto& [number, channel] : _channels) channel->seek(place);
+}
+
+void TelephonyServer::changeTechnology(const std::string& technology) {
+  _host.technology = technology;
+  end();
+}
+
+std::optional<StreamPosition> TelephonyServer::position() const {
+  for (const auto& [number, channel] : _channels)
+    if (const auto position = channel->position()) return position;
+  return std::nullopt;
 }
 
 MessageCounts TelephonyServer::counts() const {

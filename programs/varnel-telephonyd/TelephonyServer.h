@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -28,6 +29,21 @@ class TelephonyServer {
   /// Ends every channel.
   void end();
 
+  /// Stops all streams where they are; those that begin later wait at their start.
+  void pause();
+  void goOn();
+  bool isPaused() const { return _isPaused; }
+  /// Plays all streams this many times as fast as at speed 1, also those that begin later.
+  void setSpeed(double speed);
+  /// Moves all streams to this place. Those that begin later begin at their start.
+  void seek(const StreamPlace& place);
+  /// Tells viewers another technology, and ends every channel, so that the viewers come back and ask for the
+  /// technology.
+  void changeTechnology(const std::string& technology);
+  const std::string& technology() const { return _host.technology; }
+  /// Where the stream of the oldest channel is; absent without one.
+  std::optional<StreamPosition> position() const;
+
   std::size_t channels() const { return _channels.size(); }
   /// The sums over all channels, including those that have ended.
   MessageCounts counts() const;
@@ -38,9 +54,11 @@ class TelephonyServer {
   void checkViewers();
   void tellLosses();
 
-  const ChannelHost _host;
+  ChannelHost _host;
   std::map<unsigned, std::shared_ptr<ServedChannel>> _channels;  // by the number in the name of their port
   MessageCounts _endedCounts;                                    // of channels that have ended
+  bool _isPaused = false;
+  std::optional<double> _speed;  // absent until one was set
   std::string _note;
   std::uint64_t _toldLosses = 0;
   std::chrono::milliseconds _lossesToldAt{0};

@@ -20,11 +20,15 @@
 #include "host/TerminateHandler.h"
 #include "host/captures/Capture.h"
 #include "platform/TelephonyService.h"
+#include "programs/varnel-telephonyd/CaptureSurvey.h"
+#include "programs/varnel-telephonyd/ControlListener.h"
+#include "programs/varnel-telephonyd/ControlProgram.h"
 #include "programs/varnel-telephonyd/Options.h"
 #include "programs/varnel-telephonyd/PipeReader.h"
 #include "programs/varnel-telephonyd/PipedReplay.h"
 #include "programs/varnel-telephonyd/Recorder.h"
 #include "programs/varnel-telephonyd/ReplaySource.h"
+#include "programs/varnel-telephonyd/ServerControls.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "programs/varnel-telephonyd/TelephonyServer.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
@@ -79,7 +83,10 @@ std::chrono::milliseconds uptime() {
 
 std::unique_ptr<MessageSource> makeSource(const Options& options, Unasked unasked) {
   if (options.simulatedTechnology) {
-    return std::make_unique<SimulationSource>(simulatedModem(*options.simulatedTechnology, options.seed));
+    return std::make_unique<SimulationSource>(
+        [technology = *options.simulatedTechnology, seed = options.seed] {
+          return simulatedModem(technology, seed);
+        });
   }
   const auto atEnd = options.loops ? ReplaySource::AtEnd::StartOver : ReplaySource::AtEnd::Stop;
   return std::make_unique<ReplaySource>(*options.replayPath, options.speed, atEnd, options.subscription,
@@ -186,11 +193,24 @@ void end(HostApplication& application, LivePort* port) {
   port->end([&application] { application.end(0); });
 }
 
+ServedSource servedSource(const Options& options) {
+  if (options.portPath) return ServedSource::Port;
+  if (options.simulatedTechnology) return ServedSource::Simulation;
+  return options.replayPath == "-" ? ServedSource::StandardInput : ServedSource::Capture;
+}
+
+// What is read ahead of a capture, if one is replayed, to know how long it plays.
+std::unique_ptr<CaptureSurvey> makeSurvey(const Options& options, MainQueue& queue, Unasked unasked) {
+  if (servedSource(options) != ServedSource::Capture) return nullptr;
+  return std::make_unique<CaptureSurvey>(queue, *options.replayPath, options.subscription, unasked);
+}
+
 int serve(int& argumentCount, char** arguments, const Options& options) {
   // A capture that cannot be replayed is reported now, not when the first viewer comes.
   std::unique_ptr<PipeReader> reader = makePipeReader(options);
   const std::string technology = technologyOf(options, reader.get());
-  const Unasked unasked = unaskedOf(technology);
+  Unasked unasked = unaskedOf(technology);
+  Options served = options;  // with the technology of now
 
   raiseDescriptorLimit(mostFiles);
   HostApplication application(argumentCount, arguments);
@@ -214,7 +234,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   }
   const auto makeAnySource = [&] {
     if (livePort) return livePort->makeSource();
-    return pipedReplay ? pipedReplay->makeSource() : makeSource(options, unasked);
+    return pipedReplay ? pipedReplay->makeSource() : makeSource(served, unasked);
   };
   std::unique_ptr<Recorder> recorder;
   TelephonyServer server({.ports = ports,
@@ -229,6 +249,28 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
                           .tell = tell});
   const TelephonyListener listener(
       folder, [&](std::string_view viewerPortName) { return server.createLogChannel(viewerPortName); });
+  std::unique_ptr<CaptureSurvey> survey = makeSurvey(options, queue, unasked);
+  ServerControls controls(
+      {.server = server,
+       .source = servedSource(options),
+       .name = livePort ? livePort->name() : options.replayPath.value_or(""),
+       .speed = options.speed,
+       .recording = options.recordPath,
+       .clients = [&] { return listener.clients(); },
+       .leftOutOfPort = livePort ? [&] { return livePort->leftOut(); } : std::function<LeftOut()>(),
+       .survey = [&] { return survey ? survey->result() : std::nullopt; },
+       .useTechnology =
+           [&](const std::string& chosen) {
+             if (served.simulatedTechnology) served.simulatedTechnology = chosen;
+             unasked = unaskedOf(chosen);
+             survey = makeSurvey(options, queue, unasked);
+             tell("serving " + chosen + " from now on");
+           },
+       // Later: the reply comes first.
+       .stop =
+           [&] { queue.after(std::chrono::milliseconds(0), [&] { end(application, livePort.get()); }); }});
+  const ControlListener controlListener(
+      folder, [&](const ControlRequest& request) { return controls.reply(request); });
   recorder = makeRecorder(options, queue, server, technology);
   if (livePort) {
     livePort->open();
@@ -269,7 +311,9 @@ int playPort(int& argumentCount, char** arguments, const Options& options) {
 }
 
 int run(int argumentCount, char** arguments) {
-  const auto choice = readOptions(argumentCount, arguments, applicationInfo().version.value_or("(none)"));
+  const std::string version = applicationInfo().version.value_or("(none)");
+  if (isControlCommand(argumentCount, arguments)) return runControlCommand(argumentCount, arguments, version);
+  const auto choice = readOptions(argumentCount, arguments, version);
   if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
   try {
     const auto& options = std::get<Options>(choice);

@@ -2,7 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "host/CaptureWriter.h"
@@ -374,7 +376,7 @@ TEST_F(TelephonyServerTest, AMessageInHandWhenTheViewerGoesIsDropped) {
   takeOnlyWhile(hasRoom);
   _ports.deliver(channel(), 0, startEverything);
   _queue.advance(200ms);
-  EXPECT_EQ(_server.counts(), (MessageCounts{.received = 1}));
+  EXPECT_EQ(_server.counts(), (MessageCounts{.received = 1, .waiting = 1}));
   _server.end();
   EXPECT_EQ(_server.counts(), (MessageCounts{.received = 1, .dropped = 1}));
   EXPECT_EQ(_server.channels(), 0u);
@@ -479,6 +481,311 @@ TEST_F(TelephonyServerTest, AFloodIsCountedToTheLastMessage) {
   EXPECT_EQ(_reports.back(), (StreamReport{"", 79'000, 0}));
 }
 
+// A live source: what the viewer has not taken waits in it, and some of it is lost there.
+class QueueSource final : public MessageSource {
+ public:
+  struct Queue {
+    std::size_t waiting = 0;
+    std::uint64_t lost = 0;
+    std::function<void()> news;
+  };
+  explicit QueueSource(Queue& queue) : _queue(queue) {}
+
+  std::optional<StreamMessage> next() override {
+    if (_queue.waiting == 0) return std::nullopt;
+    const std::uint8_t code = _queue.waiting-- % 10 == 0 ? 2 : 1;
+    return StreamMessage{0ms, modemPacket(code)};
+  }
+  bool isWaiting() const override { return true; }
+  void setNewsHandler(std::function<void()> handler) override { _queue.news = std::move(handler); }
+  Lateness lateness() const override { return Lateness::Waits; }
+  std::uint64_t takeLost() override { return std::exchange(_queue.lost, 0); }
+  std::size_t waiting() const override { return _queue.waiting; }
+
+ private:
+  Queue& _queue;
+};
+
+// A thousand times a thousand messages for a viewer that reads now and then: each tenth message has a code
+// that it has not asked for, and each thousand loses a hundred before they reach the channel.
+TEST_F(TelephonyServerTest, OfAMillionMessagesEachIsDeliveredWaitingDroppedOrRefusedAtAnyTime) {
+  QueueSource::Queue source;
+  TelephonyServer server{{.ports = _ports,
+                          .queue = _queue,
+                          .uptime = [this] { return _queue.now(); },
+                          .technology = "kalvi-lte",
+                          .makeSource = [&source] { return std::make_unique<QueueSource>(source); },
+                          .messageSent = [](ByteView) {},
+                          .tell = [](const std::string&) {}}};
+  bool hasRoom = true;
+  std::uint64_t taken = 0;
+  _ports.answer = [&](const MemoryPorts::Request& request) {
+    if (hasRoom && request.identifier == 0) ++taken;
+    return RemotePort::SendResult{hasRoom ? 0 : RemotePort::sendTimeout, std::nullopt};
+  };
+  _ports.deliver(server.createLogChannel("viewer").portName.value(), 0,
+                 startWith("<integer>1</integer>", ""));
+  std::uint64_t mostWaiting = 0;
+  for (int round = 1; round <= 1000; ++round) {
+    hasRoom = round % 5 != 0;
+    source.waiting += 900;
+    source.lost += 100;
+    source.news();
+    for (int step = 0; step < 3; ++step) {
+      _queue.advance(10ms);
+      const MessageCounts counts = server.counts();
+      ASSERT_EQ(counts.received, counts.delivered + counts.waiting + counts.dropped + counts.refused());
+      ASSERT_EQ(counts.delivered, taken);
+      mostWaiting = std::max(mostWaiting, counts.waiting);
+    }
+    _ports.requests.clear();
+  }
+  hasRoom = true;
+  _queue.advance(1s);
+  EXPECT_EQ(server.counts(),
+            (MessageCounts{
+                .received = 1'000'000, .delivered = 810'000, .dropped = 100'000, .notAskedFor = 90'000}));
+  EXPECT_EQ(mostWaiting, 899u);
+  EXPECT_EQ(server.channels(), 1u);
+}
+
+// A capture of ten seconds with a message per second; the time is in the message.
+class ReplayedStreamTest : public TelephonyServerTest {
+ protected:
+  ReplayedStreamTest() {
+    CaptureWriter writer(_path);
+    for (std::uint8_t second = 0; second <= 10; ++second)
+      writer.write({1000 + second, 0}, modemPacket(second));
+  }
+
+  std::string start(ReplaySource::AtEnd atEnd = ReplaySource::AtEnd::Stop) {
+    _atEnd = atEnd;
+    const std::string port = _replay.createLogChannel("viewer").portName.value();
+    _ports.deliver(port, 0, startEverything);
+    _queue.run();
+    return port;
+  }
+  // The seconds of the messages that were sent since the last call.
+  std::vector<int> seconds() {
+    std::vector<int> seconds;
+    for (const Bytes& message : sent()) seconds.push_back(message.at(3));
+    return seconds;
+  }
+  std::chrono::milliseconds position() const { return _replay.position().value().sinceStart; }
+
+  TemporaryFolder _folder;
+  const std::string _path = _folder.file("walk.pcap");
+  ReplaySource::AtEnd _atEnd = ReplaySource::AtEnd::Stop;
+  TelephonyServer _replay{{.ports = _ports,
+                           .queue = _queue,
+                           .uptime = [this] { return _queue.now(); },
+                           .technology = "kalvi-lte",
+                           .makeSource = [this] { return std::make_unique<ReplaySource>(_path, 1, _atEnd); },
+                           .messageSent = [](ByteView) {},
+                           .tell = [this](const std::string& sentence) { _told.push_back(sentence); }}};
+};
+
+using Seconds = std::vector<int>;
+
+TEST_F(ReplayedStreamTest, ASeekForwardSendsWhatLiesBetweenAtOnceAndGoesOnFromThere) {
+  start();
+  _queue.advance(1500ms);
+  EXPECT_EQ(seconds(), (Seconds{0, 1}));
+  _replay.seek(6s);
+  _queue.run();
+  EXPECT_EQ(seconds(), (Seconds{2, 3, 4, 5, 6}));
+  EXPECT_EQ(position(), 6s);
+  _queue.advance(999ms);
+  EXPECT_EQ(seconds(), Seconds());
+  _queue.advance(1ms);
+  EXPECT_EQ(seconds(), (Seconds{7}));
+}
+
+TEST_F(ReplayedStreamTest, ASeekBackwardStartsOverAtFullSpeed) {
+  start();
+  _queue.advance(7s);
+  EXPECT_EQ(seconds(), (Seconds{0, 1, 2, 3, 4, 5, 6, 7}));
+  _replay.seek(2500ms);
+  _queue.run();
+  EXPECT_EQ(seconds(), (Seconds{0, 1, 2, 3}));
+  _queue.advance(1s);
+  EXPECT_EQ(seconds(), (Seconds{4}));
+  EXPECT_EQ(_replay.channels(), 1u);
+}
+
+TEST_F(ReplayedStreamTest, ASeekToATimeGoesByTheClockOfTheCapture) {
+  start();
+  _replay.seek(Time{1008, 0});
+  _queue.run();
+  EXPECT_EQ(seconds(), (Seconds{0, 1, 2, 3, 4, 5, 6, 7, 8}));
+  _replay.seek(Time{1001, 500'000'000});
+  _queue.run();
+  EXPECT_EQ(seconds(), (Seconds{0, 1, 2}));
+  EXPECT_EQ(_replay.position(), (StreamPosition{2s, Time{1002, 0}}));
+}
+
+TEST_F(ReplayedStreamTest, ASeekToTheMessageThatIsNextSendsItAtOnce) {
+  start();
+  _queue.advance(100ms);
+  seconds();
+  _replay.seek(1s);
+  _queue.run();
+  EXPECT_EQ(seconds(), (Seconds{1}));
+  _queue.advance(1s);
+  EXPECT_EQ(seconds(), (Seconds{2}));
+}
+
+TEST_F(ReplayedStreamTest, ASeekBehindTheEndEndsTheReplayAndASeekBackPlaysItAgain) {
+  start();
+  _replay.seek(1h);
+  _queue.advance(2s);
+  EXPECT_EQ(seconds().size(), 11u);
+  EXPECT_EQ(_reports.back().note, "the replay of " + _path + " has ended");
+  _replay.seek(9s);
+  _queue.advance(1s);
+  EXPECT_EQ(seconds(), (Seconds{0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10}));
+  _replay.seek(0s);
+  _queue.advance(1s);
+  EXPECT_EQ(seconds(), (Seconds{0, 1}));
+  EXPECT_EQ(_reports.back().note, "");
+}
+
+TEST_F(ReplayedStreamTest, ASeekThatALoopNeverReachesEndsWithTheRound) {
+  start(ReplaySource::AtEnd::StartOver);
+  _replay.seek(1h);
+  _queue.run();
+  EXPECT_EQ(seconds(), (Seconds{0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 0}));
+  _queue.advance(1s);
+  EXPECT_EQ(seconds(), (Seconds{1}));
+}
+
+TEST_F(ReplayedStreamTest, APauseStopsTheStreamAndGoingOnKeepsTheDistances) {
+  start();
+  _queue.advance(1500ms);
+  _replay.pause();
+  seconds();
+  _queue.advance(1h);
+  EXPECT_EQ(seconds(), Seconds());
+  EXPECT_TRUE(_replay.isPaused());
+  _replay.goOn();
+  _queue.advance(499ms);
+  EXPECT_EQ(seconds(), Seconds());
+  _queue.advance(1ms);
+  EXPECT_EQ(seconds(), (Seconds{2}));
+  EXPECT_EQ(_replay.counts(), (MessageCounts{.received = 3, .delivered = 3}));
+}
+
+TEST_F(ReplayedStreamTest, ASeekDuringAPauseSendsWhatIsBeforeThePlaceAndStaysThere) {
+  start();
+  _replay.pause();
+  seconds();
+  _replay.seek(3s);
+  _queue.advance(1min);
+  EXPECT_EQ(seconds(), (Seconds{1, 2}));
+  _replay.seek(1s);
+  _queue.advance(1min);
+  EXPECT_EQ(seconds(), (Seconds{0}));
+  _replay.goOn();
+  _queue.advance(1s);
+  EXPECT_EQ(seconds(), (Seconds{1, 2}));
+}
+
+TEST_F(ReplayedStreamTest, AStreamThatBeginsDuringAPauseWaitsAtItsStart) {
+  _replay.pause();
+  start();
+  _queue.advance(1min);
+  EXPECT_EQ(seconds(), Seconds());
+  _replay.goOn();
+  _queue.advance(1s);
+  EXPECT_EQ(seconds(), (Seconds{0, 1}));
+}
+
+TEST_F(ReplayedStreamTest, ANewSpeedCountsFromNowOn) {
+  start();
+  _queue.advance(1500ms);
+  seconds();
+  _replay.setSpeed(4);
+  _queue.advance(124ms);
+  EXPECT_EQ(seconds(), Seconds());
+  _queue.advance(1ms);
+  EXPECT_EQ(seconds(), (Seconds{2}));
+  _queue.advance(500ms);
+  EXPECT_EQ(seconds(), (Seconds{3, 4}));
+  _replay.setSpeed(0.001);
+  _queue.advance(4999ms);
+  EXPECT_EQ(seconds(), Seconds());
+  _queue.advance(1ms);  // no wait is longer than five seconds
+  EXPECT_EQ(seconds(), (Seconds{5}));
+  EXPECT_EQ(position(), 5s);
+}
+
+TEST_F(ReplayedStreamTest, AChangeOfTechnologyEndsTheChannelsAndThoseThatComeBackAreTold) {
+  start();
+  seconds();
+  _replay.changeTechnology("all-radios");
+  EXPECT_EQ(_replay.channels(), 0u);
+  const std::string port = _replay.createLogChannel("viewer").portName.value();
+  const auto reply = _ports.deliver(port, 0, technologyRequest).value();
+  EXPECT_NE(std::string(reply.begin(), reply.end()).find("<string>all-radios</string>"), std::string::npos);
+  _ports.deliver(port, 0, startEverything);
+  _queue.advance(1s);
+  EXPECT_EQ(seconds(), (Seconds{0, 1}));
+}
+
+TEST_F(ReplayedStreamTest, AViewerWithoutRoomDuringASeekLosesNothing) {
+  start();
+  bool hasRoom = false;
+  takeOnlyWhile(hasRoom);
+  seconds();
+  _replay.seek(5s);
+  _queue.advance(3s);
+  _ports.requests.clear();
+  hasRoom = true;
+  _queue.advance(20ms);
+  EXPECT_EQ(seconds(), (Seconds{1, 2, 3, 4, 5}));
+  _queue.advance(1s);
+  EXPECT_EQ(seconds(), (Seconds{6}));
+}
+
+TEST_F(TelephonyServerTest, ASimulationCanBePausedPlayedFasterAndPlayedAgain) {
+  TelephonyServer server{
+      {.ports = _ports,
+       .queue = _queue,
+       .uptime = [this] { return _queue.now(); },
+       .technology = "kalvi-lte",
+       .makeSource =
+           [] { return std::make_unique<SimulationSource>([] { return simulatedModem("kalvi-lte", 1); }); },
+       .messageSent = [](ByteView) {},
+       .tell = [](const std::string&) {}}};
+  Sent expected;
+  std::size_t inTen = 0;
+  const auto modem = simulatedModem("kalvi-lte", 1);
+  for (SimulatedMessage next = modem->next(); next.at <= 40s; next = modem->next()) {
+    expected.push_back(next.bytes);
+    if (next.at <= 10s) ++inTen;
+  }
+  _ports.deliver(server.createLogChannel("viewer").portName.value(), 0, startEverything);
+  _queue.advance(10s);
+  EXPECT_EQ(sent().size(), inTen);
+  server.pause();
+  _queue.advance(1min);
+  EXPECT_EQ(sent(), Sent());
+  server.goOn();
+  server.setSpeed(10);
+  _queue.advance(3s);
+  EXPECT_EQ(sent().size(), expected.size() - inTen);
+  EXPECT_EQ(server.counts().dropped, 0u);
+  server.setSpeed(1);
+  server.seek(40s);  // what was played last is not behind it
+  server.seek(10s);
+  _queue.run();
+  const Sent again = sent();
+  ASSERT_GE(again.size(), inTen);
+  EXPECT_TRUE(
+      std::equal(again.begin(), again.begin() + static_cast<std::ptrdiff_t>(inTen), expected.begin()));
+  EXPECT_GE(server.position().value().sinceStart, 10s);
+}
+
 struct SimulatedStream {
   const char* technology;
   Bytes start;                 // the viewer's command
@@ -518,7 +825,7 @@ class SimulatedStreamTest : public testing::TestWithParam<SimulatedStream> {
     return sent;
   }
   static std::unique_ptr<MessageSource> simulation() {
-    return std::make_unique<SimulationSource>(simulatedModem(GetParam().technology, 1));
+    return std::make_unique<SimulationSource>([] { return simulatedModem(GetParam().technology, 1); });
   }
 
   MemoryPorts _ports;
