@@ -38,7 +38,8 @@ void VarnelApp::applicationDidFinishLaunching() {
   setUpdateMessage(std::string(notConnectedStatus));
   _dateFormatter.emplace(updateStatusPattern);
 
-  const auto root = std::make_shared<VarnelPaneController>(_host.userInterface, *this, nullptr, "/");
+  const auto root =
+      std::make_shared<VarnelPaneController>(_host.userInterface, *this, nullptr, "/", &_changes);
   showFirstStatus(*root);
   _navController = _host.userInterface.makeNavigationStack(root);
   _navController->setDelegate(this);
@@ -65,6 +66,7 @@ void VarnelApp::startOver() {
   _notices.begin(*_model);
   const auto root = _navController->controllers().front();
   _navController->popTo(*root, Animation::None);
+  showTree(nullptr);
   varnelPane(*root).reloadWithNode(nullptr);
   showFirstStatus(varnelPane(*root));
   showNotice();
@@ -146,9 +148,10 @@ void VarnelApp::showWindowTitle() {
 
 void VarnelApp::reloadPanes() {
   const auto panes = _navController->controllers();
+  showTree(_model->topLevelNodes());
   for (std::size_t i = 0; i < panes.size(); ++i) {
     VarnelPaneController& pane = varnelPane(*panes[i]);
-    const auto node = i == 0 ? _model->topLevelNodes() : _model->nodeAtPath(pane.path());
+    const auto node = i == 0 ? _tree : _model->nodeAtPath(pane.path());
     if (i > 0 && !node) {
       // Kept: this pane and those above it leave without showing the new tree. Only the panes below show it.
       _navController->popTo(*panes[i - 1], Animation::Animated);
@@ -156,6 +159,26 @@ void VarnelApp::reloadPanes() {
     }
     pane.reloadWithNode(node);
   }
+}
+
+void VarnelApp::showTree(VarnelPaneController::Node root) {
+  _tree = std::move(root);
+  _changes.follow(_tree);
+}
+
+std::vector<FoundNode> VarnelApp::find(std::string_view words) const {
+  return _tree ? findNodes(*_tree, words) : std::vector<FoundNode>();
+}
+
+const VarnelModelNode* VarnelApp::nodeAt(const NamePath& path) const {
+  return _tree ? nodeUnderNames(*_tree, path) : nullptr;
+}
+
+void VarnelApp::goTo(const NamePath& path) {
+  if (path.empty() || !nodeAt(path)) return;
+  _navController->popTo(*_navController->controllers().front(), Animation::None);
+  for (std::size_t i = 0; i + 1 < path.size(); ++i) topPane().openRow(path[i]);
+  topPane().selectRow(path.back());
 }
 
 std::string VarnelApp::updateMessageForNow() const {
@@ -206,6 +229,7 @@ void VarnelApp::applicationWillTerminate() {
   _setGSMRSSI(false);
   _notices.end();
   setUpdateMessage(std::nullopt);
+  showTree(nullptr);
   _dateFormatter.reset();
   setSaveViewController(nullptr);
   if (_window) _window->hide();

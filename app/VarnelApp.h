@@ -9,6 +9,8 @@
 #include "app/DateFormatter.h"
 #include "app/NoticeKeeper.h"
 #include "app/SaveControl.h"
+#include "app/TreeChanges.h"
+#include "app/TreeSearch.h"
 #include "app/ValueHistory.h"
 #include "app/VarnelPaneController.h"
 #include "app/VarnelSaveViewController.h"
@@ -53,6 +55,13 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   /// Calls the task once, after this many refreshes were shown.
   void afterUpdates(unsigned count, std::function<void()> task);
 
+  /// The nodes of the display with these words in their names (`findNodes`); none while there is no display.
+  std::vector<FoundNode> find(std::string_view words) const;
+  /// The node at the end of these names; null when there is none.
+  const VarnelModelNode* nodeAt(const NamePath& path) const;
+  /// Opens the panes above this node and selects its row. Does nothing when there is no such node any more.
+  void goTo(const NamePath& path);
+
   /// Checks whether the device allows snapshots.
   void getSaveButtonPref();
   void updateViewControllerFromModel() override;
@@ -87,6 +96,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   bool isConnected() const { return _model && _model->isConnected(); }
   void reloadPanes();
   void keepNumbers();
+  void showTree(VarnelPaneController::Node root);
   VarnelPaneController& topPane() const;
   void showNotice();
   void showWindowTitle();
@@ -99,6 +109,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   std::optional<std::string> _updateMessage;
   std::optional<DateFormatter> _dateFormatter;
   AwaitedUpdates _awaitedUpdates;
+  VarnelPaneController::Node _tree;  // the one that the panes show
+  TreeChanges _changes;
   NoticeKeeper _notices;
   bool _showsFirstStatus = true;
   std::string _technologyOfFormats;  // of those that the history has

@@ -1,5 +1,6 @@
 #include "app/VarnelPaneController.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace varnel {
@@ -15,12 +16,13 @@ constexpr double statusFontSize = 14;
 }  // namespace
 
 VarnelPaneController::VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node,
-                                           std::string path)
+                                           std::string path, const TreeChanges* changes)
     : _userInterface(userInterface),
       _saveControl(saveControl),
       _pane(userInterface.makeTablePane()),
       _nodes(std::move(node)),
-      _keyPath(std::move(path)) {
+      _keyPath(std::move(path)),
+      _changes(changes) {
   _pane->table().setDelegate(this);
 }
 
@@ -81,6 +83,7 @@ std::unique_ptr<VarnelCell> VarnelPaneController::innerNodeCell(TableView& table
   cell->key().setText(child.displayName());
   cell->cellView().setAccessory(CellAccessory::DisclosureIndicator);
   if (cell->value()) cell->value()->setText("");
+  showChange(*cell, child);
   cell->setLayoutKey();
   return cell;
 }
@@ -94,8 +97,14 @@ std::unique_ptr<VarnelCell> VarnelPaneController::leafCell(TableView& table,
   cell->key().setText(child.displayName());
   cell->cellView().setAccessory(CellAccessory::None);
   if (cell->value()) cell->value()->setText(*child.value());
+  showChange(*cell, child);
   cell->setLayout();
   return cell;
+}
+
+void VarnelPaneController::showChange(VarnelCell& cell, const VarnelModelNode& child) const {
+  const bool isChanged = _changes && _changes->contains(child);
+  cell.cellView().setChange(isChanged ? CellChange::Changed : CellChange::None);
 }
 
 void VarnelPaneController::tableView_didSelectRowAtIndexPath(TableView& table,
@@ -106,10 +115,30 @@ void VarnelPaneController::tableView_didSelectRowAtIndexPath(TableView& table,
     table.deselectRow(*path, Animation::None);
     return;
   }
-  const auto next = std::make_shared<VarnelPaneController>(_userInterface, _saveControl, child,
-                                                           childPath(_keyPath, child->displayName()));
+  const auto next = std::make_shared<VarnelPaneController>(
+      _userInterface, _saveControl, child, childPath(_keyPath, child->displayName()), _changes);
   next->setStatus_isLoading(_status, _isLoading);
   if (navigationController()) navigationController()->push(next, Animation::Animated);
+}
+
+std::optional<IndexPath> VarnelPaneController::rowNamed(std::string_view name) const {
+  const auto* children = _nodes ? _nodes->childNodes() : nullptr;
+  if (!children) return std::nullopt;
+  const auto found =
+      std::ranges::find_if(*children, [name](const Node& child) { return child->displayName() == name; });
+  if (found == children->end()) return std::nullopt;
+  return IndexPath{0, static_cast<std::size_t>(found - children->begin())};
+}
+
+void VarnelPaneController::selectRow(std::string_view name) {
+  if (const auto row = rowNamed(name)) _pane->table().selectRow(*row);
+}
+
+void VarnelPaneController::openRow(std::string_view name) {
+  const auto row = rowNamed(name);
+  if (!row) return;
+  _pane->table().selectRow(*row);
+  tableView_didSelectRowAtIndexPath(_pane->table(), row);
 }
 
 VarnelPaneController::Node VarnelPaneController::childAt(const IndexPath& path) const {

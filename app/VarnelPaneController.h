@@ -6,6 +6,7 @@
 #include <string_view>
 
 #include "app/SaveControl.h"
+#include "app/TreeChanges.h"
 #include "app/VarnelCell.h"
 #include "model/VarnelModelNode.h"
 #include "platform/ui/UserInterface.h"
@@ -18,9 +19,10 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
  public:
   using Node = std::shared_ptr<const VarnelModelNode>;
 
-  /// A pane for the node with this path. The node is null while there is no tree. User interface and save
-  /// control must outlive the pane.
-  VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node, std::string path);
+  /// A pane for the node with this path. The node is null while there is no tree. User interface, save
+  /// control, and changes must outlive the pane. Without changes, no row is marked as changed.
+  VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node, std::string path,
+                       const TreeChanges* changes = nullptr);
 
   /// The node's path in the tree, "/" for the root.
   const std::string& path() const { return _keyPath; }
@@ -30,6 +32,10 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
   void setStatus_isLoading(std::optional<std::string_view> status, bool isLoading);
   /// Shows another node, or no node.
   void reloadWithNode(Node node);
+  /// Selects the row with this name, if there is one.
+  void selectRow(std::string_view name);
+  /// Selects the row with this name, if there is one, and opens its pane, if it leads to one.
+  void openRow(std::string_view name);
   /// Builds the toolbar again. Its label gets its size only once, so every change of the status needs a new
   /// toolbar.
   void createToolbarItems();
@@ -48,6 +54,8 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
                                             const VarnelModelNode& child) const;
   std::unique_ptr<VarnelCell> leafCell(TableView& table, std::unique_ptr<VarnelCell> reused,
                                        const VarnelModelNode& child) const;
+  void showChange(VarnelCell& cell, const VarnelModelNode& child) const;
+  std::optional<IndexPath> rowNamed(std::string_view name) const;
   Node childAt(const IndexPath& path) const;
   void showTitle();
 
@@ -56,6 +64,7 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
   std::unique_ptr<TablePane> _pane;
   Node _nodes;
   std::string _keyPath;
+  const TreeChanges* const _changes;
   std::string _status;
   bool _isLoading = true;
 };

@@ -25,12 +25,13 @@ const std::vector<Layer> layers = {
     {"platform/", {"platform/", "base/"}, true},
     {"host/", {"host/", "platform/", "base/"}, false},
     {"widgets/", {"widgets/", "host/", "platform/ui/", "platform/", "base/"}, false},
+    {"terminal/", {"terminal/", "platform/ui/", "platform/", "base/"}, false},
     {"LogGenerator/", {"LogGenerator/", "platform/", "base/"}, true},
     {"model/", {"model/", "LogGenerator/", "platform/", "base/"}, true},
     {"app/", {"app/", "model/", "LogGenerator/", "platform/ui/", "platform/", "base/"}, true},
     {"programs/",
-     {"programs/", "app/", "model/", "LogGenerator/", "widgets/", "host/", "platform/ui/", "platform/",
-      "base/"},
+     {"programs/", "app/", "model/", "LogGenerator/", "widgets/", "terminal/", "host/", "platform/ui/",
+      "platform/", "base/"},
      false},
 };
 
@@ -71,6 +72,8 @@ std::optional<std::string> fault(const Layer& layer, const std::string& line) {
   const bool isPropertyListLibrary = layer.folder == "base/" && header == "plist/plist.h";
   if (layer.isCore && !isStandardHeader(header) && !isPropertyListLibrary)
     return "is no standard header: " + line;
+  const bool isTerminalLibrary = header == "curses.h" || header == "term.h";
+  if (isTerminalLibrary && layer.folder != "terminal/") return "belongs into terminal/: " + line;
   return std::nullopt;
 }
 
@@ -78,7 +81,7 @@ TEST(Layers, IncludesPointDownwardAndTheCoreKnowsNoToolkit) {
   const fs::path root = VARNEL_SOURCE_DIR;
   int filesSeen = 0;
   for (const char* top :
-       {"base", "platform", "host", "widgets", "LogGenerator", "model", "app", "programs"}) {
+       {"base", "platform", "host", "widgets", "terminal", "LogGenerator", "model", "app", "programs"}) {
     for (const auto& entry : fs::recursive_directory_iterator(root / top)) {
       const std::string extension = entry.path().extension();
       if (extension != ".h" && extension != ".cpp") continue;
@@ -109,6 +112,11 @@ TEST(Layers, TheRuleSeesWhatBreaksIt) {
   EXPECT_TRUE(fault(userInterface, "#include \"app/TreeText.h\""));
   EXPECT_FALSE(fault(userInterface, "#include \"base/Value.h\""));
   EXPECT_FALSE(fault(*layerOf("app/TextViewer.h"), "#include \"platform/ui/Window.h\""));
+  const Layer& terminal = *layerOf("terminal/CursesScreen.cpp");
+  EXPECT_FALSE(fault(terminal, "#include <curses.h>"));
+  EXPECT_TRUE(fault(terminal, "#include \"app/VarnelApp.h\""));
+  EXPECT_TRUE(fault(terminal, "#include \"widgets/Display.h\""));
+  EXPECT_TRUE(fault(*layerOf("programs/varnel/main.cpp"), "#include <curses.h>"));
   EXPECT_TRUE(fault(*layerOf("base/Value.h"), "#include \"platform/ui/Window.h\""))
       << "the user interface is above the rest of the platform";
 }

@@ -7,9 +7,9 @@
 #include <optional>
 
 #include "platform/ui/CellPool.h"
+#include "platform/ui/RowIndex.h"
 #include "platform/ui/TableView.h"
 #include "widgets/MousePress.h"
-#include "widgets/RowIndex.h"
 #include "widgets/RowWidget.h"
 #include "widgets/TouchScrolling.h"
 
@@ -32,6 +32,7 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   void reloadData() override;
   std::unique_ptr<TableCell> dequeueReusableCell(std::string_view reuseIdentifier) override;
   std::unique_ptr<CellView> makeCellView(CellStyle style) override;
+  void selectRow(const IndexPath& path) override { moveTo(_rows.rowOf(path)); }
   void deselectRow(const IndexPath& path, Animation animation) override;
   void sizeToFit() override;
 

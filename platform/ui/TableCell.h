@@ -1,8 +1,10 @@
 #pragma once
 
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "platform/ui/Font.h"
 #include "platform/ui/Geometry.h"
@@ -24,6 +26,9 @@ enum class CellAccessory {
   Checkmark,
 };
 
+/// Whether a row is as it was before the last refresh.
+enum class CellChange { None, Changed };
+
 /// The visible part of a cell. A table makes it.
 class CellView {
  public:
@@ -42,6 +47,12 @@ class CellView {
   /// The style's built-in text and its font. A long text is cut.
   virtual void setText(std::string_view text) = 0;
   virtual void setTextFont(const Font& font) = 0;
+
+  /// What a host may show beside the texts; one that shows nothing of it need not keep it.
+  virtual void setChange(CellChange) {}
+  /// The course of the row's value, the oldest first, one value per equal stretch of time; nothing where
+  /// there was none. Empty when the value is no number.
+  virtual void setCourse(std::vector<std::optional<double>>) {}
 };
 
 /// A cell: its view, and what its maker keeps with it.

@@ -51,6 +51,9 @@ class TableView {
   virtual std::unique_ptr<TableCell> dequeueReusableCell(std::string_view reuseIdentifier) = 0;
   /// The view for a new cell of this table.
   virtual std::unique_ptr<CellView> makeCellView(CellStyle style) = 0;
+  /// Makes the row the one from which the user's keys go on, and scrolls to it. A row that does not exist
+  /// changes nothing.
+  virtual void selectRow(const IndexPath& path) = 0;
   virtual void deselectRow(const IndexPath& path, Animation animation) = 0;
   /// Takes the height of all its rows, as far as there is room.
   virtual void sizeToFit() = 0;

@@ -17,7 +17,7 @@
 
 namespace varnel {
 
-/// What both viewers, window and text, need from the host. It needs an event loop.
+/// What every viewer needs from the host. It needs an event loop.
 class HostServices final {
  public:
   /// The application information must outlive it. Throws std::runtime_error when the runtime folder cannot be
@@ -26,6 +26,7 @@ class HostServices final {
 
   /// Lines of generators for standard output go to this stream, which must outlive the models.
   ModelServices model(std::ostream& standardOutput = std::cout);
+  MainQueue& queue() { return _queue; }
   DeviceFiles& files() { return _files; }
   Preferences& preferences() { return _preferences; }
 

@@ -12,7 +12,9 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       "\n"
       "In the window: arrow keys, Return to open, Escape to go back, Shift and Left or Right\n"
       "for long values, Ctrl+S to save a snapshot, Ctrl+R to start over, Ctrl+Q to end.\n"
-      "In a terminal: S to save a snapshot, R to start over, Q to end.\n"
+      "In a terminal: the same, and j, k, h, l, g, G; s to save, R to start over, q to end,\n"
+      "/ to find a row, L for log lines, ? for all keys.\n"
+      "As text: S to save a snapshot, R to start over, Q to end.\n"
       "\n"
       "VARNEL_RESOURCES in the environment names the folder of the display templates and the\n"
       "screen layout, if not the installed one.");
@@ -21,8 +23,9 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
   parser
       .add_option(
           "--ui", options.userInterface,
-          "how the display is shown: window, text, or auto (a window if there is a graphical display)")
-      ->check(CLI::IsMember({"auto", "window", "text"}))
+          "how the display is shown: window, terminal, text, or auto (a window if there is a graphical "
+          "display, else the terminal if standard input and output are one, else text)")
+      ->check(CLI::IsMember({"auto", "window", "terminal", "text"}))
       ->capture_default_str();
   parser
       .add_option("--device-root", options.deviceRoot,

@@ -6,8 +6,10 @@
 #include "host/ProgramStart.h"
 #include "host/TerminateHandler.h"
 #include "programs/varnel/Options.h"
+#include "programs/varnel/TerminalView.h"
 #include "programs/varnel/TextView.h"
 #include "programs/varnel/WindowView.h"
+#include "terminal/CursesScreen.h"
 #include "widgets/Display.h"
 
 namespace varnel {
@@ -17,8 +19,14 @@ namespace {
 constexpr int generalError = 1;
 constexpr int usageError = 2;
 
-bool wantsWindow(const Options& options) {
-  return options.userInterface == "window" || (options.userInterface == "auto" && displayIsThere());
+using View = int (*)(int&, char**, const Options&, const ApplicationInfo&);
+
+View viewFor(const std::string& userInterface) {
+  if (userInterface == "window") return viewInWindow;
+  if (userInterface == "terminal") return viewInTerminal;
+  if (userInterface == "text") return viewAsText;
+  if (displayIsThere()) return viewInWindow;
+  return terminalIsThere() ? viewInTerminal : viewAsText;
 }
 
 int run(int argumentCount, char** arguments) {
@@ -35,8 +43,7 @@ int run(int argumentCount, char** arguments) {
     return usageError;
   }
   try {
-    const auto view = wantsWindow(options) ? viewInWindow : viewAsText;
-    return view(argumentCount, arguments, options, application);
+    return viewFor(options.userInterface)(argumentCount, arguments, options, application);
   } catch (const std::runtime_error& error) {
     std::cerr << programName << ": " << printable(error.what()) << '\n';
     return generalError;

@@ -73,6 +73,8 @@ class RecordingCellView final : public CellView {
   void setAccessory(CellAccessory accessory) override { this->accessory = accessory; }
   void setText(std::string_view text) override { this->text = text; }
   void setTextFont(const Font& font) override { textFont = font; }
+  void setChange(CellChange change) override { this->change = change; }
+  void setCourse(std::vector<std::optional<double>> course) override { this->course = std::move(course); }
 
   const CellStyle style;
   std::vector<std::unique_ptr<RecordingLabel>> labels;
@@ -80,6 +82,8 @@ class RecordingCellView final : public CellView {
   CellAccessory accessory = CellAccessory::None;
   std::string text;
   Font textFont;
+  CellChange change = CellChange::None;
+  std::vector<std::optional<double>> course;
   unsigned layouts = 0;
 
  private:
@@ -103,6 +107,9 @@ class RecordingTable final : public TableView {
   std::unique_ptr<CellView> makeCellView(CellStyle style) override {
     ++cellsMade;
     return std::make_unique<RecordingCellView>(style, content);
+  }
+  void selectRow(const IndexPath& path) override {
+    if (path.section == 0 && path.row < _rows) _selected = path;
   }
   void deselectRow(const IndexPath& path, Animation animation) override {
     if (_selected == path) _selected.reset();

@@ -1,4 +1,4 @@
-#include "widgets/RowIndex.h"
+#include "platform/ui/RowIndex.h"
 
 #include <gtest/gtest.h>
 
@@ -12,6 +12,15 @@ TEST(RowIndex, CountsThroughSections) {
   EXPECT_EQ(index.pathOf(1), (IndexPath{0, 1}));
   EXPECT_EQ(index.pathOf(2), (IndexPath{2, 0}));
   EXPECT_EQ(index.pathOf(4), (IndexPath{2, 2}));
+}
+
+TEST(RowIndex, FindsTheRowOfAPath) {
+  const RowIndex index({2, 0, 3});
+  EXPECT_EQ(index.rowOf({0, 1}), 1u);
+  EXPECT_EQ(index.rowOf({2, 2}), 4u);
+  EXPECT_EQ(index.rowOf({0, 2}), std::nullopt);
+  EXPECT_EQ(index.rowOf({1, 0}), std::nullopt);
+  EXPECT_EQ(index.rowOf({3, 0}), std::nullopt);
 }
 
 TEST(RowIndex, WithoutSectionsThereAreNoRows) { EXPECT_EQ(RowIndex().rows(), 0u); }

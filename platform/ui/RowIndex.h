@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <optional>
 #include <vector>
 
 #include "platform/ui/TableView.h"
@@ -17,6 +18,8 @@ class RowIndex {
   std::size_t rows() const { return _rows; }
   /// `row` must be less than `rows`.
   IndexPath pathOf(std::size_t row) const;
+  /// Nothing when there is no such row.
+  std::optional<std::size_t> rowOf(const IndexPath& path) const;
 
   friend bool operator==(const RowIndex&, const RowIndex&) = default;
 

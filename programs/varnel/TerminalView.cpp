@@ -1,0 +1,173 @@
+#include "programs/varnel/TerminalView.h"
+
+#include <pthread.h>
+#include <unistd.h>
+
+#include <QSocketNotifier>
+#include <csignal>
+#include <cstdlib>
+#include <iostream>
+#include <optional>
+
+#include "app/DateFormatter.h"
+#include "app/PrintableText.h"
+#include "app/VarnelApp.h"
+#include "host/HostApplication.h"
+#include "host/SignalWatcher.h"
+#include "programs/varnel/HostServices.h"
+#include "terminal/CursesScreen.h"
+#include "terminal/HeldLines.h"
+#include "terminal/TerminalUserInterface.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr std::chrono::seconds intervalOfTrimming(10);
+constexpr std::string_view momentPattern = "yyyy-MM-dd 'at' HH:mm:ss";
+
+// Stops the process until somebody continues it. A process that nobody could continue is not stopped.
+void stopHere() {
+  sigset_t stop;
+  ::sigemptyset(&stop);
+  ::sigaddset(&stop, SIGTSTP);
+  ::raise(SIGTSTP);  // still blocked
+  ::pthread_sigmask(SIG_UNBLOCK, &stop, nullptr);
+  ::pthread_sigmask(SIG_BLOCK, &stop, nullptr);
+}
+
+/// The viewer on a terminal, from start to end.
+class TerminalViewer final {
+ public:
+  TerminalViewer(HostApplication& host, const Options& options, const ApplicationInfo& application)
+      : _host(host),
+        _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2, SIGWINCH, SIGTSTP},
+                 [this](int signal) { take(signal); }),
+        _services(options, application),
+        _screen(std::in_place),
+        _userInterface(
+            _services.queue(),
+            {.close = [this] { _host.end(0); },
+             .startOver = [this] { _app.startOver(); },
+             .save = [this] { _app.save(); },
+             .find = [this](const std::string& words) { return found(words); },
+             .goTo = [this](const FoundRow& row) { _app.goTo(row.path); },
+             .explain = [this](const std::vector<std::string>& path) { return explained(path); },
+             .heldLines = [this] { return heldLines(); },
+             .suspend = [] { ::kill(0, SIGTSTP); },
+             .redraw = [this] { _screen->redraw(); }},
+            [this](const CellGrid& grid) { _screen->show(grid); }, _screen->glyphs()),
+        _app({_services.model(_held.lines()), _services.files(), _services.preferences(), _userInterface,
+              "press R"}),
+        _input(STDIN_FILENO, QSocketNotifier::Read),
+        _trimming(_services.queue().repeating(intervalOfTrimming, [this] { _held.trim(); })) {
+    QObject::connect(&_input, &QSocketNotifier::activated, &_input, [this] { takeKeys(); });
+    if (options.updates) _app.afterUpdates(*options.updates, [this] { _host.end(0); });
+  }
+
+  int run() {
+    _userInterface.resize(_screen->columns(), _screen->rows());
+    _app.applicationDidFinishLaunching();
+    const int status = _host.run();
+    _app.applicationWillTerminate();
+    _screen.reset();
+    if (_hasLostTerminal) std::cerr << programName << ": the terminal is closed\n";
+    return status;
+  }
+
+ private:
+  void take(int signal) {
+    switch (signal) {
+      case SIGUSR1:
+        return _app.startOver();
+      case SIGUSR2:
+        return _app.save();
+      case SIGWINCH:
+        return adaptSize();
+      case SIGTSTP:
+        return suspend();
+      default:
+        _host.end(0);
+    }
+  }
+
+  std::vector<FoundRow> found(const std::string& words) const {
+    std::vector<FoundRow> rows;
+    for (auto& node : _app.find(words)) rows.push_back({std::move(node.path), std::move(node.value)});
+    return rows;
+  }
+
+  std::string heldLines() const {
+    const std::string lines = _held.last();
+    return lines.empty() ? "There are no lines. --log-level N brings log lines of priority N and below.\n"
+                         : lines;
+  }
+
+  // What there is to say about a row, in lines.
+  std::string explained(const NamePath& path) const {
+    const VarnelModelNode* const node = path.empty() ? nullptr : _app.nodeAt(path);
+    if (!node) return {};
+    std::string text = "This row: ";
+    for (const std::string& name : path) text.append(&name == &path.front() ? "" : " > ").append(name);
+    text += '\n';
+    if (!node->value()) {
+      const std::size_t rows = node->childNodes()->size();
+      return text + "It leads to " + std::to_string(rows) + (rows == 1 ? " row" : " rows") +
+             "; Enter opens them.\n";
+    }
+    text += "Its value: " + printableText(*node->value()) + '\n';
+    // Only a leaf has a value.
+    if (const auto& written = static_cast<const VarnelModelLeafNode&>(*node).writtenAt()) {
+      const SystemClock clock;
+      text += "The modem last sent it " +
+              DateFormatter(momentPattern).string(*written, clock.zoneAt(*written)) + ".\n";
+    }
+    return text;
+  }
+
+  void takeKeys() noexcept {
+    bool isAny = false;
+    while (const auto key = _screen->nextKey()) {
+      isAny = true;
+      _userInterface.take(*key);
+    }
+    if (isAny || !CursesScreen::inputHasEnded()) return;
+    _input.setEnabled(false);
+    _hasLostTerminal = true;
+    _host.end(EXIT_FAILURE);
+  }
+
+  void adaptSize() {
+    _screen->updateSize();
+    _userInterface.resize(_screen->columns(), _screen->rows());
+  }
+
+  void suspend() {
+    _screen->leave();
+    stopHere();
+    _screen->enter();
+    adaptSize();
+  }
+
+  HostApplication& _host;
+  const SignalWatcher _watcher;  // before the screen: a signal must not end the program while it is in use
+  HeldLines _held;
+  HostServices _services;
+  std::optional<CursesScreen> _screen;
+  TerminalUserInterface _userInterface;
+  VarnelApp _app;
+  QSocketNotifier _input;
+  std::unique_ptr<RepeatingTimer> _trimming;
+  bool _hasLostTerminal = false;
+};
+
+}  // namespace
+
+int viewInTerminal(int& argumentCount, char** arguments, const Options& options,
+                   const ApplicationInfo& application) {
+  HostApplication host(argumentCount, arguments);
+  TerminalViewer viewer(host, options, application);
+  return viewer.run();
+}
+
+}  // namespace varnel
