@@ -1,6 +1,7 @@
 #include <zlib.h>
 
 #include <algorithm>
+#include <chrono>
 #include <cstdio>
 #include <exception>
 #include <filesystem>
@@ -18,16 +19,20 @@
 #include "fuzz/FuzzHost.h"
 #include "fuzz/InputSteps.h"
 #include "host/PortFrame.h"
+#include "host/captures/FrameEncoding.h"
 #include "host/captures/PcapEncoders.h"
 #include "host/captures/StreamEncoders.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
+#include "programs/varnel-telephonyd/simulation/pty/SimulatedPort.h"
+#include "tests/support/FakeQueue.h"
 
 namespace varnel {
 
 namespace {
 
 namespace fs = std::filesystem;
+using namespace std::chrono_literals;
 
 // The same limits as in `longest_input` of ./dev.
 constexpr std::size_t largestPlay = 768, largestFile = 4096;
@@ -256,6 +261,102 @@ void makeFrameSeeds(SeedFolder& folder) {
   }
 }
 
+// Talks of a server with a simulated modem, first bytes as `PortSessionFuzz` reads them. The answers come as
+// contents of frames, as frames, or as messages of a device that is no serial line.
+class PortTalk {
+ public:
+  enum class Form { Contents, Frames, Messages };
+
+  PortTalk(std::string_view technology, Form form)
+      : _form(form),
+        _port({.modem = simulatedModem(technology, 1),
+               .queue = _queue,
+               .uptime = [this] { return _queue.now(); },
+               .now =
+                   [this] {
+                     return Time{1'709'301'909 + _queue.now() / 1s, 0};
+                   },
+               .send = [this](ByteView frame) { return answer(frame); },
+               .build = "simulated"}) {
+    _input.push_back(form == Form::Messages ? 1 : 0);
+    for (const Bytes& request :
+         {portRequest::version(), portRequest::build(), portRequest::eventsOff(), portRequest::debugTextOff(),
+          portRequest::allCodesOff(), portRequest::codeNumbers()})
+      ask(request, 0);
+    const Bytes wanted{0xC0, 0xB0, 0x2F, 0x51};
+    appendStep(_input, {wantOthers, wanted});
+    CodeMask mask{.count = codesOfEquipment, .bits = Bytes(codesOfEquipment / 8, 0xFF)};
+    for (const std::size_t equipment : {5, 11}) {
+      // The server's mask is shorter; the answer tells only its status.
+      _longestAnswer = logConfiguration::setEquipmentOffset + 4;
+      ask(portRequest::setCodes(equipment, mask), 0);
+      _longestAnswer = longest;
+    }
+    _queue.advance(20s);
+    for (const Bytes& request :
+         {portRequest::eventsOff(), portRequest::allCodesOff(), portRequest::debugTextOff()})
+      ask(request, end);
+  }
+
+  const Bytes& input() const { return _input; }
+
+ private:
+  static constexpr std::uint8_t wantOthers = 2, end = 4, areContents = 8;
+  static constexpr std::size_t longest = 300, mostBytes = 3000;
+
+  void ask(const Bytes& request, std::uint8_t after) {
+    _after = after;
+    Bytes frame;
+    appendFramed(frame, request);
+    _port.take(frame);
+    _after = 0;
+  }
+  bool answer(ByteView frame) {
+    LeftOut ignored;
+    FrameStream stream(ignored);
+    stream.take(frame, [&](std::span<std::uint8_t> whole) {
+      const ByteView contents = ByteView(whole).first(std::min(whole.size(), _longestAnswer));
+      if (whole.size() > longest && _longestAnswer == longest) return;
+      if (_input.size() > mostBytes) return;
+      if (_form == Form::Contents)
+        return appendStep(_input, {static_cast<std::uint8_t>(areContents | _after), contents});
+      Bytes bytes;
+      appendFramed(bytes, contents);
+      if (_form == Form::Messages)
+        bytes = joined({Bytes{32, 0, 0, 0, 1, 0, 0, 0, static_cast<std::uint8_t>(bytes.size()),
+                              static_cast<std::uint8_t>(bytes.size() >> 8), 0, 0},
+                        bytes});
+      appendStep(_input, {_after, bytes});
+    });
+    return true;
+  }
+
+  const Form _form;
+  FakeQueue _queue;
+  SimulatedPort _port;
+  std::uint8_t _after = 0;
+  std::size_t _longestAnswer = longest;
+  Bytes _input;
+};
+
+void makePortSeeds(SeedFolder& folder) {
+  using Form = PortTalk::Form;
+  for (const Technology& technology : technologies) {
+    if (technology.identifier == technology::ifxGSM) continue;  // its messages are no log records
+    for (const Form form : {Form::Contents, Form::Frames, Form::Messages})
+      folder.add("talk", PortTalk(technology.identifier, form).input());
+  }
+  // A port for AT commands, and one that answers nothing.
+  const std::string text = "\r\nERROR\r\n";
+  Bytes spoken{0}, silent{0};
+  for (int second = 0; second < 5; ++second) {
+    appendStep(spoken, {1, Bytes(text.begin(), text.end())});
+    appendStep(silent, {1, {}});
+  }
+  folder.add("text", spoken);
+  folder.add("silence", silent);
+}
+
 void addInBothEncodings(SeedFolder& folder, const std::string& kind, const Value& list) {
   folder.add(kind, writeXmlPropertyList(list).value());
   folder.add(kind, writeBinaryPropertyList(list).value());
@@ -371,9 +472,10 @@ void makeSeeds(const fs::path& root) {
   SeedFolder captures(root, "CaptureFuzz"), frames(root, "PortFrameFuzz");
   SeedFolder commands(root, "ChannelCommandFuzz"), lists(root, "PropertyListFuzz");
   SeedFolder resources(root, "ResourceFuzz"), preferences(root, "PreferencesFuzz");
-  SeedFolder snapshots(root, "SnapshotFuzz");
+  SeedFolder snapshots(root, "SnapshotFuzz"), ports(root, "PortSessionFuzz");
   makeCaptureSeeds(captures);
   makeFrameSeeds(frames);
+  makePortSeeds(ports);
   makeCommandSeeds(commands, host);
   makePropertyListSeeds(lists);
   makeResourceSeeds(resources, host.shipped);
