@@ -115,14 +115,7 @@ void SeenPaths::finish(const std::string& inputName) {
 }
 
 std::string SeenPaths::adviceFor(const std::string& path) const {
-  const auto nearest = nearestTo(path);
-  if (nearest.empty()) return "--format paths shows what there is";
-  std::string advice = "did you mean ";
-  for (std::size_t i = 0; i < nearest.size(); ++i) {
-    if (i > 0) advice += i + 1 < nearest.size() ? ", " : " or ";
-    advice.append("'").append(nearest[i]).append("'");
-  }
-  return advice + "?";
+  return adviceOf(nearestTo(path), "--format paths shows what there is");
 }
 
 }  // namespace varnel

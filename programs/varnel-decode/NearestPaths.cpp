@@ -103,4 +103,14 @@ std::vector<std::string> NearestPaths::to(std::string_view path) const {
   return nearest;
 }
 
+std::string adviceOf(const std::vector<std::string>& nearest, std::string_view otherwise) {
+  if (nearest.empty()) return std::string(otherwise);
+  std::string advice = "did you mean ";
+  for (std::size_t i = 0; i < nearest.size(); ++i) {
+    if (i > 0) advice += i + 1 < nearest.size() ? ", " : " or ";
+    advice.append("'").append(nearest[i]).append("'");
+  }
+  return advice + "?";
+}
+
 }  // namespace varnel

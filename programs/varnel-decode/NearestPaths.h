@@ -26,4 +26,7 @@ class NearestPaths {
   std::size_t _size = 0;  // of all paths together
 };
 
+/// "did you mean 'A' or 'B'?" of these paths. The other advice when there are none.
+std::string adviceOf(const std::vector<std::string>& nearest, std::string_view otherwise);
+
 }  // namespace varnel

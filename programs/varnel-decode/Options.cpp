@@ -20,6 +20,7 @@ constexpr int usageError = 2;
 constexpr const char* listOption = "--files-from";
 constexpr const char* mergeOption = "--merge";
 constexpr const char* databaseOption = "--sqlite";
+constexpr const char* explainOption = "--explain";
 constexpr unsigned mostJobs = 256;
 constexpr std::string_view eventTableFormat = "csv";  // of events alone, as values have --csv
 
@@ -51,6 +52,7 @@ constexpr const char* examples =
     "--resume\n"
     "  varnel-decode --files-from captures.txt --part 2/8 --sqlite part2.db\n"
     "  varnel-decode --sqlite all.db --merge part1.db part2.db\n"
+    "  varnel-decode --explain LTE/Measurements/RSRP\n"
     "  varnel-decode --format none --pcap walk.pcap walk.bin\n"
     "  varnel-decode --format none --messages walk-messages.pcapng walk.bin\n"
     "  varnel-decode --dlf walk.dlf --format none VarnelSnapshot-1709301914.varnel\n";
@@ -108,7 +110,7 @@ enum class CaptureIs { Required, NamedElsewhere };
 CaptureIs captureIsIn(std::span<const char* const> arguments) {
   const bool isElsewhere = std::ranges::any_of(arguments, [](std::string_view argument) {
     const std::string_view name = argument.substr(0, argument.find('='));
-    return name == listOption || name == mergeOption;
+    return name == listOption || name == mergeOption || name == explainOption;
   });
   return isElsewhere ? CaptureIs::NamedElsewhere : CaptureIs::Required;
 }
@@ -156,6 +158,9 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
          "add up reports of --stats --format json, or databases into that of --sqlite, and do nothing "
          "else")
       ->type_name("PART");
+  app.add_option(explainOption, options.explainedPaths,
+                 "tell what the values or sections under these paths mean, and do nothing else")
+      ->type_name("PATH");
 }
 
 void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
@@ -332,10 +337,11 @@ Output outputFor(const Options& options, const Wishes& wishes) {
   return wishes.format == "json" ? Output::StatisticsJson : Output::StatisticsTable;
 }
 
-// An option that was given and means nothing when parts are merged.
-std::optional<std::string> optionBesideMerge(const CLI::App& app) {
+// An option that was given beside these.
+std::optional<std::string> optionBeside(const CLI::App& app, std::initializer_list<const char*> names) {
   for (const CLI::Option* option : app.get_options())
-    if (option->count() > 0 && !option->check_name(mergeOption) && !option->check_name(databaseOption))
+    if (option->count() > 0 &&
+        std::ranges::none_of(names, [&](const char* name) { return option->check_name(name); }))
       return option->get_name();
   return std::nullopt;
 }
@@ -388,8 +394,13 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
   } catch (const CLI::ParseError& error) {
     return mistake(fileTakenForPath(options, wishes).value_or(error.what()));
   }
+  if (!options.explainedPaths.empty()) {
+    if (const auto other = optionBeside(app, {explainOption}))
+      return mistake(*other + " does not go with --explain, which takes paths only");
+    return options;
+  }
   if (!options.mergedParts.empty()) {
-    if (const auto other = optionBesideMerge(app))
+    if (const auto other = optionBeside(app, {mergeOption, databaseOption}))
       return mistake(*other + " does not go with --merge, which takes only --sqlite");
     return options;
   }

@@ -68,8 +68,10 @@ struct Options {
   std::optional<std::string> reportPath;    ///< where to write what became of each capture
   std::optional<std::string> databasePath;  ///< the database that gets each capture
   std::vector<std::string> mergedParts;     ///< if there are any, they are added up, and nothing else is done
-  bool isResuming = false;                  ///< what is there, and newer than its capture, is left
-  bool areSeveral = false;                  ///< several captures, or a list with any number of them
+  std::vector<std::string>
+      explainedPaths;       ///< if there are any, they are explained, and nothing else is done
+  bool isResuming = false;  ///< what is there, and newer than its capture, is left
+  bool areSeveral = false;  ///< several captures, or a list with any number of them
 
   /// Whether events are written as a table, which begins with a header.
   bool isEventTable() const { return output == Output::Events && eventFormat == EventFormat::Csv; }

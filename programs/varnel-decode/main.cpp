@@ -10,6 +10,7 @@
 #include "host/FileResources.h"
 #include "host/ProgramStart.h"
 #include "host/TerminateHandler.h"
+#include "programs/varnel-decode/Explaining.h"
 #include "programs/varnel-decode/InputDecoding.h"
 #include "programs/varnel-decode/ManyCaptures.h"
 #include "programs/varnel-decode/MergeParts.h"
@@ -52,6 +53,7 @@ int run(int argumentCount, char** arguments) {
   auto choice = readOptions(argumentCount, arguments, technologies, application.version.value_or("(none)"));
   if (const auto* status = std::get_if<ExitStatus>(&choice)) return status->code;
   auto& options = std::get<Options>(choice);
+  if (!options.explainedPaths.empty()) return explain(options.explainedPaths, resources);
   if (!options.mergedParts.empty()) return mergeParts(options.mergedParts, options.databasePath);
   if (!succeeds([&] { takeList(options); })) return generalError;
   if (const auto clash = outputClash(options)) return mistake(*clash).code;
