@@ -5,12 +5,15 @@
 #include <CLI/CLI.hpp>
 #include <iostream>
 #include <limits>
+#include <utility>
 #include <vector>
 
 #include "host/ControlProtocol.h"
 #include "host/FileIdentity.h"
 #include "host/Printable.h"
 #include "platform/TelephonyService.h"
+#include "programs/varnel-telephonyd/Fault.h"
+#include "programs/varnel-telephonyd/RecordingName.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 namespace varnel {
@@ -75,10 +78,12 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
       ->check(CLI::Range(1U, 255U).description(""))
       ->type_name("N");
   auto* record =
-      app.add_option("--record", options.recordPath,
-                     "write what is sent to viewers to a capture that can be replayed and decoded; refuses a "
-                     "file that exists and is not empty. It holds identities of a person, such as the "
-                     "numbers of the SIM card")
+      app.add_option(
+             "--record", options.recordPath,
+             "write what is sent to viewers to a capture that can be replayed and decoded; its name may "
+             "have fields of the time as for date(1), such as %Y%m%d-%H%M%S; refuses a "
+             "file that exists and is not empty. It holds identities of a person, such as the "
+             "numbers of the SIM card")
           ->excludes(pty)
           ->type_name("CAPTURE");
   app.add_flag_callback(
@@ -88,6 +93,15 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
   app.add_option("--runtime-dir", options.runtimeFolder,
                  "where viewer and server meet; $XDG_RUNTIME_DIR/varnel unless given")
       ->type_name("DIR");
+  app.add_option_function<std::string>(
+         "--fault",
+         [&options](const std::string& text) {
+           const auto fault = readFault(text);
+           if (!fault) throw CLI::ValidationError("--fault", "must be one of " + namesOfFaults());
+           options.fault = *fault;
+         },
+         "make a fault, for tests of viewers: " + namesOfFaults())
+      ->type_name("FAULT");
   app.add_option("--log-level", options.logLevel,
                  "also write log lines of this priority number and lower to standard error; -1 for none")
       ->check(CLI::Range(-1, std::numeric_limits<int>::max()))
@@ -110,12 +124,20 @@ std::optional<std::string> conflictOfPipe(const Options& options) {
   return std::nullopt;
 }
 
+void nameRecording(Options& options) {
+  if (!options.recordPath) return;
+  std::string name = recordingNameOfNow(*options.recordPath);
+  options.recordPathIsOfNow = name != *options.recordPath;
+  options.recordPath = std::move(name);
+}
+
 // What is wrong with the combination of valid options; nothing when they go together.
 std::optional<std::string> conflict(const Options& options) {
   if (!options.portPath && !options.simulatedTechnology && !options.replayPath)
     return "one of --port, --simulate, and --replay is needed";
   if (options.playsPort && options.simulatedTechnology == technology::ifxGSM)
     return "the modem of ifx-gsm sends no log packets, so it has no diagnostic port to play";
+  if (options.recordPath && options.recordPath->empty()) return "--record needs the name of a file";
   if (!options.replayPath) return std::nullopt;
   if (const auto found = conflictOfPipe(options)) return found;
   if (!isPlayable(options.speed)) return "--speed must lie between 0.001 and 1000000";
@@ -144,6 +166,7 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
   } catch (const CLI::ParseError& error) {
     return mistake(error.what());
   }
+  nameRecording(options);
   if (const auto found = conflict(options)) return mistake(*found);
   return options;
 }

@@ -7,6 +7,7 @@
 
 #include "base/Log.h"
 #include "host/RecordingFile.h"
+#include "programs/varnel-telephonyd/Fault.h"
 
 namespace varnel {
 
@@ -30,8 +31,10 @@ struct Options {
   std::optional<unsigned> subscription;  ///< 1 to 255; absent: the first one in the capture, or all
 
   std::optional<std::string> recordPath;  ///< absent: nothing is recorded
+  bool recordPathIsOfNow = false;         ///< whether the user has named it by fields of the time
   ExistingRecording existingRecording = ExistingRecording::Refused;
   std::optional<std::string> runtimeFolder;
+  Fault fault{};
   int logLevel = logErrorPriority;  ///< the highest priority number that goes to standard error
 };
 

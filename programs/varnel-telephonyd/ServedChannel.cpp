@@ -1,8 +1,10 @@
 #include "programs/varnel-telephonyd/ServedChannel.h"
 
+#include <thread>
 #include <utility>
 
 #include "base/Log.h"
+#include "base/PropertyList.h"
 #include "host/PortFrame.h"
 #include "host/TelephonyProtocol.h"
 #include "programs/varnel-telephonyd/ChannelCommand.h"
@@ -22,6 +24,15 @@ constexpr std::uint64_t mostNamedAsTooLong = 10;
 constexpr std::chrono::milliseconds commandPatience = 10s;
 // A live message is shown within this time or not at all.
 constexpr std::chrono::milliseconds longestDelay = 1s;
+// Of a reply that is late on purpose. A viewer waits for one second.
+constexpr std::chrono::milliseconds lateness = 2s;
+
+// Bytes that are neither a packet nor a property list.
+Bytes garbage() {
+  Bytes bytes(256);
+  for (std::size_t i = 0; i < bytes.size(); ++i) bytes[i] = static_cast<std::uint8_t>(0x5A + 37 * i);
+  return bytes;
+}
 
 }  // namespace
 
@@ -70,9 +81,35 @@ std::optional<Bytes> ServedChannel::takeCommand(ByteView data) {
     return std::nullopt;
   }
   _hasCommand = true;
-  if (std::holds_alternative<TechnologyRequest>(*command)) return technologyReply(_host.technology);
+  if (std::holds_alternative<TechnologyRequest>(*command)) return answerTechnologyRequest();
   start(std::get<StartRequest>(*command).filter);
   return std::nullopt;
+}
+
+std::optional<Bytes> ServedChannel::answerTechnologyRequest() {
+  switch (_host.fault.kind) {
+    case Fault::Kind::Silent:
+      return std::nullopt;
+    case Fault::Kind::LateReply:
+      std::this_thread::sleep_for(lateness);
+      break;
+    case Fault::Kind::BadReply:
+      return garbage();
+    case Fault::Kind::EmptyReply:
+      return writeXmlPropertyList(Value::ofDictionary());
+    case Fault::Kind::UnknownTechnology:
+      return technologyReply("of-no-modem");
+    case Fault::Kind::DropAfterReply: {
+      // The port sends the reply before it closes.
+      Bytes reply = technologyReply(_host.technology);
+      const auto self = shared_from_this();
+      end();
+      return reply;
+    }
+    default:
+      break;
+  }
+  return technologyReply(_host.technology);
 }
 
 // If the stream already runs, it goes on with the new codes.
@@ -205,6 +242,18 @@ ServedChannel::Delivery ServedChannel::deliver(ByteView message) {
   _withoutRoomSince.reset();
   ++_counts.delivered;
   _host.messageSent(message);
+  return makeFault();
+}
+
+ServedChannel::Delivery ServedChannel::makeFault() {
+  const Fault& fault = _host.fault;
+  if (fault.isDue(Fault::Kind::Garbage, _counts.delivered)) {
+    static_cast<void>(_viewer->sendRequest(0, garbage(), 0ms, std::nullopt));
+  } else if (fault.isDue(Fault::Kind::DropChannel, _counts.delivered)) {
+    // The message in hand was delivered.
+    _next.reset();
+    return Delivery::Ended;
+  }
   return Delivery::Done;
 }
 

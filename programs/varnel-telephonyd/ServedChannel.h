@@ -11,6 +11,7 @@
 #include "platform/MainQueue.h"
 #include "platform/MessagePort.h"
 #include "programs/varnel-telephonyd/CodeFilter.h"
+#include "programs/varnel-telephonyd/Fault.h"
 #include "programs/varnel-telephonyd/MessageCounts.h"
 #include "programs/varnel-telephonyd/MessageSource.h"
 
@@ -30,6 +31,7 @@ struct ChannelHost {
   std::function<void(ByteView message)> messageSent;
   /// Tells the server's user one sentence.
   std::function<void(const std::string& sentence)> tell;
+  Fault fault{};  ///< what goes wrong, for tests
 };
 
 /// The server's side of one log channel. It takes the viewer's commands on its own port, and sends the stream
@@ -74,11 +76,13 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   std::chrono::milliseconds streamTime() const { return clock() - _startedAt; }
 
   std::optional<Bytes> takeCommand(ByteView data);
+  std::optional<Bytes> answerTechnologyRequest();
   void start(CodeFilter filter);
   void sendWhatIsDue();
   void sendLater(std::chrono::milliseconds delay);
   Delivery deliver(ByteView message);
   Delivery waitForRoom();
+  Delivery makeFault();
   Delivery refuseLength(std::size_t length);
   void takeNext();
   void noteWait();

@@ -1,6 +1,8 @@
 #include "programs/varnel-telephonyd/TelephonyServer.h"
 
+#include <cstdlib>
 #include <string>
+#include <utility>
 
 #include "base/Log.h"
 #include "host/TelephonyProtocol.h"
@@ -21,13 +23,21 @@ constexpr std::size_t mostChannels = 16;
 
 TelephonyServer::TelephonyServer(ChannelHost host)
     : _host(std::move(host)),
+      _messageSent(std::exchange(_host.messageSent, [this](ByteView message) { countSent(message); })),
       _viewerCheck(_host.queue.repeating(viewerCheckInterval, [this] { checkViewers(); })) {}
+
+// A crash is one of the program, so the messages of all channels count.
+void TelephonyServer::countSent(ByteView message) {
+  _messageSent(message);
+  if (_host.fault.isDue(Fault::Kind::Crash, ++_sent)) std::abort();
+}
 
 TelephonyConnection::LogChannel TelephonyServer::createLogChannel(std::string_view viewerPortName) {
   if (viewerPortName.starts_with(protocol::socketName)) {
     logWarning("A log channel was asked for \"%s\", a port of the server's own", viewerPortName);
     return {protocol::portOfTheService, std::nullopt};
   }
+  if (_host.fault.is(Fault::Kind::RefuseChannel)) return {protocol::tooManyChannels, std::nullopt};
   if (_channels.size() >= mostChannels) {
     logWarning("A log channel was asked for, and %ld are open", _channels.size());
     return {protocol::tooManyChannels, std::nullopt};
@@ -49,6 +59,8 @@ TelephonyConnection::LogChannel TelephonyServer::createLogChannel(std::string_vi
   if (_speed) channel->setSpeed(*_speed);
   _channels.emplace(number, channel);
   logLine(logNoticePriority, "A log channel to port \"%s\" is open", viewerPortName);
+  if (_host.fault.is(Fault::Kind::NoPort)) return {0, std::nullopt};
+  if (_host.fault.is(Fault::Kind::WrongPort)) return {0, std::string(commandPortPrefix) + "0"};
   return {0, portName};
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <map>
 #include <memory>
 #include <optional>
@@ -51,10 +52,13 @@ class TelephonyServer {
  private:
   unsigned freeNumber() const;
   void close(unsigned number);
+  void countSent(ByteView message);
   void checkViewers();
   void tellLosses();
 
   ChannelHost _host;
+  const std::function<void(ByteView message)> _messageSent;      // of the host that was given
+  std::uint64_t _sent = 0;                                       // messages over all channels
   std::map<unsigned, std::shared_ptr<ServedChannel>> _channels;  // by the number in the name of their port
   MessageCounts _endedCounts;                                    // of channels that have ended
   bool _isPaused = false;

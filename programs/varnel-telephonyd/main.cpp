@@ -63,6 +63,7 @@ int fail(const std::runtime_error& error) {
 std::unique_ptr<Recorder> makeRecorder(const Options& options, MainQueue& queue, TelephonyServer& server,
                                        const std::string& technology) {
   if (!options.recordPath) return nullptr;
+  if (options.recordPathIsOfNow) tell("the recording is " + *options.recordPath);
   const auto tellEnd = [&queue, &server](const std::string& why) {
     tell(why);
     // Deferred: a channel is sending now.
@@ -246,7 +247,8 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
                               [&](ByteView message) {
                                 if (recorder) recorder->record(message);
                               },
-                          .tell = tell});
+                          .tell = tell,
+                          .fault = options.fault});
   const TelephonyListener listener(
       folder, [&](std::string_view viewerPortName) { return server.createLogChannel(viewerPortName); });
   std::unique_ptr<CaptureSurvey> survey = makeSurvey(options, queue, unasked);

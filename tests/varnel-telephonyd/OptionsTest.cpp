@@ -93,6 +93,22 @@ TEST(TelephonydOptions, ARecordingMayReplaceAnEarlierOneWhereThatIsSaid) {
   EXPECT_EQ(reading.options().existingRecording, ExistingRecording::Replaced);
 }
 
+TEST(TelephonydOptions, ARecordingIsNamedByTheTimeOfTheStart) {
+  const Reading reading = read({"--simulate", "kalvi-lte", "--record", "walk-%%-%Y"});
+  EXPECT_EQ(reading.error, "");
+  const std::string name = reading.options().recordPath.value();
+  EXPECT_TRUE(name.starts_with("walk-%-2")) << name;
+  EXPECT_EQ(name.size(), 11u) << name;
+  EXPECT_TRUE(reading.options().recordPathIsOfNow);
+  EXPECT_FALSE(read({"--simulate", "kalvi-lte", "--record", "walk"}).options().recordPathIsOfNow);
+}
+
+TEST(TelephonydOptions, AFaultForTests) {
+  EXPECT_EQ(read({"--simulate", "kalvi-lte"}).options().fault, Fault{});
+  EXPECT_EQ(read({"--simulate", "kalvi-lte", "--fault", "crash@7"}).options().fault,
+            (Fault{Fault::Kind::Crash, 7}));
+}
+
 TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
   const std::vector<std::vector<const char*>> mistakes = {
       {},
@@ -110,6 +126,8 @@ TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
       {"--replay", "walk.pcap", "--sim", "0"},
       {"--replay", "walk.pcap", "--sim", "256"},
       {"--simulate", "kalvi-lte", "--sim", "1"},
+      {"--simulate", "kalvi-lte", "--fault", "dance"},
+      {"--simulate", "kalvi-lte", "--record", ""},
       {"--replay", "-", "--loop"},
       {"--replay", "/etc/passwd", "--record", "/etc/../etc/passwd"},
       {"--replay", "/etc/no-such-file", "--record", "/etc/../etc/no-such-file"},
@@ -132,7 +150,7 @@ TEST(TelephonydOptions, HelpAndVersionGoToStandardOutput) {
   EXPECT_EQ(std::get<ExitStatus>(help.choice).code, 0);
   for (const char* option :
        {"--port", "--simulate", "--seed", "--replay", "--technology", "--speed", "--loop", "--record",
-        "--overwrite", "--runtime-dir", "--log-level", "--version"})
+        "--overwrite", "--runtime-dir", "--fault", "--log-level", "--version"})
     EXPECT_THAT(help.output, HasSubstr(option));
   const Reading version = read({"--version"});
   EXPECT_EQ(std::get<ExitStatus>(version.choice).code, 0);
