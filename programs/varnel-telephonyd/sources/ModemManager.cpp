@@ -78,8 +78,11 @@ std::vector<ModemManager::Port> portsIn(const QDBusArgument& objects) {
   return ports;
 }
 
+// Does not start the service: its user may have stopped it for the port's sake.
 QDBusMessage callTo(const QString& interface, const char* method) {
-  return QDBusMessage::createMethodCall(service, path, interface, QString::fromLatin1(method));
+  QDBusMessage call = QDBusMessage::createMethodCall(service, path, interface, QString::fromLatin1(method));
+  call.setAutoStartService(false);
+  return call;
 }
 
 QDBusMessage inhibitDevice(const std::string& modem, bool isInhibited) {
