@@ -329,7 +329,8 @@ auto ValueHistory::makeSeries(const std::string& key, std::size_t nameStart, std
     -> SeriesList::iterator {
   std::size_t bytesWanted = Series::bytesWithKey(key.size()) + ValueSeries().bytesOfOneMore();
   // Old and new buckets exist at the same time.
-  if (_byKey.size() + 1 > _byKey.bucket_count()) bytesWanted += 2 * 3 * bytesOfBuckets(_byKey.bucket_count());
+  if (_byKey.size() + 1 > _byKey.bucket_count())
+    bytesWanted += std::size_t{6} * bytesOfBuckets(_byKey.bucket_count());
   if (!makeRoom(bytesWanted)) return _series.end();
   const auto series = _series.insert(_series.end(), Series{.key = std::string(key),
                                                            .nameStart = nameStart,

@@ -4,7 +4,9 @@
 #include <gtest/gtest.h>
 #include <malloc.h>
 
+#include <limits>
 #include <map>
+#include <random>
 
 #include "tests/support/DictionaryOf.h"
 
@@ -580,6 +582,39 @@ TEST(ValueHistoryBounds, GenerationsThatComeVeryFastAreBoundedToo) {
   for (int i = 0; i < 70'000; ++i) history.add(display, {.seconds = noon, .nanoseconds = i});
   EXPECT_EQ(history.samples(*history.seriesOfKey(keyOf(0)), history.whole()).size(), 65'536U);
   EXPECT_LE(history.bytes(), 3'000'000U);
+}
+
+// Displays of any rows at any times, with the same random numbers at each run.
+TEST(ValueHistoryBounds, WhateverIsShownTheSamplesStayInOrderAndTheMemoryBounded) {
+  constexpr std::size_t limit = 60'000;
+  std::mt19937 random(1);  // NOLINT(cert-msc51-cpp): the same numbers at each run
+  const auto below = [&](unsigned end) { return static_cast<int>(random() % end); };
+  ValueHistory history({}, {.length = 10min, .bytes = limit});
+  std::int64_t now = 0;
+  for (int i = 0; i < 2000; ++i) {
+    const int kind = below(50);
+    now += kind == 0 ? -below(100'000) : kind == 1 ? below(100'000) : kind == 2 ? -below(10) : below(5);
+    if (below(500) == 0) history.clear();
+    const auto display = displayOf(below(300), below(60));
+    history.add(display, second(now));
+    ASSERT_LE(history.bytes(), limit);
+    const auto whole = history.whole();
+    for (const auto number : history.series()) {
+      const auto samples = history.samples(number, whole);
+      for (std::size_t j = 1; j < samples.size(); ++j) ASSERT_LE(samples[j - 1].at, samples[j].at);
+      ASSERT_TRUE(samples.empty() || (samples.front().at >= whole.begin && samples.back().at <= whole.end));
+      std::size_t inColumns = 0;
+      for (const auto& column : history.columns(number, whole, 7)) inColumns += column.count;
+      ASSERT_EQ(inColumns, samples.size());
+      ASSERT_EQ(history.summary(number, whole).count, samples.size());
+    }
+    for (const auto& row : *display->childNodes()->front()->childNodes()) {
+      const auto number = history.seriesOf(*row);
+      if (!number) continue;
+      ASSERT_EQ(history.key(*number), "/Section/" + row->displayName());
+      ASSERT_EQ(history.samples(*number, whole).back().at, whole.end);
+    }
+  }
 }
 
 }  // namespace
