@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <memory>
+#include <regex>
 #include <string>
 #include <vector>
 
@@ -190,6 +191,32 @@ TEST_F(PortEndToEnd, EveryRecordArrivesAlsoBetweenAnswersAndBeforeAndAfterAnUnpl
   EXPECT_THAT(telephony->error(),
               HasSubstr("\nvarnel-telephonyd: port: " + std::to_string(1500 + answers) + " records, "));
   EXPECT_THAT(telephony->error(), HasSubstr("(10 with a wrong checksum"));
+}
+
+// Eight megabytes, while the viewer does not run.
+TEST_F(PortEndToEnd, WhatAViewerDoesNotReadIsCounted) {
+  const auto telephony = server();
+  const auto varnel = viewer();
+  ASSERT_TRUE(eventually([&] { return _modem.isOn(0xB0C1); })) << telephony->error();
+  varnel->signal(SIGSTOP);
+  Bytes hundred;
+  for (int i = 0; i < 100; ++i) appendFramed(hundred, logContents(0xB0C1, Bytes(200, 1)));
+  for (int i = 0; i < 400; ++i) {
+    _modem.send(hundred);
+    ASSERT_TRUE(eventually([&] { return _modem.hasSentAll(); }));
+  }
+  telephony->signal(SIGTERM);
+  ASSERT_TRUE(telephony->waitForEnd());
+  EXPECT_THAT(telephony->error(), HasSubstr("\nvarnel-telephonyd: port: 40000 records, 0 frames left out\n"));
+  std::smatch counts;
+  const std::string told = telephony->error();
+  ASSERT_TRUE(std::regex_search(
+      told, counts,
+      std::regex("messages: ([0-9]+) received, ([0-9]+) delivered, ([0-9]+) dropped, ([0-9]+) ")))
+      << told;
+  const auto count = [&](std::size_t index) { return std::stoul(counts[index]); };
+  EXPECT_EQ(count(1), count(2) + count(3) + count(4)) << told;
+  EXPECT_GT(count(3), 0u) << told;
 }
 
 TEST_F(PortEndToEnd, AfterTheModemWasUnpluggedTheDisplayGoesOn) {
