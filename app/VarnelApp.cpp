@@ -38,8 +38,8 @@ void VarnelApp::applicationDidFinishLaunching() {
   setUpdateMessage(std::string(notConnectedStatus));
   _dateFormatter.emplace(updateStatusPattern);
 
-  const auto root =
-      std::make_shared<VarnelPaneController>(_host.userInterface, *this, nullptr, "/", &_changes);
+  const auto root = std::make_shared<VarnelPaneController>(_host.userInterface, *this, nullptr, "/",
+                                                           RowFacts{&_changes, _host.history});
   showFirstStatus(*root);
   _navController = _host.userInterface.makeNavigationStack(root);
   _navController->setDelegate(this);

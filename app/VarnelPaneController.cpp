@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <utility>
 
+#include "app/RowCourse.h"
+
 namespace varnel {
 
 namespace {
@@ -16,13 +18,13 @@ constexpr double statusFontSize = 14;
 }  // namespace
 
 VarnelPaneController::VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node,
-                                           std::string path, const TreeChanges* changes)
+                                           std::string path, const RowFacts& facts)
     : _userInterface(userInterface),
       _saveControl(saveControl),
       _pane(userInterface.makeTablePane()),
       _nodes(std::move(node)),
       _keyPath(std::move(path)),
-      _changes(changes) {
+      _facts(facts) {
   _pane->table().setDelegate(this);
 }
 
@@ -83,7 +85,7 @@ std::unique_ptr<VarnelCell> VarnelPaneController::innerNodeCell(TableView& table
   cell->key().setText(child.displayName());
   cell->cellView().setAccessory(CellAccessory::DisclosureIndicator);
   if (cell->value()) cell->value()->setText("");
-  showChange(*cell, child);
+  showFacts(*cell, child);
   cell->setLayoutKey();
   return cell;
 }
@@ -97,14 +99,16 @@ std::unique_ptr<VarnelCell> VarnelPaneController::leafCell(TableView& table,
   cell->key().setText(child.displayName());
   cell->cellView().setAccessory(CellAccessory::None);
   if (cell->value()) cell->value()->setText(*child.value());
-  showChange(*cell, child);
+  showFacts(*cell, child);
   cell->setLayout();
   return cell;
 }
 
-void VarnelPaneController::showChange(VarnelCell& cell, const VarnelModelNode& child) const {
-  const bool isChanged = _changes && _changes->contains(child);
+void VarnelPaneController::showFacts(VarnelCell& cell, const VarnelModelNode& child) const {
+  const bool isChanged = _facts.changes && _facts.changes->contains(child);
   cell.cellView().setChange(isChanged ? CellChange::Changed : CellChange::None);
+  cell.cellView().setCourse(_facts.history ? recentCourse(*_facts.history, child)
+                                           : std::vector<std::optional<double>>());
 }
 
 void VarnelPaneController::tableView_didSelectRowAtIndexPath(TableView& table,
@@ -115,8 +119,8 @@ void VarnelPaneController::tableView_didSelectRowAtIndexPath(TableView& table,
     table.deselectRow(*path, Animation::None);
     return;
   }
-  const auto next = std::make_shared<VarnelPaneController>(
-      _userInterface, _saveControl, child, childPath(_keyPath, child->displayName()), _changes);
+  const auto next = std::make_shared<VarnelPaneController>(_userInterface, _saveControl, child,
+                                                           childPath(_keyPath, child->displayName()), _facts);
   next->setStatus_isLoading(_status, _isLoading);
   if (navigationController()) navigationController()->push(next, Animation::Animated);
 }

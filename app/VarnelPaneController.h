@@ -5,8 +5,8 @@
 #include <string>
 #include <string_view>
 
+#include "app/RowFacts.h"
 #include "app/SaveControl.h"
-#include "app/TreeChanges.h"
 #include "app/VarnelCell.h"
 #include "model/VarnelModelNode.h"
 #include "platform/ui/UserInterface.h"
@@ -19,10 +19,10 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
  public:
   using Node = std::shared_ptr<const VarnelModelNode>;
 
-  /// A pane for the node with this path. The node is null while there is no tree. User interface, save
-  /// control, and changes must outlive the pane. Without changes, no row is marked as changed.
+  /// A pane for the node with this path. The node is null while there is no tree. User interface, and
+  /// save control must outlive the pane.
   VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node, std::string path,
-                       const TreeChanges* changes = nullptr);
+                       const RowFacts& facts = {});
 
   /// The node's path in the tree, "/" for the root.
   const std::string& path() const { return _keyPath; }
@@ -54,7 +54,7 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
                                             const VarnelModelNode& child) const;
   std::unique_ptr<VarnelCell> leafCell(TableView& table, std::unique_ptr<VarnelCell> reused,
                                        const VarnelModelNode& child) const;
-  void showChange(VarnelCell& cell, const VarnelModelNode& child) const;
+  void showFacts(VarnelCell& cell, const VarnelModelNode& child) const;
   std::optional<IndexPath> rowNamed(std::string_view name) const;
   Node childAt(const IndexPath& path) const;
   void showTitle();
@@ -64,7 +64,7 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
   std::unique_ptr<TablePane> _pane;
   Node _nodes;
   std::string _keyPath;
-  const TreeChanges* const _changes;
+  const RowFacts _facts;
   std::string _status;
   bool _isLoading = true;
 };

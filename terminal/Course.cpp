@@ -18,8 +18,8 @@ std::wstring courseInBlocks(std::span<const std::optional<double>> values, int c
   std::wstring line;
   const auto top = static_cast<double>(glyphs.blocks.size() - 1);
   for (const auto& value : values) {
-    // A value that does not change is in the middle.
-    const double share = !value || *highest == *lowest ? 0.5 : (*value - *lowest) / (*highest - *lowest);
+    // A value that does not change is a low line.
+    const double share = !value || *highest == *lowest ? 0 : (*value - *lowest) / (*highest - *lowest);
     line.push_back(value ? glyphs.blocks[static_cast<std::size_t>(share * top + 0.5)] : L' ');
   }
   return line;

@@ -133,14 +133,27 @@ std::optional<Key> typedKey(wchar_t character) {
   return Key::of(character);
 }
 
-// ncurses would end the program by itself, without what else there is to do.
-void takeSignalsBack() {
-  for (const int signal : {SIGINT, SIGTERM, SIGTSTP, SIGWINCH}) {
-    struct sigaction action {};
-    if (::sigaction(signal, nullptr, &action) == 0 && action.sa_handler != SIG_IGN)
-      std::signal(signal, SIG_DFL);
+void doNothing(int) {}
+
+// A signal that has its usual effect gets a handler that ncurses leaves alone. Otherwise ncurses would end
+// the program by itself, without what else there is to do, and would drop a SIGTSTP that comes while it
+// writes.
+class SignalsFromNcurses {
+ public:
+  SignalsFromNcurses() { exchange(SIG_DFL, doNothing); }
+  SignalsFromNcurses(const SignalsFromNcurses&) = delete;
+  SignalsFromNcurses& operator=(const SignalsFromNcurses&) = delete;
+  ~SignalsFromNcurses() { exchange(doNothing, SIG_DFL); }
+
+ private:
+  static void exchange(sighandler_t former, sighandler_t next) {
+    for (const int signal : {SIGINT, SIGTERM, SIGTSTP, SIGWINCH}) {
+      struct sigaction action {};
+      if (::sigaction(signal, nullptr, &action) == 0 && action.sa_handler == former)
+        std::signal(signal, next);
+    }
   }
-}
+};
 
 }  // namespace
 
@@ -151,9 +164,11 @@ CursesScreen::CursesScreen() : _hasUnicode(takesUtf8()) {
   useUtf8Characters();
   ::tcgetattr(STDIN_FILENO, &_formerMode);
   if (!std::getenv("ESCDELAY")) ::set_escdelay(escapeDelay);
-  _screen = ::newterm(nullptr, stdout, stdin);
+  {
+    const SignalsFromNcurses kept;
+    _screen = ::newterm(nullptr, stdout, stdin);
+  }
   if (!_screen) refuse("the terminal cannot be used");
-  takeSignalsBack();
   TerminalRescue::arm(_formerMode, waysToLeave());
   ::raw();
   ::noecho();
@@ -189,7 +204,8 @@ std::string CursesScreen::waysToLeave() const {
 }
 
 void CursesScreen::leave() {
-  if (::isendwin()) return;
+  if (_isLeft) return;
+  _isLeft = true;
   ::curs_set(1);
   ::endwin();
   // What the mouse has sent meanwhile must not reach the shell.
@@ -203,9 +219,12 @@ void CursesScreen::enter() {
   ::tcgetattr(STDIN_FILENO, &_formerMode);
   ::def_shell_mode();
   TerminalRescue::arm(_formerMode, waysToLeave());
+  _isLeft = false;
   ::reset_prog_mode();
-  updateSize();
+  // This takes the screen again, with the keys, the cursor, and the mouse as they were.
+  ::refresh();
   ::curs_set(0);
+  updateSize();
   redraw();
 }
 
@@ -219,7 +238,7 @@ int CursesScreen::columns() const { return getmaxx(::stdscr); }
 int CursesScreen::rows() const { return getmaxy(::stdscr); }
 
 void CursesScreen::show(const CellGrid& grid) {
-  if (::isendwin()) return;
+  if (_isLeft) return;
   for (int row = 0; row < std::min(grid.rows(), rows()); ++row) {
     for (int column = 0; column < std::min(grid.columns(), columns()); ++column) {
       const GridCell& cell = grid.at(column, row);
@@ -244,7 +263,7 @@ void CursesScreen::show(const CellGrid& grid) {
 void CursesScreen::redraw() { ::clearok(stdscr, TRUE); }
 
 std::optional<Key> CursesScreen::nextKey() {
-  if (::isendwin()) return std::nullopt;
+  if (_isLeft) return std::nullopt;
   for (;;) {
     wint_t typed = 0;
     const int kind = ::get_wch(&typed);

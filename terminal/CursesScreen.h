@@ -53,6 +53,7 @@ class CursesScreen final {
   termios _formerMode{};
   bool _hasUnicode;
   bool _hasColors = false;
+  bool _isLeft = false;
   ::screen* _screen = nullptr;
 };
 

@@ -23,6 +23,7 @@ constexpr std::string_view keysOfHelp =
     "/                           find a row in the whole display\n"
     "s Ctrl+S                    save a snapshot, on devices that allow it\n"
     "R Ctrl+R                    start over with an empty display\n"
+    "T                           the course of the row's value over time\n"
     "L                           the last log lines\n"
     "Ctrl+L                      draw the screen anew\n"
     "Ctrl+Z                      back to the shell; fg returns\n"
@@ -122,6 +123,10 @@ KeyUse TerminalUserInterface::takeAsOwn(const Key& key) {
     open(std::make_unique<FindPage>(_wishes.find, _wishes.goTo));
     return KeyUse::Used;
   }
+  if (key.is(L'T') && _wishes.course) {
+    showCourse();
+    return KeyUse::Used;
+  }
   if (key.is(L'L') && _wishes.heldLines) {
     open(std::make_unique<LinesPage>(L"Log lines", _wishes.heldLines, LinesPage::Start::End));
     return KeyUse::Used;
@@ -142,6 +147,14 @@ void TerminalUserInterface::showHelp() {
     const std::string about = _wishes.explain ? _wishes.explain(path) : std::string();
     return about + std::string(keysOfHelp.substr(about.empty() ? 1 : 0));
   }));
+}
+
+void TerminalUserInterface::showCourse() {
+  if (auto source = _wishes.course(pathOfFocus())) {
+    open(std::make_unique<CoursePage>(std::move(source)));
+  } else {
+    showAlert({"No course", "The value of this row is no number.", "Close"});
+  }
 }
 
 void TerminalUserInterface::turnWheel() {

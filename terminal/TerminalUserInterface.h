@@ -8,6 +8,7 @@
 #include "platform/MainQueue.h"
 #include "platform/ui/UserInterface.h"
 #include "terminal/CellGrid.h"
+#include "terminal/CoursePage.h"
 #include "terminal/FindPage.h"
 #include "terminal/Glyphs.h"
 #include "terminal/Key.h"
@@ -32,6 +33,8 @@ class TerminalUserInterface final : public UserInterface {
     FindPage::GoTo goTo{};
     /// Lines about the row with the focus; absent names mean that there is none.
     std::function<std::string(const std::vector<std::string>& path)> explain{};
+    /// The course of the value of that row; empty when there is none.
+    std::function<CoursePage::Source(const std::vector<std::string>& path)> course{};
     /// The last lines that were held back while the screen is in use.
     std::function<std::string()> heldLines{};
     /// The user wants the shell back for a while.
@@ -68,6 +71,7 @@ class TerminalUserInterface final : public UserInterface {
   KeyUse takeAsOwn(const Key& key);
   void open(std::unique_ptr<Overlay> overlay);
   void showHelp();
+  void showCourse();
   std::vector<std::string> pathOfFocus() const;
   void turnWheel();
   TerminalStack* stack() const { return _window ? _window->visibleRoot() : nullptr; }

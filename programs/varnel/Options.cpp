@@ -13,7 +13,7 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       "In the window: arrow keys, Return to open, Escape to go back, Shift and Left or Right\n"
       "for long values, Ctrl+S to save a snapshot, Ctrl+R to start over, Ctrl+Q to end.\n"
       "In a terminal: the same, and j, k, h, l, g, G; s to save, R to start over, q to end,\n"
-      "/ to find a row, L for log lines, ? for all keys.\n"
+      "/ to find a row, T for the course of a value, L for log lines, ? for all keys.\n"
       "As text: S to save a snapshot, R to start over, Q to end.\n"
       "\n"
       "VARNEL_RESOURCES in the environment names the folder of the display templates and the\n"

@@ -5,12 +5,14 @@
 
 #include <QSocketNotifier>
 #include <csignal>
+#include <cstdio>
 #include <cstdlib>
 #include <iostream>
 #include <optional>
 
 #include "app/DateFormatter.h"
 #include "app/PrintableText.h"
+#include "app/ValueHistory.h"
 #include "app/VarnelApp.h"
 #include "host/HostApplication.h"
 #include "host/SignalWatcher.h"
@@ -36,6 +38,36 @@ void stopHere() {
   ::pthread_sigmask(SIG_BLOCK, &stop, nullptr);
 }
 
+std::string timeOfDay(Time time) {
+  const SystemClock clock;
+  return DateFormatter("HH:mm:ss").string(time, clock.zoneAt(time));
+}
+
+std::optional<CourseColumns> courseColumns(const ValueHistory& history, ValueHistory::Number number,
+                                           const std::string& name, std::chrono::minutes length,
+                                           int columns) {
+  if (!history.has(number)) return std::nullopt;
+  const auto stretch = history.last(length);
+  CourseColumns course;
+  course.name = name;
+  course.unit = history.unit(number);
+  const auto summary = history.summary(number, stretch);
+  char text[160];
+  std::snprintf(text, sizeof text, "now %g   lowest %g   mean %.6g   highest %g", summary.last,
+                summary.lowest, summary.mean, summary.highest);
+  course.summary = text;
+  course.begin = timeOfDay(history.timeAt(stretch.begin));
+  course.end = timeOfDay(history.timeAt(stretch.end));
+  for (const auto& column : history.columns(number, stretch, static_cast<std::size_t>(columns))) {
+    if (column.isEmpty) {
+      course.columns.emplace_back();
+    } else {
+      course.columns.emplace_back(CourseColumns::Range{column.lowest, column.highest});
+    }
+  }
+  return course;
+}
+
 /// The viewer on a terminal, from start to end.
 class TerminalViewer final {
  public:
@@ -53,12 +85,13 @@ class TerminalViewer final {
              .find = [this](const std::string& words) { return found(words); },
              .goTo = [this](const FoundRow& row) { _app.goTo(row.path); },
              .explain = [this](const std::vector<std::string>& path) { return explained(path); },
+             .course = [this](const std::vector<std::string>& path) { return courseOf(path); },
              .heldLines = [this] { return heldLines(); },
              .suspend = [] { ::kill(0, SIGTSTP); },
              .redraw = [this] { _screen->redraw(); }},
             [this](const CellGrid& grid) { _screen->show(grid); }, _screen->glyphs()),
         _app({_services.model(_held.lines()), _services.files(), _services.preferences(), _userInterface,
-              "press R"}),
+              "press R", &_history}),
         _input(STDIN_FILENO, QSocketNotifier::Read),
         _trimming(_services.queue().repeating(intervalOfTrimming, [this] { _held.trim(); })) {
     QObject::connect(&_input, &QSocketNotifier::activated, &_input, [this] { takeKeys(); });
@@ -95,6 +128,17 @@ class TerminalViewer final {
     std::vector<FoundRow> rows;
     for (auto& node : _app.find(words)) rows.push_back({std::move(node.path), std::move(node.value)});
     return rows;
+  }
+
+  CoursePage::Source courseOf(const NamePath& path) const {
+    const VarnelModelNode* const node = path.empty() ? nullptr : _app.nodeAt(path);
+    const auto series = node ? _history.seriesOf(*node) : std::nullopt;
+    if (!series) return {};
+    std::string name;
+    for (const std::string& part : path) name.append(name.empty() ? "" : " > ").append(part);
+    return [this, name, number = *series](std::chrono::minutes length, int columns) {
+      return courseColumns(_history, number, name, length, columns);
+    };
   }
 
   std::string heldLines() const {
@@ -155,6 +199,7 @@ class TerminalViewer final {
   HostServices _services;
   std::optional<CursesScreen> _screen;
   TerminalUserInterface _userInterface;
+  ValueHistory _history;
   VarnelApp _app;
   QSocketNotifier _input;
   std::unique_ptr<RepeatingTimer> _trimming;

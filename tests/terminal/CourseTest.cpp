@@ -15,9 +15,7 @@ TEST(Course, TheNewestValuesAreShown) {
   EXPECT_EQ(courseInBlocks(Values{100, 1, 2}, 2, unicodeGlyphs), L"▁█");
 }
 
-TEST(Course, AStandingValueIsInTheMiddle) {
-  EXPECT_EQ(courseInBlocks(Values{7, 7}, 5, unicodeGlyphs), L"▅▅");
-}
+TEST(Course, AStandingValueIsALowLine) { EXPECT_EQ(courseInBlocks(Values{7, 7}, 5, unicodeGlyphs), L"▁▁"); }
 
 TEST(Course, ABlankStandsWhereThereIsNoValue) {
   EXPECT_EQ(courseInBlocks(Values{1, {}, 2}, 3, unicodeGlyphs), L"▁ █");

@@ -101,6 +101,7 @@ class TerminalScreens : public testing::Test {
            },
        .goTo = [this](const FoundRow& row) { app.goTo(row.path); },
        .explain = [](const std::vector<std::string>& path) { return "About " + path.back() + "\n"; },
+       .course = [this](const std::vector<std::string>& path) { return courseOf(path); },
        .heldLines = [this] { return held; },
        .suspend = [this] { wishes.emplace_back("suspend"); },
        .redraw = [this] { wishes.emplace_back("redraw"); }},
@@ -108,6 +109,20 @@ class TerminalScreens : public testing::Test {
         picture = grid;
         ++pictures;
       }};
+  // "State" has a course of as many columns as are asked for, which rises from 1 to 2.
+  CoursePage::Source courseOf(const std::vector<std::string>& path) const {
+    if (path.back() != "State") return {};
+    return [this](std::chrono::minutes length, int columns) -> std::optional<CourseColumns> {
+      if (hasLostCourse) return std::nullopt;
+      CourseColumns course{"State", "dB", "over " + std::to_string(length.count()), "12:00", "12:05", {}};
+      course.columns.resize(static_cast<std::size_t>(columns), CourseColumns::Range{1, 1});
+      course.columns.front().reset();
+      course.columns.back() = CourseColumns::Range{1, 2};
+      return course;
+    };
+  }
+
+  bool hasLostCourse = false;
   std::string held = "first line\nlast line\n";
   VarnelApp app{{{ports, telephony, queue, host.services, writeXmlPropertyList, &link},
                  files,
@@ -310,6 +325,38 @@ TEST_F(TerminalScreens, LShowsTheLastHeldLines) {
   EXPECT_EQ(line(1), "first line");
   type(L"L");
   EXPECT_EQ(line(1), " PDP Context Info                      ›");
+}
+
+TEST_F(TerminalScreens, TShowsTheCourseOfTheRowsValue) {
+  launch();
+  type(L"ll");
+  press(Key::Kind::Down);
+  type(L"T");
+  const std::string bars = "▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁▁";
+  EXPECT_EQ(shown(),
+            " State in dB\n"
+            " over 5\n"
+            "        2                              █\n" +
+                std::string(39, ' ') + "█\n" + std::string(39, ' ') + "█\n" + "        1  " + bars +
+                "█\n"
+                "          12:00                    12:05\n"
+                " 5 minutes             + - Time  q Back\n");
+  type(L"+");
+  EXPECT_EQ(line(1), " over 20");
+  type(L"---");
+  EXPECT_EQ(line(1), " over 1");
+  EXPECT_THAT(line(7), testing::StartsWith(" 1 minute "));
+  hasLostCourse = true;
+  type(L"+");
+  EXPECT_EQ(line(0), " This value has gone");
+  type(L"T");
+  EXPECT_EQ(line(0), " PDP Context Info › 0");
+}
+
+TEST_F(TerminalScreens, ARowWithoutANumberHasNoCourse) {
+  launch();
+  type(L"T");
+  EXPECT_THAT(shown(), HasSubstr("The value of this row is no number."));
 }
 
 TEST_F(TerminalScreens, SOpensTheSaveScreenOnDevicesThatAllowIt) {
