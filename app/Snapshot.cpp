@@ -5,10 +5,6 @@
 
 namespace varnel {
 
-namespace {
-constexpr std::string_view snapshotFolder = "/var/mobile/Library/Logs/CrashReporter";
-}
-
 Value snapshotContents(Time created, const Value& saveContents,
                        const std::optional<std::string>& description) {
   Value contents = Value::ofDictionary();

@@ -1,6 +1,7 @@
 #include "programs/varnel/HostServices.h"
 
 #include "base/PropertyList.h"
+#include "host/Printable.h"
 #include "host/RuntimeFolder.h"
 
 namespace varnel {
@@ -13,10 +14,15 @@ HostServices::HostServices(const Options& options, const ApplicationInfo& applic
       _portsOfSubscription(_ports, _link, options.subscription),
       _telephony(_folder, std::chrono::seconds(1), &_link),
       _resources(readableResourceFolder()),
-      _files(options.deviceRoot),
-      _preferences(options.deviceRoot),
+      _deviceRoot(deviceRoot(options.deviceRoot)),
+      _files(_deviceRoot.folder),
+      _preferences(_deviceRoot.folder),
       _application(application),
-      _identities(options.showsIdentities ? Identities::Shown : Identities::Hidden) {}
+      _identities(options.showsIdentities ? Identities::Shown : Identities::Hidden) {
+  if (_deviceRoot.failure.empty()) return;
+  std::cerr << programName << ": " << printable(_deviceRoot.failure)
+            << "; name one that stands for a device with --device-root\n";
+}
 
 ModelServices HostServices::model(std::ostream& standardOutput) {
   return {_portsOfSubscription,

@@ -13,6 +13,7 @@
 #include "host/SubscriptionPorts.h"
 #include "host/SystemClock.h"
 #include "model/VarnelModel.h"
+#include "programs/varnel/DeviceRoot.h"
 #include "programs/varnel/Options.h"
 
 namespace varnel {
@@ -40,6 +41,7 @@ class HostServices final {
   EventLoopQueue _queue;
   FileResources _resources;
   SystemClock _clock;
+  const DeviceRoot _deviceRoot;
   RootedFiles _files;
   FilePreferences _preferences;
   const ApplicationInfo& _application;

@@ -8,7 +8,7 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
   parser.description("Shows what the cellular modem behind the telephony server sees.");
   parser.footer(
       "SIGUSR1 starts over with an empty display. SIGUSR2 saves a snapshot into\n"
-      "var/mobile/Library/Logs/CrashReporter under the device root, on devices that allow it.\n"
+      "var/mobile/Library/Logs/CrashReporter under the device root, if the device allows it.\n"
       "\n"
       "In the window: arrow keys, Return to open, Escape to go back, Shift and Left or Right\n"
       "for long values, Ctrl+S to save a snapshot, Ctrl+R to start over, Ctrl+Q to end.\n"
@@ -29,9 +29,9 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       ->capture_default_str();
   parser
       .add_option("--device-root", options.deviceRoot,
-                  "the folder that stands for the root of the device's file system")
-      ->type_name("DIR")
-      ->capture_default_str();
+                  "the folder that stands for the root of the device's file system; $XDG_STATE_HOME/varnel "
+                  "unless given or / is a device")
+      ->type_name("DIR");
   parser
       .add_option("--runtime-dir", options.runtimeFolder,
                   "where viewer and server meet; $XDG_RUNTIME_DIR/varnel unless given")

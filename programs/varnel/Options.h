@@ -13,7 +13,7 @@ inline constexpr const char* programName = "varnel";
 /// What the command line asks for.
 struct Options {
   std::string userInterface = "auto";
-  std::string deviceRoot = "/";
+  std::optional<std::string> deviceRoot;  ///< absent: / if that is a device, else the program's state folder
   std::optional<std::string> runtimeFolder;
   int logLevel = -1;  ///< the highest priority number that goes to standard error; -1 for none
   std::optional<unsigned> updates;

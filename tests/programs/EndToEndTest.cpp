@@ -353,6 +353,41 @@ TEST_F(EndToEnd, ASnapshotIsSavedOnlyWithTheMarker) {
   EXPECT_TRUE(eventually([&] { return contentsOf(snapshot).find("DLF binary (") != std::string::npos; }));
 }
 
+// This machine is no device, so the viewer has one of its own.
+TEST_F(EndToEnd, WithoutADeviceSnapshotsGoToTheStateFolderAndTheNoticeSaysWhere) {
+  namespace fs = std::filesystem;
+  const fs::path logs = _device.path() / "varnel/var/mobile/Library/Logs/CrashReporter";
+  const auto telephony = server();
+  const Process varnel(VARNEL_PROGRAM, {"--ui", "text", "--runtime-dir", _runtime.path(), "--log-level", "3"},
+                       {"XDG_STATE_HOME=" + _device.path().string()});
+  ASSERT_TRUE(eventually([&] { return occurrences(varnel.output(), "EF-ICCID") >= 1; }));
+  varnel.signal(SIGUSR2);
+  const std::string place = (logs / "VarnelSnapshot-").string();
+  ASSERT_TRUE(eventually([&] {
+    return varnel.output().find("Notice: Saved: " + place) != std::string::npos;
+  })) << varnel.output();
+  EXPECT_EQ(std::distance(fs::directory_iterator(logs), fs::directory_iterator()), 1);
+
+  fs::remove_all(logs);
+  varnel.signal(SIGUSR2);
+  ASSERT_TRUE(eventually([&] {
+    return varnel.output().find("Notice: Not saved: " + place) != std::string::npos;
+  })) << varnel.output();
+  EXPECT_THAT(varnel.error(), HasSubstr("<3>Unable to write snapshot to "));
+  EXPECT_FALSE(fs::exists(logs));
+}
+
+TEST_F(EndToEnd, AViewerThatCannotMakeItsSnapshotFolderSaysSoAndGoesOn) {
+  const auto telephony = server();
+  std::ofstream(_device.file("varnel")) << "in the way";
+  Process varnel(VARNEL_PROGRAM, {"--ui", "text", "--runtime-dir", _runtime.path(), "--updates", "1"},
+                 {"XDG_STATE_HOME=" + _device.path().string()});
+  ASSERT_TRUE(varnel.waitForEnd());
+  EXPECT_EQ(varnel.exitStatus(), 0);
+  EXPECT_EQ(varnel.error(), "varnel: the folder for snapshots cannot be made in " + _device.file("varnel") +
+                                ": Not a directory; name one that stands for a device with --device-root\n");
+}
+
 TEST_F(EndToEnd, TheWindowEndsAfterItsUpdatesAndPutsThePreferenceBack) {
   const auto telephony = server();
   const auto varnel = window({"--updates", "2"}, "QT_QPA_PLATFORM=offscreen");
