@@ -4,6 +4,7 @@
 #include <cerrno>
 #include <iterator>
 #include <system_error>
+#include <utility>
 #include <vector>
 
 #include "host/StreamReport.h"
@@ -37,8 +38,8 @@ constexpr Cause connectCauses[] = {
 };
 
 constexpr Cause channelCauses[] = {
-    {protocol::missingRights, "the telephony server in % misses rights of this viewer",
-     "use programs of one version"},
+    {protocol::missingRights, "the telephony server in % gives this user no log channel",
+     "become a member of the group that its option --allow-group names"},
     {protocol::noReply, "the telephony server in % does not answer", startServerAgain},
     {protocol::malformedReply, "the telephony server in % cannot be understood",
      "use programs of one version"},
@@ -80,6 +81,11 @@ std::string LinkMonitor::mixture() const {
          " send; to see one of them alone, start varnel with --sim " + std::to_string(numbers.front());
 }
 
+void LinkMonitor::looksInto(std::filesystem::path runtimeFolder, std::string obstacle) {
+  _folder = std::move(runtimeFolder);
+  _obstacle = std::move(obstacle);
+}
+
 void LinkMonitor::linkIsOpen() {
   _report = {};
   _shownSubscriptions.reset();
@@ -90,6 +96,7 @@ void LinkMonitor::tell(std::string_view what, std::string_view whatToDo) {
   if (const auto at = _report.trouble.find('%'); at != std::string::npos)
     _report.trouble.replace(at, 1, _folder.string());
   if (!whatToDo.empty()) _report.trouble.append("; ").append(whatToDo);
+  if (!_obstacle.empty()) _report.trouble.append("; ").append(_obstacle);
 }
 
 void LinkMonitor::portNameIsTaken() {

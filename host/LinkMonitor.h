@@ -17,6 +17,9 @@ class LinkMonitor final : public LinkReports {
 
   LinkReport linkReport() const override;
 
+  /// The viewer looks into this folder from now on. What keeps it from looking into another one is one
+  /// sentence, or empty.
+  void looksInto(std::filesystem::path runtimeFolder, std::string obstacle);
   /// Another process has a port with the name of this viewer's port.
   void portNameIsTaken();
   /// A port or a connection could not be made. The reason is one sentence.
@@ -39,7 +42,8 @@ class LinkMonitor final : public LinkReports {
   void tell(std::string_view what, std::string_view whatToDo);
   std::string mixture() const;
 
-  const std::filesystem::path _folder;
+  std::filesystem::path _folder;
+  std::string _obstacle;
   LinkReport _report;
   std::bitset<256> _shownSubscriptions;
 };

@@ -39,11 +39,12 @@ Bytes replyFrom(SocketConnection& connection, const QDeadlineTimer& deadline) {
 
 ServerStatus ServerControl::ask(const ControlRequest& request) const {
   const QDeadlineTimer deadline(_replyTimeout);
-  const auto [connection, error] = SocketConnection::open(socketPath(_folder, controlProtocol::socketName));
-  if (!connection) throw std::runtime_error(whyOutOfReach(_folder, error));
+  const auto [connection, error] =
+      SocketConnection::open(socketPath(_folder.path, controlProtocol::socketName), _folder.access);
+  if (!connection) throw std::runtime_error(whyOutOfReach(_folder.path, error));
   connection->send({0, FrameMark::Request, controlProtocol::writeRequest(request)});
   const Bytes bytes = replyFrom(*connection, deadline);
-  const std::string server = "the telephony server in " + _folder.string();
+  const std::string server = "the telephony server in " + _folder.path.string();
   if (bytes.empty()) throw std::runtime_error(server + " does not answer; end it and start it again");
   const auto reply = controlProtocol::readReply(bytes);
   if (!reply) throw std::runtime_error(server + " cannot be understood; use programs of one version");

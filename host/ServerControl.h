@@ -1,9 +1,9 @@
 #pragma once
 
 #include <chrono>
-#include <filesystem>
 
 #include "host/ControlProtocol.h"
+#include "host/RuntimeFolder.h"
 
 namespace varnel {
 
@@ -14,7 +14,7 @@ namespace varnel {
 class ServerControl final {
  public:
   /// `runtimeFolder` is that of the server.
-  explicit ServerControl(std::filesystem::path runtimeFolder,
+  explicit ServerControl(RuntimeFolder runtimeFolder,
                          std::chrono::milliseconds replyTimeout = std::chrono::seconds(2))
       : _folder(std::move(runtimeFolder)), _replyTimeout(replyTimeout) {}
 
@@ -42,7 +42,7 @@ class ServerControl final {
   ServerStatus ask(const ControlRequest& request) const;
 
  private:
-  const std::filesystem::path _folder;
+  const RuntimeFolder _folder;
   const std::chrono::milliseconds _replyTimeout;
 };
 

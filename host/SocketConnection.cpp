@@ -3,7 +3,6 @@
 #include <poll.h>
 #include <sys/socket.h>
 #include <sys/un.h>
-#include <unistd.h>
 
 #include <cerrno>
 #include <stdexcept>
@@ -43,14 +42,15 @@ std::filesystem::path socketPath(const std::filesystem::path& folder, std::strin
   return path;
 }
 
-SocketConnection::Opening SocketConnection::open(const std::filesystem::path& path) {
+SocketConnection::Opening SocketConnection::open(const std::filesystem::path& path,
+                                                 const PeerAccess& access) {
   FileDescriptor socket(::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
   const sockaddr_un address = socketAddress(path);
   if (::connect(socket.number(), reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0)
     return {nullptr, errno};
-  auto connection = std::make_unique<SocketConnection>(std::move(socket));
-  if (!connection->hasTrustedPeer()) return {nullptr, EPERM};
-  return {std::move(connection), 0};
+  const auto peer = peerOf(socket.number());
+  if (!peer || !access.accepts(*peer)) return {nullptr, EPERM};
+  return {std::make_unique<SocketConnection>(std::move(socket)), 0};
 }
 
 SocketConnection::SocketConnection(FileDescriptor socket, std::shared_ptr<const void> place,
@@ -78,14 +78,6 @@ SocketConnection::~SocketConnection() {
   _activityHandler = nullptr;
   while (_socket->flush()) {
   }
-}
-
-bool SocketConnection::hasTrustedPeer() const {
-  ucred peer{};
-  socklen_t size = sizeof peer;
-  const auto descriptor = static_cast<int>(_socket->socketDescriptor());
-  if (::getsockopt(descriptor, SOL_SOCKET, SO_PEERCRED, &peer, &size) != 0) return false;
-  return isTrusted(peer.uid, ::geteuid());
 }
 
 bool SocketConnection::isOpen() const { return _socket->state() == QLocalSocket::ConnectedState; }
@@ -117,7 +109,10 @@ std::optional<Frame> SocketConnection::nextFrame() {
       _isOverdue = false;
       return frame;
     }
-    if (_reader.isFaulty()) _socket->abort();
+    if (_reader.isFaulty() && isOpen()) {
+      logWarning("A peer has sent what is no frame: the connection ends");
+      _socket->abort();
+    }
     if (!isOpen() && _socket->bytesAvailable() == 0) return std::nullopt;
     if (feedReader()) continue;
     // What came while this program was held up still counts.
@@ -145,8 +140,11 @@ void SocketConnection::watchFrameTime() {
 }
 
 void SocketConnection::send(const Frame& frame) {
-  if (!hasRoom()) _socket->abort();
   if (!isOpen()) return;
+  if (!hasRoom()) {
+    logWarning("A peer does not read what it is sent: the connection ends");
+    return _socket->abort();
+  }
   _outgoing.clear();
   appendFrame(_outgoing, frame);
   _socket->write(reinterpret_cast<const char*>(_outgoing.data()), static_cast<qint64>(_outgoing.size()));

@@ -1,6 +1,5 @@
 #pragma once
 
-#include <sys/types.h>
 #include <sys/un.h>
 
 #include <QDeadlineTimer>
@@ -15,6 +14,7 @@
 #include <string_view>
 
 #include "host/FileDescriptor.h"
+#include "host/PeerAccess.h"
 #include "host/PortFrame.h"
 
 namespace varnel {
@@ -25,9 +25,6 @@ std::filesystem::path socketPath(const std::filesystem::path& folder, std::strin
 
 /// The address of a socket whose path `socketPath` has made.
 sockaddr_un socketAddress(const std::filesystem::path& path);
-
-/// Whether a process of user `self` trusts a peer of user `peer`: the same user, or root.
-constexpr bool isTrusted(uid_t peer, uid_t self) { return peer == self || peer == 0; }
 
 /// The longest time that a frame may take from its first byte to its last.
 inline constexpr std::chrono::milliseconds longestFrameTime = std::chrono::seconds(10);
@@ -40,8 +37,8 @@ class SocketConnection final {
     int error = 0;                                 ///< the system's; EPERM for an untrusted peer
   };
   /// Connects to the socket at this path, at once or not at all: it does not wait for a peer whose queue is
-  /// full.
-  static Opening open(const std::filesystem::path& path);
+  /// full. The peer is the user who listens there.
+  static Opening open(const std::filesystem::path& path, const PeerAccess& access = PeerAccess());
 
   /// Takes over a connected socket. It holds its place among the server's connections until it is destroyed.
   /// A frame that is not complete after `frameTime` ends the connection.
@@ -52,8 +49,6 @@ class SocketConnection final {
   /// Sends what can be sent without waiting.
   ~SocketConnection();
 
-  /// True when the peer's process belongs to a trusted user.
-  bool hasTrustedPeer() const;
   /// False once the peer is known to have gone, or has sent what is no frame. Frames that came before can
   /// still be taken.
   bool isOpen() const;

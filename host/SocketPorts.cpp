@@ -17,11 +17,12 @@ namespace {
 
 class SocketLocalPort final : public LocalPort {
  public:
-  SocketLocalPort(const std::filesystem::path& path, MessageHandler handler)
+  SocketLocalPort(const RuntimeFolder& folder, std::string_view name, MessageHandler handler)
       : _delivery(std::make_shared<Delivery>(Delivery{std::move(handler)})),
         _server(std::make_unique<SocketServer>(
-            path, [this](std::unique_ptr<SocketConnection> peer) { setPeer(std::move(peer)); },
-            SocketLimits{.connections = 1})) {}
+            socketPath(folder.path, name),
+            [this](std::unique_ptr<SocketConnection> peer) { setPeer(std::move(peer)); },
+            SocketLimits{.connections = 1}, SocketGate{.access = folder.access})) {}
   SocketLocalPort(const SocketLocalPort&) = delete;
   SocketLocalPort& operator=(const SocketLocalPort&) = delete;
   ~SocketLocalPort() override { end(); }
@@ -178,7 +179,7 @@ MessagePorts::LocalPortCreation SocketPorts::createLocalPort(std::string_view na
                                                              LocalPort::MessageHandler handler) {
   if (_monitor) handler = showingReports(*_monitor, std::move(handler));
   try {
-    return {std::make_unique<SocketLocalPort>(socketPath(_folder, name), std::move(handler)), false};
+    return {std::make_unique<SocketLocalPort>(_folder, name, std::move(handler)), false};
   } catch (const SocketNameTaken&) {
     if (_monitor) _monitor->portNameIsTaken();
     return {nullptr, true};
@@ -191,7 +192,7 @@ MessagePorts::LocalPortCreation SocketPorts::createLocalPort(std::string_view na
 
 std::unique_ptr<RemotePort> SocketPorts::createRemotePort(std::string_view name) {
   try {
-    auto [connection, error] = SocketConnection::open(socketPath(_folder, name));
+    auto [connection, error] = SocketConnection::open(socketPath(_folder.path, name), _folder.access);
     if (_monitor && connection) _monitor->linkIsOpen();
     if (_monitor && !connection) _monitor->serverIsOutOfReach(error);
     return connection ? std::make_unique<SocketRemotePort>(std::move(connection), _monitor) : nullptr;

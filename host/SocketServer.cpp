@@ -19,11 +19,14 @@ namespace {
 namespace fs = std::filesystem;
 using namespace std::chrono_literals;
 
+constexpr std::string_view lockSuffix = ".lock";
 constexpr int connectionQueue = 128;
 // After this many the server lets the rest of the program run.
 constexpr int connectionsAtATime = 64;
 constexpr std::chrono::milliseconds refusalLineInterval = 10s;
 constexpr std::chrono::milliseconds descriptorWait = 100ms;
+// Members of the group can make any number of files in a shared folder.
+constexpr int mostLooks = 1000;
 
 SocketFile identityOf(const struct stat& status) { return {status.st_dev, status.st_ino}; }
 
@@ -45,6 +48,8 @@ std::optional<SocketFile> fileOf(const FileDescriptor& file) {
   throw SocketNameTaken("another process serves " + path.string());
 }
 
+fs::path lockPathOf(const fs::path& socketPath) { return socketPath.string() + std::string(lockSuffix); }
+
 FileDescriptor localSocket() {
   return FileDescriptor(::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
 }
@@ -57,20 +62,37 @@ bool isServed(const fs::path& path) {
          errno == EAGAIN;
 }
 
+// Members of a shared folder's group find out whether a name is taken, and the server clears away what
+// viewers of other users left behind.
+mode_t modeFor(const SocketGate& gate) { return gate.access.isShared() ? 0660 : 0600; }
+
 FileDescriptor spareDescriptor() { return FileDescriptor(::open("/dev/null", O_RDONLY | O_CLOEXEC)); }
 
 }  // namespace
 
-SocketServer::NameLock::NameLock(const fs::path& socketPath)
-    : _path(socketPath.string() + ".lock"), _socketPath(socketPath) {
+SocketServer::NameLock::NameLock(const fs::path& socketPath, mode_t mode)
+    : _path(lockPathOf(socketPath)), _socketPath(socketPath), _mode(mode) {
   lock();
+}
+
+// A system can forbid to open another user's file in a shared folder for a program that would also make it.
+// So opening and making are two steps.
+FileDescriptor SocketServer::NameLock::openOrMake() const {
+  while (true) {
+    FileDescriptor file(::open(_path.c_str(), O_RDWR | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK));
+    if (file.isOpen() || errno != ENOENT) return file;
+    file = FileDescriptor(::open(_path.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, _mode));
+    // The umask has taken bits away.
+    if (file.isOpen()) ::fchmod(file.number(), _mode);
+    if (file.isOpen() || errno != EEXIST) return file;
+  }
 }
 
 void SocketServer::NameLock::lock() {
   // The owner removes the file when it ends. So the file that was opened can differ from the file that is
   // there once the lock is held.
   while (true) {
-    FileDescriptor file(::open(_path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW, 0600));
+    FileDescriptor file = openOrMake();
     if (!file.isOpen()) fail("cannot open " + _path.string(), errno);
     if (::flock(file.number(), LOCK_EX | LOCK_NB) != 0) {
       if (errno == EWOULDBLOCK) nameIsTaken(_socketPath);
@@ -95,12 +117,12 @@ SocketServer::NameLock::~NameLock() {
 }
 
 SocketServer::SocketServer(const fs::path& path, ConnectionHandler handler, const SocketLimits& limits,
-                           Bytes refusal)
+                           SocketGate gate)
     : _path(path),
       _handler(std::move(handler)),
       _limits(limits),
-      _refusal(std::move(refusal)),
-      _lock(path),
+      _gate(std::move(gate)),
+      _lock(path, modeFor(_gate)),
       _spare(spareDescriptor()),
       _places(std::make_shared<const int>(0)) {
   // A program that cleans up may have removed a live server's lock file.
@@ -119,9 +141,11 @@ void SocketServer::listen() {
   ::unlink(_path.c_str());
   FileDescriptor socket = localSocket();
   const sockaddr_un address = socketAddress(_path);
-  // The socket's file gets the socket's mode without the umask, so no other user ever sees it open.
+  // The file gets the socket's mode, so no other user ever sees it open. The umask takes away what the group
+  // of a shared folder needs.
   if (!socket.isOpen() || ::fchmod(socket.number(), 0600) != 0 ||
       ::bind(socket.number(), reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0 ||
+      (_gate.access.isShared() && ::chmod(_path.c_str(), modeFor(_gate)) != 0) ||
       ::listen(socket.number(), connectionQueue) != 0)
     fail("cannot listen on " + _path.string(), errno);
   _socketFile = fileUnder(_path);
@@ -160,14 +184,26 @@ bool SocketServer::acceptOne() {
     if (errno == EMFILE || errno == ENFILE) refuseOne();
     return false;
   }
-  const auto open = static_cast<std::size_t>(_places.use_count() - 1);
-  if (open >= _limits.connections) {
-    turnAway(socket, "as many are open as there may be");
+  if (!admits(socket)) return true;
+  if (!hasRoom() && _gate.makeRoom) _gate.makeRoom();
+  if (!hasRoom()) {
+    turnAway(socket, _gate.refusalWhenFull, _tellingOfNoRoom, "as many are open as there may be");
     return true;
   }
-  auto connection = std::make_unique<SocketConnection>(std::move(socket), _places, _limits.frameTime);
-  if (connection->hasTrustedPeer()) _handler(std::move(connection));
+  _handler(std::make_unique<SocketConnection>(std::move(socket), _places, _limits.frameTime));
   return true;
+}
+
+bool SocketServer::hasRoom() const {
+  return static_cast<std::size_t>(_places.use_count() - 1) < _limits.connections;
+}
+
+bool SocketServer::admits(const FileDescriptor& socket) {
+  const auto peer = peerOf(socket.number());
+  if (peer && (_gate.accepts ? _gate.accepts(*peer) : _gate.access.accepts(*peer))) return true;
+  turnAway(socket, _gate.refusalOfStranger, _tellingOfStrangers,
+           peer ? "user " + std::to_string(peer->user) + " has no right to them" : "their user is not known");
+  return false;
 }
 
 // There is no descriptor left. Accepts and refuses the next connection with the spare one; otherwise it would
@@ -175,19 +211,25 @@ bool SocketServer::acceptOne() {
 void SocketServer::refuseOne() {
   _spare = FileDescriptor();
   FileDescriptor socket(::accept4(_listening.number(), nullptr, nullptr, SOCK_CLOEXEC | SOCK_NONBLOCK));
-  if (socket.isOpen()) turnAway(socket, "this program may open no more files");
+  if (socket.isOpen())
+    turnAway(socket, _gate.refusalWhenFull, _tellingOfNoRoom, "this program may open no more files");
   const bool wasAccepted = socket.isOpen();
   socket = FileDescriptor();
   _spare = spareDescriptor();
   if (!wasAccepted || !_spare.isOpen()) waitForDescriptors();
 }
 
-void SocketServer::turnAway(const FileDescriptor& socket, const char* reason) {
+void SocketServer::turnAway(const FileDescriptor& socket, const Bytes& refusal, Telling& telling,
+                            const std::string& reason) {
   // A peer that cannot take the refusal learns it from the end of the connection.
-  static_cast<void>(::send(socket.number(), _refusal.data(), _refusal.size(), MSG_NOSIGNAL));
-  if (_sinceRefusalWasTold.isValid() && !_sinceRefusalWasTold.hasExpired(refusalLineInterval.count())) return;
-  _sinceRefusalWasTold.start();
-  logWarning("Connections to %s are refused: %s", _path.string(), reason);
+  static_cast<void>(::send(socket.number(), refusal.data(), refusal.size(), MSG_NOSIGNAL));
+  if (telling.isDue()) logWarning("Connections to %s are refused: %s", _path.string(), reason);
+}
+
+bool SocketServer::Telling::isDue() {
+  if (_since.isValid() && !_since.hasExpired(refusalLineInterval.count())) return false;
+  _since.start();
+  return true;
 }
 
 void SocketServer::waitForDescriptors() {
@@ -196,6 +238,23 @@ void SocketServer::waitForDescriptors() {
     if (!_spare.isOpen()) _spare = spareDescriptor();
     _notifier->setEnabled(true);
   });
+}
+
+void removeLeftovers(const fs::path& folder) {
+  std::error_code failure;
+  int looks = 0;
+  for (fs::directory_iterator entry(folder, failure), end; !failure && entry != end && looks < mostLooks;
+       entry.increment(failure), ++looks) {
+    const std::string name = entry->path().filename().string();
+    if (!name.ends_with(lockSuffix)) continue;
+    const fs::path socketPath = folder / name.substr(0, name.size() - lockSuffix.size());
+    const FileDescriptor file(::open(entry->path().c_str(), O_RDWR | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK));
+    // While the lock is held here, no program takes the name.
+    if (!file.isOpen() || ::flock(file.number(), LOCK_EX | LOCK_NB) != 0) continue;
+    if (fileOf(file) != fileUnder(entry->path()) || isServed(socketPath)) continue;
+    ::unlink(socketPath.c_str());
+    ::unlink(entry->path().c_str());
+  }
 }
 
 }  // namespace varnel

@@ -29,9 +29,22 @@ class SocketNameTaken : public std::runtime_error {
 struct SocketLimits {
   std::size_t connections = 64;  ///< open at the same time
   std::chrono::milliseconds frameTime = longestFrameTime;
+  /// How long a client of the telephony service may stay when others find no room. A viewer needs a moment.
+  std::chrono::milliseconds stay = std::chrono::seconds(2);
   /// How often the server checks and touches the socket and its lock, so that no program removes them as
   /// leftovers.
   std::chrono::milliseconds lookInterval = std::chrono::minutes(1);
+};
+
+/// Who may connect to a named socket.
+struct SocketGate {
+  PeerAccess access = PeerAccess();  ///< of the folder: members of its group may open the files
+  /// Whether a peer gets in. Empty: if the access accepts it.
+  std::function<bool(const Peer&)> accepts = {};
+  Bytes refusalOfStranger = {};  ///< what a peer gets that may not connect
+  Bytes refusalWhenFull = {};    ///< what a peer gets that finds no room
+  /// Called when there is no room; ends a connection if it can. Empty: none is ended.
+  std::function<void()> makeRoom = {};
 };
 
 /// The file that a name or a descriptor stands for.
@@ -42,9 +55,10 @@ struct SocketFile {
   bool operator==(const SocketFile&) const = default;
 };
 
-/// The listening end of a named local socket. It replaces a socket that a dead process left behind. It
-/// refuses peers of other users. When there is no room, it sends the bytes of the refusal and closes the
-/// connection. When somebody has removed the socket or the lock, it makes them again.
+/// The listening end of a named local socket. It replaces a socket that a dead process left behind. When a
+/// peer may not connect, or when there is no room, it sends the bytes of the refusal and closes the
+/// connection; a log line says so, at most every ten seconds. When somebody has removed the socket or the
+/// lock, it makes them again.
 class SocketServer final {
  public:
   using ConnectionHandler = std::function<void(std::unique_ptr<SocketConnection>)>;
@@ -52,7 +66,7 @@ class SocketServer final {
   /// Listens at once; the event loop passes each connection to the handler. Throws SocketNameTaken, and
   /// std::runtime_error when the socket cannot be made for another reason.
   SocketServer(const std::filesystem::path& path, ConnectionHandler handler, const SocketLimits& limits = {},
-               Bytes refusal = {});
+               SocketGate gate = {});
   SocketServer(const SocketServer&) = delete;
   SocketServer& operator=(const SocketServer&) = delete;
   /// Removes the socket and the lock.
@@ -63,7 +77,7 @@ class SocketServer final {
   // ends.
   class NameLock {
    public:
-    explicit NameLock(const std::filesystem::path& socketPath);
+    NameLock(const std::filesystem::path& socketPath, mode_t mode);
     NameLock(const NameLock&) = delete;
     NameLock& operator=(const NameLock&) = delete;
     ~NameLock();
@@ -73,9 +87,11 @@ class SocketServer final {
 
    private:
     void lock();
+    FileDescriptor openOrMake() const;
 
     const std::filesystem::path _path;
     const std::filesystem::path _socketPath;
+    const mode_t _mode;
     FileDescriptor _file;
   };
 
@@ -83,14 +99,25 @@ class SocketServer final {
   void keepName() noexcept;
   void acceptConnections() noexcept;
   bool acceptOne();
+  bool admits(const FileDescriptor& socket);
+  bool hasRoom() const;
   void refuseOne();
-  void turnAway(const FileDescriptor& socket, const char* reason);
+  // Limits how often one kind of refusal is logged.
+  class Telling {
+   public:
+    bool isDue();
+
+   private:
+    QElapsedTimer _since;
+  };
+  void turnAway(const FileDescriptor& socket, const Bytes& refusal, Telling& telling,
+                const std::string& reason);
   void waitForDescriptors();
 
   const std::filesystem::path _path;
   const ConnectionHandler _handler;
   const SocketLimits _limits;
-  const Bytes _refusal;
+  const SocketGate _gate;
   NameLock _lock;         // held until the socket is removed
   FileDescriptor _spare;  // closed for a moment to refuse a peer when no other descriptor is free
   FileDescriptor _listening;
@@ -98,7 +125,12 @@ class SocketServer final {
   std::unique_ptr<QSocketNotifier> _notifier;
   QTimer _look;
   std::shared_ptr<const int> _places;  // each connection holds one reference more
-  QElapsedTimer _sinceRefusalWasTold;
+  Telling _tellingOfStrangers;
+  Telling _tellingOfNoRoom;
 };
+
+/// Removes the sockets and locks of dead processes from a shared folder. Only the folder's owner can remove
+/// those of other users.
+void removeLeftovers(const std::filesystem::path& folder);
 
 }  // namespace varnel

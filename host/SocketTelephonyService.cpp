@@ -20,8 +20,6 @@ std::optional<Bytes> logChannelRequest(std::string_view localPortName) {
   Value request = Value::ofDictionary();
   request.dictionary()->set(protocol::commandKey, protocol::createLogChannel);
   request.dictionary()->set(protocol::portNameKey, localPortName);
-  request.dictionary()->set(protocol::rightsKey,
-                            Value::ofArray({protocol::spiRight, protocol::internalRight}));
   return writeXmlPropertyList(request);
 }
 
@@ -88,7 +86,8 @@ class SocketTelephonyConnection final : public TelephonyConnection {
 std::unique_ptr<TelephonyConnection> SocketTelephonyService::connect(
     std::function<void()> notificationHandler) {
   try {
-    auto [connection, error] = SocketConnection::open(socketPath(_folder, protocol::socketName));
+    auto [connection, error] =
+        SocketConnection::open(socketPath(_folder.path, protocol::socketName), _folder.access);
     if (!connection) {
       if (_monitor) _monitor->serverIsOutOfReach(error);
       return nullptr;

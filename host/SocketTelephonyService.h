@@ -1,8 +1,8 @@
 #pragma once
 
 #include <chrono>
-#include <filesystem>
 
+#include "host/RuntimeFolder.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
@@ -12,9 +12,9 @@ class LinkMonitor;
 /// The telephony server of a runtime folder, over its local socket.
 class SocketTelephonyService final : public TelephonyService {
  public:
-  /// The folder's path is absolute. A request waits `replyTimeout` for its reply. The monitor is told why
+  /// A request waits `replyTimeout` for its reply. The monitor is told why
   /// attempts fail. It may be null, else it must outlive the service and its connections.
-  explicit SocketTelephonyService(std::filesystem::path runtimeFolder,
+  explicit SocketTelephonyService(RuntimeFolder runtimeFolder,
                                   std::chrono::milliseconds replyTimeout = std::chrono::seconds(1),
                                   LinkMonitor* monitor = nullptr)
       : _folder(std::move(runtimeFolder)), _replyTimeout(replyTimeout), _monitor(monitor) {}
@@ -24,7 +24,7 @@ class SocketTelephonyService final : public TelephonyService {
   std::unique_ptr<TelephonyConnection> connect(std::function<void()> notificationHandler) override;
 
  private:
-  std::filesystem::path _folder;
+  RuntimeFolder _folder;
   std::chrono::milliseconds _replyTimeout;
   LinkMonitor* _monitor;
 };

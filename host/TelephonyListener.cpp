@@ -1,6 +1,6 @@
 #include "host/TelephonyListener.h"
 
-#include <algorithm>
+#include <utility>
 
 #include "base/Dictionary.h"
 #include "base/PropertyList.h"
@@ -12,12 +12,10 @@ namespace {
 
 namespace protocol = telephonyProtocol;
 
-bool isText(const Value& value, std::string_view text) { return value.string() && *value.string() == text; }
+// A viewer tries again after five seconds.
+constexpr std::chrono::milliseconds clearingInterval = std::chrono::seconds(2);
 
-bool holdsRight(const Dictionary& request, std::string_view right) {
-  const Array* const rights = request.get(protocol::rightsKey).array();
-  return rights && std::ranges::any_of(*rights, [&](const Value& held) { return isText(held, right); });
-}
+bool isText(const Value& value, std::string_view text) { return value.string() && *value.string() == text; }
 
 std::optional<Bytes> replyOf(const TelephonyConnection::LogChannel& channel) {
   Value reply = Value::ofDictionary();
@@ -26,33 +24,57 @@ std::optional<Bytes> replyOf(const TelephonyConnection::LogChannel& channel) {
   return writeXmlPropertyList(reply);
 }
 
-// The reply that a client gets when there is no room for it, as if it had asked.
-Bytes refusal() {
+// The reply that a client gets whose connection is refused, as if it had asked.
+Bytes refusal(std::int64_t error) {
   Bytes bytes;
-  const auto reply = replyOf({protocol::tooManyConnections, std::nullopt});
+  const auto reply = replyOf({error, std::nullopt});
   appendFrame(bytes, {0, FrameMark::Reply, reply.value()});
   return bytes;
 }
 
 }  // namespace
 
-TelephonyListener::TelephonyListener(const std::filesystem::path& runtimeFolder,
-                                     LogChannelMaker makeLogChannel, const SocketLimits& limits)
+TelephonyListener::TelephonyListener(const RuntimeFolder& folder, LogChannelMaker makeLogChannel,
+                                     const SocketLimits& limits, RightsGranter rightsOf)
     : _makeLogChannel(std::move(makeLogChannel)),
+      _stay(limits.stay),
       _server(std::make_unique<SocketServer>(
-          socketPath(runtimeFolder, protocol::socketName),
-          [this](std::unique_ptr<SocketConnection> client) { add(std::move(client)); }, limits, refusal())) {}
+          socketPath(folder.path, protocol::socketName),
+          [this](std::unique_ptr<SocketConnection> client) { add(std::move(client)); }, limits,
+          gate(folder, std::move(rightsOf)))) {
+  if (!folder.access.isShared()) return;
+  _clearing.callOnTimeout([path = folder.path] { removeLeftovers(path); });
+  _clearing.start(clearingInterval);
+}
 
 TelephonyListener::~TelephonyListener() = default;
 
+SocketGate TelephonyListener::gate(const RuntimeFolder& folder, RightsGranter rightsOf) {
+  if (!rightsOf) rightsOf = [access = folder.access](const Peer& peer) { return access.rightsOf(peer); };
+  return {.access = folder.access,
+          .accepts =
+              [rightsOf = std::move(rightsOf)](const Peer& peer) {
+                const Rights rights = rightsOf(peer);
+                return rights.spi && rights.internal;
+              },
+          .refusalOfStranger = refusal(protocol::missingRights),
+          .refusalWhenFull = refusal(protocol::tooManyConnections),
+          .makeRoom = [this] { makeRoom(); }};
+}
+
+void TelephonyListener::makeRoom() {
+  if (!_guests.empty() && _guests.front().stay.hasExpired(_stay.count())) _guests.erase(_guests.begin());
+}
+
 void TelephonyListener::notifyAll() {
-  for (const Client& client : _clients) client->send({0, FrameMark::Notification, {}});
+  for (const Guest& guest : _guests) guest.client->send({0, FrameMark::Notification, {}});
 }
 
 void TelephonyListener::add(Client client) {
   client->setActivityHandler([this, weak = std::weak_ptr(client)] { serve(weak.lock()); });
   client->send({0, FrameMark::Notification, {}});
-  _clients.push_back(std::move(client));
+  _guests.push_back({std::move(client), {}});
+  _guests.back().stay.start();
 }
 
 void TelephonyListener::serve(const Client& client) {
@@ -61,7 +83,7 @@ void TelephonyListener::serve(const Client& client) {
     const auto reply = replyOf(answer(frame->payload));
     client->send({frame->identifier, reply ? FrameMark::Reply : FrameMark::NoReply, reply.value_or(Bytes())});
   }
-  if (!client->isOpen()) std::erase(_clients, client);
+  if (!client->isOpen()) std::erase_if(_guests, [&](const Guest& guest) { return guest.client == client; });
 }
 
 TelephonyConnection::LogChannel TelephonyListener::answer(ByteView request) const {
@@ -72,8 +94,6 @@ TelephonyConnection::LogChannel TelephonyListener::answer(ByteView request) cons
     return {protocol::unknownCommand, std::nullopt};
   const std::string* const localPortName = fields->get(protocol::portNameKey).string();
   if (!localPortName) return {protocol::malformedRequest, std::nullopt};
-  if (!holdsRight(*fields, protocol::spiRight) || !holdsRight(*fields, protocol::internalRight))
-    return {protocol::missingRights, std::nullopt};
   return _makeLogChannel(*localPortName);
 }
 

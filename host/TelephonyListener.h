@@ -1,30 +1,38 @@
 #pragma once
 
+#include <QElapsedTimer>
+#include <QTimer>
 #include <cstddef>
-#include <filesystem>
 #include <functional>
 #include <memory>
 #include <string_view>
 #include <vector>
 
 #include "base/Bytes.h"
+#include "host/RuntimeFolder.h"
 #include "host/SocketServer.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
 
-/// The server's side of the telephony service. It takes connections, checks requests, and notifies clients.
-/// Every new connection gets one notification at once.
+/// The server's side of the telephony service. It takes connections of clients that hold the rights "spi" and
+/// "internal", checks requests, and notifies clients. Every new connection gets one notification at once.
+/// When there is no room, the client that came first has to go, unless it has just come. In a shared folder
+/// the listener removes the ports that killed viewers have left behind.
 class TelephonyListener final {
  public:
   /// Makes the log channel that delivers to the client's local port of this name. An exception that leaves it
   /// ends the program.
   using LogChannelMaker = std::function<TelephonyConnection::LogChannel(std::string_view localPortName)>;
 
-  /// Listens at once; everything happens on the event loop. The folder's path is absolute. Throws
-  /// std::runtime_error when another server runs in this folder, or when the socket cannot be made.
-  TelephonyListener(const std::filesystem::path& runtimeFolder, LogChannelMaker makeLogChannel,
-                    const SocketLimits& limits = {});
+  /// The rights of the user behind a connection.
+  using RightsGranter = std::function<Rights(const Peer& peer)>;
+
+  /// Listens at once; everything happens on the event loop. Without a granter, the folder's access grants the
+  /// rights. Throws std::runtime_error when another server runs in this folder, or when the socket cannot be
+  /// made.
+  TelephonyListener(const RuntimeFolder& folder, LogChannelMaker makeLogChannel,
+                    const SocketLimits& limits = {}, RightsGranter rightsOf = {});
   TelephonyListener(const TelephonyListener&) = delete;
   TelephonyListener& operator=(const TelephonyListener&) = delete;
   ~TelephonyListener();
@@ -32,18 +40,28 @@ class TelephonyListener final {
   /// Sends a notification to every open connection.
   void notifyAll();
   /// How many connections are open.
-  std::size_t clients() const { return _clients.size(); }
+  std::size_t clients() const { return _guests.size(); }
 
  private:
   using Client = std::shared_ptr<SocketConnection>;
 
+  // A client, and how long it has been connected.
+  struct Guest {
+    Client client;
+    QElapsedTimer stay;
+  };
+
+  SocketGate gate(const RuntimeFolder& folder, RightsGranter rightsOf);
   void add(Client client);
+  void makeRoom();
   void serve(const Client& client);
   TelephonyConnection::LogChannel answer(ByteView request) const;
 
   LogChannelMaker _makeLogChannel;
-  std::vector<Client> _clients;
+  const std::chrono::milliseconds _stay;
+  std::vector<Guest> _guests;  // the one that came first is the first
   std::unique_ptr<SocketServer> _server;
+  QTimer _clearing;
 };
 
 }  // namespace varnel

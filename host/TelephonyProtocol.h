@@ -5,21 +5,19 @@
 
 /// The messages between the telephony service and its clients. A request and its reply are dictionaries,
 /// written as property lists, one per frame: {"Command": "CreateLogChannel", "PortName": local port of the
-/// client, "Rights": ["spi", "internal"]} {"Error": integer, "PortName": port on which the service takes
-/// commands; absent when there is none} When the service has no room for a connection, it sends a reply
-/// without a request and closes the connection.
+/// client} {"Error": integer, "PortName": port on which the service takes commands; absent when there is
+/// none} The service makes a log channel only for a client that holds the rights "spi" and "internal". It
+/// grants them by the client's user, whom it learns from the socket. When the service has no room for a
+/// connection, or grants it no rights, it sends a reply without a request and closes the connection.
 namespace varnel::telephonyProtocol {
 
 inline constexpr std::string_view socketName = "com.orvane.TelephonyServer";
 
 inline constexpr std::string_view commandKey = "Command";
 inline constexpr std::string_view portNameKey = "PortName";
-inline constexpr std::string_view rightsKey = "Rights";
 inline constexpr std::string_view errorKey = "Error";
 
 inline constexpr std::string_view createLogChannel = "CreateLogChannel";
-inline constexpr std::string_view spiRight = "spi";
-inline constexpr std::string_view internalRight = "internal";
 
 /// The message identifier of reports about the stream. Messages of the stream itself have 0.
 ///   {"Note": text, "Dropped": integer, "TooLong": integer}

@@ -11,11 +11,10 @@ namespace {
 // After this many, others get a turn.
 constexpr int requestsAtATime = 16;
 
-// The reply that a client gets when there is no room for it, as if it had asked.
-Bytes refusal() {
+// The reply that a client gets whose connection is refused, as if it had asked.
+Bytes refusal(const std::string& sentence) {
   Bytes bytes;
-  const Bytes reply = controlProtocol::writeReply(
-      ControlRefusal{"the telephony server is controlled by as many programs as it takes; end one of them"});
+  const Bytes reply = controlProtocol::writeReply(ControlRefusal{sentence});
   appendFrame(bytes, {0, FrameMark::Reply, reply});
   return bytes;
 }
@@ -27,7 +26,12 @@ ControlListener::ControlListener(const std::filesystem::path& runtimeFolder, Ans
     : _answer(std::move(answer)),
       _server(std::make_unique<SocketServer>(
           socketPath(runtimeFolder, controlProtocol::socketName),
-          [this](std::unique_ptr<SocketConnection> client) { add(std::move(client)); }, limits, refusal())) {}
+          [this](std::unique_ptr<SocketConnection> client) { add(std::move(client)); }, limits,
+          SocketGate{.refusalOfStranger =
+                         refusal("the telephony server obeys nobody but its own user; become that user"),
+                     .refusalWhenFull = refusal(
+                         "the telephony server is controlled by as many programs as it takes; end one of "
+                         "them")})) {}
 
 ControlListener::~ControlListener() = default;
 

@@ -10,8 +10,9 @@
 
 namespace varnel {
 
-/// Takes requests to the running server over a socket of the runtime folder, from the peers that the socket
-/// trusts. There are 16 connections at most. A connection that sends anything but requests is ended.
+/// Takes requests to the running server over a socket of the runtime folder, from the own user and root,
+/// also when a group may connect as viewers. There are 16 connections at most. A connection that sends
+/// anything but requests is ended.
 class ControlListener final {
  public:
   using Answer = std::function<ControlReply(const ControlRequest& request)>;

@@ -70,7 +70,7 @@ int fail(std::string_view text, int status) {
 }
 
 int ask(const ControlOptions& options) {
-  const ServerStatus status = ServerControl(runtimeFolder(options.runtimeFolder)).ask(options.request);
+  const ServerStatus status = ServerControl(viewersFolder(options.runtimeFolder)).ask(options.request);
   if (options.request.command != Command::Status) return 0;
   std::cout << (options.wantsJson ? statusJson(status) + '\n' : statusText(status)) << std::flush;
   return std::cout ? 0 : generalError;

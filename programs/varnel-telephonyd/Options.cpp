@@ -102,6 +102,11 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
          },
          "make a fault, for tests of viewers: " + namesOfFaults())
       ->type_name("FAULT");
+  app.add_option(
+         "--allow-group", options.allowedGroup,
+         "let members of this group connect too, in a runtime folder that belongs to the group; unless "
+         "given, only this user may")
+      ->type_name("GROUP");
   app.add_option("--log-level", options.logLevel,
                  "also write log lines of this priority number and lower to standard error; -1 for none")
       ->check(CLI::Range(-1, std::numeric_limits<int>::max()))

@@ -35,7 +35,8 @@ struct Options {
   ExistingRecording existingRecording = ExistingRecording::Refused;
   std::optional<std::string> runtimeFolder;
   Fault fault{};
-  int logLevel = logErrorPriority;  ///< the highest priority number that goes to standard error
+  std::optional<std::string> allowedGroup;  ///< whose members may connect too; absent: only this user may
+  int logLevel = logErrorPriority;          ///< the highest priority number that goes to standard error
 };
 
 /// The status to end with when the command line leaves nothing to do: 0 after help, 2 after a mistake.

@@ -218,13 +218,13 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   std::unique_ptr<LivePort> livePort;
   const SignalWatcher signals({SIGINT, SIGTERM}, [&](int /*signal*/) { end(application, livePort.get()); });
   const HostLog log({.programName = programName, .standardErrorLevel = options.logLevel});
-  const std::filesystem::path folder = runtimeFolder(options.runtimeFolder);
+  const RuntimeFolder folder = serversFolder(options.runtimeFolder, options.allowedGroup);
   SocketPorts ports(folder);
   EventLoopQueue queue;
   const std::unique_ptr<PipedReplay> pipedReplay =
       makePipedReplay(options, queue, std::move(reader), unasked);
   const auto tellServing = [&] {
-    tell("serving " + technology + " in " + folder.string() + "; now start varnel" +
+    tell("serving " + technology + " in " + folder.path.string() + "; now start varnel" +
          (options.runtimeFolder ? " --runtime-dir " + *options.runtimeFolder : ""));
   };
   const std::unique_ptr<PortChooser> chooser = makePortChooser(options, queue);
@@ -272,7 +272,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
        .stop =
            [&] { queue.after(std::chrono::milliseconds(0), [&] { end(application, livePort.get()); }); }});
   const ControlListener controlListener(
-      folder, [&](const ControlRequest& request) { return controls.reply(request); });
+      folder.path, [&](const ControlRequest& request) { return controls.reply(request); });
   recorder = makeRecorder(options, queue, server, technology);
   if (livePort) {
     livePort->open();

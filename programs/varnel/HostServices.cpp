@@ -8,11 +8,10 @@ namespace varnel {
 
 HostServices::HostServices(const Options& options, const ApplicationInfo& application)
     : _log({.programName = programName, .standardErrorLevel = options.logLevel}),
-      _folder(runtimeFolder(options.runtimeFolder)),
-      _link(_folder),
-      _ports(_folder, &_link),
-      _portsOfSubscription(_ports, _link, options.subscription),
-      _telephony(_folder, std::chrono::seconds(1), &_link),
+      _folder(viewersFolder(options.runtimeFolder)),
+      _link(_folder.path),
+      _server(_folder, options.runtimeFolder ? std::nullopt : std::optional(systemsFolder), _link),
+      _portsOfSubscription(_server, _link, options.subscription),
       _resources(readableResourceFolder()),
       _deviceRoot(deviceRoot(options.deviceRoot)),
       _files(_deviceRoot.folder),
@@ -25,12 +24,9 @@ HostServices::HostServices(const Options& options, const ApplicationInfo& applic
 }
 
 ModelServices HostServices::model(std::ostream& standardOutput) {
-  return {_portsOfSubscription,
-          _telephony,
-          _queue,
-          {_resources, _clock, _application, standardOutput, _identities},
-          writeXmlPropertyList,
-          &_link};
+  return {
+      _portsOfSubscription, _server, _queue, {_resources, _clock, _application, standardOutput, _identities},
+      writeXmlPropertyList, &_link};
 }
 
 }  // namespace varnel

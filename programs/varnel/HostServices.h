@@ -7,9 +7,8 @@
 #include "host/FileResources.h"
 #include "host/HostLog.h"
 #include "host/LinkMonitor.h"
+#include "host/NearestServer.h"
 #include "host/RootedFiles.h"
-#include "host/SocketPorts.h"
-#include "host/SocketTelephonyService.h"
 #include "host/SubscriptionPorts.h"
 #include "host/SystemClock.h"
 #include "model/VarnelModel.h"
@@ -33,11 +32,10 @@ class HostServices final {
 
  private:
   HostLog _log;
-  std::filesystem::path _folder;
+  RuntimeFolder _folder;
   LinkMonitor _link;
-  SocketPorts _ports;
+  NearestServer _server;
   SubscriptionPorts _portsOfSubscription;  // of all subscriptions unless the user asked for one
-  SocketTelephonyService _telephony;
   EventLoopQueue _queue;
   FileResources _resources;
   SystemClock _clock;

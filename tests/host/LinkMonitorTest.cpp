@@ -111,7 +111,7 @@ TEST_F(Link, TellsOfAServerThatServesSixteenViewers) {
 }
 
 TEST_F(Link, TellsOfAServerWithoutRoomForAConnection) {
-  const auto listener = server(0, {.connections = 1});
+  const auto listener = server(0, {.connections = 1, .stay = std::chrono::hours(1)});
   const RawSocket other = RawSocket::connectedTo(serverPath());
   EXPECT_FALSE(other.receive().empty());
   EXPECT_EQ(askForChannel(), 10);
@@ -125,7 +125,8 @@ TEST_F(Link, TellsOfMissingRightsAndOfOtherErrors) {
     const auto listener = server(3);
     EXPECT_EQ(askForChannel(), 3);
     EXPECT_EQ(trouble(), inFolder("The telephony server in ",
-                                  " misses rights of this viewer; use programs of one version"));
+                                  " gives this user no log channel; become a member of the group that its "
+                                  "option --allow-group names"));
   }
   const auto listener = server(7);
   EXPECT_EQ(askForChannel(), 7);

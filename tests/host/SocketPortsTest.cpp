@@ -412,14 +412,6 @@ TEST_F(SocketPortsTest, APeerThatSendsNoFramesIsDropped) {
   }
 }
 
-TEST(SocketTrust, IsInTheSameUserAndInRootAlone) {
-  EXPECT_TRUE(isTrusted(1000, 1000));
-  EXPECT_TRUE(isTrusted(0, 1000));
-  EXPECT_TRUE(isTrusted(0, 0));
-  EXPECT_FALSE(isTrusted(1001, 1000));
-  EXPECT_FALSE(isTrusted(1000, 0));
-}
-
 // If the test runs as root, the peer becomes another user. Otherwise it cannot, and is served.
 TEST_F(SocketPortsTest, PeersAreServedUnlessTheyAreOfAnotherUser) {
   const bool isRoot = ::geteuid() == 0;
@@ -542,7 +534,7 @@ TEST_F(SocketPortsTest, ANameThatNoSocketCanHaveIsToldInTheLog) {
 
 TEST(SocketPortsWithoutAFolder, CannotMakeAPort) {
   LastLine log;
-  SocketPorts ports("/nowhere/at/all");
+  SocketPorts ports(std::filesystem::path("/nowhere/at/all"));
   const auto created = ports.createLocalPort("name", {});
   EXPECT_FALSE(created.port);
   EXPECT_FALSE(created.alreadyExists);

@@ -11,10 +11,12 @@
 #include <string>
 #include <vector>
 
+#include "base/Log.h"
 #include "host/DescriptorLimit.h"
 #include "host/SocketPorts.h"
 #include "host/TelephonyListener.h"
 #include "tests/support/EventLoop.h"
+#include "tests/support/OtherUser.h"
 #include "tests/support/Process.h"
 #include "tests/support/RawSocket.h"
 
@@ -24,12 +26,33 @@ namespace {
 using namespace std::chrono_literals;
 namespace fs = std::filesystem;
 
+// The log lines up to this priority number, while it lives.
+class LogLines final : public LogSink {
+ public:
+  explicit LogLines(int level) { setLogSink(this, level); }
+  LogLines(const LogLines&) = delete;
+  LogLines& operator=(const LogLines&) = delete;
+  ~LogLines() override { setLogSink(nullptr, -1); }
+  void write(int /*priority*/, std::string_view line) override { texts.emplace_back(line); }
+
+  std::vector<std::string> texts;
+};
+
 class SocketServerTest : public testing::Test {
  protected:
   std::unique_ptr<SocketServer> server(const SocketLimits& limits = {}) {
     return std::make_unique<SocketServer>(
         path(), [this](std::unique_ptr<SocketConnection> connection) { add(std::move(connection)); }, limits,
-        Bytes{'f', 'u', 'l', 'l'});
+        SocketGate{.refusalWhenFull = Bytes{'f', 'u', 'l', 'l'}});
+  }
+  std::unique_ptr<SocketServer> server(SocketGate gate) {
+    return std::make_unique<SocketServer>(
+        path(), [this](std::unique_ptr<SocketConnection> connection) { add(std::move(connection)); },
+        SocketLimits(), std::move(gate));
+  }
+  static unsigned modeOf(const std::string& file) {
+    struct stat status {};
+    return ::stat(file.c_str(), &status) == 0 ? status.st_mode & 07777 : 0;
   }
   void add(std::shared_ptr<SocketConnection> connection) {
     connection->setActivityHandler([weak = std::weak_ptr(connection), this] {
@@ -165,6 +188,101 @@ TEST_F(SocketServerTest, SocketAndLockGoWithTheirOwner) {
   EXPECT_TRUE(fs::exists(lockPath()));
   listening.reset();
   EXPECT_TRUE(fs::is_empty(_folder.path()));
+}
+
+TEST_F(SocketServerTest, InASharedFolderTheGroupMayOpenSocketAndLockWhateverTheUmaskIs) {
+  const mode_t before = ::umask(077);
+  const auto listening = server(SocketGate{.access = PeerAccess(::geteuid(), ::getegid())});
+  ::umask(before);
+  EXPECT_EQ(modeOf(path()), 0660u);
+  EXPECT_EQ(modeOf(lockPath()), 0660u);
+  EXPECT_TRUE(isServed());
+}
+
+TEST_F(SocketServerTest, AStrangerIsTurnedAwayWithOneLineAndOthersAreServed) {
+  const LogLines lines(logWarningPriority);
+  bool isStranger = true;
+  std::vector<uid_t> users;
+  const auto listening = server(SocketGate{.accepts =
+                                               [&](const Peer& peer) {
+                                                 users.push_back(peer.user);
+                                                 return !isStranger;
+                                               },
+                                           .refusalOfStranger = Bytes{'n', 'o'}});
+  for (int i = 0; i < 100; ++i) EXPECT_EQ(refusal(), (Bytes{'n', 'o'}));
+  EXPECT_EQ(users, std::vector<uid_t>(100, ::geteuid()));
+  EXPECT_TRUE(_connections.empty());
+  EXPECT_EQ(lines.texts, (std::vector<std::string>{"Connections to " + path() + " are refused: user " +
+                                                   std::to_string(::geteuid()) + " has no right to them"}));
+  isStranger = false;
+  EXPECT_TRUE(isServed());
+}
+
+// If the test is root, the peer is another user, whose process has the folder's group, or has not.
+TEST_F(SocketServerTest, InASharedFolderAPeerOfItsGroupIsServedAndAnotherOneIsNot) {
+  const auto listening = server(
+      SocketGate{.access = PeerAccess(::geteuid(), unusedGroup), .refusalOfStranger = Bytes{'n', 'o'}});
+  ::chmod(_folder.path().c_str(), 0777);
+  ::chmod(path().c_str(), 0777);
+  const auto isRefused = [this] {
+    const RawSocket client = RawSocket::connectedTo(path());
+    Bytes frame;
+    appendFrame(frame, {0, FrameMark::Message, {}});
+    client.send(frame);
+    return client.waits(canBecomeAnotherUser() ? 60s : 20ms) && !client.receive().empty() ? 1 : 0;
+  };
+  EXPECT_EQ(inAnotherProcess(unusedGroup + 1, isRefused), canBecomeAnotherUser() ? 1 : 0);
+  const int before = _frames;
+  const auto send = [this] {
+    const RawSocket client = RawSocket::connectedTo(path());
+    Bytes frame;
+    appendFrame(frame, {0, FrameMark::Message, {}});
+    return client.send(frame) ? 0 : 1;
+  };
+  EXPECT_EQ(inAnotherProcess(unusedGroup, send), 0);
+  EXPECT_TRUE(runUntil([&] { return _frames > before; }));
+}
+
+TEST_F(SocketServerTest, WhatIsNoFrameEndsTheConnectionWithOneLine) {
+  const LogLines lines(logWarningPriority);
+  const auto listening = server();
+  const RawSocket rude = RawSocket::connectedTo(path());
+  for (int i = 0; i < 3; ++i) rude.send(Bytes(100, 0xFF));
+  EXPECT_TRUE(runUntil([&] { return rude.waits(0ms); }));
+  EXPECT_TRUE(runUntil([&] { return _connections.empty(); }));
+  EXPECT_EQ(lines.texts, (std::vector<std::string>{"A peer has sent what is no frame: the connection ends"}));
+  EXPECT_TRUE(isServed());
+}
+
+TEST_F(SocketServerTest, APeerThatNeverReadsIsDroppedWithOneLineOnceFourMebibytesWait) {
+  const LogLines lines(logWarningPriority);
+  const auto listening = server();
+  const RawSocket deaf = RawSocket::connectedTo(path());
+  ASSERT_TRUE(runUntil([&] { return _connections.size() == 1; }));
+  const Bytes payload(1'000'000, 'x');
+  int sent = 0;
+  for (; sent < 100 && _connections[0]->isOpen(); ++sent)
+    _connections[0]->send({0, FrameMark::Message, payload});
+  EXPECT_FALSE(_connections[0]->isOpen());
+  EXPECT_GE(sent, 5);
+  EXPECT_LE(sent, 12);
+  EXPECT_EQ(lines.texts,
+            (std::vector<std::string>{"A peer does not read what it is sent: the connection ends"}));
+  EXPECT_TRUE(runUntil([&] { return _connections.empty(); }));
+  EXPECT_TRUE(isServed());
+}
+
+TEST_F(SocketServerTest, LeftoversOfDeadProcessesAreRemovedAndNothingElse) {
+  const auto listening = server();
+  // What a killed process leaves: a socket on which nobody listens, and a lock that nobody holds.
+  RawSocket::listeningAt(_folder.file("dead")).close();
+  for (const char* name : {"dead.lock", "alone.lock", "file"}) std::ofstream(_folder.file(name)) << "";
+  removeLeftovers(_folder.path());
+  std::vector<std::string> left;
+  for (const auto& entry : fs::directory_iterator(_folder.path())) left.push_back(entry.path().filename());
+  EXPECT_THAT(left, testing::UnorderedElementsAre("name", "name.lock", "file"));
+  EXPECT_TRUE(isServed());
+  removeLeftovers(_folder.file("missing"));
 }
 
 TEST_F(SocketServerTest, ASecondServerIsRefusedAlsoWhenTheLockFileWasRemoved) {

@@ -1,6 +1,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <sys/stat.h>
+#include <sys/wait.h>
+
+#include <csignal>
+#include <fstream>
 #include <stdexcept>
 
 #include "base/Dictionary.h"
@@ -9,6 +14,7 @@
 #include "host/SocketTelephonyService.h"
 #include "host/TelephonyListener.h"
 #include "tests/support/EventLoop.h"
+#include "tests/support/OtherUser.h"
 #include "tests/support/Process.h"
 #include "tests/support/RawSocket.h"
 
@@ -159,16 +165,114 @@ std::string dictionary(const std::vector<std::string>& entries) {
   return text + "</dict>";
 }
 
-TEST_F(SocketTelephony, BothRightsAreNeeded) {
-  EXPECT_EQ(errorOf(dictionary({command, portName, rights})), 0);
+// The error that a client gets to whom the service grants these rights.
+class SocketTelephonyRights : public SocketTelephony {
+ protected:
+  std::int64_t errorWith(const Rights& rights) {
+    const PeerThread listener([this, rights] {
+      return std::make_shared<TelephonyListener>(
+          _folder.path(),
+          [this](std::string_view name) {
+            _askedFor = name;
+            return TelephonyConnection::LogChannel{0, "commands"};
+          },
+          SocketLimits(), [rights](const Peer&) { return rights; });
+    });
+    return _service.connect({})->createLogChannel("local").error;
+  }
+};
+
+TEST_F(SocketTelephonyRights, BothAreNeeded) {
+  EXPECT_EQ(errorWith({.spi = true, .internal = true}), 0);
   EXPECT_EQ(_askedFor, "local");
   _askedFor.clear();
-  EXPECT_EQ(errorOf(dictionary({command, portName})), 3);
-  for (const std::string right : {"spi", "internal"}) {
-    const std::string one = "<key>Rights</key><array><string>" + right + "</string></array>";
-    EXPECT_EQ(errorOf(dictionary({command, portName, one})), 3);
-  }
+  EXPECT_EQ(errorWith({}), 3);
+  EXPECT_EQ(errorWith({.spi = true}), 3);
+  EXPECT_EQ(errorWith({.internal = true}), 3);
   EXPECT_EQ(_askedFor, "");
+}
+
+TEST_F(SocketTelephonyRights, AreGrantedByThePeersUserAndNotByWhatThePeerSays) {
+  const auto claim = dictionary({command, portName, rights});
+  Bytes answer;
+  {
+    const TelephonyListener listener(
+        _folder.path(),
+        [](std::string_view) {
+          return TelephonyConnection::LogChannel{0, "commands"};
+        },
+        SocketLimits(),
+        [](const Peer& peer) {
+          EXPECT_EQ(peer.user, ::geteuid());
+          return Rights();
+        });
+    const RawSocket client = RawSocket::connectedTo(path());
+    client.send(requestFrame(claim));
+    ASSERT_TRUE(runUntil([&] { return client.waits(0ms); }));
+    answer = client.receive();
+  }
+  FrameReader reader;
+  reader.feed(answer);
+  const auto frame = reader.next();
+  ASSERT_TRUE(frame);
+  EXPECT_EQ(frame->mark, FrameMark::Reply);
+  EXPECT_EQ(readPropertyList(frame->payload)->dictionary()->get("Error").integer(), 3);
+  EXPECT_EQ(errorOf(claim), 0) << "of the server's own user";
+  EXPECT_EQ(errorOf(dictionary({command, portName})), 0) << "without a claim";
+}
+
+// If the test is root, the viewers are another user's. Their processes have the folder's group, or have not.
+TEST_F(SocketTelephonyRights, AreThoseOfTheServersUserAndOfTheFoldersGroup) {
+  const RuntimeFolder shared(_folder.path(), PeerAccess(::geteuid(), unusedGroup));
+  const TelephonyListener listener(shared, [](std::string_view) {
+    return TelephonyConnection::LogChannel{0, "commands"};
+  });
+  ::chmod(_folder.path().c_str(), 0777);
+  ::chmod(path().c_str(), 0777);
+  const auto error = [&] {
+    SocketTelephonyService service(shared, 1min);
+    return static_cast<int>(service.connect({})->createLogChannel("local").error);
+  };
+  EXPECT_EQ(inAnotherProcess(unusedGroup, error), 0);
+  EXPECT_EQ(inAnotherProcess(unusedGroup + 1, error), canBecomeAnotherUser() ? 3 : 0);
+}
+
+// The server of a shared folder may be another user's; that of a closed one may not. If the test is not root,
+// the server is its own, and found in both.
+TEST_F(SocketTelephonyRights, AViewerTrustsTheServerOfASharedFoldersOwner) {
+  int ready[2];
+  ASSERT_EQ(::pipe(ready), 0);
+  ::chmod(_folder.path().c_str(), 0777);
+  const pid_t child = ::fork();
+  if (child == 0) {
+    if (canBecomeAnotherUser() && (::setgid(unusedGroup) != 0 || ::setuid(unusedUser) != 0)) ::_exit(1);
+    const RawSocket server = RawSocket::listeningAt(path());
+    if (::write(ready[1], "y", 1) != 1) ::_exit(2);
+    while (true) ::pause();
+  }
+  char answer = 'n';
+  ASSERT_EQ(::read(ready[0], &answer, 1), 1);
+  const uid_t owner = canBecomeAnotherUser() ? unusedUser : ::geteuid();
+  const auto opens = [this](const PeerAccess& access) {
+    return SocketConnection::open(path(), access).error;
+  };
+  EXPECT_EQ(opens(PeerAccess()), canBecomeAnotherUser() ? EPERM : 0);
+  EXPECT_EQ(opens(PeerAccess(owner, ::getegid())), 0);
+  EXPECT_EQ(opens(PeerAccess(::geteuid(), unusedGroup)), 0) << "a member";
+  EXPECT_EQ(opens(PeerAccess(::geteuid(), unusedGroup + 1)), canBecomeAnotherUser() ? EPERM : 0);
+  ::kill(child, SIGKILL);
+  ::waitpid(child, nullptr, 0);
+  ::close(ready[0]);
+  ::close(ready[1]);
+}
+
+TEST_F(SocketTelephonyRights, OfASharedFolderLetTheServerClearAwayWhatKilledViewersLeave) {
+  const RuntimeFolder shared(_folder.path(), PeerAccess(::geteuid(), ::getegid()));
+  const TelephonyListener listener(shared, {});
+  RawSocket::listeningAt(_folder.file("viewer")).close();
+  std::ofstream(_folder.file("viewer.lock")) << "";
+  EXPECT_TRUE(runUntil([&] { return !std::filesystem::exists(_folder.file("viewer.lock")); }));
+  EXPECT_FALSE(std::filesystem::exists(_folder.file("viewer")));
 }
 
 TEST_F(SocketTelephony, RequestsThatMakeNoSenseAreRefused) {
@@ -177,6 +281,39 @@ TEST_F(SocketTelephony, RequestsThatMakeNoSenseAreRefused) {
   EXPECT_EQ(errorOf(dictionary({portName, rights})), 2);
   EXPECT_EQ(errorOf(dictionary({"<key>Command</key><string>Dance</string>", portName, rights})), 2);
   EXPECT_EQ(_askedFor, "");
+}
+
+TEST_F(SocketTelephony, ClientsThatStayKeepNobodyAwayForLong) {
+  const TelephonyListener listener(
+      _folder.path(),
+      [](std::string_view) {
+        return TelephonyConnection::LogChannel{0, "commands"};
+      },
+      SocketLimits{.connections = 3, .stay = 1ms});
+  std::vector<RawSocket> flood;
+  for (int i = 0; i < 3; ++i) {
+    flood.push_back(RawSocket::connectedTo(path()));
+    ASSERT_TRUE(runUntil([&] { return flood.back().waits(0ms); }));  // greeted
+    EXPECT_FALSE(flood.back().receive().empty());
+  }
+  runFor(5ms);
+  const RawSocket client = RawSocket::connectedTo(path());
+  client.send(requestFrame(dictionary({command, portName})));
+  FrameReader reader;
+  std::optional<std::int64_t> error;
+  ASSERT_TRUE(runUntil([&] {
+    if (client.waits(0ms)) reader.feed(client.receive());
+    while (const auto frame = reader.next()) {
+      if (frame->mark == FrameMark::Reply)
+        error = readPropertyList(frame->payload)->dictionary()->get("Error").integer();
+    }
+    return error.has_value();
+  }));
+  EXPECT_EQ(error, 0);
+  EXPECT_TRUE(flood[0].waits(60s)) << "the oldest one goes";
+  EXPECT_TRUE(flood[0].receive().empty());
+  EXPECT_FALSE(flood[1].waits(0ms));
+  EXPECT_FALSE(flood[2].waits(0ms));
 }
 
 TEST_F(SocketTelephony, AClientThatSendsNoFramesIsDroppedAndOthersAreServed) {

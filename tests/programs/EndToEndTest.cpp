@@ -267,6 +267,34 @@ TEST_F(EndToEnd, TheServerSaysWhatItServesAndWhatBecameOfItsMessages) {
   EXPECT_TRUE(std::filesystem::is_empty(_runtime.path()));
 }
 
+// A group of the test itself: every process may give its folders to it.
+TEST_F(EndToEnd, AServerCanShareItsFolderWithAGroup) {
+  const std::string folder = _runtime.file("shared");
+  const Process telephony(VARNEL_TELEPHONYD_PROGRAM, {"--simulate", "kalvi-lte", "--runtime-dir", folder,
+                                                      "--allow-group", std::to_string(::getegid())});
+  ASSERT_TRUE(eventually([&] { return telephony.error().find("serving") != std::string::npos; }));
+  const auto modeOf = [](const std::string& path) {
+    struct stat status {};
+    return ::stat(path.c_str(), &status) == 0 ? status.st_mode & 07777 : 0;
+  };
+  EXPECT_EQ(modeOf(folder), 03770u);
+  EXPECT_EQ(modeOf(folder + "/com.orvane.TelephonyServer"), 0660u);
+  Process varnel(VARNEL_PROGRAM, {"--ui", "text", "--runtime-dir", folder, "--device-root", _device.path(),
+                                  "--updates", "2"});
+  ASSERT_TRUE(varnel.waitForEnd());
+  EXPECT_THAT(varnel.output(), HasSubstr("Serving Cell Info\n"));
+}
+
+TEST_F(EndToEnd, AGroupThatIsNotThereIsOneLineAndStatusOne) {
+  Process telephony(VARNEL_TELEPHONYD_PROGRAM, {"--simulate", "kalvi-lte", "--runtime-dir", _runtime.path(),
+                                                "--allow-group", "no such group"});
+  ASSERT_TRUE(telephony.waitForEnd());
+  EXPECT_EQ(telephony.exitStatus(), 1);
+  EXPECT_EQ(
+      telephony.error(),
+      "varnel-telephonyd: there is no group no such group; name one that is there with --allow-group\n");
+}
+
 TEST_F(EndToEnd, AViewerWithoutAServerKeepsTrying) {
   const auto varnel = viewer();
   ASSERT_TRUE(logsAgain(*varnel, noLink));

@@ -33,8 +33,15 @@ TEST(TelephonydOptions, ASimulation) {
   EXPECT_EQ(reading.options().simulatedTechnology, "kalvi-lte");
   EXPECT_EQ(reading.options().seed, 7u);
   EXPECT_EQ(reading.options().runtimeFolder, "run");
+  EXPECT_FALSE(reading.options().allowedGroup);
   EXPECT_EQ(reading.options().logLevel, 5);
   EXPECT_EQ(reading.options().recordPath, std::nullopt);
+}
+
+TEST(TelephonydOptions, AGroupWhoseMembersMayConnect) {
+  const Reading reading = read({"--simulate", "kalvi-lte", "--allow-group", "viewers"});
+  EXPECT_EQ(reading.error, "");
+  EXPECT_EQ(reading.options().allowedGroup, "viewers");
 }
 
 TEST(TelephonydOptions, AModemsPort) {
