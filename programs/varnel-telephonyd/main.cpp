@@ -13,6 +13,7 @@
 #include "host/Printable.h"
 #include "host/ProgramStart.h"
 #include "host/RuntimeFolder.h"
+#include "host/ServiceManager.h"
 #include "host/SignalWatcher.h"
 #include "host/SocketPorts.h"
 #include "host/SystemClock.h"
@@ -226,6 +227,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   const auto tellServing = [&] {
     tell("serving " + technology + " in " + folder.path.string() + "; now start varnel" +
          (options.runtimeFolder ? " --runtime-dir " + *options.runtimeFolder : ""));
+    tellServiceManager("READY=1");
   };
   const std::unique_ptr<PortChooser> chooser = makePortChooser(options, queue);
   if (options.portPath) {
@@ -280,6 +282,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
     tellServing();
   }
   const int status = application.run();
+  tellServiceManager("STOPPING=1");
   server.end();
   if (status != 0) return status;
   tell(inWords(server.counts()));

@@ -42,6 +42,12 @@ std::set<std::string> matches(const std::string& text, const std::regex& pattern
   return found;
 }
 
+// The manual page of a program, below the folder of the installation.
+std::string pageOf(const std::string& program) {
+  const std::string section = program == "varnel-telephonyd" ? "8" : "1";
+  return "share/man/man" + section + "/" + program + "." + section;
+}
+
 class Installation : public testing::Test {
  protected:
   static void SetUpTestSuite() {
@@ -99,18 +105,31 @@ TEST_F(Installation, TheDissectorIsThereWithItsTableOfLogCodes) {
       HasSubstr("[0xB17F] = {{\"LTE\", \"Serving Cell Measurements\"}, {\"All radios\", \"Measurements\"}}"));
 }
 
+TEST_F(Installation, TheUnitsStartAProgramThatIsThereWithOptionsThatItHas) {
+  const std::string help = outputOf(installed("bin/varnel-telephonyd"), {"--help"});
+  const auto known = matches(help, std::regex(R"(\n  (?:-h,)?--([a-z-]+))"));
+  for (const std::string kind : {"system", "user"}) {
+    const std::string unit = contentsOf(installed("lib/systemd/" + kind + "/varnel-telephonyd.service"));
+    EXPECT_THAT(unit, HasSubstr("\nType=notify\n")) << kind;
+    EXPECT_THAT(unit, HasSubstr("\nExecStart=varnel-telephonyd ")) << kind;
+    const auto used = matches(unit, std::regex("[ =]--([a-z-]+)"));
+    EXPECT_FALSE(used.empty()) << kind;
+    for (const std::string& option : used) EXPECT_EQ(known.count(option), 1u) << kind << ": " << option;
+  }
+  EXPECT_THAT(contentsOf(installed("lib/sysusers.d/varnel.conf")), HasSubstr("\nu varnel "));
+}
+
 TEST_F(Installation, ManualPagesHaveNoWarnings) {
   std::vector<std::string> pages = programs;
   pages.push_back("varnel-array");
   for (const std::string& page : pages)
-    expectSuccess(tool("mandoc"),
-                  {"-T", "lint", "-W", "warning", installed("share/man/man1/" + page + ".1")});
+    expectSuccess(tool("mandoc"), {"-T", "lint", "-W", "warning", installed(pageOf(page))});
 }
 
 TEST_F(Installation, EachManualPageHasTheOptionsOfItsProgram) {
   for (const std::string& program : programs) {
     const std::string help = outputOf(installed("bin/" + program), {"--help"});
-    const std::string page = contentsOf(installed("share/man/man1/" + program + ".1"));
+    const std::string page = contentsOf(installed(pageOf(program)));
     EXPECT_EQ(matches(page, std::regex(R"(\n\.It Fl (?:h , )?-([a-z-]+))")),
               matches(help, std::regex(R"(\n  (?:-h,)?--([a-z-]+))")))
         << program;

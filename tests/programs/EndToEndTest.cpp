@@ -11,6 +11,7 @@
 
 #include "host/FileDescriptor.h"
 #include "tests/support/Process.h"
+#include "tests/support/RawSocket.h"
 
 namespace varnel {
 namespace {
@@ -265,6 +266,22 @@ TEST_F(EndToEnd, TheServerSaysWhatItServesAndWhatBecameOfItsMessages) {
       testing::ContainsRegex("\nvarnel-telephonyd: messages: [1-9][0-9]* received, [1-9][0-9]* delivered, "
                              "0 dropped, 0 refused \\(0 too long for the channel, 0 not asked for\\)\n"));
   EXPECT_TRUE(std::filesystem::is_empty(_runtime.path()));
+}
+
+TEST_F(EndToEnd, TheServerTellsTheServiceManagerWhenItServesAndWhenItEnds) {
+  const RawSocket manager = RawSocket::receivingAt(_device.file("notify"));
+  const auto told = [&] {
+    const Bytes bytes = manager.receive();
+    return std::string(bytes.begin(), bytes.end());
+  };
+  Process telephony(VARNEL_TELEPHONYD_PROGRAM, {"--simulate", "kalvi-lte", "--runtime-dir", _runtime.path()},
+                    {"NOTIFY_SOCKET=" + _device.file("notify")});
+  EXPECT_EQ(told(), "READY=1");
+  EXPECT_TRUE(std::filesystem::exists(_runtime.file("com.orvane.TelephonyServer")));
+  telephony.signal(SIGTERM);
+  EXPECT_EQ(told(), "STOPPING=1");
+  ASSERT_TRUE(telephony.waitForEnd());
+  EXPECT_EQ(telephony.exitStatus(), 0);
 }
 
 // A group of the test itself: every process may give its folders to it.

@@ -7,6 +7,7 @@
 #include <unistd.h>
 
 #include <chrono>
+#include <cstddef>
 #include <cstring>
 #include <string>
 
@@ -66,10 +67,17 @@ class RawSocket {
   static RawSocket boundTo(const std::string& path, int type) {
     RawSocket socket(::socket(AF_UNIX, type | SOCK_CLOEXEC, 0));
     const sockaddr_un address = addressOf(path);
-    if (::bind(socket._descriptor, reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0)
+    if (::bind(socket._descriptor, reinterpret_cast<const sockaddr*>(&address), sizeOf(path)) != 0)
       ADD_FAILURE() << "cannot bind to " << path << ": " << std::strerror(errno);
     if (type == SOCK_STREAM) ::listen(socket._descriptor, 10);
     return socket;
+  }
+
+  // The name of an abstract socket, which begins with a zero, ends with its last byte.
+  static socklen_t sizeOf(const std::string& path) {
+    const bool isAbstract = path.starts_with('\0');
+    return static_cast<socklen_t>(isAbstract ? offsetof(sockaddr_un, sun_path) + path.size()
+                                             : sizeof(sockaddr_un));
   }
 
   static sockaddr_un addressOf(const std::string& path) {
