@@ -94,6 +94,7 @@ std::vector<std::string> holdersOf(dev_t device, const fs::path& processes) {
     holders[*number] = nameOf(process->path()) + " (process " + std::to_string(*number) + ")";
   }
   std::vector<std::string> names;
+  names.reserve(holders.size());
   for (auto& [number, name] : holders) names.push_back(std::move(name));
   return names;
 }
