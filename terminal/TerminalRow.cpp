@@ -10,6 +10,12 @@ namespace varnel {
 
 namespace {
 
+// On the row with the focus, which is reversed, colors would be patches of the background.
+Look inked(Look look, Ink ink) {
+  if (!look.isReversed) look.ink = ink;
+  return look;
+}
+
 constexpr int roomOfAccessory = 2;  // a blank and the mark
 constexpr int builtInTextColumn = 1;
 constexpr int columnOfChangeMark = 0;
@@ -113,16 +119,14 @@ void TerminalRow::paint(CellGrid& grid, const Area& area, Emphasis emphasis, con
   paintPart(grid, area, _labels, look, glyphs);
   for (const auto& container : _containers) paintPart(grid, area, *container, look, glyphs);
   paintCourse(grid, area, look, glyphs);
-  Look mark = look;
-  mark.ink = Ink::Mark;
+  Look mark = inked(look, Ink::Mark);
   if (emphasis == Emphasis::Opened) mark.isReversed = true;
   const int last = area.column + area.columns - 1;
   if (_accessory == CellAccessory::DisclosureIndicator)
     grid.write(last, area.row, glyphs.disclosure, mark, area);
   if (_accessory == CellAccessory::Checkmark) grid.write(last, area.row, glyphs.checkmark, mark, area);
-  mark.isReversed = look.isReversed;
   if (_change == CellChange::Changed) {
-    mark.ink = Ink::Change;
+    mark = inked(look, Ink::Change);
     mark.isBold = true;
     grid.write(area.column + columnOfChangeMark, area.row, glyphs.change, mark, area);
   }
@@ -138,12 +142,11 @@ void TerminalRow::paintPart(CellGrid& grid, const Area& area, const TerminalScro
     if (label->shownText().empty()) continue;
     Look its = look;
     its.isBold = label->isBold();
-    if (_change == CellChange::Changed && !label->isBold()) its.ink = Ink::Change;
+    if (_change == CellChange::Changed && !label->isBold()) its = inked(its, Ink::Change);
     grid.write(inside.column + label->column() - part.position(), area.row, label->shownText(), its, inside);
     goesOnToTheLeft |= label->column() < part.position();
   }
-  Look mark = look;
-  mark.ink = Ink::Mark;
+  const Look mark = inked(look, Ink::Mark);
   if (goesOnToTheLeft) grid.write(inside.column, area.row, glyphs.more, mark, inside);
   if (part.endOfTexts() - part.position() > part.columns())
     grid.write(inside.column + inside.columns - 1, area.row, glyphs.more, mark, inside);
@@ -158,8 +161,7 @@ void TerminalRow::paintCourse(CellGrid& grid, const Area& area, const Look& look
   const int end = std::min(labels.back()->column() - gapOfCourse, content - usualRoomOfValue);
   const int room = std::min(longestCourse, end - labels.front()->end() - gapOfCourse);
   if (room < shortestCourse) return;
-  Look its = look;
-  its.ink = Ink::Mark;
+  const Look its = inked(look, Ink::Mark);
   const std::wstring line = courseInBlocks(_course, room, glyphs);
   grid.write(area.column + end - columnsOf(line), area.row, line, its, area);
 }

@@ -268,16 +268,48 @@ TEST_F(TerminalEndToEnd, WithoutATerminalAutoIsText) {
   EXPECT_THAT(varnel.output(), StartsWith("Connecting...\n"));
 }
 
-TEST_F(TerminalEndToEnd, AClosedTerminalEndsTheProgram) {
+TEST_F(TerminalEndToEnd, AClosedTerminalEndsTheProgramAlsoWhenItIgnoresHangUps) {
   const auto telephony = server();
-  pid_t viewer = 0;
-  {
-    const Tmux terminal;
-    start(terminal);
-    ASSERT_TRUE(terminal.shows(" Updated 20"));
-    viewer = viewerOf(terminal);
+  for (const char* trap : {":", "trap '' HUP"}) {
+    pid_t viewer = 0;
+    {
+      const Tmux terminal;
+      terminal.command(trap);
+      start(terminal);
+      ASSERT_TRUE(terminal.shows(" Updated 20"));
+      viewer = viewerOf(terminal);
+    }
+    EXPECT_TRUE(eventually([&] { return ::kill(viewer, 0) != 0; })) << trap;
   }
-  EXPECT_TRUE(eventually([&] { return ::kill(viewer, 0) != 0; }));
+}
+
+TEST_F(TerminalEndToEnd, NoColorIsKept) {
+  const auto telephony = server();
+  const std::regex color("\x1b\\[[0-9;]*3[0-9]m");
+  for (const char* environment : {"NO_COLOR=1", "NO_COLOR="}) {
+    const Tmux terminal;
+    const std::string bytes = _device.file(environment);
+    terminal.command(std::string("export ") + environment);
+    terminal.copyBytesTo(bytes);
+    start(terminal);
+    ASSERT_TRUE(terminal.shows("•Serving Cell"));
+    terminal.press({"q"});
+    expectLeft(terminal, "0");
+    EXPECT_EQ(std::regex_search(contentsOf(bytes), color), std::string_view(environment) == "NO_COLOR=");
+  }
+}
+
+TEST_F(TerminalEndToEnd, AClickOpensARow) {
+  const auto telephony = server();
+  const Tmux terminal;
+  start(terminal);
+  ASSERT_TRUE(terminal.shows("Serving Cell Info"));
+  // Button 1 is pressed and released in the fifth column of the second row.
+  terminal.type("\x1b[M %\"\x1b[M#%\"");
+  ASSERT_TRUE(terminal.shows(" Serving Cell Info                  "));
+  ASSERT_TRUE(terminal.shows("Tracking Area Code"));
+  terminal.press({"q"});
+  expectLeft(terminal, "0");
 }
 
 TEST_F(TerminalEndToEnd, AnAsciiTerminalGetsAscii) {
