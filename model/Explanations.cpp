@@ -152,17 +152,22 @@ std::vector<std::string> Explanations::keys() const {
 
 std::optional<SignalLevel> Explanations::levelOf(std::string_view path, std::string_view value,
                                                  const EntryFormats& formats) const {
-  if (value.empty() || formats.unitOf(value).empty()) return std::nullopt;
-  const std::string_view number = formats.number(value);
-  const auto explanation = number.empty() ? std::nullopt : of(path);
+  const std::string_view text = formats.number(value);
+  if (text.empty()) return std::nullopt;
+  double number = 0;
+  std::from_chars(text.data(), text.data() + text.size(), number);
+  return levelOf(path, number, formats.unitOf(value));
+}
+
+std::optional<SignalLevel> Explanations::levelOf(std::string_view path, double number,
+                                                 std::string_view unit) const {
+  const auto explanation = unit.empty() ? std::nullopt : of(path);
   if (!explanation || !explanation->limits) return std::nullopt;
   const Explanation::Limits& limits = *explanation->limits;
-  double level = 0;
-  std::from_chars(number.data(), number.data() + number.size(), level);
-  if (level > limits.highest) return std::nullopt;
-  if (level >= limits.excellent) return SignalLevel::Excellent;
-  if (level >= limits.good) return SignalLevel::Good;
-  return level >= limits.fair ? SignalLevel::Fair : SignalLevel::Poor;
+  if (number > limits.highest) return std::nullopt;
+  if (number >= limits.excellent) return SignalLevel::Excellent;
+  if (number >= limits.good) return SignalLevel::Good;
+  return number >= limits.fair ? SignalLevel::Fair : SignalLevel::Poor;
 }
 
 }  // namespace varnel

@@ -57,6 +57,8 @@ class Explanations {
   /// unit.
   std::optional<SignalLevel> levelOf(std::string_view path, std::string_view value,
                                      const EntryFormats& formats) const;
+  /// The same for a number that was read already.
+  std::optional<SignalLevel> levelOf(std::string_view path, double number, std::string_view unit) const;
 
  private:
   const Value* find(std::string_view path, std::string* key) const;

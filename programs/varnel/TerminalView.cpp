@@ -16,6 +16,7 @@
 #include "app/VarnelApp.h"
 #include "host/HostApplication.h"
 #include "host/SignalWatcher.h"
+#include "model/Explanations.h"
 #include "programs/varnel/HostServices.h"
 #include "terminal/CursesScreen.h"
 #include "terminal/HeldLines.h"
@@ -148,25 +149,53 @@ class TerminalViewer final {
   }
 
   // What there is to say about a row, in lines.
-  std::string explained(const NamePath& path) const {
+  std::string explained(const NamePath& path) {
     const VarnelModelNode* const node = path.empty() ? nullptr : _app.nodeAt(path);
     if (!node) return {};
     std::string text = "This row: ";
     for (const std::string& name : path) text.append(&name == &path.front() ? "" : " > ").append(name);
     text += '\n';
+    const std::string meaning = meaningOf(path);
     if (!node->value()) {
+      text += meaning;
       const std::size_t rows = node->childNodes()->size();
       return text + "It leads to " + std::to_string(rows) + (rows == 1 ? " row" : " rows") +
              "; Enter opens them.\n";
     }
-    text += "Its value: " + printableText(*node->value()) + '\n';
+    text += "Its value: " + printableText(*node->value()) + levelOf(*node, path) + '\n';
     // Only a leaf has a value.
     if (const auto& written = static_cast<const VarnelModelLeafNode&>(*node).writtenAt()) {
       const SystemClock clock;
       text += "The modem last sent it " +
               DateFormatter(momentPattern).string(*written, clock.zoneAt(*written)) + ".\n";
     }
+    return text + meaning;
+  }
+
+  // The resource is read when somebody asks for the first time.
+  const Explanations& explanations() {
+    if (!_explanations) _explanations.emplace(_services.model().generator.resources);
+    return *_explanations;
+  }
+
+  static std::string joined(const NamePath& path) {
+    std::string text;
+    for (const std::string& name : path) text.append("/").append(name);
     return text;
+  }
+
+  std::string meaningOf(const NamePath& path) {
+    const auto explanation = explanations().of(joined(path));
+    return explanation ? explanation->text() : std::string();
+  }
+
+  // Such as " (good)"; empty for a row that shows no level.
+  std::string levelOf(const VarnelModelNode& row, const NamePath& path) {
+    const auto series = _history.seriesOf(row);
+    if (!series) return {};
+    const double number = _history.summary(*series, _history.last({})).last;
+    const auto level = explanations().levelOf(joined(path), number, _history.unit(*series));
+    return level ? " (" + std::string(nameOf(*level)) + ")" : std::string();
   }
 
   void takeKeys() noexcept {
@@ -200,6 +229,7 @@ class TerminalViewer final {
   std::optional<CursesScreen> _screen;
   TerminalUserInterface _userInterface;
   ValueHistory _history;
+  std::optional<Explanations> _explanations;
   VarnelApp _app;
   QSocketNotifier _input;
   std::unique_ptr<RepeatingTimer> _trimming;

@@ -109,6 +109,12 @@ TEST_F(ExplanationsTest, ALevelBeginsAtItsLimit) {
   EXPECT_EQ(levelOf("Cells/RSRP", "0.00 dBm"), "excellent");
 }
 
+TEST_F(ExplanationsTest, ANumberThatWasReadAlreadyHasTheSameLevel) {
+  const Explanations explanations(resources);
+  EXPECT_EQ(explanations.levelOf("Cells/RSRP", -90, "dBm"), SignalLevel::Good);
+  EXPECT_EQ(explanations.levelOf("Cells/RSRP", -90, ""), std::nullopt);
+}
+
 TEST_F(ExplanationsTest, WhatIsNoReadingHasNoLevel) {
   EXPECT_EQ(levelOf("Cells/RSRP", "0.01 dBm"), "(none)") << "above the highest reading";
   EXPECT_EQ(levelOf("Cells/RSRP", "-90"), "(none)") << "without its unit";

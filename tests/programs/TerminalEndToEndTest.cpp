@@ -109,6 +109,7 @@ TEST_F(TerminalEndToEnd, FindGoesToARowAnywhere) {
   ASSERT_TRUE(terminal.shows(" Serving Cell Measurements  "));
   terminal.press({"?"});
   ASSERT_TRUE(terminal.shows("This row: Serving Cell Measurements > Average RSRP"));
+  ASSERT_TRUE(terminal.shows("Defined in: 3GPP TS 36.214, 5.1.1"));
   terminal.press({"C-q"});
   expectLeft(terminal, "0");
 }
