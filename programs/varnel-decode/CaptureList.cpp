@@ -11,7 +11,6 @@
 #include <queue>
 #include <stdexcept>
 #include <system_error>
-#include <unordered_set>
 #include <utility>
 
 namespace varnel {
@@ -52,8 +51,8 @@ std::optional<Part> partNamed(std::string_view text) {
 
 std::vector<std::string> capturesIn(std::string_view list, const std::string& listName) {
   const char separator = list.find('\0') == std::string_view::npos ? '\n' : '\0';
-  std::vector<std::string> captures;
-  std::unordered_set<std::string_view> seen;
+  std::vector<std::string_view> names;
+  names.reserve(static_cast<std::size_t>(std::ranges::count(list, separator)) + 1);
   while (!list.empty()) {
     const std::size_t end = std::min(list.find(separator), list.size());
     const std::string_view name = list.substr(0, end);
@@ -61,8 +60,20 @@ std::vector<std::string> capturesIn(std::string_view list, const std::string& li
     if (name.size() >= PATH_MAX)
       throw std::runtime_error(listName + " is no list of captures: a name in it has " +
                                std::to_string(name.size()) + " characters");
-    if (!name.empty() && seen.insert(name).second) captures.push_back(asFile(name));
+    if (!name.empty()) names.push_back(name);
   }
+  // There may be very many names, and what is needed only here must leave no holes in the memory. So there is
+  // no set of them.
+  std::vector<std::size_t> sorted(names.size());
+  std::iota(sorted.begin(), sorted.end(), std::size_t{0});
+  std::ranges::stable_sort(sorted, {}, [&](std::size_t i) { return names[i]; });
+  std::vector<bool> occursAgain(names.size());
+  for (std::size_t i = 1; i < sorted.size(); ++i)
+    occursAgain[sorted[i]] = names[sorted[i]] == names[sorted[i - 1]];
+  std::vector<std::string> captures;
+  captures.reserve(names.size());
+  for (std::size_t i = 0; i < names.size(); ++i)
+    if (!occursAgain[i]) captures.push_back(asFile(names[i]));
   return captures;
 }
 

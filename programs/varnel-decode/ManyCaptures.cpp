@@ -85,9 +85,9 @@ class ManyCaptures {
   ManyCaptures(const Options& options, const DecodingServices& services)
       : _options(options),
         _services(services),
-        _progress(isTerminalThatErases(STDERR_FILENO) ? sizesOf(options.captures)
-                                                      : std::vector<std::uint64_t>(options.captures.size()),
-                  options.jobs) {
+        _progress(
+            isTerminalThatErases(STDERR_FILENO) ? sizesOf(options.captures) : std::vector<std::uint64_t>(),
+            options.jobs) {
     if (options.outputFolder) _tree.emplace(*options.outputFolder, outputEnding(options));
     if (options.reportPath) _report.emplace(*options.reportPath);
   }
@@ -105,6 +105,8 @@ class ManyCaptures {
                  .ended = [this](const JobEnd& end) { note(end); },
                  .progress = &_progress});
     if (_report) _report->finish();
+    if (_options.databasePath)
+      _hasFailed |= !succeeds([&] { CaptureDatabase(*_options.databasePath).removeJournal(); });
     return _hasFailed ? std::max(status, generalError) : status;
   }
 

@@ -27,6 +27,7 @@ std::ifstream openPart(const std::string& path) {
 void addDatabases(const std::vector<std::string>& parts, const std::string& databasePath) {
   CaptureDatabase database(databasePath);
   for (const std::string& part : parts) database.take(part);
+  database.removeJournal();
 }
 
 void addReports(const std::vector<std::string>& parts) {

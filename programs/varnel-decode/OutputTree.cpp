@@ -3,6 +3,7 @@
 #include <sys/stat.h>
 
 #include <algorithm>
+#include <functional>
 #include <system_error>
 #include <utility>
 
@@ -67,19 +68,24 @@ fs::path OutputTree::outputOf(const std::string& capture) const {
 }
 
 std::optional<std::string> OutputTree::clash(const std::vector<std::string>& captures) const {
-  std::vector<std::pair<fs::path, std::size_t>> outputs;
+  // There may be very many captures, so their outputs are compared by hashes first.
+  std::vector<std::pair<std::size_t, std::size_t>> outputs;  // hash and capture
   std::vector<Node> inputs;
+  outputs.reserve(captures.size());
+  inputs.reserve(captures.size());
   for (std::size_t i = 0; i < captures.size(); ++i) {
-    outputs.emplace_back(outputOf(captures[i]), i);
+    outputs.emplace_back(std::hash<std::string>()(outputOf(captures[i]).string()), i);
     if (const auto node = nodeOf(captures[i])) inputs.push_back(*node);
   }
   std::ranges::sort(inputs);
   std::ranges::sort(outputs);
-  const auto twice = std::ranges::adjacent_find(outputs, {}, [](const auto& output) { return output.first; });
-  if (twice != outputs.end())
-    return captures[twice->second] + " and " + captures[std::next(twice)->second] +
-           " would have the same output, " + twice->first.string() + "; decode one of them alone";
-  for (const auto& [output, capture] : outputs) {
+  for (std::size_t i = 0; i < outputs.size(); ++i) {
+    const auto& [hash, capture] = outputs[i];
+    const fs::path output = outputOf(captures[capture]);
+    for (std::size_t other = i + 1; other < outputs.size() && outputs[other].first == hash; ++other)
+      if (outputOf(captures[outputs[other].second]) == output)
+        return captures[capture] + " and " + captures[outputs[other].second] +
+               " would have the same output, " + output.string() + "; decode one of them alone";
     const auto node = nodeOf(output);
     if (node && std::ranges::binary_search(inputs, *node))
       return "the output of " + captures[capture] + " would overwrite the capture " + output.string() +

@@ -54,6 +54,7 @@ TEST_F(DecodeIntoDatabase, EachCaptureIsThereWithWhatBecameOfIt) {
   const Result result = runLte({"--files-from", "list", "--sqlite", "all.db", "--jobs", "2"});
   EXPECT_EQ(result.status, 1);
   EXPECT_EQ(result.output, "");
+  EXPECT_FALSE(std::filesystem::exists("all.db-journal"));
   const auto captures = capturesIn("all.db");
   ASSERT_EQ(captures.size(), 5u);
   EXPECT_EQ(captures[0], "a|decoded||2");

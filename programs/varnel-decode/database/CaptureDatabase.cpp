@@ -144,7 +144,8 @@ CaptureDatabase::CaptureDatabase(const std::string& path, Use use)
     : _connection(path, use == Use::Reading ? SqliteConnection::Mode::ReadOnly
                                             : SqliteConnection::Mode::ReadAndWrite) {
   if (use == Use::Writing) {
-    _connection.run("PRAGMA journal_mode = DELETE; PRAGMA synchronous = FULL; PRAGMA cache_size = -16384");
+    _connection.run(
+        "PRAGMA journal_mode = TRUNCATE; PRAGMA synchronous = NORMAL; PRAGMA cache_size = -16384");
     makeTables();
   }
   if (_connection.number("PRAGMA application_id") != applicationId)
@@ -159,6 +160,8 @@ bool CaptureDatabase::isDatabase(const std::string& path) {
   std::ifstream file(path, std::ios::binary);
   return file.read(bytes.data(), static_cast<std::streamsize>(bytes.size())) && bytes == beginning;
 }
+
+void CaptureDatabase::removeJournal() { _connection.run("PRAGMA journal_mode = DELETE"); }
 
 // Another process may do the same at the same time.
 void CaptureDatabase::makeTables() {

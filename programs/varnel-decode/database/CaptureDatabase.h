@@ -38,6 +38,10 @@ class CaptureDatabase final {
   /// Copies all captures of another database.
   void take(const std::string& part);
 
+  /// Removes the empty journal beside the file, which saves time between transactions. Another process that
+  /// writes makes it again.
+  void removeJournal();
+
  private:
   void makeTables();
   std::int64_t addCapture(const CaptureEntry& capture);
