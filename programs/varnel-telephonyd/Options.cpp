@@ -144,7 +144,7 @@ std::optional<std::string> conflict(const Options& options) {
     return "the modem of ifx-gsm sends no log packets, so it has no diagnostic port to play";
   if (options.recordPath && options.recordPath->empty()) return "--record needs the name of a file";
   if (!options.replayPath) return std::nullopt;
-  if (const auto found = conflictOfPipe(options)) return found;
+  if (auto found = conflictOfPipe(options)) return found;
   if (!isPlayable(options.speed)) return "--speed must lie between 0.001 and 1000000";
   if (options.recordPath &&
       identityOfRecording(*options.recordPath).isSameFileAs(identityOfCapture(*options.replayPath)))
