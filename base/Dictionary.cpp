@@ -45,6 +45,15 @@ void Dictionary::remove(std::string_view key) {
   if (!_positions.empty()) indexAll();
 }
 
+void Dictionary::writeAt(std::size_t position, std::string_view key, std::string_view text) {
+  if (hasAt(position, key)) {
+    at(position).assignText(text);
+  } else {
+    truncate(position);
+    add(key, text);
+  }
+}
+
 void Dictionary::truncate(std::size_t size) {
   if (size >= _entries.size()) return;
   _entries.erase(_entries.begin() + static_cast<std::ptrdiff_t>(size), _entries.end());

@@ -39,6 +39,9 @@ class Dictionary {
   void remove(std::string_view key);
   /// Adds an entry at the end. The key must not be in the dictionary, and the value not be absent.
   void add(std::string_view key, Value value);
+  /// Makes the entry at this position, at most the size, this key with a text. No entry before it may have
+  /// the key. An entry that has the key keeps its memory; else the entries from the position on are removed.
+  void writeAt(std::size_t position, std::string_view key, std::string_view text);
   /// Removes the entries from this position on.
   void truncate(std::size_t size);
   /// Reserves memory for this many keys.

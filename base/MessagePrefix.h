@@ -3,6 +3,8 @@
 #include <cstddef>
 #include <cstdint>
 #include <optional>
+#include <string>
+#include <string_view>
 
 #include "base/Bytes.h"
 
@@ -17,6 +19,14 @@ inline constexpr std::size_t prefixSize = 2;
 inline std::optional<std::uint8_t> subscriptionOf(ByteView message) {
   if (message.size() < prefixSize || message[0] != prefixMark || message[1] == 0) return std::nullopt;
   return message[1];
+}
+
+/// What the name of a SIM card begins with.
+inline constexpr std::string_view subscriptionNameMark = "SIM ";
+
+/// "SIM 2": the SIM card with this number.
+inline std::string subscriptionName(std::uint8_t number) {
+  return std::string(subscriptionNameMark) + std::to_string(number);
 }
 
 }  // namespace varnel

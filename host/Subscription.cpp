@@ -1,5 +1,6 @@
 #include "host/Subscription.h"
 
+#include "base/MessagePrefix.h"
 #include "platform/TelephonyService.h"
 
 namespace varnel {
@@ -9,7 +10,7 @@ Unasked unaskedOf(std::string_view technology) {
 }
 
 std::string subscriptionName(std::optional<std::uint8_t> subscription) {
-  return subscription ? "SIM " + std::to_string(*subscription) : "No SIM";
+  return subscription ? subscriptionName(*subscription) : "No SIM";
 }
 
 std::string subscriptionNames(std::span<const std::uint8_t> subscriptions) {

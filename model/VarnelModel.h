@@ -108,7 +108,8 @@ class VarnelModel {
   std::optional<std::string> missingTemplate() const;
   /// The formats of the display's numbers; none while there is no generator. They are made anew by each call.
   NumberFormats numberFormats() const;
-  /// How many messages since the link was opened no decoder took, because of their log code or length.
+  /// How many messages since the link was opened no decoder took, because of their log code, version, or
+  /// length.
   std::uint64_t messagesNotDecoded() const;
 
  private:

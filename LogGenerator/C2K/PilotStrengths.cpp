@@ -32,14 +32,7 @@ void PilotStrengths::publishOrNone() {
 // Most pilots come again, and reuse the memory of the previous packet's pilots.
 void PilotStrengths::put(std::string_view key, std::string_view text) {
   if (_size == 0) _pilots = _lookup.dictionaryFor(_variable);
-  Dictionary& pilots = *_pilots.dictionary();
-  if (pilots.hasAt(_size, key)) {
-    pilots.at(_size).assignText(text);
-  } else {
-    pilots.truncate(_size);
-    pilots.add(key, text);
-  }
-  ++_size;
+  _pilots.dictionary()->writeAt(_size++, key, text);
 }
 
 double decibels(double ratio) { return 10.0 * std::log10(ratio); }

@@ -19,8 +19,6 @@ constexpr std::string_view templateName = "AllRadios";
 // kind.
 constexpr std::string_view groupsKey = "Groups";
 
-std::string nameOf(std::uint8_t subscription) { return "SIM " + std::to_string(subscription); }
-
 // The dictionary under a key, which is made if it is not there.
 Value dictionaryAt(Dictionary& entries, std::string_view key) {
   if (!entries.get(key).dictionary()) entries.set(key, Value::ofDictionary());
@@ -63,7 +61,7 @@ void AllRadiosLogGenerator::showIfAny(Subscription& subscription, SubscriptionNu
                                       Dictionary& state) {
   const std::size_t marks = 1;
   if (subscription.isShown || subscription.display.dictionary()->size() == marks) return;
-  state.get(stateKey::display).dictionary()->set(nameOf(number), subscription.display);
+  state.get(stateKey::display).dictionary()->set(subscriptionName(number), subscription.display);
   subscription.isShown = true;
 }
 
@@ -92,10 +90,10 @@ AllRadiosLogGenerator::Subscription* AllRadiosLogGenerator::subscriptionIn(Dicti
                                             std::forward_as_tuple(services(), displayTemplate()))
                                    .first->second;
   const Value& whole = state.get(stateKey::display);
-  const Value& earlier = whole.dictionary()->get(nameOf(number));
+  const Value& earlier = whole.dictionary()->get(subscriptionName(number));
   subscription.isShown = number == 0 || earlier.dictionary();
   subscription.display = number == 0 ? whole : earlier.dictionary() ? earlier : Value::ofDictionary();
-  subscription.groups.bind(dictionaryAt(*state.get(groupsKey).dictionary(), nameOf(number)),
+  subscription.groups.bind(dictionaryAt(*state.get(groupsKey).dictionary(), subscriptionName(number)),
                            subscription.display);
   return &subscription;
 }

@@ -410,26 +410,6 @@ std::optional<std::uint32_t> lteUplinkOf(std::uint32_t downlinkEarfcn) {
   return uplink;
 }
 
-std::optional<std::int32_t> lteBandwidth_khz(std::uint32_t resourceBlocks) {
-  // 3GPP TS 36.101, table 5.6-1.
-  switch (resourceBlocks) {
-    case 6:
-      return 1'400;
-    case 15:
-      return 3'000;
-    case 25:
-      return 5'000;
-    case 50:
-      return 10'000;
-    case 75:
-      return 15'000;
-    case 100:
-      return 20'000;
-    default:
-      return std::nullopt;
-  }
-}
-
 std::optional<std::int32_t> nrFrequency_khz(std::uint32_t nrArfcn) {
   for (const NRRaster& part : nrRaster)
     if (part.numbers.contains(nrArfcn))

@@ -67,8 +67,6 @@ std::optional<LTEChannel> lteUplink(std::uint32_t earfcn);
 /// a time division band. Nothing where there is no uplink: in bands that have none, and in the part of bands
 /// 66 and 70 that is wider than their uplink.
 std::optional<std::uint32_t> lteUplinkOf(std::uint32_t downlinkEarfcn);
-/// The bandwidth of a carrier of so many resource blocks. Nothing for numbers that LTE does not have.
-std::optional<std::int32_t> lteBandwidth_khz(std::uint32_t resourceBlocks);
 
 /// The frequency of an NR-ARFCN, which is the same in both directions.
 std::optional<std::int32_t> nrFrequency_khz(std::uint32_t nrArfcn);

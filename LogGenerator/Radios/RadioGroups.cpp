@@ -60,6 +60,11 @@ bool hasContent(const Value& value) {
   });
 }
 
+bool isDecoded(const Subscriber& subscriber, const Packet& packet, std::uint32_t logCode) {
+  if (subscriber.handler) return packet.size() >= subscriber.handler->minimumLength;
+  return subscriber.decoder->fateOf(packet, logCode).outcome == MessageFate::Outcome::Decoded;
+}
+
 }  // namespace
 
 RadioGroups::RadioGroups(const Services& services, const Value& displayTemplate)
@@ -149,7 +154,7 @@ bool RadioGroups::take(const LogMessage& message, ByteView bytes) {
   bool isTaken = false;
   const Time now = _services.clock.now();
   for (const auto& [index, subscriber] : found->second.deliveries) {
-    isTaken |= !subscriber.handler || message.packet().size() >= subscriber.handler->minimumLength;
+    isTaken = isTaken || isDecoded(subscriber, message.packet(), logCode);
     subscriber.decoder->section().setTime(now);
     subscriber.deliver(message.packet(), logCode);
     if (!_groups[index].isShown) noteWhetherShown(_groups[index]);
@@ -186,12 +191,9 @@ MessageFate RadioGroups::fateOf(const LogMessage& message, ByteView bytes) const
   if (found->second.isC2K) return _c2k.fateOf(bytes);
   MessageFate best{TooShort, logCode};
   for (const auto& [index, subscriber] : found->second.deliveries) {
-    if (subscriber.handler) {
-      if (message.packet().size() >= subscriber.handler->minimumLength) return {Decoded, logCode};
-      continue;
-    }
+    if (isDecoded(subscriber, message.packet(), logCode)) return {Decoded, logCode};
+    if (subscriber.handler) continue;
     const MessageFate fate = subscriber.decoder->fateOf(message.packet(), logCode);
-    if (fate.outcome == Decoded) return fate;
     if (fate.outcome == UnknownVersion) best = fate;
   }
   return best;

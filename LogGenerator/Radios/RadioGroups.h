@@ -35,7 +35,7 @@ class RadioGroups final : public WriteTimes {
   /// in the display, from now on or from the message on that says it.
   void bind(const Value& memory, const Value& display);
 
-  /// Decodes one message. Returns whether a decoder takes it.
+  /// Decodes one message. Returns whether a decoder knows its log code, version, and length.
   bool take(const LogMessage& message, ByteView bytes);
   MessageFate fateOf(const LogMessage& message, ByteView bytes) const;
   /// A display is about to be made.

@@ -22,15 +22,7 @@ class RecordWriter {
   RecordWriter& operator=(const RecordWriter&) = delete;
   ~RecordWriter() { _record.truncate(_next); }
 
-  void put(std::string_view label, std::string_view text) {
-    if (_record.hasAt(_next, label)) {
-      _record.at(_next).assignText(text);
-    } else {
-      _record.truncate(_next);
-      _record.add(label, text);
-    }
-    ++_next;
-  }
+  void put(std::string_view label, std::string_view text) { _record.writeAt(_next++, label, text); }
   /// Writes nothing where there is no text.
   void putUnlessEmpty(std::string_view label, std::string_view text) {
     if (!text.empty()) put(label, text);

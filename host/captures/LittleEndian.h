@@ -18,10 +18,14 @@ Number loadLittleEndian(ByteView bytes, std::size_t offset) {
   return number;
 }
 
-template <class Number>
-void appendLittleEndian(Bytes& bytes, Number number) {
-  const auto* const first = reinterpret_cast<const std::uint8_t*>(&number);
-  bytes.insert(bytes.end(), first, first + sizeof number);
+/// Appends numbers, each in as many bytes as its type has.
+template <class... Numbers>
+void appendLittleEndian(Bytes& bytes, Numbers... numbers) {
+  const auto append = [&bytes](const auto& number) {
+    const auto* const first = reinterpret_cast<const std::uint8_t*>(&number);
+    bytes.insert(bytes.end(), first, first + sizeof number);
+  };
+  (append(numbers), ...);
 }
 
 }  // namespace varnel

@@ -10,26 +10,21 @@ namespace {
 
 constexpr std::uint32_t nanosecondMagic = 0xA1B23C4D;
 
-template <class... Numbers>
-void put(Bytes& bytes, Numbers... numbers) {
-  (appendLittleEndian(bytes, numbers), ...);
-}
-
 }  // namespace
 
 ByteView PcapWriter::beginning() {
   constexpr std::uint32_t snapshotLength = PcapCapture::longestMessage;
   _bytes.clear();
-  put(_bytes, nanosecondMagic, std::uint16_t{2}, std::uint16_t{4}, std::uint64_t{0}, snapshotLength,
-      PcapCapture::linkType);
+  appendLittleEndian(_bytes, nanosecondMagic, std::uint16_t{2}, std::uint16_t{4}, std::uint64_t{0},
+                     snapshotLength, PcapCapture::linkType);
   return _bytes;
 }
 
 ByteView PcapWriter::encode(const CaptureRecord& record) {
   const auto size = static_cast<std::uint32_t>(record.message.size());
   _bytes.clear();
-  put(_bytes, static_cast<std::uint32_t>(record.time.seconds),
-      static_cast<std::uint32_t>(record.time.nanoseconds), size, size);
+  appendLittleEndian(_bytes, static_cast<std::uint32_t>(record.time.seconds),
+                     static_cast<std::uint32_t>(record.time.nanoseconds), size, size);
   _bytes.insert(_bytes.end(), record.message.begin(), record.message.end());
   return _bytes;
 }

@@ -17,18 +17,13 @@ constexpr std::uint8_t nanoseconds = 9;                                         
 constexpr std::uint32_t noLimit = 0;
 constexpr std::size_t longestText = 1024;
 
-template <class... Numbers>
-void put(Bytes& bytes, Numbers... numbers) {
-  (appendLittleEndian(bytes, numbers), ...);
-}
-
 void putPadded(Bytes& bytes, ByteView value) {
   bytes.insert(bytes.end(), value.begin(), value.end());
   bytes.resize((bytes.size() + 3) / 4 * 4);
 }
 
 void putOption(Bytes& bytes, std::uint16_t kind, ByteView value) {
-  put(bytes, kind, static_cast<std::uint16_t>(value.size()));
+  appendLittleEndian(bytes, kind, static_cast<std::uint16_t>(value.size()));
   putPadded(bytes, value);
 }
 
@@ -40,9 +35,9 @@ void putOption(Bytes& bytes, std::uint16_t kind, std::string_view text) {
 // A block has its size at the beginning and at the end.
 void putBlock(Bytes& bytes, std::uint32_t type, const Bytes& body) {
   const auto size = static_cast<std::uint32_t>(body.size() + 12);
-  put(bytes, type, size);
+  appendLittleEndian(bytes, type, size);
   bytes.insert(bytes.end(), body.begin(), body.end());
-  put(bytes, size);
+  appendLittleEndian(bytes, size);
 }
 
 std::uint64_t nanosecondsSince1970(Time time) {
@@ -57,13 +52,13 @@ std::uint64_t nanosecondsSince1970(Time time) {
 
 void appendSection(Bytes& file) {
   Bytes section;
-  put(section, byteOrderMagic, std::uint16_t{1}, std::uint16_t{0}, ~std::uint64_t{0});
+  appendLittleEndian(section, byteOrderMagic, std::uint16_t{1}, std::uint16_t{0}, ~std::uint64_t{0});
   putBlock(file, sectionBlock, section);
 }
 
 void appendInterface(Bytes& file, const Interface& interface) {
   Bytes body;
-  put(body, interface.linkType, std::uint16_t{0}, noLimit);
+  appendLittleEndian(body, interface.linkType, std::uint16_t{0}, noLimit);
   if (interface.name) putOption(body, nameOption, *interface.name);
   if (interface.description) putOption(body, descriptionOption, *interface.description);
   putOption(body, resolutionOption, Bytes{nanoseconds});
@@ -76,13 +71,13 @@ void appendPacket(Bytes& file, const Packet& packet) {
   const std::uint64_t time = nanosecondsSince1970(packet.time);
   const bool hasDirection = packet.direction != Direction::Unknown;
   Bytes body;
-  put(body, packet.interface, static_cast<std::uint32_t>(time >> 32), static_cast<std::uint32_t>(time), size,
-      size);
+  appendLittleEndian(body, packet.interface, static_cast<std::uint32_t>(time >> 32),
+                     static_cast<std::uint32_t>(time), size, size);
   putPadded(body, packet.bytes);
   if (!packet.comment.empty()) putOption(body, commentOption, packet.comment);
   if (hasDirection) {
     Bytes flags;
-    put(flags, std::uint32_t{static_cast<std::uint8_t>(packet.direction)});
+    appendLittleEndian(flags, std::uint32_t{static_cast<std::uint8_t>(packet.direction)});
     putOption(body, flagsOption, flags);
   }
   if (hasDirection || !packet.comment.empty()) putOption(body, endOfOptions, ByteView());

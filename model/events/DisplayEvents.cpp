@@ -5,14 +5,9 @@
 #include <string_view>
 
 #include "base/Dictionary.h"
+#include "base/MessagePrefix.h"
 
 namespace varnel {
-
-namespace {
-
-constexpr std::string_view cardPrefix = "SIM ";
-
-}  // namespace
 
 std::vector<DisplayEvent> DisplayEvents::lookAt(const Value& display, Time time) {
   std::vector<DisplayEvent> events;
@@ -35,7 +30,7 @@ void DisplayEvents::bind(const Value& display) {
   if (isNew) _subscriptions.clear();
   bindSubscription("", display);
   for (const auto& [key, value] : *display.dictionary())
-    if (key.starts_with(cardPrefix) && value.dictionary()) bindSubscription(key, value);
+    if (key.starts_with(subscriptionNameMark) && value.dictionary()) bindSubscription(key, value);
 }
 
 void DisplayEvents::bindSubscription(const std::string& name, const Value& groups) {

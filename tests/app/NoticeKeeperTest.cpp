@@ -253,7 +253,7 @@ TEST_F(NoticeKeeperTest, MessagesThatAreNotShownAreCountedALineForEachReason) {
   EXPECT_EQ(keeper.text(),
             "Messages that the server dropped, since they were read too slowly: 12\n"
             "Messages too long for the log channel: 1\n"
-            "Messages of a log code or length that no decoder knows: 1");
+            "Messages of a log code, version, or length that no decoder knows: 1");
 }
 
 TEST_F(NoticeKeeperTest, ASnapshotIsToldWithItsPlaceForHalfAMinute) {

@@ -204,6 +204,25 @@ TEST(Dictionary, AddPutsAnEntryAtTheEnd) {
   EXPECT_EQ(textOf(dictionary, "last"), "1");
 }
 
+TEST(Dictionary, WriteAtKeepsAnEntryThatHasTheKey) {
+  Dictionary dictionary;
+  dictionary.set("a", "1");
+  dictionary.set("b", "2");
+  dictionary.writeAt(0, "a", "3");
+  EXPECT_EQ(keysOf(dictionary), "a b ");
+  EXPECT_EQ(textOf(dictionary, "a"), "3");
+  dictionary.writeAt(2, "c", "4");
+  EXPECT_EQ(keysOf(dictionary), "a b c ");
+}
+
+TEST(Dictionary, WriteAtRemovesTheEntriesBehindAnotherKey) {
+  Dictionary dictionary;
+  for (const char* key : {"a", "b", "c"}) dictionary.set(key, "1");
+  dictionary.writeAt(1, "c", "2");
+  EXPECT_EQ(keysOf(dictionary), "a c ");
+  EXPECT_EQ(textOf(dictionary, "c"), "2");
+}
+
 TEST(Dictionary, TruncateRemovesTheEntriesFromAPositionOn) {
   Dictionary dictionary = numbered(60);
   const std::string first = dictionary.begin()->key;

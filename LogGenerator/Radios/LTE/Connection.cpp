@@ -23,6 +23,9 @@ void Connection::take(const AirMessageReading& reading) {
   const std::string_view name = reading.message->name;
   // Most messages are of other kinds.
   const bool mayChange = name.starts_with("RRCConnection");
+  // A phone that another radio takes over leaves its LTE connection (3GPP TS 36.331, 5.4.3.4). If it does not
+  // get there, it re-establishes the connection.
+  if (is(name, "MobilityFromEUTRACommand")) return sectionRef.setText(stateEntry, "Idle");
   // A phone that may not re-establish its connection has lost it (3GPP TS 36.331, 5.3.7.8).
   if (mayChange && (is(name, "RRCConnectionRelease") || is(name, "RRCConnectionReject") ||
                     is(name, "RRCConnectionReestablishmentReject")))

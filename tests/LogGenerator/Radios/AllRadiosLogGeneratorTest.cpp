@@ -104,6 +104,14 @@ TEST_F(AllRadiosLogGeneratorTest, APacketThatIsTooShortShowsNoGroup) {
   const Bytes packet = servingCell(17);
   take(Bytes(packet.begin(), packet.end() - 1));
   EXPECT_THAT(groups(), IsEmpty());
+  EXPECT_EQ(generator->messagesNotDecoded(), 1u);
+}
+
+TEST_F(AllRadiosLogGeneratorTest, APacketOfAnUnknownVersionIsNotDecoded) {
+  take(servingCell(17, 3));
+  EXPECT_EQ(generator->messagesNotDecoded(), 0u);
+  take(servingCell(17, 37));
+  EXPECT_EQ(generator->messagesNotDecoded(), 1u);
 }
 
 TEST_F(AllRadiosLogGeneratorTest, AnUnknownVersionIsShownAsSuch) {

@@ -271,18 +271,6 @@ TEST(LTEChannels, WhereThereIsNoUplinkThereIsNoPartner) {
     EXPECT_EQ(lteUplinkOf(earfcn), std::nullopt) << earfcn;
 }
 
-TEST(LTEChannels, SixNumbersOfResourceBlocksAreABandwidth) {
-  EXPECT_EQ(lteBandwidth_khz(6), 1400);
-  EXPECT_EQ(lteBandwidth_khz(15), 3000);
-  EXPECT_EQ(lteBandwidth_khz(25), 5000);
-  EXPECT_EQ(lteBandwidth_khz(50), 10000);
-  EXPECT_EQ(lteBandwidth_khz(75), 15000);
-  EXPECT_EQ(lteBandwidth_khz(100), 20000);
-  for (const std::uint32_t blocks :
-       {0u, 5u, 7u, 14u, 16u, 24u, 26u, 49u, 51u, 74u, 76u, 99u, 101u, 110u, highest})
-    EXPECT_EQ(lteBandwidth_khz(blocks), std::nullopt) << blocks;
-}
-
 // ---- NR ----
 
 TEST(NRChannels, BothEndsOfEachPartOfTheRaster) {

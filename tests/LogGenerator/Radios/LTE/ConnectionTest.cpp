@@ -58,6 +58,12 @@ TEST_F(ConnectionTest, RejectedReestablishmentEndsTheConnection) {
   EXPECT_EQ(shownAfter(48, {0x20}), R"({RRC State: "Idle", RRC Connections: "1"})");  // 0 01, narrow-band
 }
 
+TEST_F(ConnectionTest, ACommandToAnotherRadioEndsTheConnection) {
+  shownAfter(11, {0x20});
+  EXPECT_EQ(shownAfter(9, {0x18}), R"({RRC State: "Idle", RRC Connections: "1"})");        // 0 0011
+  EXPECT_EQ(shownAfter(11, {0x18}), R"({RRC State: "Connected", RRC Connections: "1"})");  // re-established
+}
+
 TEST_F(ConnectionTest, MessagesOfCommonChannelsTellNothing) {
   for (const unsigned channel : {3U, 7U, 8U, 10U})
     EXPECT_EQ(shownAfter(channel, {0x00}), R"({RRC State: "", RRC Connections: ""})") << channel;
