@@ -78,20 +78,31 @@ RadioGroups::RadioGroups(const Services& services, const Value& displayTemplate)
   }
 }
 
+std::vector<ClassIndex*> RadioGroups::indexesOf(std::string_view group) const {
+  std::vector<ClassIndex*> indexes;
+  for (std::size_t i = 0; i < children().size(); ++i) {
+    const auto& groups = children()[i].groups;
+    if (std::ranges::find(groups, group) != groups.end()) indexes.push_back(_indexes[i].get());
+  }
+  return indexes;
+}
+
 void RadioGroups::addGroup(const std::string& key, const Value& sections) {
   Group group{key, sections.dictionary(), {}};
   if (!group.sections) return;
   const std::string_view name = displayNameOfSortedKey(key);
-  for (std::size_t i = 0; i < children().size(); ++i) {
-    if (std::ranges::find(children()[i].groups, name) != children()[i].groups.end())
-      group.indexes.push_back(_indexes[i].get());
+  const std::vector<ClassIndex*> indexes = indexesOf(name);
+  for (const auto& [section, value] : *group.sections) {
+    Base* decoder = nullptr;
+    for (auto index = indexes.begin(); index != indexes.end() && !decoder; ++index)
+      decoder = (*index)->getClass(section);
+    group.decoders.push_back(decoder);
   }
-  for (ClassIndex* index : group.indexes) {
+  for (ClassIndex* index : indexes) {
     for (const std::uint32_t code : index->logCodes()) {
       for (const Subscriber& subscriber : index->subscription(code)->subscribers) {
-        const std::string_view section = subscriber.decoder->getSectionName();
-        if (!group.sections->has(section) || decoderOf(group, section) != subscriber.decoder) continue;
-        takersOf(code).deliveries.push_back({_groups.size(), subscriber});
+        if (std::ranges::find(group.decoders, subscriber.decoder) != group.decoders.end())
+          takersOf(code).deliveries.push_back({_groups.size(), subscriber});
       }
     }
   }
@@ -110,13 +121,6 @@ RadioGroups::Takers& RadioGroups::takersOf(std::uint32_t logCode) {
   return takers->second;
 }
 
-Base* RadioGroups::decoderOf(const Group& group, std::string_view section) const {
-  for (const ClassIndex* index : group.indexes) {
-    if (Base* decoder = index->getClass(section)) return decoder;
-  }
-  return nullptr;
-}
-
 void RadioGroups::bind(const Value& memory, const Value& display) {
   _display = display;
   _sections.clear();
@@ -125,24 +129,28 @@ void RadioGroups::bind(const Value& memory, const Value& display) {
   if (!kept.get(c2kStateKey).dictionary()) kept.set(c2kStateKey, Value::ofDictionary());
   _c2kState = kept.get(c2kStateKey);
   for (Group& group : _groups) {
-    if (!kept.get(group.key).dictionary()) kept.set(group.key, Value::ofDictionary());
+    const bool isNew = !kept.get(group.key).dictionary();
+    if (isNew) kept.set(group.key, Value::ofDictionary());
     group.shown = kept.get(group.key);
     group.isShown = display.dictionary()->has(group.key);
-    bindSections(group);
+    group.isBound = false;
+    if (!isNew) bindSections(group);
   }
 }
 
 void RadioGroups::bindSections(Group& group) {
+  group.isBound = true;
   Dictionary& sections = *group.shown.dictionary();
+  auto decoder = group.decoders.begin();
   for (const auto& [name, value] : *group.sections) {
     if (!sections.has(name)) sections.set(name, value.deepCopy());
-    Base* const decoder = decoderOf(group, name);
-    if (!decoder) continue;
+    Base* const itsDecoder = *decoder++;
+    if (!itsDecoder) continue;
     const Value& section = sections.get(name);
-    decoder->updateSectionRef(section);
+    itsDecoder->updateSectionRef(section);
     const void* const container =
         section.dictionary() ? static_cast<const void*>(section.dictionary()) : section.array();
-    _sections[container] = &decoder->section();
+    _sections[container] = &itsDecoder->section();
   }
 }
 
@@ -154,10 +162,12 @@ bool RadioGroups::take(const LogMessage& message, ByteView bytes) {
   bool isTaken = false;
   const Time now = _services.clock.now();
   for (const auto& [index, subscriber] : found->second.deliveries) {
+    Group& group = _groups[index];
+    if (!group.isBound) bindSections(group);
     isTaken = isTaken || isDecoded(subscriber, message.packet(), logCode);
     subscriber.decoder->section().setTime(now);
     subscriber.deliver(message.packet(), logCode);
-    if (!_groups[index].isShown) noteWhetherShown(_groups[index]);
+    if (!group.isShown) noteWhetherShown(group);
   }
   if (found->second.isC2K) {
     isTaken |= _c2k.fateOf(bytes).outcome == MessageFate::Outcome::Decoded;
@@ -202,7 +212,7 @@ MessageFate RadioGroups::fateOf(const LogMessage& message, ByteView bytes) const
 void RadioGroups::prepareDisplay(const Time& now) {
   for (const auto& index : _indexes) index->prepareDisplay(now);
   for (Group& group : _groups) {
-    if (!group.isShown) noteWhetherShown(group);
+    if (group.isBound && !group.isShown) noteWhetherShown(group);
   }
 }
 
@@ -229,9 +239,10 @@ std::vector<CodeSections> RadioGroups::codeSections() const {
 NumberFormats RadioGroups::numberFormats() const {
   NumberFormats formats = _c2k.numberFormats();
   for (const Group& group : _groups) {
+    auto decoder = group.decoders.begin();
     for (const auto& [name, value] : *group.sections) {
       SectionFormats section(formats, name);
-      if (const Base* decoder = decoderOf(group, name)) decoder->listNumberFormats(section);
+      if (const Base* const itsDecoder = *decoder++) itsDecoder->listNumberFormats(section);
     }
   }
   return formats;

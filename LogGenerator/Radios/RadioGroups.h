@@ -52,8 +52,9 @@ class RadioGroups final : public WriteTimes {
   struct Group {
     std::string key;  // as in the template: "1;LTE"
     const Dictionary* sections;
-    std::vector<ClassIndex*> indexes;  // of sections that several have, the first one's decoder counts
-    Value shown{};                     // once bound
+    std::vector<Base*> decoders;  // one per section; null where there is none
+    Value shown{};
+    bool isBound = false;  // from the first message on, or from an earlier generator's groups on
     bool isShown = false;
   };
   // A decoder that takes a log code, and its group.
@@ -68,8 +69,8 @@ class RadioGroups final : public WriteTimes {
   };
 
   void addGroup(const std::string& key, const Value& sections);
+  std::vector<ClassIndex*> indexesOf(std::string_view group) const;
   Takers& takersOf(std::uint32_t logCode);
-  Base* decoderOf(const Group& group, std::string_view section) const;
   void bindSections(Group& group);
   void noteWhetherShown(Group& group);
   void takeC2K(ByteView bytes);
