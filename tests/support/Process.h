@@ -121,6 +121,7 @@ class Process {
   Process& operator=(const Process&) = delete;
 
   void signal(int number) const { ::kill(_id, number); }
+  pid_t id() const { return _id; }
 
   /// True when the program ends by itself within this time.
   bool waitForEnd(std::chrono::milliseconds within = std::chrono::seconds(120)) {

@@ -32,7 +32,10 @@ class RawSocket {
   static RawSocket receivingAt(const std::string& path) { return boundTo(path, SOCK_DGRAM); }
 
   RawSocket(RawSocket&& other) noexcept : _descriptor(std::exchange(other._descriptor, -1)) {}
-  RawSocket& operator=(RawSocket&&) = delete;
+  RawSocket& operator=(RawSocket&& other) noexcept {
+    std::swap(_descriptor, other._descriptor);
+    return *this;
+  }
   ~RawSocket() { close(); }
 
   RawSocket accept() const { return RawSocket(::accept4(_descriptor, nullptr, nullptr, SOCK_CLOEXEC)); }
@@ -47,6 +50,11 @@ class RawSocket {
       bytes = bytes.subspan(static_cast<std::size_t>(sent));
     }
     return true;
+  }
+  /// Sends the bytes if the peer takes them at once; false when it does not take all of them.
+  bool sendNow(ByteView bytes) const {
+    return ::send(_descriptor, bytes.data(), bytes.size(), MSG_NOSIGNAL | MSG_DONTWAIT) ==
+           static_cast<ssize_t>(bytes.size());
   }
   /// The next bytes that arrive within the time; empty when none arrive, or when the peer has gone.
   Bytes receive(std::chrono::milliseconds within = std::chrono::seconds(60)) const {
