@@ -228,6 +228,13 @@ void CursesScreen::enter() {
   redraw();
 }
 
+void CursesScreen::takeAgain() {
+  if (_isLeft) return;
+  ::reset_prog_mode();
+  updateSize();
+  redraw();
+}
+
 void CursesScreen::updateSize() {
   winsize size{};
   if (::ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) != 0 || size.ws_row == 0 || size.ws_col == 0) return;

@@ -28,6 +28,8 @@ class CursesScreen final {
   void leave();
   /// Takes it again.
   void enter();
+  /// The program was stopped without a chance to leave the terminal, and goes on.
+  void takeAgain();
 
   /// Adapts to the present size of the terminal.
   void updateSize();

@@ -93,11 +93,6 @@ std::wstring TerminalRow::name() const {
   return labels.empty() ? std::wstring() : labels.front()->shownText();
 }
 
-std::wstring TerminalRow::value() const {
-  const auto labels = filledLabels();
-  return labels.size() < 2 ? std::wstring() : labels.back()->shownText();
-}
-
 const TerminalScrollContainer& TerminalRow::scrolledPart() const {
   return _containers.empty() ? _labels : *_containers.front();
 }

@@ -81,11 +81,8 @@ class TerminalRow final : public CellView {
   void setChange(CellChange change) override { _change = change; }
   void setCourse(std::vector<std::optional<double>> course) override { _course = std::move(course); }
 
-  /// The first of its texts, and the last one if there are several.
+  /// The first of its texts.
   std::wstring name() const;
-  std::wstring value() const;
-  bool isChanged() const { return _change == CellChange::Changed; }
-  bool leadsOn() const { return _accessory == CellAccessory::DisclosureIndicator; }
 
   /// The row was laid out: labels that are no part of a container can be scrolled too.
   void fitLabels();

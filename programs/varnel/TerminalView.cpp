@@ -74,7 +74,7 @@ class TerminalViewer final {
  public:
   TerminalViewer(HostApplication& host, const Options& options, const ApplicationInfo& application)
       : _host(host),
-        _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2, SIGWINCH, SIGTSTP},
+        _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2, SIGWINCH, SIGTSTP, SIGCONT},
                  [this](int signal) { take(signal); }),
         _services(options, application),
         _screen(std::in_place),
@@ -120,6 +120,9 @@ class TerminalViewer final {
         return adaptSize();
       case SIGTSTP:
         return suspend();
+      case SIGCONT:
+        _screen->takeAgain();
+        return adaptSize();
       default:
         _host.end(0);
     }

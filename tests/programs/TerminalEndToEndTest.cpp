@@ -220,6 +220,23 @@ TEST_F(TerminalEndToEnd, CtrlZGivesTheShellBackAndFgReturns) {
   ASSERT_TRUE(terminal.shows("status 0\n"));
 }
 
+TEST_F(TerminalEndToEnd, AProgramThatWasStoppedWithoutWarningGoesOn) {
+  const auto telephony = server();
+  const Tmux terminal;
+  start(terminal);
+  ASSERT_TRUE(terminal.shows(" Updated 20"));
+  signal(terminal, SIGSTOP);
+  ASSERT_TRUE(terminal.shows("Stopped"));
+  // This shell leaves the mode as it is, so Return is no end of a line.
+  terminal.type("fg");
+  terminal.press({"C-j"});
+  ASSERT_TRUE(terminal.showsNoMore("Stopped"));
+  terminal.press({"l"});
+  ASSERT_TRUE(terminal.shows("Tracking Area Code"));
+  terminal.press({"q"});
+  ASSERT_TRUE(terminal.showsNoMore("Tracking Area Code"));
+}
+
 TEST_F(TerminalEndToEnd, LogLinesComeOutAfterTheScreenAndUnderL) {
   const auto telephony = server();
   const Tmux terminal(80, 40);

@@ -259,7 +259,11 @@ TEST_F(TerminalScreens, ATinyScreenShowsWhatFitsAndNothingPassesItsEdge) {
       queue.run();
       type(L"?jkGgq/x");
       press(Key::Kind::Escape);
+      type(L"LGqT");
+      press(Key::Kind::Enter);
+      type(L"jT+-");
       ASSERT_EQ(picture.columns(), columns);
+      type(L"qk");
       for (int row = 0; row < rows; ++row) ASSERT_LE(columnsOf(line(row)), columns);
     }
   }
