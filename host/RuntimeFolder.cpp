@@ -99,16 +99,18 @@ void share(const Place& place, const struct stat& status, gid_t group, const std
 
 RuntimeFolder serversFolder(const std::optional<std::string>& option,
                             const std::optional<std::string>& group) {
-  const auto number = group ? groupNamed(*group) : std::nullopt;
-  if (group && !number)
-    throw std::runtime_error("there is no group " + *group + "; name one that is there with --allow-group");
   const Place place = placeOf(option);
-  const struct stat status = madeFolder(place);
-  requireOwner(place, status);
-  if (!number) {
+  if (!group) {
+    const struct stat status = madeFolder(place);
+    requireOwner(place, status);
     requireClosed(place, status);
     return place.path;
   }
+  const auto number = groupNamed(*group);
+  if (!number)
+    throw std::runtime_error("there is no group " + *group + "; name one that is there with --allow-group");
+  const struct stat status = madeFolder(place);
+  requireOwner(place, status);
   share(place, status, *number, *group);
   return {place.path, PeerAccess(::geteuid(), *number)};
 }
