@@ -422,6 +422,19 @@ std::string_view ValueHistory::name(Number number) const {
                 : std::string_view();
 }
 
+std::string ValueHistory::record(Number number) const {
+  const Series* const series = find(number);
+  if (!series) return {};
+  std::string text;
+  std::string_view rest = std::string_view(series->key).substr(0, series->nameStart);
+  for (auto begin = rest.find('['); begin != std::string_view::npos; begin = rest.find('[')) {
+    rest.remove_prefix(begin + 1);
+    if (!text.empty()) text += ", ";
+    text += rest.substr(0, rest.find(']'));
+  }
+  return text;
+}
+
 std::string_view ValueHistory::unit(Number number) const {
   const Series* const series = find(number);
   return series ? series->unit : std::string_view();

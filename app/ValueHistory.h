@@ -102,6 +102,8 @@ class ValueHistory {
   std::string_view key(Number number) const;
   /// The name of its row.
   std::string_view name(Number number) const;
+  /// What the records are about that its row is in, such as "EARFCN 1300, PCI 16"; empty outside of lists.
+  std::string record(Number number) const;
   /// Such as "dBm"; empty for a number without a unit.
   std::string_view unit(Number number) const;
 

@@ -140,6 +140,9 @@ class TerminalViewer final {
     if (!series) return {};
     std::string name;
     for (const std::string& part : path) name.append(name.empty() ? "" : " > ").append(part);
+    // The record can change its place while its course is shown.
+    const std::string record = _history.record(*series);
+    if (!record.empty()) name.append(" (").append(record).append(")");
     return [this, name, number = *series](std::chrono::minutes length, int columns) {
       return courseColumns(_history, number, name, length, columns);
     };

@@ -93,6 +93,7 @@ TEST_F(ValueHistoryTest, EveryNumberHasASeriesAndTextsHaveNone) {
   EXPECT_THAT(course("/Cell/RSRP"), ElementsAre("|0:-84!"));
   EXPECT_EQ(history.unit(number("/Cell/RSRP")), "dBm");
   EXPECT_EQ(history.name(number("/Cell/RSRP")), "RSRP");
+  EXPECT_EQ(history.record(number("/Cell/RSRP")), "");
   EXPECT_EQ(history.unit(number("/Cell/PCI")), "");
 }
 
@@ -120,6 +121,7 @@ TEST_F(ValueHistoryTest, ASeriesThatHasGoneYieldsNothing) {
   EXPECT_FALSE(history.has(nobody));
   EXPECT_EQ(history.key(nobody), "");
   EXPECT_EQ(history.name(nobody), "");
+  EXPECT_EQ(history.record(nobody), "");
   EXPECT_EQ(history.unit(nobody), "");
   EXPECT_THAT(history.samples(nobody, {0s, 100s}), IsEmpty());
   EXPECT_EQ(history.summary(nobody, {0s, 100s}).count, 0U);
@@ -240,6 +242,8 @@ TEST_F(ValueHistoryTest, ListsWithinRecordsAreNamedByBoth) {
   show(layers("44"), 0);
   show(layers("45"), 2);
   EXPECT_THAT(course("/Layers[NR-ARFCN 620000]/Cells[PCI 44]/RSRP"), ElementsAre("|0:-90!", "2:-90"));
+  EXPECT_EQ(history.record(number("/Layers[NR-ARFCN 620000]/Cells[PCI 44]/Beams[SSB 2]/Level")),
+            "NR-ARFCN 620000, PCI 44, SSB 2");
   EXPECT_THAT(course("/Layers[NR-ARFCN 620000]/Cells[PCI 44]/Beams[SSB 2]/Level"),
               ElementsAre("|0:-91!", "2:-91"));
   EXPECT_THAT(course("/Layers[NR-ARFCN 620000, Serving PCI 44]/RSRP Rx0"), ElementsAre("|0:-88!"));
