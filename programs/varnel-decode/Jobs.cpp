@@ -181,7 +181,7 @@ class JobQueue {
   }
 
   // Files that the job does not need any more are closed: many jobs may wait for their turn.
-  static void noteEnd(Job& job, int status) {
+  void noteEnd(Job& job, int status) const {
     job.hasEnded = true;
     job.end.time = Clock::now() - job.start;
     job.end.status = WIFEXITED(status) ? WEXITSTATUS(status) : generalError;
@@ -189,7 +189,7 @@ class JobQueue {
     job.end.lastError = lastLineOf(::fileno(job.error.get()));
     job.end.details = contentsOf(job.details.get());
     job.details.reset();
-    if (isEmpty(job.output.get())) job.output.reset();
+    if (!_plan.showsOutput || isEmpty(job.output.get())) job.output.reset();
     if (isEmpty(job.error.get())) job.error.reset();
   }
 

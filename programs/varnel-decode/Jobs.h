@@ -38,7 +38,8 @@ struct JobPlan {
   std::function<int(std::size_t piece, JobContext& context)> work;
   std::function<bool(std::size_t piece)> isLeft{};  ///< whether there is nothing to do; empty for never
   std::function<void(const JobEnd& end)> ended{};   ///< called in the order of the names; may be empty
-  ListProgress* progress = nullptr;                 ///< with a slot for each process; may be null
+  bool showsOutput = true;           ///< whether their standard output comes out; otherwise it is dropped
+  ListProgress* progress = nullptr;  ///< with a slot for each process; may be null
 };
 
 /// Does each piece of work in its own process, at most `mostAtATime` at the same time. Their standard output

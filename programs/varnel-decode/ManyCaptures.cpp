@@ -103,6 +103,7 @@ class ManyCaptures {
                  .work = [this](std::size_t i, JobContext& context) { return decodeOne(i, context); },
                  .isLeft = [this](std::size_t i) { return isLeft(i); },
                  .ended = [this](const JobEnd& end) { note(end); },
+                 .showsOutput = !_tree,
                  .progress = &_progress});
     if (_report) _report->finish();
     if (_options.databasePath)
@@ -137,8 +138,6 @@ class ManyCaptures {
       if (!succeeds(part)) status = std::max(status, generalError);
     };
     if (_tree) also([&] { keepOutput(_options.captures[index], status); });
-    // The rest goes to standard output.
-    if (_tree && ::ftruncate(STDOUT_FILENO, 0) != 0) status = std::max(status, generalError);
     if (isStoring) {
       CaptureEntry entry{.path = _options.captures[index]};
       if (status != 0) {

@@ -96,6 +96,17 @@ TEST_F(ManyCaptures, EachHasAnOutputOfItsOwnAsIfItWereAlone) {
       << "monday, its file, and one file: nothing else is left behind";
 }
 
+TEST_F(ManyCaptures, WhatADecoderWroteBeforeItAbortedIsNoOutput) {
+  make("bad", pcapHeader() + pcapRecord(afternoon, 0, antennas(2)) +
+                  pcapRecord(afternoon + 5, 0, antennas(2)) +
+                  pcapRecord(afternoon + 6, 0, packet(0xFF, 0, "?")));
+  EXPECT_THAT(runLte({"--every", "bad"}).output, StartsWith("{"));
+  const Result result = runLte({"--output", "out", "--every", "bad"});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(result.output, "");
+  EXPECT_FALSE(fs::exists("out/bad.jsonl"));
+}
+
 TEST_F(ManyCaptures, WhatIsThereAndNewerIsLeft) {
   makeCapture("a", 2);
   makeCapture("b", 4);
