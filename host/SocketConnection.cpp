@@ -152,6 +152,8 @@ void SocketConnection::send(const Frame& frame) {
 
 bool SocketConnection::hasRoom() const { return _socket->bytesToWrite() < sendBufferSize; }
 
+bool SocketConnection::hasUnsentBytes() const { return _socket->bytesToWrite() > 0; }
+
 bool SocketConnection::waitForRoom(const QDeadlineTimer& deadline) {
   return waitUntilUnsent(sendBufferSize - 1, deadline);
 }

@@ -68,6 +68,8 @@ class SocketConnection final {
   void send(const Frame& frame);
   /// True while so little waits to be sent that the caller may queue more.
   bool hasRoom() const;
+  /// True while something that was queued is not sent yet.
+  bool hasUnsentBytes() const;
 
   /// The waits serve this socket only: nothing else happens meanwhile. They return true when what they wait
   /// for has come, and false when the time is up or the connection has ended.

@@ -112,6 +112,10 @@ class SocketRemotePort final : public RemotePort {
   SendResult sendRequest(std::int32_t identifier, ByteView data, std::chrono::milliseconds timeout,
                          std::optional<std::chrono::milliseconds> replyTimeout) override {
     if (data.size() > maximumPayload) return {transportError, std::nullopt};
+    if (!replyTimeout && hasRoomBehindOthers()) {
+      _connection->send({identifier, FrameMark::Message, data});
+      return {};
+    }
     if (!isValid()) return {isInvalid, std::nullopt};
     const QDeadlineTimer sendDeadline(timeout);
     if (!_connection->waitForRoom(sendDeadline)) return {statusOr(sendTimeout), std::nullopt};
@@ -132,6 +136,12 @@ class SocketRemotePort final : public RemotePort {
   void invalidate() override { _connection.reset(); }
 
  private:
+  // A message behind others that wait to be sent has their fate. So a stream of messages asks the system
+  // neither about the peer nor for the time.
+  bool hasRoomBehindOthers() const {
+    return _connection && _connection->isOpen() && _connection->hasUnsentBytes() && _connection->hasRoom();
+  }
+
   SendResult awaitReply(const QDeadlineTimer& deadline) {
     do {
       while (const auto frame = takeFrame()) {
