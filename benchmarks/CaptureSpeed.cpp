@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "LogGenerator/LogGenerator.h"
+#include "base/Dictionary.h"
 #include "base/MessagePrefix.h"
 #include "host/FileResources.h"
 #include "host/captures/Capture.h"
@@ -24,6 +25,7 @@
 #include "host/captures/StreamEncoders.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-decode/OfflineDecoder.h"
+#include "programs/varnel-decode/database/CaptureDatabase.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 
 // How long it takes to read captures, one line per way: the least that framing can take, framing alone, and
@@ -31,6 +33,8 @@
 // captures of real modems one record in 29 has a log code that the decoders of LTE know. The first capture
 // here is like them; in the second one, every record has such a log code. The third one has the packets of
 // all radios in the shares that they have there.
+//
+// Then, how long it takes to put values into a database: to gather those that change, and to write them.
 
 namespace varnel {
 namespace {
@@ -262,6 +266,48 @@ void measure(const char* name, std::string_view technology, Mix mix) {
                 way.best / ways.front().best);
 }
 
+// A display of 20 sections with 25 levels each. In every display each of them has another number.
+Value displayOfLevels(int number) {
+  Value display = Value::ofDictionary();
+  for (int section = 0; section < 20; ++section) {
+    Value entries = Value::ofDictionary();
+    for (int entry = 0; entry < 25; ++entry) {
+      char level[16];
+      std::snprintf(level, sizeof level, "-%d.%02d dBm", 60 + (number + entry) % 50,
+                    (number + section) % 100);
+      entries.dictionary()->set("Level " + std::to_string(entry), level);
+    }
+    display.dictionary()->set("Section " + std::to_string(section), entries);
+  }
+  return display;
+}
+
+void measureDatabase() {
+  constexpr int captures = 10, displays = 100;
+  const auto path = std::filesystem::temp_directory_path() / ("varnel-speed-" + std::to_string(::getpid()));
+  std::vector<Generation> generations;
+  for (int i = 0; i < displays; ++i)
+    generations.push_back({.time = {1'709'301'909 + 2 * i, 0}, .display = displayOfLevels(i)});
+  double gathering = 0, writing = 0;
+  std::size_t values = 0;
+  for (int i = 0; i < captures; ++i) {
+    const double start = secondsUsed();
+    ValueChanges changes;
+    for (const Generation& generation : generations) changes.take(generation);
+    const double gathered = secondsUsed();
+    CaptureDatabase(path).store({.path = std::to_string(i)}, nullptr, &changes);
+    gathering += gathered - start;
+    writing += secondsUsed() - gathered;
+    values += changes.paths().size() * changes.displays().size();
+  }
+  for (const char* const ending : {"", "-journal"}) std::filesystem::remove(path.string() + ending);
+  const auto perSecond = [&](double seconds) { return static_cast<double>(values) / seconds / 1e3; };
+  std::printf("%zu changed values of %d captures into a database, in thousands per second\n", values,
+              captures);
+  std::printf("gathered %.0f, written %.0f, both %.0f\n", perSecond(gathering), perSecond(writing),
+              perSecond(gathering + writing));
+}
+
 }  // namespace
 }  // namespace varnel
 
@@ -285,5 +331,6 @@ int main() {
            {ofCodes(0xB0E4, 0xB0E5), 2},
            {ofCodes(0xB821), 1},
            {unknownMessages(), 27}});
+  measureDatabase();
   return 0;
 }
