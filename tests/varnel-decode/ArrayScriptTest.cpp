@@ -158,6 +158,12 @@ TEST_F(ArrayScript, TheArrayIsAsLargeAsTheListAsks) {
                                      "--parsable|--dependency=afterany:42|--output=" + out +
                                      "/logs/merge.log|" + program + "|merge|" + out + "|3|\n");
   EXPECT_EQ(contentsOf("out/list"), list);
+
+  fs::create_directories("out/parts-3");
+  EXPECT_EQ(script({"submit", "nul", "out", "--every"}, {path}).status, 0);
+  EXPECT_TRUE(fs::exists("out/parts-3")) << "the tasks go on where they were";
+  EXPECT_EQ(script({"submit", "nul", "out"}, {path}).status, 0);
+  EXPECT_FALSE(fs::exists("out/parts-3")) << "other options make other parts";
 }
 
 TEST_F(ArrayScript, AnythingElseIsAMistake) {
