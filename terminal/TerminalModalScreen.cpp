@@ -12,8 +12,6 @@ namespace {
 
 using Kind = ScreenElement::Kind;
 
-std::wstring buttonText(const ScreenElement& button) { return L"[ " + charactersOf(button.title) + L" ]"; }
-
 }  // namespace
 
 TerminalModalScreen::TerminalModalScreen(const ScreenLayout& layout, Actions actions)
@@ -59,8 +57,19 @@ void TerminalModalScreen::leave() {
   }
 }
 
-int TerminalModalScreen::columnsOfElement(const Element& element) const {
-  return element.described.kind == Kind::Button ? columnsOf(buttonText(element.described)) : 0;
+std::wstring TerminalModalScreen::buttonText(const Element& button) {
+  const std::wstring blank(button.isNarrow ? 0 : 1, L' ');
+  return L"[" + blank + charactersOf(button.described.title) + blank + L"]";
+}
+
+int TerminalModalScreen::columnsOfLine(std::size_t line) const {
+  int columns = 0;
+  for (const Element& element : _elements) {
+    if (element.line != line || element.described.kind == Kind::Space) continue;
+    const bool isButton = element.described.kind == Kind::Button;
+    columns += (columns > 0 ? _spacing : 0) + (isButton ? columnsOf(buttonText(element)) : 1);
+  }
+  return columns;
 }
 
 void TerminalModalScreen::setArea(const Area& area) {
@@ -80,27 +89,31 @@ void TerminalModalScreen::setArea(const Area& area) {
   }
 }
 
-// Elements that take as much as there is share what the others leave.
+// Elements that take as much as there is share what the others leave. Where the line is too long, buttons
+// become narrow.
 void TerminalModalScreen::layOutLine(std::size_t line, const Area& area) {
-  int fixed = 0;
   int flexible = 0;
-  int count = 0;
-  for (const Element& element : _elements) {
+  for (Element& element : _elements) {
     if (element.line != line) continue;
-    ++count;
-    fixed += columnsOfElement(element);
+    element.isNarrow = false;
     flexible += element.described.kind == Kind::Button ? 0 : 1;
   }
-  const int left = std::max(0, area.columns - fixed - _spacing * std::max(0, count - 1));
+  const bool isTooLong = columnsOfLine(line) > area.columns;
+  for (Element& element : _elements) {
+    if (element.line == line) element.isNarrow = isTooLong;
+  }
+  const int share = flexible == 0 ? 0 : std::max(0, area.columns - columnsOfLine(line)) / flexible;
   int column = area.column;
   for (Element& element : _elements) {
     if (element.line != line) continue;
-    const int wanted = element.described.kind == Kind::Button ? columnsOfElement(element) : left / flexible;
+    const Kind kind = element.described.kind;
+    const int wanted = kind == Kind::Button  ? columnsOf(buttonText(element))
+                       : kind == Kind::Space ? share
+                                             : share + 1;
     const int columns = std::clamp(wanted, 0, std::max(0, area.column + area.columns - column));
     element.area = {column, area.row, columns, area.rows};
-    column += columns + _spacing;
-    if (!element.table) continue;
-    element.table->setArea(element.area);
+    column += columns + (kind == Kind::Space ? 0 : _spacing);
+    if (element.table) element.table->setArea(element.area);
   }
 }
 
@@ -170,7 +183,7 @@ void TerminalModalScreen::paint(CellGrid& grid, const Glyphs& glyphs) const {
     if (element.described.kind == Kind::Button) {
       Look look;
       look.isReversed = hasFocus;
-      grid.write(element.area.column, element.area.row, buttonText(element.described), look, element.area);
+      grid.write(element.area.column, element.area.row, buttonText(element), look, element.area);
     }
     if (element.field)
       element.field->paint(grid, element.area,

@@ -38,6 +38,7 @@ class TerminalModalScreen final : public ModalScreen {
     std::unique_ptr<TerminalTable> table{};
     std::unique_ptr<TerminalTextField> field{};
     Area area{};
+    bool isNarrow = false;  // a button without blanks around its title
   };
 
   bool canHaveFocus(const Element& element) const {
@@ -48,7 +49,9 @@ class TerminalModalScreen final : public ModalScreen {
   void moveFocus(int direction);
   void focusButton(std::string_view title);
   void takeClick(const Key& key);
-  int columnsOfElement(const Element& element) const;
+  static std::wstring buttonText(const Element& button);
+  /// What the elements of the line need besides those that take what is left.
+  int columnsOfLine(std::size_t line) const;
   void layOutLine(std::size_t line, const Area& area);
 
   Actions _actions;

@@ -390,6 +390,15 @@ TEST_F(TerminalScreens, EscapeLeavesTheSaveScreenAndCtrlSSaves) {
   EXPECT_THAT(line(1), testing::StartsWith("Saved:"));
 }
 
+TEST_F(TerminalScreens, OnASmallScreenTheButtonsOfTheSaveScreenAreNarrow) {
+  files.existing.insert(marker);
+  launch();
+  type(L"s");
+  userInterface.resize(20, 5);
+  queue.run();
+  EXPECT_EQ(line(1), " [Cancel]    [Save]");
+}
+
 TEST_F(TerminalScreens, TabGoesAroundTheSaveScreen) {
   files.existing.insert(marker);
   launch();
