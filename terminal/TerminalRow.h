@@ -79,7 +79,7 @@ class TerminalRow final : public CellView {
   void setText(std::string_view text) override;
   void setTextFont(const Font& font) override { _textFont = font; }
   void setChange(CellChange change) override { _change = change; }
-  void setCourse(std::vector<std::optional<double>> course) override { _course = std::move(course); }
+  void setCourse(const std::vector<std::optional<double>>& course) override { _course = course; }
 
   /// The first of its texts.
   std::wstring name() const;

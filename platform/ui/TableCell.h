@@ -52,7 +52,7 @@ class CellView {
   virtual void setChange(CellChange) {}
   /// The course of the row's value, the oldest first, one value per equal stretch of time; nothing where
   /// there was none. Empty when the value is no number.
-  virtual void setCourse(std::vector<std::optional<double>>) {}
+  virtual void setCourse(const std::vector<std::optional<double>>&) {}
 };
 
 /// A cell: its view, and what its maker keeps with it.

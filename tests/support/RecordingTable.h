@@ -74,7 +74,7 @@ class RecordingCellView final : public CellView {
   void setText(std::string_view text) override { this->text = text; }
   void setTextFont(const Font& font) override { textFont = font; }
   void setChange(CellChange change) override { this->change = change; }
-  void setCourse(std::vector<std::optional<double>> course) override { this->course = std::move(course); }
+  void setCourse(const std::vector<std::optional<double>>& course) override { this->course = course; }
 
   const CellStyle style;
   std::vector<std::unique_ptr<RecordingLabel>> labels;
