@@ -1,8 +1,8 @@
 #pragma once
 
 #include <sys/types.h>
-#include <time.h>
 
+#include <ctime>
 #include <filesystem>
 #include <optional>
 #include <system_error>

@@ -59,19 +59,19 @@ struct Options {
   AtEndOfFile atEnd = AtEndOfFile::Stop;  ///< what happens where a capture ends
   unsigned jobs = 1;                      ///< how many captures are decoded at the same time
   bool namesEachCapture = false;          ///< text of several captures: a line before each says which it is
+  bool isResuming = false;                ///< what is there, and newer than its capture, is left
+  bool areSeveral = false;                ///< several captures, or a list with any number of them
+  std::optional<Part> part;               ///< the only part of the captures that is decoded
   /// Captures and snapshots, at least one unless there is a list or parts are merged; "-" is standard input.
   /// `takeList` adds those of the list, and takes away those of other parts.
   std::vector<std::string> captures;
   std::optional<std::string> listPath;      ///< a list of captures; "-" is standard input
-  std::optional<Part> part;                 ///< the only part of the captures that is decoded
   std::optional<std::string> outputFolder;  ///< each capture has an output of its own in this folder
   std::optional<std::string> reportPath;    ///< where to write what became of each capture
   std::optional<std::string> databasePath;  ///< the database that gets each capture
   std::vector<std::string> mergedParts;     ///< if there are any, they are added up, and nothing else is done
   std::vector<std::string>
-      explainedPaths;       ///< if there are any, they are explained, and nothing else is done
-  bool isResuming = false;  ///< what is there, and newer than its capture, is left
-  bool areSeveral = false;  ///< several captures, or a list with any number of them
+      explainedPaths;  ///< if there are any, they are explained, and nothing else is done
 
   /// Whether events are written as a table, which begins with a header.
   bool isEventTable() const { return output == Output::Events && eventFormat == EventFormat::Csv; }

@@ -104,7 +104,7 @@ constexpr const char* tablesByCapture[] = {"counts", "unknown_versions", "left_o
                                            "cells",  "displays",         "changes"};
 
 struct FileState {
-  std::optional<std::int64_t> bytes{}, modified_ns{};
+  std::optional<std::int64_t> bytes{}, modified{};  // the time in nanoseconds since 1970
 
   bool operator==(const FileState&) const = default;
 };
@@ -113,7 +113,7 @@ FileState stateOf(const std::string& path) {
   struct stat status {};
   if (::stat(path.c_str(), &status) != 0 || !S_ISREG(status.st_mode)) return {};
   return {.bytes = status.st_size,
-          .modified_ns = std::int64_t{status.st_mtim.tv_sec} * 1'000'000'000 + status.st_mtim.tv_nsec};
+          .modified = std::int64_t{status.st_mtim.tv_sec} * 1'000'000'000 + status.st_mtim.tv_nsec};
 }
 
 void bindOptional(SqliteStatement& statement, int parameter, const std::optional<std::int64_t>& number) {
@@ -191,7 +191,7 @@ void CaptureDatabase::remove(const std::string& capture) {
   const std::string key = std::to_string(find.number(0));
   find.run();
   for (const std::string table : tablesByCapture)
-    _connection.run("DELETE FROM " + table + " WHERE capture = " + key);
+    _connection.run(std::string("DELETE FROM ").append(table).append(" WHERE capture = ").append(key));
   _connection.run("DELETE FROM captures WHERE id = " + key);
 }
 
@@ -206,7 +206,7 @@ std::int64_t CaptureDatabase::addCapture(const CaptureEntry& capture) {
   else
     add.bind(3, capture.why);
   bindOptional(add, 4, state.bytes);
-  bindOptional(add, 5, state.modified_ns);
+  bindOptional(add, 5, state.modified);
   add.run();
   return _connection.lastKey();
 }
@@ -302,7 +302,7 @@ std::vector<bool> CaptureDatabase::present(const std::vector<std::string>& captu
   for (const std::string& capture : captures) {
     bool isPresent = false;
     if (find.bind(1, capture).next()) {
-      isPresent = FileState{.bytes = find.number(0), .modified_ns = find.number(1)} == stateOf(capture);
+      isPresent = FileState{.bytes = find.number(0), .modified = find.number(1)} == stateOf(capture);
       find.run();
     }
     present.push_back(isPresent);

@@ -25,6 +25,7 @@ struct ShownCell {
   std::string channel;   ///< the number of its channel
   std::string identity;  ///< physical cell identity, scrambling code, or BSIC
 
+  // NOLINTNEXTLINE(modernize-use-nullptr): the 0 that it sees is the compiler's own
   friend auto operator<=>(const ShownCell&, const ShownCell&) = default;
 };
 
