@@ -57,19 +57,23 @@ std::string troubleOfOpening(const std::string& path, const struct stat& status,
   }
 }
 
-// Raw, eight bits, no parity, one stop bit. The speed of a line over USB has no meaning. False when the
-// device is no serial line, which has no such settings and needs none.
-bool makeRaw(int device) {
-  termios settings{};
-  if (::tcgetattr(device, &settings) != 0) return false;
+// Raw, eight bits, no parity, one stop bit. The speed of a line over USB has no meaning. Returns the settings
+// from before; nothing when the device is no serial line, which has no such settings and needs none.
+std::optional<termios> makeRaw(int device) {
+  termios before{};
+  if (::tcgetattr(device, &before) != 0) return std::nullopt;
+  termios settings = before;
   ::cfmakeraw(&settings);
   settings.c_cflag &= ~static_cast<tcflag_t>(CSTOPB | CRTSCTS);
   settings.c_cflag |= CLOCAL | CREAD;
   settings.c_cc[VMIN] = 1;
   settings.c_cc[VTIME] = 0;
   ::tcsetattr(device, TCSANOW, &settings);
-  return true;
+  return before;
 }
+
+// Whether the device is the terminal that this program was started from. Others fail to tell the session.
+bool isOwnTerminal(int device) { return ::tcgetsid(device) == ::getsid(0); }
 
 bool hasNothingNow(int error) { return error == EAGAIN || error == EINTR; }
 
@@ -82,12 +86,14 @@ std::optional<std::string> DiagnosticPort::open(Handlers handlers) {
   if (!S_ISCHR(status.st_mode)) return troubleOfNoDevice(_path);
   FileDescriptor device(::open(_path.c_str(), O_RDWR | O_NOCTTY | O_NONBLOCK | O_CLOEXEC));
   if (!device.isOpen()) return troubleOfOpening(_path, status, errno);
+  if (isOwnTerminal(device.number())) return troubleOfOwnTerminal(_path);
   if (const auto holders = holdersOf(status.st_rdev); !holders.empty()) return troubleOfBusy(_path, holders);
   // Other programs of this kind respect the lock, and others than root the exclusive use.
   if (::flock(device.number(), LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK)
     return troubleOfBusy(_path, {});
   ::ioctl(device.number(), TIOCEXCL);
-  _isSerialLine = makeRaw(device.number());
+  _settingsBefore = makeRaw(device.number());
+  _isSerialLine = _settingsBefore.has_value();
   _handlers = std::move(handlers);
   _device = std::move(device);
   _room.resize(mostPerTurn);
@@ -115,7 +121,10 @@ void DiagnosticPort::close() {
     notifier->release()->deleteLater();  // it may be at work now
   }
   _outgoing.clear();
-  if (_device.isOpen()) ::ioctl(_device.number(), TIOCNXCL);
+  if (_device.isOpen()) {
+    if (_settingsBefore) ::tcsetattr(_device.number(), TCSANOW, &*_settingsBefore);
+    ::ioctl(_device.number(), TIOCNXCL);
+  }
   _device = FileDescriptor();
 }
 
@@ -139,12 +148,13 @@ void DiagnosticPort::restAWhile() {
   _rest.start(pause);
 }
 
-// An error that lasts is met by the reader too.
+// An error that lasts is met by the reader too. A device that takes no byte and tells no error fails as well:
+// asking it again at once might never end.
 void DiagnosticPort::writeBytes() noexcept {
   while (!_outgoing.empty() && _device.isOpen()) {
     const ssize_t count = ::write(_device.number(), _outgoing.data(), _outgoing.size());
     if (count < 0 && hasNothingNow(errno)) break;
-    if (count < 0) {
+    if (count <= 0) {
       _outgoing.clear();
     } else {
       _outgoing.erase(_outgoing.begin(), _outgoing.begin() + count);

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <termios.h>
+
 #include <QSocketNotifier>
 #include <QTimer>
 #include <memory>
@@ -12,8 +14,8 @@
 
 namespace varnel {
 
-/// The character device of a modem's diagnostic port: a serial line, which is made raw (8N1), or a device
-/// that is none. The event loop reads it, a limited number of bytes per turn.
+/// The character device of a modem's diagnostic port: a serial line, which is made raw (8N1) while it is
+/// open, or a device that is none. The event loop reads it, a limited number of bytes per turn.
 class DiagnosticPort final : public PortDevice {
  public:
   explicit DiagnosticPort(std::string path) : _path(std::move(path)) {}
@@ -40,8 +42,9 @@ class DiagnosticPort final : public PortDevice {
   Handlers _handlers;
   FileDescriptor _device;
   bool _isSerialLine = false;
-  Bytes _room;      // for what is read
-  Bytes _outgoing;  // what the device has not taken yet
+  std::optional<termios> _settingsBefore;  // those of the serial line before it was opened
+  Bytes _room;                             // for what is read
+  Bytes _outgoing;                         // what the device has not taken yet
   std::unique_ptr<QSocketNotifier> _readable, _writable;
   QTimer _rest;  // runs while the device is not read
 };

@@ -62,6 +62,12 @@ std::string troubleOfNoDevice(const std::string& name) {
   return name + " is no device; to play a file back, type --replay " + name;
 }
 
+std::string troubleOfOwnTerminal(const std::string& name) {
+  return name +
+         " is the terminal of this server and no modem's port; name a port of the modem (ls -l "
+         "/dev/serial/by-id)";
+}
+
 std::string troubleOfPermission(const std::string& name, const std::string& group) {
   if (group.empty()) return "you may not open " + name + ", and no group may; start the server with sudo";
   return "you may not open " + name + ", which belongs to the group " + group + "; type sudo usermod -aG " +

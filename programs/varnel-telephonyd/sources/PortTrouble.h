@@ -19,6 +19,8 @@ std::string troubleOfRefusedCodes(const std::string& name, std::size_t equipment
 std::string troubleOfMissing(const std::string& name);
 /// It is a file, a folder, or the like.
 std::string troubleOfNoDevice(const std::string& name);
+/// It is the terminal that the server was started from.
+std::string troubleOfOwnTerminal(const std::string& name);
 /// The user may not open it. The group is the one that may; empty when no group may.
 std::string troubleOfPermission(const std::string& name, const std::string& group);
 /// Others have it open, each as "ModemManager (process 812)"; empty when they are not known. The sentence

@@ -5,6 +5,7 @@
 #include <grp.h>
 #include <gtest/gtest.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <termios.h>
 #include <unistd.h>
 
@@ -74,6 +75,48 @@ TEST_F(DiagnosticPortTest, IsForOneProgramAloneUntilItIsClosed) {
             "another program uses " + _name + "; find it with sudo fuser -v " + _name + ", and end it");
   first.close();
   EXPECT_EQ(open(second), std::nullopt);
+}
+
+TEST_F(DiagnosticPortTest, ASerialLineHasItsSettingsBackWhenItIsClosed) {
+  const FileDescriptor other(::open(_name.c_str(), O_RDWR | O_NOCTTY | O_CLOEXEC));
+  const auto settings = [&] {
+    termios now{};
+    EXPECT_EQ(::tcgetattr(other.number(), &now), 0);
+    return now;
+  };
+  const auto echoesLines = [&] { return (settings().c_lflag & (ICANON | ECHO)) == (ICANON | ECHO); };
+  termios twoStopBits = settings();
+  twoStopBits.c_cflag |= CSTOPB;
+  twoStopBits.c_cc[VMIN] = 7;
+  ASSERT_EQ(::tcsetattr(other.number(), TCSANOW, &twoStopBits), 0);
+  ASSERT_TRUE(echoesLines());
+  DiagnosticPort port(_name);
+  ASSERT_EQ(open(port), std::nullopt);
+  EXPECT_FALSE(echoesLines());
+  port.close();
+  EXPECT_TRUE(echoesLines());
+  EXPECT_NE(settings().c_cflag & CSTOPB, 0u);
+  EXPECT_NE(settings().c_oflag & OPOST, 0u);
+  EXPECT_EQ(settings().c_cc[VMIN], 7);
+}
+
+// A child with a terminal of its own.
+TEST_F(DiagnosticPortTest, TheTerminalOfTheServerIsRefused) {
+  const pid_t child = ::fork();
+  ASSERT_GE(child, 0);
+  if (child == 0) {
+    // The first terminal that a new session opens is its own.
+    if (::setsid() < 0 || ::open(_name.c_str(), O_RDWR | O_CLOEXEC) < 0) ::_exit(2);
+    DiagnosticPort general("/dev/tty"), named(_name);
+    const std::string rest =
+        " is the terminal of this server and no modem's port; name a port of the modem (ls -l "
+        "/dev/serial/by-id)";
+    ::_exit(open(general) == "/dev/tty" + rest && open(named) == _name + rest ? 0 : 1);
+  }
+  int status = 0;
+  ASSERT_EQ(::waitpid(child, &status, 0), child);
+  ASSERT_TRUE(WIFEXITED(status));
+  EXPECT_EQ(WEXITSTATUS(status), 0);
 }
 
 TEST_F(DiagnosticPortTest, ADeviceThatIsNoSerialLineNeedsNoSettings) {
