@@ -33,6 +33,13 @@ bool isError(ByteView contents) {
   return contents[0] >= portCommand::firstError && contents[0] <= portCommand::lastError;
 }
 
+// What follows the error repeats the request, or its beginning.
+bool isErrorOf(ByteView contents, ByteView request) {
+  const ByteView repeated = contents.subspan(1);
+  return std::ranges::equal(repeated.first(std::min(repeated.size(), request.size())),
+                            request.first(std::min(repeated.size(), request.size())));
+}
+
 // The operation, and for `setCodes` the equipment, must be those of the request.
 bool isConfigurationAnswer(ByteView contents, ByteView request) {
   const auto operation = numberAt(request, layout::operationOffset);
@@ -83,7 +90,7 @@ Bytes setCodes(std::size_t equipment, const CodeMask& mask) {
 
 bool isAnswer(ByteView contents, ByteView request) {
   if (contents.empty() || request.empty()) return false;
-  if (isError(contents)) return true;
+  if (isError(contents)) return isErrorOf(contents, request);
   if (contents[0] != request[0]) return false;
   switch (request[0]) {
     case portCommand::logConfiguration:

@@ -73,8 +73,9 @@ Bytes setCodes(std::size_t equipment, const CodeMask& mask);
 
 }  // namespace portRequest
 
-/// Whether the contents of a frame answer the request, with success or not. An error names no request, so it
-/// answers every one. What merely repeats a request for the version is no answer.
+/// Whether the contents of a frame answer the request, with success or not. An error is followed by
+/// the request that it answers, or by its beginning; one that is followed by nothing answers every request.
+/// What merely repeats a request for the version is no answer.
 bool isAnswer(ByteView contents, ByteView request);
 
 /// Why the answer refuses the request, such as "error 0x13" or "status 2"; nothing when it does not.

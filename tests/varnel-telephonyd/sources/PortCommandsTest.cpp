@@ -48,7 +48,21 @@ TEST(PortAnswers, OfTheLogConfigurationAreOfTheSameOperationAndEquipment) {
   EXPECT_FALSE(isAnswer(Bytes(ofNumbers.begin(), ofNumbers.end() - 1), portRequest::codeNumbers()));
 }
 
-TEST(PortAnswers, ErrorsAnswerEveryRequestAndRefuseIt) {
+TEST(PortAnswers, ErrorsAnswerTheRequestThatTheyRepeat) {
+  const Bytes ofAllOff{0x14, 0x73, 0, 0, 0, 0, 0, 0, 0}, ofNumbers{0x14, 0x73, 0, 0, 0, 1, 0, 0, 0};
+  EXPECT_FALSE(isAnswer(Bytes{0x13, 0x7C}, portRequest::allCodesOff()));
+  EXPECT_FALSE(isAnswer(Bytes{0x13, 0x7C}, portRequest::codeNumbers()));
+  EXPECT_TRUE(isAnswer(ofAllOff, portRequest::allCodesOff()));
+  EXPECT_FALSE(isAnswer(ofAllOff, portRequest::codeNumbers()));
+  EXPECT_TRUE(isAnswer(ofNumbers, portRequest::codeNumbers()));
+  EXPECT_FALSE(isAnswer(ofNumbers, portRequest::allCodesOff()));
+  EXPECT_TRUE(isAnswer(Bytes{0x14, 0x73, 0, 0}, portRequest::codeNumbers()));
+  // More than the request, and nothing of it.
+  EXPECT_TRUE(isAnswer(Bytes{0x13, 0x7C, 9, 9}, portRequest::build()));
+  EXPECT_TRUE(isAnswer(Bytes{0x13}, portRequest::allCodesOff()));
+}
+
+TEST(PortAnswers, ErrorsRefuseTheirRequest) {
   for (std::uint8_t error = 0x13; error <= 0x18; ++error)
     EXPECT_TRUE(isAnswer(Bytes{error, 0x7C}, portRequest::build()));
   EXPECT_FALSE(isAnswer(Bytes{0x12}, portRequest::build()));
@@ -67,13 +81,13 @@ TEST(PortAnswers, AStatusOtherThanZeroRefuses) {
 TEST(PortAnswers, TellHowManyCodesThereAreOfEachEquipmentAndNeverMoreThanItCanHave) {
   Bytes answer(12 + 64, 0);
   answer[0] = 0x73, answer[4] = 1;
-  answer[12 + 4 * 0x4] = 0x21, answer[13 + 4 * 0x4] = 0x09;
-  answer[12 + 4 * 0xB] = 0xC4, answer[13 + 4 * 0xB] = 0x01;
+  answer[12 + 4 * 0x4] = 0xD2, answer[13 + 4 * 0x4] = 0x04;
+  answer[12 + 4 * 0xB] = 0x2B, answer[13 + 4 * 0xB] = 0x02;
   answer[15 + 4 * 0xD] = 0xFF;
   const auto numbers = codeNumbersIn(answer);
   ASSERT_TRUE(numbers);
-  EXPECT_EQ((*numbers)[0x4], 2337u);
-  EXPECT_EQ((*numbers)[0xB], 452u);
+  EXPECT_EQ((*numbers)[0x4], 1234u);
+  EXPECT_EQ((*numbers)[0xB], 555u);
   EXPECT_EQ((*numbers)[0xD], 4096u);
   EXPECT_EQ((*numbers)[0xF], 0u);
   answer.pop_back();

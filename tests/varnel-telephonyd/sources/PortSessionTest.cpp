@@ -256,6 +256,22 @@ TEST_F(PortSessionTest, AnAnswerThatComesLateIsNotTakenForTheNextOne) {
   EXPECT_EQ(_leftOut, LeftOut{.otherCommands = 1});
 }
 
+TEST_F(PortSessionTest, ARefusalThatComesLateIsNotTakenForThatOfTheNextRequest) {
+  _modem.otherAnswers = {{build, {}}, {eventsOff, {}}, {debugTextOff, {}}, {allCodesOff, {}}};
+  begin();
+  for (int i = 0; i < 3; ++i) advance(2s);
+  EXPECT_EQ(requests(), (Requests{version, build, eventsOff, debugTextOff, allCodesOff}));
+  _modem.otherAnswers.clear();
+  _session.take(framed({0x13, 0x7C}));
+  run();
+  EXPECT_THAT(requests(), IsEmpty());
+  _session.take(framed({0x73, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0}));
+  _session.take(framed({0x13, 0x73, 0, 0, 0, 0, 0, 0, 0}));
+  run();
+  EXPECT_TRUE(_session.isReady());
+  EXPECT_THAT(_failures, IsEmpty());
+}
+
 TEST_F(PortSessionTest, WhatIsNotNeededMayBeRefused) {
   _modem.otherAnswers = {{build, {0x13, 0x7C}}, {eventsOff, {0x14, 0x60}}, {debugTextOff, {0x13, 0x7D}}};
   begin();
