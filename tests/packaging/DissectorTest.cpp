@@ -129,17 +129,17 @@ const std::vector<std::string> header = {"varnel.subscription", "varnel.log_type
                                          "varnel.log_code",     "varnel.time",     "varnel.payload",
                                          "_ws.expert.message"};
 
-// 0x00ED1D1470274558 is 66741543098598744: 1018395127847 units of 1.25 ms since 1980 and 17752 parts.
-const Bytes servingCell = {1, 14, 0, 0x7F, 0xB1, 0x58, 0x45, 0x27, 0x70, 0x14, 0x1D, 0xED, 0, 0xAA, 0xBB};
+// 0x00FDAE6F47A83000 is 71404962074603520: 1089553254312 units of 1.25 ms since 1980 and 12288 parts.
+const Bytes servingCell = {1, 14, 0, 0x7F, 0xB1, 0, 0x30, 0xA8, 0x47, 0x6F, 0xAE, 0xFD, 0, 0xAA, 0xBB};
 
 TEST_F(Dissector, APacketOfTheModemShowsItsHeaderAndItsPayload) {
-  EXPECT_THAT(shown({servingCell}, header), ElementsAre("\t0x01\t14\t0x00b17f\t66741543098598744\taabb\t"));
+  EXPECT_THAT(shown({servingCell}, header), ElementsAre("\t0x01\t14\t0x00b17f\t71404962074603520\taabb\t"));
 }
 
 TEST_F(Dissector, AModemsTimeShowsItsDateInUTC) {
-  // 17752/49152 of 1.25 ms are 451457 ns.
+  // 712 units of a second are 890 ms, and 12288/49152 of 1.25 ms are 312500 ns.
   EXPECT_THAT(shown({servingCell}, {"varnel.time.date", "varnel.time.since_start"}),
-              ElementsAre("May  8, 2020 17:25:09.809201457 UTC\t"));
+              ElementsAre("Mar  4, 2023 05:06:07.890312500 UTC\t"));
 }
 
 TEST_F(Dissector, ATimeBefore1990ShowsNoDate) {
@@ -156,7 +156,7 @@ TEST_F(Dissector, ATimeBefore1990ShowsNoDate) {
 TEST_F(Dissector, TheByteBehind0x81IsTheSubscription) {
   Bytes message = {0x81, 2};
   append(message, servingCell);
-  EXPECT_THAT(shown({message}, header), ElementsAre("2\t0x01\t14\t0x00b17f\t66741543098598744\taabb\t"));
+  EXPECT_THAT(shown({message}, header), ElementsAre("2\t0x01\t14\t0x00b17f\t71404962074603520\taabb\t"));
 }
 
 TEST_F(Dissector, AMessageOfTheServerHasItsPseudoCodeItsMillisecondsAndItsPropertyList) {
@@ -287,7 +287,7 @@ TEST_F(Dissector, PcapngIsTakenAsWell) {
   message[1] = 15;
   message.push_back(0xCC);
   EXPECT_THAT(shownOfFile(pcapng(message), header),
-              ElementsAre("\t0x01\t15\t0x00b17f\t66741543098598744\taabbcc\t"));
+              ElementsAre("\t0x01\t15\t0x00b17f\t71404962074603520\taabbcc\t"));
 }
 
 TEST_F(Dissector, NoBytesWhateverMakeTheScriptFail) {
