@@ -101,6 +101,7 @@ class InputDecoding {
   int run(const DecodingServices& services) {
     const int status = decode(services);
     if (isCountedForOthers()) *_notes->statistics = std::move(_statistics);
+    if (_notes) _notes->isOutputBroken = _isOutputBroken;
     return status;
   }
 

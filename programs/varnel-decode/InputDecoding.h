@@ -32,6 +32,7 @@ struct DecodingNotes {
   std::atomic<std::uint64_t>* bytesRead = nullptr;  ///< gets how far the capture was read; may be null
   MessageStatistics* statistics = nullptr;          ///< gets what became of the messages; may be null
   ValueChanges* changes = nullptr;                  ///< gets the displays; may be null
+  bool isOutputBroken = false;  ///< set when standard output, or `changes`, cannot take any more
 };
 
 /// Does everything that the options ask for with one of the captures or snapshots. Returns the exit status:

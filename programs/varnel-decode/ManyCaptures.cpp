@@ -3,7 +3,6 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <functional>
@@ -24,8 +23,6 @@
 namespace varnel {
 
 namespace {
-
-constexpr int generalError = 1;
 
 ByteView bytesOf(std::string_view text) {
   return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
@@ -89,14 +86,16 @@ class ManyCaptures {
             isTerminalThatErases(STDERR_FILENO) ? sizesOf(options.captures) : std::vector<std::uint64_t>(),
             options.jobs) {
     if (options.outputFolder) _tree.emplace(*options.outputFolder, outputEnding(options));
-    if (options.reportPath) _report.emplace(*options.reportPath);
   }
 
   int run() {
     if (const auto clash = _tree ? _tree->clash(_options.captures) : std::nullopt)
       return mistake(*clash).code;
-    const bool isUsable = succeeds([this] { lookIntoDatabase(); });
-    if (!isUsable) return generalError;
+    const bool areUsable = succeeds([this] {
+      if (_options.reportPath) _report.emplace(*_options.reportPath);
+      lookIntoDatabase();
+    });
+    if (!areUsable) return notWrittenStatus;
     const int status =
         runJobs({.names = _options.captures,
                  .mostAtATime = _options.jobs,
@@ -105,13 +104,18 @@ class ManyCaptures {
                  .ended = [this](const JobEnd& end) { note(end); },
                  .showsOutput = !_tree,
                  .progress = &_progress});
-    if (_report) _report->finish();
-    if (_options.databasePath)
-      _hasFailed |= !succeeds([&] { CaptureDatabase(*_options.databasePath).removeJournal(); });
-    return _hasFailed ? std::max(status, generalError) : status;
+    if (_report) keep([this] { _report->finish(); });
+    if (_options.databasePath) keep([this] { CaptureDatabase(*_options.databasePath).removeJournal(); });
+    return _isNotWritten ? notWrittenStatus : status;
   }
 
  private:
+  bool keep(const std::function<void()>& part) {
+    const bool isWritten = succeeds(part);
+    _isNotWritten |= !isWritten;
+    return isWritten;
+  }
+
   // The connection must not be open when other processes are started.
   void lookIntoDatabase() {
     if (!_options.databasePath) return;
@@ -134,8 +138,9 @@ class ManyCaptures {
                         .statistics = _report || isStoring ? &statistics : nullptr,
                         .changes = isStoring ? &changes : nullptr};
     int status = decodeInput(_options, index, _services, &notes);
+    if (notes.isOutputBroken || std::ferror(stdout)) status = notWrittenStatus;
     const auto also = [&](const std::function<void()>& part) {
-      if (!succeeds(part)) status = std::max(status, generalError);
+      if (!succeeds(part)) status = notWrittenStatus;
     };
     if (_tree) also([&] { keepOutput(_options.captures[index], status); });
     if (isStoring) {
@@ -175,9 +180,9 @@ class ManyCaptures {
     }
     // The process that ended could not do it itself.
     if (_options.databasePath && end.signal)
-      _hasFailed |=
-          !succeeds([&] { CaptureDatabase(*_options.databasePath).store(entry, nullptr, nullptr); });
-    if (_report) _report->write(entry);
+      keep([&] { CaptureDatabase(*_options.databasePath).store(entry, nullptr, nullptr); });
+    // A report that lacks a line does not appear.
+    if (_report && !keep([&] { _report->write(entry); })) _report.reset();
   }
 
   const Options& _options;
@@ -186,7 +191,7 @@ class ManyCaptures {
   std::optional<OutputTree> _tree;
   std::optional<Report> _report;
   std::vector<bool> _isInDatabase;  // by capture; empty unless the work is resumed
-  bool _hasFailed = false;
+  bool _isNotWritten = false;       // a part of the report or the database
 };
 
 }  // namespace

@@ -2,7 +2,9 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <cstdint>
 #include <fstream>
+#include <string>
 #include <system_error>
 
 #include "host/FileIdentity.h"
@@ -24,10 +26,12 @@ std::ifstream openPart(const std::string& path) {
   return file;
 }
 
-void addDatabases(const std::vector<std::string>& parts, const std::string& databasePath) {
+// Returns how many captures the database has then.
+std::int64_t addDatabases(const std::vector<std::string>& parts, const std::string& databasePath) {
   CaptureDatabase database(databasePath);
   for (const std::string& part : parts) database.take(part);
   database.removeJournal();
+  return database.captureCount();
 }
 
 void addReports(const std::vector<std::string>& parts) {
@@ -58,7 +62,12 @@ int mergeParts(const std::vector<std::string>& parts, const std::optional<std::s
     if (databasePath && FileIdentity::ofPath(part).isSameFileAs(FileIdentity::ofPath(*databasePath)))
       return mistake("--sqlite " + *databasePath + " is one of the parts; name another file").code;
   bool isDone = true;
-  if (databasePath) isDone &= succeeds([&] { addDatabases(databases, *databasePath); });
+  if (databasePath)
+    isDone &= succeeds([&] {
+      const std::int64_t captures = addDatabases(databases, *databasePath);
+      // Otherwise standard output has the sum of the reports.
+      if (reports.empty()) writeOutput(stdout, "{\"Captures\":" + std::to_string(captures) + "}\n");
+    });
   if (!reports.empty()) isDone &= succeeds([&] { addReports(reports); });
   return isDone ? 0 : generalError;
 }

@@ -7,6 +7,10 @@ namespace varnel {
 
 inline constexpr const char* programName = "varnel-decode";
 
+/// The exit status of a run over several captures when an output, the report, or the database could not be
+/// written. It is larger than that of captures that cannot be decoded.
+inline constexpr int notWrittenStatus = 3;
+
 /// Writes one line to standard error, after the program's name. Control characters, which names of files can
 /// hold, are written as escapes.
 void tell(std::string_view text);

@@ -130,6 +130,35 @@ TEST_F(ArrayScript, AMergeNamesTheTasksThatAreMissing) {
             "varnel-array: these tasks have not ended well: 1 3; submit the list again to run them\n");
 }
 
+// The wrapper makes the database, and lets no file become as large.
+TEST_F(ArrayScript, ATaskWhoseDatabaseIsNotWrittenHasFailed) {
+  fs::create_directory("out");
+  fs::copy_file("list", "out/list");
+  write("limited", "#!/bin/bash\n" VARNEL_DECODE_PROGRAM
+                   " --files-from /dev/null --sqlite \"${11}\"\n"
+                   "ulimit -f 8; exec " VARNEL_DECODE_PROGRAM " \"$@\"\n");
+  fs::permissions("limited", fs::perms::owner_all);
+  const std::string decoder = "VARNEL_DECODE=" + fs::absolute("limited").string();
+  const std::string place = "TMPDIR=" + fs::absolute("tmp").string();
+  Process process(VARNEL_SOURCE_DIR "/packaging/slurm/varnel-array",
+                  {"task", "out", "1/1", "--log-level", "-1"}, {decoder, place});
+  const Result result = finish(process);
+  EXPECT_EQ(result.status, 1);
+  EXPECT_THAT(result.error, HasSubstr("ended with status 3"));
+  EXPECT_TRUE(fs::is_empty("out/parts-1"));
+}
+
+TEST_F(ArrayScript, AMergeMissesCapturesInTheDatabase) {
+  fs::create_directory("out");
+  fs::copy_file("list", "out/list");
+  for (const char* part : {"1/2", "2/2"}) task(part);
+  fs::copy_file("out/parts-2/1.db", "out/parts-2/2.db", fs::copy_options::overwrite_existing);
+  const Result result = script({"merge", "out", "2"});
+  EXPECT_EQ(result.status, 1);
+  EXPECT_THAT(result.error, HasSubstr("the database and the report do not have the same captures"));
+  EXPECT_FALSE(fs::exists("out/captures.db"));
+}
+
 TEST_F(ArrayScript, AWrongOptionOfTheDecoderFailsTheTask) {
   fs::create_directory("out");
   fs::copy_file("list", "out/list");

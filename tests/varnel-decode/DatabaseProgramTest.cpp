@@ -77,6 +77,7 @@ TEST_F(DecodeIntoDatabase, PartsAndProcessesAndOneRunHaveTheSameRows) {
   }
   const Result merged = run({"--sqlite", "merged.db", "--merge", "part3", "part1", "part2"});
   EXPECT_EQ(merged.status, 0) << merged.error;
+  EXPECT_EQ(merged.output, "{\"Captures\":5}\n");
   for (const char* database : {"together.db", "merged.db"}) {
     EXPECT_EQ(changesIn(database), changesIn("all.db"));
     EXPECT_EQ(capturesIn(database), capturesIn("all.db"));
@@ -124,7 +125,7 @@ TEST_F(DecodeIntoDatabase, WhatCannotBeMergedIsOneLine) {
       {{"--merge", "text", "--every"}, 2},
       {{"--merge", "text"}, 1},
       {{"--merge", "missing"}, 1},
-      {{"--sqlite", "text", "a"}, 1},
+      {{"--sqlite", "text", "a"}, 3},
       {{"--sqlite", "a", "a"}, 2},
       {{"--sqlite", "", "a"}, 2},
       {{"--follow", "--every", "--sqlite", "x", "a"}, 2},

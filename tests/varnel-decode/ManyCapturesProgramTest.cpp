@@ -189,10 +189,24 @@ TEST_F(ManyCaptures, AnOutputThatCannotBeWrittenIsOneLineOfTheReport) {
   makeCapture("b/c", 2);
   make("out/b", "in the way");
   const Result result = runLte({"--output", "out", "--every", "--report", "report", "a", "b/c"});
-  EXPECT_EQ(result.status, 1);
+  EXPECT_EQ(result.status, 3) << "not that of a capture that cannot be decoded";
   EXPECT_THAT(contentsOf("report"),
               HasSubstr(R"({"Path":"b/c","Status":"failed","Why":"cannot write out/b/c.jsonl)"));
   EXPECT_THAT(contentsOf("out/a.jsonl"), EndsWith("}\n"));
+}
+
+TEST_F(ManyCaptures, AReportOrADatabaseThatCannotBeWrittenHasAStatusOfItsOwn) {
+  makeCapture("a", 2);
+  EXPECT_EQ(runLte({"--report", "nowhere/report", "a"}).status, 3);
+  EXPECT_EQ(runLte({"--sqlite", "nowhere/all.db", "a"}).status, 3);
+  EXPECT_EQ(runLte({"--sqlite", "all.db", "a"}).status, 0);
+  Process process("/bin/sh",
+                  {"-c", "ulimit -f 16; exec " VARNEL_DECODE_PROGRAM
+                         " --technology kalvi-lte --log-level -1 --sqlite all.db --report report a"});
+  const Result limited = finish(process);
+  EXPECT_EQ(limited.status, 3) << limited.error;
+  EXPECT_THAT(contentsOf("report"),
+              StartsWith(R"({"Path":"a","Status":"failed","Why":"cannot use the database )"));
 }
 
 }  // namespace

@@ -163,6 +163,8 @@ bool CaptureDatabase::isDatabase(const std::string& path) {
 
 void CaptureDatabase::removeJournal() { _connection.run("PRAGMA journal_mode = DELETE"); }
 
+std::int64_t CaptureDatabase::captureCount() { return _connection.number("SELECT count(*) FROM captures"); }
+
 // Another process may do the same at the same time.
 void CaptureDatabase::makeTables() {
   if (_connection.number("SELECT count(*) FROM sqlite_master") > 0) return;

@@ -35,6 +35,9 @@ class CaptureDatabase final {
   /// Which of the captures the database has, decoded when they had their present size and time.
   std::vector<bool> present(const std::vector<std::string>& captures);
 
+  /// How many captures the database has.
+  std::int64_t captureCount();
+
   /// Copies all captures of another database.
   void take(const std::string& part);
 
