@@ -7,6 +7,7 @@
 
 #include <array>
 #include <cerrno>
+#include <cstdlib>
 #include <system_error>
 #include <utility>
 
@@ -40,12 +41,43 @@ std::optional<SocketFile> fileOf(const FileDescriptor& file) {
   return ::fstat(file.number(), &status) == 0 ? std::optional(identityOf(status)) : std::nullopt;
 }
 
-[[noreturn]] void fail(const std::string& what, int error) {
-  throw std::system_error(error, std::generic_category(), what);
+constexpr std::string_view useOtherFolder = "name another folder with --runtime-dir";
+
+[[noreturn]] void fail(const std::string& what, const fs::path& path, int error) {
+  throw std::runtime_error(what + " " + path.string() + ": " + std::generic_category().message(error) + "; " +
+                           (fileUnder(path) ? "remove it, or " : "") + std::string(useOtherFolder));
 }
 
 [[noreturn]] void nameIsTaken(const fs::path& path) {
-  throw SocketNameTaken("another process serves " + path.string());
+  throw SocketNameTaken("another process serves " + path.string() + "; end it, or " +
+                        std::string(useOtherFolder));
+}
+
+// Whether another user, who is not root, has put there what is there.
+bool isOfStranger(const fs::path& path) {
+  struct stat status {};
+  return ::lstat(path.c_str(), &status) == 0 && status.st_uid != ::geteuid() && status.st_uid != 0;
+}
+
+// A folder may hold anything, so it is not removed but gets a name that nobody could know and take before.
+bool renameFolder(const fs::path& path) {
+  std::string aside = path.string() + ".XXXXXX";
+  if (!::mkdtemp(aside.data())) return false;
+  if (::rename(path.c_str(), aside.c_str()) == 0) return true;
+  ::rmdir(aside.c_str());
+  return false;
+}
+
+// The owner of a folder may remove what others have put there.
+void clearAway(const fs::path& path) {
+  if (::unlink(path.c_str()) != 0 && !renameFolder(path)) return;
+  logWarning("Another user had taken the server's name %s: it is free again", path.string());
+}
+
+// Whether others could hold the lock on this file.
+bool isOpenToOthers(const FileDescriptor& file) {
+  struct stat status {};
+  return ::fstat(file.number(), &status) == 0 && (status.st_mode & (S_IRWXG | S_IRWXO)) != 0;
 }
 
 fs::path lockPathOf(const fs::path& socketPath) { return socketPath.string() + std::string(lockSuffix); }
@@ -62,16 +94,22 @@ bool isServed(const fs::path& path) {
          errno == EAGAIN;
 }
 
-// Members of a shared folder's group find out whether a name is taken, and the server clears away what
-// viewers of other users left behind.
-mode_t modeFor(const SocketGate& gate) { return gate.access.isShared() ? 0660 : 0600; }
+mode_t socketModeFor(const SocketGate& gate) { return gate.access.isShared() ? 0660 : 0600; }
+
+// Members of a shared folder's group find out whether a viewer's name is taken, and the server clears away
+// what viewers of other users left behind. Whoever can open a file can hold its lock, so a server's is
+// closed.
+mode_t lockModeFor(const SocketGate& gate) { return gate.ownsName ? 0600 : socketModeFor(gate); }
 
 FileDescriptor spareDescriptor() { return FileDescriptor(::open("/dev/null", O_RDONLY | O_CLOEXEC)); }
 
 }  // namespace
 
-SocketServer::NameLock::NameLock(const fs::path& socketPath, mode_t mode)
-    : _path(lockPathOf(socketPath)), _socketPath(socketPath), _mode(mode) {
+SocketServer::NameLock::NameLock(const fs::path& socketPath, const SocketGate& gate)
+    : _path(lockPathOf(socketPath)),
+      _socketPath(socketPath),
+      _mode(lockModeFor(gate)),
+      _ownsName(gate.ownsName) {
   lock();
 }
 
@@ -91,12 +129,15 @@ FileDescriptor SocketServer::NameLock::openOrMake() const {
 void SocketServer::NameLock::lock() {
   // The owner removes the file when it ends. So the file that was opened can differ from the file that is
   // there once the lock is held.
+  if (_ownsName && isOfStranger(_path)) clearAway(_path);
   while (true) {
     FileDescriptor file = openOrMake();
-    if (!file.isOpen()) fail("cannot open " + _path.string(), errno);
+    if (!file.isOpen()) fail("cannot open", _path, errno);
+    // A dead server has left it, or an older one is alive, which its socket shows.
+    if (_ownsName && isOpenToOthers(file) && ::unlink(_path.c_str()) == 0) continue;
     if (::flock(file.number(), LOCK_EX | LOCK_NB) != 0) {
       if (errno == EWOULDBLOCK) nameIsTaken(_socketPath);
-      fail("cannot lock " + _path.string(), errno);
+      fail("cannot lock", _path, errno);
     }
     if (fileOf(file) != fileUnder(_path)) continue;
     _file = std::move(file);
@@ -122,9 +163,10 @@ SocketServer::SocketServer(const fs::path& path, ConnectionHandler handler, cons
       _handler(std::move(handler)),
       _limits(limits),
       _gate(std::move(gate)),
-      _lock(path, modeFor(_gate)),
+      _lock(path, _gate),
       _spare(spareDescriptor()),
       _places(std::make_shared<const int>(0)) {
+  if (_gate.ownsName && isOfStranger(path)) clearAway(path);
   // A program that cleans up may have removed a live server's lock file.
   if (isServed(path)) nameIsTaken(path);
   listen();
@@ -145,9 +187,9 @@ void SocketServer::listen() {
   // of a shared folder needs.
   if (!socket.isOpen() || ::fchmod(socket.number(), 0600) != 0 ||
       ::bind(socket.number(), reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0 ||
-      (_gate.access.isShared() && ::chmod(_path.c_str(), modeFor(_gate)) != 0) ||
+      (_gate.access.isShared() && ::chmod(_path.c_str(), socketModeFor(_gate)) != 0) ||
       ::listen(socket.number(), connectionQueue) != 0)
-    fail("cannot listen on " + _path.string(), errno);
+    fail("cannot listen on", _path, errno);
   _socketFile = fileUnder(_path);
   _notifier = std::make_unique<QSocketNotifier>(socket.number(), QSocketNotifier::Read);
   QObject::connect(_notifier.get(), &QSocketNotifier::activated, _notifier.get(),

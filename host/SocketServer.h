@@ -39,6 +39,9 @@ struct SocketLimits {
 /// Who may connect to a named socket.
 struct SocketGate {
   PeerAccess access = PeerAccess();  ///< of the folder: members of its group may open the files
+  /// Whether the name is this user's alone, in a folder of this user's. What other users have put there, is
+  /// cleared away, but not what root has put there; and no other user may open the lock.
+  bool ownsName = false;
   /// Whether a peer gets in. Empty: if the access accepts it.
   std::function<bool(const Peer&)> accepts = {};
   Bytes refusalOfStranger = {};  ///< what a peer gets that may not connect
@@ -77,7 +80,7 @@ class SocketServer final {
   // ends.
   class NameLock {
    public:
-    NameLock(const std::filesystem::path& socketPath, mode_t mode);
+    NameLock(const std::filesystem::path& socketPath, const SocketGate& gate);
     NameLock(const NameLock&) = delete;
     NameLock& operator=(const NameLock&) = delete;
     ~NameLock();
@@ -92,6 +95,7 @@ class SocketServer final {
     const std::filesystem::path _path;
     const std::filesystem::path _socketPath;
     const mode_t _mode;
+    const bool _ownsName;
     FileDescriptor _file;
   };
 

@@ -52,6 +52,7 @@ TelephonyListener::~TelephonyListener() = default;
 SocketGate TelephonyListener::gate(const RuntimeFolder& folder, RightsGranter rightsOf) {
   if (!rightsOf) rightsOf = [access = folder.access](const Peer& peer) { return access.rightsOf(peer); };
   return {.access = folder.access,
+          .ownsName = true,
           .accepts =
               [rightsOf = std::move(rightsOf)](const Peer& peer) {
                 const Rights rights = rightsOf(peer);

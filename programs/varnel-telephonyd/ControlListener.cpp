@@ -27,7 +27,8 @@ ControlListener::ControlListener(const std::filesystem::path& runtimeFolder, Ans
       _server(std::make_unique<SocketServer>(
           socketPath(runtimeFolder, controlProtocol::socketName),
           [this](std::unique_ptr<SocketConnection> client) { add(std::move(client)); }, limits,
-          SocketGate{.refusalOfStranger =
+          SocketGate{.ownsName = true,
+                     .refusalOfStranger =
                          refusal("the telephony server obeys nobody but its own user; become that user"),
                      .refusalWhenFull = refusal(
                          "the telephony server is controlled by as many programs as it takes; end one of "

@@ -538,7 +538,9 @@ TEST(SocketPortsWithoutAFolder, CannotMakeAPort) {
   const auto created = ports.createLocalPort("name", {});
   EXPECT_FALSE(created.port);
   EXPECT_FALSE(created.alreadyExists);
-  EXPECT_EQ(log.text, "cannot open /nowhere/at/all/name.lock: No such file or directory");
+  EXPECT_EQ(log.text,
+            "cannot open /nowhere/at/all/name.lock: No such file or directory; name another folder with "
+            "--runtime-dir");
 }
 
 using SocketPortsDeathTest = SocketPortsTest;

@@ -3,6 +3,7 @@
 #include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/file.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
 
@@ -197,6 +198,112 @@ TEST_F(SocketServerTest, InASharedFolderTheGroupMayOpenSocketAndLockWhateverTheU
   EXPECT_EQ(modeOf(path()), 0660u);
   EXPECT_EQ(modeOf(lockPath()), 0660u);
   EXPECT_TRUE(isServed());
+}
+
+TEST_F(SocketServerTest, AServersOwnLockIsClosedToTheGroupAndOneThatWasOpenIsReplaced) {
+  std::ofstream(lockPath()) << "";
+  ::chmod(lockPath().c_str(), 0660);
+  const FileDescriptor members(::open(lockPath().c_str(), O_RDWR | O_CLOEXEC));
+  ASSERT_EQ(::flock(members.number(), LOCK_EX | LOCK_NB), 0);
+  const SocketGate gate{.access = PeerAccess(::geteuid(), ::getegid()), .ownsName = true};
+  const auto listening = server(gate);
+  EXPECT_EQ(modeOf(path()), 0660u);
+  EXPECT_EQ(modeOf(lockPath()), 0600u);
+  EXPECT_TRUE(isServed());
+  EXPECT_THROW(server(gate), SocketNameTaken);
+}
+
+TEST_F(SocketServerTest, WhatBlocksANameIsToldWithWhatToDo) {
+  const auto trouble = [this] {
+    try {
+      server(SocketGate{.ownsName = true});
+    } catch (const std::runtime_error& error) {
+      return std::string(error.what());
+    }
+    return std::string();
+  };
+  fs::create_directory(path());
+  EXPECT_EQ(trouble(), "cannot listen on " + path() +
+                           ": Address already in use; remove it, or name another folder with --runtime-dir");
+  fs::create_directory(lockPath());
+  EXPECT_EQ(trouble(), "cannot open " + lockPath() +
+                           ": Is a directory; remove it, or name another folder with --runtime-dir");
+}
+
+// The server's user and the member of the group, if the test is root; else both are the test's user.
+struct ServerAndMember {
+  uid_t server, member;
+};
+
+class NameTakenByAMember : public SocketServerTest {
+ protected:
+  void SetUp() override {
+    ASSERT_EQ(::chmod(_folder.path().c_str(), 03770), 0);
+    give(_folder.path(), _users.server);
+  }
+  static void give(const fs::path& file, uid_t user) {
+    if (canBecomeAnotherUser()) {
+      ASSERT_EQ(::lchown(file.c_str(), user, static_cast<gid_t>(-1)), 0);
+    }
+  }
+  // Makes a server in a process of its user. A test that is not root checks that an entry of the same user,
+  // which only that user can have made, is left alone.
+  bool isMade() {
+    return inAnotherProcess(unusedGroup, [this] {
+             try {
+               const auto made = server(SocketGate{.ownsName = true});
+               return RawSocket::connectedTo(path()).send(Bytes{0}) ? 0 : 1;
+             } catch (const std::runtime_error&) {
+               return 2;
+             }
+           }) == 0;
+  }
+
+  const ServerAndMember _users = canBecomeAnotherUser() ? ServerAndMember{unusedUser, unusedUser + 1}
+                                                        : ServerAndMember{::geteuid(), ::geteuid()};
+};
+
+TEST_F(NameTakenByAMember, WithAClosedLockIsTakenBack) {
+  std::ofstream(lockPath()) << "";
+  ::chmod(lockPath().c_str(), 0600);
+  give(lockPath(), _users.member);
+  EXPECT_TRUE(isMade());
+}
+
+TEST_F(NameTakenByAMember, WithAHeldLockIsTakenBack) {
+  const FileDescriptor lock(::open(lockPath().c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0666));
+  ::fchmod(lock.number(), 0666);
+  give(lockPath(), _users.member);
+  ASSERT_EQ(::flock(lock.number(), LOCK_EX | LOCK_NB), 0);
+  EXPECT_TRUE(isMade());
+}
+
+TEST_F(NameTakenByAMember, WithAFolderIsTakenBackAndTheFolderIsKept) {
+  for (const std::string& name : {path(), lockPath()}) {
+    fs::create_directory(name);
+    std::ofstream(fs::path(name) / "file") << "";
+    give(name, _users.member);
+  }
+  EXPECT_EQ(isMade(), canBecomeAnotherUser());
+  std::size_t folders = 0;
+  for (const auto& entry : fs::directory_iterator(_folder.path()))
+    folders += fs::exists(entry.path() / "file");
+  EXPECT_EQ(folders, 2u);
+}
+
+TEST_F(NameTakenByAMember, WithALiveSocketIsTakenBack) {
+  const RawSocket members = RawSocket::listeningAt(path());
+  give(path(), _users.member);
+  ::chmod(path().c_str(), 0666);
+  EXPECT_EQ(isMade(), canBecomeAnotherUser());
+}
+
+// Only root can make root's entries.
+TEST_F(NameTakenByAMember, ByRootIsLeftAlone) {
+  const RawSocket roots = RawSocket::listeningAt(path());
+  ::chmod(path().c_str(), 0666);
+  EXPECT_FALSE(isMade());
+  EXPECT_TRUE(fs::exists(path()));
 }
 
 TEST_F(SocketServerTest, AStrangerIsTurnedAwayWithOneLineAndOthersAreServed) {

@@ -151,7 +151,8 @@ TEST_F(SocketTelephony, ASecondListenerIsRefused) {
     const TelephonyListener second(_folder.path(), {});
     FAIL() << "two servers in one folder";
   } catch (const std::runtime_error& error) {
-    EXPECT_EQ(error.what(), "another process serves " + path());
+    EXPECT_EQ(error.what(),
+              "another process serves " + path() + "; end it, or name another folder with --runtime-dir");
   }
 }
 
