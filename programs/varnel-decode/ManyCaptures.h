@@ -6,8 +6,8 @@
 namespace varnel {
 
 /// Does everything that the options ask for with all captures, each in its own process, and writes the report
-/// about them. Returns the exit status: the worst one of `decodeInput`. Throws std::system_error when no
-/// process can be started, or when standard output or the report cannot be written.
+/// about them. Returns the exit status: the worst one of `decodeInput`, or `notWrittenStatus`. Throws
+/// std::system_error when no process can be started, or when standard output cannot be written.
 int decodeMany(const Options& options, const DecodingServices& services);
 
 }  // namespace varnel

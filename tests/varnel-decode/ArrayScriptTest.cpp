@@ -15,6 +15,7 @@ namespace fs = std::filesystem;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
+using ::testing::StartsWith;
 
 // The script for Slurm without Slurm. Its parts run like those of an array.
 class ArrayScript : public DecodeProgram {
@@ -177,22 +178,62 @@ TEST_F(ArrayScript, TheArrayIsAsLargeAsTheListAsks) {
   for (int i = 0; i < 250; ++i) list += "name " + std::to_string(i) + '\0';
   write("nul", list);
   const std::string path = "PATH=" + fs::absolute("bin").string() + ":/usr/bin:/bin";
-  const Result result = script({"submit", "nul", "out", "--every"}, {path});
+  const Result result = script({"submit", "nul", "out", "--identities"}, {path});
   EXPECT_EQ(result.status, 0) << result.error;
   EXPECT_THAT(result.output, HasSubstr("job 42 decodes 250 captures in 3 tasks"));
   const std::string out = fs::canonical("out").string();
   const std::string program = fs::canonical(VARNEL_SOURCE_DIR "/packaging/slurm/varnel-array").string();
   EXPECT_EQ(contentsOf("calls"), "--parsable|--array=1-3|--cpus-per-task=1|--output=" + out +
-                                     "/logs/%a.log|" + program + "|task|" + out + "|/3|--every|\n" +
+                                     "/logs/%a.log|" + program + "|task|" + out + "|/3|--identities|\n" +
                                      "--parsable|--dependency=afterany:42|--output=" + out +
                                      "/logs/merge.log|" + program + "|merge|" + out + "|3|\n");
   EXPECT_EQ(contentsOf("out/list"), list);
 
   fs::create_directories("out/parts-3");
-  EXPECT_EQ(script({"submit", "nul", "out", "--every"}, {path}).status, 0);
+  EXPECT_EQ(script({"submit", "nul", "out", "--identities"}, {path}).status, 0);
   EXPECT_TRUE(fs::exists("out/parts-3")) << "the tasks go on where they were";
   EXPECT_EQ(script({"submit", "nul", "out"}, {path}).status, 0);
   EXPECT_FALSE(fs::exists("out/parts-3")) << "other options make other parts";
+}
+
+TEST_F(ArrayScript, OptionsThatATaskCannotTakeAreRefusedBeforeAnythingRuns) {
+  for (const char* option :
+       {"--every", "--csv", "--events", "--jobs", "--output=out", "--sqlite", "another"}) {
+    const Result result = script({"submit", "list", "out", "--technology", "kalvi-lte", option});
+    EXPECT_EQ(result.status, 2);
+    EXPECT_THAT(result.error, StartsWith("varnel-array: " + std::string(option) + " cannot be given"));
+  }
+  EXPECT_EQ(script({"submit", "list", "out", "--sim"}).error, "varnel-array: --sim needs a value\n");
+  EXPECT_FALSE(fs::exists("out"));
+}
+
+TEST_F(ArrayScript, NamesAreCountedAsBytes) {
+  fs::create_directory("bin");
+  write("bin/sbatch", "#!/bin/sh\necho 42\n");
+  fs::permissions("bin/sbatch", fs::perms::owner_all);
+  write("list", "\xFF\nb\n\xFE\n");
+  const std::string path = "PATH=" + fs::absolute("bin").string() + ":/usr/bin:/bin";
+  EXPECT_THAT(script({"submit", "list", "out"}, {path, "LC_ALL=C.UTF-8"}).output,
+              HasSubstr("decodes 3 captures"));
+}
+
+// The program takes a while to end, and writes until then.
+TEST_F(ArrayScript, ATerminatedTaskWaitsForTheProgram) {
+  fs::create_directory("out");
+  fs::copy_file("list", "out/list");
+  write("slow",
+        "#!/bin/bash\n"
+        "trap 'sleep 0.3; mkdir -p \"${11%/*}\"; touch \"${11%/*}/late\"; exit 143' TERM\n"
+        "touch begun\nwhile :; do sleep 0.05; done\n");
+  fs::permissions("slow", fs::perms::owner_all);
+  Process process(
+      VARNEL_SOURCE_DIR "/packaging/slurm/varnel-array", {"task", "out", "1/1"},
+      {"VARNEL_DECODE=" + fs::absolute("slow").string(), "TMPDIR=" + fs::absolute("tmp").string()});
+  EXPECT_TRUE(eventually([] { return fs::exists("begun"); }));
+  process.signal(SIGTERM);
+  EXPECT_TRUE(process.waitForEnd());
+  EXPECT_EQ(process.exitStatus(), 143);
+  EXPECT_FALSE(eventually([] { return !fs::is_empty("tmp"); }, std::chrono::seconds(1)));
 }
 
 TEST_F(ArrayScript, AnythingElseIsAMistake) {
