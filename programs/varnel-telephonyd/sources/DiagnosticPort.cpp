@@ -12,6 +12,7 @@
 #include <cerrno>
 #include <chrono>
 #include <cstddef>
+#include <vector>
 
 #include "programs/varnel-telephonyd/sources/PortHolders.h"
 #include "programs/varnel-telephonyd/sources/PortTrouble.h"
@@ -41,6 +42,10 @@ std::string groupOf(const struct stat& status) {
   return std::to_string(status.st_gid);
 }
 
+std::string troubleOfHolders(const std::string& path, const std::vector<std::string>& holders) {
+  return holders.empty() ? troubleOfUnknownHolder(path, runsModemManager()) : troubleOfBusy(path, holders);
+}
+
 std::string troubleOfOpening(const std::string& path, const struct stat& status, int error) {
   switch (error) {
     case ENOENT:
@@ -51,7 +56,7 @@ std::string troubleOfOpening(const std::string& path, const struct stat& status,
     case EPERM:
       return troubleOfPermission(path, groupOf(status));
     case EBUSY:
-      return troubleOfBusy(path, holdersOf(status.st_rdev));
+      return troubleOfHolders(path, holdersOf(status.st_rdev));
     default:
       return troubleOfSystem(path, error);
   }
@@ -90,7 +95,7 @@ std::optional<std::string> DiagnosticPort::open(Handlers handlers) {
   if (const auto holders = holdersOf(status.st_rdev); !holders.empty()) return troubleOfBusy(_path, holders);
   // Other programs of this kind respect the lock, and others than root the exclusive use.
   if (::flock(device.number(), LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK)
-    return troubleOfBusy(_path, {});
+    return troubleOfHolders(_path, {});
   ::ioctl(device.number(), TIOCEXCL);
   _settingsBefore = makeRaw(device.number());
   _isSerialLine = _settingsBefore.has_value();

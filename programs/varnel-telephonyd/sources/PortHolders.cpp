@@ -61,6 +61,13 @@ bool holds(const fs::path& process, dev_t device) {
   return hasDevice;
 }
 
+std::string shortNameOf(const fs::path& process) {
+  std::string name;
+  std::ifstream file(process / "comm");
+  std::getline(file, name);
+  return name;
+}
+
 // The system cuts the short name off after 15 characters, so the command line is asked first.
 std::string nameOf(const fs::path& process) {
   constexpr std::size_t longest = 64;
@@ -68,10 +75,7 @@ std::string nameOf(const fs::path& process) {
   std::ifstream commandLine(process / "cmdline");
   std::getline(commandLine, name, '\0');
   name = fs::path(name).filename().string();
-  if (name.empty()) {
-    std::ifstream shortName(process / "comm");
-    std::getline(shortName, name);
-  }
+  if (name.empty()) name = shortNameOf(process);
   return name.empty() ? "a program" : name.substr(0, longest);
 }
 
@@ -97,6 +101,15 @@ std::vector<std::string> holdersOf(dev_t device, const fs::path& processes) {
   names.reserve(holders.size());
   for (auto& [number, name] : holders) names.push_back(std::move(name));
   return names;
+}
+
+bool runsModemManager(const fs::path& processes) {
+  std::error_code error;
+  for (fs::directory_iterator process(processes, error), end; !error && process != end;
+       process.increment(error))
+    if (processNumber(process->path().filename().string()) && shortNameOf(process->path()) == "ModemManager")
+      return true;
+  return false;
 }
 
 }  // namespace varnel

@@ -13,4 +13,7 @@ namespace varnel {
 /// are none, or when the system does not show them to this user.
 std::vector<std::string> holdersOf(dev_t device, const std::filesystem::path& processes = "/proc");
 
+/// Whether a process named ModemManager runs, whose open devices only root sees.
+bool runsModemManager(const std::filesystem::path& processes = "/proc");
+
 }  // namespace varnel

@@ -75,8 +75,6 @@ std::string troubleOfPermission(const std::string& name, const std::string& grou
 }
 
 std::string troubleOfBusy(const std::string& name, const std::vector<std::string>& holders) {
-  if (holders.empty())
-    return "another program uses " + name + "; find it with sudo fuser -v " + name + ", and end it";
   if (holders.size() > 1) return inWords(holders) + " use " + name + "; end them first";
   const bool isModemManager = holders[0].starts_with("ModemManager ");
   return holders[0] + " uses " + name + "; " +
@@ -84,6 +82,16 @@ std::string troubleOfBusy(const std::string& name, const std::vector<std::string
               ? "type --inhibit too, which cuts the modem's data connection, or sudo systemctl stop "
                 "ModemManager"
               : "end it first");
+}
+
+std::string troubleOfUnknownHolder(const std::string& name, bool runsModemManager) {
+  std::string trouble =
+      "another program uses " + name + "; find it with sudo fuser -v " + name + ", and end it";
+  if (runsModemManager)
+    trouble +=
+        ". ModemManager runs and may be that program; --inhibit asks it to leave the modem alone, which "
+        "cuts the modem's data connection";
+  return trouble;
 }
 
 std::string troubleOfNoPort(bool hasModemManager) {

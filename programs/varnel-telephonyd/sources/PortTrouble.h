@@ -23,9 +23,11 @@ std::string troubleOfNoDevice(const std::string& name);
 std::string troubleOfOwnTerminal(const std::string& name);
 /// The user may not open it. The group is the one that may; empty when no group may.
 std::string troubleOfPermission(const std::string& name, const std::string& group);
-/// Others have it open, each as "ModemManager (process 812)"; empty when they are not known. The sentence
-/// names three at most.
+/// Others have it open, each as "ModemManager (process 812)"; at least one. The sentence names three at most.
 std::string troubleOfBusy(const std::string& name, const std::vector<std::string>& holders);
+/// Another program has it open, and the system does not show which one. A second sentence follows when
+/// ModemManager runs.
+std::string troubleOfUnknownHolder(const std::string& name, bool runsModemManager);
 /// No device may be a diagnostic port. ModemManager runs or does not.
 std::string troubleOfNoPort(bool hasModemManager);
 /// Of the devices that may be one, none is and is free.

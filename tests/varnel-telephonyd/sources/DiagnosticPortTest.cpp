@@ -71,8 +71,9 @@ TEST_F(DiagnosticPortTest, TellsWhenItIsUnpluggedAndMayBeOpenedAgain) {
 TEST_F(DiagnosticPortTest, IsForOneProgramAloneUntilItIsClosed) {
   DiagnosticPort first(_name), second(_name);
   ASSERT_EQ(open(first), std::nullopt);
-  EXPECT_EQ(open(second),
-            "another program uses " + _name + "; find it with sudo fuser -v " + _name + ", and end it");
+  EXPECT_THAT(
+      open(second).value_or(""),
+      StartsWith("another program uses " + _name + "; find it with sudo fuser -v " + _name + ", and end it"));
   first.close();
   EXPECT_EQ(open(second), std::nullopt);
 }
@@ -187,6 +188,21 @@ TEST_F(DiagnosticPortTest, HoldersAreNamedAsFarAsTheSystemShowsThem) {
   EXPECT_THAT(holdersOf(status.st_rdev, folder.path() / "none"), IsEmpty());
 }
 
+// A user sees the name of a process of root, and not what it has open.
+TEST_F(DiagnosticPortTest, ModemManagerRunsWhenAProcessHasItsName) {
+  const TemporaryFolder folder;
+  const auto add = [&](const char* process, const char* name) {
+    std::filesystem::create_directories(folder.path() / process);
+    std::ofstream(folder.path() / process / "comm") << name << '\n';
+  };
+  EXPECT_FALSE(runsModemManager(folder.path() / "none"));
+  add("7", "NetworkManager");
+  add("bus", "ModemManager");
+  EXPECT_FALSE(runsModemManager(folder.path()));
+  add("812", "ModemManager");
+  EXPECT_TRUE(runsModemManager(folder.path()));
+}
+
 TEST_F(DiagnosticPortTest, WhatPlaysAModemOnAPseudoTerminalDoesNotHoldIt) {
   struct stat status {};
   ASSERT_EQ(::stat(_name.c_str(), &status), 0);
@@ -221,6 +237,13 @@ TEST(PortTroubles, SayWhatToDo) {
       "$USER, log out, and log in again");
   EXPECT_EQ(troubleOfPermission("/dev/ttyUSB0", ""),
             "you may not open /dev/ttyUSB0, and no group may; start the server with sudo");
+  EXPECT_EQ(troubleOfUnknownHolder("/dev/ttyUSB0", false),
+            "another program uses /dev/ttyUSB0; find it with sudo fuser -v /dev/ttyUSB0, and end it");
+  EXPECT_EQ(
+      troubleOfUnknownHolder("/dev/ttyUSB0", true),
+      "another program uses /dev/ttyUSB0; find it with sudo fuser -v /dev/ttyUSB0, and end it. "
+      "ModemManager runs and may be that program; --inhibit asks it to leave the modem alone, which cuts "
+      "the modem's data connection");
   EXPECT_EQ(troubleOfBusy("/dev/ttyUSB0", {"ModemManager (process 812)"}),
             "ModemManager (process 812) uses /dev/ttyUSB0; type --inhibit too, which cuts the modem's data "
             "connection, or sudo systemctl stop ModemManager");
