@@ -1,10 +1,13 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <chrono>
+#include <cstdlib>
 #include <memory>
 #include <string>
 #include <vector>
 
+#include "programs/varnel-telephonyd/sources/ModemManager.h"
 #include "tests/support/FakeModemManager.h"
 #include "tests/support/PrivateBus.h"
 #include "tests/support/Process.h"
@@ -17,6 +20,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::Not;
+using testing::StartsWith;
 
 constexpr std::uint32_t textPort = 3, diagnosticPort = 4;
 
@@ -98,6 +102,21 @@ TEST_F(AutomaticPort, WhoMayNotInhibitLearnsWhatToDo) {
   EXPECT_EQ(telephony->error(),
             "varnel-telephonyd: ModemManager does not leave the modem alone (not allowed); start "
             "the server with sudo, or type sudo systemctl stop ModemManager\n");
+}
+
+// The real limit is longer than a test should last.
+TEST_F(AutomaticPort, AllCallsTogetherWaitOnlySoLong) {
+  startService({.device = "modem", .ports = {{portName(), textPort}}, .answersInhibition = false});
+  ::setenv("DBUS_SYSTEM_BUS_ADDRESS", _bus.address().c_str(), 1);
+  {
+    ModemManager service(std::chrono::seconds(1));
+    EXPECT_TRUE(service.ports());
+    for (int i = 0; i < 20; ++i)
+      EXPECT_THAT(service.inhibit("modem").value_or(""),
+                  StartsWith("ModemManager does not leave the modem alone ("));
+  }
+  EXPECT_TRUE(runUntil([&] { return _service->inhibitions().size() == 40; }));
+  EXPECT_EQ(_service->inhibitions().back(), "off modem");
 }
 
 TEST_F(AutomaticPort, TheSearchCanBeEnded) {

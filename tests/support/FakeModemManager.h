@@ -52,6 +52,7 @@ class FakeModemManager {
     std::string device = "/sys/devices/usb1/1-2";
     std::vector<std::pair<std::string, std::uint32_t>> ports;
     bool isInhibitionAllowed = true;
+    bool answersInhibition = true;
   };
 
   FakeModemManager(const std::string& address, Modem modem)
@@ -96,7 +97,7 @@ class FakeModemManager {
         _fake._inhibitions.push_back((message.arguments().at(1).toBool() ? "on " : "off ") +
                                      message.arguments().at(0).toString().toStdString());
       }
-      return connection.send(message.createReply());
+      return !_fake._modem.answersInhibition || connection.send(message.createReply());
     }
 
    private:

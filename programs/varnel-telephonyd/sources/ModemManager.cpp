@@ -14,9 +14,9 @@
 
 namespace varnel {
 
-namespace {
-
 using namespace std::chrono_literals;
+
+namespace {
 
 constexpr const char* connectionName = "varnel-modem-manager";
 const QString service = QStringLiteral("org.freedesktop.ModemManager1");
@@ -27,9 +27,6 @@ const QString modemInterface = QStringLiteral("org.freedesktop.ModemManager1.Mod
 // In the service's enumeration of port types.
 constexpr std::uint32_t diagnosticPort = 4;  // diagnostic port
 
-constexpr std::chrono::milliseconds timeLimit = 10s;
-// The service ends connections and closes ports first.
-constexpr std::chrono::milliseconds inhibitTimeLimit = 60s;
 constexpr std::size_t mostPorts = 256, longestName = 100;
 
 using Interfaces = QMap<QString, QVariantMap>;
@@ -91,12 +88,11 @@ QDBusMessage inhibitDevice(const std::string& modem, bool isInhibited) {
   return call;
 }
 
-int inMilliseconds(std::chrono::milliseconds duration) { return static_cast<int>(duration.count()); }
-
 }  // namespace
 
-ModemManager::ModemManager()
-    : _bus(QDBusConnection::connectToBus(QDBusConnection::SystemBus, QString::fromLatin1(connectionName))) {}
+ModemManager::ModemManager(std::chrono::milliseconds patience)
+    : _bus(QDBusConnection::connectToBus(QDBusConnection::SystemBus, QString::fromLatin1(connectionName))),
+      _patience(patience) {}
 
 ModemManager::~ModemManager() {
   release();
@@ -105,8 +101,7 @@ ModemManager::~ModemManager() {
 
 std::optional<std::vector<ModemManager::Port>> ModemManager::ports() {
   if (!_bus.isConnected()) return std::nullopt;
-  const QDBusMessage answer =
-      _bus.call(callTo(objectManager, "GetManagedObjects"), QDBus::Block, inMilliseconds(timeLimit));
+  const QDBusMessage answer = answerTo(callTo(objectManager, "GetManagedObjects"));
   if (answer.type() != QDBusMessage::ReplyMessage || answer.signature() != QStringLiteral("a{oa{sa{sv}}}"))
     return std::nullopt;
   return portsIn(answer.arguments().value(0).value<QDBusArgument>());
@@ -114,19 +109,27 @@ std::optional<std::vector<ModemManager::Port>> ModemManager::ports() {
 
 std::optional<std::string> ModemManager::inhibit(const std::string& modem) {
   release();
-  const QDBusMessage answer =
-      _bus.call(inhibitDevice(modem, true), QDBus::Block, inMilliseconds(inhibitTimeLimit));
-  if (answer.type() != QDBusMessage::ReplyMessage)
-    return "ModemManager does not leave the modem alone (" + answer.errorMessage().toStdString() +
-           "); start the server with sudo, or type sudo systemctl stop ModemManager";
   _inhibited = modem;
-  return std::nullopt;
+  const QDBusMessage answer = answerTo(inhibitDevice(modem, true));
+  if (answer.type() == QDBusMessage::ReplyMessage) return std::nullopt;
+  release();  // the service may still do it when the time is over
+  return "ModemManager does not leave the modem alone (" + answer.errorMessage().toStdString() +
+         "); start the server with sudo, or type sudo systemctl stop ModemManager";
 }
 
 void ModemManager::release() {
   if (_inhibited.empty()) return;
   const std::string modem = std::exchange(_inhibited, {});
-  _bus.call(inhibitDevice(modem, false), QDBus::Block, inMilliseconds(timeLimit));
+  answerTo(inhibitDevice(modem, false));
+}
+
+QDBusMessage ModemManager::answerTo(const QDBusMessage& call) {
+  const auto start = std::chrono::steady_clock::now();
+  // Without patience the call is made all the same.
+  QDBusMessage answer = _bus.call(call, QDBus::Block, static_cast<int>(std::max(_patience, 1ms).count()));
+  const auto passed = std::chrono::steady_clock::now() - start;
+  _patience -= std::chrono::duration_cast<std::chrono::milliseconds>(passed);
+  return answer;
 }
 
 }  // namespace varnel

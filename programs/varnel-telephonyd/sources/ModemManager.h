@@ -1,13 +1,16 @@
 #pragma once
 
 #include <QDBusConnection>
+#include <QDBusMessage>
+#include <chrono>
 #include <optional>
 #include <string>
 #include <vector>
 
 namespace varnel {
 
-/// ModemManager, the service that connects modems to networks, on the system bus. Calls wait for its answer.
+/// ModemManager, the service that connects modems to networks, on the system bus. Calls wait for its answer:
+/// all calls of an object together 15 s at most, for the program cannot be ended meanwhile.
 class ModemManager final {
  public:
   struct Port {
@@ -17,7 +20,7 @@ class ModemManager final {
   };
 
   /// Connects to the system bus; a bus that is not there is like one without the service.
-  ModemManager();
+  explicit ModemManager(std::chrono::milliseconds patience = std::chrono::seconds(15));
   ModemManager(const ModemManager&) = delete;
   ModemManager& operator=(const ModemManager&) = delete;
   /// Modems that are inhibited are the service's again.
@@ -33,8 +36,11 @@ class ModemManager final {
   void release();
 
  private:
+  QDBusMessage answerTo(const QDBusMessage& call);
+
   QDBusConnection _bus;
-  std::string _inhibited;  // empty when no modem is
+  std::chrono::milliseconds _patience;  // how long calls may still wait
+  std::string _inhibited;               // empty when no modem is
 };
 
 }  // namespace varnel
