@@ -107,10 +107,12 @@ EventFormat eventFormatNamed(std::string_view name) {
 
 enum class CaptureIs { Required, NamedElsewhere };
 
+// The help does not call captures required, as some options name them.
 CaptureIs captureIsIn(std::span<const char* const> arguments) {
   const bool isElsewhere = std::ranges::any_of(arguments, [](std::string_view argument) {
     const std::string_view name = argument.substr(0, argument.find('='));
-    return name == listOption || name == mergeOption || name == explainOption;
+    return name == listOption || name == mergeOption || name == explainOption || name == "--help" ||
+           name == "-h";
   });
   return isElsewhere ? CaptureIs::NamedElsewhere : CaptureIs::Required;
 }
@@ -139,7 +141,7 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
   auto* captures = app.add_option(
       "CAPTURE", options.captures,
       "a stream of a diagnostic port, log records, pcap of link type USER0, or a snapshot; - is "
-      "standard input");
+      "standard input; needed unless --files-from, --merge or --explain is given");
   captures->type_name("");
   // An option that takes many arguments leaves the last one to a capture only if there must be one.
   captures->required(captureIs == CaptureIs::Required);

@@ -461,6 +461,14 @@ TEST_F(DecodeProgram, HelpIsOnStandardOutput) {
   EXPECT_EQ(result.error, "");
 }
 
+TEST_F(DecodeProgram, HelpTellsThatOptionsCanNameTheCaptures) {
+  const std::string help = run({"--help"}).output;
+  EXPECT_THAT(help, HasSubstr("[CAPTURE...]"));
+  EXPECT_THAT(help, Not(HasSubstr("REQUIRED")));
+  EXPECT_EQ(run({"-h"}).output, help);
+  EXPECT_EQ(run({}).status, 2);
+}
+
 TEST_F(DecodeProgram, TheVersionIsOnStandardOutput) {
   const Result result = run({"--version"});
   EXPECT_EQ(result.status, 0);
