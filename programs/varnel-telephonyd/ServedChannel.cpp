@@ -204,8 +204,8 @@ void ServedChannel::seek(const StreamPlace& place) {
   const auto seeking = _source->seek(place, now);
   if (_report.note == std::exchange(_endNote, {})) note("");
   if (seeking == MessageSource::Seeking::StartsOver) {
-    // A message that has waited for room until now is left out.
-    if (_next && _isReceived) ++_counts.dropped;
+    // A message that has waited for room until now is no longer due: it comes again in its turn.
+    if (_next && _isReceived) --_counts.received;
     takeNext();
   } else if (_next) {
     _next->at = now;

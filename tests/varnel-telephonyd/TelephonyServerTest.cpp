@@ -747,6 +747,23 @@ TEST_F(ReplayedStreamTest, AViewerWithoutRoomDuringASeekLosesNothing) {
   EXPECT_EQ(seconds(), (Seconds{6}));
 }
 
+TEST_F(ReplayedStreamTest, ASeekBackDuringASeekForwardLosesNothing) {
+  start();
+  bool hasRoom = false;
+  takeOnlyWhile(hasRoom);
+  _replay.seek(5s);
+  _queue.advance(1s);
+  EXPECT_EQ(_replay.counts(), (MessageCounts{.received = 2, .delivered = 1, .waiting = 1}));
+  _replay.seek(0s);
+  EXPECT_EQ(_replay.counts(), (MessageCounts{.received = 1, .delivered = 1}));
+  seconds();
+  hasRoom = true;
+  _queue.advance(2s);
+  EXPECT_EQ(seconds(), (Seconds{0, 1, 2}));
+  EXPECT_EQ(_replay.counts(), (MessageCounts{.received = 4, .delivered = 4}));
+  EXPECT_EQ(_told, std::vector<std::string>());
+}
+
 TEST_F(TelephonyServerTest, ASimulationCanBePausedPlayedFasterAndPlayedAgain) {
   TelephonyServer server{
       {.ports = _ports,
