@@ -23,8 +23,9 @@ constexpr struct {
 
 constexpr std::string_view commandKey = "Command", speedKey = "Speed", positionKey = "Position",
                            timeKey = "Time", technologyKey = "Technology", errorKey = "Error",
-                           playableKey = "Playable", pausedKey = "Paused", lengthKey = "Length",
-                           firstTimeKey = "FirstTime", lastTimeKey = "LastTime", badFramesKey = "BadFrames";
+                           playableKey = "Playable", pausedKey = "Paused", seekingKey = "Seeking",
+                           lengthKey = "Length", firstTimeKey = "FirstTime", lastTimeKey = "LastTime",
+                           badFramesKey = "BadFrames";
 
 constexpr struct {
   std::string_view key;
@@ -100,6 +101,7 @@ Value propertyList(const ServerStatus& status) {
   if (status.badFrames) fields.set(badFramesKey, integer(*status.badFrames));
   fields.set(playableKey, Value::ofBoolean(status.isPlayable));
   fields.set(pausedKey, Value::ofBoolean(status.isPaused));
+  fields.set(seekingKey, Value::ofBoolean(status.isSeeking));
   fields.set(speedKey, Value::ofReal(status.speed));
   for (const auto& [key, duration] : durations)
     if (status.*duration) fields.set(key, Value::ofInteger((status.*duration)->count()));
@@ -116,6 +118,7 @@ ServerStatus statusIn(const Dictionary& fields) {
   if (fields.get(badFramesKey).integer()) status.badFrames = count(fields.get(badFramesKey));
   status.isPlayable = fields.get(playableKey).boolean().value_or(false);
   status.isPaused = fields.get(pausedKey).boolean().value_or(false);
+  status.isSeeking = fields.get(seekingKey).boolean().value_or(false);
   status.speed = fields.get(speedKey).real().value_or(1);
   for (const auto& [key, duration] : durations) status.*duration = durationIn(fields.get(key));
   for (const auto& [key, time] : times) status.*time = timeIn(fields.get(key));

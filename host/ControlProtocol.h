@@ -40,7 +40,7 @@ struct ServerStatus {
   std::string name{};         ///< of the device or the capture; empty for a simulation
   std::string technology{};   ///< as viewers are told
   std::string recording{};    ///< the file of the recording; empty when there is none
-  std::uint64_t clients = 0;  ///< connections to the telephony service
+  std::uint64_t clients = 0;  ///< viewers that have a channel or are connected to the telephony service
   std::uint64_t channels = 0;
 
   /// What became of the messages. `received` is the sum of the others.
@@ -51,6 +51,7 @@ struct ServerStatus {
 
   bool isPlayable = false;  ///< whether the stream can be paused and played at other speeds, and has places
   bool isPaused = false;
+  bool isSeeking = false;  ///< whether everything before the place of a seek is being sent
   double speed = 1;
   /// How long playing takes at speed 1, until the last message and until the end. Absent when not known.
   std::optional<std::chrono::milliseconds> position{}, length{};

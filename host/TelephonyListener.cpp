@@ -1,5 +1,6 @@
 #include "host/TelephonyListener.h"
 
+#include <algorithm>
 #include <utility>
 
 #include "base/Dictionary.h"
@@ -74,20 +75,20 @@ void TelephonyListener::notifyAll() {
 void TelephonyListener::add(Client client) {
   client->setActivityHandler([this, weak = std::weak_ptr(client)] { serve(weak.lock()); });
   client->send({0, FrameMark::Notification, {}});
-  _guests.push_back({std::move(client), {}});
+  _guests.push_back({std::move(client), {}, {}});
   _guests.back().stay.start();
 }
 
 void TelephonyListener::serve(const Client& client) {
   while (const auto frame = client->nextFrame()) {
     if (frame->mark != FrameMark::Request) continue;
-    const auto reply = replyOf(answer(frame->payload));
+    const auto reply = replyOf(answer(client, frame->payload));
     client->send({frame->identifier, reply ? FrameMark::Reply : FrameMark::NoReply, reply.value_or(Bytes())});
   }
   if (!client->isOpen()) std::erase_if(_guests, [&](const Guest& guest) { return guest.client == client; });
 }
 
-TelephonyConnection::LogChannel TelephonyListener::answer(ByteView request) const {
+TelephonyConnection::LogChannel TelephonyListener::answer(const Client& client, ByteView request) {
   const auto list = readPropertyList(request);
   const Dictionary* const fields = list ? list->dictionary() : nullptr;
   if (!fields) return {protocol::malformedRequest, std::nullopt};
@@ -95,7 +96,15 @@ TelephonyConnection::LogChannel TelephonyListener::answer(ByteView request) cons
     return {protocol::unknownCommand, std::nullopt};
   const std::string* const localPortName = fields->get(protocol::portNameKey).string();
   if (!localPortName) return {protocol::malformedRequest, std::nullopt};
+  const auto guest = std::ranges::find(_guests, client, &Guest::client);
+  if (guest != _guests.end()) guest->portName = *localPortName;
   return _makeLogChannel(*localPortName);
+}
+
+std::size_t TelephonyListener::clients(const std::set<std::string, std::less<>>& portsWithChannels) const {
+  const auto others = std::ranges::count_if(
+      _guests, [&](const Guest& guest) { return !portsWithChannels.contains(guest.portName); });
+  return portsWithChannels.size() + static_cast<std::size_t>(others);
 }
 
 }  // namespace varnel

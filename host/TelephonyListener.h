@@ -5,6 +5,8 @@
 #include <cstddef>
 #include <functional>
 #include <memory>
+#include <set>
+#include <string>
 #include <string_view>
 #include <vector>
 
@@ -39,8 +41,9 @@ class TelephonyListener final {
 
   /// Sends a notification to every open connection.
   void notifyAll();
-  /// How many connections are open.
-  std::size_t clients() const { return _guests.size(); }
+  /// How many clients there are: those with these ports, which have channels, and all others that are
+  /// connected. A client has one port. It may stay connected when it has its channel, or not.
+  std::size_t clients(const std::set<std::string, std::less<>>& portsWithChannels) const;
 
  private:
   using Client = std::shared_ptr<SocketConnection>;
@@ -49,13 +52,14 @@ class TelephonyListener final {
   struct Guest {
     Client client;
     QElapsedTimer stay;
+    std::string portName;  // for which it has asked for a channel; empty before that
   };
 
   SocketGate gate(const RuntimeFolder& folder, RightsGranter rightsOf);
   void add(Client client);
   void makeRoom();
   void serve(const Client& client);
-  TelephonyConnection::LogChannel answer(ByteView request) const;
+  TelephonyConnection::LogChannel answer(const Client& client, ByteView request);
 
   LogChannelMaker _makeLogChannel;
   const std::chrono::milliseconds _stay;

@@ -39,9 +39,11 @@ struct ChannelHost {
 /// meanwhile messages of a source that does not wait are lost.
 class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
  public:
-  /// Takes ownership of the viewer's port. The host must outlive the channel.
-  ServedChannel(const ChannelHost& host, std::unique_ptr<RemotePort> viewer)
-      : _host(host), _viewer(std::move(viewer)) {}
+  /// Takes ownership of the viewer's port, which has this name. The host must outlive the channel.
+  ServedChannel(const ChannelHost& host, std::unique_ptr<RemotePort> viewer, std::string viewerPortName)
+      : _host(host), _viewer(std::move(viewer)), _viewerPortName(std::move(viewerPortName)) {}
+
+  const std::string& viewerPortName() const { return _viewerPortName; }
 
   /// Takes commands on a new port with this name. Calls the handler once when the viewer has gone away, has
   /// taken nothing for too long, or has given no command for ten seconds. The handler may release the
@@ -67,6 +69,8 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
   void seek(const StreamPlace& place);
   /// Where the stream is; absent before it is started, and for a live stream.
   std::optional<StreamPosition> position() const;
+  /// Whether messages are sent at once because they are before the place of a seek.
+  bool isSeeking() const { return _next && _source->isSeeking(); }
 
  private:
   enum class Delivery { Done, NoRoom, Ended };
@@ -92,6 +96,7 @@ class ServedChannel final : public std::enable_shared_from_this<ServedChannel> {
 
   const ChannelHost& _host;
   std::unique_ptr<RemotePort> _viewer;
+  const std::string _viewerPortName;
   std::unique_ptr<LocalPort> _commands;
   std::function<void()> _ended;  // empty once it was called
 

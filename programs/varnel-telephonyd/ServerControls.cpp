@@ -20,6 +20,16 @@ bool isPlayable(ServedSource source) {
   return source == ServedSource::Simulation || source == ServedSource::Capture;
 }
 
+// A simulation has no end, so a seek in it needs one.
+constexpr std::chrono::hours mostSimulated(24);
+
+// Whether a simulation would play too long until the place. It begins at its start if the place was passed.
+bool isTooFar(const StreamPlace& place, std::chrono::milliseconds position) {
+  const auto* const sinceStart = std::get_if<std::chrono::milliseconds>(&place);
+  if (!sinceStart) return false;
+  return (*sinceStart > position ? *sinceStart - position : *sinceStart) > mostSimulated;
+}
+
 const char* wordOf(ServedSource source) {
   switch (source) {
     case ServedSource::Port:
@@ -68,8 +78,11 @@ std::optional<std::string> ServerControls::refusalOfPlaying(const ControlRequest
     if (isLive) return live + " has no places to go to: its messages come once";
     if (_setup.source == ServedSource::Simulation && std::holds_alternative<Time>(request.place))
       return "a simulation has no dates; name the time since its start, as in 1:30";
-    if (!_setup.server.position())
+    const auto position = _setup.server.position();
+    if (!position)
       return "there is no stream to seek in: no viewer is connected, and each one starts at the beginning";
+    if (_setup.source == ServedSource::Simulation && isTooFar(request.place, position->sinceStart))
+      return "a simulation plays at most 24 hours for a seek; name an earlier place";
   } else if (isLive) {
     return live + " cannot be paused: its messages come when they come";
   }
@@ -128,6 +141,7 @@ ServerStatus ServerControls::status() const {
                       .notAskedFor = counts.notAskedFor,
                       .isPlayable = isPlayable(_setup.source),
                       .isPaused = server.isPaused(),
+                      .isSeeking = server.isSeeking(),
                       .speed = _speed};
   std::optional<LeftOut> leftOut;
   if (_setup.leftOutOfPort) leftOut = _setup.leftOutOfPort();

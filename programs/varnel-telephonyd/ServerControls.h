@@ -24,7 +24,7 @@ class ServerControls final {
     std::string name;                      ///< of the device or the capture
     double speed = 1;                      ///< at which streams begin
     std::optional<std::string> recording;  ///< the file of the recording
-    /// How many connections the telephony service has.
+    /// How many viewers have a channel or are connected to the telephony service.
     std::function<std::size_t()> clients;
     /// The frames of the port that hold no record; empty unless the source is a port.
     std::function<LeftOut()> leftOutOfPort;

@@ -45,6 +45,11 @@ std::string numberText(double number) {
 
 std::string line(const char* name, const std::string& text) { return formatted("%-12s", name) + text + '\n'; }
 
+const char* stateOf(const ServerStatus& status) {
+  if (status.isSeeking) return status.isPaused ? "seeking, then paused" : "seeking";
+  return status.isPaused ? "paused" : "playing";
+}
+
 std::string messagesText(const ServerStatus& status) {
   return std::to_string(status.received) + " received, " + std::to_string(status.delivered) + " delivered, " +
          std::to_string(status.waiting) + " waiting, " + std::to_string(status.dropped) + " dropped, " +
@@ -163,8 +168,7 @@ std::string statusText(const ServerStatus& status) {
   std::string text = line("source", printable(status.source) + name);
   text += line("technology", printable(status.technology));
   if (status.isPlayable)
-    text +=
-        line("state", (status.isPaused ? "paused, speed " : "playing, speed ") + numberText(status.speed));
+    text += line("state", std::string(stateOf(status)) + ", speed " + numberText(status.speed));
   if (status.position) {
     const std::string of = status.length ? " of " + clockText(*status.length) : "";
     const std::string at = status.time ? ", " + dateDescription(*status.time) : "";
@@ -191,6 +195,7 @@ std::string statusJson(const ServerStatus& status) {
   if (status.badFrames) appendMember(json, "badFrames", std::to_string(*status.badFrames));
   if (status.isPlayable) {
     appendMember(json, "paused", status.isPaused ? "true" : "false");
+    appendMember(json, "seeking", status.isSeeking ? "true" : "false");
     appendMember(json, "speed", numberText(status.speed));
   }
   if (status.position) appendMember(json, "position", secondsText(*status.position));

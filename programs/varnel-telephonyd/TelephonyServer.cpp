@@ -1,5 +1,6 @@
 #include "programs/varnel-telephonyd/TelephonyServer.h"
 
+#include <algorithm>
 #include <cstdlib>
 #include <string>
 #include <utility>
@@ -49,7 +50,7 @@ TelephonyConnection::LogChannel TelephonyServer::createLogChannel(std::string_vi
   }
   const unsigned number = freeNumber();
   const std::string portName = std::string(commandPortPrefix) + std::to_string(number);
-  const auto channel = std::make_shared<ServedChannel>(_host, std::move(viewer));
+  const auto channel = std::make_shared<ServedChannel>(_host, std::move(viewer), std::string(viewerPortName));
   if (!channel->open(portName, [this, number] { close(number); })) {
     logError("The port \"%s\" could not be made", portName);
     return {protocol::commandPortNotMade, std::nullopt};
@@ -115,6 +116,16 @@ std::optional<StreamPosition> TelephonyServer::position() const {
   for (const auto& [number, channel] : _channels)
     if (const auto position = channel->position()) return position;
   return std::nullopt;
+}
+
+bool TelephonyServer::isSeeking() const {
+  return std::ranges::any_of(_channels, [](const auto& numbered) { return numbered.second->isSeeking(); });
+}
+
+std::set<std::string, std::less<>> TelephonyServer::viewerPorts() const {
+  std::set<std::string, std::less<>> names;
+  for (const auto& [number, channel] : _channels) names.insert(channel->viewerPortName());
+  return names;
 }
 
 MessageCounts TelephonyServer::counts() const {

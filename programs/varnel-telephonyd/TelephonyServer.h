@@ -5,6 +5,7 @@
 #include <map>
 #include <memory>
 #include <optional>
+#include <set>
 #include <string>
 #include <string_view>
 
@@ -44,8 +45,12 @@ class TelephonyServer {
   const std::string& technology() const { return _host.technology; }
   /// Where the stream of the oldest channel is; absent without one.
   std::optional<StreamPosition> position() const;
+  /// Whether a stream is being moved to the place of a seek.
+  bool isSeeking() const;
 
   std::size_t channels() const { return _channels.size(); }
+  /// The names of the viewers' ports that have channels.
+  std::set<std::string, std::less<>> viewerPorts() const;
   /// The sums over all channels, including those that have ended.
   MessageCounts counts() const;
 

@@ -260,7 +260,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
        .name = livePort ? livePort->name() : options.replayPath.value_or(""),
        .speed = options.speed,
        .recording = options.recordPath,
-       .clients = [&] { return listener.clients(); },
+       .clients = [&] { return listener.clients(server.viewerPorts()); },
        .leftOutOfPort = livePort ? [&] { return livePort->leftOut(); } : std::function<LeftOut()>(),
        .survey = [&] { return survey ? survey->result() : std::nullopt; },
        .useTechnology =

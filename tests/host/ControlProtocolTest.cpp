@@ -70,6 +70,7 @@ TEST(ControlProtocol, RepliesArriveAsTheyWereSent) {
                             .badFrames = 7,
                             .isPlayable = true,
                             .isPaused = true,
+                            .isSeeking = true,
                             .speed = 2.5,
                             .position = 1ms,
                             .length = 2h,

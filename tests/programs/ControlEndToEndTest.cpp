@@ -123,20 +123,23 @@ TEST_F(ControlEndToEnd, ASimulationChangesItsModem) {
   expectDone({"technology", "kalvi-cdma"});
   EXPECT_TRUE(logs(*varnel, "Starting the display update timer", 2));
   EXPECT_TRUE(statusHas(R"("source":"simulation","technology":"kalvi-cdma")"));
-  EXPECT_TRUE(statusHas(R"("channels":1)"));
+  EXPECT_TRUE(statusHas(R"("clients":1,"channels":1)"));
 }
 
 TEST_F(ControlEndToEnd, WithoutAServerACommandIsOneLine) {
+  std::filesystem::remove(_runtime.path());
   const Outcome outcome = control({"status"});
   EXPECT_EQ(outcome.status, 1);
+  EXPECT_FALSE(std::filesystem::exists(_runtime.path()));
   EXPECT_EQ(outcome.error, "varnel-telephonyd ctl: no telephony server serves in " +
                                _runtime.path().string() +
                                "; start varnel-telephonyd, or name its folder with --runtime-dir\n");
 }
 
 TEST_F(ControlEndToEnd, MistakesAreOneLineAndStatusTwo) {
-  for (const Texts& arguments : {Texts{}, Texts{"dance"}, Texts{"speed"}, Texts{"speed", "fast"},
-                                 Texts{"seek", "soon"}, Texts{"pause", "1"}}) {
+  for (const Texts& arguments :
+       {Texts{}, Texts{"dance"}, Texts{"speed"}, Texts{"speed", "fast"}, Texts{"seek", "soon"},
+        Texts{"technology", "\xFF"}, Texts{"technology", std::string(5000, 'x')}, Texts{"pause", "1"}}) {
     const Outcome outcome = control(arguments);
     EXPECT_EQ(outcome.status, 2) << outcome.error;
     EXPECT_EQ(std::count(outcome.error.begin(), outcome.error.end(), '\n'), 1) << outcome.error;

@@ -124,5 +124,21 @@ TEST_F(ServerControlsTest, WhatIsDoneShowsInTheStatusThatIsReturned) {
   EXPECT_TRUE(_stopped);
 }
 
+TEST_F(ServerControlsTest, ASeekInASimulationIsNoLongerThanADay) {
+  const char* const tooFar = "a simulation plays at most 24 hours for a seek; name an earlier place";
+  ServerControls simulation = controls(ServedSource::Simulation);
+  startStream();
+  EXPECT_EQ(refusal(simulation.reply({.command = Command::Seek, .place = 900'000'000min})), tooFar);
+  const auto position = _server.position().value().sinceStart;
+  EXPECT_EQ(refusal(simulation.reply({.command = Command::Seek, .place = position + 24h + 1ms})), tooFar);
+  EXPECT_FALSE(_server.isSeeking());
+  const auto status =
+      std::get<ServerStatus>(simulation.reply({.command = Command::Seek, .place = position + 24h}));
+  EXPECT_TRUE(status.isSeeking);
+  simulation.reply({.command = Command::Seek, .place = 10s});
+  _queue.run();
+  EXPECT_FALSE(std::get<ServerStatus>(simulation.reply({})).isSeeking);
+}
+
 }  // namespace
 }  // namespace varnel

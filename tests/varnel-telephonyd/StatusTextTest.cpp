@@ -62,12 +62,21 @@ TEST(StatusText, AStreamThatHasNotBegunHasALength) {
             std::string::npos);
 }
 
+TEST(StatusText, TellsOfASeek) {
+  EXPECT_NE(statusText({.isPlayable = true, .isSeeking = true}).find("state       seeking, speed 1\n"),
+            std::string::npos);
+  EXPECT_NE(statusText({.isPlayable = true, .isPaused = true, .isSeeking = true})
+                .find("state       seeking, then paused, speed 1\n"),
+            std::string::npos);
+  EXPECT_NE(statusJson({.isPlayable = true, .isSeeking = true}).find(R"("seeking":true)"), std::string::npos);
+}
+
 TEST(StatusText, JsonHasSecondsAndMomentsInUtc) {
   EXPECT_EQ(statusJson(replay),
             R"({"source":"capture","name":"a \"walk\"\u000a.pcap","technology":"kalvi-lte",)"
             R"("recording":"again.pcap","clients":2,"channels":1,"messages":{"received":10,"delivered":4,)"
             R"("waiting":1,"dropped":2,"refused":3,"tooLong":1,"notAskedFor":2},"badFrames":7,)"
-            R"("paused":true,"speed":2.5,"position":3723.004,"length":7200.000,)"
+            R"("paused":true,"seeking":false,"speed":2.5,"position":3723.004,"length":7200.000,)"
             R"("time":"2023-11-14T22:13:20.005Z","firstTime":"2023-11-14T21:11:17.000Z",)"
             R"("lastTime":"2023-11-14T23:11:17.999Z"})");
 }
