@@ -95,6 +95,21 @@ void share(const Place& place, const struct stat& status, gid_t group, const std
     refuseSharing(place, name);
 }
 
+// Throws unless this user's viewer can use the folder, which has this status.
+RuntimeFolder usable(const Place& place, const struct stat& status) {
+  const bool mayBeAnothers = place.links == Links::Followed;
+  if (!isShared(status) || !mayBeAnothers) requireOwner(place, status);
+  if (!isShared(status)) {
+    requireClosed(place, status);
+    return place.path;
+  }
+  if (const auto group = groupThatIsMissing(place.path)) {
+    refuse(place.path, "is for members of the group " + *group +
+                           " alone; become one, or name another one with --runtime-dir");
+  }
+  return {place.path, PeerAccess(status.st_uid, status.st_gid)};
+}
+
 }  // namespace
 
 RuntimeFolder serversFolder(const std::optional<std::string>& option,
@@ -117,18 +132,14 @@ RuntimeFolder serversFolder(const std::optional<std::string>& option,
 
 RuntimeFolder viewersFolder(const std::optional<std::string>& option) {
   const Place place = placeOf(option);
-  const struct stat status = madeFolder(place);
-  const bool mayBeAnothers = place.links == Links::Followed;
-  if (!isShared(status) || !mayBeAnothers) requireOwner(place, status);
-  if (!isShared(status)) {
-    requireClosed(place, status);
-    return place.path;
-  }
-  if (const auto group = groupThatIsMissing(place.path)) {
-    refuse(place.path, "is for members of the group " + *group +
-                           " alone; become one, or name another one with --runtime-dir");
-  }
-  return {place.path, PeerAccess(status.st_uid, status.st_gid)};
+  return usable(place, madeFolder(place));
+}
+
+RuntimeFolder controllersFolder(const std::optional<std::string>& option) {
+  const Place place = placeOf(option);
+  struct stat status {};
+  if (::lstat(place.path.c_str(), &status) != 0 && errno == ENOENT) return place.path;
+  return usable(place, statusOf(place));
 }
 
 std::optional<RuntimeFolder> sharedFolder(const fs::path& path) {

@@ -32,6 +32,9 @@ RuntimeFolder serversFolder(const std::optional<std::string>& option,
 /// Throws std::runtime_error like `serversFolder`, and when the user may not enter it.
 RuntimeFolder viewersFolder(const std::optional<std::string>& option);
 
+/// The same folder for a program that controls a server. Makes none: without the folder there is no server.
+RuntimeFolder controllersFolder(const std::optional<std::string>& option);
+
 /// The folder of the system's server.
 inline constexpr const char* systemsFolder = "/run/varnel";
 

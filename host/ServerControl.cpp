@@ -37,6 +37,12 @@ Bytes replyFrom(SocketConnection& connection, const QDeadlineTimer& deadline) {
 
 }  // namespace
 
+bool ServerControl::isThere() const {
+  const auto [connection, error] =
+      SocketConnection::open(socketPath(_folder.path, controlProtocol::socketName), _folder.access);
+  return connection || (error != ENOENT && error != ECONNREFUSED);
+}
+
 ServerStatus ServerControl::ask(const ControlRequest& request) const {
   const QDeadlineTimer deadline(_replyTimeout);
   const auto [connection, error] =
@@ -51,6 +57,12 @@ ServerStatus ServerControl::ask(const ControlRequest& request) const {
   if (const auto* const refusal = std::get_if<ControlRefusal>(&*reply))
     throw std::runtime_error(refusal->sentence);
   return std::get<ServerStatus>(*reply);
+}
+
+RuntimeFolder nearestControl(RuntimeFolder own, const std::filesystem::path& system) {
+  if (ServerControl(own).isThere()) return own;
+  const auto shared = sharedFolder(system);
+  return shared && ServerControl(*shared).isThere() ? *shared : own;
 }
 
 }  // namespace varnel

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <chrono>
+#include <filesystem>
 
 #include "host/ControlProtocol.h"
 #include "host/RuntimeFolder.h"
@@ -41,9 +42,16 @@ class ServerControl final {
 
   ServerStatus ask(const ControlRequest& request) const;
 
+  /// Whether a server is in the folder, also one that this user may not control.
+  bool isThere() const;
+
  private:
   const RuntimeFolder _folder;
   const std::chrono::milliseconds _replyTimeout;
 };
+
+/// The folder of the server that a user means who names none: `own`, or the system's folder if it is shared
+/// and only there a server is. Throws std::runtime_error when the path is too long for a socket.
+RuntimeFolder nearestControl(RuntimeFolder own, const std::filesystem::path& system);
 
 }  // namespace varnel

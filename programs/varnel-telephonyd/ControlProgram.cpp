@@ -26,12 +26,21 @@ struct ControlOptions {
   bool wantsJson = false;
 };
 
+// A command line can hold bytes that no request can.
+bool isSendable(const std::string& technology) {
+  const Bytes request =
+      controlProtocol::writeRequest({.command = Command::SetTechnology, .technology = technology});
+  return !request.empty() && request.size() <= controlProtocol::longestRequest;
+}
+
 void declare(CLI::App& app, ControlOptions& options, const std::string& version) {
   app.description("Controls the telephony server that runs in a runtime folder.");
   app.set_version_flag("--version", "varnel-telephonyd " + version);
   app.require_subcommand(1);
-  app.add_option("--runtime-dir", options.runtimeFolder,
-                 "the folder of the server; $XDG_RUNTIME_DIR/varnel unless given")
+  app.add_option(
+         "--runtime-dir", options.runtimeFolder,
+         "the folder of the server; unless given, $XDG_RUNTIME_DIR/varnel, and /run/varnel when no server is "
+         "there")
       ->type_name("DIR");
   const auto command = [&](const char* name, Command meaning, const char* explanation) {
     CLI::App* const added = app.add_subcommand(name, explanation);
@@ -60,6 +69,8 @@ void declare(CLI::App& app, ControlOptions& options, const std::string& version)
       ->required();
   command("technology", Command::SetTechnology, "serve as that of another modem; viewers come back with it")
       ->add_option("NAME", options.request.technology, "as for --technology")
+      ->check(
+          [](const std::string& name) { return isSendable(name) ? "" : "must be the name of a technology"; })
       ->required();
   command("stop", Command::Stop, "end the server");
 }
@@ -70,7 +81,9 @@ int fail(std::string_view text, int status) {
 }
 
 int ask(const ControlOptions& options) {
-  const ServerStatus status = ServerControl(viewersFolder(options.runtimeFolder)).ask(options.request);
+  RuntimeFolder folder = controllersFolder(options.runtimeFolder);
+  if (!options.runtimeFolder) folder = nearestControl(std::move(folder), systemsFolder);
+  const ServerStatus status = ServerControl(std::move(folder)).ask(options.request);
   if (options.request.command != Command::Status) return 0;
   std::cout << (options.wantsJson ? statusJson(status) + '\n' : statusText(status)) << std::flush;
   return std::cout ? 0 : generalError;

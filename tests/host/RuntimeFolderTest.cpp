@@ -55,6 +55,15 @@ TEST_F(RuntimeFolder, IsWhatTheOptionNames) {
   EXPECT_EQ(viewersFolder(_folder.file("made")).path, made);
 }
 
+TEST_F(RuntimeFolder, IsNotMadeToControlAServer) {
+  EXPECT_EQ(controllersFolder(_folder.file("typo")).path, _folder.file("typo"));
+  EXPECT_FALSE(std::filesystem::exists(_folder.file("typo")));
+  EXPECT_EQ(controllersFolder({}).path, _own);
+  EXPECT_FALSE(std::filesystem::exists(_own));
+  serversFolder({});
+  EXPECT_EQ(controllersFolder({}).path, _own);
+}
+
 TEST_F(RuntimeFolder, IsAnAbsolutePath) {
   const auto before = std::filesystem::current_path();
   std::filesystem::current_path(_folder.path());

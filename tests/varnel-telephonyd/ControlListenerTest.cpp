@@ -1,6 +1,7 @@
 #include "programs/varnel-telephonyd/ControlListener.h"
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <memory>
 #include <stdexcept>
@@ -74,6 +75,18 @@ TEST_F(ControlListenerTest, AnswersEachRequest) {
   const auto answers = replies(socket, 100);
   ASSERT_EQ(answers.size(), 100u);
   EXPECT_EQ(std::get<ServerStatus>(answers[99]).channels, 100u);
+}
+
+TEST_F(ControlListenerTest, WithoutAServerInTheOwnFolderTheSystemsIsMeant) {
+  const std::filesystem::path own = _folder.file("own"), system = _folder.path();
+  std::filesystem::create_directory(own);
+  ::chmod(system.c_str(), 03770);
+  EXPECT_EQ(nearestControl(own, system).path, own);
+  const auto systems = listener();
+  EXPECT_EQ(nearestControl(own, system).path, system);
+  EXPECT_EQ(nearestControl(std::filesystem::path(_folder.file("missing")), system).path, system);
+  const ControlListener owns(own, [](const ControlRequest&) { return ServerStatus{}; });
+  EXPECT_EQ(nearestControl(own, system).path, own);
 }
 
 TEST_F(ControlListenerTest, TellsWhyItRefuses) {
