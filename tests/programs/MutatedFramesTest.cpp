@@ -33,6 +33,10 @@ const std::string startCommand = plistOf(
     "</integer><integer>45439</integer></array><key>SetTkExtraCodes</key><array><integer>0</integer></array>"
     "</dict>");
 
+const std::string statusRequest = plistOf("<dict><key>Command</key><string>Status</string></dict>");
+const std::string seekRequest =
+    plistOf("<dict><key>Command</key><string>Seek</string><key>Position</key><integer>1000</integer></dict>");
+
 std::string channelRequest(const std::string& port) {
   return plistOf("<dict><key>Command</key><string>CreateLogChannel</string><key>PortName</key><string>" +
                  port + "</string></dict>");
@@ -144,6 +148,49 @@ class MutatedFramesToTheServer : public MutatedFrames {
     std::filesystem::remove(path(name));
   }
 
+  // One program that controls the server, and may stay. It never asks the server to end.
+  void attackControl() {
+    RawSocket client = RawSocket::connectedTo(path(serviceName + ".Control"));
+    for (std::size_t frames = 1 + _mutator.below(8); frames > 0; --frames)
+      if (!sendInPieces(client, controlBytes())) break;
+    if (_mutator.below(2) == 0) client.receive(10ms);
+    if (_mutator.below(4) == 0) _controlling.push_back(std::move(client));
+    if (_controlling.size() > 12) _controlling.erase(_controlling.begin());
+  }
+
+  // A request, one that is not whole, one with changes, or bytes of any value.
+  Bytes controlBytes() {
+    const std::string& request = _mutator.below(2) ? statusRequest : seekRequest;
+    const Frame frame{0, FrameMark::Request, viewOf(request)};
+    Bytes bytes;
+    switch (_mutator.below(5)) {
+      case 0:
+        appendFrame(bytes, frame);
+        break;
+      case 1:
+        appendFrame(bytes, frame);
+        bytes.resize(1 + _mutator.below(bytes.size() - 1));
+        break;
+      case 2:
+        bytes.resize(1 + _mutator.below(500));
+        for (std::uint8_t& byte : bytes) byte = static_cast<std::uint8_t>(_mutator.below(256));
+        break;
+      default:
+        return _mutator.mutated(frame);
+    }
+    return bytes;
+  }
+
+  // Who asks for the status as one should gets it.
+  void expectControl() {
+    const auto status = [this] {
+      const RawSocket client = RawSocket::connectedTo(path(serviceName + ".Control"));
+      return answer(client, statusRequest).value_or("");
+    };
+    // Connections that have ended can take a moment to close.
+    EXPECT_TRUE(eventually([&] { return status().find("<key>Channels</key>") != std::string::npos; }));
+  }
+
   // The server's port for commands; nothing when it made no channel, for many are still open.
   std::optional<RawSocket> openChannel(const std::string& port) {
     const RawSocket client = RawSocket::connectedTo(path(serviceName));
@@ -172,7 +219,7 @@ class MutatedFramesToTheServer : public MutatedFrames {
     std::filesystem::remove(path(viewerPortName));
   }
 
-  std::vector<RawSocket> _staying;
+  std::vector<RawSocket> _staying, _controlling;
   std::size_t _channels = 0;  // that were attacked
 };
 
@@ -185,16 +232,27 @@ TEST_F(MutatedFramesToTheServer, HarmNobody) {
   const auto files = openFiles(server.id());
   std::size_t early = 0;
   for (; goesOn(400); ++_rounds) {
-    if (_mutator.below(3) == 0) {
-      attackChannel();
-    } else {
-      attackService();
+    switch (_mutator.below(6)) {
+      case 0:
+      case 1:
+        attackChannel();
+        break;
+      case 2:
+        attackControl();
+        break;
+      default:
+        attackService();
     }
-    if (_rounds % 100 == 99) expectService();
+    if (_rounds % 100 == 99) {
+      expectService();
+      expectControl();
+    }
     if (_rounds == 199) early = residentKibibytes(server.id());
   }
   _staying.clear();
+  _controlling.clear();
   expectService();
+  expectControl();
   EXPECT_GT(_channels, 0u);
   EXPECT_LT(residentKibibytes(server.id()), early + mostGrowthKibibytes) << "from " << early << " KiB";
   EXPECT_TRUE(eventually([&] { return openFiles(server.id()) <= files; })) << openFiles(server.id());
