@@ -142,6 +142,8 @@ std::optional<std::string> conflict(const Options& options) {
     return "one of --port, --simulate, and --replay is needed";
   if (options.playsPort && options.simulatedTechnology == technology::ifxGSM)
     return "the modem of ifx-gsm sends no log packets, so it has no diagnostic port to play";
+  if (options.portPath && options.portPath->empty())
+    return "--port needs the name of a device, such as /dev/ttyUSB0, or auto";
   if (options.recordPath && options.recordPath->empty()) return "--record needs the name of a file";
   if (!options.replayPath) return std::nullopt;
   if (auto found = conflictOfPipe(options)) return found;

@@ -53,6 +53,12 @@ TEST(TelephonydOptions, AModemsPort) {
   EXPECT_FALSE(reading.options().inhibitsModemManager);
 }
 
+TEST(TelephonydOptions, APortNeedsAName) {
+  EXPECT_EQ(read({"--port", ""}).error,
+            "varnel-telephonyd: --port needs the name of a device, such as /dev/ttyUSB0, or auto; see "
+            "varnel-telephonyd --help\n");
+}
+
 TEST(TelephonydOptions, ModemManagerCanBeInhibitedForAPort) {
   EXPECT_TRUE(read({"--port", "auto", "--inhibit"}).options().inhibitsModemManager);
   EXPECT_THAT(read({"--replay", "a", "--inhibit"}).error, HasSubstr("--inhibit requires --port"));

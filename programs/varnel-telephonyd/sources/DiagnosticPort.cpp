@@ -88,6 +88,7 @@ std::optional<std::string> DiagnosticPort::open(Handlers handlers) {
   struct stat status {};
   if (::stat(_path.c_str(), &status) != 0)
     return troubleOfOpening(_path, status, errno == ENOTDIR ? ENOENT : errno);
+  if (S_ISREG(status.st_mode)) return troubleOfFile(_path);
   if (!S_ISCHR(status.st_mode)) return troubleOfNoDevice(_path);
   FileDescriptor device(::open(_path.c_str(), O_RDWR | O_NOCTTY | O_NONBLOCK | O_CLOEXEC));
   if (!device.isOpen()) return troubleOfOpening(_path, status, errno);

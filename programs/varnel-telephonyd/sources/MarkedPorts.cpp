@@ -1,7 +1,9 @@
 #include "programs/varnel-telephonyd/sources/MarkedPorts.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <fstream>
+#include <string_view>
 #include <system_error>
 
 namespace varnel {
@@ -36,6 +38,22 @@ void forEachEntry(const fs::path& folder, Function function) {
     function(entry->path());
 }
 
+// Numbers are compared as such: ttyUSB2 is before ttyUSB10. They have no zeros before them.
+bool isBefore(std::string_view left, std::string_view right) {
+  const auto isDigit = [](char letter) { return letter >= '0' && letter <= '9'; };
+  const auto sizeOfNumber = [&](std::string_view text) {
+    return static_cast<std::size_t>(std::ranges::find_if_not(text, isDigit) - text.begin());
+  };
+  while (!left.empty() && !right.empty()) {
+    const std::size_t leftSize = sizeOfNumber(left), rightSize = sizeOfNumber(right);
+    if (leftSize != 0 && rightSize != 0 && leftSize != rightSize) return leftSize < rightSize;
+    if (left.front() != right.front()) return left.front() < right.front();
+    left.remove_prefix(1);
+    right.remove_prefix(1);
+  }
+  return left.size() < right.size();
+}
+
 }  // namespace
 
 std::vector<std::string> markedPorts(const DeviceFolders& folders) {
@@ -47,7 +65,7 @@ std::vector<std::string> markedPorts(const DeviceFolders& folders) {
       ports.push_back((folders.devices / device.filename()).string());
     });
   }
-  std::ranges::sort(ports);
+  std::ranges::sort(ports, isBefore);
   return ports;
 }
 

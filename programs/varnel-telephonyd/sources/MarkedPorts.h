@@ -14,7 +14,7 @@ struct DeviceFolders {
 };
 
 /// The devices that udev marks as a modem's port, by the property VARNEL_MODEM=1 of the package's rule.
-/// Sorted by name.
+/// Sorted by name, and numbers in it by their value.
 std::vector<std::string> markedPorts(const DeviceFolders& folders = {});
 
 /// The link that names the same device also after it was plugged in again; the path itself when there is

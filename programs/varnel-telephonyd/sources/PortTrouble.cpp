@@ -58,8 +58,12 @@ std::string troubleOfMissing(const std::string& name) {
          "; plug the modem in, or look for its ports with ls /dev/tty* /dev/wwan*";
 }
 
-std::string troubleOfNoDevice(const std::string& name) {
+std::string troubleOfFile(const std::string& name) {
   return name + " is no device; to play a file back, type --replay " + name;
+}
+
+std::string troubleOfNoDevice(const std::string& name) {
+  return name + " is no device; look for the modem's ports with ls /dev/tty* /dev/wwan*";
 }
 
 std::string troubleOfOwnTerminal(const std::string& name) {

@@ -17,7 +17,9 @@ std::string troubleOfRefusedCodes(const std::string& name, std::size_t equipment
 
 /// There is no such device.
 std::string troubleOfMissing(const std::string& name);
-/// It is a file, a folder, or the like.
+/// It is a file.
+std::string troubleOfFile(const std::string& name);
+/// It is a folder, or the like.
 std::string troubleOfNoDevice(const std::string& name);
 /// It is the terminal that the server was started from.
 std::string troubleOfOwnTerminal(const std::string& name);

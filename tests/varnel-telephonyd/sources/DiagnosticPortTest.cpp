@@ -144,6 +144,13 @@ TEST_F(DiagnosticPortTest, AFileIsNoDevice) {
                             folder.file("walk.pcap"));
 }
 
+TEST_F(DiagnosticPortTest, AFolderIsNoDeviceAndCannotBePlayedBack) {
+  const TemporaryFolder folder;
+  DiagnosticPort port(folder.path());
+  EXPECT_EQ(open(port), folder.path().string() +
+                            " is no device; look for the modem's ports with ls /dev/tty* /dev/wwan*");
+}
+
 TEST_F(DiagnosticPortTest, WhoMayNotOpenItLearnsWhichGroupMay) {
   const uid_t user = ::geteuid();
   if (user == 0) {

@@ -55,6 +55,16 @@ TEST(MarkedPorts, AreThoseThatUdevMarksAsAModems) {
               ElementsAre(devices.device("ttyUSB0"), devices.device("ttyUSB1"), devices.device("wwan0p3")));
 }
 
+TEST(MarkedPorts, AreSortedByTheirNumbers) {
+  const FakeDevices devices;
+  for (const char* number : {"10", "2", "1", "12", "0"})
+    devices.add("tty", std::string("ttyUSB") + number, std::string("188:") + number, "E:VARNEL_MODEM=1\n");
+  devices.add("tty", "ttyACM3", "166:3", "E:VARNEL_MODEM=1\n");
+  EXPECT_THAT(markedPorts(devices.folders()),
+              ElementsAre(devices.device("ttyACM3"), devices.device("ttyUSB0"), devices.device("ttyUSB1"),
+                          devices.device("ttyUSB2"), devices.device("ttyUSB10"), devices.device("ttyUSB12")));
+}
+
 TEST(MarkedPorts, WithoutUdevThereAreNone) {
   const FakeDevices devices;
   EXPECT_THAT(markedPorts(devices.folders()), IsEmpty());
