@@ -89,8 +89,6 @@ class ManyCaptures {
   }
 
   int run() {
-    if (const auto clash = _tree ? _tree->clash(_options.captures) : std::nullopt)
-      return mistake(*clash).code;
     const bool areUsable = succeeds([this] {
       if (_options.reportPath) _report.emplace(*_options.reportPath);
       lookIntoDatabase();

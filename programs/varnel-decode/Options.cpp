@@ -70,7 +70,7 @@ struct Wishes {
   bool isShowingIdentities = false;
   std::vector<std::string> plot;
   std::string messagesAs;
-  std::string part;
+  std::optional<std::string> part;
 };
 
 // The values of --messages-as.
@@ -260,8 +260,9 @@ std::optional<std::string> conflictOfEvents(const Options& options, const Wishes
 std::optional<std::string> conflictOfMany(const Options& options, const Wishes& wishes) {
   if (options.listPath && !options.captures.empty())
     return "--files-from names all captures; put " + options.captures.front() + " into the list";
-  if (!wishes.part.empty() && !partNamed(wishes.part))
-    return "--part takes a number and how many parts there are, such as 2/8, not " + wishes.part;
+  if (wishes.part && !partNamed(*wishes.part))
+    return "--part takes a number and how many parts there are, such as 2/8, not " +
+           (wishes.part->empty() ? "nothing" : *wishes.part);
   const std::pair<const char*, const std::optional<std::string>*> files[] = {
       {"--files-from", &options.listPath},
       {"--output", &options.outputFolder},
@@ -364,7 +365,7 @@ void fulfill(Options& options, const Wishes& wishes) {
   const bool isForReading = (options.output == Output::Display && (format == "text" || format == "paths")) ||
                             options.output == Output::StatisticsTable ||
                             (options.output == Output::Events && options.eventFormat == EventFormat::Text);
-  if (!wishes.part.empty()) options.part = partNamed(wishes.part);
+  if (wishes.part) options.part = partNamed(*wishes.part);
   options.areSeveral = options.captures.size() > 1 || options.listPath;
   options.namesEachCapture = options.sharesOutput() && isForReading;
   if (!wishes.plot.empty())
@@ -414,6 +415,9 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
 
 void takeList(Options& options) {
   if (options.listPath) options.captures = readCaptureList(*options.listPath);
+}
+
+void takePart(Options& options) {
   if (options.part) options.captures = shareOf(options.captures, sizesOf(options.captures), *options.part);
 }
 

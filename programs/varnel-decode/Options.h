@@ -63,7 +63,7 @@ struct Options {
   bool areSeveral = false;                ///< several captures, or a list with any number of them
   std::optional<Part> part;               ///< the only part of the captures that is decoded
   /// Captures and snapshots, at least one unless there is a list or parts are merged; "-" is standard input.
-  /// `takeList` adds those of the list, and takes away those of other parts.
+  /// `takeList` adds those of the list, and `takePart` takes away those of other parts.
   std::vector<std::string> captures;
   std::optional<std::string> listPath;      ///< a list of captures; "-" is standard input
   std::optional<std::string> outputFolder;  ///< each capture has an output of its own in this folder
@@ -95,8 +95,11 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
                                               const std::vector<std::string>& technologies,
                                               const std::string& version);
 
-/// Reads the list of captures, if there is one, and leaves the part of the captures that is to be decoded.
-/// Throws std::runtime_error when the list cannot be read or is no list.
+/// Reads the list of captures, if there is one. Throws std::runtime_error when the list cannot be read or is
+/// no list.
 void takeList(Options& options);
+
+/// Leaves the part of the captures that is to be decoded.
+void takePart(Options& options);
 
 }  // namespace varnel

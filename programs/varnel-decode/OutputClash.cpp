@@ -4,16 +4,11 @@
 
 #include <vector>
 
-#include "host/FileIdentity.h"
+#include "programs/varnel-decode/OutputTree.h"
 
 namespace varnel {
 
 namespace {
-
-struct NamedFile {
-  std::string name;
-  FileIdentity identity;
-};
 
 NamedFile inputNamed(const std::string& path) {
   if (path == "-") return {"standard input", FileIdentity::ofDescriptor(STDIN_FILENO)};
@@ -47,7 +42,7 @@ std::vector<NamedFile> outputsOf(const Options& options) {
 }  // namespace
 
 std::optional<std::string> outputClash(const Options& options) {
-  const std::vector<NamedFile> outputs = outputsOf(options);
+  std::vector<NamedFile> outputs = outputsOf(options);
   for (std::size_t i = 0; i < outputs.size(); ++i)
     for (std::size_t other = 0; other < i; ++other)
       if (outputs[i].identity.isSameFileAs(outputs[other].identity))
@@ -64,7 +59,9 @@ std::optional<std::string> outputClash(const Options& options) {
   // There may be very many captures, so only one of them is looked at at a time.
   for (const std::string& path : options.captures)
     if (auto clash = clashWith(inputNamed(path), "decoded")) return clash;
-  return std::nullopt;
+  if (!options.outputFolder) return std::nullopt;
+  if (options.listPath) outputs.push_back(inputNamed(*options.listPath));
+  return OutputTree(*options.outputFolder, outputEnding(options)).clash(options.captures, outputs);
 }
 
 }  // namespace varnel

@@ -67,7 +67,8 @@ fs::path OutputTree::outputOf(const std::string& capture) const {
   return _folder / (name.relative_path().string() + _ending);
 }
 
-std::optional<std::string> OutputTree::clash(const std::vector<std::string>& captures) const {
+std::optional<std::string> OutputTree::clash(const std::vector<std::string>& captures,
+                                             const std::vector<NamedFile>& others) const {
   // There may be very many captures, so their outputs are compared by hashes first.
   std::vector<std::pair<std::size_t, std::size_t>> outputs;  // hash and capture
   std::vector<Node> inputs;
@@ -90,6 +91,11 @@ std::optional<std::string> OutputTree::clash(const std::vector<std::string>& cap
     if (node && std::ranges::binary_search(inputs, *node))
       return "the output of " + captures[capture] + " would overwrite the capture " + output.string() +
              "; name another folder";
+    const auto identity = others.empty() ? FileIdentity() : FileIdentity::ofPath(output);
+    for (const NamedFile& file : others)
+      if (identity.isSameFileAs(file.identity))
+        return "the output of " + captures[capture] + " would overwrite " + file.name +
+               "; name another folder";
   }
   return std::nullopt;
 }

@@ -6,9 +6,16 @@
 #include <string_view>
 #include <vector>
 
+#include "host/FileIdentity.h"
 #include "programs/varnel-decode/Options.h"
 
 namespace varnel {
+
+/// A file that an output must not overwrite, and how messages name it.
+struct NamedFile {
+  std::string name;
+  FileIdentity identity;
+};
 
 /// Where the outputs of captures go when each capture has an output of its own: a folder with the tree of the
 /// captures' names. Each output has the name of its capture with the ending of its format.
@@ -22,8 +29,9 @@ class OutputTree {
   std::filesystem::path outputOf(const std::string& capture) const;
 
   /// One sentence when two captures would have the same output, or when an output would overwrite one of the
-  /// captures. Asks the system about each file.
-  std::optional<std::string> clash(const std::vector<std::string>& captures) const;
+  /// captures or of the other files. Asks the system about each file.
+  std::optional<std::string> clash(const std::vector<std::string>& captures,
+                                   const std::vector<NamedFile>& others = {}) const;
 
   /// Whether the output of a capture is there and newer than the capture.
   bool hasNewer(const std::string& capture) const;

@@ -172,6 +172,7 @@ TEST_F(ManyCaptures, OutputsThatWouldOverwriteAreMistakes) {
                                              {"--files-from", "list", "a"},
                                              {"--files-from", ""},
                                              {"--part", "3/2", "a"},
+                                             {"--part", "", "a"},
                                              {"--resume", "a"},
                                              {"--output", "out", "--format", "none", "a"},
                                              {"--files-from", "list", "--pcap", "x"},
@@ -182,6 +183,34 @@ TEST_F(ManyCaptures, OutputsThatWouldOverwriteAreMistakes) {
     EXPECT_EQ(linesOf(result.error), 1u) << result.error;
   }
   EXPECT_THAT(contentsOf("a"), Not(HasSubstr("Path")));
+}
+
+// The outputs of all parts go to one folder.
+TEST_F(ManyCaptures, AnOutputThatWouldOverwriteACaptureOfAnotherPartIsAMistake) {
+  makeCapture("a", 2);
+  makeCapture("a.txt", 4);
+  const std::string before = contentsOf("a.txt");
+  EXPECT_EQ(runLte({"--output", ".", "--part", "1/2", "a", "a.txt"}).status, 2);
+  EXPECT_EQ(contentsOf("a.txt"), before);
+  EXPECT_EQ(runLte({"--output", "out", "--part", "1/2", "a", "./a"}).status, 2);
+  EXPECT_FALSE(fs::exists("out"));
+}
+
+TEST_F(ManyCaptures, AnOutputThatIsTheListTheReportOrTheDatabaseIsAMistake) {
+  makeCapture("a", 2);
+  makeCapture("b", 4);
+  make("b.txt", "a\nb\n");
+  fs::create_directory("out");
+  const Result list = runLte({"--files-from", "b.txt", "--output", "."});
+  EXPECT_EQ(list.status, 2);
+  EXPECT_EQ(list.error,
+            "varnel-decode: the output of b would overwrite b.txt; name another folder; see varnel-decode "
+            "--help\n");
+  EXPECT_EQ(contentsOf("b.txt"), "a\nb\n");
+  for (const char* option : {"--report", "--sqlite"}) {
+    EXPECT_EQ(runLte({"b", "a", "--output", "out", option, "out/a.txt"}).status, 2) << option;
+    EXPECT_TRUE(fs::is_empty("out")) << option;
+  }
 }
 
 TEST_F(ManyCaptures, AnOutputThatCannotBeWrittenIsOneLineOfTheReport) {
