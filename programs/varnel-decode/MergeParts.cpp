@@ -4,6 +4,7 @@
 #include <cerrno>
 #include <cstdint>
 #include <fstream>
+#include <stdexcept>
 #include <string>
 #include <system_error>
 
@@ -50,7 +51,9 @@ int mergeParts(const std::vector<std::string>& parts, const std::optional<std::s
   std::vector<std::string> databases, reports;
   const bool areReadable = succeeds([&] {
     for (const std::string& part : parts) {
-      static_cast<void>(openPart(part));
+      // A report may be empty, but a database that is was never written.
+      if (databasePath && openPart(part).peek() == std::ifstream::traits_type::eof())
+        throw std::runtime_error(part + " is empty; it is no database of captures");
       (CaptureDatabase::isDatabase(part) ? databases : reports).push_back(part);
     }
   });

@@ -16,9 +16,17 @@ using Json = nlohmann::ordered_json;
 constexpr const char* countNames[] = {"Received", "Decoded", "Too Short",
                                       "Too Long", "Unknown", "Unknown Version"};
 
+struct NoCount {};
+
+// The library would turn -5 and 1.9 into other numbers.
+std::uint64_t countIn(const Json& json) {
+  if (!json.is_number_unsigned()) throw NoCount();
+  return json.get<std::uint64_t>();
+}
+
 template <class Counts>
 void addCounts(Counts& counts, const Json& json) {
-  for (std::size_t i = 0; i < counts.size(); ++i) counts[i] += json.at(countNames[i]).get<std::uint64_t>();
+  for (std::size_t i = 0; i < counts.size(); ++i) counts[i] += countIn(json.at(countNames[i]));
 }
 
 template <class Counts>
@@ -45,25 +53,30 @@ void StatisticsSum::add(std::istream& report, const std::string& name) {
   std::uint64_t number = 0;
   for (std::string line; std::getline(report, line);) {
     ++number;
+    const auto refuse = [&] {
+      throw std::runtime_error("line " + std::to_string(number) + " of " + name +
+                               " is not one of --stats --format json");
+    };
     try {
       addLine(line);
     } catch (const Json::exception&) {
-      throw std::runtime_error("line " + std::to_string(number) + " of " + name +
-                               " is not one of --stats --format json");
+      refuse();
+    } catch (const NoCount&) {
+      refuse();
     }
   }
 }
 
 void StatisticsSum::addLine(const std::string& line) {
   const Json json = Json::parse(line);
-  _captures += json.value("Captures", std::uint64_t{1});
+  _captures += json.contains("Captures") ? countIn(json.at("Captures")) : 1;
   for (const Json& message : json.at("Messages")) {
     const Json& code = message.at("Log Code");
-    Messages& messages = _messages[{code.is_null() ? noLogCode : code.get<std::uint64_t>(),
-                                    message.at("Name").get<std::string>()}];
+    Messages& messages =
+        _messages[{code.is_null() ? noLogCode : countIn(code), message.at("Name").get<std::string>()}];
     addCounts(messages.counts, message);
     for (const Json& version : message.at("Unknown Versions")) {
-      const auto count = version.at("Messages").get<std::uint64_t>();
+      const auto count = countIn(version.at("Messages"));
       if (version.at("Version").is_null()) {
         messages.otherVersions += count;
       } else {
@@ -75,13 +88,12 @@ void StatisticsSum::addLine(const std::string& line) {
   for (const auto& [kind, count] : json.at("Frames").items()) {
     auto found = std::ranges::find(_frames, kind, &std::pair<std::string, std::uint64_t>::first);
     if (found == _frames.end()) found = _frames.insert(found, {kind, 0});
-    found->second += count.get<std::uint64_t>();
+    found->second += countIn(count);
   }
-  _noiseBytes += json.at("Noise Bytes").get<std::uint64_t>();
+  _noiseBytes += countIn(json.at("Noise Bytes"));
   for (const Json& card : json.at("SIM")) {
     const Json& number = card.at("Number");
-    _cards[number.is_null() ? std::nullopt : std::optional(number.get<std::uint64_t>())] +=
-        card.at("Records").get<std::uint64_t>();
+    _cards[number.is_null() ? std::nullopt : std::optional(countIn(number))] += countIn(card.at("Records"));
   }
   addCounts(_total, json.at("Total"));
 }

@@ -119,11 +119,13 @@ TEST_F(DecodeIntoDatabase, ReportsOfCountsAddUp) {
 TEST_F(DecodeIntoDatabase, WhatCannotBeMergedIsOneLine) {
   EXPECT_EQ(runLte({"--sqlite", "all.db", "a"}).status, 0);
   write("text", "no JSON\n");
+  write("empty", "");
   const std::pair<std::vector<std::string>, int> cases[] = {
       {{"--merge", "all.db"}, 2},
       {{"--sqlite", "all.db", "--merge", "all.db"}, 2},
       {{"--merge", "text", "--every"}, 2},
       {{"--merge", "text"}, 1},
+      {{"--sqlite", "merged.db", "--merge", "empty"}, 1},
       {{"--merge", "missing"}, 1},
       {{"--sqlite", "text", "a"}, 3},
       {{"--sqlite", "a", "a"}, 2},

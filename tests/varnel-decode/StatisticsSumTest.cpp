@@ -48,5 +48,16 @@ TEST(StatisticsSum, AnotherLineIsNamed) {
   }
 }
 
+TEST(StatisticsSum, ACountIsAnIntegerThatIsNotNegative) {
+  for (const std::string bad : {"-5", "1.9", "1e3", "18446744073709551616", "true", "\"1\"", "null"}) {
+    std::string report = monday;
+    report.replace(report.find(":7,"), 3, ":" + bad + ",");
+    EXPECT_THROW(sumOf({report}), std::runtime_error) << bad;
+    report = both;
+    report.replace(report.find(":2,"), 3, ":" + bad + ",");
+    EXPECT_THROW(sumOf({report}), std::runtime_error) << bad;
+  }
+}
+
 }  // namespace
 }  // namespace varnel
