@@ -46,7 +46,9 @@ class Report {
 };
 
 // Copies standard output, which is a temporary file of this process, to the output of the capture.
-void writeOutputOf(const std::string& capture, const std::filesystem::path& output, bool isWhole) {
+// An output that is not whole, or whose capture has changed since `before`, is dated before the capture.
+void writeOutputOf(const std::string& capture, const std::filesystem::path& output, bool isWhole,
+                   const CaptureState& before) {
   const auto check = [&](std::error_code failure) {
     if (failure) throw std::system_error(failure, "cannot write " + output.string());
   };
@@ -65,7 +67,9 @@ void writeOutputOf(const std::string& capture, const std::filesystem::path& outp
     offset += count;
   }
   struct stat status {};
-  if (!isWhole && ::stat(capture.c_str(), &status) == 0) {
+  // What changes later is newer than the last byte that was written here.
+  const bool isCurrent = isWhole && CaptureState::of(capture) == before;
+  if (!isCurrent && ::stat(capture.c_str(), &status) == 0) {
     --status.st_mtim.tv_sec;
     check(file.dateTo(status.st_mtim));
   }
@@ -140,14 +144,15 @@ class ManyCaptures {
     const auto also = [&](const std::function<void()>& part) {
       if (!succeeds(part)) status = notWrittenStatus;
     };
-    if (_tree) also([&] { keepOutput(_options.captures[index], status); });
+    if (_tree) also([&] { keepOutput(_options.captures[index], status, before); });
     if (isStoring) {
       CaptureEntry entry{.path = _options.captures[index]};
       if (status != 0) {
         entry.fate = CaptureFate::Failed;
         entry.why = lastLineOf(STDERR_FILENO);
       }
-      also([&] { CaptureDatabase(*_options.databasePath).store(entry, &statistics, &changes); });
+    const CaptureState before = CaptureState::of(_options.captures[index]);
+      also([&] { CaptureDatabase(*_options.databasePath).store(entry, &statistics, &changes, before); });
     }
     if (_report) {
       const std::string details = statistics.asReportMembers();
@@ -157,10 +162,10 @@ class ManyCaptures {
   }
 
   // What could be read of a damaged capture is kept. Its output is older than the capture, so that it is made
-  // again when the work is resumed.
-  void keepOutput(const std::string& capture, int status) const {
+  // again when the work is resumed. The same goes for a capture that grew while it was decoded.
+  void keepOutput(const std::string& capture, int status, const CaptureState& before) const {
     if (std::ferror(stdout)) throw std::runtime_error("the output of " + capture + " was not written");
-    if (status == 0 || hasOutput()) writeOutputOf(capture, _tree->outputOf(capture), status == 0);
+    if (status == 0 || hasOutput()) writeOutputOf(capture, _tree->outputOf(capture), status == 0, before);
   }
 
   void note(const JobEnd& end) {

@@ -211,6 +211,16 @@ TEST_F(CaptureDatabaseTest, ACaptureIsPresentAsLongAsItDoesNotChange) {
   EXPECT_THAT(database.present({a}), ElementsAre(false));
 }
 
+TEST_F(CaptureDatabaseTest, ACaptureThatGrewWhileItWasDecodedIsNotPresent) {
+  const std::string a = folder.file("a");
+  std::ofstream(a) << "x";
+  const CaptureState before = CaptureState::of(a);
+  std::ofstream(a, std::ios::app) << "y";
+  CaptureDatabase database(file);
+  database.store({.path = a}, nullptr, nullptr, before);
+  EXPECT_THAT(database.present({a}), ElementsAre(false));
+}
+
 TEST_F(CaptureDatabaseTest, AnotherFileIsRefused) {
   std::ofstream(file) << "some text that is no database, and is longer than the header of one is";
   EXPECT_FALSE(CaptureDatabase::isDatabase(file));

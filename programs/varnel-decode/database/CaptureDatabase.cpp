@@ -103,19 +103,6 @@ INSERT INTO sqlite_stat1 VALUES
 constexpr const char* tablesByCapture[] = {"counts", "unknown_versions", "left_out",
                                            "cells",  "displays",         "changes"};
 
-struct FileState {
-  std::optional<std::int64_t> bytes{}, modified{};  // the time in nanoseconds since 1970
-
-  bool operator==(const FileState&) const = default;
-};
-
-FileState stateOf(const std::string& path) {
-  struct stat status {};
-  if (::stat(path.c_str(), &status) != 0 || !S_ISREG(status.st_mode)) return {};
-  return {.bytes = status.st_size,
-          .modified = std::int64_t{status.st_mtim.tv_sec} * 1'000'000'000 + status.st_mtim.tv_nsec};
-}
-
 void bindOptional(SqliteStatement& statement, int parameter, const std::optional<std::int64_t>& number) {
   if (number)
     statement.bind(parameter, *number);
@@ -139,6 +126,13 @@ void bindNumber(SqliteStatement& statement, int parameter, std::string_view numb
 }
 
 }  // namespace
+
+CaptureState CaptureState::of(const std::string& path) {
+  struct stat status {};
+  if (::stat(path.c_str(), &status) != 0 || !S_ISREG(status.st_mode)) return {};
+  return {.bytes = status.st_size,
+          .modified = std::int64_t{status.st_mtim.tv_sec} * 1'000'000'000 + status.st_mtim.tv_nsec};
+}
 
 CaptureDatabase::CaptureDatabase(const std::string& path, Use use)
     : _connection(path, use == Use::Reading ? SqliteConnection::Mode::ReadOnly
@@ -178,10 +172,10 @@ void CaptureDatabase::makeTables() {
 }
 
 void CaptureDatabase::store(const CaptureEntry& capture, const MessageStatistics* statistics,
-                            ValueChanges* changes) {
+                            ValueChanges* changes, const std::optional<CaptureState>& state) {
   SqliteTransaction transaction(_connection);
   remove(capture.path);
-  const std::int64_t key = addCapture(capture);
+  const std::int64_t key = addCapture(capture, state ? *state : CaptureState::of(capture.path));
   if (statistics) addCounts(key, *statistics);
   if (changes) addChanges(key, *changes);
   transaction.commit();
@@ -197,8 +191,7 @@ void CaptureDatabase::remove(const std::string& capture) {
   _connection.run("DELETE FROM captures WHERE id = " + key);
 }
 
-std::int64_t CaptureDatabase::addCapture(const CaptureEntry& capture) {
-  const FileState state = stateOf(capture.path);
+std::int64_t CaptureDatabase::addCapture(const CaptureEntry& capture, const CaptureState& state) {
   const std::string status(nameOf(capture.fate));
   SqliteStatement add(_connection,
                       "INSERT INTO captures(path, status, why, bytes, modified) VALUES(?, ?, ?, ?, ?)");
@@ -304,7 +297,8 @@ std::vector<bool> CaptureDatabase::present(const std::vector<std::string>& captu
   for (const std::string& capture : captures) {
     bool isPresent = false;
     if (find.bind(1, capture).next()) {
-      isPresent = FileState{.bytes = find.number(0), .modified = find.number(1)} == stateOf(capture);
+      isPresent =
+          CaptureState{.bytes = find.number(0), .modified = find.number(1)} == CaptureState::of(capture);
       find.run();
     }
     present.push_back(isPresent);

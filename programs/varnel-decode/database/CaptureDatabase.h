@@ -12,6 +12,14 @@
 
 namespace varnel {
 
+/// What tells whether a capture has changed. Both are absent for what is no file.
+struct CaptureState {
+  std::optional<std::int64_t> bytes{}, modified{};  ///< the time in nanoseconds since 1970
+
+  static CaptureState of(const std::string& path);
+  bool operator==(const CaptureState&) const = default;
+};
+
 /// A database of many captures: an SQLite file with what became of each capture, its counts, the cells that
 /// it shows, and its values as changes. `docs/formats.md` describes the tables.
 ///
@@ -29,8 +37,10 @@ class CaptureDatabase final {
   /// Whether the file begins like an SQLite file.
   static bool isDatabase(const std::string& path);
 
-  /// Replaces what the database has of this capture. The other arguments are null when nothing is known.
-  void store(const CaptureEntry& capture, const MessageStatistics* statistics, ValueChanges* changes);
+  /// Replaces what the database has of this capture. The next arguments are null when nothing is known. The
+  /// state is that from before the capture was opened, because it may grow; absent for its present state.
+  void store(const CaptureEntry& capture, const MessageStatistics* statistics, ValueChanges* changes,
+             const std::optional<CaptureState>& state = std::nullopt);
 
   /// Which of the captures the database has, decoded when they had their present size and time.
   std::vector<bool> present(const std::vector<std::string>& captures);
@@ -47,7 +57,7 @@ class CaptureDatabase final {
 
  private:
   void makeTables();
-  std::int64_t addCapture(const CaptureEntry& capture);
+  std::int64_t addCapture(const CaptureEntry& capture, const CaptureState& state);
   void addCounts(std::int64_t capture, const MessageStatistics& statistics);
   void addChanges(std::int64_t capture, ValueChanges& changes);
   std::vector<std::int64_t> pathKeys(const ValueChanges& changes);
