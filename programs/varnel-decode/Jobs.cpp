@@ -1,6 +1,7 @@
 #include "programs/varnel-decode/Jobs.h"
 
 #include <sys/prctl.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -21,8 +22,12 @@ namespace varnel {
 namespace {
 
 constexpr int generalError = 1;
-// Outputs that wait for their turn are open files.
-constexpr std::size_t mostWaiting = 300;
+// The files of a job while it runs; those that have something in them stay open until its turn comes.
+constexpr std::size_t filesOfJob = 3;
+constexpr std::size_t mostFiles = 900;
+constexpr std::size_t otherFiles = 64;  // of this process
+// What jobs that wait for their turn tell may fill this much memory.
+constexpr std::size_t mostNotes = std::size_t{128} << 20;
 constexpr std::size_t longestDetails = std::size_t{1} << 20;
 
 struct CloseFile {
@@ -50,7 +55,20 @@ struct Job {
   pid_t process = -1;
   bool hasEnded = false;
   Clock::time_point start{};
+
+  std::size_t files() const {
+    return std::size_t{output != nullptr} + (error != nullptr) + (details != nullptr);
+  }
+  std::size_t notes() const { return sizeof(Job) + end.details.size() + end.lastError.size(); }
 };
+
+// How many files the jobs may have open together.
+std::size_t fileLimit() {
+  rlimit limit{};
+  if (::getrlimit(RLIMIT_NOFILE, &limit) != 0) return mostFiles;
+  const auto most = static_cast<std::size_t>(limit.rlim_cur);
+  return std::min(mostFiles, most - std::min(most, otherFiles));
+}
 
 void copy(std::FILE* from, std::FILE* to, const char* toName) {
   std::array<char, 1 << 16> part;
@@ -79,7 +97,7 @@ bool isEmpty(std::FILE* file) {
 
 class JobQueue {
  public:
-  explicit JobQueue(const JobPlan& plan) : _plan(plan), _names(plan.names), _isSlotTaken(plan.mostAtATime) {
+  explicit JobQueue(const JobPlan& plan) : _plan(plan), _names(plan.names), _slots(plan.mostAtATime) {
     if (!isShowingProgress()) return;
     sigset_t childEnds;
     ::sigemptyset(&childEnds);
@@ -100,31 +118,59 @@ class JobQueue {
   }
 
   int run() {
+    try {
+      return runAll();
+    } catch (...) {
+      tellRest();
+      throw;
+    }
+  }
+
+ private:
+  int runAll() {
     int worst = 0;
     while (_next < _names.size() || !_jobs.empty()) {
-      while (_next < _names.size() && _running < _plan.mostAtATime && _jobs.size() < mostWaiting)
-        start(_next++);
+      while (_next < _names.size() && mayStart()) start(_next++);
       if (_running > 0) waitForOne();
-      for (; !_jobs.empty() && _jobs.front().hasEnded; _jobs.pop_front())
+      for (; !_jobs.empty() && _jobs.front().hasEnded; _jobs.pop_front()) {
+        _files -= _jobs.front().files();
+        _notes -= _jobs.front().notes();
         worst = std::max(worst, finish(_jobs.front()));
+      }
     }
     return worst;
   }
 
- private:
+  // After a failure nothing more is written, but what became of the jobs that have ended is still known.
+  void tellRest() noexcept {
+    if (!_plan.ended) return;
+    try {
+      for (const Job& job : _jobs)
+        if (job.hasEnded && &job != _finishing) _plan.ended(job.end);
+    } catch (const std::exception&) {  // the first failure is the one that is told
+    }
+  }
+
+  bool mayStart() const {
+    if (_jobs.empty()) return true;
+    return _running < _plan.mostAtATime && _files + filesOfJob <= _fileLimit && _notes < mostNotes;
+  }
+
   bool isShowingProgress() const { return _plan.progress && _plan.progress->isShown(); }
 
   void start(std::size_t piece) {
     Job& job = _jobs.emplace_back(Job{.end = {.piece = piece}});
     if (_plan.isLeft && _plan.isLeft(piece)) {
       job.end.wasLeft = job.hasEnded = true;
+      _notes += job.notes();
       if (_plan.progress) _plan.progress->leave(piece);
       return;
     }
     job.output = temporaryFile();
     job.error = temporaryFile();
     job.details = temporaryFile();
-    job.slot = static_cast<std::size_t>(std::ranges::find(_isSlotTaken, false) - _isSlotTaken.begin());
+    _files += job.files();
+    job.slot = static_cast<std::size_t>(std::ranges::find(_slots, nullptr) - _slots.begin());
     JobContext context{job.details.get(), nullptr};
     if (_plan.progress) context.bytesRead = _plan.progress->begin(job.slot, piece);
     job.start = Clock::now();
@@ -134,7 +180,7 @@ class JobQueue {
     job.process = ::fork();
     if (job.process < 0) fail("cannot start a process");
     if (job.process == 0) runInChild(job, context, parent);
-    _isSlotTaken[job.slot] = true;
+    _slots[job.slot] = &job;
     ++_running;
   }
 
@@ -156,11 +202,16 @@ class JobQueue {
     while ((process = nextEnd(status)) < 0 && errno == EINTR) {
     }
     if (process < 0) fail("cannot wait for a process");
-    const auto ended = std::ranges::find(_jobs, process, &Job::process);
-    if (ended == _jobs.end()) return;
-    noteEnd(*ended, status);
-    _isSlotTaken[ended->slot] = false;
-    if (_plan.progress) _plan.progress->end(ended->slot);
+    const auto slot =
+        std::ranges::find_if(_slots, [&](const Job* job) { return job && job->process == process; });
+    if (slot == _slots.end()) return;
+    Job& ended = **slot;
+    _files -= ended.files();
+    noteEnd(ended, status);
+    _files += ended.files();
+    _notes += ended.notes();
+    *slot = nullptr;
+    if (_plan.progress) _plan.progress->end(ended.slot);
     --_running;
   }
 
@@ -194,24 +245,30 @@ class JobQueue {
   }
 
   // Writes the output of the job. Returns its exit status.
-  int finish(const Job& job) const {
+  int finish(const Job& job) {
     const JobEnd& end = job.end;
     if (_plan.progress && (job.output || job.error || end.signal)) _plan.progress->erase();
     if (job.output) copy(job.output.get(), stdout, "standard output");
     if (job.error) copy(job.error.get(), stderr, "standard error");
     if (end.signal)
       tell("decoding " + _names[end.piece] + " was ended by a signal: " + ::strsignal(*end.signal));
+    _finishing = &job;
     if (_plan.ended) _plan.ended(end);
+    _finishing = nullptr;
     return end.status;
   }
 
   const JobPlan& _plan;
   const std::vector<std::string>& _names;
-  std::deque<Job> _jobs;  // jobs that run, and jobs whose output waits, in order
-  std::vector<bool> _isSlotTaken;
+  std::deque<Job> _jobs;     // jobs that run, and jobs whose output waits, in order
+  std::vector<Job*> _slots;  // those that run; null for a free slot
+  std::size_t _files = 0;    // open for the jobs
+  std::size_t _notes = 0;    // bytes of the jobs that have ended
+  const std::size_t _fileLimit = fileLimit();
   std::size_t _next = 0;
   std::size_t _running = 0;
-  sigset_t _signals{};  // those that were blocked before, while a bar is shown
+  const Job* _finishing = nullptr;  // the one that is just told
+  sigset_t _signals{};              // those that were blocked before, while a bar is shown
 };
 
 }  // namespace

@@ -47,7 +47,7 @@ struct JobPlan {
 ///
 /// Returns the worst of their exit statuses. A process that a signal ended has the status 1, and a line on
 /// standard error names its piece of work. Throws std::system_error when a process cannot be started, or its
-/// output cannot be written.
+/// output cannot be written; `ended` then was called for each piece that had ended by itself.
 int runJobs(const JobPlan& plan);
 
 /// The same for pieces of work that tell nothing besides.

@@ -24,6 +24,8 @@ namespace varnel {
 
 namespace {
 
+constexpr int generalError = 1;
+
 ByteView bytesOf(std::string_view text) {
   return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
 }
@@ -98,14 +100,18 @@ class ManyCaptures {
       lookIntoDatabase();
     });
     if (!areUsable) return notWrittenStatus;
-    const int status =
-        runJobs({.names = _options.captures,
-                 .mostAtATime = _options.jobs,
-                 .work = [this](std::size_t i, JobContext& context) { return decodeOne(i, context); },
-                 .isLeft = [this](std::size_t i) { return isLeft(i); },
-                 .ended = [this](const JobEnd& end) { note(end); },
-                 .showsOutput = !_tree,
-                 .progress = &_progress});
+    int status = generalError;
+    const auto decodeAll = [&] {
+      status = runJobs({.names = _options.captures,
+                        .mostAtATime = _options.jobs,
+                        .work = [this](std::size_t i, JobContext& context) { return decodeOne(i, context); },
+                        .isLeft = [this](std::size_t i) { return isLeft(i); },
+                        .ended = [this](const JobEnd& end) { note(end); },
+                        .showsOutput = !_tree,
+                        .progress = &_progress});
+    };
+    // After a failure, such as one to open more files, the report has what is known.
+    if (!succeeds(decodeAll)) _isNotWritten |= _tree || _report || _options.databasePath;
     if (_report) keep([this] { _report->finish(); });
     if (_options.databasePath) keep([this] { CaptureDatabase(*_options.databasePath).removeJournal(); });
     return _isNotWritten ? notWrittenStatus : status;
@@ -134,6 +140,7 @@ class ManyCaptures {
   // Runs in a process of its own, whose standard output and standard error are temporary files.
   int decodeOne(std::size_t index, JobContext& context) const {
     const bool isStoring = _options.databasePath.has_value();
+    const CaptureState before = CaptureState::of(_options.captures[index]);
     MessageStatistics statistics;
     ValueChanges changes;
     DecodingNotes notes{.bytesRead = context.bytesRead,
@@ -151,7 +158,6 @@ class ManyCaptures {
         entry.fate = CaptureFate::Failed;
         entry.why = lastLineOf(STDERR_FILENO);
       }
-    const CaptureState before = CaptureState::of(_options.captures[index]);
       also([&] { CaptureDatabase(*_options.databasePath).store(entry, &statistics, &changes, before); });
     }
     if (_report) {

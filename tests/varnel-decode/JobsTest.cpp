@@ -1,6 +1,7 @@
 #include "programs/varnel-decode/Jobs.h"
 
 #include <gmock/gmock.h>
+#include <unistd.h>
 
 #include <chrono>
 #include <csignal>
@@ -98,6 +99,36 @@ TEST_F(JobsTest, MorePiecesThanFilesMayBeOpenAreDone) {
                     }),
             0);
   EXPECT_EQ(linesOf(::testing::internal::GetCapturedStdout()), 700u);
+}
+
+// Only jobs that wait with an output hold files.
+TEST_F(JobsTest, APieceThatTakesLongLetsAllOthersGoOn) {
+  EXPECT_EQ(runJobs(names(1200), 2,
+                    [this](std::size_t piece) {
+                      const std::string last = folder.file("last");
+                      if (piece == 1199) std::ofstream(last).flush();
+                      return piece > 0 || eventually([&] { return std::filesystem::exists(last); }) ? 0 : 1;
+                    }),
+            0);
+}
+
+TEST_F(JobsTest, AfterAFailureThePiecesThatHaveEndedAreTold) {
+  const auto pieces = names(3);
+  std::vector<std::size_t> told;
+  const JobPlan plan{.names = pieces,
+                     .mostAtATime = 2,
+                     .work =
+                         [](std::size_t piece, JobContext&) {
+                           while (piece == 0) ::pause();
+                           return 0;
+                         },
+                     .isLeft = [](std::size_t piece) -> bool {
+                       if (piece == 2) throw std::runtime_error("the system has no more files");
+                       return false;
+                     },
+                     .ended = [&](const JobEnd& end) { told.push_back(end.piece); }};
+  EXPECT_THROW(runJobs(plan), std::runtime_error);
+  EXPECT_THAT(told, ::testing::ElementsAre(1u));
 }
 
 class DecodeSeveral : public DecodeProgram {

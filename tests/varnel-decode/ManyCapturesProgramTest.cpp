@@ -213,6 +213,31 @@ TEST_F(ManyCaptures, AnOutputThatIsTheListTheReportOrTheDatabaseIsAMistake) {
   }
 }
 
+TEST_F(ManyCaptures, FewerRunAtATimeWhenTheSystemAllowsFewFiles) {
+  std::string names;
+  for (int i = 0; i < 40; ++i) {
+    names += ' ' + std::to_string(i);
+    makeCapture(std::to_string(i), 2);
+  }
+  Process process("/bin/sh", {"-c", "ulimit -n 80; exec " VARNEL_DECODE_PROGRAM
+                                    " --technology kalvi-lte --every --jobs 40 --report report" +
+                                        names});
+  const Result result = finish(process);
+  EXPECT_EQ(result.status, 0) << result.error;
+  EXPECT_EQ(linesOf(result.output), 40u);
+  EXPECT_EQ(linesOf(contentsOf("report")), 40u);
+}
+
+TEST_F(ManyCaptures, AReportIsThereEvenWhenTheSystemAllowsTooFewFiles) {
+  makeCapture("a", 2);
+  Process process("/bin/sh", {"-c", "ulimit -n 6; exec " VARNEL_DECODE_PROGRAM
+                                    " --technology kalvi-lte --every --report report a"});
+  const Result result = finish(process);
+  EXPECT_EQ(result.status, 3);
+  EXPECT_THAT(result.error, HasSubstr("cannot make a temporary file"));
+  EXPECT_TRUE(fs::exists("report"));
+}
+
 TEST_F(ManyCaptures, AnOutputThatCannotBeWrittenIsOneLineOfTheReport) {
   makeCapture("a", 2);
   makeCapture("b/c", 2);
