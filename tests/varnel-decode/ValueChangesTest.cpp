@@ -114,6 +114,14 @@ TEST(ValueChanges, ACellIsASectionOrARecordWithChannelAndIdentity) {
                                            cell("LTE", "1400", "9"), cell("NR", "630000", "8")));
 }
 
+TEST(ValueChanges, TheColorsOfAGsmCellAreItsNumber) {
+  ValueChanges changes;
+  for (const char* identity : {"21", "2/5 (NCC/BCC)", "8/5 (NCC/BCC)"})
+    changes.take(at(2, displayOf("GSM", section({{"ARFCN", "60"}, {"BSIC", identity}}))));
+  EXPECT_THAT(changes.cells(),
+              ElementsAre(ShownCell{"GSM", "60", "21"}, ShownCell{"GSM", "60", "8/5 (NCC/BCC)"}));
+}
+
 TEST(ValueChanges, ACellIsSeenWhenOnlyItsChannelChanges) {
   ValueChanges changes;
   for (const char* channel : {"", "100", "100", "200"})

@@ -60,6 +60,16 @@ constexpr NamedEntry identityEntries[] = {
     {"BSIC ID", Radio::GSM},
 };
 
+// Some modems write the identity of a GSM cell as a number, and others its two parts: "2/5 (NCC/BCC)" is 21.
+std::string identityIn(const std::string& text, Radio radio) {
+  constexpr std::string_view parts = " (NCC/BCC)";
+  if (radio != Radio::GSM || text.size() != 3 + parts.size() || !text.ends_with(parts) || text[1] != '/')
+    return text;
+  const int network = text[0] - '0', station = text[2] - '0';
+  if (network < 0 || network > 7 || station < 0 || station > 7) return text;
+  return std::to_string(8 * network + station);
+}
+
 bool names(std::span<const NamedEntry> entries, std::string_view name, Radio radio) {
   return std::ranges::any_of(
       entries, [&](const NamedEntry& entry) { return entry.name == name && entry.radio == radio; });
@@ -243,7 +253,8 @@ void ValueChanges::seeCell(const Node& identity) {
       _isTooMuch = true;
       return;
     }
-    _cells.insert({radioNames[static_cast<std::size_t>(radio)], std::string(number), *identity.text});
+    _cells.insert({radioNames[static_cast<std::size_t>(radio)], std::string(number),
+                   identityIn(*identity.text, radio)});
   }
 }
 
