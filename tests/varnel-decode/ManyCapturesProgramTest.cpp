@@ -230,7 +230,7 @@ TEST_F(ManyCaptures, FewerRunAtATimeWhenTheSystemAllowsFewFiles) {
 
 TEST_F(ManyCaptures, AReportIsThereEvenWhenTheSystemAllowsTooFewFiles) {
   makeCapture("a", 2);
-  Process process("/bin/sh", {"-c", "ulimit -n 6; exec " VARNEL_DECODE_PROGRAM
+  Process process("/bin/sh", {"-c", "exec 3>&- 4>&- 5>&-; ulimit -n 6; exec " VARNEL_DECODE_PROGRAM
                                     " --technology kalvi-lte --every --report report a"});
   const Result result = finish(process);
   EXPECT_EQ(result.status, 3);
