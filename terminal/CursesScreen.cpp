@@ -57,15 +57,15 @@ void checkTerminal() {
     throw std::runtime_error(
         "--ui terminal needs a terminal as standard input and standard output; --ui text needs none");
   const char* const name = std::getenv("TERM");
-  const std::string named =
-      name && *name ? "TERM=" + std::string(name) : std::string("TERM, which is not set,");
+  if (!name || !*name) refuse("TERM is not set, so the kind of this terminal is not known");
+  const std::string named = utf8(charactersOf("TERM=" + std::string(name)));
   switch (lookUpTerminal()) {
     case TerminalKnowledge::Enough:
       return;
     case TerminalKnowledge::Unknown:
-      refuse("the terminal " + utf8(charactersOf(named)) + " is not known here");
+      refuse("the terminal " + named + " is not known here");
     case TerminalKnowledge::CannotPlace:
-      refuse("the terminal " + utf8(charactersOf(named)) + " cannot write at a place of the screen");
+      refuse("the terminal " + named + " cannot write at a place of the screen");
   }
 }
 

@@ -12,6 +12,7 @@ struct Glyphs {
   std::wstring_view checkmark;
   std::wstring_view change;   ///< the row changed with the last refresh
   std::wstring_view step;     ///< between the names of a path
+  std::wstring_view dash;     ///< between the parts of the window's title
   std::wstring_view divider;  ///< between two panes
   std::wstring_view line;     ///< a line from left to right
   std::array<std::wstring_view, 4> wheel;
@@ -20,8 +21,8 @@ struct Glyphs {
 };
 
 inline constexpr Glyphs unicodeGlyphs{
-    L"…", L"›", L"✓", L"•", L" › ", L"│", L"─", {L"◐", L"◓", L"◑", L"◒"}, L"▁▂▃▄▅▆▇█"};
-inline constexpr Glyphs asciiGlyphs{L">",     L">", L"x", L"*", L" > ", L"|", L"-", {L"|", L"/", L"-", L"\\"},
-                                    L"_.-=*#"};
+    L"…", L"›", L"✓", L"•", L" › ", L" — ", L"│", L"─", {L"◐", L"◓", L"◑", L"◒"}, L"▁▂▃▄▅▆▇█"};
+inline constexpr Glyphs asciiGlyphs{
+    L">", L">", L"x", L"*", L" > ", L" - ", L"|", L"-", {L"|", L"/", L"-", L"\\"}, L"_.-=*#"};
 
 }  // namespace varnel

@@ -13,7 +13,14 @@ namespace varnel::TerminalRescue {
 
 namespace {
 
-constexpr int fatalSignals[] = {SIGABRT, SIGSEGV, SIGBUS, SIGFPE, SIGILL, SIGQUIT, SIGSYS, SIGTRAP, SIGXCPU};
+// Those whose default ends the program, without the real-time signals. Where the event loop takes one of
+// them, it is blocked, so that this has no effect.
+constexpr int fatalSignals[] = {SIGABRT, SIGSEGV,   SIGBUS,  SIGFPE,  SIGILL,   SIGQUIT, SIGSYS,
+                                SIGTRAP, SIGXCPU,   SIGXFSZ, SIGALRM, SIGPROF,  SIGIO,   SIGPWR,
+                                SIGPIPE, SIGVTALRM, SIGUSR1, SIGUSR2, SIGSTKFLT};
+
+// A program whose stack has overflowed has none for the handler.
+alignas(16) char handlerStack[std::size_t{64} * 1024];
 
 // A signal handler may touch nothing but plain memory.
 constexpr std::size_t longestLeaving = 512;
@@ -49,11 +56,32 @@ void writeHeldLines() {
 void rescue(int signal) {
   if (isArmed.exchange(false)) {
     writeAll(leaving, leavingSize);
+    // What was typed, and what the mouse has sent, must not reach the shell.
+    ::tcflush(STDIN_FILENO, TCIFLUSH);
     ::tcsetattr(STDIN_FILENO, TCSANOW, &formerMode);
   }
   writeHeldLines();
   // The handler was removed when it was called, so this has the usual effect.
   ::raise(signal);
+}
+
+void prepareHandlerStack() {
+  stack_t stack{};
+  if (::sigaltstack(nullptr, &stack) != 0 || (stack.ss_flags & SS_DISABLE) == 0) return;
+  stack = {};
+  stack.ss_sp = handlerStack;
+  stack.ss_size = sizeof handlerStack;
+  ::sigaltstack(&stack, nullptr);
+}
+
+void rescueAt(int signal) {
+  struct sigaction action {};
+  if (::sigaction(signal, nullptr, &action) != 0 || action.sa_handler == SIG_IGN) return;
+  action = {};
+  action.sa_handler = rescue;
+  action.sa_flags = static_cast<int>(SA_RESETHAND | SA_NODEFER | SA_ONSTACK);
+  ::sigemptyset(&action.sa_mask);
+  ::sigaction(signal, &action, nullptr);
 }
 
 }  // namespace
@@ -63,15 +91,9 @@ void arm(const termios& mode, const std::string& leave) {
   leavingSize = std::min(leave.size(), longestLeaving);
   std::copy_n(leave.begin(), leavingSize.load(), leaving);
   isArmed = true;
-  struct sigaction action {};
-  action.sa_handler = rescue;
-  action.sa_flags = static_cast<int>(SA_RESETHAND | SA_NODEFER);
-  ::sigemptyset(&action.sa_mask);
-  for (const int signal : fatalSignals) {
-    struct sigaction former {};
-    if (::sigaction(signal, nullptr, &former) == 0 && former.sa_handler != SIG_IGN)
-      ::sigaction(signal, &action, nullptr);
-  }
+  prepareHandlerStack();
+  for (const int signal : fatalSignals) rescueAt(signal);
+  for (int signal = SIGRTMIN; signal <= SIGRTMAX; ++signal) rescueAt(signal);
 }
 
 void disarm() { isArmed = false; }

@@ -11,6 +11,7 @@ namespace varnel {
 namespace {
 
 constexpr Look barLook{false, true, Ink::Plain};
+constexpr std::wstring_view separator = L" — ";  // in the title of the window
 constexpr std::wstring_view saveText = L" s Save ";
 constexpr std::wstring_view helpText = L" ? Help ";
 
@@ -25,6 +26,15 @@ std::wstring cutAtItsBeginning(std::wstring_view text, int columns, std::wstring
   if (columnsOf(text) <= columns) return std::wstring(text);
   while (!text.empty() && columnsOf(text) > columns - columnsOf(mark)) text.remove_prefix(1);
   return std::wstring(fitting(mark, std::max(0, columns))).append(text);
+}
+
+std::wstring withDashes(std::wstring_view title, std::wstring_view dash) {
+  std::wstring text;
+  for (auto end = title.find(separator); end != std::wstring_view::npos; end = title.find(separator)) {
+    text.append(title.substr(0, end)).append(dash);
+    title.remove_prefix(end + separator.size());
+  }
+  return text.append(title);
 }
 
 }  // namespace
@@ -235,17 +245,16 @@ void TerminalStack::paint(CellGrid& grid, const Glyphs& glyphs, std::wstring_vie
 void TerminalStack::paintTitle(CellGrid& grid, const Glyphs& glyphs, std::wstring_view windowTitle) const {
   const Area bar{_area.column, _area.row, _area.columns, 1};
   grid.fill(bar, barLook);
-  constexpr std::wstring_view separator = L" — ";
   std::wstring path;
   for (std::size_t i = 1; i < _controllers.size(); ++i) {
     if (i > 1) path += glyphs.step;
     path += paneOf(*_controllers[i]).title();
   }
-  std::wstring_view rest = windowTitle;
-  if (_controllers.size() > 1 && rest.starts_with(topPane().title())) {
-    rest.remove_prefix(topPane().title().size());
-    if (rest.starts_with(separator)) rest.remove_prefix(separator.size());
+  if (_controllers.size() > 1 && windowTitle.starts_with(topPane().title())) {
+    windowTitle.remove_prefix(topPane().title().size());
+    if (windowTitle.starts_with(separator)) windowTitle.remove_prefix(separator.size());
   }
+  std::wstring rest = withDashes(windowTitle, glyphs.dash);
   if (path.empty()) path = std::exchange(rest, {});
   Look bold = barLook;
   bold.isBold = true;
