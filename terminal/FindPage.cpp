@@ -23,6 +23,21 @@ void FindPage::moveBy(int rows) {
   _focus = std::clamp(_focus + rows, 0, std::max(0, static_cast<int>(_rows.size()) - 1));
 }
 
+// Rows come and go meanwhile. The focus stays on its row, and the row stays at its line.
+void FindPage::searchAgain() {
+  const auto former = std::exchange(_rows, _search(*_words.text()));
+  if (_focus < static_cast<int>(former.size())) {
+    const auto& path = former[static_cast<std::size_t>(_focus)].path;
+    const auto found = std::ranges::find(_rows, path, &FoundRow::path);
+    if (found != _rows.end()) {
+      const int place = static_cast<int>(found - _rows.begin());
+      _top = std::max(0, _top + place - _focus);
+      _focus = place;
+    }
+  }
+  moveBy(0);
+}
+
 Overlay::Wish FindPage::take(const Key& key) {
   switch (key.kind) {
     case Key::Kind::Escape:
@@ -66,8 +81,7 @@ Overlay::Wish FindPage::take(const Key& key) {
 }
 
 void FindPage::paint(CellGrid& grid, const Glyphs& glyphs) {
-  _rows = _search(*_words.text());  // the values change meanwhile
-  moveBy(0);
+  searchAgain();
   const Look bar{false, true, Ink::Plain};
   grid.fill(grid.area());
   grid.write(0, 0, label);

@@ -29,6 +29,7 @@ class FindPage final : public Overlay {
 
  private:
   void moveBy(int rows);
+  void searchAgain();
   void paintRow(CellGrid& grid, int line, const FoundRow& row, const Look& look, const Glyphs& glyphs) const;
 
   const Search _search;

@@ -47,6 +47,8 @@ class TerminalStack final : public NavigationStack {
   TerminalPane& topPane() const;
   /// The names of the panes and of the row with the focus, from the top of the tree. The root has no name.
   std::vector<std::wstring> pathOfFocus() const;
+  /// True when a modal screen hides the panes.
+  bool isCovered() const { return _modal != nullptr; }
   bool isPresenting() const { return _modal != nullptr; }
   /// True while a wheel turns, which `step` counts.
   bool isWheelTurning() const { return !_modal && topPane().toolbar().isWheelTurning; }

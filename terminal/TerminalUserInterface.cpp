@@ -96,10 +96,13 @@ void TerminalUserInterface::take(const Key& key) {
     if (_wishes.redraw) _wishes.redraw();
     return;
   }
+  if (key.kind == Key::Kind::Help && !_help) return showHelp();
   if (!_overlays.empty()) {
     Overlay* const top = _overlays.back().get();
-    if (top->take(key) == Overlay::Wish::Close)
+    if (top->take(key) == Overlay::Wish::Close) {
       std::erase_if(_overlays, [top](const auto& overlay) { return overlay.get() == top; });
+      if (top == _help) _help = nullptr;
+    }
     return;
   }
   if (TerminalStack* const root = stack(); root && root->take(key) == KeyUse::Used) return;
@@ -115,7 +118,7 @@ KeyUse TerminalUserInterface::takeAsOwn(const Key& key) {
   if (key.is(L'R') || key.isControl(L'r')) return call(_wishes.startOver);
   if (key.is(L's') || key.isControl(L's')) return call(_wishes.save);
   const bool isOnHelpButton = key.kind == Key::Kind::Click && key.row == _area.rows - 1;
-  if (key.is(L'?') || key.kind == Key::Kind::Help || isOnHelpButton) {
+  if (key.is(L'?') || isOnHelpButton) {
     showHelp();
     return KeyUse::Used;
   }
@@ -142,11 +145,15 @@ std::vector<std::string> TerminalUserInterface::pathOfFocus() const {
 }
 
 void TerminalUserInterface::showHelp() {
+  // Nothing about a row that is not in sight.
+  const bool isRowShown = _overlays.empty() && stack() && !stack()->isCovered();
   const auto path = pathOfFocus();
-  open(std::make_unique<LinesPage>(L"Help", [this, path] {
-    const std::string about = _wishes.explain ? _wishes.explain(path) : std::string();
+  auto help = std::make_unique<LinesPage>(L"Help", [this, path, isRowShown] {
+    const std::string about = isRowShown && _wishes.explain ? _wishes.explain(path) : std::string();
     return about + std::string(keysOfHelp.substr(about.empty() ? 1 : 0));
-  }));
+  });
+  _help = help.get();
+  open(std::move(help));
 }
 
 void TerminalUserInterface::showCourse() {

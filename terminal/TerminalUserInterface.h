@@ -85,6 +85,7 @@ class TerminalUserInterface final : public UserInterface {
   Repainting _repainting;
   TerminalWindow* _window = nullptr;  // the newest window
   std::vector<std::unique_ptr<Overlay>> _overlays;
+  const Overlay* _help = nullptr;  // one of the overlays
   unsigned _wheelStep = 0;
   std::unique_ptr<RepeatingTimer> _wheel;  // set while a wheel turns
 };
