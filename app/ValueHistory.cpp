@@ -520,6 +520,7 @@ ValueHistory::Summary ValueHistory::summary(Number number, const Stretch& stretc
     summary.lowest = std::min(summary.lowest, value);
     summary.highest = std::max(summary.highest, value);
     summary.last = value;
+    summary.decimals = std::max(summary.decimals, static_cast<unsigned>(series->samples[i].decimals));
     sum += value;
     ++summary.count;
   }

@@ -63,6 +63,7 @@ class ValueHistory {
   struct Summary {
     std::size_t count = 0;
     double lowest = 0, mean = 0, highest = 0, last = 0;  ///< 0 without samples
+    unsigned decimals = 0;                               ///< of the sample that has most of them
   };
   /// What a part of a stretch holds, as wide as a column on the screen.
   struct Column {

@@ -14,11 +14,11 @@ namespace {
 constexpr std::array<std::chrono::minutes, 4> lengths{std::chrono::minutes(1), std::chrono::minutes(5),
                                                       std::chrono::minutes(20), std::chrono::minutes(60)};
 constexpr std::wstring_view keys = L" + - Time  q Back ";
-constexpr int axis = 10;  // columns for the numbers on the left
+constexpr int narrowestAxis = 10;  // columns for the numbers on the left
 
-std::wstring numberText(double number) {
-  char text[32];
-  std::snprintf(text, sizeof text, "%.6g", number);
+std::wstring numberText(double number, unsigned decimals) {
+  char text[64];
+  std::snprintf(text, sizeof text, "%.*f", static_cast<int>(decimals), number);
   return charactersOf(text);
 }
 
@@ -40,6 +40,13 @@ std::optional<Scale> scaleOf(const CourseColumns& course) {
     scale->highest += 1;
   }
   return scale;
+}
+
+int axisOf(const CourseColumns& course) {
+  const auto scale = scaleOf(course);
+  if (!scale) return narrowestAxis;
+  return std::max({narrowestAxis, columnsOf(numberText(scale->lowest, course.decimals)) + 1,
+                   columnsOf(numberText(scale->highest, course.decimals)) + 1});
 }
 
 // A bar from the bottom up to the highest value of the column.
@@ -76,9 +83,11 @@ void CoursePage::paint(CellGrid& grid, const Glyphs& glyphs) {
   Look bold = bar;
   bold.isBold = true;
   grid.fill(grid.area());
+  auto course = _source(length(), grid.columns());
+  const int axis = course ? axisOf(*course) : narrowestAxis;
   const int left = grid.columns() > 3 * axis ? axis : 0;
   const Area plot{left, 2, std::max(1, grid.columns() - left), std::max(0, grid.rows() - 4)};
-  const auto course = _source(length(), plot.columns);
+  if (left > 0) course = _source(length(), plot.columns);
   grid.fill({0, 0, grid.columns(), 1}, bar);
   std::wstring title = course ? charactersOf(course->name) : L"This value has gone";
   if (course && !course->unit.empty()) title += L" in " + charactersOf(course->unit);
@@ -88,7 +97,8 @@ void CoursePage::paint(CellGrid& grid, const Glyphs& glyphs) {
     grid.write(1, 1, cutTo(charactersOf(course->summary), grid.columns() - 2, glyphs.more));
     if (const auto scale = scaleOf(*course); scale && plot.rows > 0) {
       if (left > 0) {
-        const std::wstring top = numberText(scale->highest), bottom = numberText(scale->lowest);
+        const std::wstring top = numberText(scale->highest, course->decimals);
+        const std::wstring bottom = numberText(scale->lowest, course->decimals);
         grid.write(left - 1 - columnsOf(top), plot.row, top);
         if (plot.rows > 1) grid.write(left - 1 - columnsOf(bottom), plot.row + plot.rows - 1, bottom);
       }

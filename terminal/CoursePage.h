@@ -23,6 +23,7 @@ struct CourseColumns {
   std::string begin{};                          ///< the time at the left edge
   std::string end{};                            ///< the time at the right edge
   std::vector<std::optional<Range>> columns{};  ///< nothing where there was no value
+  unsigned decimals = 0;                        ///< of the numbers at the axis
 };
 
 /// Draws the course of a value. + and - change the length of time.

@@ -53,9 +53,12 @@ std::optional<CourseColumns> courseColumns(const ValueHistory& history, ValueHis
   course.name = name;
   course.unit = history.unit(number);
   const auto summary = history.summary(number, stretch);
+  course.decimals = summary.decimals;
+  const int decimals = static_cast<int>(summary.decimals);
   char text[160];
-  std::snprintf(text, sizeof text, "now %g   lowest %g   mean %.6g   highest %g", summary.last,
-                summary.lowest, summary.mean, summary.highest);
+  std::snprintf(text, sizeof text, "now %.*f   lowest %.*f   mean %.*f   highest %.*f", decimals,
+                summary.last, decimals, summary.lowest, decimals + 1, summary.mean, decimals,
+                summary.highest);
   course.summary = text;
   course.begin = timeOfDay(history.timeAt(stretch.begin));
   course.end = timeOfDay(history.timeAt(stretch.end));

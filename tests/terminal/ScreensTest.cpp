@@ -306,6 +306,41 @@ TEST_F(TerminalScreens, FindFollowsTheDisplayAndEscapeLeavesIt) {
   EXPECT_EQ(line(1), "•PDP Context Info                      ›");
 }
 
+TEST(FindPage, TheFocusStaysOnItsRowWhenRowsComeAndGo) {
+  std::vector<FoundRow> rows;
+  for (const char* name : {"a", "b", "c", "d", "e"}) rows.push_back({{"Section", name}});
+  std::string chosen;
+  FindPage page([&](const std::string&) { return rows; },
+                [&](const FoundRow& row) { chosen = row.path.back(); });
+  CellGrid grid(20, 4);  // two rows fit
+  page.paint(grid, unicodeGlyphs);
+  for (int i = 0; i < 3; ++i) page.take(Key{Key::Kind::Down});
+  page.paint(grid, unicodeGlyphs);
+  EXPECT_EQ(grid.line(2), " Section › d");
+  rows.erase(rows.begin(), rows.begin() + 2);
+  page.paint(grid, unicodeGlyphs);
+  EXPECT_EQ(grid.line(1), " Section › c");
+  EXPECT_EQ(grid.line(2), " Section › d");
+  EXPECT_TRUE(grid.at(0, 2).look.isReversed);
+  page.take(Key{Key::Kind::Enter});
+  EXPECT_EQ(chosen, "d");
+}
+
+TEST_F(TerminalScreens, F1HelpsInEveryPageAndLeadsBack) {
+  files.existing.insert(marker);
+  launch();
+  for (const wchar_t page : {L'/', L'T', L's'}) {
+    type({page});
+    const std::string former = shown();
+    press(Key::Kind::Help);
+    EXPECT_EQ(line(0), " Help");
+    EXPECT_THAT(line(1), testing::StartsWith("Up Down j k")) << "the row is not in sight";
+    press(Key::Kind::Help);
+    EXPECT_EQ(shown(), former);
+    press(Key::Kind::Escape);
+  }
+}
+
 TEST_F(TerminalScreens, HelpBeginsWithTheRowThatHasTheFocus) {
   launch();
   for (const Key& key : {Key::of(L'?'), Key{Key::Kind::Help}}) {
@@ -355,6 +390,26 @@ TEST_F(TerminalScreens, TShowsTheCourseOfTheRowsValue) {
   EXPECT_EQ(line(0), " This value has gone");
   type(L"T");
   EXPECT_EQ(line(0), " PDP Context Info › 0");
+}
+
+TEST(CoursePage, TheNumbersAtTheAxisAreWholeAndExact) {
+  const auto paint = [](double lowest, double highest, unsigned decimals) {
+    CoursePage page([=](std::chrono::minutes, int columns) {
+      CourseColumns course{"Cell Identity", "", "", "12:00", "12:05", {}, decimals};
+      course.columns.resize(static_cast<std::size_t>(columns), CourseColumns::Range{lowest, highest});
+      return std::optional(course);
+    });
+    CellGrid grid(40, 8);
+    page.paint(grid, unicodeGlyphs);
+    return grid;
+  };
+  const CellGrid identity = paint(25800720, 25800721, 0);
+  EXPECT_THAT(identity.line(2), testing::StartsWith(" 25800721 █"));
+  EXPECT_THAT(identity.line(5), testing::StartsWith(" 25800720 █"));
+  const CellGrid wide = paint(-12345678.5, 1234567.25, 2);
+  EXPECT_THAT(wide.line(2), testing::StartsWith("  1234567.25 █"));
+  EXPECT_THAT(wide.line(5), testing::StartsWith("-12345678.50 █"));
+  EXPECT_THAT(wide.line(6), testing::StartsWith("             12:00"));
 }
 
 TEST_F(TerminalScreens, ARowWithoutANumberHasNoCourse) {
