@@ -7,12 +7,24 @@ namespace {
 constexpr std::size_t columns = 24;
 constexpr ValueHistory::Duration columnLength = std::chrono::seconds(10);
 
+// The last moment within the length of the line at which the value became another one, or came back; the
+// newest generation's when it stood all the time, so that the line is flat.
+ValueHistory::Duration lastChange(const ValueHistory& history, ValueHistory::Number series) {
+  const auto stretch = history.last(columns * columnLength);
+  const auto samples = history.samples(series, stretch);
+  for (std::size_t i = samples.size(); i-- > 0;) {
+    const bool isChange = samples[i].followsGap || (i > 0 && samples[i].value != samples[i - 1].value);
+    if (isChange) return samples[i].at;
+  }
+  return stretch.end;
+}
+
 }  // namespace
 
 std::vector<std::optional<double>> recentCourse(const ValueHistory& history, const VarnelModelNode& row) {
   const auto series = history.seriesOf(row);
   if (!series) return {};
-  const auto newest = history.whole().end;
+  const auto newest = lastChange(history, *series);
   // A stretch has its end, but not its beginning.
   const auto begun = newest / columnLength + (newest % columnLength == ValueHistory::Duration() ? 0 : 1);
   const auto end = begun * columnLength;

@@ -52,6 +52,19 @@ TEST_F(RowCourseTest, MovesOnlyWhenTenSecondsAreOver) {
   EXPECT_EQ(course()[23], 4);
 }
 
+TEST_F(RowCourseTest, OfAStandingNumberStandsUntilFourMinutesAreOver) {
+  for (int second = 0; second <= 8; second += 2) add(second, std::to_string(second));
+  const auto former = course();
+  EXPECT_EQ(former[22], 0);
+  EXPECT_EQ(former[23], 8);
+  for (int second = 10; second <= 246; second += 2) {
+    add(second, "8");
+    ASSERT_EQ(course(), former) << second;
+  }
+  for (int second = 248; second <= 250; second += 2) add(second, "8");
+  EXPECT_EQ(course(), (std::vector<std::optional<double>>(24, 8)));
+}
+
 TEST_F(RowCourseTest, ATextHasNoCourse) {
   add(0, "1");
   EXPECT_THAT(recentCourse(history, row(1)), IsEmpty());
