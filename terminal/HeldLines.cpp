@@ -74,7 +74,10 @@ int HeldLines::Buffer::overflow(int character) {
   return character;
 }
 
-void HeldLines::add(std::string_view text) { writeAll(_file, text); }
+void HeldLines::add(std::string_view text) {
+  writeAll(_file, text);
+  if (sizeOf(_file) > 2 * most) trim();
+}
 
 std::string HeldLines::tail(std::size_t bytes) const {
   const std::size_t size = sizeOf(_file);

@@ -13,7 +13,7 @@ namespace varnel {
 /// is ended by a signal. Only the newest lines are kept, and a line tells how many bytes are missing.
 class HeldLines final {
  public:
-  /// At most this many bytes are kept for long.
+  /// At most this many bytes are kept for long, and of the stream's lines never more than twice as many.
   static constexpr std::size_t most = std::size_t{256} * 1024;
 
   /// Throws std::system_error when the system lacks resources.

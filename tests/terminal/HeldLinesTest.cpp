@@ -4,6 +4,9 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
+#include <algorithm>
+#include <cstdint>
+#include <filesystem>
 #include <string>
 
 #include "tests/support/Process.h"
@@ -60,6 +63,30 @@ TEST(HeldLines, OfTooManyTheOldestAreLeftOutAndCounted) {
   EXPECT_LE(text.size(), 256u * 1024 + 64);
   EXPECT_TRUE(text.starts_with("(")) << text.substr(0, 80);
   EXPECT_NE(text.find(" bytes of older lines are left out)\n123456789\n"), std::string::npos);
+}
+
+// The largest file in memory that this process has open.
+std::uintmax_t heldBytes() {
+  std::uintmax_t most = 0;
+  for (const auto& file : std::filesystem::directory_iterator("/proc/self/fd")) {
+    std::error_code error;
+    const std::string name = std::filesystem::read_symlink(file.path(), error).string();
+    if (name.starts_with("/memfd:varnel-held-lines"))
+      most = std::max(most, std::filesystem::file_size(file.path()));
+  }
+  return most;
+}
+
+TEST(HeldLines, AreBoundedWithoutATimer) {
+  const OutputInFile output;
+  HeldLines held;
+  std::uintmax_t most = 0;
+  for (int piece = 0; piece < 100; ++piece) {
+    for (int i = 0; i < 1000; ++i) held.lines() << "123456789\n";
+    most = std::max(most, heldBytes());
+  }
+  EXPECT_GT(most, 256u * 1024) << "a file was found";
+  EXPECT_LE(most, 512u * 1024);
 }
 
 TEST(HeldLines, StandardErrorThatIsNoTerminalStaysWhereItIs) {
