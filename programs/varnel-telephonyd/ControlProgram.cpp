@@ -39,8 +39,8 @@ void declare(CLI::App& app, ControlOptions& options, const std::string& version)
   app.require_subcommand(1);
   app.add_option(
          "--runtime-dir", options.runtimeFolder,
-         "the folder of the server; unless given, $XDG_RUNTIME_DIR/varnel, and /run/varnel when no server is "
-         "there")
+         "the folder of the server; unless given, $XDG_RUNTIME_DIR/varnel, or varnel-UID in the temporary "
+         "folder (/tmp) when that variable is not set, and /run/varnel when no server is there")
       ->type_name("DIR");
   const auto command = [&](const char* name, Command meaning, const char* explanation) {
     CLI::App* const added = app.add_subcommand(name, explanation);

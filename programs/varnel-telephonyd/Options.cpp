@@ -91,7 +91,9 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
          "let the recording replace an existing file, when the first message comes")
       ->needs(record);
   app.add_option("--runtime-dir", options.runtimeFolder,
-                 "where viewer and server meet; $XDG_RUNTIME_DIR/varnel unless given")
+                 "where viewer and server meet; unless given, $XDG_RUNTIME_DIR/varnel, or varnel-UID in the "
+                 "temporary "
+                 "folder (/tmp) when that variable is not set")
       ->type_name("DIR");
   app.add_option_function<std::string>(
          "--fault",
@@ -102,10 +104,10 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
          },
          "make a fault, for tests of viewers: " + namesOfFaults())
       ->type_name("FAULT");
-  app.add_option(
-         "--allow-group", options.allowedGroup,
-         "let members of this group connect too, in a runtime folder that belongs to the group; unless "
-         "given, only this user may")
+  app.add_option("--allow-group", options.allowedGroup,
+                 "let members of this one group connect too, in a runtime folder that belongs to the group; "
+                 "this user "
+                 "must be a member; unless given, only this user and root may connect")
       ->type_name("GROUP");
   app.add_option("--log-level", options.logLevel,
                  "also write log lines of this priority number and lower to standard error; -1 for none")

@@ -33,10 +33,10 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
                   "unless given or / is a device")
       ->type_name("DIR");
   parser
-      .add_option(
-          "--runtime-dir", options.runtimeFolder,
-          "where viewer and server meet; unless given, $XDG_RUNTIME_DIR/varnel, and /run/varnel when no "
-          "server is there")
+      .add_option("--runtime-dir", options.runtimeFolder,
+                  "where viewer and server meet; unless given, $XDG_RUNTIME_DIR/varnel, or varnel-UID in the "
+                  "temporary "
+                  "folder (/tmp) when that variable is not set, and /run/varnel when no server is there")
       ->type_name("DIR");
   parser
       .add_option("--log-level", options.logLevel,

@@ -101,7 +101,8 @@ TEST_F(AutomaticPort, WhoMayNotInhibitLearnsWhatToDo) {
   EXPECT_EQ(telephony->exitStatus(), 1);
   EXPECT_EQ(telephony->error(),
             "varnel-telephonyd: ModemManager does not leave the modem alone (not allowed); start "
-            "the server with sudo, or type sudo systemctl stop ModemManager\n");
+            "the server with sudo, or allow it to a service with the rule of polkit in varnel-telephonyd(8), "
+            "or type sudo systemctl stop ModemManager\n");
 }
 
 // The real limit is longer than a test should last.

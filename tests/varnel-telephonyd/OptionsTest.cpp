@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <sstream>
+#include <string>
 #include <vector>
 
 namespace varnel {
@@ -168,6 +170,15 @@ TEST(TelephonydOptions, HelpAndVersionGoToStandardOutput) {
   const Reading version = read({"--version"});
   EXPECT_EQ(std::get<ExitStatus>(version.choice).code, 0);
   EXPECT_EQ(version.output, "varnel-telephonyd 9.8.7\n");
+}
+
+TEST(TelephonydOptions, TheHelpTellsWhomAGroupNeedsAndWhereTheRuntimeFolderIsAtLast) {
+  std::istringstream lines(read({"--help"}).output);
+  std::string text;
+  for (std::string word; lines >> word;) text += word + ' ';
+  EXPECT_THAT(text, HasSubstr("members of this one group connect too"));
+  EXPECT_THAT(text, HasSubstr("this user must be a member"));
+  EXPECT_THAT(text, HasSubstr("varnel-UID in the temporary folder (/tmp)"));
 }
 
 }  // namespace

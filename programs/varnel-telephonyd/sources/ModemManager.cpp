@@ -114,7 +114,8 @@ std::optional<std::string> ModemManager::inhibit(const std::string& modem) {
   if (answer.type() == QDBusMessage::ReplyMessage) return std::nullopt;
   release();  // the service may still do it when the time is over
   return "ModemManager does not leave the modem alone (" + answer.errorMessage().toStdString() +
-         "); start the server with sudo, or type sudo systemctl stop ModemManager";
+         "); start the server with sudo, or allow it to a service with the rule of polkit in "
+         "varnel-telephonyd(8), or type sudo systemctl stop ModemManager";
 }
 
 void ModemManager::release() {
