@@ -27,6 +27,8 @@ constexpr std::size_t mostPerTurn = 1 << 14;
 // time: each turn costs more than a record. The system holds what comes meanwhile.
 constexpr std::size_t fewBytes = 1 << 10;
 constexpr std::chrono::milliseconds pause(10);
+// When as many come during a pause, there is none.
+constexpr std::size_t manyBytes = 1 << 13;
 // A port that takes nothing gets no more. Requests are few and short.
 constexpr std::size_t mostOutgoing = 1 << 16;
 
@@ -142,10 +144,22 @@ void DiagnosticPort::readBytes() noexcept {
     if (count <= 0) return goAway();
     total += static_cast<std::size_t>(count);
     _handlers.bytesCame(ByteView(_room).first(static_cast<std::size_t>(count)));
-    if (static_cast<std::size_t>(count) < fewBytes) return restAWhile();
+    _inWindow += static_cast<std::size_t>(count);
+    if (static_cast<std::size_t>(count) < fewBytes) return isBusy() ? void() : restAWhile();
     // What is no serial line may refuse to give less than a whole message.
     if (!_isSerialLine) return;
   }
+}
+
+// What the system holds for a fast modem would not last for the pause. Short reads come from fast ones, too.
+bool DiagnosticPort::isBusy() {
+  const auto now = std::chrono::steady_clock::now();
+  if (now - _windowStart >= pause) {
+    _isBusy = _inWindow >= manyBytes;
+    _inWindow = 0;
+    _windowStart = now;
+  }
+  return _isBusy;
 }
 
 void DiagnosticPort::restAWhile() {

@@ -4,6 +4,8 @@
 
 #include <QSocketNotifier>
 #include <QTimer>
+#include <chrono>
+#include <cstddef>
 #include <memory>
 #include <optional>
 #include <string>
@@ -34,6 +36,7 @@ class DiagnosticPort final : public PortDevice {
 
  private:
   void readBytes() noexcept;
+  bool isBusy();
   void restAWhile();
   void writeBytes() noexcept;
   void goAway();
@@ -46,7 +49,10 @@ class DiagnosticPort final : public PortDevice {
   Bytes _room;                             // for what is read
   Bytes _outgoing;                         // what the device has not taken yet
   std::unique_ptr<QSocketNotifier> _readable, _writable;
-  QTimer _rest;  // runs while the device is not read
+  QTimer _rest;               // runs while the device is not read
+  std::size_t _inWindow = 0;  // bytes read since the time below
+  std::chrono::steady_clock::time_point _windowStart;
+  bool _isBusy = false;  // many bytes came in the window before
 };
 
 }  // namespace varnel
