@@ -39,7 +39,9 @@ constexpr Cause connectCauses[] = {
 
 constexpr Cause channelCauses[] = {
     {protocol::missingRights, "the telephony server in % gives this user no log channel",
-     "become a member of the group that its option --allow-group names"},
+     // An older server also refuses its own user, for it waits for rights that viewers name.
+     "if it is this user's own, end it and start it again, else become a member of the group that its option "
+     "--allow-group names"},
     {protocol::noReply, "the telephony server in % does not answer", startServerAgain},
     {protocol::malformedReply, "the telephony server in % cannot be understood",
      "use programs of one version"},

@@ -125,8 +125,9 @@ TEST_F(Link, TellsOfMissingRightsAndOfOtherErrors) {
     const auto listener = server(3);
     EXPECT_EQ(askForChannel(), 3);
     EXPECT_EQ(trouble(), inFolder("The telephony server in ",
-                                  " gives this user no log channel; become a member of the group that its "
-                                  "option --allow-group names"));
+                                  " gives this user no log channel; if it is this user's own, end it and "
+                                  "start it again, else become a member of the group that its option "
+                                  "--allow-group names"));
   }
   const auto listener = server(7);
   EXPECT_EQ(askForChannel(), 7);
