@@ -206,11 +206,18 @@ std::string CursesScreen::waysToLeave() const {
 void CursesScreen::leave() {
   if (_isLeft) return;
   _isLeft = true;
+  // A program in the background leaves the terminal too, instead of being stopped.
+  sigset_t stop;
+  sigset_t former;
+  ::sigemptyset(&stop);
+  ::sigaddset(&stop, SIGTTOU);
+  ::pthread_sigmask(SIG_BLOCK, &stop, &former);
   ::curs_set(1);
   ::endwin();
   // What the mouse has sent meanwhile must not reach the shell.
   ::tcflush(STDIN_FILENO, TCIFLUSH);
   ::tcsetattr(STDIN_FILENO, TCSANOW, &_formerMode);
+  ::pthread_sigmask(SIG_SETMASK, &former, nullptr);
   TerminalRescue::disarm();
 }
 

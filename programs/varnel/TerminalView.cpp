@@ -4,9 +4,12 @@
 #include <unistd.h>
 
 #include <QSocketNotifier>
+#include <algorithm>
+#include <atomic>
 #include <csignal>
 #include <cstdio>
 #include <cstdlib>
+#include <initializer_list>
 #include <iostream>
 #include <optional>
 
@@ -37,6 +40,35 @@ void stopHere() {
   ::raise(SIGTSTP);  // still blocked
   ::pthread_sigmask(SIG_UNBLOCK, &stop, nullptr);
   ::pthread_sigmask(SIG_BLOCK, &stop, nullptr);
+}
+
+bool isPending(std::initializer_list<int> signals) {
+  sigset_t pending;
+  ::sigpending(&pending);
+  return std::ranges::any_of(signals, [&](int signal) { return ::sigismember(&pending, signal) == 1; });
+}
+
+// Another job of the shell has the terminal: who touches it is stopped.
+bool isInBackground() {
+  const pid_t foreground = ::tcgetpgrp(STDIN_FILENO);
+  return foreground >= 0 && foreground != ::getpgrp();
+}
+
+std::atomic<bool> wasContinued;
+
+// Signals still have their usual effect, so that the shell can end the program. Returns also when nobody
+// could continue it.
+void waitForForeground() {
+  struct sigaction action {};
+  struct sigaction former {};
+  action.sa_handler = [](int) { wasContinued = true; };
+  ::sigemptyset(&action.sa_mask);
+  ::sigaction(SIGCONT, &action, &former);
+  do {
+    wasContinued = false;
+    if (isInBackground()) ::raise(SIGTTOU);
+  } while (wasContinued);
+  ::sigaction(SIGCONT, &former, nullptr);
 }
 
 std::string timeOfDay(Time time) {
@@ -124,9 +156,11 @@ class TerminalViewer final {
       case SIGTSTP:
         return suspend();
       case SIGCONT:
+        if (!waitForTerminal()) return;
         _screen->takeAgain();
         return adaptSize();
       default:
+        _isEnding = true;
         _host.end(0);
     }
   }
@@ -224,9 +258,25 @@ class TerminalViewer final {
     _userInterface.resize(_screen->columns(), _screen->rows());
   }
 
+  // Stays stopped while another job has the terminal. False when the program ends instead.
+  bool waitForTerminal() {
+    for (;;) {
+      if (_isEnding || isPending({SIGTERM, SIGHUP, SIGINT})) return false;
+      if (!isInBackground()) return true;
+      stopHere();
+      if (isPending({SIGCONT, SIGTERM, SIGHUP, SIGINT})) continue;
+      // Nobody could continue it, so it was not stopped, and the terminal does not come back.
+      _isEnding = _hasLostTerminal = true;
+      _host.end(EXIT_FAILURE);
+      return false;
+    }
+  }
+
   void suspend() {
+    if (_isEnding) return;
     _screen->leave();
     stopHere();
+    if (!waitForTerminal()) return;
     _screen->enter();
     adaptSize();
   }
@@ -243,12 +293,14 @@ class TerminalViewer final {
   QSocketNotifier _input;
   std::unique_ptr<RepeatingTimer> _trimming;
   bool _hasLostTerminal = false;
+  bool _isEnding = false;
 };
 
 }  // namespace
 
 int viewInTerminal(int& argumentCount, char** arguments, const Options& options,
                    const ApplicationInfo& application) {
+  waitForForeground();
   HostApplication host(argumentCount, arguments);
   TerminalViewer viewer(host, options, application);
   return viewer.run();

@@ -221,6 +221,32 @@ TEST_F(TerminalEndToEnd, CtrlZGivesTheShellBackAndFgReturns) {
   ASSERT_TRUE(terminal.shows("status 0\n"));
 }
 
+TEST_F(TerminalEndToEnd, AViewerThatIsStoppedEndsWhenTheShellAsksForIt) {
+  const auto telephony = server();
+  for (const bool isInBackground : {false, true}) {
+    const Tmux terminal;
+    terminal.command(viewerLine(isInBackground ? "&" : ""));
+    if (!isInBackground) {
+      ASSERT_TRUE(terminal.shows(" Updated 20"));
+      terminal.press({"C-z"});
+    }
+    // The shell tells what its jobs do before it asks for the next line.
+    ASSERT_TRUE(eventually([&] {
+      terminal.press({"Enter"});
+      return terminal.screen().find("Stopped") != std::string::npos;
+    })) << terminal.screen();
+    const pid_t viewer = viewerOf(terminal);
+    terminal.command("bg");
+    // This shell does not continue a job that it ends.
+    terminal.command("kill %1; bg");
+    EXPECT_TRUE(eventually([&] {
+      terminal.press({"Enter"});
+      return ::kill(viewer, 0) != 0;
+    })) << terminal.screen();
+    EXPECT_EQ(terminal.state("#{alternate_on}"), "0");
+  }
+}
+
 TEST_F(TerminalEndToEnd, AProgramThatWasStoppedWithoutWarningGoesOn) {
   const auto telephony = server();
   const Tmux terminal;
