@@ -79,8 +79,8 @@ bool NoticeKeeper::update() {
       {Matter::LeftOutOfLog,
        countLine("Messages that a snapshot's binary log lacks, since too many came at a time",
                  _model->messagesLeftOutOfLog())},
-      {Matter::NotDecoded,
-       countLine("Messages of a log code, version, or length that no decoder knows", _model->messagesNotDecoded())},
+      {Matter::NotDecoded, countLine("Messages of a log code, version, or length that no decoder knows",
+                                     _model->messagesNotDecoded())},
   };
   bool hasChanged = false;
   for (const auto& [matter, line] : lines) hasChanged |= _notice.set(matter, line);

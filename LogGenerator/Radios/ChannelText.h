@@ -15,7 +15,8 @@ namespace varnel::channels {
 inline constexpr Format frequencyFormat = real("%.1f MHz");
 /// "2524.950 MHz": a frequency of NR.
 inline constexpr Format nrFrequencyFormat = real("%.3f MHz");
-/// "20 MHz" and "1.4 MHz" for 100 and 6 resource blocks of LTE (3GPP TS 36.101, table 5.6-1). A field table can use it.
+/// "20 MHz" and "1.4 MHz" for 100 and 6 resource blocks of LTE (3GPP TS 36.101, table 5.6-1). A field table
+/// can use it.
 inline constexpr Choice lteBandwidths[] = {{6, "1.4 MHz"}, {15, "3 MHz"},  {25, "5 MHz"},
                                            {50, "10 MHz"}, {75, "15 MHz"}, {100, "20 MHz"}};
 inline constexpr Format lteBandwidthFormat = choice(lteBandwidths, "Unknown");
