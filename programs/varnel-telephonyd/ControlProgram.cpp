@@ -83,7 +83,8 @@ int fail(std::string_view text, int status) {
 int ask(const ControlOptions& options) {
   RuntimeFolder folder = controllersFolder(options.runtimeFolder);
   if (!options.runtimeFolder) folder = nearestControl(std::move(folder), systemsFolder);
-  const ServerStatus status = ServerControl(std::move(folder)).ask(options.request);
+  ServerControl server(std::move(folder));
+  const ServerStatus status = server.ask(options.request);
   if (options.request.command != Command::Status) return 0;
   std::cout << (options.wantsJson ? statusJson(status) + '\n' : statusText(status)) << std::flush;
   return std::cout ? 0 : generalError;

@@ -155,7 +155,8 @@ std::optional<StreamPlace> readMoment(std::string_view text) {
   }
   scanner.skip('Z');
   const year_month_day date = year / month / day;
-  if (!scanner.isAtEnd() || !date.ok() || hour >= 24h || minute >= 60min || second > 60s) return std::nullopt;
+  if (!scanner.isAtEnd() || !date.ok() || hour >= days(1) || minute >= hours(1) || second > minutes(1))
+    return std::nullopt;
   const auto moment = sys_days(date).time_since_epoch() + hour + minute + second;
   return Time{duration_cast<seconds>(moment).count(),
               static_cast<std::int32_t>(fraction.count()) * 1'000'000};
