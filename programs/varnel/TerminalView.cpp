@@ -14,12 +14,11 @@
 #include <optional>
 
 #include "app/DateFormatter.h"
-#include "app/PrintableText.h"
+#include "app/RowAnswers.h"
 #include "app/ValueHistory.h"
 #include "app/VarnelApp.h"
 #include "host/HostApplication.h"
 #include "host/SignalWatcher.h"
-#include "model/Explanations.h"
 #include "programs/varnel/HostServices.h"
 #include "terminal/CursesScreen.h"
 #include "terminal/HeldLines.h"
@@ -30,7 +29,6 @@ namespace varnel {
 namespace {
 
 constexpr std::chrono::seconds intervalOfTrimming(10);
-constexpr std::string_view momentPattern = "yyyy-MM-dd 'at' HH:mm:ss";
 
 // Stops the process until somebody continues it. A process that nobody could continue is not stopped.
 void stopHere() {
@@ -126,6 +124,7 @@ class TerminalViewer final {
              .suspend = [] { ::kill(0, SIGTSTP); },
              .redraw = [this] { _screen->redraw(); }},
             [this](const CellGrid& grid) { _screen->show(grid); }, _screen->glyphs()),
+        _answers(_services.model().generator.resources, _services.model().generator.clock, _history),
         _app({_services.model(_held.lines()), _services.files(), _services.preferences(), _userInterface,
               "press R", &_history}),
         _input(STDIN_FILENO, QSocketNotifier::Read),
@@ -173,15 +172,10 @@ class TerminalViewer final {
 
   CoursePage::Source courseOf(const NamePath& path) const {
     const VarnelModelNode* const node = path.empty() ? nullptr : _app.nodeAt(path);
-    const auto series = node ? _history.seriesOf(*node) : std::nullopt;
-    if (!series) return {};
-    std::string name;
-    for (const std::string& part : path) name.append(name.empty() ? "" : " > ").append(part);
-    // The record can change its place while its course is shown.
-    const std::string record = _history.record(*series);
-    if (!record.empty()) name.append(" (").append(record).append(")");
-    return [this, name, number = *series](std::chrono::minutes length, int columns) {
-      return courseColumns(_history, number, name, length, columns);
+    const auto course = node ? _answers.course(*node, path) : std::nullopt;
+    if (!course) return {};
+    return [this, course = *course](std::chrono::minutes length, int columns) {
+      return courseColumns(_history, course.number, course.title, length, columns);
     };
   }
 
@@ -191,54 +185,9 @@ class TerminalViewer final {
                          : lines;
   }
 
-  // What there is to say about a row, in lines.
-  std::string explained(const NamePath& path) {
+  std::string explained(const NamePath& path) const {
     const VarnelModelNode* const node = path.empty() ? nullptr : _app.nodeAt(path);
-    if (!node) return {};
-    std::string text = "This row: ";
-    for (const std::string& name : path) text.append(&name == &path.front() ? "" : " > ").append(name);
-    text += '\n';
-    const std::string meaning = meaningOf(path);
-    if (!node->value()) {
-      text += meaning;
-      const std::size_t rows = node->childNodes()->size();
-      return text + "It leads to " + std::to_string(rows) + (rows == 1 ? " row" : " rows") +
-             "; Enter opens them.\n";
-    }
-    text += "Its value: " + printableText(*node->value()) + levelOf(*node, path) + '\n';
-    // Only a leaf has a value.
-    if (const auto& written = static_cast<const VarnelModelLeafNode&>(*node).writtenAt()) {
-      const SystemClock clock;
-      text += "The modem last sent it " +
-              DateFormatter(momentPattern).string(*written, clock.zoneAt(*written)) + ".\n";
-    }
-    return text + meaning;
-  }
-
-  // The resource is read when somebody asks for the first time.
-  const Explanations& explanations() {
-    if (!_explanations) _explanations.emplace(_services.model().generator.resources);
-    return *_explanations;
-  }
-
-  static std::string joined(const NamePath& path) {
-    std::string text;
-    for (const std::string& name : path) text.append("/").append(name);
-    return text;
-  }
-
-  std::string meaningOf(const NamePath& path) {
-    const auto explanation = explanations().of(joined(path));
-    return explanation ? explanation->text() : std::string();
-  }
-
-  // Such as " (good)"; empty for a row that shows no level.
-  std::string levelOf(const VarnelModelNode& row, const NamePath& path) {
-    const auto series = _history.seriesOf(row);
-    if (!series) return {};
-    const double number = _history.summary(*series, _history.last({})).last;
-    const auto level = explanations().levelOf(joined(path), number, _history.unit(*series));
-    return level ? " (" + std::string(nameOf(*level)) + ")" : std::string();
+    return node ? _answers.everything(*node, path) : std::string();
   }
 
   void takeKeys() noexcept {
@@ -288,7 +237,7 @@ class TerminalViewer final {
   std::optional<CursesScreen> _screen;
   TerminalUserInterface _userInterface;
   ValueHistory _history;
-  std::optional<Explanations> _explanations;
+  RowAnswers _answers;
   VarnelApp _app;
   QSocketNotifier _input;
   std::unique_ptr<RepeatingTimer> _trimming;
