@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "widgets/Motion.h"
+#include "widgets/QtValues.h"
 
 namespace varnel {
 
@@ -176,8 +177,17 @@ void NavigationWidget::slide(const QPixmap& former, const QPixmap& next, SlideOv
 }
 
 void NavigationWidget::takeKeyboard() {
+  if (isHidden()) return;  // a page of the window has the keyboard
   if (ModalScreenWidget* screen = modalScreen()) return screen->takeKeyboard();
   topPane().tableWidget().setFocus(Qt::OtherFocusReason);
+}
+
+std::vector<std::string> NavigationWidget::pathOfFocus() const {
+  std::vector<std::string> path;
+  for (std::size_t i = 1; i < _controllers.size(); ++i)
+    path.push_back(utf8(paneOf(*_controllers[i]).header().title()));
+  if (const RowWidget* const row = topPane().tableWidget().currentRow()) path.push_back(utf8(row->name()));
+  return path;
 }
 
 PaneWidget& NavigationWidget::topPane() const { return paneOf(*_controllers.back()); }

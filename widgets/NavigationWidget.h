@@ -38,6 +38,9 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   /// Gives the keyboard focus to what is on top.
   void takeKeyboard();
   PaneWidget& topPane() const;
+  /// The names from below the root to the current row of the top pane; without such a row, to the pane's own
+  /// node.
+  std::vector<std::string> pathOfFocus() const;
   /// Null while no screen is presented.
   ModalScreenWidget* modalScreen() const;
 

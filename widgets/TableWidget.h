@@ -41,6 +41,8 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
 
   /// The rows on the screen, from top to bottom.
   std::vector<RowWidget*> visibleRows() const;
+  /// The row from which the arrow keys go on; null when there is none on the screen.
+  const RowWidget* currentRow() const { return _current ? visibleRow(*_current) : nullptr; }
   void chooseRow(std::size_t row);
 
   QSize sizeHint() const override;

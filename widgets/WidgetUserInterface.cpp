@@ -50,6 +50,7 @@ std::unique_ptr<Window> WidgetUserInterface::makeWindow(const Rect& frame) {
     window->setLeavingObserver([this](const QSize& size) { _lastSize.keep(size); });
   }
   _window = window.get();
+  if (_windowObserver) _windowObserver(*window);
   return window;
 }
 

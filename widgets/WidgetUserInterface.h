@@ -15,6 +15,11 @@ class WidgetUserInterface final : public UserInterface {
   /// The wishes apply to every window that it makes.
   explicit WidgetUserInterface(WindowWidget::Wishes wishes, RememberedSize lastSize = RememberedSize());
 
+  /// The observer is called with each window that it makes.
+  void setWindowObserver(std::function<void(WindowWidget& window)> observer) {
+    _windowObserver = std::move(observer);
+  }
+
   Rect screenBounds() const override;
   Rect applicationFrame() const override;
   const TextMetrics& textMetrics() const override { return _textMetrics; }
@@ -30,6 +35,7 @@ class WidgetUserInterface final : public UserInterface {
  private:
   WindowWidget::Wishes _wishes;
   RememberedSize _lastSize;
+  std::function<void(WindowWidget& window)> _windowObserver;
   FontMetrics _textMetrics;
   QPointer<WindowWidget> _window;  // the newest window
 };

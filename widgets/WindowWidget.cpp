@@ -2,25 +2,24 @@
 
 #include <QCloseEvent>
 #include <QKeyEvent>
+#include <algorithm>
 #include <utility>
 
+#include "widgets/AlertWidget.h"
 #include "widgets/FirstSize.h"
 #include "widgets/QtValues.h"
 
 namespace varnel {
 
-namespace {
-
-bool isControlAnd(Qt::Key key, const QKeyEvent& event) {
-  return event.key() == key && event.modifiers() == Qt::ControlModifier;
-}
-
-}  // namespace
-
 WindowWidget::WindowWidget(const Rect& frame, Wishes wishes) : _wishes(std::move(wishes)) {
   setWindowTitle(QStringLiteral("Varnel"));
   setMinimumSize(smallestWindowSide, smallestWindowSide);
   resize(qtPixels(frame).size());
+  if (_wishes.startOver) addCommand(tr("Start over"), {Qt::CTRL | Qt::Key_R}, _wishes.startOver);
+  // Not every desktop has its own key for quitting.
+  auto quitKeys = QKeySequence::keyBindings(QKeySequence::Quit);
+  if (!quitKeys.contains(QKeySequence(Qt::CTRL | Qt::Key_Q))) quitKeys.append(Qt::CTRL | Qt::Key_Q);
+  addCommand(tr("Quit"), quitKeys, [this] { close(); });
 }
 
 WindowWidget::~WindowWidget() { dropRoot(); }
@@ -36,14 +35,78 @@ void WindowWidget::setRoot(NavigationStack& stack) {
   dropRoot();
   _root = &static_cast<NavigationWidget&>(stack);
   _root->setParent(this);
-  _root->setGeometry(rect());
+  arrange();
   if (isVisible()) makeKeyAndVisible();
+}
+
+// The page hides the stack, so that no pane takes the keyboard below it.
+void WindowWidget::arrange() {
+  const int barHeight = _bar ? std::min(_bar->sizeHint().height(), height()) : 0;
+  const QRect main(0, 0, width(), height() - barHeight);
+  if (_root) _root->setGeometry(main);
+  if (_page) _page->setGeometry(main);
+  if (_bar) _bar->setGeometry(0, main.height(), width(), barHeight);
+}
+
+QAction& WindowWidget::addCommand(const QString& text, const QList<QKeySequence>& keys,
+                                  std::function<void()> act) {
+  auto* const action = new QAction(text, this);
+  action->setShortcuts(keys);
+  connect(action, &QAction::triggered, this, [this, act = std::move(act)] {
+    if (!isCovered()) act();
+  });
+  addAction(action);
+  return *action;
+}
+
+bool WindowWidget::isCovered() const {
+  if (_root && _root->modalScreen()) return true;
+  return std::ranges::any_of(children(),
+                             [](const QObject* child) { return dynamic_cast<const AlertWidget*>(child); });
+}
+
+void WindowWidget::showPage(const QString& title, std::unique_ptr<QWidget> content) {
+  closePage();
+  const QString below = _root ? _root->topPane().header().title() : windowTitle();
+  _page = new PageWidget(
+      {title, below}, std::move(content), [this] { closePage(); }, *this);
+  arrange();
+  _page->show();
+  if (_root) _root->hide();
+  takeKeyboard();
+}
+
+// A key or a button of the page may have caused the call.
+void WindowWidget::closePage() {
+  if (!_page) return;
+  PageWidget* const leaving = std::exchange(_page, nullptr);
+  leaving->hide();
+  leaving->deleteLater();
+  if (_root) _root->show();
+  takeKeyboard();
+}
+
+void WindowWidget::setBar(std::unique_ptr<QWidget> bar) {
+  if (_bar) {
+    _bar->hide();
+    _bar.release()->deleteLater();  // one of its buttons may have caused the call
+  }
+  _bar = std::move(bar);
+  if (_bar) {
+    _bar->setParent(this);
+    _bar->show();
+  }
+  arrange();
+}
+
+std::vector<std::string> WindowWidget::pathOfFocus() const {
+  return _root ? _root->pathOfFocus() : std::vector<std::string>();
 }
 
 void WindowWidget::makeKeyAndVisible() {
   if (_root) {
+    _root->setVisible(!_page);
     _root->appear();
-    _root->show();
   }
   show();
   raise();
@@ -53,21 +116,16 @@ void WindowWidget::makeKeyAndVisible() {
 void WindowWidget::setTitle(std::string_view title) { setWindowTitle(singleLine(title)); }
 
 void WindowWidget::takeKeyboard() {
+  if (_page) return _page->takeKeyboard();
   if (_root) _root->takeKeyboard();
 }
 
 void WindowWidget::resizeEvent(QResizeEvent* event) {
   QWidget::resizeEvent(event);
-  if (_root) _root->setGeometry(rect());
+  arrange();
 }
 
 void WindowWidget::keyPressEvent(QKeyEvent* event) {
-  if (isControlAnd(Qt::Key_R, *event) && _wishes.startOver) return _wishes.startOver();
-  // Not every desktop has its own key for quitting.
-  if (event->matches(QKeySequence::Quit) || isControlAnd(Qt::Key_Q, *event)) {
-    close();
-    return;
-  }
   // No widget had the keyboard focus for this key. From now on one has it.
   if (!focusWidget()) takeKeyboard();
   event->ignore();

@@ -11,33 +11,58 @@
 
 namespace varnel {
 
+namespace {
+
+/// The viewer in a window, from start to end.
+class WindowViewer final {
+ public:
+  WindowViewer(WidgetApplication& host, const Options& options, const ApplicationInfo& application)
+      : _host(host),
+        _services(options, application),
+        _userInterface({.close = [this] { _host.end(0); }, .startOver = [this] { _app.startOver(); }},
+                       RememberedSize(stateFolder())),
+        _app({_services.model(), _services.files(), _services.preferences(), _userInterface}),
+        _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [this](int signal) { take(signal); }) {
+    _userInterface.setWindowObserver([this](WindowWidget& window) { furnish(window); });
+    if (options.updates) _app.afterUpdates(*options.updates, [this] { _host.end(0); });
+  }
+
+  int run() {
+    _app.applicationDidFinishLaunching();
+    const int status = _host.run();
+    _app.applicationWillTerminate();
+    return status;
+  }
+
+ private:
+  void take(int signal) {
+    switch (signal) {
+      case SIGUSR1:
+        return _app.startOver();
+      case SIGUSR2:
+        return _app.save();
+      default:
+        _host.end(0);
+    }
+  }
+
+  // What the user can do in the window beyond the screens of the application.
+  void furnish(WindowWidget&) {}
+
+  WidgetApplication& _host;
+  HostServices _services;
+  WidgetUserInterface _userInterface;
+  VarnelApp _app;
+  const SignalWatcher _watcher;
+};
+
+}  // namespace
+
 int viewInWindow(int& argumentCount, char** arguments, const Options& options,
                  const ApplicationInfo& application) {
   WidgetApplication host(argumentCount, arguments);
-  HostServices services(options, application);
-  VarnelApp* viewer = nullptr;
-  WidgetUserInterface userInterface(
-      {.close = [&host] { host.end(0); }, .startOver = [&viewer] { viewer->startOver(); }},
-      RememberedSize(stateFolder()));
-  VarnelApp app({services.model(), services.files(), services.preferences(), userInterface});
-  viewer = &app;
-  if (options.updates) app.afterUpdates(*options.updates, [&host] { host.end(0); });
-  const SignalWatcher watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [&](int signal) {
-    switch (signal) {
-      case SIGUSR1:
-        app.startOver();
-        break;
-      case SIGUSR2:
-        app.save();
-        break;
-      default:
-        host.end(0);
-    }
-  });
-  app.applicationDidFinishLaunching();
-  const int status = host.run();
-  app.applicationWillTerminate();
-  return status;
+  WindowViewer viewer(host, options, application);
+  return viewer.run();
 }
 
 }  // namespace varnel

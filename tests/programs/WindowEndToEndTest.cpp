@@ -89,7 +89,7 @@ class WindowEndToEnd : public testing::Test {
     ASSERT_TRUE(QTest::qWaitForWindowActive(&window(), patience_ms));
   }
   WindowWidget& window() { return static_cast<WindowWidget&>(*_app.window()); }
-  NavigationWidget& stack() { return *dynamic_cast<NavigationWidget*>(window().children().first()); }
+  NavigationWidget& stack() { return *window().stack(); }
   PaneWidget& pane() { return stack().topPane(); }
   std::string title() { return pane().header().title().toStdString(); }
   std::string status() { return pane().toolbar().findChild<QLabel*>()->text().toStdString(); }

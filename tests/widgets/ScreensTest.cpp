@@ -59,7 +59,7 @@ class ScreensTest : public testing::TestWithParam<std::pair<int, int>> {
     QCoreApplication::processEvents();
   }
   WindowWidget& window() { return static_cast<WindowWidget&>(*app.window()); }
-  NavigationWidget& stack() { return *dynamic_cast<NavigationWidget*>(window().children().first()); }
+  NavigationWidget& stack() { return *window().stack(); }
   PaneWidget& pane() { return stack().topPane(); }
   std::vector<std::string> descriptions() {
     std::vector<std::string> all;
