@@ -105,10 +105,10 @@ std::unique_ptr<VarnelCell> VarnelPaneController::leafCell(TableView& table,
 }
 
 void VarnelPaneController::showFacts(VarnelCell& cell, const VarnelModelNode& child) const {
-  const bool isChanged = _facts.changes && _facts.changes->contains(child);
-  cell.cellView().setChange(isChanged ? CellChange::Changed : CellChange::None);
-  cell.cellView().setCourse(_facts.history ? recentCourse(*_facts.history, child)
-                                           : std::vector<std::optional<double>>());
+  CellFacts facts;
+  if (_facts.changes && _facts.changes->contains(child)) facts.change = CellChange::Changed;
+  if (_facts.history) facts.course = recentCourse(*_facts.history, child);
+  cell.cellView().setFacts(std::move(facts));
 }
 
 void VarnelPaneController::tableView_didSelectRowAtIndexPath(TableView& table,

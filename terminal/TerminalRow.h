@@ -78,8 +78,10 @@ class TerminalRow final : public CellView {
   void setAccessory(CellAccessory accessory) override { _accessory = accessory; }
   void setText(std::string_view text) override;
   void setTextFont(const Font& font) override { _textFont = font; }
-  void setChange(CellChange change) override { _change = change; }
-  void setCourse(const std::vector<std::optional<double>>& course) override { _course = course; }
+  void setFacts(CellFacts facts) override {
+    _change = facts.change;
+    _course = std::move(facts.course);
+  }
 
   /// The first of its texts.
   std::wstring name() const;

@@ -19,7 +19,7 @@ RowWidget& AccessibleRow::row() const { return static_cast<RowWidget&>(*widget()
 
 QString AccessibleRow::text(QAccessible::Text kind) const {
   if (kind == QAccessible::Name) return row().description();
-  if (kind == QAccessible::Description && row().reachesPastItsEdge()) return row().description();
+  if (kind == QAccessible::Description) return row().details(tableOf(row()).explanationOf(row()));
   return QAccessibleWidget::text(kind);
 }
 

@@ -6,8 +6,8 @@
 
 namespace varnel {
 
-/// A row for screen readers: an item of a list, named "name: value", which can be pressed. When the row is
-/// too short for its text, the text is also its description.
+/// A row for screen readers: an item of a list, named "name: value", which can be pressed. Its description is
+/// what its tooltip shows.
 class AccessibleRow final : public QAccessibleWidget {
  public:
   explicit AccessibleRow(RowWidget& row);

@@ -131,9 +131,15 @@ bool RowWidget::reachesPastItsEdge() const {
          std::ranges::any_of(_containers, [](const auto& container) { return container->hasMoreThanFits(); });
 }
 
-void RowWidget::showTooltip(const QPoint& globalPosition) const {
-  if (!reachesPastItsEdge()) return QToolTip::hideText();
-  QToolTip::showText(globalPosition, plainTooltip(description()), parentWidget(), geometry());
+QString RowWidget::details(const QString& explanation) const {
+  if (!reachesPastItsEdge()) return explanation;
+  return explanation.isEmpty() ? description() : description() + QChar::LineFeed + explanation;
+}
+
+void RowWidget::showTooltip(const QPoint& globalPosition, const QString& explanation) const {
+  const QString text = details(explanation);
+  if (text.isEmpty()) return QToolTip::hideText();
+  QToolTip::showText(globalPosition, plainTooltip(text), parentWidget(), geometry());
 }
 
 double RowWidget::sidewaysRange() const { return scrolledPart().range(); }

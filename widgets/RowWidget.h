@@ -49,9 +49,11 @@ class RowWidget final : public QWidget, public CellView {
   /// True when a part of its text is not visible while the row is at its left end. That text has to be
   /// scrolled, or is cut.
   bool reachesPastItsEdge() const;
-  /// If the row is too short for a text, shows all of the text in a tooltip beside the mouse; else hides the
-  /// tooltip.
-  void showTooltip(const QPoint& globalPosition) const;
+  /// All of the row's text if the row is too short for it, and this explanation of the row below it; empty
+  /// if there is neither.
+  QString details(const QString& explanation) const;
+  /// Shows the details in a tooltip beside the mouse. Without any, hides the tooltip.
+  void showTooltip(const QPoint& globalPosition, const QString& explanation) const;
 
   /// How far the row can be scrolled sideways; 0 when everything fits.
   double sidewaysRange() const;

@@ -58,6 +58,18 @@ void TableWidget::setDelegate(TableViewDelegate* delegate) {
 
 void TableWidget::reloadData() { load(); }
 
+void TableWidget::showFactsAgain() {
+  if (!_delegate) return;
+  for (const auto& [row, cell] : _visible)
+    _delegate->tableView_showFactsInCell(*this, *cell, _rows.pathOf(row));
+}
+
+QString TableWidget::explanationOf(const RowWidget& row) {
+  return _delegate && row.row() < _rows.rows()
+             ? QString::fromStdString(_delegate->tableView_explanationOfRow(*this, _rows.pathOf(row.row())))
+             : QString();
+}
+
 void TableWidget::load() {
   _isLoaded = true;
   const auto formerNames = namesOfVisibleRows();
@@ -254,7 +266,7 @@ bool TableWidget::viewportEvent(QEvent* event) {
 void TableWidget::showTooltip(const QHelpEvent& event) {
   const auto row = rowAt(event.pos());
   if (const RowWidget* widget = row ? visibleRow(*row) : nullptr)
-    return widget->showTooltip(event.globalPos());
+    return widget->showTooltip(event.globalPos(), explanationOf(*widget));
   QToolTip::hideText();
 }
 

@@ -30,6 +30,7 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
 
   void setDelegate(TableViewDelegate* delegate) override;
   void reloadData() override;
+  void showFactsAgain() override;
   std::unique_ptr<TableCell> dequeueReusableCell(std::string_view reuseIdentifier) override;
   std::unique_ptr<CellView> makeCellView(CellStyle style) override;
   void selectRow(const IndexPath& path) override { moveTo(_rows.rowOf(path)); }
@@ -44,6 +45,8 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   /// The row from which the arrow keys go on; null when there is none on the screen.
   const RowWidget* currentRow() const { return _current ? visibleRow(*_current) : nullptr; }
   void chooseRow(std::size_t row);
+  /// What the delegate says about this row of `visibleRows`; empty for nothing.
+  QString explanationOf(const RowWidget& row);
 
   QSize sizeHint() const override;
 

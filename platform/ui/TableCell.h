@@ -29,6 +29,30 @@ enum class CellAccessory {
 /// Whether a row is as it was before the last refresh.
 enum class CellChange { None, Changed };
 
+/// How good the level is that a row shows, if it shows one.
+enum class CellLevel { None, Poor, Fair, Good, Excellent };
+
+/// What of a row is out of date.
+enum class CellDimming {
+  None,
+  Value,  ///< no packet has renewed the value for some time
+  All,    ///< nothing renews the display
+};
+
+/// What a host may show of a row beside its texts.
+struct CellFacts {
+  CellChange change = CellChange::None;
+  CellLevel level = CellLevel::None;
+  CellDimming dimming = CellDimming::None;
+  /// What is in the record to which the row leads: parts, the most important one first. Empty for other rows.
+  std::vector<std::string> summary;
+  /// The course of the row's value, the oldest first, one value per equal stretch of time; nothing where
+  /// there was none. Empty when the value is no number.
+  std::vector<std::optional<double>> course;
+
+  friend bool operator==(const CellFacts&, const CellFacts&) = default;
+};
+
 /// The visible part of a cell. A table makes it.
 class CellView {
  public:
@@ -48,11 +72,8 @@ class CellView {
   virtual void setText(std::string_view text) = 0;
   virtual void setTextFont(const Font& font) = 0;
 
-  /// What a host may show beside the texts; one that shows nothing of it need not keep it.
-  virtual void setChange(CellChange) {}
-  /// The course of the row's value, the oldest first, one value per equal stretch of time; nothing where
-  /// there was none. Empty when the value is no number.
-  virtual void setCourse(const std::vector<std::optional<double>>&) {}
+  /// What may be shown beside the texts. A host that shows nothing of it need not keep it.
+  virtual void setFacts(CellFacts) {}
 };
 
 /// A cell: its view, and what its maker keeps with it.

@@ -3,7 +3,7 @@
 #include <cstddef>
 #include <memory>
 #include <optional>
-#include <string_view>
+#include <string>
 
 #include "platform/ui/Animation.h"
 #include "platform/ui/TableCell.h"
@@ -32,6 +32,11 @@ class TableViewDelegate {
   /// visible.
   virtual std::unique_ptr<TableCell> tableView_cellForRowAtIndexPath(TableView& table,
                                                                      const IndexPath& path) = 0;
+  /// Gives this cell, which shows the row, the row's facts of this moment (`CellView::setFacts`). Called by
+  /// `showFactsAgain`.
+  virtual void tableView_showFactsInCell(TableView&, TableCell&, const IndexPath&) {}
+  /// What there is to say about a row beside its texts: whole sentences, in lines. Empty for nothing.
+  virtual std::string tableView_explanationOfRow(TableView&, const IndexPath&) { return {}; }
   /// The user has chosen a row, by a click or by the return key on it.
   virtual void tableView_didSelectRowAtIndexPath(TableView& table, const std::optional<IndexPath>& path) = 0;
 };
@@ -47,6 +52,9 @@ class TableView {
   /// While the number of rows stays the same, the visible cells go through a `CellPool`, in row order. When a
   /// reload changes which rows there are, the table hands out no cell from before.
   virtual void reloadData() = 0;
+  /// Asks the delegate for the facts of the visible rows again. Does nothing in a host that shows no facts
+  /// that can change between two reloads.
+  virtual void showFactsAgain() {}
   /// An unused cell with this identifier; null when there is none.
   virtual std::unique_ptr<TableCell> dequeueReusableCell(std::string_view reuseIdentifier) = 0;
   /// The view for a new cell of this table.

@@ -73,8 +73,7 @@ class RecordingCellView final : public CellView {
   void setAccessory(CellAccessory accessory) override { this->accessory = accessory; }
   void setText(std::string_view text) override { this->text = text; }
   void setTextFont(const Font& font) override { textFont = font; }
-  void setChange(CellChange change) override { this->change = change; }
-  void setCourse(const std::vector<std::optional<double>>& course) override { this->course = course; }
+  void setFacts(CellFacts facts) override { this->facts = std::move(facts); }
 
   const CellStyle style;
   std::vector<std::unique_ptr<RecordingLabel>> labels;
@@ -82,8 +81,7 @@ class RecordingCellView final : public CellView {
   CellAccessory accessory = CellAccessory::None;
   std::string text;
   Font textFont;
-  CellChange change = CellChange::None;
-  std::vector<std::optional<double>> course;
+  CellFacts facts;
   unsigned layouts = 0;
 
  private:
@@ -99,6 +97,9 @@ class RecordingTable final : public TableView {
   void reloadData() override {
     ++reloads;
     load();
+  }
+  void showFactsAgain() override {
+    for (const auto& [row, cell] : _visible) _delegate->tableView_showFactsInCell(*this, *cell, {0, row});
   }
   std::unique_ptr<TableCell> dequeueReusableCell(std::string_view reuseIdentifier) override {
     if (auto cell = _reloaded.take(reuseIdentifier)) return cell;
