@@ -34,6 +34,7 @@ class Search {
     for (const auto& child : *node.childNodes()) {
       _path.push_back(child->displayName());
       _smallNames.push_back(inSmallLetters(child->displayName()));
+      _smallValue = child->value() ? inSmallLetters(*child->value()) : std::string();
       if (matches()) _found.push_back({_path, child->value() ? *child->value() : std::string()});
       look(*child);
       _path.pop_back();
@@ -44,20 +45,23 @@ class Search {
 
  private:
   bool matches() const {
-    const auto isInName = [](const std::string& name, const std::string& word) {
-      return name.find(word) != std::string::npos;
+    const auto isIn = [](const std::string& text, const std::string& word) {
+      return text.find(word) != std::string::npos;
     };
-    const auto isInOwnName = [&](const std::string& word) { return isInName(_smallNames.back(), word); };
-    const auto isInAnyName = [&](const std::string& word) {
-      return std::ranges::any_of(_smallNames, [&](const std::string& name) { return isInName(name, word); });
+    const auto isOwn = [&](const std::string& word) {
+      return isIn(_smallNames.back(), word) || isIn(_smallValue, word);
     };
-    return _words.empty() ||
-           (std::ranges::any_of(_words, isInOwnName) && std::ranges::all_of(_words, isInAnyName));
+    const auto isAnywhere = [&](const std::string& word) {
+      return isOwn(word) ||
+             std::ranges::any_of(_smallNames, [&](const std::string& name) { return isIn(name, word); });
+    };
+    return _words.empty() || (std::ranges::any_of(_words, isOwn) && std::ranges::all_of(_words, isAnywhere));
   }
 
   const std::vector<std::string> _words;
   NamePath _path;
   std::vector<std::string> _smallNames;
+  std::string _smallValue;  // of the last name
   std::vector<FoundNode> _found;
 };
 

@@ -18,9 +18,9 @@ struct FoundNode {
   std::string value{};  ///< empty for an inner node
 };
 
-/// The nodes below the root with all of these words in their names, in the order of the tree. A word may
-/// stand in the name of the node or of one above it, in any case of the letters A to Z; at least one must
-/// stand in the name of the node itself. Without words, every node.
+/// The nodes below the root with all of these words, in the order of the tree. A word may stand in the name
+/// or the value of the node, or in the name of one above it, in any case of the letters A to Z; at least one
+/// must stand in the name or the value of the node itself. Without words, every node.
 std::vector<FoundNode> findNodes(const VarnelModelNode& root, std::string_view words);
 
 /// The node at the end of these names; null when there is none.

@@ -54,7 +54,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   /// Calls the task once, after this many refreshes were shown.
   void afterUpdates(unsigned count, std::function<void()> task);
 
-  /// The nodes of the display with these words in their names (`findNodes`); none while there is no display.
+  /// The nodes of the display with these words in names and values (`findNodes`); none while there is no display.
   std::vector<FoundNode> find(std::string_view words) const;
   /// The node at the end of these names; null when there is none.
   const VarnelModelNode* nodeAt(const NamePath& path) const;

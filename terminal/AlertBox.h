@@ -14,6 +14,7 @@ class AlertBox final : public Overlay {
 
   Wish take(const Key& key) override;
   void paint(CellGrid& grid, const Glyphs& glyphs) override;
+  Kind kind() const override { return Kind::Box; }
 
  private:
   const Alert _alert;

@@ -71,6 +71,12 @@ void CellGrid::setLook(const Area& wanted, const Look& look) {
   }
 }
 
+void CellGrid::copyRow(int row, const CellGrid& other, int otherRow) {
+  for (int column = 0; column < _columns; ++column)
+    _cells[index(column, row)] = other._cells[other.index(column, otherRow)];
+  if (other._cursorRow == otherRow) setCursor(other._cursorColumn, row);
+}
+
 void CellGrid::setCursor(int column, int row) {
   _cursorColumn = std::clamp(column, 0, _columns - 1);
   _cursorRow = std::clamp(row, 0, _rows - 1);

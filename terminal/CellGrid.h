@@ -66,8 +66,11 @@ class CellGrid {
   void fill(const Area& area, const Look& look = {});
   /// Changes the look of what stands in the area.
   void setLook(const Area& area, const Look& look);
+  /// Copies a row of another grid of the same width, and the cursor if it is there.
+  void copyRow(int row, const CellGrid& other, int otherRow);
   /// Where the user's typing goes; no cursor is shown unless this is called.
   void setCursor(int column, int row);
+  void hideCursor() { _cursorColumn = _cursorRow = -1; }
   bool hasCursor() const { return _cursorRow >= 0; }
   int cursorColumn() const { return _cursorColumn; }
   int cursorRow() const { return _cursorRow; }

@@ -163,6 +163,7 @@ CursesScreen::CursesScreen() : _hasUnicode(takesUtf8()) {
   checkTerminal();
   useUtf8Characters();
   ::tcgetattr(STDIN_FILENO, &_formerMode);
+  const TerminalOutput::Writing writing(_output);
   if (!std::getenv("ESCDELAY")) ::set_escdelay(escapeDelay);
   {
     const SignalsFromNcurses kept;
@@ -212,8 +213,13 @@ void CursesScreen::leave() {
   ::sigemptyset(&stop);
   ::sigaddset(&stop, SIGTTOU);
   ::pthread_sigmask(SIG_BLOCK, &stop, &former);
-  ::curs_set(1);
-  ::endwin();
+  {
+    const TerminalOutput::Writing writing(_output);
+    if (_isEnding) _output.makeRoomToEnd();
+    ::curs_set(1);
+    ::endwin();
+  }
+  if (_isEnding) _output.dropTheRest();
   // What the mouse has sent meanwhile must not reach the shell.
   ::tcflush(STDIN_FILENO, TCIFLUSH);
   ::tcsetattr(STDIN_FILENO, TCSANOW, &_formerMode);
@@ -227,6 +233,7 @@ void CursesScreen::enter() {
   ::def_shell_mode();
   TerminalRescue::arm(_formerMode, waysToLeave());
   _isLeft = false;
+  const TerminalOutput::Writing writing(_output);
   ::reset_prog_mode();
   // This takes the screen again, with the keys, the cursor, and the mouse as they were.
   ::refresh();
@@ -252,7 +259,8 @@ int CursesScreen::columns() const { return getmaxx(::stdscr); }
 int CursesScreen::rows() const { return getmaxy(::stdscr); }
 
 void CursesScreen::show(const CellGrid& grid) {
-  if (_isLeft) return;
+  if (_isLeft || _isEnding) return;
+  const TerminalOutput::Writing writing(_output);
   for (int row = 0; row < std::min(grid.rows(), rows()); ++row) {
     for (int column = 0; column < std::min(grid.columns(), columns()); ++column) {
       const GridCell& cell = grid.at(column, row);
@@ -278,6 +286,7 @@ void CursesScreen::redraw() { ::clearok(stdscr, TRUE); }
 
 std::optional<Key> CursesScreen::nextKey() {
   if (_isLeft) return std::nullopt;
+  const TerminalOutput::Writing writing(_output);  // this can draw too
   for (;;) {
     wint_t typed = 0;
     const int kind = ::get_wch(&typed);

@@ -8,6 +8,7 @@
 #include "terminal/CellGrid.h"
 #include "terminal/Glyphs.h"
 #include "terminal/Key.h"
+#include "terminal/TerminalOutput.h"
 
 struct screen;
 
@@ -15,6 +16,9 @@ namespace varnel {
 
 /// The terminal of the program, on ncurses. It is in use from construction to destruction, and is left as it
 /// was found. There can be only one.
+///
+/// While a terminal stands still, a signal that ends the program drops what was to be written
+/// (`TerminalOutput`).
 class CursesScreen final {
  public:
   /// Throws std::runtime_error with a sentence for the user when standard input or output is no terminal, or
@@ -30,6 +34,10 @@ class CursesScreen final {
   void enter();
   /// The program was stopped without a chance to leave the terminal, and goes on.
   void takeAgain();
+
+  /// The program is about to end, and shows nothing any more. So the terminal is left even if it takes no
+  /// more output.
+  void prepareToEnd() { _isEnding = true; }
 
   /// Adapts to the present size of the terminal.
   void updateSize();
@@ -53,9 +61,11 @@ class CursesScreen final {
   std::string waysToLeave() const;
 
   termios _formerMode{};
+  const TerminalOutput _output;
   bool _hasUnicode;
   bool _hasColors = false;
   bool _isLeft = false;
+  bool _isEnding = false;
   ::screen* _screen = nullptr;
 };
 

@@ -15,8 +15,8 @@ struct FoundRow {
   std::string value{};              ///< empty for a row that leads to another pane
 };
 
-/// Finds a row by the names of the row and of the panes above it. The rows appear while the user types.
-/// Return goes to the chosen one, Escape leaves.
+/// Finds a row by its name and value, and the names of the panes above it. The rows appear while the user
+/// types. Return goes to the chosen one, Escape leaves.
 class FindPage final : public Overlay {
  public:
   using Search = std::function<std::vector<FoundRow>(const std::string& words)>;

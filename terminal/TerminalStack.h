@@ -50,6 +50,8 @@ class TerminalStack final : public NavigationStack {
   /// True when a modal screen hides the panes.
   bool isCovered() const { return _modal != nullptr; }
   bool isPresenting() const { return _modal != nullptr; }
+  /// The notice stands in so many rows below the title.
+  int rowsOfNotice() const { return static_cast<int>(_noticeLines.size()); }
   /// True while a wheel turns, which `step` counts.
   bool isWheelTurning() const { return !_modal && topPane().toolbar().isWheelTurning; }
   /// `windowTitle` is the name of the window.
@@ -62,7 +64,6 @@ class TerminalStack final : public NavigationStack {
   void layOut();
   bool showsTwoPanes() const { return _controllers.size() > 1 && _area.columns >= columnsOfTwoPanes; }
   TerminalPane& paneBelow() const;
-  int rowsOfNotice() const { return static_cast<int>(_noticeLines.size()); }
   void goBack();
   KeyUse takeMouse(const Key& key);
   KeyUse takeAsOwn(const Key& key);

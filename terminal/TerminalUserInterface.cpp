@@ -20,7 +20,7 @@ constexpr std::string_view keysOfHelp =
     "Enter Space Right l         open the row\n"
     "Escape Left Backspace h     go back\n"
     "< > Shift+Left Shift+Right  scroll a long value\n"
-    "/                           find a row in the whole display\n"
+    "/                           find a row in the whole display by name or value\n"
     "s Ctrl+S                    save a snapshot, on devices that allow it\n"
     "R Ctrl+R                    start over with an empty display\n"
     "T                           the course of the row's value over time\n"
@@ -99,7 +99,8 @@ void TerminalUserInterface::take(const Key& key) {
   if (key.kind == Key::Kind::Help && !_help) return showHelp();
   if (!_overlays.empty()) {
     Overlay* const top = _overlays.back().get();
-    if (top->take(key) == Overlay::Wish::Close) {
+    const auto own = keyFor(*top, key);
+    if (own && top->take(*own) == Overlay::Wish::Close) {
       std::erase_if(_overlays, [top](const auto& overlay) { return overlay.get() == top; });
       if (top == _help) _help = nullptr;
     }
@@ -179,8 +180,28 @@ void TerminalUserInterface::turnWheel() {
 CellGrid TerminalUserInterface::picture() {
   CellGrid grid(_area.columns, _area.rows);
   if (const TerminalStack* const root = stack()) root->paint(grid, _glyphs, _window->title(), _wheelStep);
-  for (const auto& overlay : _overlays) overlay->paint(grid, _glyphs);
+  for (const auto& overlay : _overlays) paint(*overlay, grid);
   return grid;
+}
+
+// The stack has painted the notice below its title. There it stays, and the rest of a page goes on below it.
+void TerminalUserInterface::paint(Overlay& overlay, CellGrid& grid) const {
+  if (overlay.kind() == Overlay::Kind::Box) return overlay.paint(grid, _glyphs);
+  const int notice = rowsOfNotice();
+  CellGrid page(grid.columns(), grid.rows() - notice);
+  overlay.paint(page, _glyphs);
+  grid.hideCursor();
+  for (int row = 0; row < page.rows(); ++row) grid.copyRow(row == 0 ? 0 : row + notice, page, row);
+}
+
+// With the row in the overlay's own grid; nothing for a click on the notice.
+std::optional<Key> TerminalUserInterface::keyFor(const Overlay& overlay, const Key& key) const {
+  if (key.kind != Key::Kind::Click || overlay.kind() == Overlay::Kind::Box || key.row == 0) return key;
+  const int notice = rowsOfNotice();
+  if (key.row <= notice) return std::nullopt;
+  Key own = key;
+  own.row -= notice;
+  return own;
 }
 
 }  // namespace varnel

@@ -2,6 +2,7 @@
 
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -70,6 +71,9 @@ class TerminalUserInterface final : public UserInterface {
  private:
   KeyUse takeAsOwn(const Key& key);
   void open(std::unique_ptr<Overlay> overlay);
+  void paint(Overlay& overlay, CellGrid& grid) const;
+  std::optional<Key> keyFor(const Overlay& overlay, const Key& key) const;
+  int rowsOfNotice() const { return stack() ? stack()->rowsOfNotice() : 0; }
   void showHelp();
   void showCourse();
   std::vector<std::string> pathOfFocus() const;

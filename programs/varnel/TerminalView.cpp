@@ -160,6 +160,7 @@ class TerminalViewer final {
         return adaptSize();
       default:
         _isEnding = true;
+        _screen->prepareToEnd();
         _host.end(0);
     }
   }

@@ -48,6 +48,13 @@ TEST_F(TreeSearchTest, OneWordStandsInTheNameOfTheRowItself) {
   EXPECT_THAT(found("cell"), ElementsAre("/Serving Cell", "/Neighbors/0/Cell ID=16"));
 }
 
+TEST_F(TreeSearchTest, AWordMayStandInTheValue) {
+  EXPECT_THAT(found("-101"), ElementsAre("/Neighbors/0/RSRP=-101 dBm"));
+  EXPECT_THAT(found("DBM"), ElementsAre("/Serving Cell/RSRP=-90 dBm", "/Neighbors/0/RSRP=-101 dBm"));
+  EXPECT_THAT(found("serving dbm"), ElementsAre("/Serving Cell/RSRP=-90 dBm"));
+  EXPECT_THAT(found("rsrp 16"), IsEmpty()) << "another row has this value";
+}
+
 TEST_F(TreeSearchTest, WithoutWordsFindsAll) {
   EXPECT_THAT(found(" "),
               ElementsAre("/Serving Cell", "/Serving Cell/RSRP=-90 dBm", "/Neighbors", "/Neighbors/0",

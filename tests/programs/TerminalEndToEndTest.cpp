@@ -1,10 +1,13 @@
 #include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/ioctl.h>
 #include <sys/stat.h>
+#include <termios.h>
 
 #include <algorithm>
 #include <filesystem>
+#include <optional>
 #include <regex>
 
 #include "host/FileDescriptor.h"
@@ -178,6 +181,77 @@ TEST_F(TerminalEndToEnd, CtrlCAndSignalsLeaveTheTerminalAsItWas) {
       signal(terminal, number);
     }
     expectLeft(terminal, "0");
+  }
+}
+
+// A terminal that shows nothing, and whose other end the test reads, or not.
+class BareTerminal {
+ public:
+  explicit BareTerminal(const std::string& shellLine) {
+    _other = FileDescriptor(::posix_openpt(O_RDWR | O_NOCTTY | O_CLOEXEC));
+    if (::grantpt(_other.number()) != 0 || ::unlockpt(_other.number()) != 0) ADD_FAILURE() << "no terminal";
+    const std::string name = ::ptsname(_other.number());
+    _own = FileDescriptor(::open(name.c_str(), O_RDWR | O_NOCTTY | O_CLOEXEC));
+    const winsize size{24, 80, 0, 0};
+    ::ioctl(_own.number(), TIOCSWINSZ, &size);
+    ::tcgetattr(_own.number(), &_mode);
+    const std::string whole =
+        "exec setsid -c sh -c 'exec " + shellLine + "' <" + name + " >" + name + " 2>" + name;
+    _program.emplace("/bin/sh", std::vector<std::string>{"-c", whole},
+                     std::vector<std::string>{"TERM=xterm-256color", "LC_ALL=C.UTF-8", "NO_COLOR"});
+    ::fcntl(_other.number(), F_SETFL, O_NONBLOCK);
+  }
+  Process& program() { return *_program; }
+  void type(std::string_view keys) const {
+    EXPECT_EQ(::write(_other.number(), keys.data(), keys.size()), static_cast<ssize_t>(keys.size()));
+  }
+  // All that was written since the last call and can be had now.
+  std::string read() const {
+    std::string text;
+    char piece[4096];
+    for (ssize_t count = 0; (count = ::read(_other.number(), piece, sizeof piece)) > 0;)
+      text.append(piece, static_cast<std::size_t>(count));
+    return text;
+  }
+  // How many keys the program has not read.
+  int unreadKeys() const {
+    int count = 0;
+    ::ioctl(_own.number(), FIONREAD, &count);
+    return count;
+  }
+  bool hasItsModeBack() const {
+    termios now{};
+    ::tcgetattr(_own.number(), &now);
+    return now.c_lflag == _mode.c_lflag && now.c_iflag == _mode.c_iflag && now.c_oflag == _mode.c_oflag;
+  }
+
+ private:
+  FileDescriptor _other;
+  FileDescriptor _own;
+  termios _mode{};
+  std::optional<Process> _program;
+};
+
+TEST_F(TerminalEndToEnd, SignalsEndTheProgramWhileNobodyReadsTheTerminal) {
+  const auto telephony = server();
+  for (const int number : {SIGTERM, SIGHUP, SIGINT}) {
+    BareTerminal terminal("\"" VARNEL_PROGRAM "\" --ui terminal --runtime-dir " + _runtime.path().string() +
+                          " --device-root " + _device.path().string());
+    std::string shown;
+    ASSERT_TRUE(eventually([&] {
+      return (shown += terminal.read()).find("Updated 20") != std::string::npos;
+    })) << shown;
+    // From now on the test reads nothing, and makes the program draw until it waits for the terminal.
+    ASSERT_TRUE(eventually([&] {
+      terminal.type("\x0C");
+      if (terminal.unreadKeys() == 0) return false;
+      return !eventually([&] { return terminal.unreadKeys() == 0; }, std::chrono::seconds(1));
+    }));
+    terminal.program().signal(number);
+    ASSERT_TRUE(terminal.program().waitForEnd(std::chrono::seconds(60))) << number;
+    EXPECT_EQ(terminal.program().exitStatus(), 0);
+    EXPECT_TRUE(terminal.hasItsModeBack());
+    EXPECT_THAT(terminal.read(), HasSubstr("\x1b[?1049l")) << "the end is there for a reader who comes back";
   }
 }
 

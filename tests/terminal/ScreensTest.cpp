@@ -220,6 +220,34 @@ TEST_F(TerminalScreens, ALongNoticeLeavesHalfOfTheScreenToTheRows) {
   EXPECT_EQ(line(4), " PDP Context Info                      ›");
 }
 
+TEST_F(TerminalScreens, TheNoticeStaysAboveEveryPage) {
+  launch();
+  link.report.serverNote = "The replay has ended";
+  queue.advance(2s);
+  type(L"/apn");
+  EXPECT_EQ(line(0), "Find: [apn                             ]");
+  EXPECT_EQ(line(1), "The replay has ended");
+  EXPECT_EQ(line(2), " PDP Context Info › 0 › APN    internet");
+  EXPECT_TRUE(picture.hasCursor());
+  press({Key::Kind::Click, 0, 3, 1});
+  EXPECT_EQ(line(1), "The replay has ended") << "a click on the notice does nothing";
+  EXPECT_EQ(line(0), "Find: [apn                             ]");
+  press({Key::Kind::Click, 0, 3, 3});
+  EXPECT_EQ(line(0), " PDP Context Info › 1") << "the row under the pointer";
+  press(Key::Kind::Down);
+  type(L"T");
+  EXPECT_EQ(line(0), " State in dB");
+  EXPECT_EQ(line(1), "The replay has ended");
+  EXPECT_EQ(line(2), " over 5");
+  type(L"q?");
+  EXPECT_EQ(line(0), " Help");
+  EXPECT_EQ(line(1), "The replay has ended");
+  EXPECT_EQ(line(2), "About State");
+  link.report.serverNote.clear();
+  queue.advance(2s);
+  EXPECT_EQ(line(1), "About State") << "the notice is over";
+}
+
 TEST_F(TerminalScreens, FromAWidthOf120OnTwoPanesStandSideBySide) {
   launch();
   userInterface.resize(120, 8);
