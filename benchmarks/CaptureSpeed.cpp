@@ -24,7 +24,7 @@
 #include "host/captures/PcapEncoders.h"
 #include "host/captures/StreamEncoders.h"
 #include "platform/TelephonyService.h"
-#include "programs/varnel-decode/OfflineDecoder.h"
+#include "programs/shared/OfflineDecoder.h"
 #include "programs/varnel-decode/database/CaptureDatabase.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 

@@ -1,6 +1,6 @@
 #include "programs/varnel-decode/CaptureReport.h"
 
-#include "programs/varnel-decode/Timestamps.h"
+#include "programs/shared/Timestamps.h"
 #include "programs/varnel-decode/TreeWriters.h"
 
 namespace varnel {

@@ -5,9 +5,9 @@
 #include <utility>
 
 #include "host/Printable.h"
-#include "programs/varnel-decode/CsvField.h"
+#include "programs/shared/CsvField.h"
+#include "programs/shared/Timestamps.h"
 #include "programs/varnel-decode/StandardOutput.h"
-#include "programs/varnel-decode/Timestamps.h"
 #include "programs/varnel-decode/TreeWriters.h"
 
 namespace varnel {

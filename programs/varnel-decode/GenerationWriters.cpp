@@ -3,10 +3,10 @@
 #include <algorithm>
 
 #include "model/VarnelModelNode.h"
-#include "programs/varnel-decode/CsvField.h"
+#include "programs/shared/CsvField.h"
+#include "programs/shared/Timestamps.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/StandardOutput.h"
-#include "programs/varnel-decode/Timestamps.h"
 #include "programs/varnel-decode/TreeWriters.h"
 
 namespace varnel {

@@ -7,8 +7,8 @@
 #include <vector>
 
 #include "LogGenerator/NumberFormats.h"
+#include "programs/shared/Generation.h"
 #include "programs/varnel-decode/DisplayJson.h"
-#include "programs/varnel-decode/Generation.h"
 #include "programs/varnel-decode/NearestPaths.h"
 #include "programs/varnel-decode/TechnologyGuess.h"
 

@@ -21,12 +21,13 @@
 #include "host/captures/Capture.h"
 #include "model/events/DisplayEvents.h"
 #include "platform/TelephonyService.h"
+#include "programs/shared/OfflineDecoder.h"
+#include "programs/shared/Timestamps.h"
 #include "programs/varnel-decode/ElapsedTime.h"
 #include "programs/varnel-decode/EventWriter.h"
 #include "programs/varnel-decode/FileOutput.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/MessageStatistics.h"
-#include "programs/varnel-decode/OfflineDecoder.h"
 #include "programs/varnel-decode/Picture.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/ProgressBar.h"
@@ -36,7 +37,6 @@
 #include "programs/varnel-decode/Subscriptions.h"
 #include "programs/varnel-decode/TechnologyFormats.h"
 #include "programs/varnel-decode/TechnologyGuess.h"
-#include "programs/varnel-decode/Timestamps.h"
 
 namespace varnel {
 

@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "LogGenerator/Services.h"
-#include "programs/varnel-decode/CaptureClock.h"
+#include "programs/shared/CaptureClock.h"
 #include "programs/varnel-decode/MessageStatistics.h"
 #include "programs/varnel-decode/Options.h"
 #include "programs/varnel-decode/TemplateWatch.h"

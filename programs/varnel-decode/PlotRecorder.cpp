@@ -1,27 +1,22 @@
 #include "programs/varnel-decode/PlotRecorder.h"
 
-#include <dlfcn.h>
-
 #include <algorithm>
 #include <charconv>
 #include <chrono>
 #include <clocale>
 #include <cmath>
-#include <filesystem>
-#include <stdexcept>
 #include <utility>
 
 #include "base/ClockStep.h"
 #include "host/Printable.h"
 #include "model/VarnelModelNode.h"
+#include "programs/shared/Modules.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/plot/ChartModule.h"
 
 namespace varnel {
 
 namespace {
-
-namespace fs = std::filesystem;
 
 // The years 1 to 9999. An axis can show no other years.
 constexpr double earliest = -62135596800, latest = 253402300799;
@@ -91,13 +86,6 @@ Time timeAt(double seconds) {
 bool isClockSetBetween(double earlier, double later) {
   const ClockStep step = clockStep(timeAt(earlier), timeAt(later));
   return step == ClockStep::Back || step == ClockStep::Ahead;
-}
-
-// Beside the program in the build tree, else where it was installed.
-fs::path modulePath() {
-  const fs::path folder = fs::read_symlink("/proc/self/exe").parent_path();
-  const fs::path beside = folder / "varnel-decode-plot.so";
-  return fs::exists(beside) ? beside : folder.parent_path() / "lib/varnel/modules/varnel-decode-plot.so";
 }
 
 }  // namespace
@@ -246,18 +234,13 @@ Plot PlotRecorder::plot(const std::string& title) const {
 }
 
 std::string drawPlot(const Plot& plot) {
-  const fs::path path = modulePath();
-  void* const module = ::dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
-  if (!module)
-    throw std::runtime_error(std::string("cannot load what draws pictures: ") + ::dlerror() +
-                             "; build or install it with the program");
-  const auto draw = reinterpret_cast<decltype(&varnelDrawPlot)>(::dlsym(module, "varnelDrawPlot"));
-  if (!draw) throw std::runtime_error(path.string() + " is none of this program's modules");
+  const auto draw = reinterpret_cast<decltype(&varnelDrawPlot)>(
+      moduleFunction("varnel-decode-plot.so", "varnelDrawPlot", "draws pictures"));
   std::string svg;
   draw(plot, svg);
   // The toolkit sets the user's locale; property lists need "C".
   std::setlocale(LC_NUMERIC, "C");
-  return svg;  // the module stays loaded: its libraries cannot be unloaded
+  return svg;
 }
 
 }  // namespace varnel

@@ -7,7 +7,7 @@
 #include <string_view>
 #include <vector>
 
-#include "programs/varnel-decode/Generation.h"
+#include "programs/shared/Generation.h"
 #include "programs/varnel-decode/plot/Plot.h"
 
 namespace varnel {

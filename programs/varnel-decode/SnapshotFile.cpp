@@ -7,7 +7,7 @@
 
 #include "base/Dictionary.h"
 #include "base/PropertyList.h"
-#include "programs/varnel-decode/Timestamps.h"
+#include "programs/shared/Timestamps.h"
 
 namespace varnel {
 

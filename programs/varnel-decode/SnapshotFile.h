@@ -6,7 +6,7 @@
 #include "base/Bytes.h"
 #include "base/Value.h"
 #include "host/captures/ByteWindow.h"
-#include "programs/varnel-decode/Generation.h"
+#include "programs/shared/Generation.h"
 
 namespace varnel {
 

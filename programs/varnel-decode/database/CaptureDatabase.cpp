@@ -8,7 +8,7 @@
 #include <numeric>
 #include <stdexcept>
 
-#include "programs/varnel-decode/Timestamps.h"
+#include "programs/shared/Timestamps.h"
 
 namespace varnel {
 

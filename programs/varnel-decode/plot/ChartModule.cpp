@@ -23,8 +23,8 @@
 #include <span>
 #include <vector>
 
+#include "programs/shared/TimeTicks.h"
 #include "programs/varnel-decode/plot/Legend.h"
-#include "programs/varnel-decode/plot/TimeTicks.h"
 
 namespace varnel {
 
@@ -124,7 +124,9 @@ class ChartMaker {
     axis->setLabelsPosition(QCategoryAxis::AxisLabelsPositionOnValue);
     axis->setRange(range.lowest, range.highest);
     axis->setStartValue(range.lowest);
-    for (const TimeTick& tick : timeTicks(range.lowest, range.highest, plot.times))
+    const TickLabels labels =
+        plot.times == PlotTimes::SinceEpoch ? TickLabels::TimeOfDay : TickLabels::Seconds;
+    for (const TimeTick& tick : timeTicks(range.lowest, range.highest, labels))
       axis->append(tick.label, tick.milliseconds);
     const QString times =
         plot.times == PlotTimes::SinceEpoch ? days(range) : QStringLiteral("seconds since the first record");

@@ -1,4 +1,4 @@
-#include "programs/varnel-decode/plot/TimeTicks.h"
+#include "programs/shared/TimeTicks.h"
 
 #include <QDateTime>
 #include <cmath>
@@ -7,7 +7,6 @@ namespace varnel {
 
 namespace {
 
-constexpr double mostTicks = 8;
 constexpr double second = 1000, minute = 60 * second, hour = 60 * minute, day = 24 * hour;
 
 // The steps of hours and days divide a day evenly.
@@ -18,11 +17,11 @@ constexpr double steps[] = {
     5 * day,      10 * day,     20 * day,     50 * day,   100 * day,  200 * day,   500 * day,
 };
 
-double stepFor(double length) {
+double stepFor(double length, int most) {
   for (const double step : steps)
-    if (length / step < mostTicks) return step;
+    if (length / step < most) return step;
   double step = 1000 * day;
-  while (length / step >= mostTicks) step *= 10;
+  while (length / step >= most) step *= 10;
   return step;
 }
 
@@ -40,14 +39,15 @@ QDateTime utc(double milliseconds) {
 
 }  // namespace
 
-std::vector<TimeTick> timeTicks(double first, double last, PlotTimes times) {
-  const double step = stepFor(last - first);
-  const QString format = formatFor(step, utc(first).date() == utc(last).date());
+std::vector<TimeTick> timeTicks(double first, double last, TickLabels labels, double offset, int most) {
+  const double step = stepFor(last - first, most);
+  const QString format = formatFor(step, utc(first + offset).date() == utc(last + offset).date());
   std::vector<TimeTick> ticks;
-  for (double number = std::ceil(first / step); number * step <= last; ++number) {
+  for (double number = std::ceil((first + offset) / step); number * step <= last + offset; ++number) {
     const double moment = number * step;
-    const bool hasDate = times == PlotTimes::SinceEpoch;
-    ticks.push_back({moment, hasDate ? utc(moment).toString(format) : QString::number(moment / second)});
+    const bool isTimeOfDay = labels == TickLabels::TimeOfDay;
+    ticks.push_back(
+        {moment - offset, isTimeOfDay ? utc(moment).toString(format) : QString::number(moment / second)});
   }
   return ticks;
 }

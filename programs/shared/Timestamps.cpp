@@ -1,4 +1,4 @@
-#include "programs/varnel-decode/Timestamps.h"
+#include "programs/shared/Timestamps.h"
 
 #include <charconv>
 #include <chrono>

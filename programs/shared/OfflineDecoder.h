@@ -9,8 +9,8 @@
 #include "base/Dictionary.h"
 #include "base/Time.h"
 #include "base/Value.h"
-#include "programs/varnel-decode/CaptureClock.h"
-#include "programs/varnel-decode/Generation.h"
+#include "programs/shared/CaptureClock.h"
+#include "programs/shared/Generation.h"
 
 namespace varnel {
 

@@ -1,4 +1,4 @@
-#include "programs/varnel-decode/OfflineDecoder.h"
+#include "programs/shared/OfflineDecoder.h"
 
 #include <algorithm>
 #include <limits>

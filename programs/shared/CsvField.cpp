@@ -1,4 +1,4 @@
-#include "programs/varnel-decode/CsvField.h"
+#include "programs/shared/CsvField.h"
 
 #include "host/Printable.h"
 
