@@ -24,7 +24,7 @@ std::function<void(QWidget& window)> deed;
 void awaitWindow() {
   QTimer::singleShot(10ms, [] {
     for (QWidget* const window : QApplication::topLevelWidgets()) {
-      if (window->isVisible()) return deed(*window);
+      if (window->isActiveWindow()) return deed(*window);
     }
     awaitWindow();
   });
