@@ -70,6 +70,7 @@ std::string asSentence(std::string_view text) {
 LinkReport LinkMonitor::linkReport() const {
   LinkReport report = _report;
   report.place = _folder.string();
+  if (!report.trouble.empty() && !_endOfOwnServer.empty()) report.trouble = _endOfOwnServer;
   report.mixture = mixture();
   return report;
 }

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <string>
+#include <utility>
 
 #include "base/Bytes.h"
 #include "platform/LinkReports.h"
@@ -20,6 +21,9 @@ class LinkMonitor final : public LinkReports {
   /// The viewer looks into this folder from now on. What keeps it from looking into another one is one
   /// sentence, or empty.
   void looksInto(std::filesystem::path runtimeFolder, std::string obstacle);
+  /// The server that this process had started has ended. The sentence is told in place of why no server can
+  /// be reached; an empty one ends that.
+  void setEndOfOwnServer(std::string sentence) { _endOfOwnServer = std::move(sentence); }
   /// Another process has a port with the name of this viewer's port.
   void portNameIsTaken();
   /// A port or a connection could not be made. The reason is one sentence.
@@ -44,6 +48,7 @@ class LinkMonitor final : public LinkReports {
 
   std::filesystem::path _folder;
   std::string _obstacle;
+  std::string _endOfOwnServer;  // empty while it serves, and when there is none
   LinkReport _report;
   std::bitset<256> _shownSubscriptions;
 };

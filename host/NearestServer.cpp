@@ -40,8 +40,18 @@ void NearestServer::use(const RuntimeFolder& folder, std::string obstacle) {
   _link.emplace(folder, _replyTimeout, _monitor);
 }
 
+void NearestServer::moveTo(RuntimeFolder own, std::optional<std::filesystem::path> system) {
+  _own = std::move(own);
+  _system = std::move(system);
+  _hasMoved = true;
+}
+
 void NearestServer::look() {
-  if (!_system) return;
+  const bool hasMoved = std::exchange(_hasMoved, false);
+  if (!_system) {
+    if (hasMoved) use(_own, {});
+    return;
+  }
   if (hasServer(_own)) return use(_own, {});
   const auto shared = sharedFolder(*_system);
   if (shared && hasServer(*shared)) return use(*shared, {});

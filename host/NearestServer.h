@@ -19,6 +19,9 @@ class NearestServer final : public MessagePorts, public TelephonyService {
   NearestServer(RuntimeFolder own, std::optional<std::filesystem::path> system, LinkMonitor& monitor,
                 std::chrono::milliseconds replyTimeout = std::chrono::seconds(1));
 
+  /// Looks into these folders instead, from the next local port on.
+  void moveTo(RuntimeFolder own, std::optional<std::filesystem::path> system);
+
   LocalPortCreation createLocalPort(std::string_view name, LocalPort::MessageHandler handler) override;
   std::unique_ptr<RemotePort> createRemotePort(std::string_view name) override;
   std::unique_ptr<TelephonyConnection> connect(std::function<void()> notificationHandler) override;
@@ -36,8 +39,9 @@ class NearestServer final : public MessagePorts, public TelephonyService {
   void look();
   void use(const RuntimeFolder& folder, std::string obstacle);
 
-  const RuntimeFolder _own;
-  const std::optional<std::filesystem::path> _system;
+  RuntimeFolder _own;
+  std::optional<std::filesystem::path> _system;
+  bool _hasMoved = false;  // since the last look
   LinkMonitor& _monitor;
   const std::chrono::milliseconds _replyTimeout;
   std::optional<Link> _link;  // always there after the construction

@@ -26,13 +26,19 @@ class HostServices final {
 
   /// Lines of generators for standard output go to this stream, which must outlive the models.
   ModelServices model(std::ostream& standardOutput = std::cout);
+  /// Models connect to the server of this folder alone, from their next attempt on.
+  void connectTo(const RuntimeFolder& server);
+  /// Models connect to the server that the options name, from their next attempt on.
+  void connectToUsualServer();
+  LinkMonitor& link() { return _link; }
   MainQueue& queue() { return _queue; }
   DeviceFiles& files() { return _files; }
   Preferences& preferences() { return _preferences; }
 
  private:
   HostLog _log;
-  RuntimeFolder _folder;
+  const RuntimeFolder _folder;
+  const std::optional<std::filesystem::path> _systemsFolder;  // absent when the user names a folder
   LinkMonitor _link;
   NearestServer _server;
   SubscriptionPorts _portsOfSubscription;  // of all subscriptions unless the user asked for one

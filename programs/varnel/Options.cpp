@@ -1,11 +1,25 @@
 #include "programs/varnel/Options.h"
 
 #include <limits>
+#include <vector>
+
+#include "LogGenerator/LogGenerator.h"
 
 namespace varnel {
 
+namespace {
+
+// What is wrong with the name; empty when nothing is.
+std::string faultOfFile(const std::string& name) {
+  if (name.empty()) return "FILE needs the name of a file";
+  return name == "-" ? "a pipe is shown by varnel-telephonyd --replay - and a viewer beside it" : "";
+}
+
+}  // namespace
+
 void declare(CLI::App& parser, Options& options, const ApplicationInfo& application) {
-  parser.description("Shows what the cellular modem behind the telephony server sees.");
+  parser.description(
+      "Shows what a cellular modem sees: that behind the telephony server, or that of a file.");
   parser.footer(
       "SIGUSR1 starts over with an empty display. SIGUSR2 saves a snapshot into\n"
       "var/mobile/Library/Logs/CrashReporter under the device root, if the device allows it.\n"
@@ -20,6 +34,22 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
       "screen layout, if not the installed one.");
   parser.set_version_flag("--version",
                           programName + std::string(" ") + application.version.value_or("(none)"));
+  auto* const file =
+      parser
+          .add_option(
+              "FILE", options.file,
+              "a capture of any kind that varnel-decode reads, which is played, or a snapshot; unless "
+              "given, the telephony server is shown")
+          ->check(faultOfFile)
+          ->type_name("");
+  const auto technologies = LogGenerator::technologies();
+  parser
+      .add_option(
+          "--technology", options.technology,
+          "the modem that was captured; unless given, the one that the capture names, else all-radios")
+      ->needs(file)
+      ->check(CLI::IsMember(std::vector<std::string>(technologies.begin(), technologies.end())))
+      ->type_name("TECHNOLOGY");
   parser
       .add_option(
           "--ui", options.userInterface,
@@ -37,6 +67,7 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
                   "where viewer and server meet; unless given, $XDG_RUNTIME_DIR/varnel, or varnel-UID in the "
                   "temporary "
                   "folder (/tmp) when that variable is not set, and /run/varnel when no server is there")
+      ->excludes(file)
       ->type_name("DIR");
   parser
       .add_option("--log-level", options.logLevel,

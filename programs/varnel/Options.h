@@ -12,6 +12,8 @@ inline constexpr const char* programName = "varnel";
 
 /// What the command line asks for.
 struct Options {
+  std::optional<std::string> file;        ///< a capture or a snapshot to show; absent: a server is shown
+  std::optional<std::string> technology;  ///< of the capture; absent: what the capture names, else all radios
   std::string userInterface = "auto";
   std::optional<std::string> deviceRoot;  ///< absent: / if that is a device, else the program's state folder
   std::optional<std::string> runtimeFolder;

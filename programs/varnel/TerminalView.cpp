@@ -20,6 +20,7 @@
 #include "host/HostApplication.h"
 #include "host/SignalWatcher.h"
 #include "programs/varnel/HostServices.h"
+#include "programs/varnel/PlayedFile.h"
 #include "terminal/CursesScreen.h"
 #include "terminal/HeldLines.h"
 #include "terminal/TerminalUserInterface.h"
@@ -110,6 +111,7 @@ class TerminalViewer final {
         _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2, SIGWINCH, SIGTSTP, SIGCONT},
                  [this](int signal) { take(signal); }),
         _services(options, application),
+        _file(options, _services),
         _screen(std::in_place),
         _userInterface(
             _services.queue(),
@@ -235,6 +237,7 @@ class TerminalViewer final {
   const SignalWatcher _watcher;  // before the screen: a signal must not end the program while it is in use
   HeldLines _held;
   HostServices _services;
+  const PlayedFile _file;
   std::optional<CursesScreen> _screen;
   TerminalUserInterface _userInterface;
   ValueHistory _history;

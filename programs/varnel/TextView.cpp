@@ -12,6 +12,7 @@
 #include "host/KeyWatcher.h"
 #include "host/SignalWatcher.h"
 #include "programs/varnel/HostServices.h"
+#include "programs/varnel/PlayedFile.h"
 #include "programs/varnel/StandardOutput.h"
 
 namespace varnel {
@@ -21,6 +22,7 @@ int viewAsText(int& argumentCount, char** arguments, const Options& options,
   HostApplication host(argumentCount, arguments);
   StandardOutput output;
   HostServices services(options, application);
+  const PlayedFile file(options, services);
   int status = 0;
   output.setEndHandler([&](int error) {
     if (error != 0) {

@@ -6,6 +6,7 @@
 #include "host/SignalWatcher.h"
 #include "host/StateFolder.h"
 #include "programs/varnel/HostServices.h"
+#include "programs/varnel/PlayedFile.h"
 #include "widgets/WidgetApplication.h"
 #include "widgets/WidgetUserInterface.h"
 
@@ -19,6 +20,7 @@ class WindowViewer final {
   WindowViewer(WidgetApplication& host, const Options& options, const ApplicationInfo& application)
       : _host(host),
         _services(options, application),
+        _file(options, _services),
         _userInterface({.close = [this] { _host.end(0); }, .startOver = [this] { _app.startOver(); }},
                        RememberedSize(stateFolder())),
         _app({_services.model(), _services.files(), _services.preferences(), _userInterface}),
@@ -51,6 +53,7 @@ class WindowViewer final {
 
   WidgetApplication& _host;
   HostServices _services;
+  const PlayedFile _file;
   WidgetUserInterface _userInterface;
   VarnelApp _app;
   const SignalWatcher _watcher;

@@ -1,0 +1,40 @@
+#include "programs/varnel/PlayedFile.h"
+
+#include <QCoreApplication>
+#include <stdexcept>
+
+namespace varnel {
+
+std::vector<std::string> argumentsForReplay(const Options& options, const std::string& capture) {
+  // A name may begin like an option.
+  std::vector<std::string> arguments{"--replay=" + capture};
+  if (options.technology) arguments.push_back("--technology=" + *options.technology);
+  if (options.subscription) arguments.push_back("--sim=" + std::to_string(*options.subscription));
+  return arguments;
+}
+
+PlayedFile::PlayedFile(const Options& options, HostServices& services) : _services(services) {
+  if (!options.file) return;
+  _server = std::make_unique<ChildServer>(
+      serverProgram(), argumentsForReplay(options, *options.file),
+      ChildServer::Handlers{
+          .ready = [this] { _start.quit(); },
+          .ended = [this, file = *options.file](const std::string& why) { serverHasEnded(file, why); }});
+  const int status = _start.exec();
+  if (!_trouble.empty()) throw std::runtime_error(_trouble);
+  services.connectTo(_server->folder());
+  if (_server->isReady()) return;
+  // The wish to end has ended the wait alone.
+  QMetaObject::invokeMethod(
+      QCoreApplication::instance(), [status] { QCoreApplication::exit(status); }, Qt::QueuedConnection);
+}
+
+void PlayedFile::serverHasEnded(const std::string& file, const std::string& why) {
+  if (_server->isReady())
+    return _services.link().setEndOfOwnServer("The server that plays " + file + " has ended: " + why +
+                                              "; start varnel again to see the file again");
+  _trouble = why;
+  _start.quit();
+}
+
+}  // namespace varnel
