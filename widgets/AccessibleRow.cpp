@@ -26,7 +26,7 @@ QString AccessibleRow::text(QAccessible::Text kind) const {
 QAccessible::State AccessibleRow::state() const {
   QAccessible::State state = QAccessibleWidget::state();
   state.selectable = true;
-  state.selected = row().emphasis().isSelected;
+  state.selected = row().emphasis().isSelected || row().emphasis().isOpen;
   state.focusable = true;
   state.focused = row().emphasis().hasFocusFrame;
   return state;

@@ -1,12 +1,16 @@
 #include "widgets/NavigationWidget.h"
 
+#include <QApplication>
 #include <QKeyEvent>
 #include <QMouseEvent>
+#include <QPainter>
 #include <QTimer>
 #include <algorithm>
 #include <utility>
 
+#include "widgets/Colors.h"
 #include "widgets/Motion.h"
+#include "widgets/PanePlaces.h"
 #include "widgets/QtValues.h"
 
 namespace varnel {
@@ -19,9 +23,13 @@ ModalScreenWidget& screenOf(ModalController& controller) {
   return static_cast<ModalScreenWidget&>(controller.screen());
 }
 
+bool hasModifiers(const QKeyEvent& event) {
+  return (event.modifiers() & ~Qt::KeypadModifier) != Qt::NoModifier;
+}
+
 bool isWayBack(const QKeyEvent& event) {
   if (event.matches(QKeySequence::Back)) return true;
-  if ((event.modifiers() & ~Qt::KeypadModifier) != Qt::NoModifier) return false;
+  if (hasModifiers(event)) return false;
   switch (event.key()) {
     case Qt::Key_Escape:
     case Qt::Key_Left:
@@ -32,6 +40,8 @@ bool isWayBack(const QKeyEvent& event) {
       return false;
   }
 }
+
+bool hasKeyboard(const PaneWidget& pane) { return pane.isAncestorOf(QApplication::focusWidget()); }
 
 }  // namespace
 
@@ -51,19 +61,21 @@ void NavigationWidget::adopt(std::size_t index) {
   controller.setNavigationController(this);
   PaneWidget& pane = paneOf(controller);
   pane.setParent(this);
-  pane.setGeometry(rect());
-  pane.toolbar().setVisible(_showsToolbar);
+  pane.setGeometry(PanePlaces::in(rect(), _controllers.size()).top);
   pane.notice().setText(_notice);
-  pane.header().setBackAction([this] { goBack(); });
+  pane.header().setBackAction([this, index] { goBackFrom(index); });
+  pane.tableWidget().setChoiceMaker(
+      [this, index](const TableWidget::Choice& choice) { make(index, choice); });
   showWayBack(index);
   pane.setTitleObserver([this, index] {
     if (index + 1 < _controllers.size()) showWayBack(index + 1);
+    if (PaneWidget* beside = paneBeside()) beside->tableWidget().markOpenRow(topPane().header().title());
   });
 }
 
 void NavigationWidget::showWayBack(std::size_t index) {
   if (index == 0) return;
-  paneOf(*_controllers[index]).header().showBackButton(paneOf(*_controllers[index - 1]).header().title());
+  paneAt(index).header().showBackButton(paneAt(index - 1).header().title());
 }
 
 void NavigationWidget::release(PaneController& controller) {
@@ -75,7 +87,7 @@ void NavigationWidget::release(PaneController& controller) {
 }
 
 void NavigationWidget::appear() {
-  showTop();
+  arrange();
   topController()->viewWillAppear(Animation::None);
   topPane().show();
   takeKeyboard();
@@ -97,7 +109,11 @@ void NavigationWidget::changeTop(std::vector<std::shared_ptr<PaneController>> co
                                  Animation animation, SlideOverlay::Movement movement) {
   const bool isShown = isVisible() && !_modal;
   const Animation shownAs = isShown && isShownHappening(*this, animation) ? animation : Animation::None;
-  const QPixmap former = shownAs == Animation::Animated ? topPane().grab() : QPixmap();
+  // A choice beside the top pane is seen at once: the pane that was open has gone already.
+  const bool slides = shownAs == Animation::Animated && !_isChoosing;
+  const QRect part = PanePlaces::partThatChanges(rect());
+  delete _overlay.data();
+  const QPixmap former = slides ? grab(part) : QPixmap();
   const auto formerControllers = std::exchange(_controllers, std::move(controllers));
   if (_controllers.size() > formerControllers.size()) adopt(_controllers.size() - 1);
 
@@ -106,29 +122,53 @@ void NavigationWidget::changeTop(std::vector<std::shared_ptr<PaneController>> co
   if (_delegate)
     _delegate->navigationController_willShowViewController_animated(*this, *topController(), shownAs);
 
-  showTop();
-  if (shownAs == Animation::Animated) slide(former, topPane().grab(), movement);
   for (std::size_t index = _controllers.size(); index < formerControllers.size(); ++index) {
     release(*formerControllers[index]);
     releaseLater(formerControllers[index]);
   }
+  arrange();
+  if (slides) slide(former, part, movement);
   takeKeyboard();
 }
 
-void NavigationWidget::showTop() {
-  PaneWidget& top = topPane();
-  top.setGeometry(rect());
-  top.show();
-  top.raise();
-  for (const auto& controller : _controllers) {
-    if (PaneWidget& pane = paneOf(*controller); &pane != &top) pane.hide();
+void NavigationWidget::arrange() {
+  if (_isChoosing) return;
+  const PanePlaces places = PanePlaces::in(rect(), _controllers.size());
+  const std::size_t top = _controllers.size() - 1;
+  bool losesKeyboard = false;
+  for (std::size_t index = 0; index <= top; ++index) {
+    PaneWidget& pane = paneAt(index);
+    const bool isBeside = places.left && index + 1 == top;
+    pane.showAs(isBeside ? PaneWidget::Role::Beside : PaneWidget::Role::Top, _showsToolbar);
+    pane.tableWidget().markOpenRow(isBeside ? topPane().header().title() : QString());
+    if (isBeside || index == top) {
+      pane.setGeometry(isBeside ? *places.left : places.top);
+      pane.show();
+      pane.raise();
+    } else {
+      losesKeyboard |= hasKeyboard(pane);
+      pane.hide();
+    }
   }
   if (ModalScreenWidget* screen = modalScreen()) screen->raise();
+  if (losesKeyboard) takeKeyboard();
+}
+
+// A choice in the pane that is beside the top one goes back to that pane first.
+void NavigationWidget::make(std::size_t index, const TableWidget::Choice& choice) {
+  if (index + 1 == _controllers.size()) return choice();
+  _isChoosing = true;
+  popTo(*_controllers[index], Animation::None);
+  choice();
+  _isChoosing = false;
+  arrange();
+  takeKeyboard();
 }
 
 void NavigationWidget::showToolbar() {
+  if (_showsToolbar) return;
   _showsToolbar = true;
-  for (const auto& controller : _controllers) paneOf(*controller).toolbar().show();
+  arrange();
 }
 
 void NavigationWidget::setNotice(std::string_view text) {
@@ -140,7 +180,8 @@ void NavigationWidget::setNotice(std::string_view text) {
 void NavigationWidget::present(std::shared_ptr<ModalController> controller, Animation animation) {
   dismiss(Animation::None);
   const Animation shownAs = isShownHappening(*this, animation) ? animation : Animation::None;
-  const QPixmap former = shownAs == Animation::Animated ? topPane().grab() : QPixmap();
+  delete _overlay.data();
+  const QPixmap former = shownAs == Animation::Animated ? grab() : QPixmap();
   _modal = std::move(controller);
   ModalScreenWidget& screen = screenOf(*_modal);
   screen.enter(*this);
@@ -149,7 +190,7 @@ void NavigationWidget::present(std::shared_ptr<ModalController> controller, Anim
   _modal->viewWillAppear(shownAs);
   screen.show();
   screen.raise();
-  if (shownAs == Animation::Animated) slide(former, screen.grab(), SlideOverlay::Movement::Rise);
+  if (shownAs == Animation::Animated) slide(former, rect(), SlideOverlay::Movement::Rise);
   takeKeyboard();
 }
 
@@ -157,9 +198,10 @@ void NavigationWidget::dismiss(Animation animation) {
   if (!_modal) return;
   ModalScreenWidget& screen = screenOf(*_modal);
   const bool isAnimated = isShownHappening(*this, animation);
-  const QPixmap former = isAnimated ? screen.grab() : QPixmap();
+  delete _overlay.data();
+  const QPixmap former = isAnimated ? grab() : QPixmap();
   screen.leave();
-  if (isAnimated) slide(former, topPane().grab(), SlideOverlay::Movement::Sink);
+  if (isAnimated) slide(former, rect(), SlideOverlay::Movement::Sink);
   releaseLater(std::exchange(_modal, nullptr));
   takeKeyboard();
 }
@@ -170,9 +212,9 @@ void NavigationWidget::releaseLater(std::shared_ptr<void> leaving) {
   QTimer::singleShot(0, this, [leaving = std::move(leaving)] {});
 }
 
-void NavigationWidget::slide(const QPixmap& former, const QPixmap& next, SlideOverlay::Movement movement) {
-  delete _overlay.data();
-  _overlay = new SlideOverlay(former, next, movement, *this);
+// From the former picture of this part to what it shows now.
+void NavigationWidget::slide(const QPixmap& former, const QRect& part, SlideOverlay::Movement movement) {
+  _overlay = new SlideOverlay(former, grab(part), movement, part, *this);
   _overlay->show();
 }
 
@@ -182,32 +224,66 @@ void NavigationWidget::takeKeyboard() {
   topPane().tableWidget().setFocus(Qt::OtherFocusReason);
 }
 
-std::vector<std::string> NavigationWidget::pathOfFocus() const {
+// The names from below the root to the node of this pane.
+std::vector<std::string> NavigationWidget::pathOf(std::size_t index) const {
   std::vector<std::string> path;
-  for (std::size_t i = 1; i < _controllers.size(); ++i)
-    path.push_back(utf8(paneOf(*_controllers[i]).header().title()));
-  if (const RowWidget* const row = topPane().tableWidget().currentRow()) path.push_back(utf8(row->name()));
+  for (std::size_t i = 1; i <= index; ++i) path.push_back(utf8(paneAt(i).header().title()));
   return path;
 }
 
+std::vector<std::string> NavigationWidget::pathOfFocus() const {
+  const PaneWidget* const beside = paneBeside();
+  const std::size_t index = _controllers.size() - (beside && hasKeyboard(*beside) ? 2 : 1);
+  std::vector<std::string> path = pathOf(index);
+  if (const RowWidget* const row = paneAt(index).tableWidget().currentRow())
+    path.push_back(utf8(row->name()));
+  return path;
+}
+
+PaneWidget& NavigationWidget::paneAt(std::size_t index) const { return paneOf(*_controllers[index]); }
+
 PaneWidget& NavigationWidget::topPane() const { return paneOf(*_controllers.back()); }
+
+PaneWidget* NavigationWidget::paneBeside() const {
+  const bool isThere = PanePlaces::in(rect(), _controllers.size()).left.has_value();
+  return isThere ? &paneAt(_controllers.size() - 2) : nullptr;
+}
 
 ModalScreenWidget* NavigationWidget::modalScreen() const { return _modal ? &screenOf(*_modal) : nullptr; }
 
 void NavigationWidget::resizeEvent(QResizeEvent* event) {
   QWidget::resizeEvent(event);
   delete _overlay.data();
-  topPane().setGeometry(rect());
+  arrange();
   if (ModalScreenWidget* screen = modalScreen()) screen->setGeometry(rect());
 }
 
-void NavigationWidget::goBack() {
-  if (_controllers.size() < 2) return;
-  const auto below = _controllers[_controllers.size() - 2];
+// The line between two panes.
+void NavigationWidget::paintEvent(QPaintEvent*) {
+  QPainter(this).fillRect(rect(), separatorColor(palette()));
+}
+
+void NavigationWidget::goBack() { goBackFrom(_controllers.size() - 1); }
+
+void NavigationWidget::goBackFrom(std::size_t index) {
+  if (index == 0) return;
+  const auto below = _controllers[index - 1];
   popTo(*below, Animation::Animated);
 }
 
+// Left and Right between two panes. False when the key means something else.
+bool NavigationWidget::moveKeyboard(const QKeyEvent& event) {
+  PaneWidget* const beside = paneBeside();
+  if (!beside || hasModifiers(event)) return false;
+  const bool isBeside = hasKeyboard(*beside);
+  if (event.key() != (isBeside ? Qt::Key_Right : Qt::Key_Left)) return false;
+  // As after Tab, the table shows where the keyboard is.
+  (isBeside ? topPane() : *beside).tableWidget().setFocus(Qt::TabFocusReason);
+  return true;
+}
+
 void NavigationWidget::keyPressEvent(QKeyEvent* event) {
+  if (moveKeyboard(*event)) return;
   if (isWayBack(*event)) return goBack();
   if (event->matches(QKeySequence::Save) && topPane().toolbar().press(BarButton::SystemItem::Save)) return;
   event->ignore();

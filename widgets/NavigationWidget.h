@@ -16,8 +16,12 @@ namespace varnel {
 
 /// Panes on top of each other. Every change happens at once; an animation is a picture above it.
 ///
-/// Escape, Left, Backspace, and the desktop's key and mouse button for going back go back. Ctrl+S presses the
-/// Save button of the top pane.
+/// A wide stack shows its last two panes side by side, the top one on the right. Controllers learn nothing of
+/// that: a pane beside the top one is still one that has disappeared. When the user chooses one of its rows,
+/// the stack first goes back to it.
+///
+/// Escape, Left, Backspace, and the desktop's key and mouse button for going back go back. While there are
+/// two panes, Left and Right lead from one to the other. Ctrl+S presses the Save button of the top pane.
 class NavigationWidget final : public QWidget, public NavigationStack {
  public:
   explicit NavigationWidget(std::shared_ptr<PaneController> root);
@@ -38,13 +42,16 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   /// Gives the keyboard focus to what is on top.
   void takeKeyboard();
   PaneWidget& topPane() const;
-  /// The names from below the root to the current row of the top pane; without such a row, to the pane's own
-  /// node.
+  /// The pane on the left of the top one; null while there is none.
+  PaneWidget* paneBeside() const;
+  /// The names from below the root to the current row of the pane with the keyboard focus; without such a
+  /// row, to the pane's own node. When no pane has the focus, the top one counts.
   std::vector<std::string> pathOfFocus() const;
   /// Null while no screen is presented.
   ModalScreenWidget* modalScreen() const;
 
  protected:
+  void paintEvent(QPaintEvent* event) override;
   void resizeEvent(QResizeEvent* event) override;
   void keyPressEvent(QKeyEvent* event) override;
   void mousePressEvent(QMouseEvent* event) override;
@@ -54,16 +61,22 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   void release(PaneController& controller);
   void changeTop(std::vector<std::shared_ptr<PaneController>> controllers, Animation animation,
                  SlideOverlay::Movement movement);
-  void showTop();
+  void arrange();
+  void make(std::size_t index, const TableWidget::Choice& choice);
   void showWayBack(std::size_t index);
   void goBack();
-  void slide(const QPixmap& former, const QPixmap& next, SlideOverlay::Movement movement);
+  void goBackFrom(std::size_t index);
+  bool moveKeyboard(const QKeyEvent& event);
+  PaneWidget& paneAt(std::size_t index) const;
+  std::vector<std::string> pathOf(std::size_t index) const;
+  void slide(const QPixmap& former, const QRect& part, SlideOverlay::Movement movement);
   void releaseLater(std::shared_ptr<void> leaving);
 
   std::vector<std::shared_ptr<PaneController>> _controllers;
   std::shared_ptr<ModalController> _modal;
   NavigationStackDelegate* _delegate = nullptr;
   bool _showsToolbar = false;
+  bool _isChoosing = false;  // the places of the panes stay as they are until the choice is made
   std::string _notice;
   QPointer<SlideOverlay> _overlay;
 };

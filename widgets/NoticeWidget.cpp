@@ -55,10 +55,15 @@ void NoticeWidget::setText(std::string_view text) {
   setAccessibleDescription(_text);
   updateGeometry();
   update();
-  setVisible(!_text.isEmpty());
-  if (_text.isEmpty()) return;
+  setVisible(!_text.isEmpty() && !_isShownElsewhere);
+  if (_text.isEmpty() || _isShownElsewhere) return;
   QAccessibleEvent spoken(this, QAccessible::Alert);
   QAccessible::updateAccessibility(&spoken);
+}
+
+void NoticeWidget::setShownElsewhere(bool isShownElsewhere) {
+  _isShownElsewhere = isShownElsewhere;
+  setVisible(!_text.isEmpty() && !_isShownElsewhere);
 }
 
 int NoticeWidget::heightForWidth(int width) const {

@@ -15,6 +15,8 @@ class NoticeWidget final : public QWidget {
   /// Plain text with a newline between its lines.
   void setText(std::string_view text);
   const QString& text() const { return _text; }
+  /// Whether another widget shows the same notice, so that this one is hidden.
+  void setShownElsewhere(bool isShownElsewhere);
 
   bool hasHeightForWidth() const override { return true; }
   int heightForWidth(int width) const override;
@@ -26,6 +28,7 @@ class NoticeWidget final : public QWidget {
 
  private:
   QString _text;
+  bool _isShownElsewhere = false;
 };
 
 }  // namespace varnel

@@ -31,6 +31,11 @@ void PaneWidget::resignFirstResponder() {
   if (QWidget* holder = focusWidget(); holder && holder->hasFocus()) holder->clearFocus();
 }
 
+void PaneWidget::showAs(Role role, bool hasToolbar) {
+  _toolbar.setVisible(hasToolbar && role == Role::Top);
+  _notice.setShownElsewhere(role == Role::Beside);
+}
+
 void PaneWidget::fallSilent() {
   _table.fallSilent();
   _toolbar.fallSilent();

@@ -26,6 +26,13 @@ class PaneWidget final : public QWidget, public TablePane {
   HeaderWidget& header() { return _header; }
   ToolbarWidget& toolbar() { return _toolbar; }
   NoticeWidget& notice() { return _notice; }
+  /// What is on the screen of a stack's pane.
+  enum class Role {
+    Top,     ///< everything
+    Beside,  ///< the top pane is beside it and has toolbar and notice for both
+  };
+  /// The toolbar is hidden before the first call.
+  void showAs(Role role, bool hasToolbar);
   /// The observer is called when the title has changed.
   void setTitleObserver(std::function<void()> observer) { _titleObserver = std::move(observer); }
   /// Makes no more calls from now on.

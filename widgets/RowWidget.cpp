@@ -18,6 +18,7 @@ constexpr double textInset = 10;
 constexpr double builtInTextSize = 15;
 constexpr double accessoryRoom = 30;
 constexpr double markStroke = 2;
+constexpr double openMarkWidth = 4;
 
 void stroke(QPainter& painter, const QColor& color, const QPainterPath& path) {
   painter.save();
@@ -56,7 +57,7 @@ RowWidget::RowWidget(CellStyle style, QWidget& parent) : QWidget(&parent), _labe
 void RowWidget::layOut() { _contentBounds = contentArea(); }
 
 Rect RowWidget::contentArea() const {
-  return {0, 0, parentWidget()->width() - accessoryWidth(), tableRowHeight};
+  return {0, 0, std::min(parentWidget()->width(), widest) - accessoryWidth(), tableRowHeight};
 }
 
 void RowWidget::fitLabels() {
@@ -157,7 +158,8 @@ void RowWidget::scrollSidewaysTo(double position) {
 
 void RowWidget::paintEvent(QPaintEvent*) {
   QPainter painter(this);
-  const QColor ground = _emphasis.isSelected ? selectionColor(palette()) : palette().color(QPalette::Base);
+  const bool isMarked = _emphasis.isSelected || _emphasis.isOpen;
+  const QColor ground = isMarked ? selectionColor(palette()) : palette().color(QPalette::Base);
   painter.fillRect(rect(), ground);
   painter.setPen(palette().color(QPalette::Text));
   paintBuiltInText(painter);
@@ -166,6 +168,7 @@ void RowWidget::paintEvent(QPaintEvent*) {
   for (const auto& container : _containers) container->paint(painter, colors);
   paintAccessory(painter);
   paintSeparator(painter);
+  if (_emphasis.isOpen) paintOpenMark(painter);
   if (_emphasis.hasFocusFrame) paintFocusFrame(painter);
 }
 
@@ -204,6 +207,12 @@ void RowWidget::paintFocusFrame(QPainter& painter) const {
   painter.setPen(QPen(accentColor(palette(), palette().color(QPalette::Base)), markStroke));
   painter.drawRoundedRect(QRectF(rect()).adjusted(2, 2, -2, -2), 4, 4);
   painter.restore();
+}
+
+// A color alone would not tell it from the selected row.
+void RowWidget::paintOpenMark(QPainter& painter) const {
+  painter.fillRect(QRectF(0, 0, openMarkWidth, height()),
+                   accentColor(palette(), palette().color(QPalette::Base)));
 }
 
 double RowWidget::accessoryWidth() const { return _accessory == CellAccessory::None ? 0 : accessoryRoom; }

@@ -15,15 +15,19 @@ namespace varnel {
 /// widget. The table handles mouse and touch.
 class RowWidget final : public QWidget, public CellView {
  public:
+  /// A row is as wide as its table, but never wider than this, so that the eye finds the value of a name.
+  static constexpr int widest = 800;
+
   /// How the row differs from other rows.
   struct Emphasis {
     bool isSelected = false;
     bool hasFocusFrame = false;
+    bool isOpen = false;  ///< the pane to which it leads is beside its table
 
     friend bool operator==(const Emphasis&, const Emphasis&) = default;
   };
 
-  /// The parent is the viewport of a table, which is as wide as its rows.
+  /// The parent is the viewport of a table.
   RowWidget(CellStyle style, QWidget& parent);
 
   void layOut() override;
@@ -44,6 +48,8 @@ class RowWidget final : public QWidget, public CellView {
   void fitLabels();
   /// The text for a screen reader: "name: value".
   QString description() const;
+  /// Whether the row leads to another pane.
+  bool leadsOn() const { return _accessory == CellAccessory::DisclosureIndicator; }
   /// The first of the row's texts.
   QString name() const;
   /// True when a part of its text is not visible while the row is at its left end. That text has to be
@@ -69,6 +75,7 @@ class RowWidget final : public QWidget, public CellView {
   void paintAccessory(QPainter& painter) const;
   void paintSeparator(QPainter& painter) const;
   void paintFocusFrame(QPainter& painter) const;
+  void paintOpenMark(QPainter& painter) const;
   double accessoryWidth() const;
   Rect contentArea() const;
   const PaintedScrollContainer& scrolledPart() const;

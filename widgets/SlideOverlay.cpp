@@ -20,14 +20,15 @@ bool isSideways(SlideOverlay::Movement movement) {
 
 }  // namespace
 
-SlideOverlay::SlideOverlay(const QPixmap& former, const QPixmap& next, Movement movement, QWidget& parent)
+SlideOverlay::SlideOverlay(const QPixmap& former, const QPixmap& next, Movement movement, const QRect& part,
+                           QWidget& parent)
     : QWidget(&parent),
       _below(bringsNewOneAbove(movement) ? former : next),
       _above(bringsNewOneAbove(movement) ? next : former),
       _movement(movement) {
   setAttribute(Qt::WA_TransparentForMouseEvents);
   setAttribute(Qt::WA_OpaquePaintEvent);
-  setGeometry(parent.rect());
+  setGeometry(part);
   connect(&_animation, &QVariantAnimation::valueChanged, this, [this] { update(); });
   connect(&_animation, &QVariantAnimation::finished, this, &QObject::deleteLater);
   // Where the upper picture starts and where it ends, as shares of its way.

@@ -17,8 +17,9 @@ class SlideOverlay final : public QWidget {
     Sink,   ///< the old picture goes down
   };
 
-  /// It covers the whole parent.
-  SlideOverlay(const QPixmap& former, const QPixmap& next, Movement movement, QWidget& parent);
+  /// It covers this part of the parent.
+  SlideOverlay(const QPixmap& former, const QPixmap& next, Movement movement, const QRect& part,
+               QWidget& parent);
 
  protected:
   void paintEvent(QPaintEvent* event) override;

@@ -51,6 +51,17 @@ TableWidget::TableWidget(QWidget* parent)
 
 TableWidget::~TableWidget() = default;
 
+void TableWidget::fallSilent() {
+  _delegate = nullptr;
+  _choiceMaker = nullptr;
+}
+
+void TableWidget::markOpenRow(const QString& name) {
+  if (name == _openRow && name.isNull() == _openRow.isNull()) return;
+  _openRow = name;
+  showEmphasis();
+}
+
 void TableWidget::setDelegate(TableViewDelegate* delegate) {
   _delegate = delegate;
   if (!_delegate && _isLoaded) load();
@@ -169,15 +180,19 @@ void TableWidget::showRow(std::size_t row) {
   widget.setRow(row);
   widget.fitLabels();
   placeRow(widget);
-  widget.setEmphasis({_current == row && _currentIsSelected, _current == row && _keysAreUsed && hasFocus()});
+  widget.setEmphasis(emphasisOf(widget));
   widget.show();
   _visible[row] = std::move(cell);
 }
 
 void TableWidget::placeRow(RowWidget& row) const {
   const int top = static_cast<int>(row.row()) * rowHeight - verticalScrollBar()->value();
-  row.setGeometry(0, top, viewport()->width(), rowHeight);
+  row.setGeometry(leftOfRows(), top, rowWidth(), rowHeight);
 }
+
+int TableWidget::rowWidth() const { return std::min(viewport()->width(), RowWidget::widest); }
+
+int TableWidget::leftOfRows() const { return (viewport()->width() - rowWidth()) / 2; }
 
 void TableWidget::putAwayRowsOutside(std::size_t begin, std::size_t end) {
   for (auto next = _visible.begin(); next != _visible.end();) {
@@ -226,7 +241,8 @@ RowWidget* TableWidget::visibleRow(std::size_t row) const {
 }
 
 std::optional<std::size_t> TableWidget::rowAt(const QPoint& position) const {
-  if (position.y() < 0) return std::nullopt;
+  const int fromLeft = position.x() - leftOfRows();
+  if (position.y() < 0 || fromLeft < 0 || fromLeft >= rowWidth()) return std::nullopt;
   const auto row = static_cast<std::size_t>((position.y() + verticalScrollBar()->value()) / rowHeight);
   return row < _rows.rows() ? std::optional(row) : std::nullopt;
 }
@@ -276,10 +292,11 @@ void TableWidget::keyPressEvent(QKeyEvent* event) {
   // The widget around the table handles keys with other modifiers.
   if ((event->modifiers() & ~Qt::KeypadModifier) != Qt::NoModifier) return event->ignore();
   switch (event->key()) {
+    case Qt::Key_Right:
+      return rightLeavesTable() ? event->ignore() : chooseCurrentRow();
     case Qt::Key_Return:
     case Qt::Key_Enter:
     case Qt::Key_Space:
-    case Qt::Key_Right:
       return chooseCurrentRow();
     case Qt::Key_PageUp:
     case Qt::Key_PageDown:
@@ -346,6 +363,12 @@ bool TableWidget::scrollCurrentRowSideways(int key) {
   return true;
 }
 
+bool TableWidget::rightLeavesTable() const {
+  if (_openRow.isNull()) return false;
+  const RowWidget* const row = _current ? visibleRow(*_current) : nullptr;
+  return !row || !row->leadsOn() || row->emphasis().isOpen;
+}
+
 void TableWidget::chooseCurrentRow() {
   if (_current) chooseRow(*_current);
 }
@@ -367,14 +390,23 @@ void TableWidget::tellOfFocusOn(std::size_t row) const {
 
 void TableWidget::chooseRow(std::size_t row) {
   makeCurrent(row);
-  if (_delegate) _delegate->tableView_didSelectRowAtIndexPath(*this, _rows.pathOf(row));
+  const Choice choice = [this, row] {
+    if (_delegate && row < _rows.rows())
+      _delegate->tableView_didSelectRowAtIndexPath(*this, _rows.pathOf(row));
+  };
+  // A copy: the choice may make this table fall silent.
+  if (const auto maker = _choiceMaker) return maker(choice);
+  choice();
 }
 
 void TableWidget::showEmphasis() {
-  for (RowWidget* row : visibleRows()) {
-    const bool isCurrent = _current == row->row();
-    row->setEmphasis({isCurrent && _currentIsSelected, isCurrent && _keysAreUsed && hasFocus()});
-  }
+  for (RowWidget* row : visibleRows()) row->setEmphasis(emphasisOf(*row));
+}
+
+RowWidget::Emphasis TableWidget::emphasisOf(const RowWidget& row) const {
+  const bool isCurrent = _current == row.row();
+  return {isCurrent && _currentIsSelected, isCurrent && _keysAreUsed && hasFocus(),
+          !_openRow.isNull() && row.name() == _openRow};
 }
 
 void TableWidget::mousePressEvent(QMouseEvent* event) {

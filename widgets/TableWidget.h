@@ -2,6 +2,7 @@
 
 #include <QAbstractScrollArea>
 #include <QHelpEvent>
+#include <functional>
 #include <map>
 #include <memory>
 #include <optional>
@@ -23,6 +24,8 @@ namespace varnel {
 /// One row is the current row, from which the arrow keys go on. It is also selected until it is deselected.
 /// Choosing a row (by a click, a tap, Return, Enter, Space, or Right) makes it the current row and tells the
 /// delegate.
+///
+/// Rows are never wider than `RowWidget::widest`. In a wider table they stand in its middle.
 class TableWidget final : public QAbstractScrollArea, public TableView {
  public:
   explicit TableWidget(QWidget* parent = nullptr);
@@ -38,7 +41,15 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   void sizeToFit() override;
 
   /// Keeps what it shows, but makes no more calls.
-  void fallSilent() { _delegate = nullptr; }
+  void fallSilent();
+
+  /// Passes each choice of the user on to the delegate.
+  using Choice = std::function<void()>;
+  /// Whoever shows the table makes the user's choices, by calling each one. Without it the table does.
+  void setChoiceMaker(std::function<void(const Choice&)> maker) { _choiceMaker = std::move(maker); }
+  /// Marks the row with this name: its pane is open beside this one. Right then leaves this table for that
+  /// pane, except on another row that leads to a pane. Null: no pane is open beside this one.
+  void markOpenRow(const QString& name);
 
   /// The rows on the screen, from top to bottom.
   std::vector<RowWidget*> visibleRows() const;
@@ -80,6 +91,9 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   std::map<std::size_t, QString> namesOfVisibleRows() const;
 
   RowWidget* visibleRow(std::size_t row) const;
+  RowWidget::Emphasis emphasisOf(const RowWidget& row) const;
+  int rowWidth() const;
+  int leftOfRows() const;
   std::optional<std::size_t> rowAt(const QPoint& position) const;
   void scrollToRow(std::size_t row);
   std::size_t firstWhollyVisibleRow() const;
@@ -91,10 +105,13 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   std::optional<std::size_t> rowThatKeyLeadsTo(int key) const;
   void showTooltip(const QHelpEvent& event);
   bool scrollCurrentRowSideways(int key);
+  bool rightLeavesTable() const;
   void chooseCurrentRow();
   void showEmphasis();
 
   TableViewDelegate* _delegate = nullptr;
+  std::function<void(const Choice&)> _choiceMaker;
+  QString _openRow;  // null while no pane is open beside this one
   bool _isLoaded = false;
   bool _sizesToFit = false;
   RowIndex _rows;
