@@ -59,11 +59,8 @@ void VarnelApp::startOver() {
   if (!_model) return;
   closeSaveView();
   setUpdateMessage(std::string(notConnectedStatus));
-  _notices.end();
-  if (_host.history) _host.history->clear();
-  _model.reset();  // only one model at a time can have the log channel
-  _model = std::make_unique<VarnelModel>(_host.model, *this);
-  _notices.begin(*_model);
+  renewModel();
+  _panesToReopen.clear();
   const auto root = _navController->controllers().front();
   _navController->popTo(*root, Animation::None);
   showTree(nullptr);
@@ -72,6 +69,40 @@ void VarnelApp::startOver() {
   showNotice();
   showWindowTitle();
   _model->restartMonitorLater();
+}
+
+void VarnelApp::renewModel() {
+  _notices.end();
+  if (_host.history) _host.history->clear();
+  _statusWithoutLink.reset();
+  _model.reset();  // only one model at a time can have the log channel
+  _model = std::make_unique<VarnelModel>(_host.model, *this);
+  _notices.begin(*_model);
+}
+
+void VarnelApp::startOverInPlace() {
+  if (!_model) return;
+  closeSaveView();
+  rememberPanes();
+  renewModel();
+  updateStatusForViewController(topPane());
+  showNotice();
+  _model->restartMonitorLater();
+}
+
+void VarnelApp::showDisplay(const Value& display, std::string status) {
+  if (!_model) return;
+  closeSaveView();
+  rememberPanes();
+  renewModel();
+  _notices.end();  // there is no link to tell about
+  _statusWithoutLink = std::move(status);
+  showNotice();
+  _model->showDisplay(display);
+}
+
+void VarnelApp::refresh() {
+  if (_model) _model->refresh();
 }
 
 void VarnelApp::save() {
@@ -100,6 +131,7 @@ void VarnelApp::updateViewControllerFromModel() {
   _showsFirstStatus = false;
   updateStatusForViewController(topPane());
   showWindowTitle();
+  reopenPanes();
   linkWasLookedAt();
   _awaitedUpdates.countOne();
 }
@@ -117,6 +149,7 @@ void VarnelApp::linkWasOpened() {
 
 void VarnelApp::linkWasLookedAt() {
   if (_notices.update()) showNotice();
+  if (_observer) _observer();
 }
 
 // Before the panes are reloaded: their rows ask the history for their courses.
@@ -154,11 +187,34 @@ void VarnelApp::reloadPanes() {
     const auto node = i == 0 ? _tree : _model->nodeAtPath(pane.path());
     if (i > 0 && !node) {
       // Kept: this pane and those above it leave without showing the new tree. Only the panes below show it.
+      _isReopening = true;
       _navController->popTo(*panes[i - 1], Animation::Animated);
+      _isReopening = false;
       return;
     }
     pane.reloadWithNode(node);
   }
+}
+
+void VarnelApp::rememberPanes() {
+  // Those that were missing in the display of before are still wanted.
+  const auto panes = _navController->controllers();
+  if (!_panesToReopen.empty() && panes.size() <= _panesToReopen.size()) return;
+  _panesToReopen.clear();
+  for (std::size_t i = 1; i < panes.size(); ++i) _panesToReopen.emplace_back(varnelPane(*panes[i]).title());
+}
+
+void VarnelApp::reopenPanes() {
+  _isReopening = true;
+  for (std::size_t depth = _navController->controllers().size() - 1; depth < _panesToReopen.size(); ++depth) {
+    const NamePath path(_panesToReopen.begin(),
+                        _panesToReopen.begin() + static_cast<std::ptrdiff_t>(depth) + 1);
+    const VarnelModelNode* const node = nodeAt(path);
+    if (!node || !node->childNodes()) break;
+    topPane().openRow(path.back());
+  }
+  _isReopening = false;
+  if (_navController->controllers().size() > _panesToReopen.size()) _panesToReopen.clear();
 }
 
 void VarnelApp::showTree(VarnelPaneController::Node root) {
@@ -188,7 +244,9 @@ std::string VarnelApp::updateMessageForNow() const {
 }
 
 void VarnelApp::updateStatusForViewController(VarnelPaneController& pane) {
-  if (isConnected()) {
+  if (_statusWithoutLink) {
+    pane.setStatus_isLoading(*_statusWithoutLink, false);
+  } else if (isConnected()) {
     pane.setStatus_isLoading(_updateMessage, false);
   } else {
     pane.setStatus_isLoading(notConnectedStatus, true);
@@ -197,6 +255,7 @@ void VarnelApp::updateStatusForViewController(VarnelPaneController& pane) {
 
 void VarnelApp::navigationController_willShowViewController_animated(NavigationStack&,
                                                                      PaneController& controller, Animation) {
+  if (!_isReopening) _panesToReopen.clear();  // the user goes elsewhere
   updateStatusForViewController(varnelPane(controller));
   showWindowTitle();
 }

@@ -49,12 +49,27 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   /// Replaces the model with a new one that has an empty state, and goes back to the root pane. Does nothing
   /// before the launch and after the end.
   void startOver();
+  /// The same, but the panes stay. They show what they showed until the new model has a display, and then go
+  /// on with it. Those whose sections are missing there are closed. They are opened again when a later
+  /// display has their sections, unless the user has gone elsewhere meanwhile.
+  void startOverInPlace();
+  /// Replaces the model with one that has no link and shows this display. The panes stay as with
+  /// `startOverInPlace`. The status is shown until the next start.
+  void showDisplay(const Value& display, std::string status);
+  /// Shows what has arrived since the last refresh.
+  void refresh();
   /// Saves a snapshot with an empty description at once, if the device allows it.
   void save();
   /// Calls the task once, after this many refreshes were shown.
   void afterUpdates(unsigned count, std::function<void()> task);
 
-  /// The nodes of the display with these words in names and values (`findNodes`); none while there is no display.
+  /// Called whenever the link or the display may have changed.
+  void setObserver(std::function<void()> observer) { _observer = std::move(observer); }
+  bool isConnected() const { return _model && _model->isConnected(); }
+  bool hasDisplay() const { return _tree != nullptr; }
+
+  /// The nodes of the display with these words in names and values (`findNodes`); none while there is no
+  /// display.
   std::vector<FoundNode> find(std::string_view words) const;
   /// The node at the end of these names; null when there is none.
   const VarnelModelNode* nodeAt(const NamePath& path) const;
@@ -92,8 +107,10 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
 
  private:
   void showFirstStatus(VarnelPaneController& root);
-  bool isConnected() const { return _model && _model->isConnected(); }
+  void renewModel();
   void reloadPanes();
+  void rememberPanes();
+  void reopenPanes();
   void keepNumbers();
   void showTree(VarnelPaneController::Node root);
   VarnelPaneController& topPane() const;
@@ -112,6 +129,10 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   TreeChanges _changes;
   NoticeKeeper _notices;
   bool _showsFirstStatus = true;
+  std::optional<std::string> _statusWithoutLink;  // of a display that was given
+  NamePath _panesToReopen;  // the names of those above the root; empty when there are none
+  bool _isReopening = false;
+  std::function<void()> _observer;
   std::string _technologyOfFormats;  // of those that the history has
   std::unique_ptr<VarnelModel> _model;
   std::shared_ptr<VarnelSaveViewController> _saveViewController;

@@ -232,6 +232,12 @@ void VarnelModel::updateWithData(ByteView data) {
   _updated = true;
 }
 
+void VarnelModel::showDisplay(const Value& display) {
+  _nodesByPath.emplace();
+  _nodes = VarnelModelNode::makeTreeFromObject_withPathDictionary(display, *_nodesByPath);
+  _observer.updateViewControllerFromModel();
+}
+
 std::shared_ptr<const VarnelModelNode> VarnelModel::topLevelNodes() {
   if (_nodes || !_logGenerator) return _nodes;
   const Value display = _logGenerator->generateLogUsingState(_state);

@@ -82,6 +82,8 @@ class VarnelModel {
   void startMonitor();
   /// Notices that the service has gone away. Updates the observer when new data has arrived.
   void refresh();
+  /// Shows this display in place of one that is made of messages. For a model whose link was not started.
+  void showDisplay(const Value& display);
   /// Gives the generator one message of the log channel, whole, which changes the state.
   void updateWithData(ByteView data);
 

@@ -598,8 +598,98 @@ TEST_F(VarnelAppTest, StartingOverClosesTheSaveScreen) {
   EXPECT_FALSE(app.saveViewController());
 }
 
+TEST_F(VarnelAppTest, StartingOverInPlaceKeepsThePanesAndTheirRowsUntilTheNextDisplay) {
+  launchWith(2);
+  openContext(1);
+  app.startOverInPlace();
+  EXPECT_EQ(path(), "/PDP Context Info/1");
+  EXPECT_EQ(pane().table().rows(), 1u);
+  EXPECT_EQ(pane().toolbarText(), connecting);
+  queue.run();
+  EXPECT_EQ(telephony.attempts, 2u);
+  EXPECT_EQ(pane().toolbarText(), updated);
+  receive(3);
+  EXPECT_EQ(path(), "/PDP Context Info/1");
+  stack().goBack();
+  EXPECT_EQ(pane().table().rows(), 3u) << "of the new model";
+}
+
+TEST_F(VarnelAppTest, APaneThatTheNewDisplayLacksIsOpenedWhenALaterOneHasIt) {
+  launchWith(2);
+  openContext(1);
+  app.startOverInPlace();
+  queue.run();
+  receive(1);
+  EXPECT_EQ(path(), "/PDP Context Info");
+  receive(2);
+  EXPECT_EQ(path(), "/PDP Context Info/1");
+  receive(1);
+  EXPECT_EQ(path(), "/PDP Context Info");
+  receive(2);
+  EXPECT_EQ(path(), "/PDP Context Info") << "it was opened again once";
+}
+
+TEST_F(VarnelAppTest, APaneIsNotOpenedAgainForAUserWhoHasGoneElsewhere) {
+  launchWith(2);
+  openContext(1);
+  app.startOverInPlace();
+  queue.run();
+  receive(1);
+  ASSERT_EQ(path(), "/PDP Context Info");
+  stack().goBack();
+  receive(2);
+  EXPECT_EQ(path(), "/");
+}
+
+TEST_F(VarnelAppTest, ADisplayThatIsGivenIsShownWithoutALink) {
+  launchWith(1);
+  openContext(0);
+  app.showDisplay(dictionaryOf({{"PDP Context Info", Value::ofArray({dictionaryOf({{"APN", "ims"}})})}}),
+                  "Saved yesterday");
+  EXPECT_FALSE(app.isConnected());
+  EXPECT_TRUE(app.hasDisplay());
+  EXPECT_EQ(path(), "/PDP Context Info/0");
+  EXPECT_EQ(pane().table().rows(), 1u);
+  EXPECT_EQ(pane().toolbarText(), "[hidden wheel] [Saved yesterday] [space]");
+  queue.advance(1min);
+  EXPECT_EQ(telephony.attempts, 1u);
+  EXPECT_EQ(stack().notice, "");
+  app.startOver();
+  EXPECT_FALSE(app.hasDisplay());
+  EXPECT_EQ(pane().toolbarText(), "[wheel] [Connecting] [space]");
+  queue.run();
+  EXPECT_EQ(telephony.attempts, 2u);
+}
+
+TEST_F(VarnelAppTest, TellsItsObserverOfLinkAndDisplay) {
+  std::string seen;
+  app.setObserver([&] { seen += app.hasDisplay() ? 'd' : app.isConnected() ? 'c' : '-'; });
+  telephony.refusesConnections = true;
+  launch();
+  queue.run();
+  EXPECT_EQ(seen, "-");
+  telephony.refusesConnections = false;
+  queue.advance(5s);
+  EXPECT_EQ(seen, "-c");
+  receive(1);
+  EXPECT_EQ(seen, "-cd");
+}
+
+TEST_F(VarnelAppTest, ShowsWhatHasArrivedWhenItIsAskedTo) {
+  launchWith(1);
+  ports.deliver(channel, 0, contexts(2));
+  app.refresh();
+  queue.run();
+  openContext(0);
+  stack().goBack();
+  EXPECT_EQ(pane().table().rows(), 2u);
+}
+
 TEST_F(VarnelAppTest, StartingOverAndSavingDoNothingWhileNotLaunched) {
   app.startOver();
+  app.startOverInPlace();
+  app.showDisplay(Value::ofDictionary(), "");
+  app.refresh();
   app.save();
   EXPECT_EQ(queue.waitingTasks(), 0u);
   EXPECT_THAT(files.writes, IsEmpty());
