@@ -10,6 +10,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "LogGenerator/LogGenerator.h"
@@ -22,6 +23,7 @@
 #include "host/captures/FrameEncoding.h"
 #include "host/captures/PcapEncoders.h"
 #include "host/captures/StreamEncoders.h"
+#include "platform/ModemReport.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "programs/varnel-telephonyd/simulation/pty/SimulatedPort.h"
@@ -131,6 +133,48 @@ void makeGeneratorSeeds(SeedFolder& folder, std::string_view technology) {
     for (std::size_t first = 0; first < messages.size(); first += messages.size() / 3)
       folder.add("walk", inputOf(messages, first, folder.largest()));
   }
+}
+
+// Records of the server that no simulated modem sends: a report with cells of all radios, one with a
+// position, and one of another version.
+void makeReportSeeds(SeedFolder& folder) {
+  const auto number = [](const Value& entries, std::string_view key, double amount) {
+    const auto whole = static_cast<std::int64_t>(amount);
+    entries.dictionary()->set(
+        key, static_cast<double>(whole) == amount ? Value::ofInteger(whole) : Value::ofReal(amount));
+  };
+  const auto cell = [&](std::string_view radio, std::string_view type,
+                        std::initializer_list<std::pair<std::string_view, double>> numbers) {
+    Value made = Value::ofDictionary();
+    made.dictionary()->set(modemReport::radioAccessTechnology, radio);
+    made.dictionary()->set(modemReport::cellType, type);
+    for (const auto& [key, amount] : numbers) number(made, key, amount);
+    return made;
+  };
+  const auto add = [&](double version, Dictionary::Entry entry) {
+    const Value report = Value::ofDictionary();
+    number(report, modemReport::versionKey, version);
+    report.dictionary()->set(entry.key, entry.value);
+    Bytes message{0xFF, 0, 0, 3, 0, 0, 0, 0, 0, 0, 0, 0, 0};
+    const Bytes payload = writeBinaryPropertyList(report).value();
+    message.insert(message.end(), payload.begin(), payload.end());
+    Bytes input;
+    appendStep(input, {Generate, message});
+    folder.add("report", input);
+  };
+  using namespace modemReport;
+  add(1,
+      {cells, Value::ofArray({cell(lte, serving, {{earfcn, 5230}, {physicalCellIdentity, 17}, {rsrp, -97.5}}),
+                              cell(nr, neighbor, {{nrArfcn, 632628}, {bandwidth, 100000}, {sinr, 3}})})});
+  add(1, {cells, Value::ofArray({cell(umts, serving, {{uarfcn, 10588}, {scramblingCode, 5}, {ecIo, -7.5}}),
+                                 cell(gsm, neighbor, {{arfcn, 20}, {baseStationIdentityCode, 9}})})});
+  Value place = Value::ofDictionary();
+  number(place, latitude, 52.5);
+  number(place, longitude, -13.25);
+  place.dictionary()->set(modemReport::time, Value::ofDate({817063200, 0}));
+  add(1, {position, place});
+  add(1, {accessTechnologies, Value::ofArray({"LTE", "5GNR"})});
+  add(2, {registrationState, Value::ofInteger(1)});
 }
 
 Bytes bytesOf(CaptureEncoder& encoder, const std::vector<SimulatedMessage>& messages) {
@@ -468,6 +512,7 @@ void makeSeeds(const fs::path& root) {
     const bool sendsPictures = technology.identifier == technology::ifxGSM;
     SeedFolder folder(root, technology.target, sendsPictures ? largestFile : largestPlay);
     makeGeneratorSeeds(folder, technology.identifier);
+    if (technology.identifier == technology::allRadios) makeReportSeeds(folder);
   }
   SeedFolder captures(root, "CaptureFuzz"), frames(root, "PortFrameFuzz");
   SeedFolder commands(root, "ChannelCommandFuzz"), lists(root, "PropertyListFuzz");

@@ -40,6 +40,7 @@ struct Child {
 // Adding a radio is adding a child. Where two have a section of one name in a group, the first one's counts.
 const std::vector<Child>& children() {
   static const std::vector<Child> all = {
+      {make<radios::ModemIndex>, {"Modem"}},
       {make<radios::LTEIndex>, {"LTE"}},
       {make<radios::NRIndex>, {"NR"}},
       {make<radios::CorrectedIndex>, {"UMTS", "GSM", "PLMN"}},
@@ -68,7 +69,9 @@ bool isDecoded(const Subscriber& subscriber, const Packet& packet, std::uint32_t
 }  // namespace
 
 RadioGroups::RadioGroups(const Services& services, const Value& displayTemplate)
-    : _services(services), _shared{nowhere(), services.identities, _messages, _cellMonitor}, _c2k(services) {
+    : _services(services),
+      _shared{nowhere(), services.identities, _messages, _cellMonitor, _modemReports},
+      _c2k(services) {
   _c2k.keepNoRawBytes();
   const Dictionary* groups = displayTemplate.dictionary();
   if (!groups) return;

@@ -78,6 +78,7 @@ class RadioGroups final : public WriteTimes {
   const Services _services;
   MessageFeed _messages;
   CellMonitorReader _cellMonitor;
+  modem::ReportReader _modemReports;
   radios::Shared _shared;
   std::vector<std::unique_ptr<ClassIndex>> _indexes;
   C2KLogGenerator _c2k;

@@ -20,6 +20,10 @@
 #include "LogGenerator/Radios/LastMessages.h"
 #include "LogGenerator/Radios/MessageCounts.h"
 #include "LogGenerator/Radios/MessageFeed.h"
+#include "LogGenerator/Radios/Modem/OtherCells.h"
+#include "LogGenerator/Radios/Modem/PositionSection.h"
+#include "LogGenerator/Radios/Modem/Registration.h"
+#include "LogGenerator/Radios/Modem/ServingCell.h"
 #include "LogGenerator/Radios/NR/Cells.h"
 #include "LogGenerator/Radios/NR/MasterInformation.h"
 #include "LogGenerator/Radios/NR/Registration.h"
@@ -38,6 +42,24 @@ struct Shared {
   Identities identities;
   MessageFeed& messages;
   CellMonitorReader& cellMonitor;
+  modem::ReportReader& modemReports;
+};
+
+/// What a modem tells without a diagnostic port.
+class ModemIndex final : public ClassIndex {
+ public:
+  explicit ModemIndex(Shared& shared) : ClassIndex(shared.standardOutput), _shared(shared) {
+    for (const modem::Radio& radio : modem::radios())
+      _servingCells.push_back(create<modem::ServingCell>(radio, _shared.modemReports));
+  }
+
+ private:
+  Shared& _shared;
+  std::unique_ptr<modem::Registration> _registration = create<modem::Registration>(_shared.modemReports);
+  std::vector<std::unique_ptr<modem::ServingCell>> _servingCells;
+  std::unique_ptr<modem::OtherCells> _otherCells = create<modem::OtherCells>(_shared.modemReports);
+  std::unique_ptr<modem::PositionSection> _position =
+      create<modem::PositionSection>(_shared.modemReports, _shared.identities);
 };
 
 /// The LTE sections of all radios. 0xB186 has the layout of the LTE technology.

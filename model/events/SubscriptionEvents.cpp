@@ -16,7 +16,7 @@ namespace {
 // ---- What is watched ----
 
 constexpr std::string_view lte = "LTE", nr = "NR", umts = "UMTS", gsm = "GSM",
-                           mobility = "Mobility Management", plmn = "PLMN";
+                           mobility = "Mobility Management", plmn = "PLMN", modem = "Modem";
 
 struct CellEntry {
   std::string_view name;
@@ -52,6 +52,8 @@ constexpr CellSource cells[] = {
      "State",
      "Cell DCH"},
     {gsm, "GSM Serving Cell", {{"ARFCN"}, {"BSIC", false}, {"Cell ID"}}},
+    // The cell monitor tells of the cells of the other radios.
+    {modem, "NR Cell", {{"NR-ARFCN"}, {"Physical Cell ID"}, {"Cell Identity"}}},
 };
 
 enum class StateKind { Registration, Service, Connection };
@@ -77,6 +79,8 @@ constexpr StateSource states[] = {
     // All three processes show the same.
     {mobility, "Process PS", "MM Service State", StateKind::Service},
     {plmn, "Serving PLMN", "Service Type", StateKind::Service},
+    {modem, "Registration", "State", StateKind::Registration},
+    {modem, "Registration", "State", StateKind::Service},
 };
 
 constexpr std::string_view lostTexts[] = {
@@ -93,11 +97,16 @@ constexpr std::string_view lostTexts[] = {
     "REG_STATE_AUTOMATIC_SEARCH",
     "NO_SERVICE",
     "LIMITED_SERVICE",
+    "Not Registered",
+    "Searching",
+    "Denied",
+    "Emergency Only",
 };
 // Other texts belong to neither: the phone is on its way.
 constexpr std::string_view servedTexts[] = {
     "Normal Service", "MM_NORMAL_SERVICE", "GMM_NORMAL_SERVICE", "REG_STATE_IDLE",
-    "CS_ONLY",        "PS_ONLY",           "CS_PS_SERVICE",
+    "CS_ONLY",        "PS_ONLY",           "CS_PS_SERVICE",      "Home",
+    "Roaming",
 };
 
 // NR packets have versions of 32 bits.

@@ -9,6 +9,7 @@
 #include <utility>
 
 #include "LogGenerator/KLV/Subscriber/SimFiles.h"
+#include "LogGenerator/Radios/Modem/ReportReader.h"
 #include "platform/TelephonyService.h"
 #include "programs/varnel-decode/ProgramError.h"
 
@@ -37,7 +38,8 @@ constexpr const char* examples =
     "\n"
     "Captures, snapshots, and all that is written of their messages hold identities of a person, even where "
     "the display\n"
-    "hides them: M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI, and others. Give them only to those who may "
+    "hides them: M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI, positions, and others. Give them only to "
+    "those who may "
     "know them.\n"
     "\n"
     "  varnel-decode drive.bin\n"
@@ -90,9 +92,10 @@ bool isIdentityPath(std::string_view path) {
     if (!path.ends_with(name)) return false;
     return path.size() == name.size() || path[path.size() - name.size() - 1] == '/';
   };
-  return endsIn("M-TMSI") || endsIn("5G-TMSI") || std::ranges::any_of(simFiles, [&](const SimFile& file) {
-           return file.namesPerson && endsIn(file.entry);
-         });
+  return endsIn("M-TMSI") || endsIn("5G-TMSI") || endsIn(modem::latitudeEntry) ||
+         endsIn(modem::longitudeEntry) || endsIn(modem::altitudeEntry) ||
+         std::ranges::any_of(simFiles,
+                             [&](const SimFile& file) { return file.namesPerson && endsIn(file.entry); });
 }
 
 DisplayWriter writerNamed(std::string_view name) {
@@ -208,8 +211,8 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
       ->expected(2, CLI::detail::expected_max_vector_size);
   app.add_flag(
       "--identities", wishes.isShowingIdentities,
-      "let all-radios show identities (M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI, EF-GPRS/PS-LOCI), not "
-      "only that they are present; --stats and --plot never do");
+      "let all-radios show identities (M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI, EF-GPRS/PS-LOCI) and "
+      "positions, not only that they are present; --stats and --plot never do");
   app.add_option("--snapshot", options.snapshotPath, "also write a snapshot file")->type_name("FILE");
   app.add_option("--dlf", options.binaryLogPath, "also write the binary log of the last displays")
       ->type_name("FILE");

@@ -81,9 +81,11 @@ void declare(CLI::App& parser, Options& options, const ApplicationInfo& applicat
           "show the messages of this SIM card, and those that name no card; cards usually count from 1")
       ->check(CLI::Range(1U, 255U).description(""))
       ->type_name("N");
-  parser.add_flag("--identities", options.showsIdentities,
-                  "let all-radios show identities (M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI, "
-                  "EF-GPRS/PS-LOCI), not only that they are present; snapshots hold them in any case");
+  parser.add_flag(
+      "--identities", options.showsIdentities,
+      "let all-radios show identities (M-TMSI, 5G-TMSI, EF-ICCID, EF-MSISDN, EF-LOCI, "
+      "EF-GPRS/PS-LOCI) and positions, not only that they are present; snapshots hold them in any "
+      "case");
   parser.add_option("--updates", options.updates, "end after this many refreshes")
       ->check(CLI::Range(1U, std::numeric_limits<unsigned>::max()).description(""))
       ->type_name("N");

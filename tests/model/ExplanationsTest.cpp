@@ -188,7 +188,11 @@ constexpr const char* pathsOfOtherModems[] = {"/SIM 1",
                                               "/NR/Cells/Layers/0/RSRP Rx3",
                                               "/UMTS/UMTS Set/0/Downlink Frequency",
                                               "/UMTS/UMTS Set/0/Rank Cell RSCP",
-                                              "/LTE/Neighbors/Cells/0/RSSI"};
+                                              "/LTE/Neighbors/Cells/0/RSSI",
+                                              "/Modem/Other Cells/0",
+                                              "/Modem/Other Cells/0/Radio",
+                                              "/Modem/Other Cells/0/Type",
+                                              "/Modem/Other Cells/0/RSSI"};
 
 std::set<std::string> allPaths() {
   std::set<std::string> paths(std::begin(pathsOfOtherModems), std::end(pathsOfOtherModems));

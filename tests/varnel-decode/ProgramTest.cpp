@@ -394,6 +394,7 @@ TEST_F(DecodeProgram, AWrongCommandLineIsOneLineAndStatusTwo) {
       {"--technology", "kalvi-lte", path, "--plot", "", "A/B"},
       {"--identities", path, "--plot", folder.file("plot.svg"), "LTE/Registration/M-TMSI"},
       {path, "--plot", folder.file("plot.svg"), "A/B", "NR/Registration/5G-TMSI"},
+      {path, "--plot", folder.file("plot.svg"), "A/B", "Modem/Position/Latitude"},
       {path, "--plot", folder.file("plot.svg"), "SIM 1/Subscriber/SIM Info/EF-ICCID"},
       {path, "--plot", folder.file("plot.svg"), "Subscriber/SIM Info/EF-MSISDN"},
       {path, "--plot", folder.file("plot.svg"), "/Subscriber/SIM Info/EF-LOCI"},

@@ -196,7 +196,7 @@ TEST_F(AllRadiosLogGeneratorTest, TheStartCommandAsksForEachCodeOnce) {
   for (const auto& [code, count] : codes) EXPECT_EQ(count, 1) << code;
   for (const std::int32_t code : {0xB0C2, 0xB186, 0x7150, 0xD00A, 0x1183})
     EXPECT_TRUE(codes.contains(code)) << code;
-  EXPECT_EQ(extras, (std::map<std::int32_t, int>{{0, 1}, {1, 1}, {2, 1}}));
+  EXPECT_EQ(extras, (std::map<std::int32_t, int>{{0, 1}, {1, 1}, {2, 1}, {3, 1}}));
 }
 
 TEST_F(AllRadiosLogGeneratorTest, WhatBecomesOfAMessageNeedsNoDisplay) {

@@ -246,6 +246,19 @@ TEST_F(DisplayEventsTest, EachSimCardHasEventsOfItsOwn) {
   EXPECT_THAT(look(), ElementsAre("SIM 2/LTE/Registration: registration: Deregistered -> Registered"));
 }
 
+TEST_F(DisplayEventsTest, AModemReportTellsOfItsRegistrationAndOfNRCells) {
+  show("0;Modem", "Registration", "State", "Searching");
+  show("0;Modem", "NR Cell", "NR-ARFCN", "632628");
+  EXPECT_THAT(look(), ElementsAre("Modem/NR Cell: cell change:  -> NR-ARFCN 632628",
+                                  "Modem/Registration: registration:  -> Searching",
+                                  "Modem/Registration: loss of service:  -> Searching"));
+  show("0;Modem", "Registration", "State", "Home");
+  show("0;Modem", "NR Cell", "NR-ARFCN", "627264");
+  EXPECT_THAT(look(), ElementsAre("Modem/NR Cell: cell change: NR-ARFCN 632628 -> NR-ARFCN 627264",
+                                  "Modem/Registration: registration: Searching -> Home",
+                                  "Modem/Registration: return of service: Searching -> Home"));
+}
+
 TEST_F(DisplayEventsTest, WhatIsInTheWrongPlaceTellsNothing) {
   display.dictionary()->set("1;LTE", "text");
   display.dictionary()->set("SIM 1", Value::ofArray());
