@@ -27,6 +27,7 @@
 #include "programs/varnel-decode/EventWriter.h"
 #include "programs/varnel-decode/FileOutput.h"
 #include "programs/varnel-decode/GenerationWriters.h"
+#include "programs/varnel-decode/GpxTrack.h"
 #include "programs/varnel-decode/MessageStatistics.h"
 #include "programs/varnel-decode/Picture.h"
 #include "programs/varnel-decode/ProgramError.h"
@@ -175,6 +176,7 @@ class InputDecoding {
     const auto generator = LogGenerator::generatorFromTechnology(technology, services.services);
     OfflineDecoder decoder(*generator, services.clock, isSaving() ? RawBytes::Kept : RawBytes::NotKept);
 
+    if (_options.gpxPath) _track.emplace(*_options.gpxPath, *generator);
     _isOutputBroken |= !succeeds([&] { beginEvents(); });
     bool isDone = succeeds([&] { read(capture, *generator, decoder, log, services.templates); });
     if (services.templates.missing()) return failWithout(*services.templates.missing());
@@ -192,6 +194,8 @@ class InputDecoding {
       isDone &= writeBinaryLog(items);
     }
     isDone &= finishSinks();
+    if (_track && decoder.hasStarted()) isDone &= succeeds([&] { _track->finish(_name); });
+    isDone &= !_hasTrackFailed;
     isDone &= succeeds([&] { writeSummary(display); });
     return isDone && !_isOutputBroken ? 0 : generalError;
   }
@@ -214,7 +218,7 @@ class InputDecoding {
   // Whether no output shows what the records say.
   bool isConvertingAlone() const {
     return !_outputs.areNone() && _options.output == Output::Display &&
-           _options.writeDisplay == displayAsNothing && !_options.plot && !isSaving();
+           _options.writeDisplay == displayAsNothing && !_options.plot && !_options.gpxPath && !isSaving();
   }
 
   int convert(Capture& capture) {
@@ -262,7 +266,16 @@ class InputDecoding {
       _dating = record.dating;
       decoder.deliver(record.time, record.message);
       if (_options.output == Output::Events) writeEvents(decoder);
+      if (_track) takePosition(record, decoder);
     }
+  }
+
+  // A track that fails is reported and gets nothing more.
+  void takePosition(const CaptureRecord& record, const OfflineDecoder& decoder) {
+    const auto time = record.dating == Dating::Known ? std::optional(decoder.now()) : std::nullopt;
+    if (succeeds([&] { _track->take(record.message, time, decoder.now(), decoder.display()); })) return;
+    _track.reset();
+    _hasTrackFailed = true;
   }
 
   void beginEvents() {
@@ -298,6 +311,7 @@ class InputDecoding {
     if (_options.output == Output::Events) return "--events tells what happened in captures";
     if (!_outputs.areNone())
       return "--records, --pcap, --framed and --messages write the records of captures";
+    if (_options.gpxPath) return "--gpx writes the positions in captures";
     if (_options.subscription) return "--sim chooses among the records of captures";
     if (_options.snapshotPath) return "--snapshot saves what was decoded of a capture";
     return std::nullopt;
@@ -335,7 +349,8 @@ class InputDecoding {
 
   // Whether nobody would see the rest of the capture.
   bool isPointless() const {
-    return _isOutputBroken && !_options.plot && !isSaving() && _outputs.areNone() && !isGatheringChanges();
+    return _isOutputBroken && !_options.plot && !_options.gpxPath && !isSaving() && _outputs.areNone() &&
+           !isGatheringChanges();
   }
 
   bool isSaving() const { return _options.snapshotPath || _options.binaryLogPath; }
@@ -417,6 +432,8 @@ class InputDecoding {
   std::vector<Sink> _sinks;
   DisplayEvents _events;
   EventWriter _eventWriter;
+  std::optional<GpxTrack> _track;  // refers to the generator while that decodes
+  bool _hasTrackFailed = false;
   ElapsedTime _elapsed;
   Dating _dating = Dating::Known;  // of the last record
   bool _isOutputBroken = false;

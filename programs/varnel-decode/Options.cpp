@@ -57,6 +57,7 @@ constexpr const char* examples =
     "  varnel-decode --explain LTE/Measurements/RSRP\n"
     "  varnel-decode --format none --pcap walk.pcap walk.bin\n"
     "  varnel-decode --format none --messages walk-messages.pcapng walk.bin\n"
+    "  varnel-decode --format none --gpx walk.gpx walk.pcapng\n"
     "  varnel-decode --dlf walk.dlf --format none VarnelSnapshot-1709301914.varnel\n";
 
 // The command line as it was typed, before the program checks whether it makes sense.
@@ -229,6 +230,11 @@ void declareOutput(CLI::App& app, Options& options, Wishes& wishes) {
   app.add_option("--messages-as", wishes.messagesAs,
                  "with --messages: the form of the packets; upper-pdu unless given")
       ->check(CLI::IsMember({upperPduName, gsmtapName}));
+  app.add_option(
+         "--gpx", options.gpxPath,
+         "also write where the modem was as a GPX track, with the levels of all-radios at each point; "
+         "for recordings with positions")
+      ->type_name("FILE");
 }
 
 // The options that name an output file, with the names.
@@ -243,6 +249,7 @@ std::vector<std::pair<std::string, std::string>> namedOutputs(const Options& opt
   add("--pcap", options.pcapPath);
   add("--framed", options.framedPath);
   add("--messages", options.messagesPath);
+  add("--gpx", options.gpxPath);
   if (!wishes.plot.empty()) add("--plot", wishes.plot.front());
   return outputs;
 }
@@ -256,6 +263,12 @@ std::optional<std::string> conflictOfEvents(const Options& options, const Wishes
     return "--events writes --format text, json or csv only";
   if (options.technology && *options.technology != technology::allRadios)
     return "--events are those of all-radios; leave out --technology";
+  return std::nullopt;
+}
+
+std::optional<std::string> conflictOfTrack(const Options& options) {
+  if (options.gpxPath && options.technology && *options.technology != technology::allRadios)
+    return "--gpx writes the levels of all-radios; leave out --technology";
   return std::nullopt;
 }
 
@@ -291,6 +304,7 @@ std::optional<std::string> conflict(const Options& options, const Wishes& wishes
     if (wishes.isChanges) return "--changes goes with --every or --csv";
   }
   if (const auto found = conflictOfEvents(options, wishes)) return found;
+  if (const auto found = conflictOfTrack(options)) return found;
   if (wishes.isStatistics && !format.empty() && format != "text" && format != "json")
     return "--stats writes --format text or json only";
   if (const auto identity = std::ranges::find_if(wishes.plot, isIdentityPath); identity != wishes.plot.end())
@@ -364,7 +378,7 @@ void fulfill(Options& options, const Wishes& wishes) {
   options.writeDisplay = writerNamed(format);
   if (wishes.messagesAs == gsmtapName) options.messagesAs = MessageForm::Gsmtap;
   options.eventFormat = eventFormatNamed(format);
-  if (wishes.isEvents) options.technology = technology::allRadios;
+  if (wishes.isEvents || options.gpxPath) options.technology = technology::allRadios;
   const bool isForReading = (options.output == Output::Display && (format == "text" || format == "paths")) ||
                             options.output == Output::StatisticsTable ||
                             (options.output == Output::Events && options.eventFormat == EventFormat::Text);

@@ -52,6 +52,7 @@ struct Options {
   std::optional<std::string> framedPath;     ///< as a framed stream
   std::optional<std::string> messagesPath;   ///< where to write the RRC and NAS messages
   MessageForm messagesAs = MessageForm::UpperPdu;
+  std::optional<std::string> gpxPath;  ///< where to write the positions, with the levels at each
   std::optional<PlotWish> plot;
   Identities identities = Identities::Hidden;
   /// Whose records alone are taken; absent for whichever is first, or for all, as the technology wants.

@@ -33,6 +33,7 @@ std::vector<NamedFile> outputsOf(const Options& options) {
   if (options.pcapPath) add("--pcap", *options.pcapPath);
   if (options.framedPath) add("--framed", *options.framedPath);
   if (options.messagesPath) add("--messages", *options.messagesPath);
+  if (options.gpxPath) add("--gpx", *options.gpxPath);
   if (options.plot) add("--plot", options.plot->file);
   if (options.databasePath) add("--sqlite", *options.databasePath);
   if (options.reportPath) add("--report", *options.reportPath);
