@@ -122,6 +122,71 @@ TEST(ValueChanges, TheColorsOfAGsmCellAreItsNumber) {
               ElementsAre(ShownCell{"GSM", "60", "21"}, ShownCell{"GSM", "60", "8/5 (NCC/BCC)"}));
 }
 
+Value sorted(std::initializer_list<std::pair<const char*, const char*>> entries) {
+  Value section = Value::ofDictionary();
+  section.dictionary()->set("_sorted", "");
+  for (const auto& [name, text] : entries) section.dictionary()->set(name, text);
+  return section;
+}
+
+// A display of CDMA2000.
+Value cdmaDisplay() {
+  Value oneX = sorted({{"03;Rx0 Channel", "384"}});
+  oneX.dictionary()->set("10;Active Set", sorted({{"0;84", "(ref pilot) -5.00 dB"}, {"1;168", "-9.00 dB"}}));
+  Value evdo = sorted({{"04;Channel", "777"}, {"05;Serving Pilot PN Offset", "32 × 64chips"}});
+  evdo.dictionary()->set("13;Active Set", "(none)");
+  evdo.dictionary()->set("14;Finger C2I", sorted({{"0;11", "-1.00 dB"}}));
+  Value display = sorted({});
+  display.dictionary()->set("1;1x", oneX);
+  display.dictionary()->set("2;EV-DO", evdo);
+  display.dictionary()->set("3;Network", sorted({{"5;Base Station ID", "4660"}}));
+  return display;
+}
+
+TEST(ValueChanges, ACellOfCdmaIsAPilotOfItsChannelAndABaseStation) {
+  const auto cells = {ShownCell{"CDMA2000", "384", "168"}, ShownCell{"CDMA2000", "384", "84"},
+                      ShownCell{"CDMA2000", "777", "32"}, ShownCell{"CDMA2000 base station", "384", "4660"}};
+  ValueChanges alone, ofAllRadios, ofACard;
+  alone.take(at(2, cdmaDisplay()));
+  EXPECT_THAT(alone.cells(), testing::ElementsAreArray(cells));
+  ofAllRadios.take(at(2, displayOf("CDMA2000", cdmaDisplay())));
+  EXPECT_THAT(ofAllRadios.cells(), testing::ElementsAreArray(cells));
+  ofACard.take(at(2, displayOf("SIM 1", displayOf("CDMA2000", cdmaDisplay()))));
+  EXPECT_THAT(ofACard.cells(), testing::ElementsAreArray(cells));
+}
+
+TEST(ValueChanges, AStationIsThatOfTheChannelOnWhichItWasHeard) {
+  const auto display = [](const char* channel, const char* station) {
+    Value groups = displayOf("1x", section({{"Rx0 Channel", channel}}));
+    groups.dictionary()->set("Network", section({{"Base Station ID", station}}));
+    return groups;
+  };
+  ValueChanges changes;
+  changes.take(at(2, display("384", "1")));
+  changes.take(at(4, display("425", "1")));
+  changes.take(at(6, display("425", "2")));
+  EXPECT_THAT(changes.cells(), ElementsAre(ShownCell{"CDMA2000 base station", "384", "1"},
+                                           ShownCell{"CDMA2000 base station", "425", "2"}));
+}
+
+TEST(ValueChanges, WithoutAChannelOrANumberThereIsNoCellOfCdma) {
+  ValueChanges changes;
+  Value display = displayOf("Network", section({{"Base Station ID", "4660"}}));
+  display.dictionary()->set("EV-DO",
+                            section({{"Channel", "777"}, {"Serving Pilot PN Offset", "Invalid Value"}}));
+  display.dictionary()->set("UMTS", displayOf("Active Set", Value::ofArray({section({{"RSCP", "-90"}})})));
+  display.dictionary()->set("CDMA Cell", section({{"Base Station ID", "4660"}, {"PN", "12"}}));
+  changes.take(at(2, display));
+  EXPECT_THAT(changes.cells(), IsEmpty());
+}
+
+TEST(ValueChanges, APilotOfACandidateIsACellOfItsChannel) {
+  ValueChanges changes;
+  changes.take(at(2, displayOf("Reselection Candidates List",
+                               Value::ofArray({section({{"Channel", "283"}, {"Pilot", "12"}})}))));
+  EXPECT_THAT(changes.cells(), ElementsAre(ShownCell{"CDMA2000", "283", "12"}));
+}
+
 TEST(ValueChanges, ACellIsSeenWhenOnlyItsChannelChanges) {
   ValueChanges changes;
   for (const char* channel : {"", "100", "100", "200"})

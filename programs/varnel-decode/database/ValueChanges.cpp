@@ -23,9 +23,9 @@ constexpr std::size_t mostNodes = 4 * ValueChanges::mostPaths;
 
 // ---- What tells a cell ----
 
-enum class Radio : std::size_t { None, LTE, NR, UMTS, GSM };
-constexpr const char* radioNames[] = {"", "LTE", "NR", "UMTS", "GSM"};
-constexpr Radio radios[] = {Radio::LTE, Radio::NR, Radio::UMTS, Radio::GSM};
+enum class Radio : std::size_t { None, LTE, NR, UMTS, GSM, CDMA, CDMAStation };
+constexpr const char* radioNames[] = {"", "LTE", "NR", "UMTS", "GSM", "CDMA2000", "CDMA2000 base station"};
+constexpr Radio radios[] = {Radio::LTE, Radio::NR, Radio::UMTS, Radio::GSM, Radio::CDMA, Radio::CDMAStation};
 
 struct NamedEntry {
   std::string_view name;
@@ -46,6 +46,8 @@ constexpr NamedEntry channelEntries[] = {
     {"Downlink UARFCN", Radio::UMTS},
     {"Downlink Frequency", Radio::UMTS},
     {"ARFCN", Radio::GSM},
+    {"Rx0 Channel", Radio::CDMA},
+    {"Channel", Radio::CDMA},
 };
 
 // LTE and NR share the name of the identity, so the channel decides.
@@ -58,10 +60,21 @@ constexpr NamedEntry identityEntries[] = {
     {"PSC", Radio::UMTS},
     {"BSIC", Radio::GSM},
     {"BSIC ID", Radio::GSM},
+    {"Pilot", Radio::CDMA},
+    {"Serving Pilot PN Offset", Radio::CDMA},
+    {"Base Station ID", Radio::CDMAStation},
 };
 
+// A set of pilots has an entry per pilot, whose name is the pilot's PN.
+constexpr std::string_view pilotSet = "Active Set";
+// The system information tells of a base station, but not of its channel. That is in the section of the
+// radio.
+constexpr std::string_view radioOfStations = "1x", channelOfStations = "Rx0 Channel";
+
 // Some modems write the identity of a GSM cell as a number, and others its two parts: "2/5 (NCC/BCC)" is 21.
+// A pilot's PN may have a unit.
 std::string identityIn(const std::string& text, Radio radio) {
+  if (radio == Radio::CDMA) return text.substr(0, text.find(' '));
   constexpr std::string_view parts = " (NCC/BCC)";
   if (radio != Radio::GSM || text.size() != 3 + parts.size() || !text.ends_with(parts) || text[1] != '/')
     return text;
@@ -73,6 +86,10 @@ std::string identityIn(const std::string& text, Radio radio) {
 bool names(std::span<const NamedEntry> entries, std::string_view name, Radio radio) {
   return std::ranges::any_of(
       entries, [&](const NamedEntry& entry) { return entry.name == name && entry.radio == radio; });
+}
+
+bool isNumber(std::string_view text) {
+  return !text.empty() && std::ranges::all_of(text, [](char c) { return c >= '0' && c <= '9'; });
 }
 
 bool isNamed(std::span<const NamedEntry> entries, std::string_view name) {
@@ -102,6 +119,12 @@ struct ValueChanges::Node {
   std::vector<std::unique_ptr<Node>> children{};
   std::unordered_map<std::string_view, Node*> byName{};
   std::vector<Node*> channels{};  // children that tell the channel of a cell
+  bool isPilot = false;           // its name tells which pilot of a channel it is
+
+  const Node* childNamed(std::string_view child) const {
+    const auto found = byName.find(child);
+    return found == byName.end() ? nullptr : found->second;
+  }
 
   // Of a leaf.
   std::optional<std::string> text{};
@@ -189,7 +212,9 @@ ValueChanges::Node& ValueChanges::child(Node& node, std::size_t position, std::s
             .get();
     node.byName.emplace(found->name, found);
     if (isNamed(channelEntries, name)) node.channels.push_back(found);
-    if (isNamed(identityEntries, name)) _identities.push_back(found);
+    // A list of another radio has the same name. Its records have numbers too, but no texts.
+    found->isPilot = node.name == pilotSet && isNumber(name);
+    if (found->isPilot || isNamed(identityEntries, name)) _identities.push_back(found);
   }
   _names.push_back(found->name);
   return *found;
@@ -236,25 +261,40 @@ void ValueChanges::addChange(Node& leaf, std::optional<std::string_view> text) {
   _chunkSize += sizeof(Change) + (text ? text->size() : 0);
 }
 
+// The channel of a cell; null where none is shown.
+const ValueChanges::Node* ValueChanges::channelOf(const Node& identity, std::size_t radio) {
+  if (Radio(radio) == Radio::CDMAStation) {
+    const Node* const group = identity.parent ? identity.parent->parent : nullptr;
+    const Node* const section = group ? group->childNamed(radioOfStations) : nullptr;
+    const Node* const channel = section ? section->childNamed(channelOfStations) : nullptr;
+    return channel && channel->text ? channel : nullptr;
+  }
+  for (const Node* section = identity.parent; section; section = section->parent) {
+    const auto found = std::ranges::find_if(section->channels, [&](const Node* entry) {
+      return entry->text && names(channelEntries, entry->name, Radio(radio));
+    });
+    if (found != section->channels.end()) return *found;
+  }
+  return nullptr;
+}
+
 void ValueChanges::seeCell(const Node& identity) {
   for (const Radio radio : radios) {
-    if (!names(identityEntries, identity.name, radio)) continue;
-    const Node* channel = nullptr;
-    for (const Node* section = identity.parent; section && !channel; section = section->parent) {
-      const auto found = std::ranges::find_if(section->channels, [&](const Node* entry) {
-        return entry->text && names(channelEntries, entry->name, radio);
-      });
-      if (found != section->channels.end()) channel = *found;
-    }
-    if (!channel || (identity.changedAt != _now && channel->changedAt != _now)) continue;
+    const bool isOfRadio =
+        identity.isPilot ? radio == Radio::CDMA : names(identityEntries, identity.name, radio);
+    if (!isOfRadio) continue;
+    const Node* const channel = channelOf(identity, static_cast<std::size_t>(radio));
+    // System information comes later than a new channel, and is still that of the old one.
+    const bool isWithChannel = radio != Radio::CDMAStation && channel && channel->changedAt == _now;
+    if (!channel || (identity.changedAt != _now && !isWithChannel)) continue;
     const auto number = EntryFormats().number(*channel->text);
-    if (number.empty()) continue;
+    const std::string name = identityIn(identity.isPilot ? identity.name : *identity.text, radio);
+    if (number.empty() || (radio == Radio::CDMA && !isNumber(name))) continue;
     if (_cells.size() >= mostCells) {
       _isTooMuch = true;
       return;
     }
-    _cells.insert({radioNames[static_cast<std::size_t>(radio)], std::string(number),
-                   identityIn(*identity.text, radio)});
+    _cells.insert({radioNames[static_cast<std::size_t>(radio)], std::string(number), name});
   }
 }
 

@@ -21,9 +21,9 @@ namespace varnel {
 
 /// A cell that a display showed. Channel and identity are the texts of the display.
 struct ShownCell {
-  std::string radio;     ///< "LTE", "NR", "UMTS", or "GSM"
+  std::string radio;     ///< "LTE", "NR", "UMTS", "GSM", "CDMA2000", or "CDMA2000 base station"
   std::string channel;   ///< the number of its channel
-  std::string identity;  ///< physical cell identity, scrambling code, or BSIC
+  std::string identity;  ///< physical cell identity, scrambling code, BSIC, pilot PN, or base station
 
   // NOLINTNEXTLINE(modernize-use-nullptr): the 0 that it sees is the compiler's own
   friend auto operator<=>(const ShownCell&, const ShownCell&) = default;
@@ -86,6 +86,7 @@ class ValueChanges final : public GenerationSink {
   void see(Node& leaf, std::string_view text);
   void addChange(Node& leaf, std::optional<std::string_view> text);
   void seeCell(const Node& identity);
+  static const Node* channelOf(const Node& identity, std::size_t radio);
   std::optional<std::size_t> pathOf(Node& leaf);
   void spill();
 
