@@ -68,6 +68,7 @@ void VarnelApp::startOver() {
   showFirstStatus(varnelPane(*root));
   showNotice();
   showWindowTitle();
+  tellOfDisplay();
   _model->restartMonitorLater();
 }
 
@@ -133,7 +134,12 @@ void VarnelApp::updateViewControllerFromModel() {
   showWindowTitle();
   reopenPanes();
   linkWasLookedAt();
+  tellOfDisplay();
   _awaitedUpdates.countOne();
+}
+
+void VarnelApp::tellOfDisplay() const {
+  for (const auto& observer : _displayObservers) observer();
 }
 
 void VarnelApp::linkWasLost() {

@@ -4,6 +4,8 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "app/AwaitedUpdates.h"
 #include "app/DateFormatter.h"
@@ -67,6 +69,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void setObserver(std::function<void()> observer) { _observer = std::move(observer); }
   bool isConnected() const { return _model && _model->isConnected(); }
   bool hasDisplay() const { return _tree != nullptr; }
+  /// Calls this after each change of what the panes show: a refresh, and starting over. There may be several.
+  void observeDisplay(std::function<void()> observer) { _displayObservers.push_back(std::move(observer)); }
 
   /// The nodes of the display with these words in names and values (`findNodes`); none while there is no
   /// display.
@@ -114,6 +118,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void keepNumbers();
   void showTree(VarnelPaneController::Node root);
   VarnelPaneController& topPane() const;
+  void tellOfDisplay() const;
   void showNotice();
   void showWindowTitle();
   std::string updateMessageForNow() const;
@@ -125,6 +130,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   std::optional<std::string> _updateMessage;
   std::optional<DateFormatter> _dateFormatter;
   AwaitedUpdates _awaitedUpdates;
+  std::vector<std::function<void()>> _displayObservers;
   VarnelPaneController::Node _tree;  // the one that the panes show
   TreeChanges _changes;
   NoticeKeeper _notices;

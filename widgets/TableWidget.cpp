@@ -437,6 +437,18 @@ void TableWidget::wheelEvent(QWheelEvent* event) {
   event->accept();
 }
 
+// What is around the table opens the menu, for the row with the focus frame.
+void TableWidget::contextMenuEvent(QContextMenuEvent* event) {
+  _keysAreUsed = true;
+  const bool isAtPlace = event->reason() != QContextMenuEvent::Keyboard;
+  if (const auto row = isAtPlace ? rowAt(event->pos()) : std::nullopt) {
+    setFocus(Qt::OtherFocusReason);
+    makeCurrent(*row);
+  }
+  showEmphasis();
+  event->ignore();
+}
+
 void TableWidget::focusInEvent(QFocusEvent* event) {
   if (event->reason() == Qt::TabFocusReason || event->reason() == Qt::BacktabFocusReason) _keysAreUsed = true;
   QAbstractScrollArea::focusInEvent(event);

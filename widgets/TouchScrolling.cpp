@@ -1,10 +1,12 @@
 #include "widgets/TouchScrolling.h"
 
 #include <QApplication>
+#include <QContextMenuEvent>
 #include <QScrollBar>
 #include <QScrollEvent>
 #include <QScrollPrepareEvent>
 #include <QScroller>
+#include <QStyleHints>
 #include <QTouchEvent>
 #include <utility>
 
@@ -23,6 +25,10 @@ void tell(QWidget& viewport, QScroller::Input input, const QTouchEvent& event) {
   QScroller::scroller(&viewport)->handleInput(input, event.points().front().position(), time_ms);
 }
 
+bool isNear(const QPointF& place, const QPointF& began) {
+  return (place - began).manhattanLength() < QApplication::startDragDistance();
+}
+
 void setUp(QScroller& scroller) {
   QScrollerProperties properties = scroller.scrollerProperties();
   properties.setScrollMetric(QScrollerProperties::AxisLockThreshold, axisLock);
@@ -38,6 +44,8 @@ TouchScrolling::TouchScrolling(QAbstractScrollArea& area, RowAt rowAt, Tapped ta
     : _area(area), _rowAt(std::move(rowAt)), _tapped(std::move(tapped)) {
   _area.viewport()->setAttribute(Qt::WA_AcceptTouchEvents);
   setUp(*QScroller::scroller(_area.viewport()));
+  _rest.setSingleShot(true);
+  QObject::connect(&_rest, &QTimer::timeout, &_rest, [this] { askForMenu(); });
 }
 
 bool TouchScrolling::take(QEvent& event) {
@@ -55,12 +63,12 @@ bool TouchScrolling::take(QEvent& event) {
       end(static_cast<QTouchEvent&>(event));
       return true;
     case QEvent::TouchUpdate:
-      event.accept();
-      tell(*_area.viewport(), QScroller::InputMove, static_cast<QTouchEvent&>(event));
+      move(static_cast<QTouchEvent&>(event));
       return true;
     case QEvent::TouchCancel:
       event.accept();
       _tapBegan.reset();
+      _rest.stop();
       QScroller::scroller(_area.viewport())->stop();
       return true;
     default:
@@ -88,17 +96,38 @@ void TouchScrolling::begin(QTouchEvent& event) {
   event.accept();
   const bool stopsMovement = QScroller::scroller(_area.viewport())->state() == QScroller::Scrolling;
   _tapBegan.reset();
-  if (!stopsMovement && event.points().size() == 1) _tapBegan = event.points().front().position();
+  _rest.stop();
+  if (!stopsMovement && event.points().size() == 1) {
+    _tapBegan = event.points().front().position();
+    _rest.start(QGuiApplication::styleHints()->mousePressAndHoldInterval());
+  }
   tell(*_area.viewport(), QScroller::InputPress, event);
+}
+
+void TouchScrolling::move(QTouchEvent& event) {
+  event.accept();
+  if (_tapBegan && !event.points().isEmpty() && !isNear(event.points().front().position(), *_tapBegan))
+    _rest.stop();
+  tell(*_area.viewport(), QScroller::InputMove, event);
 }
 
 void TouchScrolling::end(QTouchEvent& event) {
   event.accept();
+  _rest.stop();
   tell(*_area.viewport(), QScroller::InputRelease, event);
   const auto began = std::exchange(_tapBegan, std::nullopt);
   if (!began || event.points().isEmpty()) return;
-  const QPointF movement = event.points().front().position() - *began;
-  if (movement.manhattanLength() < QApplication::startDragDistance()) _tapped(began->toPoint());
+  if (isNear(event.points().front().position(), *began)) _tapped(began->toPoint());
+}
+
+void TouchScrolling::askForMenu() {
+  const auto place = std::exchange(_tapBegan, std::nullopt);
+  if (!place) return;
+  // The menu takes the end of the touch.
+  QScroller::scroller(_area.viewport())->stop();
+  QContextMenuEvent wish(QContextMenuEvent::Mouse, place->toPoint(),
+                         _area.viewport()->mapToGlobal(place->toPoint()));
+  QCoreApplication::sendEvent(_area.viewport(), &wish);
 }
 
 }  // namespace varnel

@@ -3,6 +3,7 @@
 #include <QAbstractScrollArea>
 #include <QEvent>
 #include <QPointer>
+#include <QTimer>
 #include <functional>
 #include <optional>
 
@@ -15,7 +16,7 @@ class QTouchEvent;
 namespace varnel {
 
 /// A finger on a table. Up and down it moves the table; sideways it moves the row below it; a tap chooses a
-/// row.
+/// row. A finger that rests asks for the menu, like the right mouse button.
 class TouchScrolling final {
  public:
   using RowAt = std::function<RowWidget*(const QPoint& position)>;
@@ -30,12 +31,15 @@ class TouchScrolling final {
   void prepare(QScrollPrepareEvent& event);
   void scroll(QScrollEvent& event);
   void begin(QTouchEvent& event);
+  void move(QTouchEvent& event);
   void end(QTouchEvent& event);
+  void askForMenu();
 
   QAbstractScrollArea& _area;
   RowAt _rowAt;
   Tapped _tapped;
   QPointer<RowWidget> _row;          // the row under the finger
+  QTimer _rest;                      // runs while the touch may still become a rest
   std::optional<QPointF> _tapBegan;  // set while the touch may still become a tap
 };
 

@@ -39,6 +39,8 @@ class WindowWidget final : public QWidget, public Window {
   QAction& addCommand(const QString& text, const QList<QKeySequence>& keys, std::function<void()> act);
   /// Lays a page with this content above the stack, in place of an earlier page. It covers the whole stack.
   void showPage(const QString& title, std::unique_ptr<QWidget> content);
+  /// True while a save screen or an alert has the keyboard.
+  bool isCovered() const;
   /// Null before `setRoot`.
   NavigationWidget* stack() const { return _root; }
   /// Does nothing when there is no page.
@@ -69,7 +71,6 @@ class WindowWidget final : public QWidget, public Window {
  private:
   void dropRoot();
   void arrange();
-  bool isCovered() const;
 
   QSize ordinarySize() const;
 

@@ -1,7 +1,6 @@
 #include "programs/varnel-decode/TreeWriters.h"
 
 #include <memory>
-#include <nlohmann/json.hpp>
 #include <optional>
 #include <stdexcept>
 
@@ -51,28 +50,6 @@ void appendPaths(std::string& lines, const VarnelModelNode& node, const std::str
     appendPaths(lines, *child, childPath(path, child->displayName()));
 }
 
-// Written by hand, since no JSON library holds an object with the same name twice.
-void appendJson(std::string& json, const VarnelModelNode& node) {
-  const auto* tree = dynamic_cast<const VarnelModelTreeNode*>(&node);
-  if (!tree) {
-    json += jsonString(*node.value());
-    return;
-  }
-  const bool isArray = tree->origin() == VarnelModelTreeNode::Origin::Array;
-  json += isArray ? '[' : '{';
-  std::string_view separator;
-  for (const auto& child : *tree->childNodes()) {
-    json += separator;
-    separator = ",";
-    if (!isArray) {
-      json += jsonString(child->displayName());
-      json += ':';
-    }
-    appendJson(json, *child);
-  }
-  json += isArray ? ']' : '}';
-}
-
 }  // namespace
 
 std::string displayAsText(const Value& display) { return treeAsText(*treeOf(display)); }
@@ -83,17 +60,7 @@ std::string displayAsPaths(const Value& display) {
   return lines;
 }
 
-std::string jsonString(const std::string& text) {
-  using Json = nlohmann::json;
-  // The library escapes all control characters except DEL and C1.
-  return printable(Json(text).dump(-1, ' ', false, Json::error_handler_t::replace));
-}
-
-std::string treeAsJson(const Value& display) {
-  std::string json;
-  appendJson(json, *treeOf(display));
-  return json;
-}
+std::string treeAsJson(const Value& display) { return treeAsJson(*treeOf(display)); }
 
 std::string displayAsJson(const Value& display) { return treeAsJson(display) + '\n'; }
 

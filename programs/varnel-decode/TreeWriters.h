@@ -4,6 +4,7 @@
 #include <string_view>
 
 #include "base/Value.h"
+#include "programs/shared/TreeJson.h"
 
 namespace varnel {
 
@@ -31,8 +32,6 @@ std::string displayAsNothing(const Value& display);
 
 /// The display tree as in `displayAsJson`, without the newline.
 std::string treeAsJson(const Value& display);
-/// A text as a JSON string.
-std::string jsonString(const std::string& text);
 
 struct DisplayFormat {
   std::string_view name;

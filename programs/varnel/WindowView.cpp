@@ -2,11 +2,14 @@
 
 #include <csignal>
 
+#include "app/RowAnswers.h"
+#include "app/ValueHistory.h"
 #include "app/VarnelApp.h"
 #include "host/SignalWatcher.h"
 #include "host/StateFolder.h"
 #include "programs/varnel/HostServices.h"
 #include "programs/varnel/PlayedFile.h"
+#include "programs/varnel/RowCommands.h"
 #include "widgets/WidgetApplication.h"
 #include "widgets/WidgetUserInterface.h"
 
@@ -23,7 +26,13 @@ class WindowViewer final {
         _file(options, _services),
         _userInterface({.close = [this] { _host.end(0); }, .startOver = [this] { _app.startOver(); }},
                        RememberedSize(stateFolder())),
-        _app({_services.model(), _services.files(), _services.preferences(), _userInterface}),
+        _answers(_services.model().generator.resources, _services.model().generator.clock, _history),
+        _app({.model = _services.model(),
+              .files = _services.files(),
+              .preferences = _services.preferences(),
+              .userInterface = _userInterface,
+              .history = &_history}),
+        _rowCommands(_app, _answers),
         _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [this](int signal) { take(signal); }) {
     _userInterface.setWindowObserver([this](WindowWidget& window) { furnish(window); });
     if (options.updates) _app.afterUpdates(*options.updates, [this] { _host.end(0); });
@@ -49,13 +58,16 @@ class WindowViewer final {
   }
 
   // What the user can do in the window beyond the screens of the application.
-  void furnish(WindowWidget&) {}
+  void furnish(WindowWidget& window) { _rowCommands.addTo(window); }
 
   WidgetApplication& _host;
   HostServices _services;
   const PlayedFile _file;
   WidgetUserInterface _userInterface;
+  ValueHistory _history;
+  RowAnswers _answers;
   VarnelApp _app;
+  RowCommands _rowCommands;
   const SignalWatcher _watcher;
 };
 

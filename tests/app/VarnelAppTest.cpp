@@ -771,5 +771,16 @@ TEST_F(VarnelAppTest, WhatTheHistoryHadToForgetIsInTheNotice) {
             "are gone");
 }
 
+TEST_F(VarnelAppTest, ObserversLearnOfEachRefreshAndOfStartingOver) {
+  std::vector<std::size_t> found;
+  app.observeDisplay([&] { found.push_back(app.find("internet").size()); });
+  launchWith(1);
+  EXPECT_THAT(found, ElementsAre(1u));
+  receive(2);
+  EXPECT_THAT(found, ElementsAre(1u, 2u)) << "the panes show the new display already";
+  app.startOver();
+  EXPECT_THAT(found, ElementsAre(1u, 2u, 0u));
+}
+
 }  // namespace
 }  // namespace varnel

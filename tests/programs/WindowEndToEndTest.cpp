@@ -1,7 +1,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <QClipboard>
+#include <QGuiApplication>
 #include <QLabel>
+#include <QMenu>
+#include <QTextBrowser>
 #include <algorithm>
 #include <filesystem>
 #include <memory>
@@ -15,11 +19,15 @@
 #include "host/CaptureWriter.h"
 #include "host/captures/Capture.h"
 #include "programs/varnel/HostServices.h"
+#include "programs/varnel/RowCommands.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/EventLoop.h"
 #include "tests/support/PacketBuilder.h"
 #include "tests/support/Process.h"
 #include "tests/support/TestWidgets.h"
+#include "widgets/HelpPage.h"
+#include "widgets/RowMenu.h"
+#include "widgets/SearchPage.h"
 
 namespace varnel {
 namespace {
@@ -49,6 +57,7 @@ class WindowEndToEnd : public testing::Test {
     fs::create_directories(_device.path() /
                            "OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle");
     fs::create_directories(_logs);
+    _userInterface.setWindowObserver([this](WindowWidget& window) { _rowCommands.addTo(window); });
   }
   ~WindowEndToEnd() override { _app.applicationWillTerminate(); }
 
@@ -106,6 +115,22 @@ class WindowEndToEnd : public testing::Test {
     return runUntil([this, former = status()] { return isUpdated() && status() != former; }, patience);
   }
 
+  std::string currentRow() {
+    const RowWidget* const row = pane().tableWidget().currentRow();
+    return row ? row->description().toStdString() : "(none)";
+  }
+  static std::string copied() { return QGuiApplication::clipboard()->text().toStdString(); }
+  // Opens the search, and returns when this has been found.
+  void find(const QString& words, const std::string& value) {
+    press(Qt::Key_F, Qt::ControlModifier);
+    QTest::keyClicks(QApplication::focusWidget(), words);
+    ASSERT_TRUE(runUntil(
+        [&] {
+          const auto* const page = qobject_cast<SearchPage*>(window().page());
+          return page && page->currentRow() && page->currentRow()->value.starts_with(value);
+        },
+        patience));
+  }
   static void press(Qt::Key key, Qt::KeyboardModifiers modifiers = Qt::NoModifier) {
     QTest::keyClick(QApplication::focusWidget(), key, modifiers);
   }
@@ -157,7 +182,15 @@ class WindowEndToEnd : public testing::Test {
   const ApplicationInfo _application{.version = "1.0", .buildDate = "Mar 01 2024 12:05"};
   HostServices _services{viewerOptions(), _application};
   WidgetUserInterface _userInterface{{.startOver = [this] { _app.startOver(); }}};
-  VarnelApp _app{{_services.model(), _services.files(), _services.preferences(), _userInterface}};
+  ValueHistory _history;
+  const RowAnswers _answers{_services.model().generator.resources, _services.model().generator.clock,
+                            _history};
+  VarnelApp _app{{.model = _services.model(),
+                  .files = _services.files(),
+                  .preferences = _services.preferences(),
+                  .userInterface = _userInterface,
+                  .history = &_history}};
+  RowCommands _rowCommands{_app, _answers};
 };
 
 TEST_F(WindowEndToEnd, TheDisplayOutlivesTheServerUntilTheUserStartsOver) {
@@ -244,6 +277,100 @@ TEST_F(WindowEndToEnd, ASnapshotTellsWhatTheServerSent) {
   EXPECT_TRUE(std::ranges::any_of(sentMessages(), [&](const Bytes& message) {
     return std::search(log->begin(), log->end(), message.begin(), message.end()) != log->end();
   })) << text;
+}
+
+TEST_F(WindowEndToEnd, FindGoesToARowAnywhereByNameAndValue) {
+  simulate("7");
+  launch();
+  ASSERT_TRUE(runUntil([this] { return isUpdated() && hasRow(measurements); }, patience));
+  find("serving average rsrp", "-");
+  const Texts before = {qobject_cast<SearchPage*>(window().page())->currentRow()->value};
+  EXPECT_TRUE(runUntil(
+      [&] { return qobject_cast<SearchPage*>(window().page())->currentRow()->value != before[0]; }, patience))
+      << "results follow the refreshes";
+  press(Qt::Key_Return);
+  EXPECT_FALSE(window().page());
+  EXPECT_EQ(title(), measurements);
+  EXPECT_THAT(currentRow(), testing::StartsWith("Average RSRP: -"));
+
+  press(Qt::Key_Slash);
+  ASSERT_TRUE(window().page());
+  press(Qt::Key_Escape);
+  EXPECT_FALSE(window().page());
+  EXPECT_THAT(currentRow(), testing::StartsWith("Average RSRP: -")) << "Escape leaves everything as it was";
+  find("dbm", "-");
+  EXPECT_GT(qobject_cast<SearchPage*>(window().page())->findChild<QListView*>()->model()->rowCount(), 3);
+}
+
+TEST_F(WindowEndToEnd, TheRowWithTheFocusIsCopiedInEveryForm) {
+  simulate("7");
+  launch();
+  openMeasurements();
+  killServer();  // so that the values stand
+  press(Qt::Key_Home);
+  while (!currentRow().starts_with("Average RSRP: ")) press(Qt::Key_Down);
+  const std::string value = currentRow().substr(std::string("Average RSRP: ").size());
+  press(Qt::Key_C, Qt::ControlModifier);
+  EXPECT_EQ(copied(), value);
+  press(Qt::Key_C, Qt::ControlModifier | Qt::ShiftModifier);
+  EXPECT_EQ(copied(), "Average RSRP\t" + value);
+  const auto copyOf = [this](const char* name) {
+    for (QAction* const action : window().actions()) {
+      if (action->text() == name) action->trigger();
+    }
+    return copied();
+  };
+  EXPECT_EQ(copyOf("Copy the path"), "/Serving Cell Measurements/Average RSRP");
+  EXPECT_THAT(copyOf("Copy the section as text"), testing::ContainsRegex("Average RSRP +" + value));
+  EXPECT_THAT(copyOf("Copy the section as JSON"), testing::HasSubstr("\"Average RSRP\":\"" + value + "\""));
+}
+
+TEST_F(WindowEndToEnd, TheMenuBelongsToTheRowUnderTheMouseAndHasEverything) {
+  simulate("7");
+  launch();
+  ASSERT_TRUE(runUntil([this] { return isUpdated() && hasRow(measurements); }, patience));
+  auto* const rowMenu = window().findChild<RowMenu*>();
+  ASSERT_TRUE(rowMenu);
+  const RowWidget* const third = pane().tableWidget().visibleRows().at(2);
+  const QPoint place = third->geometry().center();
+  QContextMenuEvent wish(QContextMenuEvent::Mouse, place,
+                         pane().tableWidget().viewport()->mapToGlobal(place));
+  QApplication::sendEvent(pane().tableWidget().viewport(), &wish);
+  ASSERT_TRUE(rowMenu->menu());
+  EXPECT_EQ(currentRow(), third->description().toStdString());
+  EXPECT_TRUE(third->emphasis().hasFocusFrame);
+  for (QAction* const action : window().actions()) {
+    EXPECT_TRUE(action->text().isEmpty() || rowMenu->menu()->actions().contains(action))
+        << action->text().toStdString();
+  }
+  QTest::keyClick(rowMenu->menu(), Qt::Key_Escape);
+  EXPECT_TRUE(runUntil([&] { return !rowMenu->menu(); }, patience));
+  window().activateWindow();
+  ASSERT_TRUE(QTest::qWaitForWindowActive(&window(), patience_ms));
+  press(Qt::Key_F10, Qt::ShiftModifier);
+  ASSERT_TRUE(rowMenu->menu());
+  EXPECT_EQ(currentRow(), third->description().toStdString());
+  rowMenu->menu()->close();
+}
+
+TEST_F(WindowEndToEnd, HelpBeginsWithTheRowAndHasEveryKey) {
+  simulate("7");
+  launch();
+  openMeasurements();
+  press(Qt::Key_Home);
+  while (!currentRow().starts_with("Average RSRP: ")) press(Qt::Key_Down);
+  press(Qt::Key_Question);
+  const auto* const page = qobject_cast<HelpPage*>(window().page());
+  ASSERT_TRUE(page);
+  const std::string sheet = page->toPlainText().toStdString();
+  EXPECT_THAT(sheet, testing::HasSubstr("This row: Serving Cell Measurements > Average RSRP\n"));
+  EXPECT_THAT(sheet, testing::HasSubstr("3GPP TS 36.214"));
+  for (const QAction* const action : window().actions()) {
+    for (const QKeySequence& key : action->shortcuts())
+      EXPECT_THAT(sheet, testing::HasSubstr(key.toString(QKeySequence::NativeText).toStdString()));
+  }
+  press(Qt::Key_F1);
+  EXPECT_FALSE(window().page()) << "the same key closes it";
 }
 
 }  // namespace

@@ -3,8 +3,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <QContextMenuEvent>
 #include <QPointingDevice>
 #include <QScrollBar>
+#include <QStyleHints>
 
 #include "tests/support/TestWidgets.h"
 
@@ -13,6 +15,16 @@ namespace {
 
 using testing::ElementsAre;
 using testing::IsEmpty;
+
+// The wishes for a menu that reach the widget, and their places in it.
+class MenuWishes : public QObject {
+ public:
+  bool eventFilter(QObject*, QEvent* event) override {
+    if (event->type() == QEvent::ContextMenu) places.push_back(static_cast<QContextMenuEvent&>(*event).pos());
+    return false;
+  }
+  std::vector<QPoint> places;
+};
 
 class TouchScrollingTest : public testing::Test {
  protected:
@@ -50,6 +62,28 @@ TEST_F(TouchScrollingTest, AFingerSidewaysScrollsItsRowOnly) {
   EXPECT_EQ(table.visibleRows().at(0)->sidewaysPosition(), 0);
   EXPECT_EQ(table.verticalScrollBar()->value(), 0);
   EXPECT_THAT(delegate.chosen, IsEmpty());
+}
+
+TEST_F(TouchScrollingTest, AFingerThatRestsAsksForTheMenuOfItsRow) {
+  MenuWishes wishes;
+  table.installEventFilter(&wishes);
+  QTest::touchEvent(&table, finger.get()).press(0, QPoint(100, 125), table.viewport());
+  EXPECT_TRUE(QTest::qWaitFor([&] { return !wishes.places.empty(); }, patience_ms));
+  EXPECT_THAT(wishes.places, ElementsAre(QPoint(100, 125)));
+  EXPECT_EQ(table.currentRow()->row(), 2u);
+  EXPECT_TRUE(table.currentRow()->emphasis().hasFocusFrame);
+  QTest::touchEvent(&table, finger.get()).release(0, QPoint(100, 125), table.viewport());
+  QTest::qWait(20);
+  EXPECT_THAT(delegate.chosen, IsEmpty()) << "it was no tap";
+}
+
+TEST_F(TouchScrollingTest, AFingerThatMovesAsksForNoMenu) {
+  MenuWishes wishes;
+  table.installEventFilter(&wishes);
+  QTest::touchEvent(&table, finger.get()).press(0, QPoint(100, 125), table.viewport());
+  QTest::touchEvent(&table, finger.get()).move(0, QPoint(100, 325), table.viewport());
+  QTest::qWait(2 * QGuiApplication::styleHints()->mousePressAndHoldInterval());
+  EXPECT_THAT(wishes.places, IsEmpty());
 }
 
 TEST_F(TouchScrollingTest, ATapChoosesItsRowOnce) {

@@ -1,0 +1,115 @@
+#include "programs/varnel/RowCommands.h"
+
+#include <QClipboard>
+#include <QGuiApplication>
+#include <QToolTip>
+#include <utility>
+
+#include "programs/varnel/RowCopies.h"
+#include "widgets/HelpPage.h"
+#include "widgets/QtValues.h"
+#include "widgets/RowMenu.h"
+#include "widgets/SearchPage.h"
+
+namespace varnel {
+
+namespace {
+
+constexpr int shownOfCopy = 60;  // characters
+
+// Says what was copied, since nothing else on the screen changes.
+void confirm(WindowWidget& window, const QString& copied) {
+  QString first = copied.section(u'\n', 0, 0).simplified();
+  if (first.size() > shownOfCopy || copied.trimmed().contains(u'\n'))
+    first = first.left(shownOfCopy) + QStringLiteral("…");
+  QToolTip::showText(placeOfFocus(window), plainTooltip(QStringLiteral("Copied: ") + first), &window);
+}
+
+}  // namespace
+
+RowCommands::RowCommands(VarnelApp& app, const RowAnswers& answers) : _app(app), _answers(answers) {
+  _app.observeDisplay([this] { followDisplay(); });
+}
+
+void RowCommands::addTo(WindowWidget& window) {
+  _window = &window;
+  window.addCommand(QStringLiteral("Find a row"),
+                    {QKeySequence(Qt::CTRL | Qt::Key_F), QKeySequence(Qt::Key_Slash)}, [this] { find(); });
+  const QList<QAction*> rowActions{
+      addCopy(QStringLiteral("Copy the value"), {QKeySequence(Qt::CTRL | Qt::Key_C)}, copied(copyOfValue)),
+      addCopy(QStringLiteral("Copy the row"), {QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_C)},
+              copied(copyOfRow)),
+      addCopy(QStringLiteral("Copy the section as text"), {}, copied(copyOfSectionAsText)),
+      addCopy(QStringLiteral("Copy the section as JSON"), {}, copied(copyOfSectionAsJson)),
+      addCopy(QStringLiteral("Copy the path"), {}, [](const NamePath& names) {
+        return names.empty() ? std::string("/") : RowAnswers::pathOf(names);
+      })};
+  auto* const menu = new RowMenu(window, rowActions);
+  window.addCommand(QStringLiteral("Help: keys, and what the row means"),
+                    {QKeySequence(Qt::Key_F1), QKeySequence(Qt::Key_Question)}, [this] { help(); });
+  window.addCommand(QStringLiteral("Open the menu of the row"),
+                    {QKeySequence(Qt::Key_Menu), QKeySequence(Qt::SHIFT | Qt::Key_F10)}, [this, menu] {
+                      if (!_window->page()) menu->open();
+                    });
+}
+
+QAction* RowCommands::addCopy(const QString& text, const QList<QKeySequence>& keys,
+                              std::function<std::string(const NamePath&)> contents) {
+  return &_window->addCommand(text, keys, [this, contents = std::move(contents)] {
+    const std::string text = contents(names());
+    if (text.empty()) return;
+    const QString copied = QString::fromStdString(text);
+    QGuiApplication::clipboard()->setText(copied);
+    confirm(*_window, copied);
+  });
+}
+
+std::function<std::string(const NamePath&)> RowCommands::copied(Copy copy) const {
+  return [this, copy](const NamePath& names) {
+    const VarnelModelNode* const root = _app.nodeAt({});
+    return root ? copy(*root, names) : std::string();
+  };
+}
+
+// The row of the search while it is open, else the row with the keyboard's focus.
+NamePath RowCommands::names() const {
+  if (const auto* const page = qobject_cast<SearchPage*>(_window->page())) {
+    const auto row = page->currentRow();
+    return row ? row->path : NamePath();
+  }
+  return _window->pathOfFocus();
+}
+
+void RowCommands::find() {
+  if (auto* const page = qobject_cast<SearchPage*>(_window->page())) return page->startOver();
+  const auto search = [this](const std::string& words) {
+    std::vector<SearchResult> rows;
+    for (auto& node : _app.find(words)) rows.push_back({std::move(node.path), std::move(node.value)});
+    return rows;
+  };
+  const auto goTo = [this](const SearchResult& row) {
+    _window->closePage();
+    _app.goTo(row.path);
+  };
+  _window->showPage(QStringLiteral("Find"), std::make_unique<SearchPage>(search, goTo));
+}
+
+void RowCommands::help() {
+  if (qobject_cast<HelpPage*>(_window->page())) return _window->closePage();
+  const NamePath row = names();
+  const auto about = [this, row] {
+    const VarnelModelNode* const node = row.empty() ? nullptr : _app.nodeAt(row);
+    return node ? _answers.everything(*node, row) : std::string();
+  };
+  std::vector<KeyHelp> keys = keysOfPanes();
+  for (KeyHelp& key : keysOf(_window->actions())) keys.push_back(std::move(key));
+  _window->showPage(QStringLiteral("Help"), std::make_unique<HelpPage>(about, std::move(keys)));
+}
+
+void RowCommands::followDisplay() const {
+  if (!_window) return;
+  if (auto* const page = qobject_cast<SearchPage*>(_window->page())) page->searchAgain();
+  if (auto* const page = qobject_cast<HelpPage*>(_window->page())) page->updateAbout();
+}
+
+}  // namespace varnel

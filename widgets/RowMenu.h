@@ -1,0 +1,40 @@
+#pragma once
+
+#include <QList>
+#include <QMenu>
+#include <QPointer>
+
+#include "widgets/WindowWidget.h"
+
+namespace varnel {
+
+/// The middle of the row with the keyboard's focus on the screen, or else that of the window.
+QPoint placeOfFocus(const WindowWidget& window);
+
+/// The menu of the row with the keyboard's focus: the actions of the row, then the others of the window, so
+/// that everything can be had without a keyboard. The right mouse button, a finger that rests, and the Menu
+/// key open it.
+class RowMenu final : public QObject {
+  Q_OBJECT
+
+ public:
+  /// The window owns the menu. Actions that the window gets later are in it too.
+  RowMenu(WindowWidget& window, QList<QAction*> rowActions);
+
+  /// Opens at the focused row, or in the middle of the window.
+  void open();
+  /// Opens at this place of the screen. Does nothing while it is open.
+  void openAt(const QPoint& place);
+  /// Null while it is not open.
+  QMenu* menu() const { return _menu; }
+
+ protected:
+  bool eventFilter(QObject* watched, QEvent* event) override;
+
+ private:
+  WindowWidget& _window;
+  const QList<QAction*> _rowActions;
+  QPointer<QMenu> _menu;
+};
+
+}  // namespace varnel
