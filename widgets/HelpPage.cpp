@@ -73,10 +73,11 @@ QString HelpPage::sheet(const QString& about) const {
     html += QStringLiteral("<p>") + lines.trimmed().replace(u'\n', QStringLiteral("<br>")) +
             QStringLiteral("</p>");
   }
-  html += heading(QStringLiteral("Keys")) + QStringLiteral("<table cellspacing=\"0\" cellpadding=\"3\">");
+  html += heading(QStringLiteral("Keys")) +
+          QStringLiteral("<table width=\"100%\" cellspacing=\"0\" cellpadding=\"3\">");
   for (const KeyHelp& key : _keys) {
-    html += QStringLiteral("<tr><td><b>") + key.keys.toHtmlEscaped() + QStringLiteral("</b>&nbsp;</td><td>") +
-            key.deed.toHtmlEscaped() + QStringLiteral("</td></tr>");
+    html += QStringLiteral("<tr><td width=\"42%\"><b>") + key.keys.toHtmlEscaped() +
+            QStringLiteral("</b>&nbsp;</td><td>") + key.deed.toHtmlEscaped() + QStringLiteral("</td></tr>");
   }
   html += QStringLiteral("</table><p>");
   html += QStringLiteral(

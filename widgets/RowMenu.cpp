@@ -1,12 +1,18 @@
 #include "widgets/RowMenu.h"
 
 #include <QContextMenuEvent>
-#include <utility>
 
 namespace varnel {
 
-RowMenu::RowMenu(WindowWidget& window, QList<QAction*> rowActions)
-    : QObject(&window), _window(window), _rowActions(std::move(rowActions)) {
+namespace {
+
+const QString roomyItems = QStringLiteral(
+    "QMenu::item { padding: 11px 14px; }"
+    "QMenu::item:selected { background: palette(highlight); color: palette(highlighted-text); }");
+
+}  // namespace
+
+RowMenu::RowMenu(WindowWidget& window) : QObject(&window), _window(window), _lastActions(window.actions()) {
   _window.installEventFilter(this);
 }
 
@@ -16,18 +22,22 @@ QPoint placeOfFocus(const WindowWidget& window) {
   return row ? row->mapToGlobal(row->rect().center()) : window.mapToGlobal(window.rect().center());
 }
 
-void RowMenu::open() { openAt(placeOfFocus(_window)); }
+void RowMenu::open() { openAt(placeOfFocus(_window), Items::ForMouse); }
 
-void RowMenu::openAt(const QPoint& place) {
+void RowMenu::openAt(const QPoint& place, Items items) {
   if (_menu) return;
   _menu = new QMenu(&_window);
   _menu->setAttribute(Qt::WA_DeleteOnClose);
+  if (items == Items::ForFinger) _menu->setStyleSheet(roomyItems);
   _menu->addActions(_rowActions);
   _menu->addSeparator();
   for (QAction* const action : _window.actions()) {
-    if (action->isVisible() && !action->text().isEmpty() && !_rowActions.contains(action))
-      _menu->addAction(action);
+    const bool isElsewhere =
+        _rowActions.contains(action) || _lastActions.contains(action) || action == _leftOut;
+    if (!action->text().isEmpty() && !isElsewhere) _menu->addAction(action);
   }
+  _menu->addSeparator();
+  _menu->addActions(_lastActions);
   _menu->popup(place);
 }
 
@@ -40,7 +50,7 @@ bool RowMenu::eventFilter(QObject* watched, QEvent* event) {
   if (wish.reason() == QContextMenuEvent::Keyboard) {
     open();
   } else {
-    openAt(wish.globalPos());
+    openAt(wish.globalPos(), wish.reason() == QContextMenuEvent::Other ? Items::ForFinger : Items::ForMouse);
   }
   return true;
 }

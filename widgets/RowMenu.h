@@ -3,6 +3,7 @@
 #include <QList>
 #include <QMenu>
 #include <QPointer>
+#include <utility>
 
 #include "widgets/WindowWidget.h"
 
@@ -18,13 +19,22 @@ class RowMenu final : public QObject {
   Q_OBJECT
 
  public:
-  /// The window owns the menu. Actions that the window gets later are in it too.
-  RowMenu(WindowWidget& window, QList<QAction*> rowActions);
+  /// The window owns the menu. The actions that the window has by now come last. Those that it gets later are
+  /// in the menu too.
+  explicit RowMenu(WindowWidget& window);
+
+  /// These come first.
+  void setRowActions(QList<QAction*> actions) { _rowActions = std::move(actions); }
+  /// This one is not in the menu.
+  void leaveOut(const QAction& action) { _leftOut = &action; }
+
+  /// How much room an item has.
+  enum class Items { ForMouse, ForFinger };
 
   /// Opens at the focused row, or in the middle of the window.
   void open();
   /// Opens at this place of the screen. Does nothing while it is open.
-  void openAt(const QPoint& place);
+  void openAt(const QPoint& place, Items items);
   /// Null while it is not open.
   QMenu* menu() const { return _menu; }
 
@@ -33,7 +43,9 @@ class RowMenu final : public QObject {
 
  private:
   WindowWidget& _window;
-  const QList<QAction*> _rowActions;
+  const QList<QAction*> _lastActions;
+  QList<QAction*> _rowActions;
+  const QAction* _leftOut = nullptr;
   QPointer<QMenu> _menu;
 };
 

@@ -125,7 +125,7 @@ void TouchScrolling::askForMenu() {
   if (!place) return;
   // The menu takes the end of the touch.
   QScroller::scroller(_area.viewport())->stop();
-  QContextMenuEvent wish(QContextMenuEvent::Mouse, place->toPoint(),
+  QContextMenuEvent wish(QContextMenuEvent::Other, place->toPoint(),
                          _area.viewport()->mapToGlobal(place->toPoint()));
   QCoreApplication::sendEvent(_area.viewport(), &wish);
 }

@@ -33,24 +33,26 @@ RowCommands::RowCommands(VarnelApp& app, const RowAnswers& answers) : _app(app),
 
 void RowCommands::addTo(WindowWidget& window) {
   _window = &window;
+  auto* const menu = new RowMenu(window);
   window.addCommand(QStringLiteral("Find a row"),
                     {QKeySequence(Qt::CTRL | Qt::Key_F), QKeySequence(Qt::Key_Slash)}, [this] { find(); });
-  const QList<QAction*> rowActions{
-      addCopy(QStringLiteral("Copy the value"), {QKeySequence(Qt::CTRL | Qt::Key_C)}, copied(copyOfValue)),
-      addCopy(QStringLiteral("Copy the row"), {QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_C)},
-              copied(copyOfRow)),
-      addCopy(QStringLiteral("Copy the section as text"), {}, copied(copyOfSectionAsText)),
-      addCopy(QStringLiteral("Copy the section as JSON"), {}, copied(copyOfSectionAsJson)),
-      addCopy(QStringLiteral("Copy the path"), {}, [](const NamePath& names) {
-        return names.empty() ? std::string("/") : RowAnswers::pathOf(names);
-      })};
-  auto* const menu = new RowMenu(window, rowActions);
-  window.addCommand(QStringLiteral("Help: keys, and what the row means"),
-                    {QKeySequence(Qt::Key_F1), QKeySequence(Qt::Key_Question)}, [this] { help(); });
-  window.addCommand(QStringLiteral("Open the menu of the row"),
-                    {QKeySequence(Qt::Key_Menu), QKeySequence(Qt::SHIFT | Qt::Key_F10)}, [this, menu] {
-                      if (!_window->page()) menu->open();
-                    });
+  menu->setRowActions(
+      {addCopy(QStringLiteral("Copy the value"), {QKeySequence(Qt::CTRL | Qt::Key_C)}, copied(copyOfValue)),
+       addCopy(QStringLiteral("Copy the row"), {QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_C)},
+               copied(copyOfRow)),
+       addCopy(QStringLiteral("Copy the section as text"), {}, copied(copyOfSectionAsText)),
+       addCopy(QStringLiteral("Copy the section as JSON"), {}, copied(copyOfSectionAsJson)),
+       addCopy(QStringLiteral("Copy the path"), {}, [](const NamePath& names) {
+         return names.empty() ? std::string("/") : RowAnswers::pathOf(names);
+       })});
+  window.addCommand(QStringLiteral("Help"), {QKeySequence(Qt::Key_F1), QKeySequence(Qt::Key_Question)},
+                    [this] { help(); });
+  const QAction& open =
+      window.addCommand(QStringLiteral("Menu of the row"),
+                        {QKeySequence(Qt::Key_Menu), QKeySequence(Qt::SHIFT | Qt::Key_F10)}, [this, menu] {
+                          if (!_window->page()) menu->open();
+                        });
+  menu->leaveOut(open);
 }
 
 QAction* RowCommands::addCopy(const QString& text, const QList<QKeySequence>& keys,
