@@ -236,6 +236,16 @@ const VarnelModelNode* VarnelApp::nodeAt(const NamePath& path) const {
   return _tree ? nodeUnderNames(*_tree, path) : nullptr;
 }
 
+bool VarnelApp::hasRecordsAt(const NamePath& path) const {
+  const VarnelModelNode* const node = path.empty() ? nullptr : nodeAt(path);
+  return node && isListOfRecords(*node);
+}
+
+std::optional<RecordList> VarnelApp::recordsAt(const NamePath& path) const {
+  if (!_tree) return std::nullopt;
+  return recordsOf(*_tree, path, _model ? _model->numberFormats() : NumberFormats());
+}
+
 void VarnelApp::goTo(const NamePath& path) {
   if (path.empty() || !nodeAt(path)) return;
   _navController->popTo(*_navController->controllers().front(), Animation::None);

@@ -10,6 +10,7 @@
 #include "app/AwaitedUpdates.h"
 #include "app/DateFormatter.h"
 #include "app/NoticeKeeper.h"
+#include "app/RecordLists.h"
 #include "app/RowFacts.h"
 #include "app/SaveControl.h"
 #include "app/TreeSearch.h"
@@ -77,6 +78,10 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   std::vector<FoundNode> find(std::string_view words) const;
   /// The node at the end of these names; null when there is none.
   const VarnelModelNode* nodeAt(const NamePath& path) const;
+  /// Whether the node under these names is a list of records.
+  bool hasRecordsAt(const NamePath& path) const;
+  /// These records; nothing when there is no list under these names.
+  std::optional<RecordList> recordsAt(const NamePath& path) const;
   /// Opens the panes above this node and selects its row. Does nothing when there is no such node any more.
   void goTo(const NamePath& path);
 

@@ -23,13 +23,21 @@ int widthOf(const QString& text, double size) {
 }  // namespace
 
 HeaderWidget::HeaderWidget(QWidget* parent)
-    : QWidget(parent), _back(TextButton::Mark::Back, this), _title(this) {
+    : QWidget(parent),
+      _back(TextButton::Mark::Back, this),
+      _title(this),
+      _side(TextButton::Mark::None, this) {
   setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Fixed);
   _back.hide();
   _title.setTextFormat(Qt::PlainText);
   _title.setAlignment(Qt::AlignCenter);
   connect(&_back, &QAbstractButton::clicked, this, [this] {
     if (_backAction) _backAction();
+  });
+  _side.hide();
+  connect(&_side, &QAbstractButton::clicked, this, [this] {
+    // A copy: the action may end in another one.
+    if (const auto action = _sideAction) action();
   });
 }
 
@@ -47,6 +55,18 @@ void HeaderWidget::showBackButton(const QString& parentTitle) {
   _back.setShortcut({});  // an ampersand in the title is no mnemonic
   _back.setAccessibleName(QStringLiteral("Back to ") + parentTitle);
   _back.show();
+  arrange();
+}
+
+void HeaderWidget::showSideButton(const std::optional<SideButton>& button) {
+  if (button.has_value() == _hasSideButton && (!button || button->text == _side.text())) return;
+  _hasSideButton = button.has_value();
+  if (button) {
+    _side.setText(button->text);
+    _side.setToolTip(button->tooltip);
+    _side.setAccessibleDescription(button->tooltip);
+  }
+  _side.setVisible(_hasSideButton);
   arrange();
 }
 
@@ -70,9 +90,12 @@ bool HeaderWidget::arrangeWith(BackButton backButton, double titleSize) {
   int backWidth = 0;
   if (backButton == BackButton::Whole) backWidth = _back.sizeHint().width();
   if (backButton == BackButton::Mark) backWidth = _back.minimumSizeHint().width();
+  const QSize side = _side.sizeHint();
+  _side.setGeometry(width() - side.width(), (barHeight - side.height()) / 2, side.width(), side.height());
   const int titleWidth = widthOf(_wholeTitle, titleSize);
   _back.setGeometry(0, (barHeight - _back.sizeHint().height()) / 2, backWidth, _back.sizeHint().height());
   _title.setGeometry(titleRoom(backWidth, titleWidth));
+  _back.setToolTip(backButton == BackButton::Mark ? plainTooltip(_back.text()) : QString());
   showAsMuchAsFits(qtFont(Font::boldSystem(titleSize)));
   return titleWidth <= _title.width();
 }
@@ -84,11 +107,15 @@ void HeaderWidget::showAsMuchAsFits(const QFont& font) {
   _title.setToolTip(fitting == _wholeTitle ? QString() : plainTooltip(_wholeTitle));
 }
 
-// In the middle of the bar, or as near to it as the back button allows.
+int HeaderWidget::rightInset() const { return _hasSideButton ? _side.sizeHint().width() : inset; }
+
+// In the middle of the bar, or as near to it as the buttons allow.
 QRect HeaderWidget::titleRoom(int backWidth, int titleWidth) const {
   const int left = backWidth > 0 ? backWidth : inset;
-  const int width = std::min(titleWidth, this->width() - left - inset);
-  return {std::max(left, (this->width() - width) / 2), 0, std::max(0, width), barHeight - 1};
+  const int right = this->width() - rightInset();
+  const int width = std::max(0, std::min(titleWidth, right - left));
+  const int middle = (this->width() - width) / 2;
+  return {std::max(left, std::min(middle, right - width)), 0, width, barHeight - 1};
 }
 
 void HeaderWidget::paintEvent(QPaintEvent*) {

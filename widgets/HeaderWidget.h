@@ -3,14 +3,16 @@
 #include <QLabel>
 #include <QWidget>
 #include <functional>
+#include <optional>
 
 #include "widgets/TextButton.h"
 
 namespace varnel {
 
 /// The bar above a pane. Its title is in the middle. The back button on the left has the title of the pane to
-/// which it leads. When both do not fit, first the title gets smaller letters, then the back button loses its
-/// text, then the title is cut at its end. Its tooltip then shows all of it.
+/// which it leads. On the right there may be a button for another way to show the pane. When all do not fit,
+/// first the title gets smaller letters, then the back button loses its text, then the title is cut at its
+/// end. Its tooltip then shows all of it.
 class HeaderWidget final : public QWidget {
  public:
   explicit HeaderWidget(QWidget* parent = nullptr);
@@ -22,6 +24,16 @@ class HeaderWidget final : public QWidget {
   void showBackButton(const QString& parentTitle);
   /// Called when the user wants to go back.
   void setBackAction(std::function<void()> action) { _backAction = std::move(action); }
+
+  /// A button on the right.
+  struct SideButton {
+    QString text;
+    QString tooltip;
+  };
+  /// Nothing removes the button.
+  void showSideButton(const std::optional<SideButton>& button);
+  /// Called when the user presses the button on the right.
+  void setSideAction(std::function<void()> action) { _sideAction = std::move(action); }
 
   QSize sizeHint() const override;
 
@@ -36,12 +48,16 @@ class HeaderWidget final : public QWidget {
   bool arrangeWith(BackButton backButton, double titleSize);
   void showAsMuchAsFits(const QFont& font);
   QRect titleRoom(int backWidth, int titleWidth) const;
+  int rightInset() const;
 
   TextButton _back;
   QLabel _title;
   QString _wholeTitle;
+  TextButton _side;
   std::function<void()> _backAction;
+  std::function<void()> _sideAction;
   bool _leadsBack = false;
+  bool _hasSideButton = false;
 };
 
 }  // namespace varnel

@@ -30,7 +30,10 @@ const std::vector<KeyHelp>& keysOfPanes() {
       {QStringLiteral("Page Up, Page Down"), QStringLiteral("go a page up or down")},
       {QStringLiteral("Return, Space, Right"), QStringLiteral("open the row")},
       {QStringLiteral("Escape, Left, Backspace"), QStringLiteral("go back")},
+      {QStringLiteral("Left, Right"),
+       QStringLiteral("with two panes side by side, go from one to the other")},
       {QStringLiteral("Shift+Left, Shift+Right"), QStringLiteral("scroll a long value")},
+      {QStringLiteral("S"), QStringLiteral("sort a table with columns by the current one")},
       {QStringLiteral("Ctrl+S"), QStringLiteral("open the save screen, on devices that allow it")},
   };
   return keys;

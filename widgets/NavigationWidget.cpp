@@ -67,9 +67,10 @@ void NavigationWidget::adopt(std::size_t index) {
   pane.tableWidget().setChoiceMaker(
       [this, index](const TableWidget::Choice& choice) { make(index, choice); });
   showWayBack(index);
+  offerRecords(index);
   pane.setTitleObserver([this, index] {
     if (index + 1 < _controllers.size()) showWayBack(index + 1);
-    if (PaneWidget* beside = paneBeside()) beside->tableWidget().markOpenRow(topPane().header().title());
+    if (PaneWidget* beside = paneBeside()) beside->markOpenRow(topPane().header().title());
   });
 }
 
@@ -140,7 +141,7 @@ void NavigationWidget::arrange() {
     PaneWidget& pane = paneAt(index);
     const bool isBeside = places.left && index + 1 == top;
     pane.showAs(isBeside ? PaneWidget::Role::Beside : PaneWidget::Role::Top, _showsToolbar);
-    pane.tableWidget().markOpenRow(isBeside ? topPane().header().title() : QString());
+    pane.markOpenRow(isBeside ? topPane().header().title() : QString());
     if (isBeside || index == top) {
       pane.setGeometry(isBeside ? *places.left : places.top);
       pane.show();
@@ -221,7 +222,7 @@ void NavigationWidget::slide(const QPixmap& former, const QRect& part, SlideOver
 void NavigationWidget::takeKeyboard() {
   if (isHidden()) return;  // a page of the window has the keyboard
   if (ModalScreenWidget* screen = modalScreen()) return screen->takeKeyboard();
-  topPane().tableWidget().setFocus(Qt::OtherFocusReason);
+  topPane().takeKeyboard(Qt::OtherFocusReason);
 }
 
 // The names from below the root to the node of this pane.
@@ -232,12 +233,44 @@ std::vector<std::string> NavigationWidget::pathOf(std::size_t index) const {
 }
 
 std::vector<std::string> NavigationWidget::pathOfFocus() const {
-  const PaneWidget* const beside = paneBeside();
-  const std::size_t index = _controllers.size() - (beside && hasKeyboard(*beside) ? 2 : 1);
+  const std::size_t index = paneWithKeyboard();
   std::vector<std::string> path = pathOf(index);
-  if (const RowWidget* const row = paneAt(index).tableWidget().currentRow())
-    path.push_back(utf8(row->name()));
+  for (std::string& name : paneAt(index).pathOfFocus()) path.push_back(std::move(name));
   return path;
+}
+
+// When no pane has the keyboard, the top one counts.
+std::size_t NavigationWidget::paneWithKeyboard() const {
+  const PaneWidget* const beside = paneBeside();
+  return _controllers.size() - (beside && hasKeyboard(*beside) ? 2 : 1);
+}
+
+void NavigationWidget::setRecordSource(const RecordSource& source) {
+  _recordSource = source;
+  for (std::size_t index = 0; index < _controllers.size(); ++index) offerRecords(index);
+}
+
+void NavigationWidget::offerRecords(std::size_t index) {
+  if (!_recordSource.hasRecords || !_recordSource.records) return;
+  paneAt(index).setRecordSource({[this, index] { return _recordSource.hasRecords(pathOf(index)); },
+                                 [this, index] { return _recordSource.records(pathOf(index)); }});
+}
+
+bool NavigationWidget::toggleRecordTable() {
+  for (PaneWidget* const pane : {&paneAt(paneWithKeyboard()), &topPane()}) {
+    if (!pane->offersRecords()) continue;
+    pane->recordTable() ? pane->showRows() : pane->showRecords();
+    return true;
+  }
+  return false;
+}
+
+// Escape in a table with columns does not go back yet.
+bool NavigationWidget::showRowsAgain(const QKeyEvent& event) {
+  PaneWidget& pane = paneAt(paneWithKeyboard());
+  if (event.key() != Qt::Key_Escape || !pane.recordTable()) return false;
+  pane.showRows();
+  return true;
 }
 
 PaneWidget& NavigationWidget::paneAt(std::size_t index) const { return paneOf(*_controllers[index]); }
@@ -278,12 +311,12 @@ bool NavigationWidget::moveKeyboard(const QKeyEvent& event) {
   const bool isBeside = hasKeyboard(*beside);
   if (event.key() != (isBeside ? Qt::Key_Right : Qt::Key_Left)) return false;
   // As after Tab, the table shows where the keyboard is.
-  (isBeside ? topPane() : *beside).tableWidget().setFocus(Qt::TabFocusReason);
+  (isBeside ? topPane() : *beside).takeKeyboard(Qt::TabFocusReason);
   return true;
 }
 
 void NavigationWidget::keyPressEvent(QKeyEvent* event) {
-  if (moveKeyboard(*event)) return;
+  if (moveKeyboard(*event) || showRowsAgain(*event)) return;
   if (isWayBack(*event)) return goBack();
   if (event->matches(QKeySequence::Save) && topPane().toolbar().press(BarButton::SystemItem::Save)) return;
   event->ignore();

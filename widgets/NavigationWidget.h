@@ -2,7 +2,9 @@
 
 #include <QPointer>
 #include <QWidget>
+#include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -42,6 +44,17 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   /// Gives the keyboard focus to what is on top.
   void takeKeyboard();
   PaneWidget& topPane() const;
+  using Path = std::vector<std::string>;
+  /// What the stack asks for the records of lists, by the names from below the root to the list.
+  struct RecordSource {
+    std::function<bool(const Path& path)> hasRecords;                    ///< whether its rows are records
+    std::function<std::optional<RecordList>(const Path& path)> records;  ///< nothing when there is no list
+  };
+  /// Holds for the panes that are on the stack and for those that come. Without it they show rows only.
+  void setRecordSource(const RecordSource& source);
+  /// Shows the list of the pane with the keyboard, else of the top pane, as a table with columns, or as rows
+  /// again. False when neither is a list of records.
+  bool toggleRecordTable();
   /// The pane on the left of the top one; null while there is none.
   PaneWidget* paneBeside() const;
   /// The names from below the root to the current row of the pane with the keyboard focus; without such a
@@ -64,8 +77,11 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   void arrange();
   void make(std::size_t index, const TableWidget::Choice& choice);
   void showWayBack(std::size_t index);
+  void offerRecords(std::size_t index);
   void goBack();
   void goBackFrom(std::size_t index);
+  bool showRowsAgain(const QKeyEvent& event);
+  std::size_t paneWithKeyboard() const;
   bool moveKeyboard(const QKeyEvent& event);
   PaneWidget& paneAt(std::size_t index) const;
   std::vector<std::string> pathOf(std::size_t index) const;
@@ -75,6 +91,7 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   std::vector<std::shared_ptr<PaneController>> _controllers;
   std::shared_ptr<ModalController> _modal;
   NavigationStackDelegate* _delegate = nullptr;
+  RecordSource _recordSource;
   bool _showsToolbar = false;
   bool _isChoosing = false;  // the places of the panes stay as they are until the choice is made
   std::string _notice;

@@ -54,6 +54,7 @@ TableWidget::~TableWidget() = default;
 void TableWidget::fallSilent() {
   _delegate = nullptr;
   _choiceMaker = nullptr;
+  _loadObserver = nullptr;
 }
 
 void TableWidget::markOpenRow(const QString& name) {
@@ -101,6 +102,7 @@ void TableWidget::load() {
   }
   if (rows == Rows::Changed) settleNewCells(sidewaysPositions);
   showEmphasis();
+  if (_loadObserver) _loadObserver();
 }
 
 // Gives new cells the sideways positions of the old ones, and tells screen readers about the current row.

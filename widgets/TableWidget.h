@@ -47,6 +47,10 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   using Choice = std::function<void()>;
   /// Whoever shows the table makes the user's choices, by calling each one. Without it the table does.
   void setChoiceMaker(std::function<void(const Choice&)> maker) { _choiceMaker = std::move(maker); }
+  /// The observer is called after each load of the rows.
+  void setLoadObserver(std::function<void()> observer) { _loadObserver = std::move(observer); }
+  /// The place of the current row among all rows.
+  std::optional<std::size_t> currentPlace() const { return _current; }
   /// Marks the row with this name: its pane is open beside this one. Right then leaves this table for that
   /// pane, except on another row that leads to a pane. Null: no pane is open beside this one.
   void markOpenRow(const QString& name);
@@ -112,6 +116,7 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
 
   TableViewDelegate* _delegate = nullptr;
   std::function<void(const Choice&)> _choiceMaker;
+  std::function<void()> _loadObserver;
   QString _openRow;  // null while no pane is open beside this one
   bool _isLoaded = false;
   bool _sizesToFit = false;

@@ -77,16 +77,27 @@ bool TouchScrolling::take(QEvent& event) {
 }
 
 void TouchScrolling::prepare(QScrollPrepareEvent& event) {
-  _row = _rowAt(event.startPos().toPoint());
+  if (_rowAt) _row = _rowAt(event.startPos().toPoint());
   const QScrollBar& bar = *_area.verticalScrollBar();
   event.setViewportSize(_area.viewport()->size());
-  event.setContentPosRange({0, 0, _row ? _row->sidewaysRange() : 0, static_cast<double>(bar.maximum())});
-  event.setContentPos({_row ? _row->sidewaysPosition() : 0, static_cast<double>(bar.value())});
+  event.setContentPosRange({0, 0, sidewaysRange(), static_cast<double>(bar.maximum())});
+  event.setContentPos({sidewaysPosition(), static_cast<double>(bar.value())});
   event.accept();
+}
+
+double TouchScrolling::sidewaysRange() const {
+  if (!_rowAt) return _area.horizontalScrollBar()->maximum();
+  return _row ? _row->sidewaysRange() : 0;
+}
+
+double TouchScrolling::sidewaysPosition() const {
+  if (!_rowAt) return _area.horizontalScrollBar()->value();
+  return _row ? _row->sidewaysPosition() : 0;
 }
 
 void TouchScrolling::scroll(QScrollEvent& event) {
   _area.verticalScrollBar()->setValue(qRound(event.contentPos().y()));
+  if (!_rowAt) _area.horizontalScrollBar()->setValue(qRound(event.contentPos().x()));
   if (_row) _row->scrollSidewaysTo(event.contentPos().x());
   event.accept();
 }

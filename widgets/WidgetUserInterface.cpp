@@ -58,7 +58,9 @@ std::unique_ptr<TablePane> WidgetUserInterface::makeTablePane() { return std::ma
 
 std::unique_ptr<NavigationStack> WidgetUserInterface::makeNavigationStack(
     std::shared_ptr<PaneController> root) {
-  return std::make_unique<NavigationWidget>(std::move(root));
+  auto stack = std::make_unique<NavigationWidget>(std::move(root));
+  stack->setRecordSource(_recordSource);
+  return stack;
 }
 
 std::unique_ptr<ModalScreen> WidgetUserInterface::makeModalScreen(const ScreenLayout& layout,

@@ -20,6 +20,9 @@ class WidgetUserInterface final : public UserInterface {
     _windowObserver = std::move(observer);
   }
 
+  /// Holds for every stack that it makes from now on.
+  void setRecordSource(NavigationWidget::RecordSource source) { _recordSource = std::move(source); }
+
   Rect screenBounds() const override;
   Rect applicationFrame() const override;
   const TextMetrics& textMetrics() const override { return _textMetrics; }
@@ -36,6 +39,7 @@ class WidgetUserInterface final : public UserInterface {
   WindowWidget::Wishes _wishes;
   RememberedSize _lastSize;
   std::function<void(WindowWidget& window)> _windowObserver;
+  NavigationWidget::RecordSource _recordSource;
   FontMetrics _textMetrics;
   QPointer<WindowWidget> _window;  // the newest window
 };

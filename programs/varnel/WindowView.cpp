@@ -34,6 +34,8 @@ class WindowViewer final {
               .history = &_history}),
         _rowCommands(_app, _answers),
         _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [this](int signal) { take(signal); }) {
+    _userInterface.setRecordSource({[this](const NamePath& list) { return _app.hasRecordsAt(list); },
+                                    [this](const NamePath& list) { return _app.recordsAt(list); }});
     _userInterface.setWindowObserver([this](WindowWidget& window) { furnish(window); });
     if (options.updates) _app.afterUpdates(*options.updates, [this] { _host.end(0); });
   }
@@ -58,7 +60,13 @@ class WindowViewer final {
   }
 
   // What the user can do in the window beyond the screens of the application.
-  void furnish(WindowWidget& window) { _rowCommands.addTo(window); }
+  void furnish(WindowWidget& window) {
+    _rowCommands.addTo(window);
+    window.addCommand(QObject::tr("Show a list as a table, or as rows again"), {Qt::CTRL | Qt::Key_T},
+                      [&window] {
+                        if (!window.page() && window.stack()) window.stack()->toggleRecordTable();
+                      });
+  }
 
   WidgetApplication& _host;
   HostServices _services;

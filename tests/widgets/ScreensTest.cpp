@@ -41,15 +41,19 @@ class ScreensTest : public testing::TestWithParam<std::pair<int, int>> {
     ports.answer = [](const MemoryPorts::Request&) {
       return RemotePort::SendResult{0, writeXmlPropertyList(dictionaryOf({{"GetTechnology", "kalvi-lte"}}))};
     };
+    userInterface.setRecordSource({[this](const NamePath& list) { return app.hasRecordsAt(list); },
+                                   [this](const NamePath& list) { return app.recordsAt(list); }});
     app.applicationDidFinishLaunching();
     window().setGeometry(0, 0, GetParam().first, GetParam().second);
     EXPECT_TRUE(QTest::qWaitForWindowActive(&window(), patience_ms));
     queue.run();
     receive("internet");
   }
-  void receive(const std::string& apn) {
+  void receive(const std::string& apn) { receiveAll({apn}); }
+  void receiveAll(const std::vector<std::string>& apns) {
     const Value list = Value::ofArray();
-    list.array()->push_back(dictionaryOf({{"APN", apn}, {"State", "Active"}}));
+    for (const std::string& apn : apns)
+      list.array()->push_back(dictionaryOf({{"APN", apn}, {"State", "Active"}}));
     ports.deliver(channel, 0, serverMessage(0xFF0002, list));
     queue.advance(2s);
     QCoreApplication::processEvents();
@@ -132,6 +136,79 @@ TEST_P(ScreensTest, ARefreshOfAnOpenPaneShowsTheNewValueInTheSameRow) {
   EXPECT_THAT(descriptions(), testing::Contains("APN: ims"));
   EXPECT_EQ(pane().tableWidget().visibleRows(), rows);
   EXPECT_TRUE(rows.front()->emphasis().isSelected);
+}
+
+TEST_P(ScreensTest, OnlyAListOfRecordsIsOfferedAsATable) {
+  EXPECT_FALSE(stack().toggleRecordTable()) << "these rows are sections";
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  EXPECT_TRUE(pane().offersRecords());
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  EXPECT_FALSE(pane().offersRecords()) << "these rows are leaves";
+}
+
+TEST_P(ScreensTest, AListAsATableHasColumnsAndIsRefreshed) {
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  auto* const button = pane().header().findChildren<TextButton*>().last();
+  ASSERT_TRUE(button->isVisible());
+  QTest::mouseClick(button, Qt::LeftButton);
+  RecordTableWidget* const table = pane().recordTable();
+  ASSERT_NE(table, nullptr);
+  EXPECT_TRUE(table->isVisible());
+  EXPECT_FALSE(pane().tableWidget().isVisible());
+  EXPECT_EQ(table->model()->headerData(1, Qt::Horizontal), "APN");
+  EXPECT_EQ(table->model()->index(0, 1).data(), "internet");
+  receiveAll({"ims", "internet"});
+  EXPECT_EQ(pane().recordTable(), table);
+  EXPECT_EQ(table->model()->rowCount(), 2);
+  EXPECT_EQ(table->model()->index(0, 1).data(), "ims");
+  EXPECT_THAT(stack().controllers(), SizeIs(2)) << "the pane stays on the stack";
+  QTest::mouseClick(button, Qt::LeftButton);
+  EXPECT_EQ(pane().recordTable(), nullptr);
+  EXPECT_THAT(descriptions(), testing::ElementsAre("0", "1"));
+}
+
+TEST_P(ScreensTest, EnterInTheTableOpensTheRecordAndEscapeComesBackToTheRows) {
+  receiveAll({"ims", "internet"});
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  ASSERT_TRUE(stack().toggleRecordTable());
+  press(Qt::Key_End);
+  EXPECT_THAT(stack().pathOfFocus(), testing::ElementsAre("PDP Context Info", "1"));
+  press(Qt::Key_Return);
+  EXPECT_THAT(stack().controllers(), SizeIs(3));
+  EXPECT_THAT(descriptions(), testing::Contains("APN: internet"));
+  press(Qt::Key_Escape);
+  EXPECT_THAT(stack().controllers(), SizeIs(2));
+  ASSERT_NE(pane().recordTable(), nullptr) << "the list is still a table";
+  press(Qt::Key_Escape);
+  EXPECT_EQ(pane().recordTable(), nullptr);
+  EXPECT_THAT(stack().controllers(), SizeIs(2));
+  EXPECT_TRUE(pane().tableWidget().visibleRows().at(1)->emphasis().isSelected);
+  press(Qt::Key_Escape);
+  EXPECT_THAT(stack().controllers(), SizeIs(1));
+}
+
+TEST_P(ScreensTest, ATableBesideTheTopPaneIsRefreshedAndOpensOtherRecords) {
+  receiveAll({"ims", "internet"});
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  stack().toggleRecordTable();
+  press(Qt::Key_Home);
+  press(Qt::Key_Return);
+  PaneWidget* const beside = stack().paneBeside();
+  EXPECT_EQ(beside != nullptr, GetParam().first >= 900);
+  if (!beside) return;
+  RecordTableWidget& table = *beside->recordTable();
+  receiveAll({"ims", "internet", "mms"});
+  EXPECT_EQ(table.model()->rowCount(), 3);
+  const QModelIndex third = table.model()->index(2, 1);
+  QTest::mouseClick(table.viewport(), Qt::LeftButton, {}, table.visualRect(third).center());
+  EXPECT_THAT(stack().controllers(), SizeIs(3));
+  EXPECT_THAT(descriptions(), testing::Contains("APN: mms"));
+  EXPECT_TRUE(third.data(Qt::FontRole).value<QFont>().bold());
 }
 
 TEST_P(ScreensTest, ControlSOpensTheSaveScreenAndSavesOnIt) {
