@@ -31,9 +31,8 @@ constexpr struct {
   std::string_view key;
   std::string ServerStatus::*text;
 } texts[] = {
-    {"Source", &ServerStatus::source},
-    {"Name", &ServerStatus::name},
-    {technologyKey, &ServerStatus::technology},
+    {"Source", &ServerStatus::source},       {"Name", &ServerStatus::name},
+    {"Modem", &ServerStatus::modem},         {technologyKey, &ServerStatus::technology},
     {"Recording", &ServerStatus::recording},
 };
 

@@ -36,8 +36,10 @@ struct ControlRequest {
 
 /// What a running telephony server does.
 struct ServerStatus {
-  std::string source{};       ///< what is served: "port", "simulation", "capture", or "standard input"
-  std::string name{};         ///< of the device or the capture; empty for a simulation
+  /// What is served: "port", "ModemManager", "simulation", "capture", or "standard input".
+  std::string source{};
+  std::string name{};         ///< of the device or the capture; empty for a simulation and ModemManager
+  std::string modem{};        ///< one sentence about ModemManager's modem; empty for other sources
   std::string technology{};   ///< as viewers are told
   std::string recording{};    ///< the file of the recording; empty when there is none
   std::uint64_t clients = 0;  ///< viewers that have a channel or are connected to the telephony service

@@ -28,9 +28,11 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
   const std::vector<std::string> technologies(simulated.begin(), simulated.end());
 
   app.description(
-      "Serves the log channel to viewers, from a modem's diagnostic port, from a simulated modem, or from a "
-      "capture. One of --port, --simulate, and --replay is needed. SIGINT and SIGTERM end it. A "
-      "running server can be asked and told things: see \"varnel-telephonyd ctl --help\".");
+      "Serves the log channel to viewers, from a modem's diagnostic port, from ModemManager, from a "
+      "simulated "
+      "modem, or from a capture. Without --port, --live, --simulate, and --replay it takes what is there: a "
+      "diagnostic port, else ModemManager. SIGINT and SIGTERM end it. A running server can be asked and told "
+      "things: see \"varnel-telephonyd ctl --help\".");
   app.set_version_flag("--version", programName + (" " + version));
   auto* port =
       app.add_option("--port", options.portPath,
@@ -41,8 +43,26 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
                "ask ModemManager to leave the modem alone while the server runs, which cuts the modem's data "
                "connection")
       ->needs(port);
+  auto* live =
+      app.add_flag("--live", options.isLive,
+                   "show what ModemManager tells of a modem: its cells, levels, network, SIM card, and "
+                   "connections; for modems without a diagnostic port")
+          ->excludes(port);
+  app.add_option(
+         "--modem", options.modem,
+         "this modem, as mmcli -L lists them: its number or its path, or the path of its device; unless "
+         "given, any one")
+      ->needs(live)
+      ->type_name("MODEM");
+  app.add_option("--poll", options.poll_s,
+                 "ask ModemManager this often for what it does not tell of its own accord, in seconds")
+      ->needs(live)
+      ->check(CLI::Range(1U, 3600U).description(""))
+      ->type_name("SECONDS")
+      ->capture_default_str();
   auto* simulate = app.add_option("--simulate", options.simulatedTechnology, "simulate a modem")
                        ->excludes(port)
+                       ->excludes(live)
                        ->check(CLI::IsMember(technologies))
                        ->type_name("TECHNOLOGY");
   app.add_option("--seed", options.seed, "the same seed makes the modem send the same messages")
@@ -60,6 +80,7 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
                      "viewer at a time")
           ->excludes(simulate)
           ->excludes(port)
+          ->excludes(live)
           ->type_name("CAPTURE");
   app.add_option("--technology", options.replayTechnology,
                  "the modem that was captured; unless given, the one that the capture names, else all-radios")
@@ -90,6 +111,12 @@ void declare(CLI::App& app, Options& options, const std::string& version) {
          "--overwrite", [&options] { options.existingRecording = ExistingRecording::Replaced; },
          "let the recording replace an existing file, when the first message comes")
       ->needs(record);
+  app.add_flag(
+         "--record-position", options.recordsPosition,
+         "also record where the modem is, which the modem or gpsd on this machine tells; without it nobody "
+         "is asked")
+      ->needs(record)
+      ->needs(live);
   app.add_option("--runtime-dir", options.runtimeFolder,
                  "where viewer and server meet; unless given, $XDG_RUNTIME_DIR/varnel, or varnel-UID in the "
                  "temporary "
@@ -140,8 +167,6 @@ void nameRecording(Options& options) {
 
 // What is wrong with the combination of valid options; nothing when they go together.
 std::optional<std::string> conflict(const Options& options) {
-  if (!options.portPath && !options.simulatedTechnology && !options.replayPath)
-    return "one of --port, --simulate, and --replay is needed";
   if (options.playsPort && options.simulatedTechnology == technology::ifxGSM)
     return "the modem of ifx-gsm sends no log packets, so it has no diagnostic port to play";
   if (options.portPath && options.portPath->empty())

@@ -14,10 +14,16 @@ namespace varnel {
 /// In place of a device's path.
 inline constexpr const char* automaticPort = "auto";
 
-/// What the program is asked to do. One of `portPath`, `simulatedTechnology`, and `replayPath` is set.
+/// What the program is asked to do. At most one of `portPath`, `isLive`, `simulatedTechnology`, and
+/// `replayPath` is set. Without any of them the server takes what is there.
 struct Options {
   std::optional<std::string> portPath;  ///< automaticPort: the server looks for one
   bool inhibitsModemManager = false;
+
+  bool isLive = false;           ///< shows what ModemManager tells
+  std::string modem{};           ///< ModemManager's index or path; empty: any
+  unsigned poll_s = 5;           ///< how often ModemManager is asked what it does not signal
+  bool recordsPosition = false;  ///< whether packets, and so recordings, have positions
 
   std::optional<std::string> simulatedTechnology;
   std::uint64_t seed = 1;
@@ -38,6 +44,11 @@ struct Options {
   std::optional<std::string> allowedGroup;  ///< whose members may connect too; absent: only this user may
   int logLevel = logErrorPriority;          ///< the highest priority number that goes to standard error
 };
+
+/// Whether no option says where messages come from.
+inline bool namesNoSource(const Options& options) {
+  return !options.portPath && !options.isLive && !options.simulatedTechnology && !options.replayPath;
+}
 
 /// The status to end with when the command line leaves nothing to do: 0 after help, 2 after a mistake.
 struct ExitStatus {

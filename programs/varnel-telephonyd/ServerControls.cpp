@@ -13,7 +13,17 @@ using Command = ControlRequest::Command;
 
 // How sentences call a source that comes as it comes.
 std::string nameOfLive(ServedSource source) {
-  return source == ServedSource::Port ? "a live port" : "a replay of standard input";
+  switch (source) {
+    case ServedSource::Port:
+      return "a live port";
+    case ServedSource::ModemManager:
+      return "what ModemManager tells";
+    case ServedSource::Simulation:
+    case ServedSource::Capture:
+    case ServedSource::StandardInput:
+      break;
+  }
+  return "a replay of standard input";
 }
 
 bool isPlayable(ServedSource source) {
@@ -34,6 +44,8 @@ const char* wordOf(ServedSource source) {
   switch (source) {
     case ServedSource::Port:
       return "port";
+    case ServedSource::ModemManager:
+      return "ModemManager";
     case ServedSource::Simulation:
       return "simulation";
     case ServedSource::Capture:
@@ -143,6 +155,7 @@ ServerStatus ServerControls::status() const {
                       .isPaused = server.isPaused(),
                       .isSeeking = server.isSeeking(),
                       .speed = _speed};
+  if (_setup.modem) status.modem = _setup.modem();
   std::optional<LeftOut> leftOut;
   if (_setup.leftOutOfPort) leftOut = _setup.leftOutOfPort();
   if (const auto survey = _setup.survey ? _setup.survey() : std::nullopt) {

@@ -13,7 +13,7 @@
 namespace varnel {
 
 /// Where a server has its messages from.
-enum class ServedSource { Port, Simulation, Capture, StandardInput };
+enum class ServedSource { Port, ModemManager, Simulation, Capture, StandardInput };
 
 /// Does what somebody asks of the running server, or says why not.
 class ServerControls final {
@@ -26,6 +26,8 @@ class ServerControls final {
     std::optional<std::string> recording;  ///< the file of the recording
     /// How many viewers have a channel or are connected to the telephony service.
     std::function<std::size_t()> clients;
+    /// How it stands with the modem, one sentence; empty unless the source is ModemManager.
+    std::function<std::string()> modem{};
     /// The frames of the port that hold no record; empty unless the source is a port.
     std::function<LeftOut()> leftOutOfPort;
     /// What is known of the capture; empty unless the source is one.

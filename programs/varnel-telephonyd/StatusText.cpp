@@ -167,6 +167,7 @@ std::optional<StreamPlace> readMoment(std::string_view text) {
 std::string statusText(const ServerStatus& status) {
   const std::string name = status.name.empty() ? "" : " " + printable(status.name);
   std::string text = line("source", printable(status.source) + name);
+  if (!status.modem.empty()) text += line("modem", printable(status.modem));
   text += line("technology", printable(status.technology));
   if (status.isPlayable)
     text += line("state", std::string(stateOf(status)) + ", speed " + numberText(status.speed));
@@ -188,6 +189,7 @@ std::string statusJson(const ServerStatus& status) {
   std::string json = "{";
   appendMember(json, "source", jsonString(status.source));
   if (!status.name.empty()) appendMember(json, "name", jsonString(status.name));
+  if (!status.modem.empty()) appendMember(json, "modem", jsonString(status.modem));
   appendMember(json, "technology", jsonString(status.technology));
   if (!status.recording.empty()) appendMember(json, "recording", jsonString(status.recording));
   appendMember(json, "clients", std::to_string(status.clients));

@@ -32,6 +32,7 @@
 #include "programs/varnel-telephonyd/ServerControls.h"
 #include "programs/varnel-telephonyd/SimulationSource.h"
 #include "programs/varnel-telephonyd/TelephonyServer.h"
+#include "programs/varnel-telephonyd/live/LiveModem.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
 #include "programs/varnel-telephonyd/simulation/pty/PseudoTerminal.h"
 #include "programs/varnel-telephonyd/simulation/pty/SimulatedPort.h"
@@ -115,7 +116,7 @@ std::optional<std::string> technologyOfCapture(const Options& options, PipeReade
 
 // The technology that viewers are told. Opens the capture, if there is one, to ask it. Throws CaptureError.
 std::string technologyOf(const Options& options, PipeReader* pipe) {
-  if (options.portPath) return std::string(technology::allRadios);
+  if (options.portPath || options.isLive || namesNoSource(options)) return std::string(technology::allRadios);
   if (options.simulatedTechnology) return *options.simulatedTechnology;
   const auto named = technologyOfCapture(options, pipe);
   if (options.replayTechnology) return *options.replayTechnology;
@@ -148,6 +149,41 @@ std::unique_ptr<PortChooser> makePortChooser(const Options& options, MainQueue& 
       .queue = queue, .use = options.inhibitsModemManager ? Use::IsInhibited : Use::Stays, .tell = tell});
 }
 
+// Looks for a port that is free. Absent when the program was asked to end meanwhile; empty when there is
+// none.
+std::optional<std::string> searchPort(PortChooser& chooser, MainQueue& queue, HostApplication& application) {
+  std::optional<std::string> chosen;
+  queue.async([&] {
+    chooser.search([&](const std::optional<std::string>& path) {
+      chosen = path.value_or("");
+      application.end(0);
+    });
+  });
+  application.run();
+  return chosen;
+}
+
+// Takes what is there, without any option that names a source: a diagnostic port, else ModemManager. Tells
+// which and why. Returns false when the program was asked to end meanwhile.
+bool chooseSource(Options& options, MainQueue& queue, HostApplication& application) {
+  std::string reason;
+  PortChooser chooser({.queue = queue, .tell = [&reason](const std::string& sentence) {
+                         // The first clause of the first sentence. What follows is about another command.
+                         if (reason.empty()) reason = sentence.substr(0, sentence.find(';'));
+                       }});
+  const auto port = searchPort(chooser, queue, application);
+  if (!port) return false;
+  if (port->empty()) {
+    options.isLive = true;
+    tell("no diagnostic port can be used (" + reason + "), so the server shows what ModemManager tells");
+  } else {
+    options.portPath = *port;
+    tell("no option names a source, and " + *port +
+         " is a diagnostic port, so the server shows what it sends");
+  }
+  return true;
+}
+
 // The device's path, for which the event loop may have to run. Else the exit status: 0 when the program was
 // asked to end meanwhile. Throws std::runtime_error.
 std::variant<std::string, ExitStatus> choosePort(const Options& options, PortChooser* chooser,
@@ -156,15 +192,9 @@ std::variant<std::string, ExitStatus> choosePort(const Options& options, PortCho
     if (chooser) chooser->inhibitModemOf(*options.portPath);
     return *options.portPath;
   }
-  std::optional<std::string> chosen;
-  queue.async([&] {
-    chooser->search([&](const std::optional<std::string>& path) {
-      chosen = path;
-      application.end(path ? 0 : generalError);
-    });
-  });
-  const int status = application.run();
-  if (!chosen) return ExitStatus{status};
+  const auto chosen = searchPort(*chooser, queue, application);
+  if (!chosen) return ExitStatus{0};
+  if (chosen->empty()) return ExitStatus{generalError};
   return *chosen;
 }
 
@@ -190,13 +220,21 @@ std::unique_ptr<LivePort> makeLivePort(const std::string& path, MainQueue& queue
 }
 
 // Ends the program. A modem is made quiet first, unless the user asks twice.
-void end(HostApplication& application, LivePort* port) {
-  if (!port || port->isEnding()) return application.end(0);
-  port->end([&application] { application.end(0); });
+template <class Modem>
+void end(HostApplication& application, Modem& modem) {
+  if (modem.isEnding()) return application.end(0);
+  modem.end([&application] { application.end(0); });
+}
+
+void end(HostApplication& application, LivePort* port, LiveModem* modem) {
+  if (port) return end(application, *port);
+  if (modem) return end(application, *modem);
+  application.end(0);
 }
 
 ServedSource servedSource(const Options& options) {
   if (options.portPath) return ServedSource::Port;
+  if (options.isLive) return ServedSource::ModemManager;
   if (options.simulatedTechnology) return ServedSource::Simulation;
   return options.replayPath == "-" ? ServedSource::StandardInput : ServedSource::Capture;
 }
@@ -207,7 +245,18 @@ std::unique_ptr<CaptureSurvey> makeSurvey(const Options& options, MainQueue& que
   return std::make_unique<CaptureSurvey>(queue, *options.replayPath, options.subscription, unasked);
 }
 
-int serve(int& argumentCount, char** arguments, const Options& options) {
+// What ModemManager tells of a modem, if that is asked for.
+std::unique_ptr<LiveModem> makeLiveModem(const Options& options, MainQueue& queue) {
+  if (!options.isLive) return nullptr;
+  return std::make_unique<LiveModem>(LiveModem::Setup{.queue = queue,
+                                                      .uptime = uptime,
+                                                      .wanted = options.modem,
+                                                      .pollInterval = std::chrono::seconds(options.poll_s),
+                                                      .tellsPosition = options.recordsPosition,
+                                                      .tell = tell});
+}
+
+int serve(int& argumentCount, char** arguments, Options options) {
   // A capture that cannot be replayed is reported now, not when the first viewer comes.
   std::unique_ptr<PipeReader> reader = makePipeReader(options);
   const std::string technology = technologyOf(options, reader.get());
@@ -217,7 +266,9 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   raiseDescriptorLimit(mostFiles);
   HostApplication application(argumentCount, arguments);
   std::unique_ptr<LivePort> livePort;
-  const SignalWatcher signals({SIGINT, SIGTERM}, [&](int /*signal*/) { end(application, livePort.get()); });
+  std::unique_ptr<LiveModem> liveModem;
+  const SignalWatcher signals({SIGINT, SIGTERM},
+                              [&](int /*signal*/) { end(application, livePort.get(), liveModem.get()); });
   const HostLog log({.programName = programName, .standardErrorLevel = options.logLevel});
   const RuntimeFolder folder = serversFolder(options.runtimeFolder, options.allowedGroup);
   SocketPorts ports(folder);
@@ -229,6 +280,8 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
          (options.runtimeFolder ? " --runtime-dir " + *options.runtimeFolder : ""));
     tellServiceManager("READY=1");
   };
+  if (namesNoSource(options) && !chooseSource(options, queue, application)) return 0;
+  liveModem = makeLiveModem(options, queue);
   const std::unique_ptr<PortChooser> chooser = makePortChooser(options, queue);
   if (options.portPath) {
     const auto choice = choosePort(options, chooser.get(), queue, application);
@@ -237,6 +290,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   }
   const auto makeAnySource = [&] {
     if (livePort) return livePort->makeSource();
+    if (liveModem) return liveModem->makeSource();
     return pipedReplay ? pipedReplay->makeSource() : makeSource(served, unasked);
   };
   std::unique_ptr<Recorder> recorder;
@@ -261,6 +315,7 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
        .speed = options.speed,
        .recording = options.recordPath,
        .clients = [&] { return listener.clients(server.viewerPorts()); },
+       .modem = liveModem ? [&] { return liveModem->state(); } : std::function<std::string()>(),
        .leftOutOfPort = livePort ? [&] { return livePort->leftOut(); } : std::function<LeftOut()>(),
        .survey = [&] { return survey ? survey->result() : std::nullopt; },
        .useTechnology =
@@ -272,7 +327,10 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
            },
        // Later: the reply comes first.
        .stop =
-           [&] { queue.after(std::chrono::milliseconds(0), [&] { end(application, livePort.get()); }); }});
+           [&] {
+             queue.after(std::chrono::milliseconds(0),
+                         [&] { end(application, livePort.get(), liveModem.get()); });
+           }});
   const ControlListener controlListener(
       folder.path, [&](const ControlRequest& request) { return controls.reply(request); });
   recorder = makeRecorder(options, queue, server, technology);
@@ -281,12 +339,14 @@ int serve(int& argumentCount, char** arguments, const Options& options) {
   } else {
     tellServing();
   }
+  if (liveModem) liveModem->start();
   const int status = application.run();
   tellServiceManager("STOPPING=1");
   server.end();
   if (status != 0) return status;
   tell(inWords(server.counts()));
   if (livePort) tell(inWords(livePort->records(), livePort->leftOut()));
+  if (liveModem) tell("ModemManager: " + std::to_string(liveModem->sent()) + " packets made");
   return status;
 }
 

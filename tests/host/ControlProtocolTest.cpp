@@ -57,6 +57,7 @@ TEST(ControlProtocol, ARequestHas4096BytesAtMost) {
 TEST(ControlProtocol, RepliesArriveAsTheyWereSent) {
   const ServerStatus status{.source = "capture",
                             .name = "walk.pcap",
+                            .modem = "M1 is locked",
                             .technology = "kalvi-lte",
                             .recording = "again.pcap",
                             .clients = 2,

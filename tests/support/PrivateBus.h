@@ -1,8 +1,10 @@
 #pragma once
 
+#include <filesystem>
 #include <fstream>
 #include <memory>
 #include <string>
+#include <system_error>
 
 #include "tests/support/Process.h"
 
@@ -22,6 +24,12 @@ class PrivateBus {
     _daemon = std::make_unique<Process>("/usr/bin/env", arguments);
     eventually([&] { return !_daemon->output().empty() || _daemon->waitForEnd(std::chrono::seconds(0)); });
     return !_daemon->output().empty();
+  }
+  /// The bus goes away with everybody's connections. It can be started again at the same address.
+  void stop() {
+    _daemon.reset();
+    std::error_code ignored;
+    std::filesystem::remove(_folder.file("bus"), ignored);
   }
   std::string address() const { return "unix:path=" + _folder.file("bus"); }
   /// The folder of its socket, which has the same name as a session's bus in its runtime folder.

@@ -66,6 +66,41 @@ TEST(TelephonydOptions, ModemManagerCanBeInhibitedForAPort) {
   EXPECT_THAT(read({"--replay", "a", "--inhibit"}).error, HasSubstr("--inhibit requires --port"));
 }
 
+TEST(TelephonydOptions, WithoutASourceTheServerTakesWhatIsThere) {
+  const Reading reading = read({"--record", "a"});
+  EXPECT_EQ(reading.error, "");
+  EXPECT_TRUE(namesNoSource(reading.options()));
+  EXPECT_FALSE(namesNoSource(read({"--live"}).options()));
+  EXPECT_FALSE(namesNoSource(read({"--port", "auto"}).options()));
+  EXPECT_FALSE(namesNoSource(read({"--simulate", "kalvi-lte"}).options()));
+}
+
+TEST(TelephonydOptions, AModemOfModemManager) {
+  const Reading reading =
+      read({"--live", "--modem", "1", "--poll", "2", "--record", "a", "--record-position"});
+  EXPECT_EQ(reading.error, "");
+  EXPECT_TRUE(reading.options().isLive);
+  EXPECT_EQ(reading.options().modem, "1");
+  EXPECT_EQ(reading.options().poll_s, 2u);
+  EXPECT_TRUE(reading.options().recordsPosition);
+  const Reading plain = read({"--live"});
+  EXPECT_EQ(plain.options().modem, "");
+  EXPECT_EQ(plain.options().poll_s, 5u);
+  EXPECT_FALSE(plain.options().recordsPosition);
+}
+
+TEST(TelephonydOptions, OptionsOfModemManagersModemGoWithNothingElse) {
+  EXPECT_THAT(read({"--modem", "1"}).error, HasSubstr("--modem requires --live"));
+  EXPECT_THAT(read({"--poll", "1"}).error, HasSubstr("--poll requires --live"));
+  EXPECT_THAT(read({"--live", "--poll", "0"}).error, HasSubstr("--poll"));
+  EXPECT_THAT(read({"--live", "--poll", "3601"}).error, HasSubstr("--poll"));
+  EXPECT_THAT(read({"--live", "--record-position"}).error, HasSubstr("--record-position requires --record"));
+  EXPECT_THAT(read({"--simulate", "kalvi-lte", "--record", "a", "--record-position"}).error,
+              HasSubstr("--record-position requires --live"));
+  for (const char* source : {"--port", "--replay", "--simulate"})
+    EXPECT_THAT(read({"--live", source, "kalvi-lte"}).error, HasSubstr("excludes")) << source;
+}
+
 TEST(TelephonydOptions, ASimulatedModemMayHaveAPortThatIsServedElsewhere) {
   EXPECT_TRUE(read({"--simulate", "kalvi-lte", "--pty"}).options().playsPort);
   EXPECT_FALSE(read({"--simulate", "kalvi-lte"}).options().playsPort);
@@ -126,7 +161,7 @@ TEST(TelephonydOptions, AFaultForTests) {
 
 TEST(TelephonydOptions, MistakesAreOneLineAndStatusTwo) {
   const std::vector<std::vector<const char*>> mistakes = {
-      {},
+      {"--poll", "2"},
       {"--port"},
       {"--port", "/dev/ttyUSB0", "--simulate", "kalvi-lte"},
       {"--port", "/dev/ttyUSB0", "--replay", "walk.pcap"},

@@ -78,6 +78,14 @@ TEST_F(ServerControlsTest, StandardInputRefusesLikeALivePort) {
             "a replay of standard input comes at its own speed, which nothing can change");
 }
 
+TEST_F(ServerControlsTest, ModemManagersModemRefusesLikeALivePort) {
+  ServerControls modem = controls(ServedSource::ModemManager);
+  EXPECT_EQ(refusal(modem.reply({.command = Command::Pause})),
+            "what ModemManager tells cannot be paused: its messages come when they come");
+  const ControlReply reply = modem.reply({});
+  EXPECT_EQ(std::get<ServerStatus>(reply).source, "ModemManager");
+}
+
 TEST_F(ServerControlsTest, MistakesAreToldInOneSentence) {
   ServerControls simulation = controls(ServedSource::Simulation);
   EXPECT_EQ(refusal(simulation.reply({.command = Command::SetSpeed, .speed = 0})),

@@ -43,6 +43,18 @@ TEST(StatusText, TellsEachMatterInALine) {
             "bad frames  7\n");
 }
 
+TEST(StatusText, TellsHowItStandsWithTheModem) {
+  EXPECT_EQ(
+      statusText(
+          {.source = "ModemManager", .modem = "M1 is registered in Test Net", .technology = "all-radios"})
+          .substr(0, 75),
+      "source      ModemManager\n"
+      "modem       M1 is registered in Test Net\n"
+      "technolog");
+  EXPECT_EQ(statusJson({.source = "ModemManager", .modem = "M1"}).substr(0, 41),
+            R"({"source":"ModemManager","modem":"M1","te)");
+}
+
 TEST(StatusText, LeavesOutWhatIsNotKnown) {
   EXPECT_EQ(statusText({.source = "port", .name = "/dev/ttyUSB0", .technology = "all-radios"}),
             "source      port /dev/ttyUSB0\n"
