@@ -45,6 +45,14 @@ QColor markColor(const QPalette& palette) {
   return blend(palette.color(QPalette::Base), palette.color(QPalette::Text), 0.5);
 }
 
+QColor quietTextColor(const QPalette& palette) {
+  const QColor ground = selectionColor(palette);
+  const QColor text = palette.color(QPalette::Text);
+  double share = 0.6;
+  while (share < 1 && contrast(blend(ground, text, share), ground) < readable) share += 0.05;
+  return blend(ground, text, std::min(share, 1.0));
+}
+
 QColor selectionColor(const QPalette& palette) {
   return blend(palette.color(QPalette::Base), palette.color(QPalette::Highlight), 0.3);
 }

@@ -19,6 +19,8 @@ QColor separatorColor(const QPalette& palette);
 QColor barColor(const QPalette& palette);
 /// Marks that are less prominent than text.
 QColor markColor(const QPalette& palette);
+/// Text that only adds to other text, readable on the ground of rows and on that of the selected row.
+QColor quietTextColor(const QPalette& palette);
 /// The ground of the selected row. The text on it keeps its color.
 QColor selectionColor(const QPalette& palette);
 /// Things that can be pressed: the desktop's highlight color, made readable on this ground.

@@ -49,7 +49,7 @@ class SearchResultDelegate final : public QStyledItemDelegate {
     paintText(*painter, qtFont(Font::boldSystem(nameSize)),
               QRectF(upper.topLeft(), QPointF(left, upper.bottom())), index.data().toString(), Qt::ElideRight,
               Qt::AlignLeft);
-    painter->setPen(markColor(palette));
+    painter->setPen(quietTextColor(palette));
     paintText(*painter, qtFont(Font::system(sectionsSize)), lower, sections, Qt::ElideLeft, Qt::AlignLeft);
     const double thickness = 1 / painter->device()->devicePixelRatioF();
     painter->fillRect(QRectF(row.left() + inset, row.bottom() - thickness, row.width() - inset, thickness),

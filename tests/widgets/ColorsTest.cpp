@@ -25,6 +25,16 @@ QPalette palette(const QColor& ground, const QColor& text) {
   return made;
 }
 
+TEST(Colors, QuietTextIsReadableOnEachGroundAndLessThanText) {
+  for (const auto& [ground, text] : {std::pair(QColor(Qt::white), QColor(Qt::black)),
+                                     std::pair(QColor(30, 30, 30), QColor(240, 240, 240))}) {
+    const QPalette desktop = palette(ground, text);
+    EXPECT_GE(contrast(quietTextColor(desktop), ground), 4.5);
+    EXPECT_GE(contrast(quietTextColor(desktop), selectionColor(desktop)), 4.5);
+    EXPECT_LT(contrast(quietTextColor(desktop), ground), 0.75 * contrast(text, ground));
+  }
+}
+
 // A pane of 360 × 640 in the desktop's palette.
 class InPalette : public testing::TestWithParam<std::pair<QColor, QColor>> {
  protected:
