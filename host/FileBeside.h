@@ -10,7 +10,8 @@
 namespace varnel {
 
 /// A new file in the folder of another one, which it replaces once it is whole. Only its owner may read it
-/// (mode 0600). The destructor removes it when it has not taken the other's place.
+/// (mode 0600). The destructor removes it when it has not taken the other's place. Where the file system can,
+/// the file has no name until then. So even a killed process leaves nothing.
 class FileBeside final {
  public:
   explicit FileBeside(std::filesystem::path target) : _target(std::move(target)) {}
@@ -27,9 +28,15 @@ class FileBeside final {
   FileDescriptor release() { return std::move(_file); }
 
  private:
+  template <class Make>
+  std::error_code withFreeName(Make make);
+  std::error_code makeNamed();
+  std::error_code giveName();
+
   const std::filesystem::path _target;
   std::filesystem::path _path;  // empty when there is nothing to remove
   FileDescriptor _file;
+  bool _hasNoName = false;
 };
 
 /// Makes sure that the names in the folder are on the disk, if the folder can be read.

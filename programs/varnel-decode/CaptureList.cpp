@@ -39,6 +39,19 @@ std::optional<unsigned> numberIn(std::string_view text) {
 
 std::string asFile(std::string_view name) { return name == "-" ? "./-" : std::string(name); }
 
+// What a list with sizes begins with. Each of its other entries is a size in bytes, a space, and a name.
+constexpr std::string_view sizedListMark = "varnel-list 1";
+
+// Takes the size from the beginning of an entry.
+std::uint64_t takeSize(std::string_view& entry, const std::string& listName) {
+  std::uint64_t size = 0;
+  const auto [end, failure] = std::from_chars(entry.data(), entry.data() + entry.size(), size);
+  if (failure != std::errc() || end == entry.data() + entry.size() || *end != ' ')
+    throw std::runtime_error(listName + " is damaged: an entry in it has no size");
+  entry.remove_prefix(static_cast<std::size_t>(end - entry.data()) + 1);
+  return size;
+}
+
 }  // namespace
 
 std::optional<Part> partNamed(std::string_view text) {
@@ -49,18 +62,27 @@ std::optional<Part> partNamed(std::string_view text) {
   return Part{*number, *count};
 }
 
-std::vector<std::string> capturesIn(std::string_view list, const std::string& listName) {
+CaptureList capturesIn(std::string_view list, const std::string& listName) {
   const char separator = list.find('\0') == std::string_view::npos ? '\n' : '\0';
   std::vector<std::string_view> names;
   names.reserve(static_cast<std::size_t>(std::ranges::count(list, separator)) + 1);
+  const bool hasSizes = separator == '\0' && list.substr(0, list.find(separator)) == sizedListMark;
+  std::vector<std::uint64_t> sizes;
+  if (hasSizes) {
+    list.remove_prefix(sizedListMark.size() + 1);
+    sizes.reserve(names.capacity());
+  }
   while (!list.empty()) {
     const std::size_t end = std::min(list.find(separator), list.size());
-    const std::string_view name = list.substr(0, end);
+    std::string_view name = list.substr(0, end);
     list.remove_prefix(std::min(end + 1, list.size()));
+    const std::uint64_t size = hasSizes ? takeSize(name, listName) : 0;
     if (name.size() >= PATH_MAX)
       throw std::runtime_error(listName + " is no list of captures: a name in it has " +
                                std::to_string(name.size()) + " characters");
-    if (!name.empty()) names.push_back(name);
+    if (name.empty()) continue;
+    names.push_back(name);
+    if (hasSizes) sizes.push_back(size);
   }
   // There may be very many names, and what is needed only here must leave no holes in the memory. So there is
   // no set of them.
@@ -70,14 +92,26 @@ std::vector<std::string> capturesIn(std::string_view list, const std::string& li
   std::vector<bool> occursAgain(names.size());
   for (std::size_t i = 1; i < sorted.size(); ++i)
     occursAgain[sorted[i]] = names[sorted[i]] == names[sorted[i - 1]];
-  std::vector<std::string> captures;
-  captures.reserve(names.size());
-  for (std::size_t i = 0; i < names.size(); ++i)
-    if (!occursAgain[i]) captures.push_back(asFile(names[i]));
+  CaptureList captures;
+  captures.names.reserve(names.size());
+  captures.sizes.reserve(sizes.size());
+  for (std::size_t i = 0; i < names.size(); ++i) {
+    if (occursAgain[i]) continue;
+    captures.names.push_back(asFile(names[i]));
+    if (hasSizes) captures.sizes.push_back(sizes[i]);
+  }
   return captures;
 }
 
-std::vector<std::string> readCaptureList(const std::string& path) {
+std::string listWithSizes(const CaptureList& captures) {
+  std::string list(sizedListMark);
+  list += '\0';
+  for (std::size_t i = 0; i < captures.names.size(); ++i)
+    list.append(std::to_string(captures.sizes.at(i))).append(" ").append(captures.names[i]) += '\0';
+  return list;
+}
+
+CaptureList readCaptureList(const std::string& path) {
   const std::string name = path == "-" ? "standard input" : path;
   const File file(path == "-" ? stdin : std::fopen(path.c_str(), "rbe"));
   if (!file) failToRead(name);

@@ -17,13 +17,24 @@ struct Part {
 /// The part that a text like "3/8" names; nothing for any other text, and for a part that does not exist.
 std::optional<Part> partNamed(std::string_view text);
 
+/// What a list says.
+struct CaptureList {
+  std::vector<std::string> names{};
+  std::vector<std::uint64_t> sizes{};  ///< of each capture; empty unless the list tells them
+};
+
 /// The names in a list. If the list has a NUL character, each name ends with NUL, otherwise with a newline. A
 /// name that occurs again is left out, and so are empty names. The name "-" is that of a file. Throws
-/// std::runtime_error for a name that no file can have, because it is too long.
-std::vector<std::string> capturesIn(std::string_view list, const std::string& listName);
+/// std::runtime_error for a name that no file can have, because it is too long, and for a list with sizes
+/// that is damaged.
+CaptureList capturesIn(std::string_view list, const std::string& listName);
 
 /// Reads such a list; "-" is standard input. Throws std::runtime_error also when it cannot be read.
-std::vector<std::string> readCaptureList(const std::string& path);
+CaptureList readCaptureList(const std::string& path);
+
+/// A list with the sizes, from which each machine comes to the same parts, whatever has become of the
+/// captures since then.
+std::string listWithSizes(const CaptureList& captures);
 
 /// The bytes of each capture; 0 for a file that cannot be found and for anything that is no file.
 std::vector<std::uint64_t> sizesOf(const std::vector<std::string>& captures);

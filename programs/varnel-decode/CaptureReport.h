@@ -27,7 +27,8 @@ struct CaptureEntry {
 };
 
 /// The capture as one line of JSON: {"Path": …, "Status": …, "Why": …, "Records": …, "Left Out": {…},
-/// "Unknown Versions": […], "Seconds": …}. What is not known is null.
+/// "Unknown Versions": […], "Seconds": …}. What is not known is null. A path that is no UTF-8 is followed by
+/// "Path Bytes": all its bytes in hexadecimal digits.
 std::string reportLine(const CaptureEntry& entry);
 
 }  // namespace varnel

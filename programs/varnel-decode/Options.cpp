@@ -11,6 +11,7 @@
 #include "LogGenerator/KLV/Subscriber/SimFiles.h"
 #include "LogGenerator/Radios/Modem/ReportReader.h"
 #include "platform/TelephonyService.h"
+#include "programs/varnel-decode/FileOutput.h"
 #include "programs/varnel-decode/ProgramError.h"
 
 namespace varnel {
@@ -19,6 +20,8 @@ namespace {
 
 constexpr int usageError = 2;
 constexpr const char* listOption = "--files-from";
+constexpr const char* writtenListOption = "--write-list";
+constexpr const char* capturesOption = "CAPTURE";
 constexpr const char* mergeOption = "--merge";
 constexpr const char* databaseOption = "--sqlite";
 constexpr const char* explainOption = "--explain";
@@ -143,7 +146,7 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
       ->type_name("N");
   app.add_flag("--follow", wishes.isFollowing, "wait for more at the end of the file, until interrupted");
   auto* captures = app.add_option(
-      "CAPTURE", options.captures,
+      capturesOption, options.captures,
       "a stream of a diagnostic port, log records, pcap of link type USER0, or a snapshot; - is "
       "standard input; needed unless --files-from, --merge or --explain is given");
   captures->type_name("");
@@ -156,6 +159,10 @@ void declareInput(CLI::App& app, Options& options, Wishes& wishes,
   app.add_option("--part", wishes.part,
                  "decode only this part of the captures; all parts have about the same size")
       ->type_name("K/N");
+  app.add_option(writtenListOption, options.writtenList,
+                 "write the captures with their sizes as a list, and do nothing else; where --part takes "
+                 "this list, parts stay the same when captures change")
+      ->type_name("FILE");
   app.add_flag("--resume", options.isResuming,
                "leave each capture whose output is there and newer than the capture; with --sqlite, each "
                "that the database has and that has not changed");
@@ -424,6 +431,11 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
       return mistake(*other + " does not go with --merge, which takes only --sqlite");
     return options;
   }
+  if (options.writtenList) {
+    if (const auto other = optionBeside(app, {writtenListOption, listOption, capturesOption}))
+      return mistake(*other + " does not go with --write-list, which takes captures only");
+    if (options.writtenList->empty()) return mistake("--write-list: the name of the file is empty");
+  }
   if (const auto taken = fileTakenForPath(options, wishes)) return mistake(*taken);
   if (const auto found = conflict(options, wishes)) return mistake(*found);
   fulfill(options, wishes);
@@ -431,11 +443,23 @@ std::variant<Options, ExitStatus> readOptions(int argumentCount, const char* con
 }
 
 void takeList(Options& options) {
-  if (options.listPath) options.captures = readCaptureList(*options.listPath);
+  if (!options.listPath) return;
+  CaptureList list = readCaptureList(*options.listPath);
+  options.captures = std::move(list.names);
+  options.sizes = std::move(list.sizes);
 }
 
+// The sizes that a list tells serve for no more than that: a capture may have grown since then.
 void takePart(Options& options) {
-  if (options.part) options.captures = shareOf(options.captures, sizesOf(options.captures), *options.part);
+  if (!options.part) return;
+  if (options.sizes.empty()) options.sizes = sizesOf(options.captures);
+  options.captures = shareOf(options.captures, options.sizes, *options.part);
+  options.sizes = {};
+}
+
+void writeList(const Options& options) {
+  const std::string list = listWithSizes({options.captures, sizesOf(options.captures)});
+  writeFile(*options.writtenList, {reinterpret_cast<const std::uint8_t*>(list.data()), list.size()});
 }
 
 }  // namespace varnel

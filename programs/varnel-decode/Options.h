@@ -66,7 +66,9 @@ struct Options {
   /// Captures and snapshots, at least one unless there is a list or parts are merged; "-" is standard input.
   /// `takeList` adds those of the list, and `takePart` takes away those of other parts.
   std::vector<std::string> captures;
+  std::vector<std::uint64_t> sizes;         ///< of the captures, as the list tells them; else empty
   std::optional<std::string> listPath;      ///< a list of captures; "-" is standard input
+  std::optional<std::string> writtenList;   ///< if there is one, the list with sizes is all that is written
   std::optional<std::string> outputFolder;  ///< each capture has an output of its own in this folder
   std::optional<std::string> reportPath;    ///< where to write what became of each capture
   std::optional<std::string> databasePath;  ///< the database that gets each capture
@@ -102,5 +104,8 @@ void takeList(Options& options);
 
 /// Leaves the part of the captures that is to be decoded.
 void takePart(Options& options);
+
+/// Writes the captures with their sizes of now. Throws std::system_error.
+void writeList(const Options& options);
 
 }  // namespace varnel

@@ -16,7 +16,7 @@ NamedFile inputNamed(const std::string& path) {
 }
 
 bool writesToStandardOutput(const Options& options) {
-  if (options.outputFolder) return false;
+  if (options.outputFolder || options.writtenList) return false;
   return options.output != Output::Display || options.writeDisplay != displayAsNothing;
 }
 
@@ -36,6 +36,7 @@ std::vector<NamedFile> outputsOf(const Options& options) {
   if (options.gpxPath) add("--gpx", *options.gpxPath);
   if (options.plot) add("--plot", options.plot->file);
   if (options.databasePath) add("--sqlite", *options.databasePath);
+  if (options.writtenList) add("--write-list", *options.writtenList);
   if (options.reportPath) add("--report", *options.reportPath);
   return outputs;
 }

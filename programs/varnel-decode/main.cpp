@@ -57,6 +57,7 @@ int run(int argumentCount, char** arguments) {
   if (!options.mergedParts.empty()) return mergeParts(options.mergedParts, options.databasePath);
   if (!succeeds([&] { takeList(options); })) return generalError;
   if (const auto clash = outputClash(options)) return mistake(*clash).code;
+  if (options.writtenList) return succeeds([&] { writeList(options); }) ? 0 : generalError;
   takePart(options);
   const Services services{templates, clock, application, nowhere, options.identities};
   return decodeAll(options, {services, clock, templates, technologies});

@@ -3,8 +3,10 @@
 #include <fcntl.h>
 #include <gtest/gtest.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
+#include <csignal>
 #include <fstream>
 #include <string>
 
@@ -64,6 +66,20 @@ TEST_F(WholeFile, AFileThatDoesNotFitLeavesTheEarlierOneAndNothingElse) {
   EXPECT_EQ(failure.message(), "File too large");
   EXPECT_EQ(contentsOf(path()), "old");
   EXPECT_EQ(files(), 1u);
+}
+
+TEST_F(WholeFile, AKilledProcessLeavesNothing) {
+  const pid_t child = ::fork();
+  ASSERT_GE(child, 0);
+  if (child == 0) {
+    WholeFileWriter file(path());
+    if (!file.open() && !file.write(bytesOf("half"))) ::kill(::getpid(), SIGKILL);
+    ::_exit(1);
+  }
+  int status = 0;
+  ASSERT_EQ(::waitpid(child, &status, 0), child);
+  EXPECT_TRUE(WIFSIGNALED(status));
+  EXPECT_EQ(files(), 0u);
 }
 
 TEST_F(WholeFile, NoFolderIsMade) {

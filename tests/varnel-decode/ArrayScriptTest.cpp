@@ -187,13 +187,43 @@ TEST_F(ArrayScript, TheArrayIsAsLargeAsTheListAsks) {
                                      "/logs/%a.log|" + program + "|task|" + out + "|/3|--identities|\n" +
                                      "--parsable|--dependency=afterany:42|--output=" + out +
                                      "/logs/merge.log|" + program + "|merge|" + out + "|3|\n");
-  EXPECT_EQ(contentsOf("out/list"), list);
+  EXPECT_THAT(contentsOf("out/list"), StartsWith(std::string("varnel-list 1\0"
+                                                             "0 name 0\0"
+                                                             "0 name 1\0",
+                                                             32)));
 
   fs::create_directories("out/parts-3");
   EXPECT_EQ(script({"submit", "nul", "out", "--identities"}, {path}).status, 0);
   EXPECT_TRUE(fs::exists("out/parts-3")) << "the tasks go on where they were";
   EXPECT_EQ(script({"submit", "nul", "out"}, {path}).status, 0);
   EXPECT_FALSE(fs::exists("out/parts-3")) << "other options make other parts";
+}
+
+// The largest capture goes away, and another one grows, while the array runs.
+TEST_F(ArrayScript, PartsStayTheSameWhenCapturesChangeWhileTheArrayRuns) {
+  fs::create_directory("bin");
+  write("bin/sbatch", "#!/bin/sh\necho 42\n");
+  fs::permissions("bin/sbatch", fs::perms::owner_all);
+  const std::vector<std::string> environment = {"PATH=" + fs::absolute("bin").string() + ":/usr/bin:/bin",
+                                                "VARNEL_TASKS=3"};
+  const auto submit = [&] {
+    return script({"submit", "list", "out", "--technology", "kalvi-lte", "--log-level", "-1"}, environment);
+  };
+  EXPECT_EQ(submit().status, 0);
+  const std::string list = contentsOf("out/list");
+  EXPECT_EQ(task("1/3").status, 0);
+  fs::rename("capture 6", "capture 7");
+  write("capture 0", pcapHeader() + pcapRecord(afternoon, 0, antennas(2) + std::string(4000, 'x')));
+  EXPECT_EQ(submit().status, 0);
+  EXPECT_EQ(contentsOf("out/list"), list);
+  EXPECT_TRUE(fs::exists("out/parts-3/1.jsonl"));
+  for (const char* part : {"2/3", "3/3"}) EXPECT_EQ(task(part).status, 0);
+  const Result merged = script({"merge", "out", "3"});
+  EXPECT_EQ(merged.status, 0) << merged.error;
+  const std::string report = contentsOf("out/report.jsonl");
+  EXPECT_EQ(linesOf(report), 8u);
+  for (int i = 0; i < 7; ++i)
+    EXPECT_THAT(report, HasSubstr("\"Path\":\"capture " + std::to_string(i) + "\""));
 }
 
 TEST_F(ArrayScript, OptionsThatATaskCannotTakeAreRefusedBeforeAnythingRuns) {

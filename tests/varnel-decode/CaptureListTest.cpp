@@ -12,19 +12,21 @@ using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
 
+std::vector<std::string> namesIn(std::string_view list) { return capturesIn(list, "list").names; }
+
 TEST(CaptureList, NewlinesSeparateNames) {
-  EXPECT_THAT(capturesIn("a\nb c\n\nd", "list"), ElementsAre("a", "b c", "d"));
+  EXPECT_THAT(namesIn("a\nb c\n\nd"), ElementsAre("a", "b c", "d"));
 }
 
 TEST(CaptureList, WithANulCharacterNamesMayHoldNewlines) {
-  EXPECT_THAT(capturesIn("a\nb\0c\0"sv, "list"), ElementsAre("a\nb", "c"));
+  EXPECT_THAT(namesIn("a\nb\0c\0"sv), ElementsAre("a\nb", "c"));
 }
 
 TEST(CaptureList, ANameThatOccursAgainIsLeftOut) {
-  EXPECT_THAT(capturesIn("b\na\nb\na\n", "list"), ElementsAre("b", "a"));
+  EXPECT_THAT(namesIn("b\na\nb\na\n"), ElementsAre("b", "a"));
 }
 
-TEST(CaptureList, ADashIsAFileOfThatName) { EXPECT_THAT(capturesIn("-\n", "list"), ElementsAre("./-")); }
+TEST(CaptureList, ADashIsAFileOfThatName) { EXPECT_THAT(namesIn("-\n"), ElementsAre("./-")); }
 
 TEST(CaptureList, ANameThatNoFileCanHaveMeansThatItIsNoList) {
   try {
@@ -33,7 +35,7 @@ TEST(CaptureList, ANameThatNoFileCanHaveMeansThatItIsNoList) {
   } catch (const std::runtime_error& error) {
     EXPECT_STREQ(error.what(), "capture.bin is no list of captures: a name in it has 4096 characters");
   }
-  EXPECT_EQ(capturesIn(std::string(4095, 'x'), "list").size(), 1u);
+  EXPECT_EQ(namesIn(std::string(4095, 'x')).size(), 1u);
 }
 
 TEST(CaptureList, AListThatCannotBeReadIsNamed) {
@@ -50,6 +52,36 @@ TEST(CaptureList, SizesAreThoseOfFilesAnd0ForAllElse) {
   std::ofstream(folder.file("five")) << "12345";
   EXPECT_THAT(sizesOf({folder.file("five"), folder.file("missing"), folder.path().string()}),
               ElementsAre(5u, 0u, 0u));
+}
+
+TEST(CaptureList, SizesStandBeforeTheNamesOfAListThatSaysSo) {
+  const CaptureList list = capturesIn(
+      "varnel-list 1\0"
+      "12 a b\0"
+      "0  c\n\0"
+      "7 -\0"sv,
+      "list");
+  EXPECT_THAT(list.names, ElementsAre("a b", " c\n", "./-"));
+  EXPECT_THAT(list.sizes, ElementsAre(12u, 0u, 7u));
+  EXPECT_THAT(capturesIn("12 a\n", "list").sizes, IsEmpty());
+  EXPECT_THAT(namesIn("varnel-list 1\n12 a\n"), ElementsAre("varnel-list 1", "12 a")) << "these are names";
+}
+
+TEST(CaptureList, WhatIsWrittenWithSizesIsReadAgain) {
+  const CaptureList list{{"a b", "c\n", "\xFF"}, {5, 18446744073709551615u, 0}};
+  const CaptureList read = capturesIn(listWithSizes(list), "list");
+  EXPECT_EQ(read.names, list.names);
+  EXPECT_EQ(read.sizes, list.sizes);
+}
+
+TEST(CaptureList, AnEntryWithoutASizeMeansThatTheListIsDamaged) {
+  for (const std::string_view list : {"varnel-list 1\0a\0"sv,
+                                      "varnel-list 1\0"
+                                      "12\0"sv,
+                                      "varnel-list 1\0 a\0"sv, "varnel-list 1\0-1 a\0"sv,
+                                      "varnel-list 1\0"
+                                      "99999999999999999999 a\0"sv})
+    EXPECT_THROW(capturesIn(list, "list"), std::runtime_error);
 }
 
 TEST(CaptureParts, APartIsANumberAndHowManyThereAre) {

@@ -1,6 +1,6 @@
 #include "programs/varnel-decode/CaptureReport.h"
 
-#include <gtest/gtest.h>
+#include <gmock/gmock.h>
 
 namespace varnel {
 namespace {
@@ -16,6 +16,14 @@ TEST(CaptureReport, ALineHasWhatIsKnownAndNullForAllElse) {
       reportLine({.path = "a\"b", .fate = CaptureFate::Aborted, .why = "Aborted"}),
       R"({"Path":"a\"b","Status":"aborted","Why":"Aborted","Records":null,"Left Out":null,"Unknown Versions":null,"Seconds":0.000})"
       "\n");
+}
+
+TEST(CaptureReport, NamesThatAreNoTextAreToldByTheirBytes) {
+  EXPECT_THAT(reportLine({.path = "a\xFF"}),
+              testing::StartsWith("{\"Path\":\"a\uFFFD\",\"Path Bytes\":\"61FF\",\"Status\""));
+  EXPECT_THAT(reportLine({.path = "a\xFE"}),
+              testing::StartsWith("{\"Path\":\"a\uFFFD\",\"Path Bytes\":\"61FE\",\"Status\""));
+  EXPECT_THAT(reportLine({.path = "a\uFFFD"}), testing::StartsWith("{\"Path\":\"a\uFFFD\",\"Status\""));
 }
 
 }  // namespace

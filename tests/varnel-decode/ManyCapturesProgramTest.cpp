@@ -1,6 +1,10 @@
+#include <fcntl.h>
 #include <gmock/gmock.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 #include <chrono>
+#include <csignal>
 #include <filesystem>
 
 #include "tests/varnel-decode/DecodeProgram.h"
@@ -80,6 +84,52 @@ TEST_F(ManyCaptures, ThePartsTogetherAreTheWhole) {
   EXPECT_THAT(runLte({"--files-from", "list", "--part", "2/2", "--every"}).output,
               StartsWith("{\"Capture\":\"b\","));
   EXPECT_EQ(runLte({"--files-from", "list", "--part", "4/4", "--every"}).output, "");
+}
+
+TEST_F(ManyCaptures, AListWithSizesMakesTheSamePartsWhateverBecomesOfTheCaptures) {
+  for (const char* name : {"a", "b", "c"}) makeCapture(name, 2);
+  make("list", "a\nb\nc\n");
+  const Result written = run({"--files-from", "list", "--write-list", "sized"});
+  EXPECT_EQ(written.status, 0) << written.error;
+  EXPECT_EQ(written.output, "");
+  EXPECT_EQ(contentsOf("sized"), std::string("varnel-list 1\0"
+                                             "62 a\0"
+                                             "62 b\0"
+                                             "62 c\0",
+                                             29));
+  fs::remove("a");
+  EXPECT_THAT(runLte({"--files-from", "sized", "--part", "2/2", "--every"}).output,
+              StartsWith("{\"Capture\":\"b\","));
+  EXPECT_THAT(runLte({"--files-from", "list", "--part", "2/2", "--every"}).output,
+              StartsWith("{\"Capture\":\"c\","))
+      << "the sizes of now";
+}
+
+TEST_F(ManyCaptures, AListWithSizesIsWrittenAlone) {
+  makeCapture("a", 2);
+  makeCapture("list", 2);
+  for (const std::vector<std::string>& arguments :
+       std::vector<std::vector<std::string>>{{"--write-list", "sized", "--every", "a"},
+                                             {"--write-list", "", "a"},
+                                             {"--write-list", "a", "a"},
+                                             {"--write-list", "list", "--files-from", "list"}})
+    EXPECT_EQ(run(arguments).status, 2) << ::testing::PrintToString(arguments);
+  EXPECT_FALSE(fs::exists("sized"));
+}
+
+TEST_F(ManyCaptures, AnInterruptedRunLeavesNoHiddenFile) {
+  ASSERT_EQ(::mkfifo("pipe", 0600), 0);
+  make("list", "pipe\n");
+  Process process(VARNEL_DECODE_PROGRAM, {"--report", "report", "--every", "--files-from", "list"});
+  // Without a reader, the pipe cannot be opened like that.
+  int writer = -1;
+  EXPECT_TRUE(eventually([&] { return (writer = ::open("pipe", O_WRONLY | O_NONBLOCK)) >= 0; },
+                         std::chrono::seconds(20)));
+  process.signal(SIGINT);
+  EXPECT_TRUE(process.waitForEnd());
+  ::close(writer);
+  const auto names = fs::directory_iterator(".");
+  EXPECT_EQ(std::distance(fs::begin(names), fs::end(names)), 2);
 }
 
 TEST_F(ManyCaptures, EachHasAnOutputOfItsOwnAsIfItWereAlone) {
