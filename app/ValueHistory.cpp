@@ -260,6 +260,7 @@ void ValueHistory::clear() {
   _firstGeneration = 0;
   _bytesOfSeries = 0;
   _lastLoss.reset();
+  _units.clear();
 }
 
 void ValueHistory::add(const std::shared_ptr<const VarnelModelNode>& root, Time now) {
@@ -270,6 +271,46 @@ void ValueHistory::add(const std::shared_ptr<const VarnelModelNode>& root, Time 
   _root = root;
   if (root->childNodes()) Walk(*this).visitRoot(*root);
   std::ranges::sort(_rows);
+}
+
+void ValueHistory::add(std::span<const Reading> readings, Time now) {
+  addGeneration(now);
+  dropOld();
+  _rows.clear();
+  _root.reset();
+  for (const Reading& reading : readings) {
+    const auto found = _byKey.find(reading.key);
+    const bool isKnown = found != _byKey.end();
+    if (isKnown && found->second->lastGeneration == newest()) continue;
+    const bool isNameInside = reading.nameStart <= reading.key.size() &&
+                              reading.nameLength <= reading.key.size() - reading.nameStart;
+    if (!isNameInside) continue;
+    const auto series =
+        isKnown ? found->second : makeSeries(std::string(reading.key), reading.nameStart, reading.nameLength);
+    if (series == _series.end()) continue;
+    if (series->unit != reading.unit) series->unit = keptUnit(reading.unit);
+    append(series, reading.sample);
+  }
+}
+
+// There are only as many units as the decoders have, so the bound is never felt.
+std::string_view ValueHistory::keptUnit(std::string_view unit) {
+  constexpr std::size_t mostUnits = 256;
+  const auto found = _units.find(unit);
+  if (found != _units.end()) return *found;
+  return _units.size() < mostUnits ? *_units.emplace(unit).first : std::string_view();
+}
+
+auto ValueHistory::newestReadings() const -> std::vector<Reading> {
+  std::vector<Reading> readings;
+  // Those on display come last.
+  for (auto series = _series.rbegin(); series != _series.rend() && series->lastGeneration == newest();
+       ++series) {
+    const ValueSeries& samples = series->samples;
+    readings.push_back(
+        {series->key, series->nameStart, series->nameLength, series->unit, samples[samples.size() - 1]});
+  }
+  return readings;
 }
 
 void ValueHistory::addGeneration(Time now) {
@@ -465,6 +506,34 @@ Time ValueHistory::timeAt(Duration point) const {
     ++seconds;
   }
   return {found->time.seconds + seconds, static_cast<std::int32_t>(nanoseconds)};
+}
+
+std::optional<ValueHistory::Duration> ValueHistory::pointAt(Time time) const {
+  for (std::size_t i = _generations.size(); i-- > 0;) {
+    if (_generations[i].time > time) continue;
+    const Duration since = durationBetween(_generations[i].time, time);
+    const bool isNewest = i + 1 == _generations.size();
+    const Duration most = isNewest ? Duration(longestStep) : _generations[i + 1].at - _generations[i].at;
+    // Later, the clock had been set already.
+    if (since <= most) return _generations[i].at + since;
+  }
+  return std::nullopt;
+}
+
+auto ValueHistory::clockPieces(const Stretch& stretch) const -> std::vector<ClockPiece> {
+  std::vector<ClockPiece> pieces;
+  if (_generations.empty() || stretch.end < stretch.begin) return pieces;
+  auto next = std::ranges::upper_bound(_generations, stretch.begin, {}, &Generation::at);
+  auto earlier = next == _generations.begin() ? next : next - 1;
+  pieces.push_back({stretch, timeAt(stretch.begin)});
+  for (; next != _generations.end() && next->at <= stretch.end; earlier = next++) {
+    const bool goesOn = durationBetween(earlier->time, next->time) == next->at - earlier->at;
+    if (goesOn || next == earlier) continue;
+    if (pieces.size() == mostClockPieces) break;
+    pieces.back().stretch.end = next->at;
+    pieces.push_back({{next->at, stretch.end}, next->time});
+  }
+  return pieces;
 }
 
 ValueHistory::Sample ValueHistory::sampleAt(const Series& series, std::size_t index) const {

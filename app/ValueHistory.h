@@ -4,9 +4,12 @@
 #include <cstddef>
 #include <cstdint>
 #include <deque>
+#include <functional>
 #include <list>
 #include <memory>
 #include <optional>
+#include <set>
+#include <span>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -74,6 +77,21 @@ class ValueHistory {
     bool followsGap = false;  ///< not to be joined with what is left of it
   };
 
+  /// A number of a display, without the display: for whoever has the display in another process.
+  struct Reading {
+    std::string_view key;                       ///< of its series
+    std::size_t nameStart = 0, nameLength = 0;  ///< the name of its row within the key
+    std::string_view unit;
+    StoredSample sample{};
+  };
+  /// A stretch in which the clock of the generations went on with the axis.
+  struct ClockPiece {
+    Stretch stretch;
+    Time time;  ///< of its beginning
+  };
+  /// Of the pieces in a stretch, the later ones are not told.
+  static constexpr std::size_t mostClockPieces = 64;
+
   explicit ValueHistory(NumberFormats formats = {}) : ValueHistory(std::move(formats), Limits()) {}
   ValueHistory(NumberFormats formats, const Limits& limits);
   ~ValueHistory();
@@ -85,6 +103,11 @@ class ValueHistory {
 
   /// Keeps the numbers of a display. `now` is the time of the generation: the clock's, or the capture's.
   void add(const std::shared_ptr<const VarnelModelNode>& root, Time now);
+
+  /// Keeps the readings of a display. Those of one series beyond the first count for nothing.
+  void add(std::span<const Reading> readings, Time now);
+  /// The numbers of the display that was added last, in no order. They are valid until the next change.
+  std::vector<Reading> newestReadings() const;
 
   /// The series of a row of the display that was added last. Nothing for a row without one: a section, a
   /// text, a number without an identity.
@@ -114,6 +137,12 @@ class ValueHistory {
   Stretch last(Duration length) const;
   /// The time of the clock at a point of the axis. Between two generations, it goes on from the earlier one.
   Time timeAt(Duration point) const;
+
+  /// The point of the axis that the clock showed as this time; the latest one, if it was set. Nothing when
+  /// the history does not have it.
+  std::optional<Duration> pointAt(Time time) const;
+  /// Where the clock went on with the axis, in order. Empty without generations.
+  std::vector<ClockPiece> clockPieces(const Stretch& stretch) const;
 
   std::vector<Sample> samples(Number number, const Stretch& stretch) const;
   /// Of every sample of the stretch, renewed or not: all of them were on display.
@@ -152,6 +181,7 @@ class ValueHistory {
   /// The end of the list when there is no room for it.
   SeriesList::iterator makeSeries(const std::string& key, std::size_t nameStart, std::size_t nameLength);
   void addRow(const VarnelModelNode& row, Number number);
+  std::string_view keptUnit(std::string_view unit);
   /// Keeps the sample, and less of the oldest ones when there is no room for it.
   void append(SeriesList::iterator series, StoredSample sample);
   /// Lets series go that were silent longest. False when those that are left are still on display.
@@ -174,6 +204,7 @@ class ValueHistory {
   std::uint64_t _nextNumber = 0;
   std::size_t _bytesOfSeries = 0;
   std::optional<Duration> _lastLoss;
+  std::set<std::string, std::less<>> _units;  // of readings
 
   std::shared_ptr<const VarnelModelNode> _root;                  // keeps the rows below alive
   std::vector<std::pair<const VarnelModelNode*, Number>> _rows;  // by address

@@ -75,6 +75,7 @@ void VarnelApp::startOver() {
 void VarnelApp::renewModel() {
   _notices.end();
   if (_host.history) _host.history->clear();
+  if (_host.events) _host.events->clear();
   _statusWithoutLink.reset();
   _model.reset();  // only one model at a time can have the log channel
   _model = std::make_unique<VarnelModel>(_host.model, *this);
@@ -166,7 +167,13 @@ void VarnelApp::keepNumbers() {
     _technologyOfFormats = _model->technology();
     _host.history->setFormats(_model->numberFormats());
   }
-  _host.history->add(_model->topLevelNodes(), _host.model.generator.clock.now());
+  const Time now = _host.model.generator.clock.now();
+  _host.history->add(_model->topLevelNodes(), now);
+  if (_host.events) {
+    const auto whole = _host.history->whole();
+    _host.events->look(_model->display(), now, whole.end);
+    _host.events->dropBefore(whole.begin);
+  }
   _notices.tellOfHistory(_host.history->notice());
 }
 

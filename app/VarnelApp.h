@@ -9,6 +9,7 @@
 
 #include "app/AwaitedUpdates.h"
 #include "app/DateFormatter.h"
+#include "app/EventHistory.h"
 #include "app/NoticeKeeper.h"
 #include "app/RecordLists.h"
 #include "app/RowFacts.h"
@@ -38,6 +39,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
     std::string wayToStartOver = "press Ctrl+R";
     /// Gets the numbers of each display; null when nobody shows their courses.
     ValueHistory* history = nullptr;
+    /// Gets what each display tells of the phone; null when nobody wants to know. Needs the history.
+    EventHistory* events = nullptr;
   };
 
   explicit VarnelApp(const Host& host);
@@ -82,6 +85,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   bool hasRecordsAt(const NamePath& path) const;
   /// These records; nothing when there is no list under these names.
   std::optional<RecordList> recordsAt(const NamePath& path) const;
+  /// The technology that the service named last; empty while there is none.
+  std::string technology() const { return _model ? _model->technology() : std::string(); }
   /// Opens the panes above this node and selects its row. Does nothing when there is no such node any more.
   void goTo(const NamePath& path);
 

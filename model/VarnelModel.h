@@ -92,6 +92,8 @@ class VarnelModel {
   std::shared_ptr<const VarnelModelNode> topLevelNodes();
   /// The node with this path; null when there is none.
   std::shared_ptr<const VarnelModelNode> nodeAtPath(const std::string& path);
+  /// The display of which the tree is made; absent while there is none.
+  const Value& display() const { return _state.get(stateKey::display); }
   /// The items that the save screen writes, as an array; absent while there is no generator.
   Value getSaveContents() const;
   /// How many messages the binary log lacks since the link was opened, because too many came at a time. They

@@ -621,5 +621,72 @@ TEST(ValueHistoryBounds, WhateverIsShownTheSamplesStayInOrderAndTheMemoryBounded
   }
 }
 
+TEST_F(ValueHistoryTest, ItsReadingsMakeTheSameHistoryElsewhere) {
+  ValueHistory other;
+  for (int i = 0; i < 3; ++i) {
+    show(dictionaryOf(
+             {{"Cell", dictionaryOf({{"RSRP", i == 1 ? "none" : "-85.50 dBm"}, {"RSRQ", "-9.00 dB"}})}}),
+         2 * i);
+    other.add(history.newestReadings(), history.timeAt(history.whole().end));
+  }
+  const auto number = other.seriesOfKey("/Cell/RSRP");
+  ASSERT_TRUE(number);
+  EXPECT_EQ(other.unit(*number), "dBm");
+  EXPECT_EQ(other.name(*number), "RSRP");
+  const auto kept = other.samples(*number, other.whole());
+  ASSERT_EQ(kept.size(), 2U);
+  EXPECT_EQ(kept[0].value, -85.5);
+  EXPECT_EQ(kept[0].at, 0s);
+  EXPECT_EQ(kept[1].at, 4s);
+  EXPECT_TRUE(kept[1].followsGap);
+  EXPECT_EQ(other.samples(*other.seriesOfKey("/Cell/RSRQ"), other.whole()).size(), 3U);
+}
+
+TEST_F(ValueHistoryTest, AReadingWhoseNameIsNotInItsKeyIsLeftOut) {
+  const ValueHistory::Reading reading{"/A", 1, 5, "", *StoredSample::ofNumber("1")};
+  history.add(std::vector{reading}, {.seconds = noon});
+  EXPECT_THAT(history.series(), IsEmpty());
+}
+
+TEST_F(ValueHistoryTest, OfSeveralReadingsOfOneSeriesTheFirstCounts) {
+  const ValueHistory::Reading one{"/A", 1, 1, "", *StoredSample::ofNumber("1")};
+  const ValueHistory::Reading two{"/A", 1, 1, "", *StoredSample::ofNumber("2")};
+  history.add(std::vector{one, two}, {.seconds = noon});
+  ASSERT_EQ(samples("/A").size(), 1U);
+  EXPECT_EQ(samples("/A")[0].value, 1);
+}
+
+TEST_F(ValueHistoryTest, TheClockHasAPieceForEachTimeThatItWasSet) {
+  showLevel("-85.00 dBm", 0);
+  showLevel("-85.00 dBm", 2);
+  showLevel("-85.00 dBm", -3600);
+  showLevel("-85.00 dBm", -3598);
+  const auto pieces = history.clockPieces(history.whole());
+  ASSERT_EQ(pieces.size(), 2U);
+  EXPECT_EQ(pieces[0].stretch.end, 2s);
+  EXPECT_EQ(pieces[0].time, (Time{.seconds = noon}));
+  EXPECT_EQ(pieces[1].stretch.begin, 2s);
+  EXPECT_EQ(pieces[1].stretch.end, 4s);
+  EXPECT_EQ(pieces[1].time, (Time{.seconds = noon - 3600}));
+}
+
+TEST_F(ValueHistoryTest, AStretchBeforeTheHistoryHasThePieceOfItsBeginning) {
+  EXPECT_TRUE(history.clockPieces({0s, 1s}).empty());
+  showLevel("-85.00 dBm", 0);
+  const auto pieces = history.clockPieces({-60s, 0s});
+  ASSERT_EQ(pieces.size(), 1U);
+  EXPECT_EQ(pieces[0].time, (Time{.seconds = noon - 60}));
+}
+
+TEST_F(ValueHistoryTest, ATimeHasItsPointOnTheAxis) {
+  EXPECT_FALSE(history.pointAt({.seconds = noon}));
+  showLevel("-85.00 dBm", 0);
+  showLevel("-85.00 dBm", 4);
+  EXPECT_EQ(history.pointAt({.seconds = noon + 3}), 3s);
+  EXPECT_EQ(history.pointAt({.seconds = noon + 9}), 9s);
+  EXPECT_FALSE(history.pointAt({.seconds = noon - 1}));
+  EXPECT_FALSE(history.pointAt({.seconds = noon + 60}));
+}
+
 }  // namespace
 }  // namespace varnel
