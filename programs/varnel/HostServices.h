@@ -33,6 +33,7 @@ class HostServices final {
   LinkMonitor& link() { return _link; }
   MainQueue& queue() { return _queue; }
   DeviceFiles& files() { return _files; }
+  const Clock& clock() const { return _clock; }
   Preferences& preferences() { return _preferences; }
 
  private:

@@ -2,14 +2,17 @@
 
 #include <csignal>
 
+#include "app/EventHistory.h"
 #include "app/RowAnswers.h"
 #include "app/ValueHistory.h"
 #include "app/VarnelApp.h"
 #include "host/SignalWatcher.h"
 #include "host/StateFolder.h"
+#include "programs/varnel/HistoryTrends.h"
 #include "programs/varnel/HostServices.h"
 #include "programs/varnel/PlayedFile.h"
 #include "programs/varnel/RowCommands.h"
+#include "programs/varnel/Trends.h"
 #include "widgets/WidgetApplication.h"
 #include "widgets/WidgetUserInterface.h"
 
@@ -27,16 +30,32 @@ class WindowViewer final {
         _userInterface({.close = [this] { _host.end(0); }, .startOver = [this] { _app.startOver(); }},
                        RememberedSize(stateFolder())),
         _answers(_services.model().generator.resources, _services.model().generator.clock, _history),
+        _liveTrends({.numbers = _history,
+                     .events = _events,
+                     .name = [this] { return _app.technology(); },
+                     .clock = &_services.clock()}),
+        _trends({.live = _liveTrends,
+                 .keyOf = [this](const NamePath& path) { return keyOf(path); },
+                 .tellFailure =
+                     [this](const std::string& why) {
+                       _userInterface.showAlert({"No Trends", why, "OK"});
+                     }}),
         _app({.model = _services.model(),
               .files = _services.files(),
               .preferences = _services.preferences(),
               .userInterface = _userInterface,
-              .history = &_history}),
+              .history = &_history,
+              .events = &_events}),
         _rowCommands(_app, _answers),
         _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [this](int signal) { take(signal); }) {
     _userInterface.setRecordSource({[this](const NamePath& list) { return _app.hasRecordsAt(list); },
                                     [this](const NamePath& list) { return _app.recordsAt(list); }});
     _userInterface.setWindowObserver([this](WindowWidget& window) { furnish(window); });
+    _app.observeDisplay([this] { _trends.refresh(); });
+    if (options.file)
+      _trends.openCapture({.path = *options.file,
+                           .technology = options.technology.value_or(""),
+                           .subscription = options.subscription});
     if (options.updates) _app.afterUpdates(*options.updates, [this] { _host.end(0); });
   }
 
@@ -66,6 +85,14 @@ class WindowViewer final {
                       [&window] {
                         if (!window.page() && window.stack()) window.stack()->toggleRecordTable();
                       });
+    _trends.furnish(window);
+  }
+
+  // The key of the row's number in the history.
+  std::optional<std::string> keyOf(const NamePath& path) const {
+    const VarnelModelNode* const row = _app.nodeAt(path);
+    const auto series = row ? _history.seriesOf(*row) : std::nullopt;
+    return series ? std::optional(std::string(_history.key(*series))) : std::nullopt;
   }
 
   WidgetApplication& _host;
@@ -73,7 +100,10 @@ class WindowViewer final {
   const PlayedFile _file;
   WidgetUserInterface _userInterface;
   ValueHistory _history;
+  EventHistory _events;
   RowAnswers _answers;
+  HistoryTrends _liveTrends;
+  Trends _trends;
   VarnelApp _app;
   RowCommands _rowCommands;
   const SignalWatcher _watcher;

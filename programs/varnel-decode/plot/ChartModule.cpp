@@ -24,7 +24,7 @@
 #include <vector>
 
 #include "programs/shared/TimeTicks.h"
-#include "programs/varnel-decode/plot/Legend.h"
+#include "programs/shared/Legend.h"
 
 namespace varnel {
 

@@ -1,4 +1,4 @@
-#include "programs/varnel-decode/plot/Legend.h"
+#include "programs/shared/Legend.h"
 
 #include <QFont>
 #include <QFontMetricsF>

@@ -1,0 +1,80 @@
+#include "programs/varnel/Trends.h"
+
+#include <memory>
+#include <stdexcept>
+#include <utility>
+
+#include "programs/shared/Modules.h"
+
+namespace varnel {
+
+namespace {
+
+std::unique_ptr<TrendPage> makePage(TrendSource& source) {
+  const auto make = reinterpret_cast<decltype(&varnelMakeTrendPage)>(
+      moduleFunction("varnel-trends.so", "varnelMakeTrendPage", "shows trends"));
+  return std::unique_ptr<TrendPage>(make(source));
+}
+
+}  // namespace
+
+void Trends::furnish(WindowWidget& window) {
+  _window = &window;
+  QAction& trend = window.addCommand(QObject::tr("Trend of this row"), {Qt::Key_T}, [this] {
+    if (page()) return page()->chooseRows();
+    open(_window->pathOfFocus(), Picture::New);
+  });
+  trend.setObjectName(QStringLiteral("trend"));
+  window.addCommand(QObject::tr("Add this row to the last trend"), {Qt::SHIFT | Qt::Key_T}, [this] {
+    if (page()) return page()->chooseRows();
+    open(_window->pathOfFocus(), Picture::WithFormerRows);
+  });
+}
+
+void Trends::show(const NamePath& path) { open(path, Picture::New); }
+
+void Trends::open(const NamePath& path, Picture picture) {
+  if (!_window) return;
+  std::unique_ptr<TrendPage> page;
+  const auto former = picture == Picture::WithFormerRows ? source().remembered() : std::vector<std::string>();
+  try {
+    page = makePage(source());
+  } catch (const std::runtime_error& error) {
+    return _host.tellFailure(error.what());
+  }
+  for (const std::string& key : former) page->addRow(key);
+  const auto key = path.empty() ? std::nullopt : _host.keyOf(path);
+  if (key) page->addRow(*key);
+  _page = page.get();
+  const bool isEmpty = page->rows().empty();
+  _window->showPage(QObject::tr("Trend"), std::move(page));
+  // A section, or a text, has no course.
+  if (isEmpty) _page->chooseRows();
+}
+
+void Trends::refresh() {
+  if (page()) page()->refresh();
+}
+
+HistoryTrends& Trends::source() {
+  const bool isThere = _capture && (_capture->isReading() || !_capture->isEmpty());
+  return isThere ? _capture->trends() : _host.live;
+}
+
+void Trends::openCapture(CaptureHistory::Wish wish) {
+  leavePage();
+  _capture = std::make_unique<CaptureHistory>(std::move(wish));
+}
+
+void Trends::closeCapture() {
+  leavePage();
+  _capture.reset();
+}
+
+void Trends::leavePage() {
+  if (page()) _window->closePage();
+  // Closing deletes the page later, but what it shows may go at once.
+  delete _page.data();
+}
+
+}  // namespace varnel

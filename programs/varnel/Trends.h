@@ -1,0 +1,58 @@
+#pragma once
+
+#include <QPointer>
+#include <functional>
+#include <memory>
+#include <string>
+
+#include "app/TreeSearch.h"
+#include "programs/varnel/CaptureHistory.h"
+#include "programs/varnel/HistoryTrends.h"
+#include "programs/varnel/trends/TrendPage.h"
+#include "widgets/WindowWidget.h"
+
+namespace varnel {
+
+/// Shows the courses of numbers on a page of the window. T shows that of the current row, Shift+T adds it to
+/// the last picture. The view is in a module, which is loaded when it is needed.
+class Trends final {
+ public:
+  struct Host {
+    /// The numbers of the display.
+    HistoryTrends& live;
+    /// The key of the row in the history; nothing when the row has no course.
+    std::function<std::optional<std::string>(const NamePath& path)> keyOf;
+    /// Tells the user why no course can be shown.
+    std::function<void(const std::string& why)> tellFailure;
+  };
+
+  explicit Trends(Host host) : _host(std::move(host)) {}
+
+  /// Adds the commands to the window.
+  void furnish(WindowWidget& window);
+  /// Shows the course of a row, whatever the picture had before.
+  void show(const NamePath& path);
+  /// A display was shown.
+  void refresh();
+  /// Shows the courses of this capture from now on, in place of those of the display. If it turns out to be
+  /// no capture, those of the display are shown.
+  void openCapture(CaptureHistory::Wish wish);
+  /// Shows the courses of the display again.
+  void closeCapture();
+
+  /// Null while no page with courses is open.
+  TrendPage* page() const { return _page && _window && _window->page() == _page ? _page.data() : nullptr; }
+
+ private:
+  enum class Picture { New, WithFormerRows };
+  void open(const NamePath& path, Picture picture);
+  HistoryTrends& source();
+  void leavePage();
+
+  Host _host;
+  std::unique_ptr<CaptureHistory> _capture;
+  QPointer<WindowWidget> _window;
+  QPointer<TrendPage> _page;
+};
+
+}  // namespace varnel

@@ -1,0 +1,117 @@
+#include "programs/varnel/trends/RowChooser.h"
+
+#include <QHBoxLayout>
+#include <QKeyEvent>
+#include <QPushButton>
+#include <QRegularExpression>
+#include <QScroller>
+#include <QVBoxLayout>
+#include <algorithm>
+#include <map>
+
+namespace varnel {
+
+namespace {
+
+constexpr int keyRole = Qt::UserRole + 1;
+constexpr int rowHeight = 32;  // for fingers
+
+// Matches texts with all of these words.
+QRegularExpression patternOf(const QString& words) {
+  QString pattern;
+  for (const QString& word : words.split(QLatin1Char(' '), Qt::SkipEmptyParts))
+    pattern += QStringLiteral("(?=.*") + QRegularExpression::escape(word) + QLatin1Char(')');
+  return QRegularExpression(pattern, QRegularExpression::CaseInsensitiveOption);
+}
+
+}  // namespace
+
+RowChooser::RowChooser(Wishes wishes, QWidget* parent)
+    : QWidget(parent), _wishes(std::move(wishes)), _words(new QLineEdit(this)), _tree(new QTreeView(this)) {
+  _found.setSourceModel(&_rows);
+  _found.setRecursiveFilteringEnabled(true);
+  _words->setPlaceholderText(tr("Find a row"));
+  _words->setAccessibleName(tr("Find a row"));
+  _words->setClearButtonEnabled(true);
+  _words->installEventFilter(this);
+  _tree->setModel(&_found);
+  _tree->installEventFilter(this);
+  _tree->setHeaderHidden(true);
+  _tree->setUniformRowHeights(true);
+  _tree->setEditTriggers(QAbstractItemView::NoEditTriggers);
+  _tree->setTextElideMode(Qt::ElideRight);
+  _tree->setAccessibleName(tr("Rows with numbers, by unit"));
+  QScroller::grabGesture(_tree->viewport(), QScroller::TouchGesture);
+  auto* const done = new QPushButton(tr("Show"), this);
+  auto* const top = new QHBoxLayout;
+  top->addWidget(_words);
+  top->addWidget(done);
+  auto* const column = new QVBoxLayout(this);
+  column->setContentsMargins(8, 4, 8, 8);
+  column->addLayout(top);
+  column->addWidget(_tree);
+  setFocusProxy(_words);
+  connect(done, &QPushButton::clicked, this, [this] { _wishes.done(); });
+  connect(_words, &QLineEdit::textChanged, this, [this](const QString& words) {
+    _found.setFilterRegularExpression(patternOf(words));
+    _tree->expandAll();
+  });
+  connect(_tree, &QTreeView::clicked, this, &RowChooser::turn);
+}
+
+void RowChooser::show(const std::vector<TrendRow>& rows, const std::vector<std::string>& chosen) {
+  _rows.clear();
+  std::map<std::string, QStandardItem*> units;
+  for (const TrendRow& row : rows) {
+    QStandardItem*& unit = units[row.unit];
+    if (!unit) {
+      unit = new QStandardItem(row.unit.empty() ? tr("(no unit)") : QString::fromStdString(row.unit));
+      unit->setSelectable(false);
+      _rows.appendRow(unit);
+    }
+    QString text = QString::fromStdString(row.name);
+    if (!row.place.empty()) text += QStringLiteral(" — ") + QString::fromStdString(row.place);
+    auto* const item = new QStandardItem(text);
+    item->setToolTip(text.toHtmlEscaped());
+    // The whole row turns the check mark, which is larger than the mark under a finger.
+    item->setCheckState(std::ranges::find(chosen, row.key) == chosen.end() ? Qt::Unchecked : Qt::Checked);
+    item->setData(QString::fromStdString(row.key), keyRole);
+    item->setSizeHint(QSize(0, rowHeight));
+    unit->appendRow(item);
+  }
+  _tree->expandAll();
+}
+
+void RowChooser::turn(const QModelIndex& index) {
+  QStandardItem* const item = _rows.itemFromIndex(_found.mapToSource(index));
+  if (!item || !item->data(keyRole).isValid()) return;
+  const bool isWanted = item->checkState() != Qt::Checked;
+  if (_wishes.choose(item->data(keyRole).toString().toStdString(), isWanted))
+    item->setCheckState(isWanted ? Qt::Checked : Qt::Unchecked);
+}
+
+void RowChooser::keyPressEvent(QKeyEvent* event) {
+  if (event->key() == Qt::Key_Escape || event->key() == Qt::Key_Return || event->key() == Qt::Key_Enter)
+    return _wishes.done();
+  QWidget::keyPressEvent(event);
+}
+
+// Down goes from the words to the rows, where Space and Return choose.
+bool RowChooser::eventFilter(QObject* watched, QEvent* event) {
+  if (event->type() != QEvent::KeyPress) return QWidget::eventFilter(watched, event);
+  const int key = static_cast<QKeyEvent*>(event)->key();
+  if (watched == _words && key == Qt::Key_Down) {
+    _tree->setFocus(Qt::TabFocusReason);
+    const QModelIndex unit = _found.index(0, 0);
+    if (!_tree->currentIndex().isValid()) _tree->setCurrentIndex(_found.index(0, 0, unit));
+    return true;
+  }
+  const bool isTurning = key == Qt::Key_Space || key == Qt::Key_Return || key == Qt::Key_Enter;
+  if (watched == _tree && isTurning) {
+    turn(_tree->currentIndex());
+    return true;
+  }
+  return QWidget::eventFilter(watched, event);
+}
+
+}  // namespace varnel
