@@ -6,6 +6,8 @@
 
 #include <QCoreApplication>
 #include <QEvent>
+#include <QTcpServer>
+#include <QTcpSocket>
 #include <cstdlib>
 #include <filesystem>
 #include <map>
@@ -79,6 +81,7 @@ class LiveModemTest : public testing::Test {
   LiveModemTest() {
     ::setenv("DBUS_SYSTEM_BUS_ADDRESS", bus().address().c_str(), 1);
     EXPECT_TRUE(bus().start()) << "dbus-daemon cannot be started";
+    EXPECT_TRUE(_positionService.listen(QHostAddress::LocalHost));
   }
   ~LiveModemTest() override { bus().stop(); }
 
@@ -88,12 +91,15 @@ class LiveModemTest : public testing::Test {
     return only;
   }
 
-  void makeLive(const std::string& wanted = {}) {
+  enum class Positions { AreNotTold, AreTold };
+  void makeLive(const std::string& wanted = {}, Positions positions = Positions::AreNotTold) {
     _live = std::make_unique<LiveModem>(
         LiveModem::Setup{.queue = _queue,
                          .uptime = now,
                          .wanted = wanted,
                          .pollInterval = 1s,
+                         .tellsPosition = positions == Positions::AreTold,
+                         .positionPort = _positionService.serverPort(),
                          .tell = [this](const std::string& sentence) { _told.push_back(sentence); }});
     _live->start();
   }
@@ -121,6 +127,7 @@ class LiveModemTest : public testing::Test {
     return ::mallinfo2().uordblks;
   }
 
+  QTcpServer _positionService;  // plays gpsd
   MockModemManager _service{bus().address()};
   EventLoopQueue _queue;
   std::vector<std::string> _told;
@@ -217,6 +224,54 @@ TEST_F(LiveModemTest, ShowsCardAndConnections) {
   EXPECT_TRUE(shows(packetData, R"(Bytes Received: "6000000000")"));
   _service.does({"change", "0", "Modem", "Bearers=dbus.Array([], signature='o')"});
   EXPECT_TRUE(shows(packetData, "[]"));
+}
+
+// Where the modem's receiver says that it is.
+const char* const ownPosition =
+    "{dbus.UInt32(2): dbus.Dictionary({'utc-time': '120000', 'latitude': 52.5, 'longitude': -13.25, "
+    "'altitude': 34.0}, "
+    "signature='sv')}";
+
+TEST_F(LiveModemTest, NobodyIsAskedForAPositionThatNobodyWants) {
+  startAll({"add", "0", "then", "location", "0", ownPosition});
+  ASSERT_TRUE(shows(modemReport, "Test Net"));
+  runFor(1500ms);
+  EXPECT_THAT(_viewer->last(modemReport), Not(HasSubstr("Position")));
+  EXPECT_FALSE(_positionService.hasPendingConnections());
+}
+
+TEST_F(LiveModemTest, ThePositionIsThatOfTheModemElseThatOfTheService) {
+  _service.start();
+  _service.does({"add", "0", "then", "location", "0", ownPosition});
+  makeLive("", Positions::AreTold);
+  _viewer = std::make_unique<Viewer>(*_live);
+  EXPECT_TRUE(shows(modemReport, R"(Position: {Latitude: 52.5000, Longitude: -13.2500, Altitude: 34.0000, )"
+                                 R"(Source: "GNSS"}})"));
+  ASSERT_TRUE(runUntil([&] { return _positionService.hasPendingConnections(); }));
+  const std::unique_ptr<QTcpSocket> connection(_positionService.nextPendingConnection());
+  connection->write("{\"class\":\"TPV\",\"mode\":2,\"lat\":1.5,\"lon\":2.5}\n");
+  connection->flush();
+  // Its receiver has no fix any more.
+  _service.does({"location", "0", "{dbus.UInt32(1): ''}"});
+  EXPECT_TRUE(shows(modemReport, R"(Position: {Latitude: 1.50000, Longitude: 2.50000, Source: "gpsd"}})"));
+}
+
+// A receiver that has lost its fix repeats its last one.
+TEST_F(LiveModemTest, APositionThatIsNotNewIsForgotten) {
+  _service.start();
+  _service.does({"add", "0", "then", "location", "0", ownPosition});
+  std::chrono::milliseconds later = 0ms;
+  _live = std::make_unique<LiveModem>(LiveModem::Setup{.queue = _queue,
+                                                       .uptime = [&] { return now() + later; },
+                                                       .pollInterval = 1s,
+                                                       .tellsPosition = true,
+                                                       .positionPort = _positionService.serverPort(),
+                                                       .tell = [](const std::string&) {}});
+  _live->start();
+  _viewer = std::make_unique<Viewer>(*_live);
+  ASSERT_TRUE(shows(modemReport, "Position"));
+  later = 16s;
+  EXPECT_TRUE(runUntil([&] { return _viewer->last(modemReport).find("Position") == std::string::npos; }));
 }
 
 TEST_F(LiveModemTest, AViewerThatComesLaterSeesWhatHasNotChanged) {
