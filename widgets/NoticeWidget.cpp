@@ -1,8 +1,10 @@
 #include "widgets/NoticeWidget.h"
 
 #include <QAccessible>
+#include <QHelpEvent>
 #include <QPainter>
 #include <QTextLayout>
+#include <QToolTip>
 #include <cmath>
 #include <memory>
 
@@ -73,6 +75,15 @@ int NoticeWidget::heightForWidth(int width) const {
 QSize NoticeWidget::sizeHint() const { return {width(), heightForWidth(width())}; }
 
 QSize NoticeWidget::minimumSizeHint() const { return {0, 0}; }
+
+bool NoticeWidget::event(QEvent* event) {
+  if (event->type() != QEvent::ToolTip) return QWidget::event(event);
+  if (height() < heightForWidth(width()))
+    QToolTip::showText(static_cast<const QHelpEvent&>(*event).globalPos(), plainTooltip(_text), this);
+  else
+    QToolTip::hideText();
+  return true;
+}
 
 void NoticeWidget::paintEvent(QPaintEvent*) {
   QPainter painter(this);

@@ -24,6 +24,8 @@ class NoticeWidget final : public QWidget {
   QSize minimumSizeHint() const override;
 
  protected:
+  /// Where the pane is too low for all lines, a tooltip has them.
+  bool event(QEvent* event) override;
   void paintEvent(QPaintEvent* event) override;
 
  private:

@@ -1,7 +1,10 @@
 #include "widgets/ToolbarWidget.h"
 
+#include <QHelpEvent>
 #include <QLabel>
 #include <QPainter>
+#include <QStyle>
+#include <QToolTip>
 #include <algorithm>
 #include <utility>
 
@@ -17,8 +20,30 @@ namespace {
 constexpr int barHeight = 48;
 constexpr int inset = 10;
 
+// A text that ends in three dots where it is cut. A tooltip then has all of it.
+class StatusLabel final : public QLabel {
+ protected:
+  bool event(QEvent* event) override {
+    if (event->type() != QEvent::ToolTip) return QLabel::event(event);
+    if (isCut())
+      QToolTip::showText(static_cast<const QHelpEvent&>(*event).globalPos(), plainTooltip(text()), this);
+    else
+      QToolTip::hideText();
+    return true;
+  }
+  void paintEvent(QPaintEvent* event) override {
+    if (!isCut()) return QLabel::paintEvent(event);
+    QPainter painter(this);
+    style()->drawItemText(&painter, rect(), Qt::AlignLeft | Qt::AlignVCenter, palette(), isEnabled(),
+                          fontMetrics().elidedText(text(), Qt::ElideRight, width()), foregroundRole());
+  }
+
+ private:
+  bool isCut() const { return fontMetrics().horizontalAdvance(text()) > width(); }
+};
+
 QLabel* makeLabel() {
-  auto* label = new QLabel;
+  auto* label = new StatusLabel;
   label->setTextFormat(Qt::PlainText);
   // Lets the window be narrower than the text.
   label->setMinimumWidth(1);

@@ -64,6 +64,29 @@ TEST_F(HeaderWidgetTest, ATitleThatDoesNotFitIsCutAtItsEndAndWholeInItsTooltip) 
   EXPECT_EQ(label().toolTip(), "");
 }
 
+TEST_F(HeaderWidgetTest, AWayBackWithoutItsTextHasATooltip) {
+  show("SIM", "Varnel", 360);
+  EXPECT_EQ(back().toolTip(), "");
+  show("A title so long that no letters of it are small enough for the bar", "Varnel", 360);
+  EXPECT_TRUE(back().toolTip().contains("Varnel"));
+}
+
+TEST_F(HeaderWidgetTest, AButtonOnTheRightLeavesTheTitleWhole) {
+  unsigned presses = 0;
+  header.setSideAction([&] { ++presses; });
+  header.showSideButton(HeaderWidget::SideButton{"Table", "Show a table"});
+  show("Reselection Candidates", "Reselection", 360);
+  auto& side = *header.findChildren<TextButton*>().last();
+  EXPECT_TRUE(titleIsWhole());
+  EXPECT_EQ(side.geometry().right(), 359);
+  EXPECT_FALSE(label().geometry().intersects(side.geometry()));
+  EXPECT_FALSE(label().geometry().intersects(back().geometry()));
+  QTest::mouseClick(&side, Qt::LeftButton);
+  EXPECT_EQ(presses, 1u);
+  header.showSideButton(std::nullopt);
+  EXPECT_FALSE(side.isVisible());
+}
+
 TEST_F(HeaderWidgetTest, TitlesAreNoMarkUp) {
   show("<b>A</b> & B", "<i>C</i> & D", 360);
   EXPECT_EQ(label().textFormat(), Qt::PlainText);

@@ -2,7 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <QHelpEvent>
 #include <QTimerEvent>
+#include <QToolTip>
 
 #include "tests/support/TestWidgets.h"
 #include "widgets/SpinnerWidget.h"
@@ -80,6 +82,31 @@ TEST_F(NoticeWidgetTest, StandsOnWhicheverPaneIsOnTop) {
   tell("");
   stack.popTo(*root, Animation::None);
   EXPECT_FALSE(noticeOf(*root).isVisible());
+}
+
+TEST_F(NoticeWidgetTest, ANoticeThatIsCutHasATooltip) {
+  const auto ask = [this] {
+    NoticeWidget& notice = noticeOf(*root);
+    QHelpEvent question(QEvent::ToolTip, QPoint(5, 5), notice.mapToGlobal(QPoint(5, 5)));
+    QApplication::sendEvent(&notice, &question);
+    return QToolTip::text();
+  };
+  tell("No server");
+  EXPECT_EQ(ask(), "");
+  std::string lines = "No server";
+  for (int i = 0; i < 60; ++i) lines += "\nMore";
+  tell(lines);
+  EXPECT_TRUE(ask().contains("No server"));
+  QToolTip::hideText();
+}
+
+TEST_F(NoticeWidgetTest, OnlyTheTopOfTwoPanesShowsIt) {
+  window.resize(1000, 640);
+  tell("No server");
+  const auto next = std::make_shared<TestController>("Next", events);
+  stack.push(next, Animation::None);
+  EXPECT_FALSE(noticeOf(*root).isVisible());
+  EXPECT_TRUE(noticeOf(*next).isVisible());
 }
 
 TEST_F(NoticeWidgetTest, TheTitleOfTheWindowIsOneLine) {

@@ -2,8 +2,11 @@
 
 #include <gtest/gtest.h>
 
+#include <QApplication>
+#include <QHelpEvent>
 #include <QLabel>
 #include <QTest>
+#include <QToolTip>
 
 #include "widgets/SpinnerWidget.h"
 #include "widgets/TextButton.h"
@@ -46,6 +49,20 @@ TEST_F(ToolbarWidgetTest, AnIndicatorThatStandsStillTakesNoRoom) {
 TEST_F(ToolbarWidgetTest, TheStatusIsNotCutAt360) {
   show(false, "Updated 2024-03-01 at 14:05:09", [] {});
   EXPECT_LE(label().sizeHint().width(), label().width());
+}
+
+TEST_F(ToolbarWidgetTest, AStatusThatIsCutHasATooltip) {
+  const auto ask = [this] {
+    QHelpEvent question(QEvent::ToolTip, QPoint(5, 5), label().mapToGlobal(QPoint(5, 5)));
+    QApplication::sendEvent(&label(), &question);
+    return QToolTip::text();
+  };
+  show(false, "Updated", [] {});
+  EXPECT_EQ(ask(), "");
+  show(false, std::string(30, 'a') + " <b>" + std::string(30, 'b'), [] {});
+  ASSERT_GT(label().sizeHint().width(), label().width());
+  EXPECT_TRUE(ask().contains(QString(30, 'a') + " &lt;b&gt;")) << ask().toStdString();
+  QToolTip::hideText();
 }
 
 TEST_F(ToolbarWidgetTest, ItemsOfTheSameKindsMakeNoWidgets) {
