@@ -9,9 +9,13 @@
 #include <cstdlib>
 #include <iostream>
 #include <stdexcept>
+#include <utility>
+#include <vector>
 
 #include "host/SessionBus.h"
+#include "widgets/DesktopColors.h"
 #include "widgets/Display.h"
+#include "widgets/Motion.h"
 
 namespace varnel {
 
@@ -49,7 +53,11 @@ WidgetApplication::WidgetApplication(int& argumentCount, char** arguments)
     : _application(makeApplication(argumentCount, arguments)) {
   std::setlocale(LC_NUMERIC, "C");  // the application object has set the user's locale
   QApplication::setQuitOnLastWindowClosed(false);
-  if (const auto bus = sessionBusAddress()) _colors = std::make_unique<DesktopColors>(*bus);
+  if (const auto bus = sessionBusAddress()) {
+    std::vector<DesktopSettings::Setting> settings = motionSettings();
+    settings.push_back(DesktopColors::setting());
+    _settings = std::make_unique<DesktopSettings>(*bus, std::move(settings));
+  }
   QApplication::setApplicationDisplayName(QStringLiteral("Varnel"));
   // The desktop finds the installed menu entry and icon by this identity.
   const QString applicationID = QStringLiteral("org.varnel.Varnel");

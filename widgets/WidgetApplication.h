@@ -3,7 +3,7 @@
 #include <QApplication>
 #include <memory>
 
-#include "widgets/DesktopColors.h"
+#include "widgets/DesktopSettings.h"
 
 namespace varnel {
 
@@ -23,7 +23,7 @@ class WidgetApplication final {
 
  private:
   std::unique_ptr<QApplication> _application;
-  std::unique_ptr<DesktopColors> _colors;  // null without a session bus
+  std::unique_ptr<DesktopSettings> _settings;  // null without a session bus
 };
 
 }  // namespace varnel

@@ -8,10 +8,11 @@
 
 #include "tests/support/PrivateBus.h"
 #include "widgets/Colors.h"
+#include "widgets/Motion.h"
 
 namespace varnel {
 
-/// A desktop's settings portal with one setting.
+/// A desktop's settings portal: dark, and with animations until they are switched off.
 class FakePortal final : public QObject {
   Q_OBJECT
   Q_CLASSINFO("D-Bus Interface", "org.freedesktop.portal.Settings")
@@ -25,11 +26,18 @@ class FakePortal final : public QObject {
   void change(unsigned scheme) {
     Q_EMIT SettingChanged("org.freedesktop.appearance", "color-scheme", QDBusVariant(scheme));
   }
+  void reduceMotion(unsigned isReduced) {
+    Q_EMIT SettingChanged("org.freedesktop.appearance", "reduced-motion", QDBusVariant(isReduced));
+  }
+  void animate(bool isAnimated) {
+    Q_EMIT SettingChanged("org.gnome.desktop.interface", "enable-animations", QDBusVariant(isAnimated));
+  }
 
   Q_SLOT QDBusVariant Read(const QString& group, const QString& key) {
-    EXPECT_EQ(group, "org.freedesktop.appearance");
-    EXPECT_EQ(key, "color-scheme");
-    return QDBusVariant(QVariant::fromValue(QDBusVariant(1U)));
+    EXPECT_EQ(group,
+              key == "enable-animations" ? "org.gnome.desktop.interface" : "org.freedesktop.appearance");
+    if (key == "enable-animations") return QDBusVariant(QVariant::fromValue(QDBusVariant(false)));
+    return QDBusVariant(QVariant::fromValue(QDBusVariant(key == "color-scheme" ? 1U : 0U)));
   }
   Q_SIGNAL void SettingChanged(const QString& group, const QString& key, const QDBusVariant& value);
 };
@@ -68,17 +76,31 @@ TEST_F(DesktopColorsTest, FollowsTheDesktopsPortal) {
   const QDBusConnection connection = QDBusConnection::sessionBus();
   ASSERT_TRUE(connection.isConnected());
   {
-    const DesktopColors colors(bus.address());
+    const DesktopSettings settings(bus.address(), {DesktopColors::setting()});
     QTest::qWait(100);
     EXPECT_FALSE(isDark()) << "there is no portal";
   }
   FakePortal portal(connection);
-  const DesktopColors colors(bus.address());
+  std::vector<DesktopSettings::Setting> all = motionSettings();
+  all.push_back(DesktopColors::setting());
+  const DesktopSettings settings(bus.address(), all);
   EXPECT_TRUE(QTest::qWaitFor(isDark, patience_ms)) << "what the portal says at first";
   portal.change(2);
   EXPECT_TRUE(QTest::qWaitFor([] { return !isDark(); }, patience_ms));
   portal.change(1);
   EXPECT_TRUE(QTest::qWaitFor(isDark, patience_ms));
+
+  EXPECT_TRUE(QTest::qWaitFor(settingsForbidMotion, patience_ms)) << "what the portal says at first";
+  portal.animate(true);
+  EXPECT_TRUE(QTest::qWaitFor([] { return !settingsForbidMotion(); }, patience_ms));
+  portal.reduceMotion(1);
+  EXPECT_TRUE(QTest::qWaitFor(settingsForbidMotion, patience_ms));
+  portal.animate(false);
+  portal.reduceMotion(0);
+  QTest::qWait(100);
+  EXPECT_TRUE(settingsForbidMotion()) << "one setting is enough";
+  portal.animate(true);
+  EXPECT_TRUE(QTest::qWaitFor([] { return !settingsForbidMotion(); }, patience_ms));
 }
 
 }  // namespace
