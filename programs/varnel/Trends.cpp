@@ -22,16 +22,18 @@ void Trends::furnish(WindowWidget& window) {
   _window = &window;
   QAction& trend = window.addCommand(QObject::tr("Trend of this row"), {Qt::Key_T}, [this] {
     if (page()) return page()->chooseRows();
-    open(_window->pathOfFocus(), Picture::New);
+    show(_window->pathOfFocus());
   });
   trend.setObjectName(QStringLiteral("trend"));
   window.addCommand(QObject::tr("Add this row to the last trend"), {Qt::SHIFT | Qt::Key_T}, [this] {
     if (page()) return page()->chooseRows();
-    open(_window->pathOfFocus(), Picture::WithFormerRows);
+    showAlso(_window->pathOfFocus());
   });
 }
 
 void Trends::show(const NamePath& path) { open(path, Picture::New); }
+
+void Trends::showAlso(const NamePath& path) { open(path, Picture::WithFormerRows); }
 
 void Trends::open(const NamePath& path, Picture picture) {
   if (!_window) return;

@@ -32,6 +32,8 @@ class Trends final {
   void furnish(WindowWidget& window);
   /// Shows the course of a row, whatever the picture had before.
   void show(const NamePath& path);
+  /// Adds the course of a row to those that the last picture had.
+  void showAlso(const NamePath& path);
   /// A display was shown.
   void refresh();
   /// Shows the courses of this capture from now on, in place of those of the display. If it turns out to be

@@ -27,7 +27,11 @@ QRegularExpression patternOf(const QString& words) {
 }  // namespace
 
 RowChooser::RowChooser(Wishes wishes, QWidget* parent)
-    : QWidget(parent), _wishes(std::move(wishes)), _words(new QLineEdit(this)), _tree(new QTreeView(this)) {
+    : QWidget(parent),
+      _wishes(std::move(wishes)),
+      _words(new QLineEdit(this)),
+      _tree(new QTreeView(this)),
+      _nothing(new QLabel(this)) {
   _found.setSourceModel(&_rows);
   _found.setRecursiveFilteringEnabled(true);
   _words->setPlaceholderText(tr("Find a row"));
@@ -49,12 +53,13 @@ RowChooser::RowChooser(Wishes wishes, QWidget* parent)
   auto* const column = new QVBoxLayout(this);
   column->setContentsMargins(8, 4, 8, 8);
   column->addLayout(top);
+  column->addWidget(_nothing);
   column->addWidget(_tree);
   setFocusProxy(_words);
   connect(done, &QPushButton::clicked, this, [this] { _wishes.done(); });
   connect(_words, &QLineEdit::textChanged, this, [this](const QString& words) {
     _found.setFilterRegularExpression(patternOf(words));
-    _tree->expandAll();
+    showFound();
   });
   connect(_tree, &QTreeView::clicked, this, &RowChooser::turn);
 }
@@ -79,7 +84,13 @@ void RowChooser::show(const std::vector<TrendRow>& rows, const std::vector<std::
     item->setSizeHint(QSize(0, rowHeight));
     unit->appendRow(item);
   }
+  showFound();
+}
+
+void RowChooser::showFound() {
   _tree->expandAll();
+  _nothing->setVisible(_found.rowCount() == 0);
+  _nothing->setText(_rows.rowCount() == 0 ? tr("There are no numbers yet.") : tr("No row has these words."));
 }
 
 void RowChooser::turn(const QModelIndex& index) {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QLabel>
 #include <QLineEdit>
 #include <QSortFilterProxyModel>
 #include <QStandardItemModel>
@@ -39,12 +40,14 @@ class RowChooser final : public QWidget {
 
  private:
   void turn(const QModelIndex& index);
+  void showFound();
 
   Wishes _wishes;
   QStandardItemModel _rows;
   QSortFilterProxyModel _found;
   QLineEdit* _words;
   QTreeView* _tree;
+  QLabel* _nothing;
 };
 
 }  // namespace varnel

@@ -233,7 +233,9 @@ void TrendPageWidget::pictureHasChanged() {
 void TrendPageWidget::showRemark() {
   QStringList lines;
   if (!_message.isEmpty()) lines.append(_message);
-  if (_keys.empty()) lines.append(tr("The picture has no row yet: choose some by “Rows…”."));
+  const bool isChoosing = _content->currentWidget() == _chooser;
+  if (isChoosing) lines.append(tr("Choose the rows of the picture."));
+  if (_keys.empty() && !isChoosing) lines.append(tr("The picture has no row yet: choose some by “Rows…”."));
   const QString remark = QString::fromStdString(_source.remark());
   if (!remark.isEmpty()) lines.append(remark);
   _remark->setText(lines.join(QLatin1Char('\n')));
@@ -250,6 +252,7 @@ void TrendPageWidget::chooseRows() {
   _chooser->show(_source.rows(), _keys);
   _content->setCurrentWidget(_chooser);
   _chooser->setFocus(Qt::OtherFocusReason);
+  tell({});
 }
 
 void TrendPageWidget::showPicture() {

@@ -11,6 +11,7 @@
 #include "programs/varnel/trends/TrendPageWidget.h"
 #include "tests/programs/trends/TrendHarness.h"
 #include "tests/support/Process.h"
+#include "widgets/Colors.h"
 
 namespace varnel {
 namespace {
@@ -206,6 +207,8 @@ TEST_F(TrendPageTest, WordsFindRows) {
   QTreeView& tree = page->chooser().tree();
   ASSERT_EQ(tree.model()->rowCount(), 1);
   EXPECT_EQ(tree.model()->index(0, 0).data().toString(), "dBm");
+  page->chooser().words().setText("no such row");
+  EXPECT_EQ(tree.model()->rowCount(), 0);
   QTest::keyClick(&page->chooser().words(), Qt::Key_Escape);
   EXPECT_FALSE(page->chooser().isVisible());
 }
@@ -264,6 +267,16 @@ TEST_F(TrendPageTest, ASmallWindowHasRoomForEverything) {
   }
   EXPECT_GT(view().chart().lines().area().width(), 180);
   EXPECT_LE(page->minimumSizeHint().width(), 360);
+}
+
+// As WCAG 2.1 asks for graphics.
+TEST(TrendLook, LinesHaveThreeTimesTheContrastOfTheirGround) {
+  QPalette dark;
+  dark.setColor(QPalette::Base, QColor(0x1e1e1e));
+  dark.setColor(QPalette::Text, QColor(0xf0f0f0));
+  for (const TrendLook& look : {TrendLook::of(dark, {}), TrendLook::forPaper({})})
+    for (std::size_t line = 0; line < mostTrendLines; ++line)
+      EXPECT_GE(contrast(look.penOf(line).color(), look.ground), 3) << line << " on " << look.isDark;
 }
 
 class SavedTrend : public TrendPageTest {

@@ -1,0 +1,75 @@
+#include "programs/varnel/Trends.h"
+
+#include <gmock/gmock.h>
+
+#include <QTest>
+#include <QTreeView>
+
+#include "tests/programs/trends/TrendHarness.h"
+#include "widgets/WindowWidget.h"
+
+namespace varnel {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+// The window without panes: the tests open courses by their paths. The module is the real one.
+class TrendsTest : public TrendHarness {
+ protected:
+  TrendsTest() {
+    for (int i = 0; i < 5; ++i) show(2 * i, "-85", "-9");
+    trends.furnish(window);
+    window.show();
+    EXPECT_TRUE(QTest::qWaitForWindowExposed(&window));
+  }
+
+  WindowWidget window{{0, 0, 700, 500}, {}};
+  std::string failure;
+  Trends trends{{.live = source,
+                 .keyOf = [](const NamePath& path) -> std::optional<std::string> {
+                   if (path.back() == "RSRP") return level;
+                   if (path.back() == "RSRQ") return quality;
+                   return std::nullopt;
+                 },
+                 .tellFailure = [this](const std::string& why) { failure = why; }}};
+};
+
+TEST_F(TrendsTest, ARowHasItsPictureOnAPageOfTheWindow) {
+  trends.show({"LTE", "Serving Cell", "RSRP"});
+  EXPECT_EQ(failure, "");
+  ASSERT_TRUE(trends.page());
+  EXPECT_EQ(window.page(), trends.page());
+  EXPECT_THAT(trends.page()->rows(), ElementsAre(level));
+  window.closePage();
+  EXPECT_FALSE(trends.page());
+}
+
+TEST_F(TrendsTest, ASecondRowIsAddedOrHasItsOwnPicture) {
+  trends.show({"LTE", "Serving Cell", "RSRP"});
+  window.closePage();
+  trends.showAlso({"LTE", "Neighbors", "RSRQ"});
+  EXPECT_THAT(trends.page()->rows(), ElementsAre(level, quality));
+  window.closePage();
+  trends.show({"LTE", "Neighbors", "RSRQ"});
+  EXPECT_THAT(trends.page()->rows(), ElementsAre(quality));
+}
+
+TEST_F(TrendsTest, ARowWithoutACourseLetsTheUserChoose) {
+  trends.show({"LTE", "Serving Cell"});
+  ASSERT_TRUE(trends.page());
+  EXPECT_THAT(trends.page()->rows(), IsEmpty());
+  EXPECT_TRUE(trends.page()->findChild<QTreeView*>()->isVisible());
+}
+
+TEST_F(TrendsTest, AnOpenedFileTakesThePlaceOfTheDisplay) {
+  trends.show({"LTE", "Serving Cell", "RSRP"});
+  trends.openCapture({.path = "/nowhere/capture", .program = VARNEL_NUMBERS_PROGRAM});
+  EXPECT_FALSE(trends.page());
+  trends.closeCapture();
+  trends.show({"LTE", "Serving Cell", "RSRP"});
+  EXPECT_THAT(trends.page()->rows(), ElementsAre(level));
+}
+
+}  // namespace
+}  // namespace varnel
