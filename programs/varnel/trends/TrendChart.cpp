@@ -5,11 +5,13 @@
 #include <QLegend>
 #include <algorithm>
 #include <limits>
+#include <optional>
 
 namespace varnel {
 
 namespace {
 
+constexpr double narrow = 480;  // points
 constexpr double pointsPerStep = 45;
 constexpr double spaceBetweenTicks = 24;
 constexpr int roomOfLastLabel = 28;  // half of the last time hangs over the end of its axis
@@ -39,7 +41,6 @@ TrendChart::TrendChart()
   legend()->hide();
   setLocalizeNumbers(false);
   setBackgroundRoundness(0);
-  setMargins(QMargins(0, 4, roomOfLastLabel, 0));
   layout()->setContentsMargins(0, 0, 0, 0);
   _time->setLabelsPosition(QCategoryAxis::AxisLabelsPositionOnValue);
   _time->setTruncateLabels(false);
@@ -54,15 +55,15 @@ void TrendChart::setLook(const TrendLook& look) {
   _look = look;
   setBackgroundBrush(look.ground);
   setBackgroundPen(Qt::NoPen);
-  color(*_time);
-  for (const UnitAxis& unit : _units) color(*unit.axis);
+  color(*_time, _look.text);
+  for (UnitAxis& unit : _units) color(*unit.axis, unit.ink = _look.text);
 }
 
-void TrendChart::color(QAbstractAxis& axis) const {
+void TrendChart::color(QAbstractAxis& axis, const QColor& ink) const {
   axis.setLabelsFont(_look.font);
   axis.setTitleFont(_look.font);
-  axis.setLabelsColor(_look.text);
-  axis.setTitleBrush(_look.text);
+  axis.setLabelsColor(ink);
+  axis.setTitleBrush(ink);
   axis.setLinePen(QPen(_look.grid, 1));
   axis.setGridLinePen(QPen(_look.grid, 1));
 }
@@ -71,7 +72,7 @@ int TrendChart::mostTicks() const {
   const QFontMetricsF metrics(_look.font);
   const double width = metrics.horizontalAdvance(QStringLiteral("00:00:00")) + spaceBetweenTicks;
   const double room = std::max(_lines->area().width(), 1.0);
-  return std::clamp(static_cast<int>(room / width), 2, 12);
+  return std::clamp(static_cast<int>(room / width), 3, 12);
 }
 
 void TrendChart::show(const TrendData& data) {
@@ -87,13 +88,28 @@ TrendChart::UnitAxis& TrendChart::axisOf(const std::string& unit) {
   if (found != _units.end()) return *found;
   auto* const axis = new QValueAxis(this);
   axis->setTickType(QValueAxis::TicksDynamic);
+  axis->setTruncateLabels(false);
   axis->setTitleText(axisTitleOf(unit));
-  color(*axis);
-  addAxis(axis, _units.size() % 2 == 0 ? Qt::AlignLeft : Qt::AlignRight);
-  _carrier->attachAxis(axis);
+  color(*axis, _look.text);
   // One grid is enough.
   axis->setGridLineVisible(_units.empty());
-  return _units.emplace_back(UnitAxis{unit, axis, {}});
+  auto* const carrier = new QLineSeries(this);
+  addSeries(carrier);
+  addAxis(axis, _units.size() % 2 == 0 ? Qt::AlignLeft : Qt::AlignRight);
+  carrier->attachAxis(_time);
+  carrier->attachAxis(axis);
+  return _units.emplace_back(UnitAxis{unit, axis, carrier, {}, _look.text});
+}
+
+// An axis of a single line has its color, so that it is plain which line belongs to which axis.
+QColor TrendChart::inkOf(const TrendData& data, const std::string& unit) const {
+  std::optional<std::size_t> only;
+  for (std::size_t i = 0; i < data.lines.size(); ++i) {
+    if (data.lines[i].row.unit != unit) continue;
+    if (only) return _look.text;
+    only = i;
+  }
+  return only && _units.size() > 1 ? _look.penOf(*only).color() : _look.text;
 }
 
 void TrendChart::showUnits(const TrendData& data) {
@@ -101,13 +117,18 @@ void TrendChart::showUnits(const TrendData& data) {
     const bool isUsed = std::ranges::any_of(
         data.lines, [&](const TrendData::Line& line) { return line.row.unit == unit.unit; });
     if (isUsed) return false;
+    removeSeries(unit.carrier);
     removeAxis(unit.axis);
+    delete unit.carrier;
     delete unit.axis;
     return true;
   });
+  if (!_units.empty()) _units.front().axis->setGridLineVisible(true);
   const int steps = std::max(2, static_cast<int>(_lines->area().height() / pointsPerStep));
   for (const TrendData::Line& line : data.lines) {
     UnitAxis& unit = axisOf(line.row.unit);
+    const QColor ink = inkOf(data, unit.unit);
+    if (ink != unit.ink) color(*unit.axis, unit.ink = ink);
     const TrendScale scale = scaleOf(data, unit.unit, steps);
     if (scale == unit.scale) continue;
     unit.scale = scale;
@@ -116,6 +137,12 @@ void TrendChart::showUnits(const TrendData& data) {
     unit.axis->setTickInterval(scale.step);
     unit.axis->setLabelFormat(QStringLiteral("%.%1f").arg(scale.decimals));
   }
+  const bool hasAxisOnTheRight = std::ranges::any_of(
+      _units, [](const UnitAxis& unit) { return unit.axis->alignment() == Qt::AlignRight; });
+  // Where there is little room, the labels on the right would lie below the title of their axis.
+  for (const UnitAxis& unit : _units)
+    unit.axis->setTitleVisible(unit.axis->alignment() == Qt::AlignLeft || size().width() >= narrow);
+  setMargins(QMargins(0, 4, hasAxisOnTheRight ? 0 : roomOfLastLabel, 0));
 }
 
 void TrendChart::showTimes(const TrendData& data) {

@@ -30,17 +30,20 @@ class TrendChart final : public QChart {
   struct UnitAxis {
     std::string unit;
     QValueAxis* axis;
+    QLineSeries* carrier;  // has no points; an axis needs a series, and those of one series have one range
     TrendScale scale;
+    QColor ink;
   };
 
   void showUnits(const TrendData& data);
   void showTimes(const TrendData& data);
   UnitAxis& axisOf(const std::string& unit);
-  void color(QAbstractAxis& axis) const;
+  void color(QAbstractAxis& axis, const QColor& ink) const;
+  QColor inkOf(const TrendData& data, const std::string& unit) const;
 
   TrendLook _look;
   QCategoryAxis* _time;
-  QLineSeries* _carrier;  // has no points; axes belong to a series
+  QLineSeries* _carrier;  // of the axis of time, when there is no row
   std::vector<UnitAxis> _units;
   TrendLines* _lines;
 };

@@ -113,6 +113,12 @@ TEST_F(TrendPageTest, EachUnitHasItsAxis) {
   QStringList titles;
   for (QAbstractAxis* const axis : view().chart().axes(Qt::Vertical)) titles.append(axis->titleText());
   EXPECT_EQ(titles, (QStringList{"dBm", "dB"}));
+  const auto* const levels = static_cast<QValueAxis*>(view().chart().axes(Qt::Vertical)[0]);
+  EXPECT_EQ(levels->min(), -100);
+  EXPECT_EQ(levels->max(), -80);
+  const auto* const qualities = static_cast<QValueAxis*>(view().chart().axes(Qt::Vertical)[1]);
+  EXPECT_EQ(qualities->min(), -10.5);
+  EXPECT_EQ(qualities->max(), -8.5);
   page->removeRow(level);
   EXPECT_THAT(view().chart().axes(Qt::Vertical), SizeIs(1));
 }
