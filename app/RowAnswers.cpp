@@ -1,5 +1,7 @@
 #include "app/RowAnswers.h"
 
+#include <chrono>
+
 #include "app/DateFormatter.h"
 #include "app/PrintableText.h"
 
@@ -8,6 +10,23 @@ namespace varnel {
 namespace {
 
 constexpr std::string_view momentPattern = "yyyy-MM-dd 'at' HH:mm:ss";
+
+// Such as "1 minute"; in the largest unit of which there is a whole one.
+std::string durationText(std::chrono::nanoseconds duration) {
+  struct Unit {
+    std::chrono::seconds length;
+    std::string_view name;
+  };
+  constexpr Unit units[] = {{std::chrono::hours(24), "day"},
+                            {std::chrono::hours(1), "hour"},
+                            {std::chrono::minutes(1), "minute"},
+                            {std::chrono::seconds(1), "second"}};
+  for (const Unit& unit : units) {
+    const auto count = duration / unit.length;
+    if (count > 0) return std::to_string(count) + " " + std::string(unit.name) + (count == 1 ? "" : "s");
+  }
+  return {};
+}
 
 }  // namespace
 
@@ -26,6 +45,22 @@ std::string RowAnswers::titleOf(const NamePath& names) {
 const Explanations& RowAnswers::explanations() const {
   if (!_explanations) _explanations.emplace(_resources);
   return *_explanations;
+}
+
+std::string RowAnswers::explanation(const VarnelModelNode& row, std::string_view path,
+                                    const std::optional<SignalLevel>& level) const {
+  std::string text;
+  const auto add = [&text](const std::string& line) {
+    if (!text.empty()) text += '\n';
+    text += line;
+  };
+  if (const auto explanation = explanations().of(path)) add(explanation->meaning);
+  if (level) add("Level: " + std::string(nameOf(*level)));
+  const auto* const leaf = dynamic_cast<const VarnelModelLeafNode*>(&row);
+  if (!leaf || !leaf->writtenAt()) return text;
+  const std::string age = durationText(durationBetween(*leaf->writtenAt(), _clock.now()));
+  add(age.empty() ? "The modem has just sent it." : "The modem sent it " + age + " ago.");
+  return text;
 }
 
 std::string RowAnswers::meaning(std::string_view path) const {

@@ -28,6 +28,11 @@ class RowAnswers final {
   /// The names with an arrow between them, such as "Cells > 0 > RSRP".
   static std::string titleOf(const NamePath& names);
 
+  /// What stands in the tooltip of a row: what it means, how good this level is, and how long ago the modem
+  /// sent the value. A line for each of them that is known, with a newline between them.
+  std::string explanation(const VarnelModelNode& row, std::string_view path,
+                          const std::optional<SignalLevel>& level) const;
+
   /// What the row or section under this path means: lines that each end in a newline. Empty where nothing is
   /// known.
   std::string meaning(std::string_view path) const;
@@ -47,9 +52,10 @@ class RowAnswers final {
   /// Absent for a row that is no number.
   std::optional<Course> course(const VarnelModelNode& row, const NamePath& names) const;
 
- private:
+  /// Reads the resource if that was not done yet.
   const Explanations& explanations() const;
 
+ private:
   const Resources& _resources;
   const Clock& _clock;
   const ValueHistory& _history;

@@ -26,7 +26,9 @@ VarnelPaneController& varnelPane(PaneController& controller) {
 }  // namespace
 
 VarnelApp::VarnelApp(const Host& host)
-    : _host(host), _notices(host.model, host.wayToStartOver, [this] { showNotice(); }) {}
+    : _host(host),
+      _facts({host.model.generator.clock, host.history, host.answers}),
+      _notices(host.model, host.wayToStartOver, [this] { showNotice(); }) {}
 
 VarnelApp::~VarnelApp() = default;
 
@@ -38,8 +40,7 @@ void VarnelApp::applicationDidFinishLaunching() {
   setUpdateMessage(std::string(notConnectedStatus));
   _dateFormatter.emplace(updateStatusPattern);
 
-  const auto root = std::make_shared<VarnelPaneController>(_host.userInterface, *this, nullptr, "/",
-                                                           RowFacts{&_changes, _host.history});
+  const auto root = std::make_shared<VarnelPaneController>(_host.userInterface, *this, nullptr, "/", &_facts);
   showFirstStatus(*root);
   _navController = _host.userInterface.makeNavigationStack(root);
   _navController->setDelegate(this);
@@ -156,17 +157,21 @@ void VarnelApp::linkWasOpened() {
 
 void VarnelApp::linkWasLookedAt() {
   if (_notices.update()) showNotice();
+  showFactsAgain();
   if (_observer) _observer();
 }
 
 // Before the panes are reloaded: their rows ask the history for their courses.
 void VarnelApp::keepNumbers() {
-  if (!_host.history) return;
+  if (!_host.history && !_host.answers) return;
   // A display that stands still is that of another generator.
   if (_technologyOfFormats != _model->technology() && !_model->standingDisplay()) {
     _technologyOfFormats = _model->technology();
-    _host.history->setFormats(_model->numberFormats());
+    const NumberFormats formats = _model->numberFormats();
+    if (_host.history) _host.history->setFormats(formats);
+    if (_host.answers) _facts.setFormats(formats);
   }
+  if (!_host.history) return;
   const Time now = _host.model.generator.clock.now();
   _host.history->add(_model->topLevelNodes(), now);
   if (_host.events) {
@@ -232,7 +237,18 @@ void VarnelApp::reopenPanes() {
 
 void VarnelApp::showTree(VarnelPaneController::Node root) {
   _tree = std::move(root);
-  _changes.follow(_tree);
+  _facts.follow(_tree, display());
+}
+
+// A display that was given is as it is meant to be.
+RowFacts::Display VarnelApp::display() const {
+  const bool isRenewed = _statusWithoutLink || (isConnected() && !_model->standingDisplay());
+  return isRenewed ? RowFacts::Display::Renewed : RowFacts::Display::Standing;
+}
+
+void VarnelApp::showFactsAgain() {
+  if (!_navController || !_facts.haveChanged(display())) return;
+  for (const auto& pane : _navController->controllers()) varnelPane(*pane).showFactsAgain();
 }
 
 std::vector<FoundNode> VarnelApp::find(std::string_view words) const {

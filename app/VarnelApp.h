@@ -41,6 +41,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
     ValueHistory* history = nullptr;
     /// Gets what each display tells of the phone; null when nobody wants to know. Needs the history.
     EventHistory* events = nullptr;
+    /// What to tell of rows beside their texts: levels, summaries, ages. Null when nobody shows that.
+    const RowAnswers* answers = nullptr;
   };
 
   explicit VarnelApp(const Host& host);
@@ -127,6 +129,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void reopenPanes();
   void keepNumbers();
   void showTree(VarnelPaneController::Node root);
+  RowFacts::Display display() const;
+  void showFactsAgain();
   VarnelPaneController& topPane() const;
   void tellOfDisplay() const;
   void showNotice();
@@ -142,7 +146,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   AwaitedUpdates _awaitedUpdates;
   std::vector<std::function<void()>> _displayObservers;
   VarnelPaneController::Node _tree;  // the one that the panes show
-  TreeChanges _changes;
+  RowFacts _facts;
   NoticeKeeper _notices;
   bool _showsFirstStatus = true;
   std::optional<std::string> _statusWithoutLink;  // of a display that was given

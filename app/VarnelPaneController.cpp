@@ -3,8 +3,6 @@
 #include <algorithm>
 #include <utility>
 
-#include "app/RowCourse.h"
-
 namespace varnel {
 
 namespace {
@@ -18,7 +16,7 @@ constexpr double statusFontSize = 14;
 }  // namespace
 
 VarnelPaneController::VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node,
-                                           std::string path, const RowFacts& facts)
+                                           std::string path, RowFacts* facts)
     : _userInterface(userInterface),
       _saveControl(saveControl),
       _pane(userInterface.makeTablePane()),
@@ -104,11 +102,16 @@ std::unique_ptr<VarnelCell> VarnelPaneController::leafCell(TableView& table,
   return cell;
 }
 
-void VarnelPaneController::showFacts(VarnelCell& cell, const VarnelModelNode& child) const {
-  CellFacts facts;
-  if (_facts.changes && _facts.changes->contains(child)) facts.change = CellChange::Changed;
-  if (_facts.history) facts.course = recentCourse(*_facts.history, child);
-  cell.cellView().setFacts(std::move(facts));
+void VarnelPaneController::showFacts(TableCell& cell, const VarnelModelNode& child) const {
+  if (_facts) cell.cellView().setFacts(_facts->of(rowOf(child)));
+}
+
+void VarnelPaneController::tableView_showFactsInCell(TableView&, TableCell& cell, const IndexPath& path) {
+  showFacts(cell, *childAt(path));
+}
+
+std::string VarnelPaneController::tableView_explanationOfRow(TableView&, const IndexPath& path) {
+  return _facts ? _facts->explanation(rowOf(*childAt(path))) : std::string();
 }
 
 void VarnelPaneController::tableView_didSelectRowAtIndexPath(TableView& table,
@@ -121,6 +124,8 @@ void VarnelPaneController::tableView_didSelectRowAtIndexPath(TableView& table,
   }
   const auto next = std::make_shared<VarnelPaneController>(_userInterface, _saveControl, child,
                                                            childPath(_keyPath, child->displayName()), _facts);
+  next->_names = _names;
+  next->_names.push_back(child->displayName());
   next->setStatus_isLoading(_status, _isLoading);
   if (navigationController()) navigationController()->push(next, Animation::Animated);
 }

@@ -7,6 +7,7 @@
 
 #include "app/RowFacts.h"
 #include "app/SaveControl.h"
+#include "app/TreeSearch.h"
 #include "app/VarnelCell.h"
 #include "model/VarnelModelNode.h"
 #include "platform/ui/UserInterface.h"
@@ -19,10 +20,10 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
  public:
   using Node = std::shared_ptr<const VarnelModelNode>;
 
-  /// A pane for the node with this path. The node is null while there is no tree. User interface, and
-  /// save control must outlive the pane.
+  /// A pane for the node with this path. The node is null while there is no tree. User interface, save
+  /// control, and facts must outlive the pane. Without facts it shows texts only.
   VarnelPaneController(UserInterface& userInterface, SaveControl& saveControl, Node node, std::string path,
-                       const RowFacts& facts = {});
+                       RowFacts* facts = nullptr);
 
   /// The node's path in the tree, "/" for the root.
   const std::string& path() const { return _keyPath; }
@@ -32,6 +33,8 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
   void setStatus_isLoading(std::optional<std::string_view> status, bool isLoading);
   /// Shows another node, or no node.
   void reloadWithNode(Node node);
+  /// Shows what stands beside the texts of the visible rows anew.
+  void showFactsAgain() { _pane->table().showFactsAgain(); }
   /// Selects the row with this name, if there is one.
   void selectRow(std::string_view name);
   /// Selects the row with this name, if there is one, and opens its pane, if it leads to one.
@@ -47,6 +50,8 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
   std::size_t tableView_numberOfRowsInSection(TableView& table, std::size_t section) override;
   std::unique_ptr<TableCell> tableView_cellForRowAtIndexPath(TableView& table,
                                                              const IndexPath& path) override;
+  void tableView_showFactsInCell(TableView& table, TableCell& cell, const IndexPath& path) override;
+  std::string tableView_explanationOfRow(TableView& table, const IndexPath& path) override;
   void tableView_didSelectRowAtIndexPath(TableView& table, const std::optional<IndexPath>& path) override;
 
  private:
@@ -54,7 +59,8 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
                                             const VarnelModelNode& child) const;
   std::unique_ptr<VarnelCell> leafCell(TableView& table, std::unique_ptr<VarnelCell> reused,
                                        const VarnelModelNode& child) const;
-  void showFacts(VarnelCell& cell, const VarnelModelNode& child) const;
+  void showFacts(TableCell& cell, const VarnelModelNode& child) const;
+  RowFacts::Row rowOf(const VarnelModelNode& child) const { return {child, *_nodes, _names}; }
   std::optional<IndexPath> rowNamed(std::string_view name) const;
   Node childAt(const IndexPath& path) const;
   void showTitle();
@@ -64,7 +70,8 @@ class VarnelPaneController final : public PaneController, public TableViewDelega
   std::unique_ptr<TablePane> _pane;
   Node _nodes;
   std::string _keyPath;
-  const RowFacts _facts;
+  NamePath _names;  // of the path, without the root's
+  RowFacts* const _facts;
   std::string _status;
   bool _isLoading = true;
 };

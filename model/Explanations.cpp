@@ -87,6 +87,13 @@ std::string Explanation::text() const {
   return text;
 }
 
+std::optional<SignalLevel> Explanation::levelBy(const Limits& limits, double number) {
+  if (number > limits.highest) return std::nullopt;
+  if (number >= limits.excellent) return SignalLevel::Excellent;
+  if (number >= limits.good) return SignalLevel::Good;
+  return number >= limits.fair ? SignalLevel::Fair : SignalLevel::Poor;
+}
+
 Explanations::Explanations(const Resources& resources) : _resource(resources.propertyList(resourceName)) {}
 
 const Value* Explanations::find(std::string_view path, std::string* key) const {
@@ -125,6 +132,12 @@ std::optional<Explanation> Explanations::of(std::string_view path) const {
                      textIn(*entries, "Standard"), limitsNamed(textIn(*entries, "Level"))};
 }
 
+std::optional<Explanation::Limits> Explanations::limitsOf(std::string_view path) const {
+  const Value* const found = find(path, nullptr);
+  const Dictionary* const entries = found ? found->dictionary() : nullptr;
+  return entries ? limitsNamed(textIn(*entries, "Level")) : std::nullopt;
+}
+
 std::optional<Explanation::Limits> Explanations::limitsNamed(std::string_view name) const {
   const Dictionary* const levels = _resource.dictionary()->get(levelsEntry).dictionary();
   const Dictionary* const limits = levels ? levels->get(name).dictionary() : nullptr;
@@ -161,13 +174,8 @@ std::optional<SignalLevel> Explanations::levelOf(std::string_view path, std::str
 
 std::optional<SignalLevel> Explanations::levelOf(std::string_view path, double number,
                                                  std::string_view unit) const {
-  const auto explanation = unit.empty() ? std::nullopt : of(path);
-  if (!explanation || !explanation->limits) return std::nullopt;
-  const Explanation::Limits& limits = *explanation->limits;
-  if (number > limits.highest) return std::nullopt;
-  if (number >= limits.excellent) return SignalLevel::Excellent;
-  if (number >= limits.good) return SignalLevel::Good;
-  return number >= limits.fair ? SignalLevel::Fair : SignalLevel::Poor;
+  const auto limits = unit.empty() ? std::nullopt : limitsOf(path);
+  return limits ? Explanation::levelBy(*limits, number) : std::nullopt;
 }
 
 }  // namespace varnel

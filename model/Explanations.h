@@ -24,6 +24,9 @@ struct Explanation {
     double fair, good, excellent, highest;
   };
 
+  /// How good this number is. Nothing above the highest reading.
+  static std::optional<SignalLevel> levelBy(const Limits& limits, double number);
+
   std::string meaning;           ///< whole sentences
   std::string unit;              ///< such as "dBm"
   std::string usual;             ///< which values are usual or possible
@@ -53,6 +56,8 @@ class Explanations {
   /// All keys.
   std::vector<std::string> keys() const;
 
+  /// The limits of the level that a row shows. Nothing for a row that shows none.
+  std::optional<Explanation::Limits> limitsOf(std::string_view path) const;
   /// How good the level is that a row shows. Nothing for a row that shows no level, or a number without its
   /// unit.
   std::optional<SignalLevel> levelOf(std::string_view path, std::string_view value,

@@ -45,10 +45,10 @@ struct CellFacts {
   CellLevel level = CellLevel::None;
   CellDimming dimming = CellDimming::None;
   /// What is in the record to which the row leads: parts, the most important one first. Empty for other rows.
-  std::vector<std::string> summary;
+  std::vector<std::string> summary{};
   /// The course of the row's value, the oldest first, one value per equal stretch of time; nothing where
   /// there was none. Empty when the value is no number.
-  std::vector<std::optional<double>> course;
+  std::vector<std::optional<double>> course{};
 
   friend bool operator==(const CellFacts&, const CellFacts&) = default;
 };

@@ -48,6 +48,30 @@ class RowAnswersTest : public testing::Test {
   RowAnswers answers{host.resources, host.clock, history};
 };
 
+TEST_F(RowAnswersTest, AnExplanationTellsWhatIsKnown) {
+  host.clock.set({1700000001, 0});
+  const auto explanation = [this](const NamePath& names, const std::optional<SignalLevel>& level = {}) {
+    return answers.explanation(row(names), RowAnswers::pathOf(names), level);
+  };
+  EXPECT_EQ(explanation({"Cell", "Level"}, SignalLevel::Good),
+            "How strong the cell is.\nLevel: good\nThe modem sent it 1 second ago.");
+  EXPECT_EQ(explanation({"Cell", "Name"}), "The modem sent it 1 second ago.");
+  EXPECT_EQ(explanation({"Cell"}), "The cell that serves the phone.");
+}
+
+TEST_F(RowAnswersTest, AnAgeIsInTheLargestUnitThatFits) {
+  const auto age = [this](std::int64_t seconds) {
+    host.clock.set({1700000000 + seconds, 999'999'999});
+    return answers.explanation(row({"Cell", "Name"}), "/Cell/Name", {});
+  };
+  EXPECT_EQ(age(-1), "The modem has just sent it.");
+  EXPECT_EQ(age(0), "The modem has just sent it.");
+  EXPECT_EQ(age(59), "The modem sent it 59 seconds ago.");
+  EXPECT_EQ(age(60), "The modem sent it 1 minute ago.");
+  EXPECT_EQ(age(7200), "The modem sent it 2 hours ago.");
+  EXPECT_EQ(age(86400), "The modem sent it 1 day ago.");
+}
+
 TEST_F(RowAnswersTest, OfALevelTellValueGradeTimeAndMeaning) {
   EXPECT_EQ(
       everything({"Cell", "Level"}),
