@@ -9,6 +9,15 @@ namespace {
 
 // The lowest contrast at which small text is easy to read (WCAG 2.1, level AA).
 constexpr double readable = 4.5;
+// The lowest contrast at which a mark is easy to see (WCAG 2.1, 1.4.11).
+constexpr double visible = 3;
+
+// The color, or one so near to the text's color that it has this contrast to the ground.
+QColor withContrast(double least, const QColor& color, const QColor& text, const QColor& ground) {
+  double share = 0;
+  while (share < 1 && contrast(blend(color, text, share), ground) < least) share += 0.05;
+  return blend(color, text, std::min(share, 1.0));
+}
 
 double linear(double channel) {
   return channel <= 0.04045 ? channel / 12.92 : std::pow((channel + 0.055) / 1.055, 2.4);
@@ -58,11 +67,16 @@ QColor selectionColor(const QPalette& palette) {
 }
 
 QColor accentColor(const QPalette& palette, const QColor& ground) {
-  const QColor highlight = palette.color(QPalette::Highlight);
-  const QColor text = palette.color(QPalette::WindowText);
-  double share = 0;
-  while (share < 1 && contrast(blend(highlight, text, share), ground) < readable) share += 0.05;
-  return blend(highlight, text, std::min(share, 1.0));
+  return withContrast(readable, palette.color(QPalette::Highlight), palette.color(QPalette::WindowText),
+                      ground);
+}
+
+QColor dimmedTextColor(const QPalette& palette, const QColor& ground) {
+  return withContrast(readable, markColor(palette), palette.color(QPalette::Text), ground);
+}
+
+QColor seenOn(const QColor& ground, const QColor& color, const QColor& text) {
+  return withContrast(visible, color, text, ground);
 }
 
 }  // namespace varnel

@@ -23,6 +23,10 @@ QColor markColor(const QPalette& palette);
 QColor quietTextColor(const QPalette& palette);
 /// The ground of the selected row. The text on it keeps its color.
 QColor selectionColor(const QPalette& palette);
+/// Text that is out of date. It is still easy to read.
+QColor dimmedTextColor(const QPalette& palette, const QColor& ground);
+/// A color for marks on this ground: nearer to the text's color, as far as the mark would not be seen well.
+QColor seenOn(const QColor& ground, const QColor& color, const QColor& text);
 /// Things that can be pressed: the desktop's highlight color, made readable on this ground.
 QColor accentColor(const QPalette& palette, const QColor& ground);
 

@@ -11,6 +11,7 @@ void PaintedLabel::setFont(const Font& font) {
   QFont wanted = qtFont(font);
   if (wanted == _font) return;
   _font = std::move(wanted);
+  _textWidth.reset();
   _row.update();
 }
 
@@ -18,6 +19,7 @@ void PaintedLabel::setText(std::string_view text) {
   if (text == _text) return;
   _text = text;
   _shownText = singleLine(text);
+  _textWidth.reset();
   _row.update();
 }
 
@@ -29,7 +31,8 @@ void PaintedLabel::setFrame(const Rect& frame) {
 }
 
 double PaintedLabel::endOfText() const {
-  return std::min(_frame.right(), _frame.left() + QFontMetricsF(_font).horizontalAdvance(_shownText));
+  if (!_textWidth) _textWidth = QFontMetricsF(_font).horizontalAdvance(_shownText);
+  return std::min(_frame.right(), _frame.left() + *_textWidth);
 }
 
 void PaintedLabel::paint(QPainter& painter) const {

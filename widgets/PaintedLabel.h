@@ -5,6 +5,7 @@
 #include <QRectF>
 #include <QString>
 #include <QWidget>
+#include <optional>
 
 #include "platform/ui/Label.h"
 
@@ -23,6 +24,7 @@ class PaintedLabel final : public Label {
 
   const QRectF& frame() const { return _frame; }
   const QString& shownText() const { return _shownText; }
+  bool isEmpty() const { return _shownText.isEmpty(); }
   /// Where its letters end, which may be before the end of its frame. Without letters, where they would
   /// begin.
   double endOfText() const;
@@ -35,6 +37,7 @@ class PaintedLabel final : public Label {
   QString _shownText;
   QFont _font;
   QRectF _frame;
+  mutable std::optional<double> _textWidth;  // absent until somebody asks
 };
 
 }  // namespace varnel

@@ -75,7 +75,10 @@ void PaintedScrollContainer::paint(QPainter& painter, const Colors& colors) cons
   painter.save();
   painter.setClipRect(qtRect(_frame));
   painter.translate(_frame.x - _position, _frame.y);
-  for (const auto& label : _labels) label->paint(painter);
+  for (const auto& label : _labels) {
+    painter.setPen(label == _labels.front() ? colors.name : colors.value);
+    label->paint(painter);
+  }
   painter.restore();
   if (range() <= 0) return;
   for (const Edge edge : {Edge::Left, Edge::Right}) {

@@ -13,8 +13,9 @@ namespace varnel {
 /// A part of a row that scrolls sideways. The row paints it. The table scrolls it by touch, wheel, and keys.
 class PaintedScrollContainer final : public ScrollContainer {
  public:
-  /// The colors around the texts.
   struct Colors {
+    QColor name;    ///< of the first text
+    QColor value;   ///< of the others
     QColor ground;  ///< the background of the row
     QColor bar;
     QColor mark;
@@ -37,7 +38,7 @@ class PaintedScrollContainer final : public ScrollContainer {
   void scrollTo(double position);
   /// False when all of its texts are visible at the same time.
   bool hasMoreThanFits() const;
-  /// Paints the labels with the painter's pen. If it can be scrolled, also paints a thin bar below them.
+  /// Paints the labels. If it can be scrolled, also paints a thin bar below them.
   /// Texts that go on past an edge fade out there before three dots.
   void paint(QPainter& painter, const Colors& colors) const;
 

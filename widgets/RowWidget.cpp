@@ -5,9 +5,12 @@
 #include <QStringList>
 #include <QToolTip>
 #include <algorithm>
+#include <cmath>
+#include <utility>
 
 #include "platform/ui/TableView.h"
 #include "widgets/Colors.h"
+#include "widgets/LevelMark.h"
 #include "widgets/QtValues.h"
 
 namespace varnel {
@@ -19,6 +22,37 @@ constexpr double builtInTextSize = 15;
 constexpr double accessoryRoom = 30;
 constexpr double markStroke = 2;
 constexpr double openMarkWidth = 4;
+
+constexpr double changeMarkRadius = 2;
+constexpr double changeMarkMiddle = 5;  // between the edge and the text
+constexpr double gap = 8;               // between two things on a row
+constexpr double gapBesideSparkline = 12;
+constexpr double sparklineHeight = 26;
+constexpr double narrowestSparkline = 60;
+constexpr double widestSparkline = 96;
+constexpr double narrowestSummary = 60;
+constexpr double summaryTextSize = 13;
+// So marks and sparklines end at the same place in most rows, whatever their values are.
+constexpr double usualRoomOfValue = 116;
+
+// Characters around a text of another direction, so that it leaves the order of the texts beside it alone.
+constexpr QChar beginningOfIsolate(0x2068), endOfIsolate(0x2069);
+
+QString isolated(const QString& text) {
+  const bool hasOther = std::any_of(text.cbegin(), text.cend(), [](QChar character) {
+    return character.direction() == QChar::DirR || character.direction() == QChar::DirAL;
+  });
+  return hasOther ? beginningOfIsolate + text + endOfIsolate : text;
+}
+
+QFont summaryFont() { return qtFont(Font::system(summaryTextSize)); }
+
+// The first parts of a summary.
+QString joined(const std::vector<std::string>& parts, std::size_t count, const QString& separator) {
+  QStringList texts;
+  for (std::size_t i = 0; i < count; ++i) texts.append(isolated(singleLine(parts[i])));
+  return texts.join(separator);
+}
 
 void stroke(QPainter& painter, const QColor& color, const QPainterPath& path) {
   painter.save();
@@ -93,6 +127,13 @@ void RowWidget::setTextFont(const Font& font) {
   update();
 }
 
+void RowWidget::setFacts(CellFacts facts) {
+  if (facts == _facts) return;
+  _facts = std::move(facts);
+  _sparkline.setCourse(_facts.course);
+  update();
+}
+
 void RowWidget::setRow(std::size_t row) {
   if (row == _row) return;
   _row = row;
@@ -115,6 +156,7 @@ QString RowWidget::description() const {
   for (const auto& container : _containers) {
     for (const auto& label : container->labels()) add(label->shownText());
   }
+  add(joined(_facts.summary, _facts.summary.size(), QStringLiteral(", ")));
   return parts.join(QStringLiteral(": "));
 }
 
@@ -128,6 +170,11 @@ QString RowWidget::name() const {
 
 bool RowWidget::reachesPastItsEdge() const {
   if (QFontMetricsF(_builtInFont).horizontalAdvance(_builtInText) > builtInRoom().width()) return true;
+  if (!_facts.summary.empty()) {
+    const double room = places().summary.width();
+    if (shownSummary(room) != joined(_facts.summary, _facts.summary.size(), QStringLiteral(" · ")))
+      return true;
+  }
   return _labels.hasMoreThanFits() ||
          std::ranges::any_of(_containers, [](const auto& container) { return container->hasMoreThanFits(); });
 }
@@ -161,15 +208,132 @@ void RowWidget::paintEvent(QPaintEvent*) {
   const bool isMarked = _emphasis.isSelected || _emphasis.isOpen;
   const QColor ground = isMarked ? selectionColor(palette()) : palette().color(QPalette::Base);
   painter.fillRect(rect(), ground);
-  painter.setPen(palette().color(QPalette::Text));
+  // The first letters of a text decide about its direction, not the desktop's language.
+  painter.setLayoutDirection(Qt::LayoutDirectionAuto);
+  const QColor plain = palette().color(QPalette::Text);
+  const QColor dimmed = dimmedTextColor(palette(), ground);
+  const QColor name = _facts.dimming == CellDimming::All ? dimmed : plain;
+  painter.setPen(name);
   paintBuiltInText(painter);
-  const PaintedScrollContainer::Colors colors{ground, barColor(palette()), markColor(palette())};
+  paintFacts(painter, ground);
+  const PaintedScrollContainer::Colors colors{name, _facts.dimming == CellDimming::None ? plain : dimmed,
+                                              ground, barColor(palette()), markColor(palette())};
   _labels.paint(painter, colors);
   for (const auto& container : _containers) container->paint(painter, colors);
   paintAccessory(painter);
   paintSeparator(painter);
+  if (_facts.change == CellChange::Changed) paintChangeMark(painter, ground);
   if (_emphasis.isOpen) paintOpenMark(painter);
   if (_emphasis.hasFocusFrame) paintFocusFrame(painter);
+}
+
+std::vector<const PaintedLabel*> RowWidget::filledLabels() const {
+  std::vector<const PaintedLabel*> filled;
+  const auto add = [&filled](const PaintedScrollContainer& part) {
+    for (const auto& label : part.labels()) {
+      if (!label->isEmpty()) filled.push_back(label.get());
+    }
+  };
+  add(_labels);
+  for (const auto& container : _containers) add(*container);
+  return filled;
+}
+
+RowWidget::Places RowWidget::places() const {
+  Places places;
+  if (_facts.level == CellLevel::None && _facts.summary.empty() && !_sparkline.hasLine()) return places;
+  const auto labels = filledLabels();
+  if (labels.size() == 2) placeBesideValue(places, *labels.front(), *labels.back());
+  if (labels.size() == 1) placeBesideName(places, labels.front()->endOfText());
+  return places;
+}
+
+void RowWidget::placeBesideValue(Places& places, const PaintedLabel& name, const PaintedLabel& value) const {
+  constexpr double middle = tableRowHeight / 2;
+  const double endOfName = name.endOfText();
+  // There is always room for the mark before the value.
+  double end = value.frame().left() - gap;
+  if (_facts.level != CellLevel::None) {
+    const double usual = std::min(end, contentArea().width - usualRoomOfValue);
+    if (sidewaysRange() <= 0 && usual - levelMarkSize.width() >= endOfName + gap) end = usual;
+    const QPointF corner(end - levelMarkSize.width(), middle - levelMarkSize.height() / 2);
+    places.levelMark = QRectF(corner, levelMarkSize);
+    end = corner.x();
+  } else {
+    end = std::min(end, contentArea().width - usualRoomOfValue - levelMarkSize.width());
+  }
+  if (sidewaysRange() > 0 || !_sparkline.hasLine()) return;
+  end -= gapBesideSparkline;
+  const double begin = std::max(endOfName + gapBesideSparkline, end - widestSparkline);
+  if (end - begin < narrowestSparkline) return;
+  places.sparkline = QRectF(QPointF(std::ceil(begin), middle - sparklineHeight / 2),
+                            QSizeF(std::floor(end) - std::ceil(begin), sparklineHeight));
+}
+
+void RowWidget::placeBesideName(Places& places, double endOfName) const {
+  constexpr double middle = tableRowHeight / 2;
+  if (_facts.summary.empty()) return;
+  double end = contentArea().width;
+  if (end - endOfName - gap < narrowestSummary) return;
+  if (_facts.level != CellLevel::None) {
+    end -= levelMarkSize.width();
+    places.levelMark = QRectF(QPointF(end, middle - levelMarkSize.height() / 2), levelMarkSize);
+    end -= gap;
+  }
+  const double begin = endOfName + 2 * gap;
+  places.summary = QRectF(begin, 0, std::max(0.0, end - begin), tableRowHeight);
+}
+
+// As many of its parts as there is room for.
+QString RowWidget::shownSummary(double width) const {
+  const QFontMetricsF metrics(summaryFont());
+  QString text;
+  for (std::size_t count = _facts.summary.size(); count > 0; --count) {
+    text = joined(_facts.summary, count, QStringLiteral(" · "));
+    if (metrics.horizontalAdvance(text) <= width) return text;
+  }
+  return metrics.elidedText(text, Qt::ElideRight, width);
+}
+
+void RowWidget::paintFacts(QPainter& painter, const QColor& ground) {
+  const Places where = places();
+  const bool isDimmed = _facts.dimming != CellDimming::None;
+  if (!where.sparkline.isEmpty()) {
+    const QColor line = isDimmed || !_sparkline.changes() ? barColor(palette()) : markColor(palette());
+    const QColor end = isDimmed ? line : seenOn(ground, accentColor(palette(), ground), line);
+    _sparkline.paint(painter, where.sparkline.topLeft(),
+                     {where.sparkline.size(), line, end, devicePixelRatioF()});
+  }
+  if (!where.levelMark.isEmpty()) {
+    const QColor filled = isDimmed ? markColor(palette()) : levelColor(_facts.level, palette(), ground);
+    painter.save();
+    painter.setClipRect(qtRect(contentArea()));
+    paintLevelMark(painter, where.levelMark.topLeft() - QPointF(sidewaysPosition(), 0), _facts.level, filled,
+                   separatorColor(palette()));
+    painter.restore();
+  }
+  if (!where.summary.isEmpty()) paintSummary(painter, where.summary, ground);
+}
+
+void RowWidget::paintSummary(QPainter& painter, const QRectF& area, const QColor& ground) const {
+  const QColor text = palette().color(QPalette::Text);
+  painter.setPen(_facts.dimming == CellDimming::None ? blend(text, ground, 0.2)
+                                                     : dimmedTextColor(palette(), ground));
+  painter.setFont(summaryFont());
+  painter.drawText(
+      area,
+      Qt::AlignRight | Qt::AlignAbsolute | Qt::AlignVCenter | Qt::TextSingleLine | Qt::TextForceLeftToRight,
+      shownSummary(area.width()));
+}
+
+void RowWidget::paintChangeMark(QPainter& painter, const QColor& ground) const {
+  painter.save();
+  painter.setRenderHint(QPainter::Antialiasing);
+  painter.setPen(Qt::NoPen);
+  painter.setBrush(accentColor(palette(), ground));
+  const double middle = changeMarkMiddle + (_emphasis.isOpen ? openMarkWidth / 2 : 0);
+  painter.drawEllipse(QPointF(middle, tableRowHeight / 2), changeMarkRadius, changeMarkRadius);
+  painter.restore();
 }
 
 QRectF RowWidget::builtInRoom() const { return qtRect(contentArea()).adjusted(textInset, 0, -textInset, 0); }

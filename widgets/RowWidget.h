@@ -8,6 +8,7 @@
 
 #include "platform/ui/TableCell.h"
 #include "widgets/PaintedScrollContainer.h"
+#include "widgets/Sparkline.h"
 
 namespace varnel {
 
@@ -37,6 +38,8 @@ class RowWidget final : public QWidget, public CellView {
   void setAccessory(CellAccessory accessory) override;
   void setText(std::string_view text) override;
   void setTextFont(const Font& font) override;
+  void setFacts(CellFacts facts) override;
+  const CellFacts& facts() const { return _facts; }
 
   /// The index of the row in the table.
   std::size_t row() const { return _row; }
@@ -46,14 +49,18 @@ class RowWidget final : public QWidget, public CellView {
   const Emphasis& emphasis() const { return _emphasis; }
   /// Call this after the cell was laid out: labels that reach past the content area can be scrolled.
   void fitLabels();
-  /// The text for a screen reader: "name: value".
+  /// The text for a screen reader: "name: value", or "name: summary".
   QString description() const;
+  /// Where the sparkline is on the row; empty when there is none.
+  QRectF sparklineArea() const { return places().sparkline; }
+  /// How often the sparkline was drawn anew.
+  unsigned sparklinesDrawn() const { return _sparkline.timesDrawn(); }
   /// Whether the row leads to another pane.
   bool leadsOn() const { return _accessory == CellAccessory::DisclosureIndicator; }
   /// The first of the row's texts.
   QString name() const;
   /// True when a part of its text is not visible while the row is at its left end. That text has to be
-  /// scrolled, or is cut.
+  /// scrolled, or is cut. The summary counts too.
   bool reachesPastItsEdge() const;
   /// All of the row's text if the row is too short for it, and this explanation of the row below it; empty
   /// if there is neither.
@@ -70,7 +77,20 @@ class RowWidget final : public QWidget, public CellView {
   void paintEvent(QPaintEvent* event) override;
 
  private:
+  // Where the row's facts are on it, beside its texts. What has no room is empty.
+  struct Places {
+    QRectF sparkline, levelMark, summary;
+  };
+
+  Places places() const;
+  void placeBesideValue(Places& places, const PaintedLabel& name, const PaintedLabel& value) const;
+  void placeBesideName(Places& places, double endOfName) const;
+  std::vector<const PaintedLabel*> filledLabels() const;
+  QString shownSummary(double width) const;
   QRectF builtInRoom() const;
+  void paintFacts(QPainter& painter, const QColor& ground);
+  void paintSummary(QPainter& painter, const QRectF& area, const QColor& ground) const;
+  void paintChangeMark(QPainter& painter, const QColor& ground) const;
   void paintBuiltInText(QPainter& painter) const;
   void paintAccessory(QPainter& painter) const;
   void paintSeparator(QPainter& painter) const;
@@ -88,6 +108,8 @@ class RowWidget final : public QWidget, public CellView {
   QString _builtInText;
   QFont _builtInFont;
   Emphasis _emphasis;
+  CellFacts _facts;
+  Sparkline _sparkline;
 };
 
 }  // namespace varnel

@@ -45,7 +45,8 @@ class WindowViewer final {
               .preferences = _services.preferences(),
               .userInterface = _userInterface,
               .history = &_history,
-              .events = &_events}),
+              .events = &_events,
+              .answers = &_answers}),
         _rowCommands(_app, _answers),
         _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [this](int signal) { take(signal); }) {
     _userInterface.setRecordSource({[this](const NamePath& list) { return _app.hasRecordsAt(list); },

@@ -23,6 +23,8 @@ constexpr int patience_ms = 60'000;
 struct TestRow {
   std::string name;
   std::optional<std::string> value{};
+  CellFacts facts{};
+  std::string explanation{};
 };
 
 /// A delegate that shows rows like a pane, and records the calls.
@@ -45,8 +47,16 @@ class TestRows : public TableViewDelegate {
     cell->key().setText(row.name);
     cell->cellView().setAccessory(row.value ? CellAccessory::None : CellAccessory::DisclosureIndicator);
     if (cell->value()) cell->value()->setText(row.value.value_or(""));
+    cell->cellView().setFacts(row.facts);
     row.value ? cell->setLayout() : cell->setLayoutKey();
     return cell;
+  }
+  void tableView_showFactsInCell(TableView&, TableCell& cell, const IndexPath& path) override {
+    cell.cellView().setFacts(rows.at(path.row).facts);
+  }
+  std::string tableView_explanationOfRow(TableView&, const IndexPath& path) override {
+    explained.push_back(path.row);
+    return rows.at(path.row).explanation;
   }
   void tableView_didSelectRowAtIndexPath(TableView& table, const std::optional<IndexPath>& path) override {
     chosen.push_back(path->row);
@@ -54,9 +64,10 @@ class TestRows : public TableViewDelegate {
   }
 
   std::vector<TestRow> rows;
-  std::vector<std::size_t> asked;   ///< rows for which the table asked for a cell
-  std::vector<std::size_t> chosen;  ///< rows that the user has chosen
-  unsigned made = 0;                ///< cells made
+  std::vector<std::size_t> asked;      ///< rows for which the table asked for a cell
+  std::vector<std::size_t> chosen;     ///< rows that the user has chosen
+  std::vector<std::size_t> explained;  ///< rows whose explanation the table wanted
+  unsigned made = 0;                   ///< cells made
 
  private:
   FontMetrics _metrics;

@@ -45,6 +45,8 @@ TEST_F(AccessibleTableTest, ARowThatIsTooShortForItsValueIsDescribedByAllOfIt) {
   table.reloadData();
   EXPECT_EQ(row(1).text(QAccessible::Description).toStdString(), "RSRP: " + std::string(80, 'x'));
   EXPECT_EQ(row(0).text(QAccessible::Description), "");
+  delegate.rows.at(0).explanation = "It is a row.";
+  EXPECT_EQ(row(0).text(QAccessible::Description), "It is a row.");
 }
 
 TEST(AccessibleWindow, AWindowIsAWindowNamedByItsTitle) {
