@@ -20,9 +20,9 @@
 #include "fuzz/Require.h"
 #include "host/Printable.h"
 #include "model/VarnelModelNode.h"
+#include "programs/shared/SnapshotFile.h"
 #include "programs/varnel-decode/GenerationWriters.h"
 #include "programs/varnel-decode/PlotRecorder.h"
-#include "programs/varnel-decode/SnapshotFile.h"
 #include "programs/varnel-decode/TechnologyGuess.h"
 
 using namespace varnel;

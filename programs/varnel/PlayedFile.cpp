@@ -5,24 +5,33 @@
 
 namespace varnel {
 
-std::vector<std::string> argumentsForReplay(const Options& options, const std::string& capture) {
+std::vector<std::string> argumentsForReplay(const Options& options, const std::string& capture,
+                                            const std::optional<std::string>& technology) {
   // A name may begin like an option.
   std::vector<std::string> arguments{"--replay=" + capture};
-  if (options.technology) arguments.push_back("--technology=" + *options.technology);
+  if (technology) arguments.push_back("--technology=" + *technology);
   if (options.subscription) arguments.push_back("--sim=" + std::to_string(*options.subscription));
   return arguments;
 }
 
 PlayedFile::PlayedFile(const Options& options, HostServices& services) : _services(services) {
   if (!options.file) return;
+  if (auto displays = savedDisplays(*options.file)) {
+    _displays = *std::move(displays);
+  } else {
+    play(options);
+  }
+}
+
+void PlayedFile::play(const Options& options) {
   _server = std::make_unique<ChildServer>(
-      serverProgram(), argumentsForReplay(options, *options.file),
+      serverProgram(), argumentsForReplay(options, *options.file, options.technology),
       ChildServer::Handlers{
           .ready = [this] { _start.quit(); },
           .ended = [this, file = *options.file](const std::string& why) { serverHasEnded(file, why); }});
   const int status = _start.exec();
   if (!_trouble.empty()) throw std::runtime_error(_trouble);
-  services.connectTo(_server->folder());
+  _services.connectTo(_server->folder());
   if (_server->isReady()) return;
   // The wish to end has ended the wait alone.
   QMetaObject::invokeMethod(

@@ -2,32 +2,42 @@
 
 #include <QEventLoop>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "host/ChildServer.h"
 #include "programs/varnel/HostServices.h"
+#include "programs/varnel/SavedDisplays.h"
 
 namespace varnel {
 
-/// What a server needs to play this capture as the options say.
-std::vector<std::string> argumentsForReplay(const Options& options, const std::string& capture);
+/// What a server needs to play this capture as that of this technology, and of the SIM card that the options
+/// name.
+std::vector<std::string> argumentsForReplay(const Options& options, const std::string& capture,
+                                            const std::optional<std::string>& technology);
 
-/// The capture that the command line names, played by a server of the viewer's own, for a viewer that shows
-/// nothing else.
+/// The file that the command line names, for a viewer that shows nothing else: the displays of a snapshot, or
+/// a capture that is played by a server of the viewer's own.
 class PlayedFile final {
  public:
-  /// Without a file in the options does nothing. Else runs the event loop until models can connect to the
-  /// server, or until the program is asked to end. The services must outlive the object. Throws
-  /// std::runtime_error with the server's reason when the file cannot be played.
+  /// Without a file in the options does nothing. For a capture runs the event loop until models can connect
+  /// to the server, or until the program is asked to end. The services must outlive the object. Throws
+  /// std::runtime_error with the reason when the file cannot be shown.
   PlayedFile(const Options& options, HostServices& services);
   PlayedFile(const PlayedFile&) = delete;
   PlayedFile& operator=(const PlayedFile&) = delete;
 
+  /// The displays of a snapshot, the oldest first; empty when the file is none.
+  const std::vector<Generation>& displays() const { return _displays; }
+
  private:
   void serverHasEnded(const std::string& file, const std::string& why);
 
+  void play(const Options& options);
+
   HostServices& _services;
+  std::vector<Generation> _displays;
   QEventLoop _start;
   std::string _trouble;  // why the server has ended before it was ready
   std::unique_ptr<ChildServer> _server;

@@ -116,7 +116,7 @@ class TerminalViewer final {
         _userInterface(
             _services.queue(),
             {.close = [this] { _host.end(0); },
-             .startOver = [this] { _app.startOver(); },
+             .startOver = [this] { startOver(); },
              .save = [this] { _app.save(); },
              .find = [this](const std::string& words) { return found(words); },
              .goTo = [this](const FoundRow& row) { _app.goTo(row.path); },
@@ -138,6 +138,7 @@ class TerminalViewer final {
   int run() {
     _userInterface.resize(_screen->columns(), _screen->rows());
     _app.applicationDidFinishLaunching();
+    if (!_file.displays().empty()) showSaved();
     const int status = _host.run();
     _app.applicationWillTerminate();
     _screen.reset();
@@ -146,10 +147,17 @@ class TerminalViewer final {
   }
 
  private:
+  void startOver() { _file.displays().empty() ? _app.startOver() : showSaved(); }
+  // The last display of the snapshot.
+  void showSaved() {
+    const Generation& saved = _file.displays().back();
+    _app.showDisplay(saved.display, statusOfSaved(saved.time));
+  }
+
   void take(int signal) {
     switch (signal) {
       case SIGUSR1:
-        return _app.startOver();
+        return startOver();
       case SIGUSR2:
         return _app.save();
       case SIGWINCH:

@@ -8,6 +8,7 @@
 #include <optional>
 
 #include "app/TextViewer.h"
+#include "app/TreeText.h"
 #include "host/HostApplication.h"
 #include "host/KeyWatcher.h"
 #include "host/SignalWatcher.h"
@@ -16,6 +17,21 @@
 #include "programs/varnel/StandardOutput.h"
 
 namespace varnel {
+
+namespace {
+
+// The displays of a snapshot, a page each, and at most as many as the user wants.
+void showAll(const std::vector<Generation>& displays, std::optional<unsigned> most, TextOutput& output) {
+  unsigned count = 0;
+  for (const Generation& saved : displays) {
+    if (most && count++ == *most) return;
+    PathDictionary paths;
+    const auto tree = VarnelModelNode::makeTreeFromObject_withPathDictionary(saved.display, paths);
+    output.show({.status = statusOfSaved(saved.time), .tree = treeAsText(*tree)});
+  }
+}
+
+}  // namespace
 
 int viewAsText(int& argumentCount, char** arguments, const Options& options,
                const ApplicationInfo& application) {
@@ -32,6 +48,10 @@ int viewAsText(int& argumentCount, char** arguments, const Options& options,
     host.end(status);
   });
 
+  if (!file.displays().empty()) {
+    showAll(file.displays(), options.updates, output);
+    return status;
+  }
   std::optional<TextViewer> viewer;
   const KeyWatcher keys([&](char key) {
     switch (std::toupper(static_cast<unsigned char>(key))) {

@@ -10,7 +10,7 @@
 #include "host/StateFolder.h"
 #include "programs/varnel/HistoryTrends.h"
 #include "programs/varnel/HostServices.h"
-#include "programs/varnel/PlayedFile.h"
+#include "programs/varnel/Player.h"
 #include "programs/varnel/RowCommands.h"
 #include "programs/varnel/Trends.h"
 #include "widgets/WidgetApplication.h"
@@ -26,8 +26,7 @@ class WindowViewer final {
   WindowViewer(WidgetApplication& host, const Options& options, const ApplicationInfo& application)
       : _host(host),
         _services(options, application),
-        _file(options, _services),
-        _userInterface({.close = [this] { _host.end(0); }, .startOver = [this] { _app.startOver(); }},
+        _userInterface({.close = [this] { _host.end(0); }, .startOver = [this] { _player.startOver(); }},
                        RememberedSize(stateFolder())),
         _answers(_services.model().generator.resources, _services.model().generator.clock, _history),
         _liveTrends({.numbers = _history,
@@ -48,20 +47,19 @@ class WindowViewer final {
               .events = &_events,
               .answers = &_answers}),
         _rowCommands(_app, _answers),
+        _player({_services, _app, _userInterface, options,
+                 [this, &options](const auto& capture) { showCourses(capture, options); }}),
         _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [this](int signal) { take(signal); }) {
     _userInterface.setRecordSource({[this](const NamePath& list) { return _app.hasRecordsAt(list); },
                                     [this](const NamePath& list) { return _app.recordsAt(list); }});
     _userInterface.setWindowObserver([this](WindowWidget& window) { furnish(window); });
     _app.observeDisplay([this] { _trends.refresh(); });
-    if (options.file)
-      _trends.openCapture({.path = *options.file,
-                           .technology = options.technology.value_or(""),
-                           .subscription = options.subscription});
     if (options.updates) _app.afterUpdates(*options.updates, [this] { _host.end(0); });
   }
 
   int run() {
     _app.applicationDidFinishLaunching();
+    _player.begin();
     const int status = _host.run();
     _app.applicationWillTerminate();
     return status;
@@ -71,7 +69,7 @@ class WindowViewer final {
   void take(int signal) {
     switch (signal) {
       case SIGUSR1:
-        return _app.startOver();
+        return _player.startOver();
       case SIGUSR2:
         return _app.save();
       default:
@@ -87,6 +85,16 @@ class WindowViewer final {
                         if (!window.page() && window.stack()) window.stack()->toggleRecordTable();
                       });
     _trends.furnish(window);
+    _player.furnish(window);
+  }
+
+  // The courses are those of the capture that is played, if there is one.
+  void showCourses(const std::optional<Player::Capture>& capture, const Options& options) {
+    if (!capture) return _trends.closeCapture();
+    _trends.openCapture({.path = capture->path,
+                         .technology = capture->technology.value_or(""),
+                         .subscription = options.subscription,
+                         .playedTime = [this] { return _player.playedTime(); }});
   }
 
   // The key of the row's number in the history.
@@ -98,7 +106,6 @@ class WindowViewer final {
 
   WidgetApplication& _host;
   HostServices _services;
-  const PlayedFile _file;
   WidgetUserInterface _userInterface;
   ValueHistory _history;
   EventHistory _events;
@@ -107,6 +114,7 @@ class WindowViewer final {
   Trends _trends;
   VarnelApp _app;
   RowCommands _rowCommands;
+  Player _player;
   const SignalWatcher _watcher;
 };
 

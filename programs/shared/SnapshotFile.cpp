@@ -1,4 +1,4 @@
-#include "programs/varnel-decode/SnapshotFile.h"
+#include "programs/shared/SnapshotFile.h"
 
 #include <algorithm>
 #include <stdexcept>

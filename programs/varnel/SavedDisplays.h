@@ -1,0 +1,18 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "programs/shared/Generation.h"
+
+namespace varnel {
+
+/// The displays of the snapshot at this path, the oldest first; nothing when the file is no snapshot. Throws
+/// std::runtime_error, one sentence, when it cannot be read, or has no display.
+std::optional<std::vector<Generation>> savedDisplays(const std::string& path);
+
+/// The status for a display that was saved at this time.
+std::string statusOfSaved(Time time);
+
+}  // namespace varnel
