@@ -5,6 +5,7 @@
 #include <regex>
 #include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "host/CaptureWriter.h"
@@ -97,6 +98,21 @@ TEST_F(Installation, TheDesktopFileNamesAProgramAndAnIconThatAreThere) {
   EXPECT_TRUE(fs::exists(installed("bin/varnel")));
   EXPECT_THAT(entry, HasSubstr("\nIcon=" + applicationID + "\n"));
   EXPECT_TRUE(fs::exists(installed("share/icons/hicolor/scalable/apps/" + applicationID + ".svg")));
+}
+
+TEST_F(Installation, TheDesktopOpensOurFilesWithTheViewer) {
+  expectSuccess(tool("update-mime-database"), {installed("share/mime")});
+  const std::string patterns = contentsOf(installed("share/mime/globs2"));
+  const std::string entry = contentsOf(installed("share/applications/" + applicationID + ".desktop"));
+  EXPECT_THAT(entry, HasSubstr("\nExec=varnel --ui window %f\n"));
+  const auto types = matches(entry, std::regex("[=;]((?:application)/[^;\n]+)"));
+  for (const auto& [pattern, type] : {std::pair("*.varnel", "application/x-varnel-snapshot"),
+                                      std::pair("*.framed", "application/x-varnel-framed"),
+                                      std::pair("*.pcapng", "application/x-pcapng")}) {
+    EXPECT_THAT(patterns, HasSubstr(std::string(":") + type + ":" + pattern + "\n"));
+    EXPECT_EQ(types.count(type), 1u) << type;
+  }
+  EXPECT_EQ(types.count("application/vnd.tcpdump.pcap"), 1u);
 }
 
 TEST_F(Installation, TheDissectorIsThereWithItsTableOfLogCodes) {
