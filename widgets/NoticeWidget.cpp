@@ -58,7 +58,8 @@ void NoticeWidget::setText(std::string_view text) {
   updateGeometry();
   update();
   setVisible(!_text.isEmpty() && !_isShownElsewhere);
-  if (_text.isEmpty() || _isShownElsewhere) return;
+  // Only the one on the screen is spoken: every pane of a stack has one.
+  if (!isVisible()) return;
   QAccessibleEvent spoken(this, QAccessible::Alert);
   QAccessible::updateAccessibility(&spoken);
 }

@@ -47,6 +47,8 @@ RecordTableWidget::RecordTableWidget(Chosen chosen, QWidget* parent)
   horizontalHeader()->setSortIndicatorClearable(true);
   horizontalHeader()->setSortIndicator(-1, Qt::AscendingOrder);
   setSortingEnabled(true);
+  connect(horizontalHeader(), &QHeaderView::sectionResized, this,
+          [this](int column) { keepWidthOf(column); });
   connect(this, &QTableView::clicked, this, [this](const QModelIndex& index) { choose(index); });
 }
 
@@ -63,14 +65,21 @@ void RecordTableWidget::showRecords(RecordList list) {
   widenColumns();
 }
 
+void RecordTableWidget::keepWidthOf(int column) {
+  if (!_isWidening) _columnsOfUser.insert(column);
+}
+
 // Never makes a column narrower: it would jump with every value.
 void RecordTableWidget::widenColumns() {
   QHeaderView& header = *horizontalHeader();
+  _isWidening = true;
   for (int column = 0; column < _model.columnCount(); ++column) {
     const int wanted = std::max(sizeHintForColumn(column), header.sectionSizeHint(column)) + paddingOfCells;
     const int width = std::min(wanted, widestColumn);
-    if (width > header.sectionSize(column)) header.resizeSection(column, width);
+    if (width > header.sectionSize(column) && !_columnsOfUser.contains(column))
+      header.resizeSection(column, width);
   }
+  _isWidening = false;
 }
 
 void RecordTableWidget::makeCurrent(std::size_t place) {

@@ -3,6 +3,7 @@
 #include <QTableView>
 #include <functional>
 #include <optional>
+#include <set>
 #include <string>
 
 #include "widgets/RecordTableModel.h"
@@ -45,11 +46,14 @@ class RecordTableWidget final : public QTableView {
   void choose(const QModelIndex& index);
   void sortByCurrentColumn();
   void widenColumns();
+  void keepWidthOf(int column);
   void showTooltip(const QHelpEvent& event);
   bool leavesTable(const QKeyEvent& event) const;
 
   RecordTableModel _model;
   Chosen _chosen;
+  std::set<int> _columnsOfUser;  // those to which the user has given a width
+  bool _isWidening = false;
   TouchScrolling _touch;
 };
 

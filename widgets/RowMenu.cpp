@@ -17,9 +17,14 @@ RowMenu::RowMenu(WindowWidget& window) : QObject(&window), _window(window), _las
 }
 
 QPoint placeOfFocus(const WindowWidget& window) {
-  const auto* const table = dynamic_cast<const TableWidget*>(window.focusWidget());
-  const RowWidget* const row = table ? table->currentRow() : nullptr;
-  return row ? row->mapToGlobal(row->rect().center()) : window.mapToGlobal(window.rect().center());
+  if (const auto* const table = dynamic_cast<const TableWidget*>(window.focusWidget())) {
+    if (const RowWidget* const row = table->currentRow()) return row->mapToGlobal(row->rect().center());
+  }
+  if (const auto* const table = dynamic_cast<const RecordTableWidget*>(window.focusWidget())) {
+    const QRect cell = table->visualRect(table->currentIndex());
+    if (!cell.isEmpty()) return table->viewport()->mapToGlobal(cell.center());
+  }
+  return window.mapToGlobal(window.rect().center());
 }
 
 void RowMenu::open() { openAt(placeOfFocus(_window), Items::ForMouse); }

@@ -2,9 +2,12 @@
 #include <gtest/gtest.h>
 
 #include <QAbstractItemModelTester>
+#include <QContextMenuEvent>
 #include <QHeaderView>
+#include <QHelpEvent>
 #include <QPointingDevice>
 #include <QScrollBar>
+#include <QToolTip>
 
 #include "tests/support/TestWidgets.h"
 #include "widgets/RecordTableWidget.h"
@@ -214,6 +217,41 @@ TEST_F(RecordTableWidgetTest, KeysThatLeaveTheTableAreForTheWidgetAround) {
   QKeyEvent held(QEvent::KeyPress, Qt::Key_Right, Qt::NoModifier, QString(), true);
   QApplication::sendEvent(&table, &held);
   EXPECT_TRUE(held.isAccepted()) << "a key that is held down stops at the edge";
+}
+
+TEST_F(RecordTableWidgetTest, AColumnFitsItsTextsUnlessTheUserHasGivenItAWidth) {
+  const QHeaderView& header = *table.horizontalHeader();
+  const int before = header.sectionSize(1);
+  RecordList list = cells({cell("0", "16", -84)});
+  list.records[0].cells[0].text = "a text that is longer";
+  table.showRecords(list);
+  EXPECT_GT(header.sectionSize(1), before);
+  table.setColumnWidth(1, 50);
+  table.showRecords(list);
+  EXPECT_EQ(header.sectionSize(1), 50);
+}
+
+TEST_F(RecordTableWidgetTest, ATextThatIsCutHasATooltip) {
+  const auto ask = [this] {
+    const QRect rect = table.visualRect(table.model()->index(0, 2));
+    QHelpEvent question(QEvent::ToolTip, rect.center(), table.viewport()->mapToGlobal(rect.center()));
+    QApplication::sendEvent(table.viewport(), &question);
+    return QToolTip::text();
+  };
+  EXPECT_EQ(ask(), "");
+  table.setColumnWidth(2, 30);
+  EXPECT_TRUE(ask().contains("-84 dBm"));
+  QToolTip::hideText();
+}
+
+TEST_F(RecordTableWidgetTest, TheRightButtonAndARestingFingerMakeTheCellCurrent) {
+  const QRect rect = table.visualRect(table.model()->index(2, 1));
+  QContextMenuEvent wish(QContextMenuEvent::Mouse, rect.center(), QPoint());
+  QApplication::sendEvent(table.viewport(), &wish);
+  EXPECT_FALSE(wish.isAccepted()) << "what is around the table opens the menu";
+  EXPECT_EQ(current(), "2");
+  EXPECT_EQ(table.currentColumn(), "PCI");
+  EXPECT_THAT(chosen, IsEmpty());
 }
 
 TEST_F(RecordTableWidgetTest, AWideTableIsScrolledSidewaysByTouch) {

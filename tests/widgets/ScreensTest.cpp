@@ -233,8 +233,57 @@ TEST_P(ScreensTest, ControlRStartsOverAtTheEmptyRoot) {
   EXPECT_FALSE(descriptions().empty());
 }
 
-INSTANTIATE_TEST_SUITE_P(, ScreensTest, testing::Values(std::pair(360, 640), std::pair(1920, 1080)),
-                         [](const auto& info) { return info.param.first == 360 ? "Phone" : "FullHD"; });
+TEST_P(ScreensTest, AnotherSectionOnTheLeftTakesThePlaceOfTheOneOnTheRight) {
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  PaneWidget* const beside = stack().paneBeside();
+  ASSERT_EQ(beside != nullptr, GetParam().first >= 900);
+  if (!beside) return;
+  RowWidget& other = *beside->tableWidget().visibleRows().at(1);
+  QTest::mouseClick(beside->tableWidget().viewport(), Qt::LeftButton, {}, other.geometry().center());
+  EXPECT_THAT(stack().controllers(), SizeIs(2));
+  EXPECT_EQ(pane().header().title(), "Connected Mode Intra-Frequency Measurement Results");
+  EXPECT_TRUE(other.emphasis().isOpen);
+  EXPECT_TRUE(pane().toolbar().isVisible());
+  EXPECT_FALSE(pane().toolbar().findChild<QLabel*>()->text().isEmpty()) << "the pane has got the status";
+  receive("ims");
+  EXPECT_TRUE(other.emphasis().isOpen);
+}
+
+TEST_P(ScreensTest, ASectionThatGoesIsLeftForTheOneBelow) {
+  receiveAll({"ims", "internet"});
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  press(Qt::Key_End);
+  press(Qt::Key_Return);
+  ASSERT_THAT(stack().controllers(), SizeIs(3));
+  receive("ims");
+  EXPECT_THAT(stack().controllers(), SizeIs(2));
+  EXPECT_EQ(pane().header().title(), "PDP Context Info");
+  EXPECT_THAT(descriptions(), testing::ElementsAre("0"));
+}
+
+TEST_P(ScreensTest, TheSaveScreenCoversBothPanes) {
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  press(Qt::Key_S, Qt::ControlModifier);
+  ASSERT_NE(stack().modalScreen(), nullptr);
+  EXPECT_EQ(stack().modalScreen()->size(), window().size());
+  EXPECT_TRUE(stack().modalScreen()->isAncestorOf(stack().childAt(200, 300)) ||
+              stack().childAt(200, 300) == stack().modalScreen());
+  window().resize(1000, 700);
+  QCoreApplication::processEvents();
+  EXPECT_EQ(stack().modalScreen()->size(), window().size());
+  EXPECT_TRUE(stack().modalScreen()->isAncestorOf(QApplication::focusWidget()));
+  press(Qt::Key_Escape);
+  queue.run();
+  EXPECT_EQ(stack().modalScreen(), nullptr);
+  EXPECT_NE(stack().paneBeside(), nullptr);
+}
+
+INSTANTIATE_TEST_SUITE_P(, ScreensTest,
+                         testing::Values(std::pair(360, 640), std::pair(1366, 768), std::pair(1920, 1080)),
+                         [](const auto& info) { return "Width" + std::to_string(info.param.first); });
 
 }  // namespace
 }  // namespace varnel
