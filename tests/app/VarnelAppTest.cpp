@@ -755,6 +755,47 @@ TEST_F(VarnelAppTest, StartingOverForgetsTheHistory) {
   EXPECT_TRUE(history.series().empty());
 }
 
+TEST_F(VarnelAppTest, WithoutALinkTheRowsOfAllPanesAreDimmedWithoutAReload) {
+  RowAnswers answers(host.resources, host.clock, history);
+  VarnelApp viewer{{.model = {ports, telephony, queue, host.services, writeXmlPropertyList, &link},
+                    .files = files,
+                    .preferences = preferences,
+                    .userInterface = userInterface,
+                    .answers = &answers}};
+  viewer.applicationDidFinishLaunching();
+  queue.run();
+  receive(1);
+  const auto dimming = [this] {
+    const auto shown = stack().controllers().front();
+    return static_cast<RecordingPane&>(shown->pane()).table().cellView(0).facts.dimming;
+  };
+  pane().table().select(0);
+  EXPECT_EQ(dimming(), CellDimming::None);
+  const unsigned reloads = pane().table().reloads;
+  loseTheLink();
+  EXPECT_EQ(dimming(), CellDimming::All);
+  EXPECT_EQ(pane().table().cellView(0).facts.dimming, CellDimming::All);
+  EXPECT_EQ(pane().table().reloads, reloads);
+}
+
+TEST_F(VarnelAppTest, AValueThatNoPacketRenewsIsDimmedAfterAMinute) {
+  RowAnswers answers(host.resources, host.clock, history);
+  VarnelApp viewer{{.model = {ports, telephony, queue, host.services, writeXmlPropertyList, &link},
+                    .files = files,
+                    .preferences = preferences,
+                    .userInterface = userInterface,
+                    .answers = &answers}};
+  viewer.applicationDidFinishLaunching();
+  queue.run();
+  receive(1);
+  openContext(0);
+  const auto dimming = [this] { return pane().table().cellView(0).facts.dimming; };
+  EXPECT_EQ(dimming(), CellDimming::None);
+  host.clock.set({1709294709 + 60, 0});
+  queue.advance(2s);
+  EXPECT_EQ(dimming(), CellDimming::Value);
+}
+
 TEST_F(VarnelAppTest, WhatTheHistoryHadToForgetIsInTheNotice) {
   ValueHistory small({}, {.bytes = 1000});
   VarnelApp viewer{{.model = {ports, telephony, queue, host.services, writeXmlPropertyList, &link},

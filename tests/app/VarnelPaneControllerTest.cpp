@@ -6,6 +6,7 @@
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/FakeSaveControl.h"
 #include "tests/support/RecordingUserInterface.h"
+#include "tests/support/TestServices.h"
 
 namespace varnel {
 namespace {
@@ -50,6 +51,25 @@ class VarnelPaneControllerTest : public testing::Test {
   std::shared_ptr<VarnelPaneController> controller;
   std::unique_ptr<NavigationStack> stack;
 };
+
+TEST_F(VarnelPaneControllerTest, ARowIsExplainedByItsNamesBelowTheRoot) {
+  TestServices host;
+  host.resources.add(
+      "Explanations",
+      dictionaryOf({{"Rows", dictionaryOf({{"Serving Cell/Band", "Its band."}, {"Band", "A band."}})}}));
+  const ValueHistory history;
+  const RowAnswers answers(host.resources, host.clock, history);
+  RowFacts facts({host.clock, nullptr, &answers});
+  const auto root = tree(display());
+  facts.follow(root, RowFacts::Display::Renewed);
+  controller = std::make_shared<VarnelPaneController>(userInterface, saveControl, root, "/", &facts);
+  stack = userInterface.makeNavigationStack(controller);
+  userInterface.stack->appear();
+  table().select(0);
+  auto& section = static_cast<RecordingPane&>(pushed().pane()).table();
+  EXPECT_EQ(pushed().tableView_explanationOfRow(section, {0, 1}), "Its band.");
+  EXPECT_EQ(pushed().tableView_explanationOfRow(section, {0, 0}), "");
+}
 
 TEST_F(VarnelPaneControllerTest, WithoutANodeItIsAnEmptyTableTitledVarnel) {
   show(nullptr);

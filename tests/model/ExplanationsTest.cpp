@@ -115,6 +115,14 @@ TEST_F(ExplanationsTest, ANumberThatWasReadAlreadyHasTheSameLevel) {
   EXPECT_EQ(explanations.levelOf("Cells/RSRP", -90, ""), std::nullopt);
 }
 
+TEST_F(ExplanationsTest, TheLimitsOfARowAreThoseOfItsLevel) {
+  const Explanations explanations(resources);
+  ASSERT_TRUE(explanations.limitsOf("/Cells/0/RSRP"));
+  EXPECT_EQ(explanations.limitsOf("/Cells/0/RSRP")->good, explanations.of("RSRP")->limits->good);
+  EXPECT_FALSE(explanations.limitsOf("Beams/RSRP")) << "a text alone";
+  EXPECT_FALSE(explanations.limitsOf("nothing"));
+}
+
 TEST_F(ExplanationsTest, WhatIsNoReadingHasNoLevel) {
   EXPECT_EQ(levelOf("Cells/RSRP", "0.01 dBm"), "(none)") << "above the highest reading";
   EXPECT_EQ(levelOf("Cells/RSRP", "-90"), "(none)") << "without its unit";
