@@ -176,6 +176,7 @@ void NavigationWidget::setNotice(std::string_view text) {
   _notice = text;
   for (const auto& controller : _controllers) paneOf(*controller).notice().setText(_notice);
   if (ModalScreenWidget* screen = modalScreen()) screen->notice().setText(_notice);
+  if (_noticeObserver) _noticeObserver();
 }
 
 void NavigationWidget::present(std::shared_ptr<ModalController> controller, Animation animation) {

@@ -36,6 +36,9 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   void popTo(const PaneController& controller, Animation animation) override;
   void showToolbar() override;
   void setNotice(std::string_view text) override;
+  const std::string& noticeText() const { return _notice; }
+  /// The observer is called when the notice has changed.
+  void setNoticeObserver(std::function<void()> observer) { _noticeObserver = std::move(observer); }
   void present(std::shared_ptr<ModalController> controller, Animation animation) override;
   void dismiss(Animation animation) override;
 
@@ -95,6 +98,7 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   bool _showsToolbar = false;
   bool _isChoosing = false;  // the places of the panes stay as they are until the choice is made
   std::string _notice;
+  std::function<void()> _noticeObserver;
   QPointer<SlideOverlay> _overlay;
 };
 

@@ -17,6 +17,7 @@ PageWidget::PageWidget(const Titles& titles, std::unique_ptr<QWidget> content, s
   _column.setContentsMargins(0, 0, 0, 0);
   _column.setSpacing(0);
   _column.addWidget(&_header);
+  _column.addWidget(&_notice);
   _column.addWidget(_content, 1);
   _header.setTitle(titles.page);
   _header.showBackButton(titles.below);

@@ -6,6 +6,7 @@
 #include <memory>
 
 #include "widgets/HeaderWidget.h"
+#include "widgets/NoticeWidget.h"
 
 namespace varnel {
 
@@ -22,6 +23,8 @@ class PageWidget final : public QWidget {
   PageWidget(const Titles& titles, std::unique_ptr<QWidget> content, std::function<void()> close,
              QWidget& window);
 
+  /// The notice above the content.
+  NoticeWidget& notice() { return _notice; }
   QWidget& content() const { return *_content; }
   void takeKeyboard();
 
@@ -33,6 +36,7 @@ class PageWidget final : public QWidget {
  private:
   QVBoxLayout _column;
   HeaderWidget _header;
+  NoticeWidget _notice;
   QWidget* _content;  // a child
   std::function<void()> _close;
 };

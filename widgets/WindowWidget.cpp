@@ -35,6 +35,9 @@ void WindowWidget::setRoot(NavigationStack& stack) {
   dropRoot();
   _root = &static_cast<NavigationWidget&>(stack);
   _root->setParent(this);
+  _root->setNoticeObserver([this] {
+    if (_page) _page->notice().setText(_root->noticeText());
+  });
   arrange();
   if (isVisible()) makeKeyAndVisible();
 }
@@ -70,6 +73,7 @@ void WindowWidget::showPage(const QString& title, std::unique_ptr<QWidget> conte
   const QString below = _root ? _root->topPane().header().title() : windowTitle();
   _page = new PageWidget(
       {title, below}, std::move(content), [this] { closePage(); }, *this);
+  if (_root) _page->notice().setText(_root->noticeText());
   arrange();
   _page->show();
   if (_root) _root->hide();

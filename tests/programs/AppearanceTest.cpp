@@ -14,33 +14,19 @@
 #include <memory>
 #include <optional>
 
-#include "app/RowAnswers.h"
-#include "app/VarnelApp.h"
-#include "base/PropertyList.h"
-#include "host/FileResources.h"
 #include "programs/varnel-telephonyd/simulation/Technologies.h"
-#include "programs/varnel/RowCommands.h"
 #include "tests/support/DictionaryOf.h"
-#include "tests/support/FakeDeviceFiles.h"
-#include "tests/support/FakeQueue.h"
-#include "tests/support/FakeTelephony.h"
-#include "tests/support/MemoryPorts.h"
 #include "tests/support/PacketBuilder.h"
 #include "tests/support/RecordingLog.h"
-#include "tests/support/RecordingPreferences.h"
-#include "tests/support/TestServices.h"
 #include "tests/support/TestWidgets.h"
+#include "tests/support/ViewerInMemory.h"
 #include "widgets/Colors.h"
 #include "widgets/QtValues.h"
-#include "widgets/WidgetUserInterface.h"
 
 namespace varnel {
 namespace {
 
 using namespace std::chrono_literals;
-
-constexpr std::string_view channel = "com.orvane.BasebandStateReport.LogChannel";
-constexpr const char* marker = "/OrvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 
 // The whole viewer in a window of 360 × 640 points on an invisible screen, with the messages of a simulated
 // LTE modem. Its pictures are measured, not compared: fonts differ between machines.
@@ -61,25 +47,21 @@ class Appearance : public testing::Test {
     ::unsetenv("QT_SCALE_FACTOR");
     QApplication::setFont(QFont(QStringLiteral("DejaVu Sans")));
     if (palette) QApplication::setPalette(*palette);
-    _viewer.emplace();
+    _viewer.emplace("kalvi-lte");
     _viewer->app.applicationDidFinishLaunching();
     window().setGeometry(0, 0, 360, 640);
     ASSERT_TRUE(QTest::qWaitForWindowActive(&window(), patience_ms));
     _viewer->queue.run();
     const auto modem = simulatedModem("kalvi-lte", 7);
     for (SimulatedMessage next = modem->next(); next.at <= 20s; next = modem->next())
-      _viewer->ports.deliver(channel, 0, next.bytes);
+      _viewer->deliver(next.bytes);
     refresh();
   }
   void receive(const Value& contexts) {
-    _viewer->ports.deliver(channel, 0, serverMessage(0xFF0002, contexts));
+    _viewer->deliver(serverMessage(0xFF0002, contexts));
     refresh();
   }
-  void refresh() {
-    _viewer->host.clock.set({_viewer->host.clock.now().seconds + 2, 0});
-    _viewer->queue.advance(2s);
-    QCoreApplication::processEvents();
-  }
+  void refresh() { _viewer->refresh(); }
   void goTo(const NamePath& path) {
     _viewer->app.goTo(path);
     settle();
@@ -113,41 +95,12 @@ class Appearance : public testing::Test {
   }
 
  private:
-  struct Viewer {
-    Viewer() {
-      host.clock.set({1709294709, 0});
-      files.existing.insert(marker);
-      ports.answer = [](const MemoryPorts::Request&) {
-        return RemotePort::SendResult{0,
-                                      writeXmlPropertyList(dictionaryOf({{"GetTechnology", "kalvi-lte"}}))};
-      };
-      userInterface.setWindowObserver([this](WindowWidget& window) { commands.addTo(window); });
-    }
-    RecordingLog log;
-    TestServices host;
-    FileResources resources{resourceFolder()};
-    const Services services{resources, host.clock, host.application, host.standardOutput};
-    FakeQueue queue;
-    MemoryPorts ports;
-    FakeTelephony telephony;
-    FakeDeviceFiles files;
-    RecordingPreferences preferences;
-    WidgetUserInterface userInterface{{}};
-    ValueHistory history;
-    const RowAnswers answers{resources, host.clock, history};
-    VarnelApp app{{.model = {ports, telephony, queue, services, writeXmlPropertyList},
-                   .files = files,
-                   .preferences = preferences,
-                   .userInterface = userInterface,
-                   .history = &history}};
-    RowCommands commands{app, answers};
-  };
-
   int _argumentCount = 1;
   char _name[7] = "varnel";
   char* _arguments[2] = {_name, nullptr};
+  const RecordingLog _log;
   std::unique_ptr<QApplication> _application;
-  std::optional<Viewer> _viewer;
+  std::optional<ViewerInMemory> _viewer;
 };
 
 // ---- What pictures show ----

@@ -155,5 +155,21 @@ TEST_F(PageWidgetTest, ThePathOfTheFocusEndsWithTheCurrentRow) {
   EXPECT_THAT(widget().pathOfFocus(), ElementsAre("LTE", "Bearers"));
 }
 
+TEST_F(PageWidgetTest, TheNoticeStandsAboveThePageToo) {
+  stack->setNotice("The replay has ended");
+  showField();
+  auto* const page = dynamic_cast<PageWidget*>(widget().page()->parentWidget());
+  ASSERT_TRUE(page);
+  const NoticeWidget* const notice = &page->notice();
+  EXPECT_TRUE(notice->isVisible());
+  QTest::qWait(0);  // the page is arranged
+  EXPECT_EQ(notice->text(), "The replay has ended");
+  EXPECT_LT(notice->geometry().bottom(), widget().page()->geometry().top());
+  stack->setNotice("");
+  EXPECT_FALSE(notice->isVisible());
+  stack->setNotice("The link is gone");
+  EXPECT_EQ(notice->text(), "The link is gone");
+}
+
 }  // namespace
 }  // namespace varnel
