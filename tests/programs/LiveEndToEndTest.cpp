@@ -1,6 +1,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <cstdio>
+#include <cstdlib>
+#include <filesystem>
+#include <iterator>
 #include <memory>
 #include <string>
 #include <vector>
@@ -213,6 +217,50 @@ TEST_F(LiveEndToEnd, TheRealServiceAndItsModemComeAndGo) {
   ASSERT_TRUE(_server->waitForEnd());
   EXPECT_EQ(_server->exitStatus(), 0);
   EXPECT_TRUE(eventually([&] { return service.run("/usr/bin/mmcli", {"-m", "any", "--signal-get"}); }));
+}
+
+std::size_t openFilesOf(const Process& process) {
+  const std::filesystem::directory_iterator files("/proc/" + std::to_string(process.id()) + "/fd");
+  return static_cast<std::size_t>(std::distance(begin(files), end(files)));
+}
+
+// Resident memory in kB.
+std::size_t memoryOf(const Process& process) {
+  const std::string status = contentsOf("/proc/" + std::to_string(process.id()) + "/status");
+  return std::stoul(status.substr(status.find("VmRSS:") + 6));
+}
+
+// ./dev soak live makes more rounds.
+TEST_F(LiveEndToEnd, TheRealServiceAndItsModemAreAlwaysBack) {
+  const char* const wish = std::getenv("VARNEL_SOAK_ROUNDS");
+  const int rounds = wish ? std::stoi(wish) : 50;
+  RealModemManager service(_bus.address());
+  service.start();
+  startServer({"--live", "--poll", "1"});
+  startViewer();
+  std::size_t files = 0, memory = 0;
+  for (int round = 1; round <= rounds; ++round) {
+    service.plugIn();
+    service.enable();
+    ASSERT_TRUE(shows("    RSRP                -91.00 dBm\n")) << "round " << round;
+    if (round == rounds / 5 + 1) files = openFilesOf(*_server), memory = memoryOf(*_server);
+    if (round % 2 == 0) {
+      service.stop();
+      ASSERT_TRUE(shows("    RSRP\n")) << "round " << round;
+      service.start();
+    } else {
+      service.unplug();
+      ASSERT_TRUE(shows("    RSRP\n")) << "round " << round;
+    }
+  }
+  service.plugIn();
+  service.enable();
+  EXPECT_TRUE(shows("    RSRP                -91.00 dBm\n"));
+  EXPECT_LE(openFilesOf(*_server), files + 2);
+  constexpr std::size_t noise = 1024;
+  EXPECT_LE(memoryOf(*_server), memory + noise);
+  std::printf("%d rounds: %zu open files, memory %zu kB, then %zu kB\n", rounds, openFilesOf(*_server),
+              memory, memoryOf(*_server));
 }
 
 }  // namespace

@@ -50,6 +50,8 @@ class RealModemManager {
                   "profile", "generic", "['" + port() + "']"});
     })) << contentsOf(_folder.file("log"));
   }
+  /// Pulls the modem out.
+  void unplug() { _modem.reset(); }
   /// Switches the modem on, as soon as the service knows it.
   void enable() const {
     EXPECT_TRUE(eventually([this] {

@@ -20,6 +20,8 @@ namespace busReading {
 
 namespace {
 
+// What begins to read a container must also end it, else the toolkit keeps the message.
+
 using Radio = CellReading::Radio;
 
 QVariant valueOf(const QVariantMap& entries, const char* key) {
@@ -277,6 +279,7 @@ Location locationIn(const QVariant& value) {
       location.network = networkLocationOf(printableText(inner.toString()));
     if (source == rawPositionSource) location.position = positionOf(dictionaryOf(inner));
   }
+  sources.endMap();
   return location;
 }
 
@@ -334,6 +337,7 @@ std::vector<std::string> paths(const QVariantMap& entries, const char* key) {
     if (std::string one = objectPath(QVariant::fromValue(each)); !one.empty())
       found.push_back(std::move(one));
   }
+  list.endArray();
   return found;
 }
 
@@ -366,6 +370,7 @@ std::optional<Objects> objectsOf(const QDBusMessage& answer) {
     list.endMapEntry();
     objects.insert(object.path(), interfaces);
   }
+  list.endMap();
   return objects;
 }
 
@@ -398,6 +403,7 @@ std::optional<std::vector<CellReading>> cellsOf(const QDBusMessage& answer) {
     list >> entries;
     if (auto cell = cellOf(entries)) cells.push_back(*std::move(cell));
   }
+  list.endArray();
   return cells;
 }
 

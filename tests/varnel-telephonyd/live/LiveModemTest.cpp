@@ -368,40 +368,45 @@ TEST_F(LiveModemTest, WithoutABusItWaitsForOne) {
   EXPECT_TRUE(isSo("the system bus cannot be reached, so ModemManager cannot be asked"));
 }
 
+// LiveEndToEndTest makes more, with the real service.
+constexpr int rounds = 20;
+
 std::size_t openFiles() {
   const std::filesystem::directory_iterator files("/proc/self/fd");
   return static_cast<std::size_t>(std::distance(begin(files), end(files)));
 }
 
-TEST_F(LiveModemTest, AModemThatComesAndGoesFiftyTimesIsAlwaysBack) {
+TEST_F(LiveModemTest, AModemThatComesAndGoesIsAlwaysBack) {
   startAll({"add", "0", "then", "cells", "0", "lte"});
   ASSERT_TRUE(shows(modemReport, "EARFCN: 66986"));
   std::size_t files = 0, memory = 0;
-  for (int round = 0; round < 50; ++round) {
+  for (int round = 0; round < rounds; ++round) {
     _service.does({"remove", "0"});
     ASSERT_TRUE(isSo("Maker M1 has gone; plug it in again")) << round;
+    ASSERT_TRUE(runUntil([&] { return _viewer->last(modemReport) == "{Version: 1}"; })) << round;
     _service.does({"add", "0", "then", "cells", "0", "lte"});
     ASSERT_TRUE(shows(modemReport, "EARFCN: 66986")) << round;
-    if (round == 10) files = openFiles(), memory = usedMemory();
+    if (round == rounds / 4) files = openFiles(), memory = usedMemory();
   }
   EXPECT_LE(openFiles(), files);
-  EXPECT_LE(usedMemory(), memory + 200'000);
+  EXPECT_LE(usedMemory(), memory + 20'000);
 }
 
-TEST_F(LiveModemTest, AServiceThatIsStoppedAndStartedFiftyTimesIsAlwaysBack) {
+TEST_F(LiveModemTest, AServiceThatIsStoppedAndStartedIsAlwaysBack) {
   startAll({"add", "0", "then", "cells", "0", "lte"});
   std::size_t files = 0, memory = 0;
-  for (int round = 0; round < 50; ++round) {
+  for (int round = 0; round < rounds; ++round) {
     ASSERT_TRUE(shows(modemReport, "EARFCN: 66986")) << round;
-    if (round == 10) files = openFiles(), memory = usedMemory();
+    if (round == rounds / 4) files = openFiles(), memory = usedMemory();
     _service.stop();
     ASSERT_TRUE(isSo("ModemManager does not run; type sudo systemctl start ModemManager")) << round;
+    ASSERT_TRUE(runUntil([&] { return _viewer->last(modemReport) == "{Version: 1}"; })) << round;
     _service.start();
     _service.does({"add", "0", "then", "cells", "0", "lte"});
   }
   EXPECT_TRUE(shows(modemReport, "EARFCN: 66986"));
   EXPECT_LE(openFiles(), files);
-  EXPECT_LE(usedMemory(), memory + 200'000);
+  EXPECT_LE(usedMemory(), memory + 20'000);
 }
 
 }  // namespace
