@@ -3,6 +3,7 @@
 #include <QAccessible>
 #include <QHelpEvent>
 #include <QPainter>
+#include <QResizeEvent>
 #include <QTextLayout>
 #include <QToolTip>
 #include <cmath>
@@ -84,6 +85,12 @@ bool NoticeWidget::event(QEvent* event) {
   else
     QToolTip::hideText();
   return true;
+}
+
+// The height follows the width, which a hidden notice does not have yet.
+void NoticeWidget::resizeEvent(QResizeEvent* event) {
+  QWidget::resizeEvent(event);
+  if (event->size().width() != event->oldSize().width()) updateGeometry();
 }
 
 void NoticeWidget::paintEvent(QPaintEvent*) {

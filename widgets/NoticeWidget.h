@@ -27,6 +27,7 @@ class NoticeWidget final : public QWidget {
   /// Where the pane is too low for all lines, a tooltip has them.
   bool event(QEvent* event) override;
   void paintEvent(QPaintEvent* event) override;
+  void resizeEvent(QResizeEvent* event) override;
 
  private:
   QString _text;

@@ -24,7 +24,7 @@ using Button = PlayBarState::Button;
 constexpr int barHeight = 52;
 constexpr int spacing = 4;
 constexpr int widthForDates = 480;
-constexpr double timeSize = 13, progressSize = 12;
+constexpr double timeSize = 13, progressSize = 12, menuSize = 15;
 constexpr int keyPause_ms = 300;
 constexpr double speeds[] = {0.5, 1, 2, 5, 10, 60, 600};
 
@@ -195,6 +195,7 @@ void PlayBar::sliderWasMoved() {
 void PlayBar::chooseSpeed() {
   auto* const menu = new QMenu(this);
   menu->setAttribute(Qt::WA_DeleteOnClose);
+  menu->setFont(qtFont(Font::system(menuSize)));
   auto* const group = new QActionGroup(menu);
   for (const double speed : speeds) {
     QAction* const choice = menu->addAction(speedText(speed));

@@ -15,7 +15,7 @@ namespace {
 
 constexpr int widestColumn = 420;
 constexpr int margin = 12;
-constexpr double titleSize = 17, explanationSize = 14;
+constexpr double titleSize = 17, explanationSize = 14, menuSize = 15;
 constexpr int offerHeight = 64;
 
 // Something to choose, with a line that explains it. Its text is the title.
@@ -67,6 +67,7 @@ QMenu* menuBelow(QAbstractButton& button, const std::vector<StartPage::Choice>& 
                  const std::function<void(const QString& id)>& choose) {
   auto* const menu = new QMenu(&button);
   menu->setAttribute(Qt::WA_DeleteOnClose);
+  menu->setFont(qtFont(Font::system(menuSize)));
   for (const auto& [id, name] : choices) {
     QString text = name;
     text.replace(u'&', QStringLiteral("&&"));
@@ -92,8 +93,7 @@ StartPage::StartPage(QWidget& table) : QWidget(&table) {
   connect(&modem, &QAbstractButton::clicked, this, [this, &modem] {
     menuBelow(modem, _modems, [this](const QString& id) { Q_EMIT modemWanted(id); });
   });
-  QAbstractButton& file =
-      addOffer(tr("Open a file…"), tr("A capture or a snapshot, which can also be dropped here"));
+  QAbstractButton& file = addOffer(tr("Open a file…"), tr("Or drop a capture or a snapshot here"));
   connect(&file, &QAbstractButton::clicked, this, &StartPage::fileWanted);
   QAbstractButton& port = addOffer(tr("Connect to a port"), tr("Show what a modem sends now"));
   connect(&port, &QAbstractButton::clicked, this, [this, &port] {

@@ -92,6 +92,27 @@ TEST_F(NearestServerTest, IsInTheNamedFolderAloneIfThereIsOne) {
   EXPECT_FALSE(nearest.connect({}));
 }
 
+TEST_F(NearestServerTest, IsInTheOtherFolderAfterAMove) {
+  makeSystemsFolder();
+  const fs::path other = _folder.path() / "other";
+  fs::create_directory(other);
+  const auto system = serverIn(_system), own = serverIn(_own), moved = serverIn(other);
+  EXPECT_EQ(found(), "own");
+  _nearest.moveTo(other, std::nullopt);
+  EXPECT_EQ(found(), "other");
+  EXPECT_EQ(_monitor.linkReport().place, other.string());
+  _nearest.moveTo(_own, _system);
+  EXPECT_EQ(found(), "own");
+}
+
+TEST_F(NearestServerTest, TheEndOfAServerOfOnesOwnIsToldInPlaceOfTheTrouble) {
+  EXPECT_EQ(found(), "");
+  _monitor.setEndOfOwnServer("The server that plays walk.pcap has ended");
+  EXPECT_EQ(_monitor.linkReport().trouble, "The server that plays walk.pcap has ended");
+  _monitor.setEndOfOwnServer({});
+  EXPECT_THAT(_monitor.linkReport().trouble, HasSubstr("No telephony server serves in "));
+}
+
 // If the test is root, the viewer is another user's. Otherwise it may use the folder, and finds the server.
 TEST_F(NearestServerTest, WhoIsNoMemberLearnsWhichGroupTheSystemsServerServes) {
   makeSystemsFolder();

@@ -84,6 +84,27 @@ TEST_F(OpenFileEndToEnd, TheTechnologyOfTheUserComesFirst) {
   EXPECT_THAT(varnel->output(), HasSubstr("\nServing Cell Info\n"));
 }
 
+TEST_F(OpenFileEndToEnd, AsTextASnapshotIsAllOfItsDisplays) {
+  const std::string path = _files.file("saved.varnel");
+  std::ofstream(path) << R"(<?xml version="1.0" encoding="UTF-8"?>
+<plist version="1.0"><dict><key>Timestamp</key><string>2023-11-14 22:13:30 +0000</string><key>Data</key><array>
+<dict><key>Display</key><dict><key>RSRP</key><string>-90 dBm</string></dict>
+<key>Date</key><string>2023-11-14 22:13:20 +0000</string></dict>
+<dict><key>Display</key><dict><key>RSRP</key><string>-91 dBm</string></dict>
+<key>Date</key><string>2023-11-14 22:13:22 +0000</string></dict>
+</array></dict></plist>)";
+  ::setenv("TZ", "UTC", 1);
+  const auto varnel = viewer({path});
+  ASSERT_TRUE(varnel->waitForEnd());
+  EXPECT_EQ(varnel->exitStatus(), 0) << varnel->error();
+  EXPECT_EQ(varnel->output(),
+            "Display of 2023-11-14 at 22:13:20\nRSRP  -90 dBm\n"
+            "Display of 2023-11-14 at 22:13:22\nRSRP  -91 dBm\n");
+  const auto first = viewer({path, "--updates", "1"});
+  ASSERT_TRUE(first->waitForEnd());
+  EXPECT_EQ(first->output(), "Display of 2023-11-14 at 22:13:20\nRSRP  -90 dBm\n");
+}
+
 TEST_F(OpenFileEndToEnd, AFileMayBeNamedLikeAnOption) {
   fs::copy(captureOf("kalvi-lte"), _files.path() / "--ui");
   fs::current_path(_files.path());

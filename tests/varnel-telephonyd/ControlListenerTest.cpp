@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "host/ControlClient.h"
 #include "host/ServerControl.h"
 #include "tests/support/EventLoop.h"
 #include "tests/support/Process.h"
@@ -194,6 +195,47 @@ TEST_F(ControlListenerTest, AServerThatDoesNotAnswerIsOneSentence) {
   EXPECT_EQ(
       failureOf([&] { ServerControl(_folder.path(), 10ms).status(); }),
       "the telephony server in " + _folder.path().string() + " does not answer; end it and start it again");
+}
+
+// In the event loop of the listener, which a client that waits would stop.
+TEST_F(ControlListenerTest, RepliesComeInTheOrderOfTheRequestsWithoutWaiting) {
+  const auto open = listener();
+  ControlClient client{RuntimeFolder(_folder.path())};
+  std::string replies;
+  const auto note = [&](const std::optional<ControlReply>& reply) {
+    if (!reply) {
+      replies += "none ";
+    } else if (const auto* status = std::get_if<ServerStatus>(&*reply)) {
+      replies += std::to_string(status->channels) + ' ';
+    } else {
+      replies += std::get<ControlRefusal>(*reply).sentence + ' ';
+    }
+  };
+  client.ask({}, note);
+  client.ask({.command = ControlRequest::Command::Pause}, note);
+  client.ask({}, note);
+  EXPECT_EQ(replies, "");
+  EXPECT_TRUE(client.isWaiting());
+  EXPECT_TRUE(runUntil([&] { return !client.isWaiting(); }));
+  EXPECT_EQ(replies, "1 not now 3 ");
+}
+
+TEST_F(ControlListenerTest, ARequestToAServerThatIsNotThereOrHasGoneGetsNoReply) {
+  ControlClient client{RuntimeFolder(_folder.path())};
+  int withReply = 0, without = 0;
+  const auto note = [&](const std::optional<ControlReply>& reply) { ++(reply ? withReply : without); };
+  client.ask({}, note);
+  EXPECT_EQ(without, 0) << "not from within";
+  EXPECT_TRUE(runUntil([&] { return without == 1; }));
+  auto open = listener();
+  client.ask({}, note);
+  EXPECT_TRUE(runUntil([&] { return withReply == 1; }));
+  client.ask({}, note);
+  open.reset();
+  EXPECT_TRUE(runUntil([&] { return without == 2; }));
+  open = listener();
+  client.ask({}, note);
+  EXPECT_TRUE(runUntil([&] { return withReply == 2; }));
 }
 
 }  // namespace

@@ -57,6 +57,15 @@ TEST_F(NoticeWidgetTest, StandsBetweenTitleAndTableAndLeavesTheRestWhereItIs) {
   EXPECT_EQ(pane.tableWidget().y(), notice.bottom() + 1);
 }
 
+TEST_F(NoticeWidgetTest, ALongFirstNoticeHasAllItsLines) {
+  tell(
+      "No telephony server serves in /run/user/1000/varnel; start varnel-telephonyd, or name its folder with "
+      "--runtime-dir");
+  const NoticeWidget& notice = noticeOf(*root);
+  EXPECT_EQ(notice.height(), notice.heightForWidth(360));
+  EXPECT_EQ(notice.y(), root->widget().header().height());
+}
+
 TEST_F(NoticeWidgetTest, IsAsHighAsItsTextEvenWithoutBlanks) {
   tell("Saved: /a");
   const int oneLine = noticeOf(*root).height();
