@@ -26,14 +26,14 @@ constexpr double openMarkWidth = 4;
 constexpr double changeMarkRadius = 2;
 constexpr double changeMarkMiddle = 5;  // between the edge and the text
 constexpr double gap = 8;               // between two things on a row
-constexpr double gapBesideSparkline = 12;
+constexpr double gapBesideSparkline = 8;
 constexpr double sparklineHeight = 26;
 constexpr double narrowestSparkline = 60;
 constexpr double widestSparkline = 96;
 constexpr double narrowestSummary = 60;
 constexpr double summaryTextSize = 13;
 // So marks and sparklines end at the same place in most rows, whatever their values are.
-constexpr double usualRoomOfValue = 116;
+constexpr double usualRoomOfValue = 106;
 
 // Characters around a text of another direction, so that it leaves the order of the texts beside it alone.
 constexpr QChar beginningOfIsolate(0x2068), endOfIsolate(0x2069);

@@ -106,7 +106,7 @@ TEST_F(RowWidgetTest, ItsNameIsTheFirstOfItsTextsAlsoWhenThatIsEmpty) {
 
 constexpr QRect changeMark(2, 20, 7, 10);
 // Where a value of usual length begins, less the gap before it, in a row of 360.
-constexpr int endOfLevelMark = 360 - 116;
+constexpr int endOfLevelMark = 360 - 106;
 // That of a record, before the room of the disclosure indicator.
 constexpr int endOfRecordsLevelMark = 330;
 
@@ -144,7 +144,7 @@ TEST_F(RowWidgetTest, TheSparklineIsBetweenNameAndLevel) {
   RowWidget& row = show("RSRP", "-97.25 dBm");
   EXPECT_TRUE(row.sparklineArea().isEmpty());
   tell({.level = CellLevel::Good, .course = {-97, -96}});
-  EXPECT_EQ(row.sparklineArea(), QRectF(endOfLevelMark - 17 - 12 - 96, 12, 96, 26));
+  EXPECT_EQ(row.sparklineArea(), QRectF(endOfLevelMark - 17 - 8 - 96, 12, 96, 26));
   EXPECT_GT(contrastIn(row, row.sparklineArea().toRect()), 3);
 }
 
