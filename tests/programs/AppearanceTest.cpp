@@ -314,6 +314,9 @@ QImage nameAlone(const QString& name) {
   return picture;
 }
 
+// A row begins with the mark of a change; names begin after it.
+constexpr int endOfChangeMark = 8;
+
 TEST_F(Appearance, NamesFromRightToLeftStandWhereOthersStandAndReadFromTheRight) {
   launch();
   receive(Value::ofArray({dictionaryOf({{"APN", "internet"},
@@ -326,7 +329,7 @@ TEST_F(Appearance, NamesFromRightToLeftStandWhereOthersStandAndReadFromTheRight)
   ASSERT_GE(rows().size(), 5u);
   const QImage picture = pictureOf(window());
   const auto columnsOf = [&](std::size_t row) {
-    const QRect place = placeIn(window(), *rows().at(row)).adjusted(4, 8, -4, -8);
+    const QRect place = placeIn(window(), *rows().at(row)).adjusted(endOfChangeMark, 8, -4, -8);
     return *paintedColumns(picture, place);
   };
   const auto latin = columnsOf(0);
@@ -341,7 +344,7 @@ TEST_F(Appearance, NamesFromRightToLeftStandWhereOthersStandAndReadFromTheRight)
 
   // The first letter is the rightmost one: in the other order the ink would stand elsewhere.
   const QRect name = placeIn(window(), *rows().at(1));
-  const auto painted = inkOf(picture.copy(name.left(), name.top() + 8, 120, 34));
+  const auto painted = inkOf(picture.copy(name.left() + endOfChangeMark, name.top() + 8, 120, 34));
   QString reversed = QString::fromStdString(network);
   std::reverse(reversed.begin(), reversed.end());
   EXPECT_LT(distance(painted, inkOf(nameAlone(QString::fromStdString(network)))),
