@@ -44,7 +44,8 @@ class MessageCounts final : public MessageSection {
   };
   struct Count {
     BoundEntry entry;
-    bool isWritten = false;  // since the last display
+    std::size_t position = 0;  // where the entry was last
+    bool isWritten = false;    // since the last display
   };
 
   void take(const AirMessageReading& reading) override;

@@ -20,6 +20,7 @@ MessageFate MessageSection::fateOf(const Packet& packet, std::uint32_t logCode) 
 void MessageSection::updateWithData_logCode(const Packet& packet, std::uint32_t logCode) {
   const AirMessageReading& reading = _feed.read(_taker, packet, logCode);
   using enum MessageFate::Outcome;
+  _hasDecodedLast = reading.fate.outcome == Decoded;
   if (reading.fate.outcome == Decoded || reading.fate.outcome == UnknownVersion) take(reading);
 }
 

@@ -17,6 +17,9 @@ class MessageSection : public Base {
   std::string_view getSectionName() const final { return _sectionName; }
   void updateWithData_logCode(const Packet& packet, std::uint32_t logCode) final;
   MessageFate fateOf(const Packet& packet, std::uint32_t logCode) const final;
+  /// Whether the last packet that the section got was decoded. It saves asking `fateOf`, which reads the
+  /// packet again.
+  bool hasDecodedLast() const { return _hasDecodedLast; }
   /// All codes of such messages.
   std::vector<std::uint32_t> getLogCodeArray() const override;
 
@@ -32,6 +35,7 @@ class MessageSection : public Base {
   std::optional<MessageFeed> _ownFeed;
   MessageFeed& _feed;
   const MessageFeed::Taker _taker;
+  bool _hasDecodedLast = false;
 };
 
 }  // namespace varnel

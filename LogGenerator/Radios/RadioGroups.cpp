@@ -105,7 +105,8 @@ void RadioGroups::addGroup(const std::string& key, const Value& sections) {
     for (const std::uint32_t code : index->logCodes()) {
       for (const Subscriber& subscriber : index->subscription(code)->subscribers) {
         if (std::ranges::find(group.decoders, subscriber.decoder) != group.decoders.end())
-          takersOf(code).deliveries.push_back({_groups.size(), subscriber});
+          takersOf(code).deliveries.push_back(
+              {_groups.size(), subscriber, dynamic_cast<const MessageSection*>(subscriber.decoder)});
       }
     }
   }
@@ -164,12 +165,13 @@ bool RadioGroups::take(const LogMessage& message, ByteView bytes) {
   if (found == _takers.end()) return false;
   bool isTaken = false;
   const Time now = _services.clock.now();
-  for (const auto& [index, subscriber] : found->second.deliveries) {
+  for (const auto& [index, subscriber, messages] : found->second.deliveries) {
     Group& group = _groups[index];
     if (!group.isBound) bindSections(group);
-    isTaken = isTaken || isDecoded(subscriber, message.packet(), logCode);
     subscriber.decoder->section().setTime(now);
     subscriber.deliver(message.packet(), logCode);
+    isTaken =
+        isTaken || (messages ? messages->hasDecodedLast() : isDecoded(subscriber, message.packet(), logCode));
     if (!group.isShown) noteWhetherShown(group);
   }
   if (found->second.isC2K) {
@@ -203,7 +205,7 @@ MessageFate RadioGroups::fateOf(const LogMessage& message, ByteView bytes) const
   if (found == _takers.end()) return {Unknown, logCode};
   if (found->second.isC2K) return _c2k.fateOf(bytes);
   MessageFate best{TooShort, logCode};
-  for (const auto& [index, subscriber] : found->second.deliveries) {
+  for (const auto& [index, subscriber, messages] : found->second.deliveries) {
     if (isDecoded(subscriber, message.packet(), logCode)) return {Decoded, logCode};
     if (subscriber.handler) continue;
     const MessageFate fate = subscriber.decoder->fateOf(message.packet(), logCode);
@@ -225,7 +227,7 @@ std::vector<CodeSections> RadioGroups::codeSections() const {
   std::vector<CodeSections> list;
   for (const std::uint32_t code : _codes) {
     CodeSections& entry = list.emplace_back(CodeSections{code, {}});
-    for (const auto& [index, subscriber] : _takers.at(code).deliveries) {
+    for (const auto& [index, subscriber, messages] : _takers.at(code).deliveries) {
       std::string name(subscriber.decoder->getSectionName());
       if (std::ranges::find(entry.sections, name) == entry.sections.end())
         entry.sections.push_back(std::move(name));

@@ -61,6 +61,7 @@ class RadioGroups final : public WriteTimes {
   struct Delivery {
     std::size_t group;
     Subscriber subscriber;
+    const MessageSection* messages;  // the decoder, if it is one of messages
   };
   // Who takes a log code.
   struct Takers {
