@@ -32,7 +32,7 @@ class Hour {
     std::vector<ValueHistory::Reading> readings;
     for (std::size_t row = 0; row < keys.size(); ++row) {
       const std::size_t nameStart = keys[row].rfind('/') + 1;
-      const std::string number = std::to_string(-80 - (_displays * (row + 3)) % 17) + ".5";
+      const std::string number = std::to_string(-80 - static_cast<int>((_displays * (row + 3)) % 17)) + ".5";
       readings.push_back({keys[row], nameStart, keys[row].size() - nameStart, row < 2 ? "dBm" : "dB",
                           *StoredSample::ofNumber(number)});
     }

@@ -145,18 +145,27 @@ void TrendChart::showUnits(const TrendData& data) {
   setMargins(QMargins(0, 4, hasAxisOnTheRight ? 0 : roomOfLastLabel, 0));
 }
 
-void TrendChart::showTimes(const TrendData& data) {
-  const double first = millisecondsOf(data.stretch.begin), last = millisecondsOf(data.stretch.end);
+void TrendChart::showTicks(const std::vector<TimeTick>& ticks) {
+  _ticks = ticks;
   for (const QString& label : _time->categoriesLabels()) _time->remove(label);
-  _time->setStartValue(first - 1);
+  if (!ticks.empty()) _time->setStartValue(ticks.front().milliseconds - 1);
   QStringList used;
-  for (const TimeTick& tick : data.ticks) {
+  for (const TimeTick& tick : ticks) {
     // The axis takes no label twice, but a clock that was set back shows a time twice.
     QString label = tick.label;
     while (used.contains(label)) label += QChar(0x200B);
     used.append(label);
     _time->append(label, tick.milliseconds);
   }
+}
+
+void TrendChart::showTimes(const TrendData& data) {
+  const double first = millisecondsOf(data.stretch.begin), last = millisecondsOf(data.stretch.end);
+  // Ticks stand still for a while, and the axis lays out all labels anew when one of them changes.
+  const bool areSame = std::ranges::equal(data.ticks, _ticks, [](const TimeTick& one, const TimeTick& other) {
+    return one.milliseconds == other.milliseconds && one.label == other.label;
+  });
+  if (!areSame) showTicks(data.ticks);
   _time->setRange(first, last);
   if (_time->titleText() != data.axisTitle) _time->setTitleText(data.axisTitle);
 }

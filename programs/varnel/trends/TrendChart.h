@@ -37,6 +37,7 @@ class TrendChart final : public QChart {
 
   void showUnits(const TrendData& data);
   void showTimes(const TrendData& data);
+  void showTicks(const std::vector<TimeTick>& ticks);
   UnitAxis& axisOf(const std::string& unit);
   void color(QAbstractAxis& axis, const QColor& ink) const;
   QColor inkOf(const TrendData& data, const std::string& unit) const;
@@ -44,6 +45,7 @@ class TrendChart final : public QChart {
   TrendLook _look;
   QCategoryAxis* _time;
   QLineSeries* _carrier;  // of the axis of time, when there is no row
+  std::vector<TimeTick> _ticks;  // that the axis of time has
   std::vector<UnitAxis> _units;
   TrendLines* _lines;
 };
