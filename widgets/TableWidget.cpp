@@ -1,6 +1,7 @@
 #include "widgets/TableWidget.h"
 
 #include <QAccessible>
+#include <QAction>
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QScrollBar>
@@ -39,7 +40,7 @@ TableWidget::TableWidget(QWidget* parent)
           },
           [this](const QPoint& position) {
             _keysAreUsed = false;
-            if (const auto row = rowAt(position)) chooseRow(*row);
+            if (const auto row = rowAt(position)) takeClick(*row, position);
           }) {
   setFrameShape(QFrame::NoFrame);
   setFocusPolicy(Qt::StrongFocus);
@@ -401,6 +402,21 @@ void TableWidget::chooseRow(std::size_t row) {
   choice();
 }
 
+void TableWidget::takeClick(std::size_t row, const QPoint& position) {
+  QAction* const course = courseActionAt(row, position);
+  if (!course) return chooseRow(row);
+  setFocus(Qt::MouseFocusReason);
+  makeCurrent(row);
+  course->trigger();
+}
+
+// Null when the position is not on the small line of the row.
+QAction* TableWidget::courseActionAt(std::size_t row, const QPoint& position) const {
+  const RowWidget* const widget = visibleRow(row);
+  if (!widget || !widget->sparklineArea().contains(widget->mapFrom(viewport(), position))) return nullptr;
+  return window()->findChild<QAction*>(QLatin1String(courseCommand), Qt::FindDirectChildrenOnly);
+}
+
 void TableWidget::showEmphasis() {
   for (RowWidget* row : visibleRows()) row->setEmphasis(emphasisOf(*row));
 }
@@ -427,7 +443,7 @@ void TableWidget::mouseReleaseEvent(QMouseEvent* event) {
   if (event->button() != Qt::LeftButton) return event->ignore();
   const auto press = std::exchange(_press, std::nullopt);
   if (press && !press->isDrag() && press->row() == rowAt(event->position().toPoint()))
-    chooseRow(press->row());
+    takeClick(press->row(), event->position().toPoint());
 }
 
 void TableWidget::wheelEvent(QWheelEvent* event) {

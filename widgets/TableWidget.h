@@ -40,6 +40,10 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   void deselectRow(const IndexPath& path, Animation animation) override;
   void sizeToFit() override;
 
+  /// The window's action with this object name shows the course of the current row. A click on the small line
+  /// of a row causes it. Without such an action, the line is a part of the row like any other.
+  static constexpr const char* courseCommand = "courseOfRow";
+
   /// Keeps what it shows, but makes no more calls.
   void fallSilent();
 
@@ -104,6 +108,8 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   std::size_t firstWhollyVisibleRow() const;
   std::size_t rowsOnScreen() const;
   void makeCurrent(std::size_t row);
+  void takeClick(std::size_t row, const QPoint& position);
+  QAction* courseActionAt(std::size_t row, const QPoint& position) const;
   void tellOfFocusOn(std::size_t row) const;
   void moveTo(std::optional<std::size_t> row);
   void turnPage(int key);

@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "programs/shared/Modules.h"
+#include "widgets/TableWidget.h"
 
 namespace varnel {
 
@@ -24,7 +25,7 @@ void Trends::furnish(WindowWidget& window) {
     if (page()) return page()->chooseRows();
     show(_window->pathOfFocus());
   });
-  trend.setObjectName(QStringLiteral("trend"));
+  trend.setObjectName(QLatin1String(TableWidget::courseCommand));
   window.addCommand(QObject::tr("Add this row to the last trend"), {Qt::SHIFT | Qt::Key_T}, [this] {
     if (page()) return page()->chooseRows();
     showAlso(_window->pathOfFocus());

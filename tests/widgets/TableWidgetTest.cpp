@@ -3,6 +3,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <QAction>
 #include <QScrollBar>
 #include <QTextDocument>
 #include <QToolTip>
@@ -463,6 +464,27 @@ TEST_F(TableWidgetTest, SizedToFitItIsAsHighAsItsRows) {
   EXPECT_THAT(delegate.asked, IsEmpty());
   showWith(leaves(3));
   EXPECT_EQ(table.maximumHeight(), 150);
+}
+
+TEST_F(TableWidgetTest, AClickOnTheSmallLineOfARowAsksForItsCourseAlone) {
+  showWith({{"A", "1"}, {"B", "2"}});
+  row(1).setFacts({.course = {1, 2, 3}});
+  QCoreApplication::processEvents();
+  ASSERT_FALSE(row(1).sparklineArea().isEmpty());
+  const QPoint line = row(1).mapTo(table.viewport(), row(1).sparklineArea().center().toPoint());
+  click(line);
+  EXPECT_THAT(delegate.chosen, testing::ElementsAre(1)) << "nobody shows courses";
+
+  auto* const course = new QAction(&table);
+  course->setObjectName(TableWidget::courseCommand);
+  int asked = 0;
+  QObject::connect(course, &QAction::triggered, &table, [&] { ++asked; });
+  click(line);
+  EXPECT_EQ(asked, 1);
+  EXPECT_EQ(table.currentPlace(), 1U);
+  click(row(1).mapTo(table.viewport(), QPoint(5, 25)));
+  EXPECT_EQ(asked, 1);
+  EXPECT_THAT(delegate.chosen, testing::ElementsAre(1, 1));
 }
 
 }  // namespace
