@@ -86,7 +86,7 @@ class Steps {
     _isLevel = true;
   }
   void addUpright(double x, double from, double to) {
-    const auto [top, bottom] = std::minmax(near(from), near(to));
+    const auto [top, bottom] = std::minmax({near(from), near(to)});
     if (top == bottom) return;
     _bars.append({near(x), top, _width, bottom - top + _width});
     _isLevel = false;
