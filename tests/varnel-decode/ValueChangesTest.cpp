@@ -187,6 +187,18 @@ TEST(ValueChanges, APilotOfACandidateIsACellOfItsChannel) {
   EXPECT_THAT(changes.cells(), ElementsAre(ShownCell{"CDMA2000", "283", "12"}));
 }
 
+TEST(ValueChanges, AFrequencyIsNoChannel) {
+  ValueChanges changes;
+  const auto cells = [](const Value& record) { return displayOf("Other Cells", Value::ofArray({record})); };
+  changes.take(at(
+      2,
+      cells(section({{"EARFCN", "1300"}, {"Downlink Frequency", "1815.0 MHz"}, {"Physical Cell ID", "7"}}))));
+  changes.take(at(
+      4,
+      cells(section({{"UARFCN", "10588"}, {"Downlink Frequency", "2117.6 MHz"}, {"Scrambling Code", "5"}}))));
+  EXPECT_THAT(changes.cells(), ElementsAre(ShownCell{"LTE", "1300", "7"}, ShownCell{"UMTS", "10588", "5"}));
+}
+
 TEST(ValueChanges, ACellIsSeenWhenOnlyItsChannelChanges) {
   ValueChanges changes;
   for (const char* channel : {"", "100", "100", "200"})

@@ -271,7 +271,9 @@ const ValueChanges::Node* ValueChanges::channelOf(const Node& identity, std::siz
   }
   for (const Node* section = identity.parent; section; section = section->parent) {
     const auto found = std::ranges::find_if(section->channels, [&](const Node* entry) {
-      return entry->text && names(channelEntries, entry->name, Radio(radio));
+      // Some entries of these names show a frequency with its unit.
+      return entry->text && names(channelEntries, entry->name, Radio(radio)) &&
+             !EntryFormats().number(*entry->text).empty();
     });
     if (found != section->channels.end()) return *found;
   }
