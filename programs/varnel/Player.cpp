@@ -261,7 +261,9 @@ void Player::close() {
 
 void Player::startOver() {
   if (_own.kind == Kind::Snapshot) return showDisplay(_display);
+  if (_own.whyItEnded) return startAgain();
   _jump.reset();
+  _wasConnected = false;  // the new link is asked how far the stream is
   _parts.app.startOver();
 }
 

@@ -246,6 +246,31 @@ TEST_F(PlayerTest, TheEndIsShownAndTheCaptureIsPlayedAgain) {
   EXPECT_EQ(title(), section);
 }
 
+TEST_F(PlayerTest, StartingOverAfterTheEndPlaysTheCaptureFromItsStart) {
+  launch(capture(20));
+  ASSERT_TRUE(waitForRow(section));
+  Q_EMIT bar()->speedWanted(600);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return state.button == PlayBarState::Button::Again; }));
+  Q_EMIT bar()->speedWanted(1);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return state.speed == 1; }));
+  _player->startOver();
+  EXPECT_TRUE(waitForBar([](const auto& state) { return state.button == PlayBarState::Button::Pause; }));
+  ASSERT_TRUE(waitForRow(section));
+}
+
+TEST_F(PlayerTest, AModemsPortIsShown) {
+  const Process modem(VARNEL_TELEPHONYD_PROGRAM, {"--simulate", "all-radios", "--pty"});
+  ASSERT_TRUE(eventually([&] { return modem.output().ends_with('\n'); }));
+  std::string port = modem.output();
+  port.pop_back();
+  launch();
+  _player->connectToPort(port);
+  EXPECT_EQ(barTexts(), "Opening " + port + "…");
+  ASSERT_TRUE(waitForRow("SIM 1"));
+  EXPECT_EQ(barTexts(), "Port " + port);
+  EXPECT_FALSE(bar()->playButton().isVisible());
+}
+
 TEST_F(PlayerTest, AFileThatCannotBeOpenedIsToldAndTheWindowOffersWhatItOffered) {
   launch("/no such file");
   EXPECT_EQ(waitForAlert(),
