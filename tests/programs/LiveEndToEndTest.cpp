@@ -219,6 +219,13 @@ TEST_F(LiveEndToEnd, TheRealServiceAndItsModemComeAndGo) {
   EXPECT_TRUE(eventually([&] { return service.run("/usr/bin/mmcli", {"-m", "any", "--signal-get"}); }));
 }
 
+TEST_F(LiveEndToEnd, TheBusTakesTheExampleOfAPolicy) {
+  _bus.stop();
+  EXPECT_TRUE(_bus.start("<include>" VARNEL_SOURCE_DIR "/packaging/dbus/varnel-modemmanager.conf</include>"));
+  PrivateBus other;
+  EXPECT_FALSE(other.start("<include>" VARNEL_SOURCE_DIR "/README.md</include>"));
+}
+
 std::size_t openFilesOf(const Process& process) {
   const std::filesystem::directory_iterator files("/proc/" + std::to_string(process.id()) + "/fd");
   return static_cast<std::size_t>(std::distance(begin(files), end(files)));

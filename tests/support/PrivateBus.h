@@ -13,12 +13,14 @@ namespace varnel {
 /// A private D-Bus session bus for the test, on which everybody may own every name.
 class PrivateBus {
  public:
-  /// False when the bus cannot be started on this machine.
-  bool start() {
+  /// False when the bus cannot be started on this machine, or does not take these elements of its
+  /// configuration.
+  bool start(const std::string& elements = {}) {
     std::ofstream(_folder.file("bus.conf"))
         << "<busconfig><type>session</type><listen>" << address()
         << "</listen><auth>EXTERNAL</auth><policy context=\"default\"><allow send_destination=\"*\" "
-           "eavesdrop=\"true\"/><allow eavesdrop=\"true\"/><allow own=\"*\"/></policy></busconfig>";
+           "eavesdrop=\"true\"/><allow eavesdrop=\"true\"/><allow own=\"*\"/></policy>"
+        << elements << "</busconfig>";
     const std::vector<std::string> arguments{"dbus-daemon", "--nofork", "--print-address",
                                              "--config-file=" + _folder.file("bus.conf")};
     _daemon = std::make_unique<Process>("/usr/bin/env", arguments);

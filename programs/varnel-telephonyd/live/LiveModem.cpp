@@ -231,9 +231,8 @@ const QVariantMap& LiveModem::properties(const QString& interface) const {
 void LiveModem::update() {
   setStatus(statusOf(_path, _modems.value(QString::fromStdString(_path))));
   if (!isUsable()) {
-    _cells.clear();
-    _location.reset();
     _ownPosition.reset();
+    _isRateRefused = false;  // it may be taken when the modem is switched on
   }
   updatePolling();
   sendLater();
@@ -257,7 +256,10 @@ void LiveModem::updatePolling() {
   if (!isWatched()) {
     _polling.reset();
     restoreRate({});
-    return;
+    // They would be old when the next viewer comes.
+    _cells.clear();
+    _location.reset();
+    return sendLater();
   }
   updateRate();
   if (_polling) return;
@@ -280,7 +282,7 @@ void LiveModem::askForCells() {
 
 void LiveModem::takeCellInfo(const QDBusMessage& answer) {
   _awaitsCells = false;
-  if (!isUsable()) return;
+  if (!isWatched()) return;
   auto cells = busReading::cellsOf(answer);
   _hasFreshCells = cells.has_value();
   // What was measured long ago is not shown.

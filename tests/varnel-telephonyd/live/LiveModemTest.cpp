@@ -294,6 +294,16 @@ TEST_F(LiveModemTest, TheModemIsAskedOnlyWhileThereIsAViewer) {
   EXPECT_EQ(_service.calls(), before);
 }
 
+TEST_F(LiveModemTest, AViewerThatComesAfterAllOthersSeesNoOldCells) {
+  startAll({"add", "0", "then", "cells", "0", "gsm-neighbor"});
+  ASSERT_TRUE(shows(modemReport, "ARFCN: 975"));
+  const std::uint64_t before = _live->sent();
+  _viewer.reset();
+  ASSERT_TRUE(runUntil([&] { return _live->sent() > before; }));
+  const Viewer later(*_live);
+  EXPECT_THAT(later.last(modemReport), AllOf(HasSubstr("Test Net"), Not(HasSubstr("ARFCN: 975"))));
+}
+
 TEST_F(LiveModemTest, AtTheEndTheModemHasItsOldRate) {
   startAll();
   ASSERT_TRUE(runUntil([&] { return _service.calls().find(" Setup 1\n") != std::string::npos; }));
