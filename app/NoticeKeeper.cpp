@@ -150,6 +150,8 @@ void NoticeKeeper::snapshotIsNotAllowed() {
                std::string(internalDeviceMarker));
 }
 
+void NoticeKeeper::snapshotIsOpen() { tellOfSaving("Not saved: what is shown comes from a snapshot"); }
+
 void NoticeKeeper::snapshotIsWanted() {
   if (_model && !_model->hasHistory()) tellOfSaving("Nothing has arrived yet: a snapshot saved now is empty");
 }

@@ -34,6 +34,8 @@ class NoticeKeeper {
   void snapshotWasWritten(const FileWriting& writing);
   /// The user wanted a snapshot on a device that allows none. Calls the observer.
   void snapshotIsNotAllowed();
+  /// The user wanted a snapshot of a display that comes from one. Calls the observer.
+  void snapshotIsOpen();
   /// A snapshot is about to be described and written. Calls the observer when the snapshot is going to be
   /// empty.
   void snapshotIsWanted();

@@ -110,6 +110,7 @@ void VarnelApp::refresh() {
 
 void VarnelApp::save() {
   if (!_model) return;
+  if (_statusWithoutLink) return _notices.snapshotIsOpen();
   const auto writing =
       saveSnapshotWithoutDescription(_host.files, _host.model.generator.clock, _model->getSaveContents());
   if (writing) {
@@ -301,6 +302,7 @@ void VarnelApp::navigationController_willShowViewController_animated(NavigationS
 
 void VarnelApp::showSaveView() {
   if (_saveViewController || !_model) return;
+  if (_statusWithoutLink) return _notices.snapshotIsOpen();
   const VarnelSaveViewController::Host host{_host.userInterface, _host.model.generator.resources, _host.files,
                                             _host.model.generator.clock, *this};
   setSaveViewController(VarnelSaveViewController::initWithSaveHistory(host, _model->getSaveContents()));

@@ -661,6 +661,19 @@ TEST_F(VarnelAppTest, ADisplayThatIsGivenIsShownWithoutALink) {
   EXPECT_EQ(telephony.attempts, 2u);
 }
 
+TEST_F(VarnelAppTest, ADisplayThatIsGivenIsNotSavedAgain) {
+  files.existing = {marker};
+  launch();
+  app.showDisplay(dictionaryOf({{"Cell", Value::ofDictionary()}}), "Saved yesterday");
+  pane().pressSave();
+  EXPECT_FALSE(app.saveViewController());
+  EXPECT_EQ(stack().notice, "Not saved: what is shown comes from a snapshot");
+  app.save();
+  EXPECT_THAT(files.writes, IsEmpty());
+  queue.advance(30s);
+  EXPECT_EQ(stack().notice, "");
+}
+
 TEST_F(VarnelAppTest, TellsItsObserverOfLinkAndDisplay) {
   std::string seen;
   app.setObserver([&] { seen += app.hasDisplay() ? 'd' : app.isConnected() ? 'c' : '-'; });
