@@ -72,6 +72,7 @@ void RowChooser::show(const std::vector<TrendRow>& rows, const std::vector<std::
     if (!unit) {
       unit = new QStandardItem(row.unit.empty() ? tr("(no unit)") : QString::fromStdString(row.unit));
       unit->setSelectable(false);
+      unit->setSizeHint(QSize(0, rowHeight));
       _rows.appendRow(unit);
     }
     QString text = QString::fromStdString(row.name);

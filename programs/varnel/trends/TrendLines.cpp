@@ -151,6 +151,10 @@ std::vector<TrendSource::Event> TrendLines::eventsAt(double x) const {
   return found;
 }
 
+std::vector<TrendSource::Event> TrendLines::eventsAtColumn(std::size_t column) const {
+  return _data ? eventsAt(xOfColumn(column)) : std::vector<TrendSource::Event>();
+}
+
 void TrendLines::paint(QPainter* painter, const QStyleOptionGraphicsItem*, QWidget*) {
   if (!_data || _area.isEmpty()) return;
   painter->setRenderHint(QPainter::Antialiasing);

@@ -26,6 +26,7 @@ class TrendLines final : public QGraphicsItem {
 
   /// Events within some points of this place.
   std::vector<TrendSource::Event> eventsAt(double x) const;
+  std::vector<TrendSource::Event> eventsAtColumn(std::size_t column) const;
 
   QRectF boundingRect() const override { return _area.adjusted(-margin, -margin, margin, margin); }
   void paint(QPainter* painter, const QStyleOptionGraphicsItem* option, QWidget* widget) override;

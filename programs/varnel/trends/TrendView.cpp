@@ -20,6 +20,7 @@ constexpr double panOfAKey = 0.2;
 constexpr double wheelStep = 120;  // of a mouse with notches
 constexpr double zoomOfANotch = 0.8;
 constexpr qsizetype mostEventsInATooltip = 10;
+constexpr qsizetype mostCursorTexts = 12;
 
 }  // namespace
 
@@ -76,6 +77,11 @@ QStringList TrendView::cursorTexts() const {
       text += tr("no value");
     }
     texts.append(text);
+  }
+  // A finger has no tooltips.
+  for (const TrendSource::Event& event : _chart->lines().eventsAtColumn(*_cursor)) {
+    if (texts.size() == mostCursorTexts) break;
+    texts.append(QString::fromStdString(event.text));
   }
   return texts;
 }

@@ -188,6 +188,8 @@ TEST_F(TrendPageTest, AMarkTellsItsEvent) {
   const QRectF area = view().chart().lines().area();
   EXPECT_THAT(view().chart().lines().eventsAt(area.center().x()), SizeIs(1));
   EXPECT_THAT(view().chart().lines().eventsAt(area.center().x() + 30), IsEmpty());
+  const std::size_t middle = view().data().lines[0].columns.size() / 2;
+  EXPECT_THAT(view().chart().lines().eventsAtColumn(middle), SizeIs(1));
 }
 
 TEST_F(TrendPageTest, RowsAreChosenFromAListByUnit) {
