@@ -319,11 +319,13 @@ constexpr int endOfChangeMark = 8;
 
 TEST_F(Appearance, NamesFromRightToLeftStandWhereOthersStandAndReadFromTheRight) {
   launch();
-  receive(Value::ofArray({dictionaryOf({{"APN", "internet"},
-                                        {network, internet},
-                                        {arabic, arabic},
-                                        {city, city + city},
-                                        {"LTE " + network, "x"}})}));
+  const Value contexts = Value::ofArray({dictionaryOf({{"APN", "internet"},
+                                                       {network, internet},
+                                                       {arabic, arabic},
+                                                       {city, city + city},
+                                                       {"LTE " + network, "x"}})});
+  receive(contexts);
+  receive(contexts);  // so that no row has the mark of a change
   goTo({"PDP Context Info", "0", "APN"});
   press(Qt::Key_Home);
   ASSERT_GE(rows().size(), 5u);
