@@ -113,7 +113,7 @@ void NavigationWidget::changeTop(std::vector<std::shared_ptr<PaneController>> co
   // A choice beside the top pane is seen at once: the pane that was open has gone already.
   const bool slides = shownAs == Animation::Animated && !_isChoosing;
   const QRect part = PanePlaces::partThatChanges(rect());
-  delete _overlay.data();
+  endAnimation();
   const QPixmap former = slides ? grab(part) : QPixmap();
   const auto formerControllers = std::exchange(_controllers, std::move(controllers));
   if (_controllers.size() > formerControllers.size()) adopt(_controllers.size() - 1);
@@ -182,7 +182,7 @@ void NavigationWidget::setNotice(std::string_view text) {
 void NavigationWidget::present(std::shared_ptr<ModalController> controller, Animation animation) {
   dismiss(Animation::None);
   const Animation shownAs = isShownHappening(*this, animation) ? animation : Animation::None;
-  delete _overlay.data();
+  endAnimation();
   const QPixmap former = shownAs == Animation::Animated ? grab() : QPixmap();
   _modal = std::move(controller);
   ModalScreenWidget& screen = screenOf(*_modal);
@@ -200,7 +200,7 @@ void NavigationWidget::dismiss(Animation animation) {
   if (!_modal) return;
   ModalScreenWidget& screen = screenOf(*_modal);
   const bool isAnimated = isShownHappening(*this, animation);
-  delete _overlay.data();
+  endAnimation();
   const QPixmap former = isAnimated ? grab() : QPixmap();
   screen.leave();
   if (isAnimated) slide(former, rect(), SlideOverlay::Movement::Sink);
@@ -212,6 +212,11 @@ void NavigationWidget::dismiss(Animation animation) {
 // loop.
 void NavigationWidget::releaseLater(std::shared_ptr<void> leaving) {
   QTimer::singleShot(0, this, [leaving = std::move(leaving)] {});
+}
+
+void NavigationWidget::endAnimation() {
+  const std::unique_ptr<SlideOverlay> overlay(_overlay.data());
+  _overlay.clear();
 }
 
 // From the former picture of this part to what it shows now.
@@ -287,7 +292,7 @@ ModalScreenWidget* NavigationWidget::modalScreen() const { return _modal ? &scre
 
 void NavigationWidget::resizeEvent(QResizeEvent* event) {
   QWidget::resizeEvent(event);
-  delete _overlay.data();
+  endAnimation();
   arrange();
   if (ModalScreenWidget* screen = modalScreen()) screen->setGeometry(rect());
 }

@@ -88,6 +88,7 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   bool moveKeyboard(const QKeyEvent& event);
   PaneWidget& paneAt(std::size_t index) const;
   std::vector<std::string> pathOf(std::size_t index) const;
+  void endAnimation();
   void slide(const QPixmap& former, const QRect& part, SlideOverlay::Movement movement);
   void releaseLater(std::shared_ptr<void> leaving);
 
