@@ -46,13 +46,22 @@ void Trends::open(const NamePath& path, Picture picture) {
     return _host.tellFailure(error.what());
   }
   for (const std::string& key : former) page->addRow(key);
-  const auto key = path.empty() ? std::nullopt : _host.keyOf(path);
-  if (key) page->addRow(*key);
+  if (const auto key = keyOf(path)) page->addRow(*key);
   _page = page.get();
   const bool isEmpty = page->rows().empty();
   _window->showPage(QObject::tr("Trend"), std::move(page));
   // A section, or a text, has no course.
   if (isEmpty) _page->chooseRows();
+}
+
+// A row that shows no number at present may have had one before, or later in the file. Outside of lists, its
+// path is its key.
+std::optional<std::string> Trends::keyOf(const NamePath& path) {
+  if (path.empty()) return std::nullopt;
+  if (auto key = _host.keyOf(path)) return key;
+  std::string joined;
+  for (const std::string& name : path) joined.append("/").append(name);
+  return source().row(joined) ? std::optional(joined) : std::nullopt;
 }
 
 void Trends::refresh() {

@@ -48,6 +48,7 @@ class Trends final {
  private:
   enum class Picture { New, WithFormerRows };
   void open(const NamePath& path, Picture picture);
+  std::optional<std::string> keyOf(const NamePath& path);
   HistoryTrends& source();
   void leavePage();
 

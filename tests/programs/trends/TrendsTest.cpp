@@ -55,6 +55,13 @@ TEST_F(TrendsTest, ASecondRowIsAddedOrHasItsOwnPicture) {
   EXPECT_THAT(trends.page()->rows(), ElementsAre(quality));
 }
 
+TEST_F(TrendsTest, ARowThatShowsNoNumberAtPresentHasTheCourseThatItHad) {
+  numbers.add(std::vector{reading("/LTE/Connection/Count", "", "3")}, {start + 20, 0});
+  show(22, "-85");
+  trends.show({"LTE", "Connection", "Count"});
+  EXPECT_THAT(trends.page()->rows(), ElementsAre("/LTE/Connection/Count"));
+}
+
 TEST_F(TrendsTest, ARowWithoutACourseLetsTheUserChoose) {
   trends.show({"LTE", "Serving Cell"});
   ASSERT_TRUE(trends.page());
