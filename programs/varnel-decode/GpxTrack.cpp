@@ -200,8 +200,8 @@ void GpxTrack::addPoint(Track& track, const modem::Position& position, std::opti
                         const Value& groups) {
   std::string text(track.isInSegment ? std::string_view() : segmentBegins);
   track.isInSegment = true;
-  text.append("      <trkpt lat=\"").append(fixed(position.latitude_deg, 7));
-  text.append("\" lon=\"").append(fixed(position.longitude_deg, 7)).append("\">\n");
+  text.append("      <trkpt lat=\"").append(fixed(position.latitude, 7));
+  text.append("\" lon=\"").append(fixed(position.longitude, 7)).append("\">\n");
   constexpr std::string_view indent = "        ";
   if (position.altitude_m) text += element(indent, "ele", fixed(*position.altitude_m, 1));
   if (time) text += element(indent, "time", timestamp(*time));

@@ -27,8 +27,8 @@ void PositionSection::show(const Dictionary& report) {
     else
       sectionRef.setReal(entry, format, *number);
   };
-  showNumber(latitudeEntry, degrees, position ? std::optional(position->latitude_deg) : std::nullopt);
-  showNumber(longitudeEntry, degrees, position ? std::optional(position->longitude_deg) : std::nullopt);
+  showNumber(latitudeEntry, degrees, position ? std::optional(position->latitude) : std::nullopt);
+  showNumber(longitudeEntry, degrees, position ? std::optional(position->longitude) : std::nullopt);
   showNumber(altitudeEntry, meters, position ? position->altitude_m : std::nullopt);
   sectionRef.setText("Time", position && position->time ? dateDescription(*position->time) : std::string());
   sectionRef.setText("Source", position ? position->source : std::string());

@@ -73,8 +73,8 @@ std::optional<Position> positionIn(const Dictionary& report) {
   const auto latitude = number(*entries, modemReport::latitude, -90, 90);
   const auto longitude = number(*entries, modemReport::longitude, -180, 180);
   if (!latitude || !longitude) return std::nullopt;
-  Position position{.latitude_deg = *latitude,
-                    .longitude_deg = *longitude,
+  Position position{.latitude = *latitude,
+                    .longitude = *longitude,
                     .altitude_m = number(*entries, modemReport::altitude, -1000, 100000),
                     .time = std::nullopt,
                     .source = shortText(entries->get(modemReport::source))};

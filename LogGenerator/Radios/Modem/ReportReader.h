@@ -47,10 +47,10 @@ std::string network(const Dictionary& entries);
 
 /// Where the modem was.
 struct Position {
-  double latitude_deg, longitude_deg;  ///< WGS 84; north and east are positive
-  std::optional<double> altitude_m;    ///< above the sea
-  std::optional<Time> time;            ///< of the fix
-  std::string source;                  ///< such as "GNSS"; empty when nobody tells
+  double latitude, longitude;        ///< degrees of WGS 84; north and east are positive
+  std::optional<double> altitude_m;  ///< above the sea
+  std::optional<Time> time;          ///< of the fix
+  std::string source;                ///< such as "GNSS"; empty when nobody tells
 };
 
 /// The entries of the display that show it. They tell where a person was, so they count as identities.
