@@ -503,8 +503,8 @@ BearerReading bearerOf(const QVariantMap& properties) {
   bearer.sent_bytes = count(counts, "tx-bytes");
   bearer.duration_s = count(counts, "duration");
   // 0 stands for a rate that is not known.
-  if (const auto rate = count(counts, "downlink-speed"); rate && *rate > 0) bearer.downlink_bps = rate;
-  if (const auto rate = count(counts, "uplink-speed"); rate && *rate > 0) bearer.uplink_bps = rate;
+  if (const auto rate = count(counts, "downlink-speed"); rate && *rate > 0) bearer.downlinkBits = rate;
+  if (const auto rate = count(counts, "uplink-speed"); rate && *rate > 0) bearer.uplinkBits = rate;
   return bearer;
 }
 

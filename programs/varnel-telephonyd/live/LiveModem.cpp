@@ -173,7 +173,7 @@ void LiveModem::takeChanged(const std::string& object, const QString& interface,
 std::string LiveModem::choice() const {
   std::string best;
   for (auto modem = _modems.begin(); modem != _modems.end(); ++modem) {
-    const std::string path = modem.key().toStdString();
+    std::string path = modem.key().toStdString();
     const std::string device = busReading::text(modem.value().value(modemInterface), "Device");
     if (!_device.empty() && device == _device) return path;
     const std::string& wanted = _setup.wanted;

@@ -72,7 +72,7 @@ struct BearerReading {
   bool isConnected = false, isSuspended = false;
   std::optional<std::int64_t> profile{};
   Addresses ip4{}, ip6{};
-  std::optional<std::uint64_t> downlink_bps{}, uplink_bps{};
+  std::optional<std::uint64_t> downlinkBits{}, uplinkBits{};  ///< per second
   std::optional<std::uint64_t> received_bytes{}, sent_bytes{}, duration_s{};
 };
 

@@ -149,8 +149,8 @@ Value rowsOf(const BearerReading& bearer) {
   if (bearer.profile) rows.set("Profile", std::to_string(*bearer.profile));
   setAddresses(rows, "", bearer.ip4);
   setAddresses(rows, "IPv6 ", bearer.ip6);
-  setRow(rows, "Downlink Rate", bearer.downlink_bps, " bit/s");
-  setRow(rows, "Uplink Rate", bearer.uplink_bps, " bit/s");
+  setRow(rows, "Downlink Rate", bearer.downlinkBits, " bit/s");
+  setRow(rows, "Uplink Rate", bearer.uplinkBits, " bit/s");
   setRow(rows, "Bytes Sent", bearer.sent_bytes);
   setRow(rows, "Bytes Received", bearer.received_bytes);
   setRow(rows, "Duration", bearer.duration_s, " s");
