@@ -142,7 +142,7 @@ QVariant SearchResults::data(const QModelIndex& index, int role) const {
 
 // ---- The list ----
 
-SearchResultsView::SearchResultsView(std::function<void(const QModelIndex&)> chosen)
+SearchResultsView::SearchResultsView(const std::function<void(const QModelIndex&)>& chosen)
     : _touch(
           *this, [](const QPoint&) { return nullptr; },
           [this, chosen](const QPoint& position) { chosen(indexAt(position)); }) {

@@ -50,7 +50,7 @@ class SearchResults final : public QAbstractListModel {
 class SearchResultsView final : public QListView {
  public:
   /// `chosen` is called with the item that a click or a tap chooses.
-  explicit SearchResultsView(std::function<void(const QModelIndex& index)> chosen);
+  explicit SearchResultsView(const std::function<void(const QModelIndex& index)>& chosen);
 
   QSize sizeHint() const override { return {320, 200}; }
 

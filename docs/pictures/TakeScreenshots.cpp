@@ -135,7 +135,6 @@ Photographer* photographer = nullptr;
 void startWithTheApplication() {
   QTimer::singleShot(0, qApp, [] { photographer->begin(); });
 }
-Q_COREAPP_STARTUP_FUNCTION(startWithTheApplication)
 
 // The root pane, its first section, and the search.
 void planSmallWindow(Photographer& user) {
@@ -187,6 +186,7 @@ int run(int argumentCount, char** arguments) {
   }
   Photographer user(arguments[1]);
   photographer = &user;
+  ::qAddPreRoutine(startWithTheApplication);
   Options options;
   if (argumentCount == 4) {
     options.runtimeFolder = arguments[2];
