@@ -102,7 +102,7 @@ void setRadio(Dictionary& record, const CellReading& cell) {
 }
 
 Value monitorRecordOf(const CellReading& cell) {
-  const Value value = Value::ofDictionary();
+  Value value = Value::ofDictionary();
   Dictionary& record = *value.dictionary();
   record.set(cellMonitor::radioAccessTechnology, monitorNameOf(cell.radio));
   record.set(cellMonitor::cellType, cell.isServing ? cellMonitor::serving : cellMonitor::neighbor);
@@ -139,7 +139,7 @@ const char* stateOf(const BearerReading& bearer) {
 }
 
 Value rowsOf(const BearerReading& bearer) {
-  const Value value = Value::ofDictionary();
+  Value value = Value::ofDictionary();
   Dictionary& rows = *value.dictionary();
   setText(rows, "APN", bearer.accessPoint);
   rows.set("State", stateOf(bearer));
@@ -196,7 +196,7 @@ void setLevels(Dictionary& record, const CellLevels& levels) {
 
 Value reportRecordOf(const CellReading& cell) {
   const ReportKeys keys = reportKeysOf(cell.radio);
-  const Value value = Value::ofDictionary();
+  Value value = Value::ofDictionary();
   Dictionary& record = *value.dictionary();
   record.set(modemReport::radioAccessTechnology, keys.name);
   record.set(modemReport::cellType, cell.isServing ? modemReport::serving : modemReport::neighbor);
@@ -217,7 +217,7 @@ Value reportRecordOf(const CellReading& cell) {
 }
 
 Value positionOf(const Position& position) {
-  const Value value = Value::ofDictionary();
+  Value value = Value::ofDictionary();
   Dictionary& entries = *value.dictionary();
   setReal(entries, modemReport::latitude, position.latitude);
   setReal(entries, modemReport::longitude, position.longitude);
