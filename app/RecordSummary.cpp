@@ -89,7 +89,8 @@ bool contains(std::string_view text, std::string_view part) {
 }
 
 // A list of LTE cells shows the power of the whole channel too, and that before the power of the cell.
-bool isOfWholeChannel(std::string_view name) { return contains(name, "RSSI"); }
+constexpr std::string_view powerOfChannel = "RSSI";
+bool isOfWholeChannel(std::string_view name) { return contains(name, powerOfChannel); }
 
 // The power and the quality of what is received.
 class MainLevels {
@@ -103,11 +104,14 @@ class MainLevels {
     }
   }
   void addTo(RecordSummary& summary) const {
-    for (const auto& level : {_power, _quality}) {
-      if (!level) continue;
-      summary.parts.push_back(shortText(*level));
-      if (!summary.level) summary.level = level->level;
+    if (_power) {
+      // It would be read as the power of the cell.
+      summary.parts.push_back(labeled(_isOfWholeChannel ? powerOfChannel : "", shortText(*_power)));
+      summary.level = _power->level;
     }
+    if (!_quality) return;
+    summary.parts.push_back(shortText(*_quality));
+    if (!summary.level) summary.level = _quality->level;
   }
 
  private:

@@ -55,7 +55,7 @@ TEST(RecordSummary, OfALonelyRecordHasTheWholeIdentity) {
   EXPECT_EQ(summaryIn("Cells", {cell("1300", "16")}).parts.front(), "EARFCN 1300, PCI 16");
 }
 
-TEST(RecordSummary, ThePowerOfACellComesBeforeThatOfTheChannel) {
+TEST(RecordSummary, ThePowerOfACellComesBeforeThatOfTheChannelWhichIsCalledSo) {
   const Value measured = dictionaryOf({{"Physical Cell ID", "300"},
                                        {"Measured RSSI", "-90.00 dBm"},
                                        {"Measured RSRP", "-102.00 dBm"},
@@ -64,7 +64,7 @@ TEST(RecordSummary, ThePowerOfACellComesBeforeThatOfTheChannel) {
   EXPECT_THAT(summaryIn("Neighbor Cells List", {measured}).parts,
               ElementsAre("PCI 300", "\u2212102.0 dBm", "\u22124.5 dB"));
   EXPECT_THAT(summaryIn("Neighboring Cells", {dictionaryOf({{"ARFCN", "13"}, {"RSSI", "-76 dBm"}})}).parts,
-              ElementsAre("ARFCN 13", "\u221276 dBm"));
+              ElementsAre("ARFCN 13", "RSSI \u221276 dBm"));
 }
 
 TEST(RecordSummary, ALevelThatRoundsToZeroHasNoSign) {
