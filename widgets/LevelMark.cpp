@@ -7,7 +7,8 @@ namespace varnel {
 namespace {
 
 constexpr int bars = 4;
-constexpr double barWidth = 3, gap = 5.0 / 3, lowestBar = 5;
+// Whole points, so that no edge is blurred.
+constexpr double barWidth = 3, gap = 2, lowestBar = 5, step = 3;
 
 int filledBars(CellLevel level) {
   switch (level) {
@@ -30,17 +31,12 @@ int filledBars(CellLevel level) {
 void paintLevelMark(QPainter& painter, const QPointF& topLeft, CellLevel level, const QColor& filled,
                     const QColor& empty) {
   if (level == CellLevel::None) return;
-  painter.save();
-  painter.setRenderHint(QPainter::Antialiasing);
-  painter.setPen(Qt::NoPen);
   for (int bar = 0; bar < bars; ++bar) {
-    const double height = lowestBar + (levelMarkSize.height() - lowestBar) * bar / (bars - 1);
+    const double height = lowestBar + step * bar;
     const QRectF area(topLeft.x() + bar * (barWidth + gap), topLeft.y() + levelMarkSize.height() - height,
                       barWidth, height);
-    painter.setBrush(bar < filledBars(level) ? filled : empty);
-    painter.drawRoundedRect(area, 1, 1);
+    painter.fillRect(area, bar < filledBars(level) ? filled : empty);
   }
-  painter.restore();
 }
 
 QColor levelColor(CellLevel level, const QPalette& palette, const QColor& ground) {

@@ -10,7 +10,7 @@
 namespace varnel {
 
 /// The size of a level's mark, in logical pixels.
-inline constexpr QSizeF levelMarkSize{17, 14};
+inline constexpr QSizeF levelMarkSize{18, 14};
 
 /// Four bars of growing height, of which one (poor) to four (excellent) are filled. Their color says the same
 /// again. Paints nothing for no level.

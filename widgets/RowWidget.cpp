@@ -211,7 +211,8 @@ void RowWidget::paintEvent(QPaintEvent*) {
   // The first letters of a text decide about its direction, not the desktop's language.
   painter.setLayoutDirection(Qt::LayoutDirectionAuto);
   const QColor plain = palette().color(QPalette::Text);
-  const QColor dimmed = dimmedTextColor(palette(), ground);
+  findColors(ground);
+  const QColor dimmed = _colors.dimmedText;
   const QColor name = _facts.dimming == CellDimming::All ? dimmed : plain;
   painter.setPen(name);
   paintBuiltInText(painter);
@@ -222,7 +223,7 @@ void RowWidget::paintEvent(QPaintEvent*) {
   for (const auto& container : _containers) container->paint(painter, colors);
   paintAccessory(painter);
   paintSeparator(painter);
-  if (_facts.change == CellChange::Changed) paintChangeMark(painter, ground);
+  if (_facts.change == CellChange::Changed) paintChangeMark(painter);
   if (_emphasis.isOpen) paintOpenMark(painter);
   if (_emphasis.hasFocusFrame) paintFocusFrame(painter);
 }
@@ -256,7 +257,7 @@ void RowWidget::placeBesideValue(Places& places, const PaintedLabel& name, const
   if (_facts.level != CellLevel::None) {
     const double usual = std::min(end, contentArea().width - usualRoomOfValue);
     if (sidewaysRange() <= 0 && usual - levelMarkSize.width() >= endOfName + gap) end = usual;
-    const QPointF corner(end - levelMarkSize.width(), middle - levelMarkSize.height() / 2);
+    const QPointF corner(std::floor(end - levelMarkSize.width()), middle - levelMarkSize.height() / 2);
     places.levelMark = QRectF(corner, levelMarkSize);
     end = corner.x();
   } else {
@@ -295,17 +296,28 @@ QString RowWidget::shownSummary(double width) const {
   return metrics.elidedText(text, Qt::ElideRight, width);
 }
 
+void RowWidget::findColors(const QColor& ground) {
+  const qint64 key = palette().cacheKey();
+  if (_colors.palette == key && _colors.ground == ground && _colors.ofLevel == _facts.level) return;
+  _colors = {key,
+             ground,
+             _facts.level,
+             dimmedTextColor(palette(), ground),
+             accentColor(palette(), ground),
+             levelColor(_facts.level, palette(), ground)};
+}
+
 void RowWidget::paintFacts(QPainter& painter, const QColor& ground) {
   const Places where = places();
   const bool isDimmed = _facts.dimming != CellDimming::None;
   if (!where.sparkline.isEmpty()) {
     const QColor line = isDimmed || !_sparkline.changes() ? barColor(palette()) : markColor(palette());
-    const QColor end = isDimmed ? line : seenOn(ground, accentColor(palette(), ground), line);
+    const QColor end = isDimmed ? line : _colors.accent;
     _sparkline.paint(painter, where.sparkline.topLeft(),
                      {where.sparkline.size(), line, end, devicePixelRatioF()});
   }
   if (!where.levelMark.isEmpty()) {
-    const QColor filled = isDimmed ? markColor(palette()) : levelColor(_facts.level, palette(), ground);
+    const QColor filled = isDimmed ? markColor(palette()) : _colors.level;
     painter.save();
     painter.setClipRect(qtRect(contentArea()));
     paintLevelMark(painter, where.levelMark.topLeft() - QPointF(sidewaysPosition(), 0), _facts.level, filled,
@@ -317,8 +329,7 @@ void RowWidget::paintFacts(QPainter& painter, const QColor& ground) {
 
 void RowWidget::paintSummary(QPainter& painter, const QRectF& area, const QColor& ground) const {
   const QColor text = palette().color(QPalette::Text);
-  painter.setPen(_facts.dimming == CellDimming::None ? blend(text, ground, 0.2)
-                                                     : dimmedTextColor(palette(), ground));
+  painter.setPen(_facts.dimming == CellDimming::None ? blend(text, ground, 0.2) : _colors.dimmedText);
   painter.setFont(summaryFont());
   painter.drawText(
       area,
@@ -326,11 +337,11 @@ void RowWidget::paintSummary(QPainter& painter, const QRectF& area, const QColor
       shownSummary(area.width()));
 }
 
-void RowWidget::paintChangeMark(QPainter& painter, const QColor& ground) const {
+void RowWidget::paintChangeMark(QPainter& painter) const {
   painter.save();
   painter.setRenderHint(QPainter::Antialiasing);
   painter.setPen(Qt::NoPen);
-  painter.setBrush(accentColor(palette(), ground));
+  painter.setBrush(_colors.accent);
   const double middle = changeMarkMiddle + (_emphasis.isOpen ? openMarkWidth / 2 : 0);
   painter.drawEllipse(QPointF(middle, tableRowHeight / 2), changeMarkRadius, changeMarkRadius);
   painter.restore();

@@ -82,7 +82,16 @@ class RowWidget final : public QWidget, public CellView {
     QRectF sparkline, levelMark, summary;
   };
 
+  // Colors that it takes time to find.
+  struct FoundColors {
+    qint64 palette = -1;  // those that follow are for this palette, ground, and level
+    QColor ground;
+    CellLevel ofLevel = CellLevel::None;
+    QColor dimmedText, accent, level;
+  };
+
   Places places() const;
+  void findColors(const QColor& ground);
   void placeBesideValue(Places& places, const PaintedLabel& name, const PaintedLabel& value) const;
   void placeBesideName(Places& places, double endOfName) const;
   std::vector<const PaintedLabel*> filledLabels() const;
@@ -90,7 +99,7 @@ class RowWidget final : public QWidget, public CellView {
   QRectF builtInRoom() const;
   void paintFacts(QPainter& painter, const QColor& ground);
   void paintSummary(QPainter& painter, const QRectF& area, const QColor& ground) const;
-  void paintChangeMark(QPainter& painter, const QColor& ground) const;
+  void paintChangeMark(QPainter& painter) const;
   void paintBuiltInText(QPainter& painter) const;
   void paintAccessory(QPainter& painter) const;
   void paintSeparator(QPainter& painter) const;
@@ -110,6 +119,7 @@ class RowWidget final : public QWidget, public CellView {
   Emphasis _emphasis;
   CellFacts _facts;
   Sparkline _sparkline;
+  FoundColors _colors;
 };
 
 }  // namespace varnel

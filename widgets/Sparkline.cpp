@@ -35,13 +35,14 @@ void Sparkline::paint(QPainter& painter, const QPointF& topLeft, const Look& loo
 void Sparkline::draw(const Look& look) {
   ++_timesDrawn;
   _look = look;
-  _picture = QPixmap((look.size * look.pixelRatio).toSize());
+  const QSize pixels = (look.size * look.pixelRatio).toSize();
+  if (_picture.size() != pixels) _picture = QPixmap(pixels);
   _picture.setDevicePixelRatio(look.pixelRatio);
   _picture.fill(Qt::transparent);
   if (!_hasLine) return;
   QPainter painter(&_picture);
   painter.setRenderHint(QPainter::Antialiasing);
-  painter.setPen(QPen(look.line, lineWidth, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
+  painter.setPen(QPen(look.line, lineWidth, Qt::SolidLine, Qt::SquareCap, Qt::BevelJoin));
   const QRectF area = QRectF(QPointF(), look.size).adjusted(dotRadius, dotRadius, -dotRadius, -dotRadius);
   const double step = area.width() / static_cast<double>(_course.size() - 1);
   QPolygonF run;

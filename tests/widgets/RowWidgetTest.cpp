@@ -51,7 +51,7 @@ class RowWidgetTest : public testing::Test {
     const QImage picture = row.grab().toImage();
     const auto ground = row.palette().color(QPalette::Base);
     int filled = 0;
-    for (const double middle : {-15.5, -10.8, -6.2, -1.5}) {
+    for (const double middle : {-16.5, -11.5, -6.5, -1.5}) {
       const QColor color = picture.pixelColor(end + static_cast<int>(std::floor(middle)), 30);
       filled += contrast(ground, color) > 2.5 ? 1 : 0;
     }
@@ -144,7 +144,7 @@ TEST_F(RowWidgetTest, TheSparklineIsBetweenNameAndLevel) {
   RowWidget& row = show("RSRP", "-97.25 dBm");
   EXPECT_TRUE(row.sparklineArea().isEmpty());
   tell({.level = CellLevel::Good, .course = {-97, -96}});
-  EXPECT_EQ(row.sparklineArea(), QRectF(endOfLevelMark - 17 - 8 - 96, 12, 96, 26));
+  EXPECT_EQ(row.sparklineArea(), QRectF(endOfLevelMark - 18 - 8 - 96, 12, 96, 26));
   EXPECT_GT(contrastIn(row, row.sparklineArea().toRect()), 3);
 }
 
