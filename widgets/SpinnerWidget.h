@@ -6,7 +6,7 @@
 
 namespace varnel {
 
-/// A small gray wheel that turns while it is on: one turn per second for three seconds, then two pictures per
+/// A small gray wheel that turns while it is on: one turn per second for three seconds, then one picture per
 /// second. It is hidden while it is off.
 class SpinnerWidget final : public QWidget {
  public:
