@@ -7,9 +7,11 @@
 #include <QMenu>
 #include <QMouseEvent>
 #include <QPainter>
+#include <QPointer>
 #include <QStyle>
 #include <QStyleOptionSlider>
 #include <QVBoxLayout>
+#include <initializer_list>
 
 #include "platform/ui/Font.h"
 #include "widgets/Colors.h"
@@ -28,12 +30,37 @@ constexpr double timeSize = 13, progressSize = 12, menuSize = 15;
 constexpr int keyPause_ms = 300;
 constexpr double speeds[] = {0.5, 1, 2, 5, 10, 60, 600};
 
-// Goes to the place that is clicked, not a page towards it.
+constexpr double grooveHeight = 4, handleRadius = 7;
+
+// Goes to the place that is clicked, not a page towards it. The groove of the desktop's style cannot be seen
+// on black, so the slider paints itself.
 class PlaceSlider final : public QSlider {
  public:
   using QSlider::QSlider;
 
  protected:
+  void paintEvent(QPaintEvent*) override {
+    QStyleOptionSlider option;
+    initStyleOption(&option);
+    const QRectF handle = style()->subControlRect(QStyle::CC_Slider, &option, QStyle::SC_SliderHandle, this);
+    const QColor ground = palette().color(QPalette::Window);
+    const QColor accent = accentColor(palette(), ground);
+    QPainter painter(this);
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(Qt::NoPen);
+    const QRectF groove(handleRadius, (height() - grooveHeight) / 2, width() - 2 * handleRadius,
+                        grooveHeight);
+    paintGroove(painter, groove, seenOn(ground, markColor(palette()), palette().color(QPalette::WindowText)));
+    QRectF passed = groove;
+    option.upsideDown ? passed.setLeft(handle.center().x()) : passed.setRight(handle.center().x());
+    paintGroove(painter, passed, accent);
+    painter.setBrush(accent);
+    painter.drawEllipse(handle.center(), handleRadius, handleRadius);
+    if (!hasFocus()) return;
+    painter.setBrush(Qt::NoBrush);
+    painter.setPen(QPen(accent, 2));
+    painter.drawRoundedRect(QRectF(rect()).adjusted(1, 1, -1, -1), 4, 4);
+  }
   void mousePressEvent(QMouseEvent* event) override {
     if (event->button() == Qt::LeftButton) {
       QStyleOptionSlider option;
@@ -47,6 +74,12 @@ class PlaceSlider final : public QSlider {
       }
     }
     QSlider::mousePressEvent(event);
+  }
+
+ private:
+  static void paintGroove(QPainter& painter, const QRectF& groove, const QColor& color) {
+    painter.setBrush(color);
+    painter.drawRoundedRect(groove, grooveHeight / 2, grooveHeight / 2);
   }
 };
 
@@ -113,6 +146,8 @@ QSize PlayBar::sizeHint() const { return {width(), barHeight}; }
 
 void PlayBar::setState(const PlayBarState& state) {
   const bool hasNewMessage = state.message != _state.message && !state.message.isEmpty();
+  const QPointer<QWidget> holder = focusWidget();
+  const bool hadKeyboard = holder && holder->hasFocus();
   _state = state;
   const bool isPlaying = state.message.isEmpty();
   showButton();
@@ -140,10 +175,18 @@ void PlayBar::setState(const PlayBarState& state) {
   _remedy->updateGeometry();
   setAccessibleName(state.name);
   setToolTip(plainTooltip(state.name));
+  if (hadKeyboard && holder && !holder->isVisibleTo(this)) passKeyboardOn();
   if (!hasNewMessage) return;
   setAccessibleDescription(state.message);
   QAccessibleEvent spoken(this, QAccessible::Alert);
   QAccessible::updateAccessibility(&spoken);
+}
+
+// What had the keyboard is hidden. The toolkit would give it to the button that closes everything.
+void PlayBar::passKeyboardOn() {
+  for (QWidget* const next : std::initializer_list<QWidget*>{_play, _remedy})
+    if (next->isVisibleTo(this)) return next->setFocus(Qt::OtherFocusReason);
+  Q_EMIT keyboardLeft();
 }
 
 void PlayBar::setProgress(const QString& progress) { _progress->setText(progress); }

@@ -70,6 +70,7 @@ class PlayBar final : public QWidget {
   void keyPressEvent(QKeyEvent* event) override;
 
  private:
+  void passKeyboardOn();
   void press();
   void showTime();
   void showButton();

@@ -9,6 +9,7 @@
 
 #include "tests/support/EventLoop.h"
 #include "tests/support/TestWidgets.h"
+#include "widgets/Colors.h"
 
 namespace varnel {
 namespace {
@@ -134,6 +135,49 @@ TEST_F(PlayBarTest, AMessageStandsInPlaceOfEverythingButItsRemedy) {
   EXPECT_EQ(bar.accessibleDescription(), "The server has ended");
   QTest::mouseClick(&bar.remedyButton(), Qt::LeftButton);
   EXPECT_EQ(remedies.size(), 1);
+}
+
+TEST_F(PlayBarTest, AButtonThatGoesPassesTheKeyboardOn) {
+  QSignalSpy departures(&bar, &PlayBar::keyboardLeft);
+  PlayBarState ended{.name = "walk.pcap"};
+  ended.message = "The server has ended";
+  ended.remedy = "Start again";
+  bar.activateWindow();
+  ASSERT_TRUE(QTest::qWaitForWindowActive(&bar, patience_ms));
+  bar.playButton().setFocus();
+  bar.setState(ended);
+  EXPECT_TRUE(bar.remedyButton().hasFocus());
+  bar.setState(stream);
+  EXPECT_TRUE(bar.playButton().hasFocus());
+  EXPECT_EQ(departures.size(), 0);
+}
+
+TEST_F(PlayBarTest, WithoutAButtonToPlayTheKeyboardLeavesTheBar) {
+  QSignalSpy departures(&bar, &PlayBar::keyboardLeft);
+  PlayBarState ended{.name = "walk.pcap"};
+  ended.message = "The server has ended";
+  ended.remedy = "Start again";
+  bar.setState(ended);
+  bar.activateWindow();
+  ASSERT_TRUE(QTest::qWaitForWindowActive(&bar, patience_ms));
+  bar.remedyButton().setFocus();
+  bar.setState({.name = "walk.pcap"});
+  EXPECT_EQ(departures.size(), 1);
+}
+
+// At least 3 to 1 is asked for (WCAG 2.1, contrast of what is not text).
+TEST_F(PlayBarTest, TheGrooveIsSeenOnWhiteAndOnBlack) {
+  for (const auto& [ground, text] : {std::pair(Qt::white, Qt::black), std::pair(Qt::black, Qt::white)}) {
+    QPalette palette;
+    for (const auto role : {QPalette::Window, QPalette::Base}) palette.setColor(role, QColor(ground));
+    for (const auto role : {QPalette::WindowText, QPalette::Text}) palette.setColor(role, QColor(text));
+    bar.setPalette(palette);
+    bar.slider().setPalette(palette);
+    const QRect place(bar.slider().mapTo(&bar, QPoint()), bar.slider().size());
+    const QImage picture = bar.grab(place).toImage();
+    const QColor groove = picture.pixelColor(picture.width() * 4 / 5, picture.height() / 2);
+    EXPECT_GE(contrast(groove, QColor(ground)), 3);
+  }
 }
 
 }  // namespace
