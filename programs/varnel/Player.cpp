@@ -12,6 +12,7 @@
 #include "LogGenerator/LogGenerator.h"
 #include "app/DateFormatter.h"
 #include "host/Printable.h"
+#include "programs/shared/FileDialogs.h"
 #include "programs/varnel/PlayedFile.h"
 #include "programs/varnel/PortNames.h"
 #include "widgets/FileDrop.h"
@@ -497,7 +498,7 @@ void Player::chooseFile() {
     _folder = QFileInfo(path).path();
     open(QFile::encodeName(path).toStdString());
   });
-  dialog->open();
+  openWithinScreen(*dialog);
 }
 
 void Player::choosePort(const std::string& id) {

@@ -14,6 +14,7 @@
 #include <algorithm>
 #include <set>
 
+#include "programs/shared/FileDialogs.h"
 #include "programs/varnel/trends/TrendPicture.h"
 
 namespace varnel {
@@ -306,7 +307,7 @@ void TrendPageWidget::askWhere(Format format) {
   dialog->selectFile(name + QLatin1Char('.') + QString::fromLatin1(textsOf(format).suffix));
   connect(dialog, &QFileDialog::fileSelected, this,
           [this, format](const QString& path) { save(format, path); });
-  dialog->open();
+  openWithinScreen(*dialog);
 }
 
 void TrendPageWidget::save(Format format, const QString& path) {
