@@ -100,12 +100,15 @@ void LiveModem::end(std::function<void()> ended) {
   _polling.reset();
   _positions.reset();
   _ended = std::move(ended);
-  const auto finish = [this, life = std::weak_ptr(_life)] {
-    if (life.expired()) return;
-    if (const auto call = std::exchange(_ended, nullptr)) call();
-  };
-  if (!restoreRate(finish)) return finish();
-  _setup.queue.after(patienceAtEnd, finish);
+  // The modem may have taken the new rate although its answer is not there yet: then that one restores it.
+  if (!_awaitsRate && !restoreRate([this] { finish(); })) return finish();
+  _setup.queue.after(patienceAtEnd, [this, life = std::weak_ptr(_life)] {
+    if (!life.expired()) finish();
+  });
+}
+
+void LiveModem::finish() {
+  if (const auto call = std::exchange(_ended, nullptr)) call();
 }
 
 // ---- The service and its modems ----
@@ -349,7 +352,11 @@ void LiveModem::takeRateAnswer(const QDBusMessage& answer, std::uint32_t before)
   _awaitsRate = false;
   if (answer.type() == QDBusMessage::ReplyMessage) {
     _rateBefore = before;
-    return updatePolling();  // the viewers may have gone meanwhile
+    if (!_isEnding) return updatePolling();  // the viewers may have gone meanwhile
+  }
+  if (_isEnding) {
+    if (!restoreRate([this] { finish(); })) finish();
+    return;
   }
   _isRateRefused = true;
   tellOnce(isRefusal(answer) ? "ModemManager does not let this user ask for levels; section AS A SERVICE of "

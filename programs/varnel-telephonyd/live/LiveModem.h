@@ -86,6 +86,7 @@ class LiveModem final {
   void updateRate();
   /// Returns whether a call was made, after whose answer the function, which may be empty, is called.
   bool restoreRate(std::function<void()> done);
+  void finish();
   void askForSim();
   void askForBearers();
   std::vector<std::string> bearerPaths() const;

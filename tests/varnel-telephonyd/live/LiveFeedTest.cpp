@@ -19,9 +19,7 @@ constexpr std::uint32_t simFiles = 0xFF0000, cellMonitor = 0xFF0001, packetData 
 
 class LiveFeedTest : public testing::Test {
  protected:
-  void send(std::uint32_t logCode, const std::string& payload) {
-    _feed.send(logCode, Value(payload));
-  }
+  void send(std::uint32_t logCode, const std::string& payload) { _feed.send(logCode, Value(payload)); }
   void sendMany(std::uint32_t logCode, int count) {
     for (int number = 1; number <= count; ++number) {
       _uptime += 1s;

@@ -314,6 +314,16 @@ TEST_F(LiveModemTest, AtTheEndTheModemHasItsOldRate) {
   EXPECT_THAT(_service.calls(), HasSubstr(" Setup 0\n"));
 }
 
+TEST_F(LiveModemTest, AtTheEndARateThatHasNoAnswerYetIsRestoredToo) {
+  startAll({"add", "0", "then", "rate", "0", "slow"});
+  ASSERT_TRUE(runUntil([&] { return _service.calls().find(" Setup 1\n") != std::string::npos; }));
+  std::string callsAtEnd;
+  _live->end([&] { callsAtEnd = _service.calls(); });
+  EXPECT_EQ(callsAtEnd, "");
+  EXPECT_TRUE(runUntil([&] { return !callsAtEnd.empty(); }));
+  EXPECT_THAT(callsAtEnd, HasSubstr(" Setup 0\n"));
+}
+
 TEST_F(LiveModemTest, ARateThatIsRefusedIsToldOnce) {
   startAll({"add", "0", "then", "rate", "0", "refused"});
   EXPECT_TRUE(runUntil([&] { return _told.size() >= 2; }));
