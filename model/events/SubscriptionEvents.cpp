@@ -262,8 +262,12 @@ void SubscriptionEvents::lookAtService(StateWatch& watch, const std::string& tex
     add(kind, pathOf(source.group, source.section), watch.state.before, text);
   };
   if (isIn(lostTexts, text)) {
-    if (!std::exchange(watch.isLost, true)) tell(EventKind::LossOfService);
+    // A phone that was just switched on, or a capture that begins in a search, has lost nothing.
+    if (!std::exchange(watch.hasService, false)) return;
+    watch.isLost = true;
+    tell(EventKind::LossOfService);
   } else if (isIn(servedTexts, text)) {
+    watch.hasService = true;
     if (std::exchange(watch.isLost, false)) tell(EventKind::ReturnOfService);
   }
 }

@@ -44,7 +44,8 @@ class SubscriptionEvents {
     std::size_t source;
     Value section{};
     Entry state, count;
-    bool isLost = false;
+    bool hasService = false;
+    bool isLost = false;  // after it had been there
   };
   struct VersionWatch {
     std::string path;

@@ -179,18 +179,39 @@ TEST_F(DisplayEventsTest, ALossOfServiceIsToldOnceAndSoIsItsEnd) {
               ElementsAre("LTE/Registration: loss of service: Update Needed -> Limited Service"));
 }
 
+TEST_F(DisplayEventsTest, WhereServiceWasNeverShownNothingIsLostAndNothingReturns) {
+  const auto substate = [&](const char* text) {
+    show("1;LTE", "Registration", "EMM Substate", text);
+    return look();
+  };
+  EXPECT_THAT(substate("PLMN Search"), IsEmpty());
+  EXPECT_THAT(substate("Attempting to Attach"), IsEmpty());
+  EXPECT_THAT(substate("No Cell Available"), IsEmpty());
+  EXPECT_THAT(substate("Normal Service"), IsEmpty());
+  EXPECT_THAT(substate("No Cell Available"),
+              ElementsAre("LTE/Registration: loss of service: Normal Service -> No Cell Available"));
+}
+
 TEST_F(DisplayEventsTest, EachRadioLosesServiceInItsOwnWords) {
+  show("2;NR", "Registration", "5GMM Substate", "Normal Service");
+  show("5;Mobility Management", "Process CS", "MM Sub State", "MM_NORMAL_SERVICE");
+  show("5;Mobility Management", "Process PS", "MM Sub State", "GMM_NORMAL_SERVICE");
+  show("5;Mobility Management", "Process PS", "MM Service State", "REG_STATE_IDLE");
+  show("6;PLMN", "Serving PLMN", "Service Type", "CS_PS_SERVICE");
+  EXPECT_THAT(look(), IsEmpty());
   show("2;NR", "Registration", "5GMM Substate", "PLMN Search");
   show("5;Mobility Management", "Process CS", "MM Sub State", "MM_LIMITED_SERVICE");
   show("5;Mobility Management", "Process PS", "MM Sub State", "GMM_NO_CELL_AVAILABLE");
   show("5;Mobility Management", "Process PS", "MM Service State", "REG_STATE_OFFLINE");
   show("6;PLMN", "Serving PLMN", "Service Type", "NO_SERVICE");
-  EXPECT_THAT(look(),
-              ElementsAre("NR/Registration: loss of service:  -> PLMN Search",
-                          "Mobility Management/Process CS: loss of service:  -> MM_LIMITED_SERVICE",
-                          "Mobility Management/Process PS: loss of service:  -> GMM_NO_CELL_AVAILABLE",
-                          "Mobility Management/Process PS: loss of service:  -> REG_STATE_OFFLINE",
-                          "PLMN/Serving PLMN: loss of service:  -> NO_SERVICE"));
+  EXPECT_THAT(look(), ElementsAre("NR/Registration: loss of service: Normal Service -> PLMN Search",
+                                  "Mobility Management/Process CS: loss of service: MM_NORMAL_SERVICE -> "
+                                  "MM_LIMITED_SERVICE",
+                                  "Mobility Management/Process PS: loss of service: GMM_NORMAL_SERVICE -> "
+                                  "GMM_NO_CELL_AVAILABLE",
+                                  "Mobility Management/Process PS: loss of service: REG_STATE_IDLE -> "
+                                  "REG_STATE_OFFLINE",
+                                  "PLMN/Serving PLMN: loss of service: CS_PS_SERVICE -> NO_SERVICE"));
 }
 
 TEST_F(DisplayEventsTest, AConnectionIsToldByItsStateOrByItsNumber) {
@@ -247,11 +268,13 @@ TEST_F(DisplayEventsTest, EachSimCardHasEventsOfItsOwn) {
 }
 
 TEST_F(DisplayEventsTest, AModemReportTellsOfItsRegistrationAndOfNRCells) {
-  show("0;Modem", "Registration", "State", "Searching");
+  show("0;Modem", "Registration", "State", "Home");
   show("0;Modem", "NR Cell", "NR-ARFCN", "632628");
   EXPECT_THAT(look(), ElementsAre("Modem/NR Cell: cell change:  -> NR-ARFCN 632628",
-                                  "Modem/Registration: registration:  -> Searching",
-                                  "Modem/Registration: loss of service:  -> Searching"));
+                                  "Modem/Registration: registration:  -> Home"));
+  show("0;Modem", "Registration", "State", "Searching");
+  EXPECT_THAT(look(), ElementsAre("Modem/Registration: registration: Home -> Searching",
+                                  "Modem/Registration: loss of service: Home -> Searching"));
   show("0;Modem", "Registration", "State", "Home");
   show("0;Modem", "NR Cell", "NR-ARFCN", "627264");
   EXPECT_THAT(look(), ElementsAre("Modem/NR Cell: cell change: NR-ARFCN 632628 -> NR-ARFCN 627264",
