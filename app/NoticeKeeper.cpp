@@ -132,9 +132,10 @@ std::string NoticeKeeper::standingLine() const {
   return "The display stands still since " + since + ", " + cause + "; " + _wayToStartOver + " to start over";
 }
 
-// All radios have a group for each SIM card.
+// All radios have a group for each SIM card. Without a technology there is no display.
 std::string NoticeKeeper::mixtureLine(const LinkReport& report) const {
-  return _model->technology() == technology::allRadios ? std::string() : report.mixture;
+  const std::string& technology = _model->technology();
+  return technology.empty() || technology == technology::allRadios ? std::string() : report.mixture;
 }
 
 void NoticeKeeper::snapshotWasWritten(const FileWriting& writing) {

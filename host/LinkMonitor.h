@@ -37,6 +37,8 @@ class LinkMonitor final : public LinkReports {
   void commandWentUnanswered();
   /// The server takes commands. Forgets what was reported about an earlier link.
   void linkIsOpen();
+  /// Nothing that has arrived is shown any more.
+  void displayIsGone() { _shownSubscriptions.reset(); }
   /// A message of this SIM card's modem has arrived, and the viewer shows it.
   void subscriptionIsShown(std::uint8_t subscription) { _shownSubscriptions.set(subscription); }
   /// Takes the server's report about its stream. Ignores bytes that are no report.

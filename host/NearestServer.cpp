@@ -44,6 +44,7 @@ void NearestServer::moveTo(RuntimeFolder own, std::optional<std::filesystem::pat
   _own = std::move(own);
   _system = std::move(system);
   _hasMoved = true;
+  _monitor.displayIsGone();
 }
 
 void NearestServer::look() {

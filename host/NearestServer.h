@@ -19,7 +19,7 @@ class NearestServer final : public MessagePorts, public TelephonyService {
   NearestServer(RuntimeFolder own, std::optional<std::filesystem::path> system, LinkMonitor& monitor,
                 std::chrono::milliseconds replyTimeout = std::chrono::seconds(1));
 
-  /// Looks into these folders instead, from the next local port on.
+  /// Looks into these folders instead, from the next local port on. The monitor forgets what was shown.
   void moveTo(RuntimeFolder own, std::optional<std::filesystem::path> system);
 
   LocalPortCreation createLocalPort(std::string_view name, LocalPort::MessageHandler handler) override;

@@ -245,6 +245,13 @@ TEST_F(NoticeKeeperTest, AllRadiosKeepSimCardsApartSoTheyAreNoMixture) {
   EXPECT_THAT(keeper.text(), testing::Not(testing::HasSubstr("mixes")));
 }
 
+TEST_F(NoticeKeeperTest, WithoutADisplayNothingIsMixed) {
+  link.report.mixture = "The display mixes SIM 1 and SIM 2";
+  keeper.begin(model);
+  keeper.update();
+  EXPECT_EQ(keeper.text(), "");
+}
+
 TEST_F(NoticeKeeperTest, MessagesThatAreNotShownAreCountedALineForEachReason) {
   start();
   link.report.droppedByServer = 12;

@@ -105,6 +105,14 @@ TEST_F(NearestServerTest, IsInTheOtherFolderAfterAMove) {
   EXPECT_EQ(found(), "own");
 }
 
+TEST_F(NearestServerTest, AMoveEndsWhatTheMonitorTellsOfTheDisplay) {
+  _monitor.subscriptionIsShown(1);
+  _monitor.subscriptionIsShown(2);
+  EXPECT_NE(_monitor.linkReport().mixture, "");
+  _nearest.moveTo(_own, std::nullopt);
+  EXPECT_EQ(_monitor.linkReport().mixture, "");
+}
+
 TEST_F(NearestServerTest, TheEndOfAServerOfOnesOwnIsToldInPlaceOfTheTrouble) {
   EXPECT_EQ(found(), "");
   _monitor.setEndOfOwnServer("The server that plays walk.pcap has ended");
