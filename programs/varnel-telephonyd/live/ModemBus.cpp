@@ -76,6 +76,7 @@ void ModemBus::send(const QDBusMessage& message, Answer answer) {
 void ModemBus::disconnectFromBus() {
   _watcher.reset();
   _isConnected = false;
+  _hasAnswered = false;
   ++_life;
   QDBusConnection::disconnectFromBus(_name);
 }

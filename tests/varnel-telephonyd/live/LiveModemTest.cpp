@@ -388,6 +388,22 @@ TEST_F(LiveModemTest, WithoutABusItWaitsForOne) {
   EXPECT_TRUE(isSo("the system bus cannot be reached, so ModemManager cannot be asked"));
 }
 
+// The event loop, and so what finds the bus, runs only while a test waits for the live modem.
+TEST_F(LiveModemTest, ABusThatIsBackWithTheServiceHasIt) {
+  startAll();
+  ASSERT_TRUE(isSo("Maker M1 is registered in Test Net"));
+  bus().stop();
+  ASSERT_TRUE(isSo("the system bus cannot be reached, so ModemManager cannot be asked"));
+  _service.stop();
+  ASSERT_TRUE(bus().start());
+  _service.start();
+  _service.does({"add", "0"});
+  EXPECT_TRUE(isSo("Maker M1 is registered in Test Net"));
+  EXPECT_THAT(_told, ElementsAre("Maker M1 is registered in Test Net",
+                                 "the system bus cannot be reached, so ModemManager cannot be asked",
+                                 "Maker M1 is registered in Test Net"));
+}
+
 // LiveEndToEndTest makes more, with the real service.
 constexpr int rounds = 20;
 
