@@ -49,8 +49,9 @@ class FaultsEndToEnd : public testing::Test {
 
 struct StartFailure {
   std::string name;
-  std::string fault;  // of the server; no server when it is empty
-  Texts lines;        // what the viewer logs
+  std::string fault;    // of the server; no server when it is empty
+  Texts lines;          // what the viewer logs
+  bool isRace = false;  // the viewer may be faster now and then, and then streams for a moment
 };
 
 class StartFailures : public FaultsEndToEnd, public testing::WithParamInterface<StartFailure> {};
@@ -78,17 +79,19 @@ const StartFailure startFailures[] = {
     {"AnUnknownTechnology", "unknown-technology", {"<3>Got log generated: ", noTechnology}},
     {"AChannelThatEndsBeforeTheStart",
      "drop-after-reply",
-     {"<3> ***** Could not send the START command (got error=-3)\n"}},
+     {"<3> ***** Could not send the START command (got error=-3)\n"},
+     true},
 };
 
 TEST_P(StartFailures, IsLoggedAndTheViewerStreamsWithTheNextServer) {
   auto telephony = GetParam().fault.empty() ? nullptr : server(GetParam().fault);
   const auto varnel = viewer();
   for (const std::string& line : GetParam().lines) EXPECT_TRUE(logs(*varnel, line));
-  EXPECT_EQ(logged(*varnel, streaming), 0u) << varnel->error();
+  if (!GetParam().isRace) EXPECT_EQ(logged(*varnel, streaming), 0u) << varnel->error();
   telephony.reset();
+  const std::size_t former = logged(*varnel, streaming);
   telephony = server();
-  EXPECT_TRUE(logs(*varnel, streaming));
+  EXPECT_TRUE(logs(*varnel, streaming, former + 1));
 }
 
 INSTANTIATE_TEST_SUITE_P(All, StartFailures, testing::ValuesIn(startFailures),
