@@ -111,8 +111,7 @@ void VarnelApp::refresh() {
 void VarnelApp::save() {
   if (!_model) return;
   if (_statusWithoutLink) return _notices.snapshotIsOpen();
-  const auto writing =
-      saveSnapshotWithoutDescription(_host.files, _host.model.generator.clock, _model->getSaveContents());
+  const auto writing = saveSnapshotWithoutDescription(_host.files, usersClock(), _model->getSaveContents());
   if (writing) {
     _notices.snapshotWasWritten(*writing);
   } else {
@@ -277,8 +276,12 @@ void VarnelApp::goTo(const NamePath& path) {
   topPane().selectRow(path.back());
 }
 
+const Clock& VarnelApp::usersClock() const {
+  return _host.usersClock ? *_host.usersClock : _host.model.generator.clock;
+}
+
 std::string VarnelApp::updateMessageForNow() const {
-  const Clock& clock = _host.model.generator.clock;
+  const Clock& clock = usersClock();
   const Time now = clock.now();
   return _dateFormatter->string(now, clock.zoneAt(now));
 }
@@ -304,7 +307,7 @@ void VarnelApp::showSaveView() {
   if (_saveViewController || !_model) return;
   if (_statusWithoutLink) return _notices.snapshotIsOpen();
   const VarnelSaveViewController::Host host{_host.userInterface, _host.model.generator.resources, _host.files,
-                                            _host.model.generator.clock, *this};
+                                            usersClock(), *this};
   setSaveViewController(VarnelSaveViewController::initWithSaveHistory(host, _model->getSaveContents()));
   if (!_saveViewController) return;
   _navController->present(_saveViewController, Animation::Animated);

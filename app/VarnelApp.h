@@ -43,6 +43,9 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
     EventHistory* events = nullptr;
     /// What to tell of rows beside their texts: levels, summaries, ages. Null when nobody shows that.
     const RowAnswers* answers = nullptr;
+    /// The clock of the status and of saved snapshots, when that of the model shows the time of a capture;
+    /// null: the model's.
+    const Clock* usersClock = nullptr;
   };
 
   explicit VarnelApp(const Host& host);
@@ -136,6 +139,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void showNotice();
   void showWindowTitle();
   std::string updateMessageForNow() const;
+  const Clock& usersClock() const;
   /// Writes the preference that is shared with the home-screen application.
   void _setGSMRSSI(bool value);
 

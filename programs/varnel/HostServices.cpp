@@ -36,9 +36,12 @@ void HostServices::connectToUsualServer() {
 }
 
 ModelServices HostServices::model(std::ostream& standardOutput) {
-  return {
-      _portsOfSubscription, _server, _queue, {_resources, _clock, _application, standardOutput, _identities},
-      writeXmlPropertyList, &_link};
+  return {_portsOfSubscription,
+          _server,
+          _queue,
+          {_resources, _playedClock, _application, standardOutput, _identities},
+          writeXmlPropertyList,
+          &_link};
 }
 
 }  // namespace varnel

@@ -14,6 +14,7 @@
 #include "model/VarnelModel.h"
 #include "programs/varnel/DeviceRoot.h"
 #include "programs/varnel/Options.h"
+#include "programs/varnel/PlayedClock.h"
 
 namespace varnel {
 
@@ -33,7 +34,10 @@ class HostServices final {
   LinkMonitor& link() { return _link; }
   MainQueue& queue() { return _queue; }
   DeviceFiles& files() { return _files; }
+  /// The machine's clock.
   const Clock& clock() const { return _clock; }
+  /// The clock of the models. It shows the machine's time until it follows a capture.
+  PlayedClock& playedClock() { return _playedClock; }
   Preferences& preferences() { return _preferences; }
 
  private:
@@ -46,6 +50,7 @@ class HostServices final {
   EventLoopQueue _queue;
   FileResources _resources;
   SystemClock _clock;
+  PlayedClock _playedClock{_clock};
   const DeviceRoot _deviceRoot;
   RootedFiles _files;
   FilePreferences _preferences;

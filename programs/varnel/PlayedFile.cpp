@@ -1,7 +1,10 @@
 #include "programs/varnel/PlayedFile.h"
 
 #include <QCoreApplication>
+#include <filesystem>
 #include <stdexcept>
+
+#include "host/captures/Capture.h"
 
 namespace varnel {
 
@@ -12,6 +15,17 @@ std::vector<std::string> argumentsForReplay(const Options& options, const std::s
   if (technology) arguments.push_back("--technology=" + *technology);
   if (options.subscription) arguments.push_back("--sim=" + std::to_string(*options.subscription));
   return arguments;
+}
+
+std::optional<Time> firstTimeOf(const std::string& capture) {
+  std::error_code failure;
+  if (!std::filesystem::is_regular_file(capture, failure)) return std::nullopt;
+  try {
+    CaptureRecord record;
+    if (openCapture(capture)->next(record)) return record.time;
+  } catch (const CaptureError&) {  // its server tells
+  }
+  return std::nullopt;
 }
 
 PlayedFile::PlayedFile(const Options& options, HostServices& services) : _services(services) {

@@ -17,6 +17,10 @@ namespace varnel {
 std::vector<std::string> argumentsForReplay(const Options& options, const std::string& capture,
                                             const std::optional<std::string>& technology);
 
+/// The time of the first message of a capture, of whatever SIM card. Absent when there is none, and for what
+/// is no regular file: reading would take its messages away.
+std::optional<Time> firstTimeOf(const std::string& capture);
+
 /// The file that the command line names, for a viewer that shows nothing else: the displays of a snapshot, or
 /// a capture that is played by a server of the viewer's own.
 class PlayedFile final {

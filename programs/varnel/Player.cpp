@@ -126,7 +126,8 @@ void Player::open(const std::string& path, const std::optional<std::string>& tec
   start({.kind = Kind::Replay,
          .name = path,
          .technology = technology,
-         .arguments = argumentsForReplay(_parts.options, path, technology)});
+         .arguments = argumentsForReplay(_parts.options, path, technology),
+         .firstTime = firstTimeOf(path)});
 }
 
 void Player::simulate(const std::string& technology) {
@@ -142,6 +143,7 @@ void Player::startAgain() {
          .name = _own.name,
          .technology = _own.technology,
          .arguments = _own.arguments,
+         .firstTime = _own.firstTime,
          .keepsPanes = true});
 }
 
@@ -177,6 +179,7 @@ void Player::serverIsReady(unsigned number) {
   _status.reset();
   _jump.reset();
   _parts.services.connectTo(_own.server->folder());
+  setClock();
   if (_own.keepsPanes) {
     _parts.app.startOverInPlace();
   } else {
@@ -193,6 +196,7 @@ void Player::serverHasEnded(unsigned number, const std::string& why) {
     _parts.services.link().setEndOfOwnServer("The server of " + _own.name + " has ended: " + why +
                                              "; start it again below");
     _jump.reset();
+    _parts.services.playedClock().stand();
     pollAsNeeded();
     return showBar();
   }
@@ -228,6 +232,7 @@ std::optional<Time> Player::playedTime() const {
 
 void Player::leaveServer() {
   _own = {};
+  setClock();
   tellOfCapture();
   _starting = {};
   _displays.clear();
@@ -264,6 +269,9 @@ void Player::startOver() {
   if (_own.kind == Kind::Snapshot) return showDisplay(_display);
   if (_own.whyItEnded) return startAgain();
   _jump.reset();
+  if (_own.kind == Kind::Replay) _jump = 0;  // until the server has the new link alone
+  _jumpIsSent = _jumpIsTaken = false;
+  setClock();
   _wasConnected = false;  // the new link is asked how far the stream is
   _parts.app.startOver();
 }
@@ -296,10 +304,25 @@ void Player::jump(int place) {
   // The stream has gone on since its last status.
   const double margin_ms = _status->isPaused ? 0 : 2000 * _status->speed;
   const bool isAhead = !_jump && wanted > milliseconds(*_status->position) + margin_ms;
+  _timeOfJump = timeAt(wanted);
+  _timeOfJumpIsKnown = false;
   if (!isAhead) return startOverFor(wanted);
   _jump = wanted;
   sendJump();
   showBar();
+}
+
+// The messages before a place come at once, and tell no times. So the clock shows the place's time before
+// they come.
+std::optional<Time> Player::timeAt(int place) const {
+  if (!_status->time || !_status->position) return std::nullopt;
+  return laterBy(std::chrono::milliseconds(place) - *_status->position, *_status->time);
+}
+
+// The guess is wrong where the capture has long pauses, or where its clock was set.
+bool Player::hasArrivedElsewhere() const {
+  if (_timeOfJumpIsKnown || !_timeOfJump || !_status->time) return false;
+  return std::chrono::abs(durationBetween(*_timeOfJump, *_status->time)) > PlayedClock::longestPause * 2;
 }
 
 // A display is made of all messages before it, so an earlier one needs a new model.
@@ -307,13 +330,24 @@ void Player::startOverFor(int place) {
   _jump = place;
   _jumpIsSent = _jumpIsTaken = false;
   _wasConnected = false;
+  setClock();
   _parts.app.startOverInPlace();
   showBar();
+}
+
+// Before a new model gets its first message.
+void Player::setClock() {
+  PlayedClock& clock = _parts.services.playedClock();
+  if (_own.kind != Kind::Replay) return clock.followHost();
+  const auto time = _jump.value_or(0) > 0 ? _timeOfJump : _own.firstTime;
+  if (time) return clock.standAt(*time);
+  if (!_jump) clock.followHost();
 }
 
 void Player::sendJump() {
   _jumpIsSent = true;
   _jumpIsTaken = false;
+  if (_timeOfJump) _parts.services.playedClock().standAt(*_timeOfJump);
   const ControlRequest request{.command = Command::Seek, .place = std::chrono::milliseconds(*_jump)};
   _control->ask(request, [this](const std::optional<ControlReply>& reply) {
     _jumpIsTaken = true;
@@ -336,13 +370,26 @@ void Player::take(const std::optional<ControlReply>& reply) {
   const auto* const status = reply ? std::get_if<ServerStatus>(&*reply) : nullptr;
   if (status) _status = *status;
   if (_jump && _jumpIsTaken && !(status && status->isSeeking)) {
+    if (status && hasArrivedElsewhere()) {
+      // Else what has come would be taken for much older, or newer, than it is.
+      _timeOfJump = status->time;
+      _timeOfJumpIsKnown = true;
+      return startOverFor(*_jump);
+    }
     _jump.reset();
     _parts.services.queue().after(timeToArrive, _whileAlive([this] { _parts.app.refresh(); }));
   } else if (_jump && !_jumpIsSent && status) {
     takeChannel(*status);
   }
+  followPlaying();
   showBar();
   pollAsNeeded();
+}
+
+void Player::followPlaying() {
+  if (_own.kind != Kind::Replay || _jump || !_status || !_status->time || _own.whyItEnded) return;
+  const bool stands = _status->isPaused || _status->isSeeking || isAtEnd();
+  _parts.services.playedClock().follow(*_status->time, stands ? 0 : _status->speed);
 }
 
 // The new model's channel has a stream, and that of the former model has gone.

@@ -70,6 +70,7 @@ class Player final {
     std::string name{};                       // of the file, the technology, or the port
     std::optional<std::string> technology{};  // that the user names for the file
     std::vector<std::string> arguments{};     // of the server
+    std::optional<Time> firstTime{};          // of the capture, if it is known
     bool keepsPanes = false;                  // when it is ready
     unsigned number = 0;                      // of the start
     std::unique_ptr<ChildServer> server{};
@@ -93,11 +94,15 @@ class Player final {
   void dragTo(int place);
   void jump(int place);
   void startOverFor(int place);
+  void setClock();
+  std::optional<Time> timeAt(int place) const;
+  bool hasArrivedElsewhere() const;
   void sendJump();
   void ask(const ControlRequest& request);
   void poll();
   void take(const std::optional<ControlReply>& reply);
   void takeChannel(const ServerStatus& status);
+  void followPlaying();
   void pollAsNeeded();
   std::optional<std::chrono::milliseconds> pollInterval() const;
   bool isAtEnd() const;
@@ -128,9 +133,11 @@ class Player final {
   std::optional<ServerStatus> _status;
   std::unique_ptr<RepeatingTimer> _polling;
   std::chrono::milliseconds _pollingInterval{};
-  std::optional<int> _jump;   // a place that is not reached yet
-  bool _jumpIsSent = false;   // to the server
-  bool _jumpIsTaken = false;  // the server has replied
+  std::optional<int> _jump;         // a place that is not reached yet
+  bool _jumpIsSent = false;         // to the server
+  bool _jumpIsTaken = false;        // the server has replied
+  std::optional<Time> _timeOfJump;  // of the place, if it is known or can be guessed
+  bool _timeOfJumpIsKnown = false;
   bool _wasConnected = false;
   bool _hasLooked = false;  // the application has tried to connect
   WhileAlive _whileAlive;

@@ -357,6 +357,26 @@ TEST_F(VarnelAppTest, TheNoticeTellsWhereASnapshotWasSaved) {
   }
 }
 
+TEST_F(VarnelAppTest, StatusAndSnapshotsHaveTheTimeOfTheUsersClock) {
+  FakeClock users;
+  users.set({1709298309, 0});
+  users.setZone({7200, false});
+  RecordingUserInterface otherInterface;
+  VarnelApp other({.model = {ports, telephony, queue, host.services, writeXmlPropertyList, &link},
+                   .files = files,
+                   .preferences = preferences,
+                   .userInterface = otherInterface,
+                   .usersClock = &users});
+  files.existing = {marker};
+  other.applicationDidFinishLaunching();
+  queue.run();
+  receive(1);
+  EXPECT_EQ(other.updateMessage(), "Updated 2024-03-01 at 15:05:09");
+  other.save();
+  EXPECT_EQ(otherInterface.stack->notice,
+            "Saved: /var/mobile/Library/Logs/CrashReporter/VarnelSnapshot-1709298309.varnel");
+}
+
 TEST_F(VarnelAppTest, TheNoticeTellsWhyASnapshotWasNotSaved) {
   launchWith(1);
   app.save();

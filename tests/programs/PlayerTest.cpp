@@ -51,15 +51,16 @@ class PlayerTest : public testing::Test {
     _app.emplace(VarnelApp::Host{.model = _services->model(),
                                  .files = _services->files(),
                                  .preferences = _services->preferences(),
-                                 .userInterface = _userInterface});
+                                 .userInterface = _userInterface,
+                                 .usersClock = &_services->clock()});
     _player.emplace(Player::Parts{*_services, *_app, _userInterface, _options});
     _userInterface.setWindowObserver([this](WindowWidget& window) { _player->furnish(window); });
   }
   ~PlayerTest() override { _app->applicationWillTerminate(); }
 
   // A capture with a packet per second, the first of them at 2023-11-14 22:13:20. The LTE technology shows
-  // the second, up to 255, as the number of antennas.
-  std::string capture(int seconds, const std::string& name = "walk.pcap") const {
+  // the second, up to 255, as the number of antennas. From second 30 on, the clock may have leapt ahead.
+  std::string capture(int seconds, const std::string& name = "walk.pcap", int leap = 0) const {
     const std::string path = _files.file(name);
     CaptureWriter writer(path, ExistingRecording::Replaced, "kalvi-lte");
     for (int second = 0; second <= seconds; ++second) {
@@ -70,7 +71,7 @@ class PlayerTest : public testing::Test {
       message[4] = 0xB0;
       message[13] = 1;
       message[20] = static_cast<std::uint8_t>(second);
-      writer.write({1'700'000'000 + second, 0}, message);
+      writer.write({1'700'000'000 + second + (second >= 30 ? leap : 0), 0}, message);
     }
     return path;
   }
@@ -225,6 +226,49 @@ TEST_F(PlayerTest, AJumpGoesThereWithTheOpenPanes) {
   Q_EMIT bar()->jumpWanted(0);
   EXPECT_TRUE(runUntil([this] { return secondShown() == 0; })) << secondShown();
   EXPECT_THAT(servers(), SizeIs(1));
+}
+
+TEST_F(PlayerTest, TheClockOfTheModelsIsThatOfTheCapture) {
+  const PlayedClock& clock = _services->playedClock();
+  const auto second = [&clock] { return clock.now().seconds - 1'700'000'000; };
+  launch(capture(200));
+  openRow(section);
+  EXPECT_GE(second(), 0);
+  EXPECT_LE(second(), 200);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return state.length == 200'000; }));
+  QTest::mouseClick(&bar()->playButton(), Qt::LeftButton);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return state.button == PlayBarState::Button::Play; }));
+  Q_EMIT bar()->jumpWanted(150'500);
+  ASSERT_TRUE(runUntil([this] { return secondShown() == 150; }));
+  ASSERT_TRUE(waitForBar([](const auto& state) { return state.place == 150'000; }));
+  EXPECT_EQ(second(), 150);
+  const Time paused = clock.now();
+  QTest::qWait(1);
+  EXPECT_EQ(clock.now(), paused);
+  Q_EMIT bar()->jumpWanted(20'500);
+  ASSERT_TRUE(runUntil([this] { return secondShown() == 20; }));
+  ASSERT_TRUE(waitForBar([](const auto& state) { return state.place == 20'000; }));
+  EXPECT_EQ(second(), 20);
+  EXPECT_NE(pane().toolbar().findChild<QLabel*>()->text().left(12), "Updated 2023");
+  _player->close();
+  EXPECT_FALSE(clock.followsCapture());
+}
+
+TEST_F(PlayerTest, AJumpOverALeapOfTheClockStampsValuesWithTheTimeOfItsPlace) {
+  launch(capture(60, "leap.pcap", 1000));
+  openRow(section);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return !state.clock.isEmpty() && state.length > 0; }));
+  QTest::mouseClick(&bar()->playButton(), Qt::LeftButton);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return state.button == PlayBarState::Button::Play; }));
+  // The leap of 1000 s takes five.
+  Q_EMIT bar()->jumpWanted(54'500);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return state.place == 54'000; })) << barTexts();
+  ASSERT_TRUE(runUntil([this] { return secondShown() == 50; })) << secondShown();
+  const auto* const row = _app->nodeAt({section, "Num Tx Antennas"});
+  ASSERT_NE(row, nullptr);
+  const auto written = static_cast<const VarnelModelLeafNode*>(row)->writtenAt();
+  ASSERT_TRUE(written);
+  EXPECT_NEAR(static_cast<double>(written->seconds), 1'700'001'050, 2);
 }
 
 TEST_F(PlayerTest, TheEndIsShownAndTheCaptureIsPlayedAgain) {
