@@ -99,7 +99,7 @@ ValueHistory::Summary HistoryTrends::summary(const std::string& key, const Stret
 std::vector<TrendSource::Event> HistoryTrends::events(const Stretch& stretch) const {
   std::vector<Event> events;
   for (const auto& found : _parts.events.in(stretch))
-    events.push_back({found.at, found.event.kind, printable(textOf(found.event))});
+    events.push_back({found.at, found.event.kind, nameOf(found.event.kind), printable(textOf(found.event))});
   return events;
 }
 

@@ -30,6 +30,8 @@ class HistoryTrends final : public TrendSource {
     std::function<std::optional<Time>()> playedTime{};
     /// The file that must not be overwritten; empty when there is none.
     std::function<std::string()> input{};
+    /// Nothing is added any more.
+    bool isComplete = false;
   };
 
   explicit HistoryTrends(Parts parts) : _parts(std::move(parts)) {}
@@ -51,6 +53,7 @@ class HistoryTrends final : public TrendSource {
   ValueHistory::Summary summary(const std::string& key, const Stretch& stretch) const override;
   std::vector<Event> events(const Stretch& stretch) const override;
   std::optional<Duration> playingPosition() const override;
+  bool isComplete() const override { return _parts.isComplete; }
   std::string remark() const override;
   std::optional<double> progress() const override;
   void rememberRows(const std::vector<std::string>& keys) override { _remembered = keys; }

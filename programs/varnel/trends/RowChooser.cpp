@@ -43,7 +43,8 @@ RowChooser::RowChooser(Wishes wishes, QWidget* parent)
   _tree->setHeaderHidden(true);
   _tree->setUniformRowHeights(true);
   _tree->setEditTriggers(QAbstractItemView::NoEditTriggers);
-  _tree->setTextElideMode(Qt::ElideRight);
+  // The end of a name tells the records of a list apart.
+  _tree->setTextElideMode(Qt::ElideMiddle);
   _tree->setAccessibleName(tr("Rows with numbers, by unit"));
   QScroller::grabGesture(_tree->viewport(), QScroller::TouchGesture);
   auto* const done = new QPushButton(tr("Show"), this);
@@ -66,26 +67,43 @@ RowChooser::RowChooser(Wishes wishes, QWidget* parent)
 
 void RowChooser::show(const std::vector<TrendRow>& rows, const std::vector<std::string>& chosen) {
   _rows.clear();
+  const auto isChosen = [&](const TrendRow& row) {
+    return std::ranges::find(chosen, row.key) != chosen.end();
+  };
+  QStandardItem* picture = nullptr;
+  if (std::ranges::any_of(rows, isChosen)) picture = addGroup(tr("In the picture"));
   std::map<std::string, QStandardItem*> units;
   for (const TrendRow& row : rows) {
-    QStandardItem*& unit = units[row.unit];
-    if (!unit) {
-      unit = new QStandardItem(row.unit.empty() ? tr("(no unit)") : QString::fromStdString(row.unit));
-      unit->setSelectable(false);
-      unit->setSizeHint(QSize(0, rowHeight));
-      _rows.appendRow(unit);
+    if (isChosen(row)) {
+      addRow(*picture, row, Qt::Checked);
+      continue;
     }
-    QString text = QString::fromStdString(row.name);
-    if (!row.place.empty()) text += QStringLiteral(" — ") + QString::fromStdString(row.place);
-    auto* const item = new QStandardItem(text);
-    item->setToolTip(text.toHtmlEscaped());
-    // The whole row turns the check mark, which is larger than the mark under a finger.
-    item->setCheckState(std::ranges::find(chosen, row.key) == chosen.end() ? Qt::Unchecked : Qt::Checked);
-    item->setData(QString::fromStdString(row.key), keyRole);
-    item->setSizeHint(QSize(0, rowHeight));
-    unit->appendRow(item);
+    QStandardItem*& unit = units[row.unit];
+    if (!unit) unit = addGroup(row.unit.empty() ? tr("(no unit)") : QString::fromStdString(row.unit));
+    addRow(*unit, row, Qt::Unchecked);
   }
   showFound();
+  _tree->scrollToTop();
+}
+
+QStandardItem* RowChooser::addGroup(const QString& title) {
+  auto* const group = new QStandardItem(title);
+  group->setSelectable(false);
+  group->setSizeHint(QSize(0, rowHeight));
+  _rows.appendRow(group);
+  return group;
+}
+
+void RowChooser::addRow(QStandardItem& group, const TrendRow& row, Qt::CheckState state) {
+  QString text = QString::fromStdString(row.name);
+  if (!row.place.empty()) text += QStringLiteral(" — ") + QString::fromStdString(row.place);
+  auto* const item = new QStandardItem(text);
+  item->setToolTip(text.toHtmlEscaped());
+  // The whole row turns the check mark, which is larger than the mark under a finger.
+  item->setCheckState(state);
+  item->setData(QString::fromStdString(row.key), keyRole);
+  item->setSizeHint(QSize(0, rowHeight));
+  group.appendRow(item);
 }
 
 void RowChooser::showFound() {

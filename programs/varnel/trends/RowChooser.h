@@ -14,8 +14,8 @@
 
 namespace varnel {
 
-/// The rows that have a course, grouped by their units, to choose those of a picture. A line of text above
-/// them finds rows by words of their names and places.
+/// The rows that have a course, to choose those of a picture: first those that the picture has, then the
+/// others, grouped by their units. A line of text above them finds rows by words of their names and places.
 class RowChooser final : public QWidget {
   Q_OBJECT
 
@@ -39,6 +39,8 @@ class RowChooser final : public QWidget {
   bool eventFilter(QObject* watched, QEvent* event) override;
 
  private:
+  QStandardItem* addGroup(const QString& title);
+  static void addRow(QStandardItem& group, const TrendRow& row, Qt::CheckState state);
   void turn(const QModelIndex& index);
   void showFound();
 

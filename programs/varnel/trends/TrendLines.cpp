@@ -6,6 +6,8 @@
 #include <algorithm>
 #include <cmath>
 
+#include "programs/varnel/trends/EventLegend.h"
+
 namespace varnel {
 
 namespace {
@@ -13,58 +15,10 @@ namespace {
 constexpr double thinWidth = 1;  // of a value that no packet has renewed
 constexpr double dotRadius = 2.5;
 constexpr int bandOpacity = 70;  // of 255
-constexpr double markSize = 9;
+constexpr double markSize = eventMarkSize;
 constexpr double reachOfMarks = 7;
 constexpr std::size_t mostDashes = 40;  // more of them would hide the lines
 constexpr double boxPadding = 5;
-
-// A shape for each kind, since colors alone do not tell everybody.
-QPainterPath markOf(EventKind kind, QPointF center) {
-  const double r = markSize / 2;
-  QPainterPath path;
-  const auto polygon = [&](std::initializer_list<QPointF> points) {
-    QPolygonF shape;
-    for (const QPointF& point : points) shape << center + point * r;
-    path.addPolygon(shape);
-    path.closeSubpath();
-  };
-  switch (kind) {
-    case EventKind::CellChange:
-      polygon({{-1, -0.8}, {1, -0.8}, {0, 1}});
-      break;
-    case EventKind::Handover:
-      polygon({{0, -1.1}, {1.1, 0}, {0, 1.1}, {-1.1, 0}});
-      break;
-    case EventKind::LossOfService:
-      polygon({{-1, -0.6},
-               {-0.6, -1},
-               {0, -0.4},
-               {0.6, -1},
-               {1, -0.6},
-               {0.4, 0},
-               {1, 0.6},
-               {0.6, 1},
-               {0, 0.4},
-               {-0.6, 1},
-               {-1, 0.6},
-               {-0.4, 0}});
-      break;
-    case EventKind::ReturnOfService:
-      path.addEllipse(center, r, r);
-      break;
-    case EventKind::Registration:
-      path.addRect(QRectF(center - QPointF(r, r) * 0.85, QSizeF(r, r) * 1.7));
-      break;
-    case EventKind::Connection:
-      path.addRect(QRectF(center.x() - 1, center.y() - r, 2, 2 * r));
-      break;
-    case EventKind::UnknownVersion:
-      path.addEllipse(center, r, r);
-      path.addEllipse(center, r * 0.5, r * 0.5);
-      break;
-  }
-  return path;
-}
 
 bool isWeighty(EventKind kind) { return kind != EventKind::Connection && kind != EventKind::UnknownVersion; }
 
@@ -193,7 +147,7 @@ void TrendLines::paintEvents(QPainter& painter) const {
     lastX = x;
     painter.setPen(QPen(_look.ground, 1));
     painter.setBrush(_look.text);
-    painter.drawPath(markOf(event.kind, {x, _area.top() + markSize / 2}));
+    painter.drawPath(eventMark(event.kind, {x, _area.top() + markSize / 2}));
   }
 }
 

@@ -51,6 +51,7 @@ TrendPageWidget::TrendPageWidget(TrendSource& source)
       _content(new QStackedLayout),
       _picture(new QWidget),
       _view(new TrendView(source, this)),
+      _marks(new EventLegendWidget(this)),
       _tableView(new QTableView(this)),
       _chooser(
           new RowChooser({[this](const std::string& key, bool isWanted) { return choose(key, isWanted); },
@@ -127,6 +128,7 @@ TrendPageWidget::TrendPageWidget(TrendSource& source)
   pictureColumn->setContentsMargins(0, 0, 0, 0);
   pictureColumn->setSpacing(0);
   pictureColumn->addWidget(_view, 1);
+  pictureColumn->addWidget(_marks);
   pictureColumn->addWidget(_tableView);
   _content->addWidget(_picture);
   _content->addWidget(_chooser);
@@ -142,7 +144,15 @@ TrendPageWidget::TrendPageWidget(TrendSource& source)
   const auto whole = _source.whole();
   _view->stretch().showLast(whole.end - whole.begin > std::chrono::minutes(2) ? std::chrono::minutes(10)
                                                                               : std::chrono::minutes(2));
+  if (_source.isComplete()) {
+    _view->stretch().showWhole();
+    // A few seconds fill the picture too.
+    if (whole.end - whole.begin < TrendStretch::leastWhole) _view->stretch().show(whole);
+  }
   _view->setObserver([this] { pictureHasChanged(); });
+  for (QWidget* const widget : {static_cast<QWidget*>(_view), _view->viewport(),
+                                static_cast<QWidget*>(_tableView), _tableView->viewport()})
+    widget->installEventFilter(this);
   connect(&_reading, &QTimer::timeout, this, [this] { refresh(); });
   refresh();
 }
@@ -154,6 +164,7 @@ QToolButton* TrendPageWidget::addButton(const QString& text, const QString& tool
   button->setAccessibleDescription(tooltip);
   button->setAutoRaise(true);
   button->setFocusPolicy(Qt::TabFocus);
+  button->installEventFilter(this);
   _buttons->addWidget(button);
   return button;
 }
@@ -221,7 +232,9 @@ void TrendPageWidget::refresh() {
 }
 
 void TrendPageWidget::pictureHasChanged() {
-  _table.show(_view->data(), TrendLook::of(palette(), font()));
+  const TrendLook look = TrendLook::of(palette(), font());
+  _table.show(_view->data(), look);
+  _marks->setLegend(EventLegend(_view->data().events, look));
   const TrendStretch& stretch = _view->stretch();
   for (QAbstractButton* const button : _lengths.buttons()) {
     const auto length = std::chrono::minutes(_lengths.id(button));
@@ -272,6 +285,14 @@ void TrendPageWidget::keyPressEvent(QKeyEvent* event) {
   } else {
     TrendPage::keyPressEvent(event);
   }
+}
+
+// What is told of one wish goes when the user does something else.
+bool TrendPageWidget::eventFilter(QObject* watched, QEvent* event) {
+  const bool isDeed = event->type() == QEvent::KeyPress || event->type() == QEvent::MouseButtonPress ||
+                      event->type() == QEvent::Wheel;
+  if (isDeed && !_message.isEmpty()) tell({});
+  return TrendPage::eventFilter(watched, event);
 }
 
 void TrendPageWidget::resizeEvent(QResizeEvent* event) {

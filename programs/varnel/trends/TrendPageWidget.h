@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "programs/varnel/trends/EventLegend.h"
 #include "programs/varnel/trends/RowChooser.h"
 #include "programs/varnel/trends/TrendPage.h"
 #include "programs/varnel/trends/TrendTable.h"
@@ -36,11 +37,13 @@ class TrendPageWidget final : public TrendPage {
   TrendView& view() { return *_view; }
   RowChooser& chooser() { return *_chooser; }
   QTableView& table() { return *_tableView; }
+  const EventLegendWidget& marks() const { return *_marks; }
   const QLabel& remark() const { return *_remark; }
 
  protected:
   void resizeEvent(QResizeEvent* event) override;
   void keyPressEvent(QKeyEvent* event) override;
+  bool eventFilter(QObject* watched, QEvent* event) override;
 
  private:
   QToolButton* addButton(const QString& text, const QString& tooltip);
@@ -58,7 +61,7 @@ class TrendPageWidget final : public TrendPage {
 
   TrendSource& _source;
   std::vector<std::string> _keys;
-  QString _message;  // of the last wish of the user
+  QString _message;  // of the last wish of the user; gone with the next one
   QButtonGroup _lengths;
   QToolButton* _wholeButton = nullptr;
   QToolButton* _zoomIn = nullptr;
@@ -67,6 +70,7 @@ class TrendPageWidget final : public TrendPage {
   QStackedLayout* _content;
   QWidget* _picture;
   TrendView* _view;
+  EventLegendWidget* _marks;
   TrendTable _table;
   QTableView* _tableView;
   RowChooser* _chooser;

@@ -9,6 +9,7 @@
 #include <cmath>
 
 #include "programs/shared/Legend.h"
+#include "programs/varnel/trends/EventLegend.h"
 #include "programs/varnel/trends/TrendChart.h"
 #include "programs/varnel/trends/TrendScale.h"
 
@@ -64,8 +65,13 @@ class Scene {
     auto* const legend = new Legend(entries, width);
     _scene.addItem(legend);
     legend->setPos(0, titleHeight + chartHeight + 4);
+    const double legendEnd = titleHeight + chartHeight + 4 + legend->height();
+    auto* const marks = new EventLegendItem(EventLegend(_data.events, look), width);
+    _scene.addItem(marks);
+    marks->setPos(0, legendEnd);
+    const double room = marks->boundingRect().height();
     addTitle(picture, font);
-    _size = QSizeF(width, titleHeight + chartHeight + 4 + legend->height()).toSize();
+    _size = QSizeF(width, legendEnd + (room > 0 ? room + 8 : 0)).toSize();
     _scene.setSceneRect(QRectF(QPointF(), QSizeF(_size)));
     _scene.setBackgroundBrush(look.ground);
   }

@@ -54,7 +54,7 @@ std::string numberText(double number, unsigned decimals) {
 
 TrendStatistics statisticsOf(const ValueHistory::Summary& summary) {
   if (summary.count == 0) return {};
-  return {numberText(summary.lowest, summary.decimals), numberText(summary.mean, summary.decimals + 1),
+  return {numberText(summary.lowest, summary.decimals), numberText(summary.mean, summary.decimals),
           numberText(summary.highest, summary.decimals), numberText(summary.last, summary.decimals)};
 }
 

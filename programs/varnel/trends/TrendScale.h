@@ -27,7 +27,7 @@ std::string numberText(double number, unsigned decimals);
 struct TrendStatistics {
   std::string lowest, mean, highest, last;
 };
-/// The mean has one more decimal than the samples.
+/// The mean has as many decimals as the samples.
 TrendStatistics statisticsOf(const ValueHistory::Summary& summary);
 
 /// Such as "10 min", "1 h 30 min", "45 s".

@@ -34,6 +34,7 @@ class TrendSource {
   struct Event {
     Duration at{};
     EventKind kind{};
+    std::string_view kindName{};  ///< such as "handover"; lives as long as the program
     std::string text;
   };
 
@@ -59,6 +60,8 @@ class TrendSource {
   virtual std::vector<Event> events(const Stretch& stretch) const = 0;
   /// Where the file is played at present; absent when none is played.
   virtual std::optional<Duration> playingPosition() const = 0;
+  /// Nothing is added any more, so a picture begins with everything.
+  virtual bool isComplete() const = 0;
 
   /// What users should know of the history, such as what it lacks; empty when there is nothing to tell.
   virtual std::string remark() const = 0;

@@ -20,6 +20,7 @@ using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
+using testing::Not;
 using testing::SizeIs;
 
 // A page as large as a small window, on a history of ten minutes. The level goes up from -100 to -80.
@@ -192,12 +193,23 @@ TEST_F(TrendPageTest, AMarkTellsItsEvent) {
   EXPECT_THAT(view().chart().lines().eventsAtColumn(middle), SizeIs(1));
 }
 
+TEST_F(TrendPageTest, MarksHaveALegendOfTheKindsThatOccur) {
+  addEvent(EventKind::Handover, 310);
+  addEvent(EventKind::LossOfService, 320);
+  open();
+  EXPECT_EQ(page->marks().legend().text(), "handover, loss of service");
+  EXPECT_EQ(page->marks().accessibleName(), "Marks of events: handover, loss of service");
+  EXPECT_TRUE(page->marks().isVisible());
+  QTest::keyClick(page.get(), Qt::Key_1);  // the last two minutes
+  EXPECT_FALSE(page->marks().isVisible());
+}
+
 TEST_F(TrendPageTest, RowsAreChosenFromAListByUnit) {
   open();
   page->chooseRows();
   QTreeView& tree = page->chooser().tree();
   ASSERT_EQ(tree.model()->rowCount(), 2);
-  const QModelIndex unit = tree.model()->index(0, 0);
+  const QModelIndex unit = tree.model()->index(1, 0);
   EXPECT_EQ(unit.data().toString(), "dB");
   EXPECT_EQ(tree.model()->index(0, 0, unit).data().toString(),
             "RSRQ — LTE > Neighbors > Cells, EARFCN 1300, PCI 16");
@@ -208,8 +220,22 @@ TEST_F(TrendPageTest, RowsAreChosenFromAListByUnit) {
   EXPECT_THAT(page->rows(), ElementsAre(level));
 }
 
+TEST_F(TrendPageTest, RowsOfThePictureComeFirstInTheList) {
+  open({quality});
+  page->chooseRows();
+  const QAbstractItemModel& rows = *page->chooser().tree().model();
+  ASSERT_EQ(rows.rowCount(), 2);
+  const QModelIndex group = rows.index(0, 0);
+  EXPECT_EQ(group.data().toString(), "In the picture");
+  ASSERT_EQ(rows.rowCount(group), 1);
+  EXPECT_EQ(rows.index(0, 0, group).data(Qt::CheckStateRole).toInt(), Qt::Checked);
+  EXPECT_EQ(rows.index(0, 0, group).data().toString(), "RSRQ — LTE > Neighbors > Cells, EARFCN 1300, PCI 16");
+  // A small window shows both ends of a long name.
+  EXPECT_EQ(page->chooser().tree().textElideMode(), Qt::ElideMiddle);
+}
+
 TEST_F(TrendPageTest, WordsFindRows) {
-  open();
+  open({quality});
   page->chooseRows();
   page->chooser().words().setText("serv rsrp");
   QTreeView& tree = page->chooser().tree();
@@ -316,6 +342,8 @@ TEST_F(SavedTrend, DrawingHasTheTitleTheUnitAndTheStatistics) {
   EXPECT_THAT(svg, HasSubstr("RSRP, RSRQ — a &lt;capture&gt;"));
   EXPECT_THAT(svg, HasSubstr("dBm"));
   EXPECT_THAT(svg, HasSubstr("RSRP (dBm) — LTE &gt; Serving Cell: lowest -100.0, mean"));
+  EXPECT_THAT(svg, HasSubstr(">handover<"));
+  EXPECT_THAT(svg, Not(HasSubstr("registration")));
 }
 
 TEST_F(SavedTrend, TableHasWhatIsShown) {
@@ -330,6 +358,22 @@ TEST_F(SavedTrend, AFailureIsShown) {
   open();
   page->save(TrendPageWidget::Format::Csv, "/nowhere/at/all.csv");
   EXPECT_THAT(page->remark().text().toStdString(), HasSubstr("was not written"));
+}
+
+TEST_F(SavedTrend, WhatIsToldGoesWithTheNextDeed) {
+  open();
+  const auto fail = [this] { page->save(TrendPageWidget::Format::Csv, "/nowhere/at/all.csv"); };
+  fail();
+  key(Qt::Key_Plus);
+  EXPECT_EQ(page->remark().text(), "");
+  fail();
+  page->refresh();  // that nobody asked for
+  EXPECT_NE(page->remark().text(), "");
+  QTest::mouseClick(view().viewport(), Qt::LeftButton, {}, QPoint(100, 100));
+  EXPECT_EQ(page->remark().text(), "");
+  fail();
+  saved(TrendPageWidget::Format::Csv);
+  EXPECT_THAT(page->remark().text().toStdString(), Not(HasSubstr("was not written")));
 }
 
 }  // namespace

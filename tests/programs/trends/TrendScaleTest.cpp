@@ -55,11 +55,11 @@ TEST(NumberText, HasNoNegativeZero) {
   EXPECT_EQ(numberText(12, 0), "12");
 }
 
-TEST(TrendStatistics, TheMeanHasOneMoreDecimal) {
+TEST(TrendStatistics, TheMeanHasTheDecimalsOfTheValues) {
   const TrendStatistics statistics =
       statisticsOf({.count = 3, .lowest = -97, .mean = -90.333, .highest = -84, .last = -90, .decimals = 1});
   EXPECT_EQ(statistics.lowest, "-97.0");
-  EXPECT_EQ(statistics.mean, "-90.33");
+  EXPECT_EQ(statistics.mean, "-90.3");
   EXPECT_EQ(statistics.highest, "-84.0");
   EXPECT_EQ(statistics.last, "-90.0");
 }
