@@ -93,13 +93,16 @@ void VarnelApp::startOverInPlace() {
   _model->restartMonitorLater();
 }
 
-void VarnelApp::showDisplay(const Value& display, std::string status) {
+void VarnelApp::showDisplay(const Value& display, std::string status, NumberFormats formats) {
   if (!_model) return;
   closeSaveView();
   rememberPanes();
   renewModel();
   _notices.end();  // there is no link to tell about
   _statusWithoutLink = std::move(status);
+  _formatsWithoutLink = std::move(formats);
+  _technologyOfFormats.reset();
+  setFormats(_formatsWithoutLink);
   showNotice();
   _model->showDisplay(display);
 }
@@ -140,6 +143,11 @@ void VarnelApp::updateViewControllerFromModel() {
   _awaitedUpdates.countOne();
 }
 
+void VarnelApp::setFormats(const NumberFormats& formats) {
+  if (_host.history) _host.history->setFormats(formats);
+  if (_host.answers) _facts.setFormats(formats);
+}
+
 void VarnelApp::tellOfDisplay() const {
   for (const auto& observer : _displayObservers) observer();
 }
@@ -165,11 +173,10 @@ void VarnelApp::linkWasLookedAt() {
 void VarnelApp::keepNumbers() {
   if (!_host.history && !_host.answers) return;
   // A display that stands still is that of another generator.
-  if (_technologyOfFormats != _model->technology() && !_model->standingDisplay()) {
+  const bool hasOtherFormats = _technologyOfFormats != _model->technology() && !_model->standingDisplay();
+  if (hasOtherFormats && !_statusWithoutLink) {
     _technologyOfFormats = _model->technology();
-    const NumberFormats formats = _model->numberFormats();
-    if (_host.history) _host.history->setFormats(formats);
-    if (_host.answers) _facts.setFormats(formats);
+    setFormats(_model->numberFormats());
   }
   if (!_host.history) return;
   const Time now = _host.model.generator.clock.now();
@@ -266,6 +273,7 @@ bool VarnelApp::hasRecordsAt(const NamePath& path) const {
 
 std::optional<RecordList> VarnelApp::recordsAt(const NamePath& path) const {
   if (!_tree) return std::nullopt;
+  if (_statusWithoutLink) return recordsOf(*_tree, path, _formatsWithoutLink);
   return recordsOf(*_tree, path, _model ? _model->numberFormats() : NumberFormats());
 }
 

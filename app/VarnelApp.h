@@ -64,9 +64,9 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   /// on with it. Those whose sections are missing there are closed. They are opened again when a later
   /// display has their sections, unless the user has gone elsewhere meanwhile.
   void startOverInPlace();
-  /// Replaces the model with one that has no link and shows this display. The panes stay as with
-  /// `startOverInPlace`. The status is shown until the next start.
-  void showDisplay(const Value& display, std::string status);
+  /// Replaces the model with one that has no link and shows this display, whose numbers have these formats.
+  /// The panes stay as with `startOverInPlace`. The status is shown until the next start.
+  void showDisplay(const Value& display, std::string status, NumberFormats formats = {});
   /// Shows what has arrived since the last refresh.
   void refresh();
   /// Saves a snapshot with an empty description at once, if the device allows it.
@@ -131,6 +131,7 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   void rememberPanes();
   void reopenPanes();
   void keepNumbers();
+  void setFormats(const NumberFormats& formats);
   void showTree(VarnelPaneController::Node root);
   RowFacts::Display display() const;
   void showFactsAgain();
@@ -157,7 +158,9 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
   NamePath _panesToReopen;  // the names of those above the root; empty when there are none
   bool _isReopening = false;
   std::function<void()> _observer;
-  std::string _technologyOfFormats;  // of those that the history has
+  NumberFormats _formatsWithoutLink;  // of a display that was given
+  std::optional<std::string>
+      _technologyOfFormats;  // of those that the history has; none while they were given
   std::unique_ptr<VarnelModel> _model;
   std::shared_ptr<VarnelSaveViewController> _saveViewController;
   std::unique_ptr<NavigationStack> _navController;

@@ -230,6 +230,11 @@ std::optional<Time> Player::playedTime() const {
   return _own.kind == Kind::Replay && _status ? _status->time : std::nullopt;
 }
 
+std::optional<Time> Player::savedTime() const {
+  return _own.kind == Kind::Snapshot && _display < _displays.size() ? std::optional(_displays[_display].time)
+                                                                    : std::nullopt;
+}
+
 void Player::leaveServer() {
   _own = {};
   setClock();
@@ -247,13 +252,15 @@ void Player::showSaved(std::vector<Generation> displays, const std::string& name
   _own.kind = Kind::Snapshot;
   _own.name = name;
   _displays = std::move(displays);
+  _formats = formatsOfSaved(_displays.back().display, _parts.services.model().generator);
+  if (_parts.savedIsShown) _parts.savedIsShown({_own.name, _displays, _formats});
   showDisplay(_displays.size() - 1);
 }
 
 void Player::showDisplay(std::size_t number) {
   if (number >= _displays.size()) return;
   _display = number;
-  _parts.app.showDisplay(_displays[number].display, statusOfSaved(_displays[number].time));
+  _parts.app.showDisplay(_displays[number].display, statusOfSaved(_displays[number].time), _formats);
   showBar();
 }
 

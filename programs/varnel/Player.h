@@ -30,6 +30,12 @@ class Player final {
     std::string path;
     std::optional<std::string> technology;  ///< absent: what the capture names
   };
+  /// A snapshot whose displays are shown.
+  struct Saved {
+    std::string path;
+    std::vector<Generation> displays;  ///< the oldest first
+    NumberFormats formats;             ///< of their numbers
+  };
   /// All objects in it must outlive this one.
   struct Parts {
     HostServices& services;
@@ -38,6 +44,8 @@ class Player final {
     const Options& options;
     /// Another capture is played from now on; without a capture, something else is shown. May be empty.
     std::function<void(const std::optional<Capture>& capture)> captureChanged{};
+    /// The displays of this snapshot are shown from now on. May be empty.
+    std::function<void(const Saved& saved)> savedIsShown{};
   };
 
   explicit Player(const Parts& parts);
@@ -59,6 +67,8 @@ class Player final {
   void close();
   /// How far the capture is, by its clock; absent when nobody knows.
   std::optional<Time> playedTime() const;
+  /// The time of the snapshot's display that is shown; absent when none is.
+  std::optional<Time> savedTime() const;
   /// The user wants an empty display.
   void startOver();
 
@@ -127,6 +137,7 @@ class Player final {
   unsigned _starts = 0;
   Own _own, _starting;                // shown; to be shown when it is ready
   std::vector<Generation> _displays;  // of a snapshot
+  NumberFormats _formats;             // of their numbers
   std::size_t _display = 0;
 
   std::unique_ptr<ControlClient> _control;

@@ -151,7 +151,8 @@ class TerminalViewer final {
   // The last display of the snapshot.
   void showSaved() {
     const Generation& saved = _file.displays().back();
-    _app.showDisplay(saved.display, statusOfSaved(saved.time));
+    _app.showDisplay(saved.display, statusOfSaved(saved.time),
+                     formatsOfSaved(saved.display, _services.model().generator));
   }
 
   void take(int signal) {

@@ -38,6 +38,8 @@ void Trends::showAlso(const NamePath& path) { open(path, Picture::WithFormerRows
 
 void Trends::open(const NamePath& path, Picture picture) {
   if (!_window) return;
+  const std::string obstacle = _saved ? _saved->obstacle() : std::string();
+  if (!obstacle.empty()) return _host.tellFailure(obstacle);
   std::unique_ptr<TrendPage> page;
   const auto former = picture == Picture::WithFormerRows ? source().remembered() : std::vector<std::string>();
   try {
@@ -69,18 +71,25 @@ void Trends::refresh() {
 }
 
 HistoryTrends& Trends::source() {
+  if (_saved) return _saved->trends();
   const bool isThere = _capture && (_capture->isReading() || !_capture->isEmpty());
   return isThere ? _capture->trends() : _host.live;
 }
 
 void Trends::openCapture(CaptureHistory::Wish wish) {
-  leavePage();
+  closeFile();
   _capture = std::make_unique<CaptureHistory>(std::move(wish));
 }
 
-void Trends::closeCapture() {
+void Trends::openSaved(SavedHistory::Wish wish) {
+  closeFile();
+  _saved = std::make_unique<SavedHistory>(std::move(wish));
+}
+
+void Trends::closeFile() {
   leavePage();
   _capture.reset();
+  _saved.reset();
 }
 
 void Trends::leavePage() {

@@ -8,6 +8,7 @@
 #include "app/TreeSearch.h"
 #include "programs/varnel/CaptureHistory.h"
 #include "programs/varnel/HistoryTrends.h"
+#include "programs/varnel/SavedHistory.h"
 #include "programs/varnel/trends/TrendPage.h"
 #include "widgets/WindowWidget.h"
 
@@ -39,8 +40,10 @@ class Trends final {
   /// Shows the courses of this capture from now on, in place of those of the display. If it turns out to be
   /// no capture, those of the display are shown.
   void openCapture(CaptureHistory::Wish wish);
+  /// Shows the courses over these displays from now on.
+  void openSaved(SavedHistory::Wish wish);
   /// Shows the courses of the display again.
-  void closeCapture();
+  void closeFile();
 
   /// Null while no page with courses is open.
   TrendPage* page() const { return _page && _window && _window->page() == _page ? _page.data() : nullptr; }
@@ -54,6 +57,7 @@ class Trends final {
 
   Host _host;
   std::unique_ptr<CaptureHistory> _capture;
+  std::unique_ptr<SavedHistory> _saved;
   QPointer<WindowWidget> _window;
   QPointer<TrendPage> _page;
 };

@@ -49,7 +49,8 @@ class WindowViewer final {
               .usersClock = &_services.clock()}),
         _rowCommands(_app, _answers),
         _player({_services, _app, _userInterface, options,
-                 [this, &options](const auto& capture) { showCourses(capture, options); }}),
+                 [this, &options](const auto& capture) { showCourses(capture, options); },
+                 [this](const auto& saved) { showCourses(saved); }}),
         _watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2}, [this](int signal) { take(signal); }) {
     _userInterface.setRecordSource({[this](const NamePath& list) { return _app.hasRecordsAt(list); },
                                     [this](const NamePath& list) { return _app.recordsAt(list); }});
@@ -91,11 +92,20 @@ class WindowViewer final {
 
   // The courses are those of the capture that is played, if there is one.
   void showCourses(const std::optional<Player::Capture>& capture, const Options& options) {
-    if (!capture) return _trends.closeCapture();
+    if (!capture) return _trends.closeFile();
     _trends.openCapture({.path = capture->path,
                          .technology = capture->technology.value_or(""),
                          .subscription = options.subscription,
                          .playedTime = [this] { return _player.playedTime(); }});
+  }
+
+  // The courses are those over the displays of the snapshot.
+  void showCourses(const Player::Saved& saved) {
+    _trends.openSaved({.path = saved.path,
+                       .displays = saved.displays,
+                       .formats = saved.formats,
+                       .clock = &_services.clock(),
+                       .shownTime = [this] { return _player.savedTime(); }});
   }
 
   // The key of the row's number in the history.

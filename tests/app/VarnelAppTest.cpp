@@ -681,6 +681,19 @@ TEST_F(VarnelAppTest, ADisplayThatIsGivenIsShownWithoutALink) {
   EXPECT_EQ(telephony.attempts, 2u);
 }
 
+TEST_F(VarnelAppTest, ADisplayThatIsGivenHasItsOwnFormats) {
+  launchWith(1);
+  NumberFormats formats;
+  formats.add("Cells", "RSRP", integer("about %d dBm"));
+  const auto number = [&] { return app.recordsAt({"Cells"}).value().records.at(0).cells.at(0).number; };
+  const Value display =
+      dictionaryOf({{"Cells", Value::ofArray({dictionaryOf({{"RSRP", "about -93 dBm"}})})}});
+  app.showDisplay(display, "Saved yesterday", formats);
+  EXPECT_EQ(number(), -93.0);
+  app.showDisplay(display, "Saved yesterday");
+  EXPECT_EQ(number(), std::nullopt);
+}
+
 TEST_F(VarnelAppTest, ADisplayThatIsGivenIsNotSavedAgain) {
   files.existing = {marker};
   launch();

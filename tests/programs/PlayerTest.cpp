@@ -53,7 +53,10 @@ class PlayerTest : public testing::Test {
                                  .preferences = _services->preferences(),
                                  .userInterface = _userInterface,
                                  .usersClock = &_services->clock()});
-    _player.emplace(Player::Parts{*_services, *_app, _userInterface, _options});
+    _player.emplace(
+        Player::Parts{*_services, *_app, _userInterface, _options, {}, [this](const Player::Saved& saved) {
+                        _saved.push_back(saved);
+                      }});
     _userInterface.setWindowObserver([this](WindowWidget& window) { _player->furnish(window); });
   }
   ~PlayerTest() override { _app->applicationWillTerminate(); }
@@ -157,6 +160,7 @@ class PlayerTest : public testing::Test {
   WidgetUserInterface _userInterface{{.startOver = [this] { _player->startOver(); }}};
   std::optional<HostServices> _services;
   std::optional<VarnelApp> _app;
+  std::vector<Player::Saved> _saved;
   std::optional<Player> _player;
 };
 
@@ -393,6 +397,18 @@ TEST_F(PlayerTest, ASnapshotIsWalkedThroughWithoutAServer) {
   EXPECT_THAT(servers(), IsEmpty());
   QTest::keyClick(&window(), Qt::Key_R, Qt::ControlModifier);
   EXPECT_TRUE(runUntil([this] { return hasRow("RSRP: -90 dBm"); }));
+}
+
+TEST_F(PlayerTest, ASnapshotIsToldWithAllOfItsDisplaysAndTheTimeOfTheOneThatIsShown) {
+  launch(snapshot({"-90 dBm", "-91 dBm"}));
+  ASSERT_EQ(_saved.size(), 1U);
+  EXPECT_THAT(_saved[0].path, testing::EndsWith("saved.varnel"));
+  EXPECT_THAT(_saved[0].displays, SizeIs(2));
+  EXPECT_EQ(_player->savedTime(), (Time{1'700'000'001, 0}));
+  QTest::keyClick(&bar()->slider(), Qt::Key_Left);
+  EXPECT_EQ(_player->savedTime(), (Time{1'700'000'000, 0}));
+  _player->close();
+  EXPECT_EQ(_player->savedTime(), std::nullopt);
 }
 
 TEST_F(PlayerTest, ASnapshotWithoutADisplayIsTold) {

@@ -6,6 +6,7 @@
 #include <QTreeView>
 
 #include "tests/programs/trends/TrendHarness.h"
+#include "tests/support/DictionaryOf.h"
 #include "widgets/WindowWidget.h"
 
 namespace varnel {
@@ -73,9 +74,25 @@ TEST_F(TrendsTest, AnOpenedFileTakesThePlaceOfTheDisplay) {
   trends.show({"LTE", "Serving Cell", "RSRP"});
   trends.openCapture({.path = "/nowhere/capture", .program = VARNEL_NUMBERS_PROGRAM});
   EXPECT_FALSE(trends.page());
-  trends.closeCapture();
+  trends.closeFile();
   trends.show({"LTE", "Serving Cell", "RSRP"});
   EXPECT_THAT(trends.page()->rows(), ElementsAre(level));
+}
+
+TEST_F(TrendsTest, TheDisplaysOfASnapshotTakeThePlaceOfTheDisplay) {
+  const auto saved = [](const char* text, std::int64_t second) {
+    return Generation{.time = {start + second, 0},
+                      .display = dictionaryOf({{"LTE", dictionaryOf({{"Cells", text}})}})};
+  };
+  trends.openSaved({.path = "walk.varnel", .displays = {saved("3", 0), saved("4", 5)}});
+  trends.show({"LTE", "Cells"});
+  ASSERT_TRUE(trends.page());
+  EXPECT_THAT(trends.page()->rows(), ElementsAre("/LTE/Cells"));
+  trends.openSaved({.path = "walk.varnel", .displays = {saved("3", 0)}});
+  EXPECT_FALSE(trends.page());
+  trends.show({"LTE", "Cells"});
+  EXPECT_FALSE(trends.page());
+  EXPECT_THAT(failure, testing::HasSubstr("walk.varnel has one display only"));
 }
 
 }  // namespace
