@@ -1,13 +1,16 @@
 #include "programs/varnel/trends/RowChooser.h"
 
+#include <QApplication>
 #include <QHBoxLayout>
 #include <QKeyEvent>
 #include <QPushButton>
 #include <QRegularExpression>
 #include <QScroller>
+#include <QTouchEvent>
 #include <QVBoxLayout>
 #include <algorithm>
 #include <map>
+#include <utility>
 
 namespace varnel {
 
@@ -46,7 +49,8 @@ RowChooser::RowChooser(Wishes wishes, QWidget* parent)
   // The end of a name tells the records of a list apart.
   _tree->setTextElideMode(Qt::ElideMiddle);
   _tree->setAccessibleName(tr("Rows with numbers, by unit"));
-  QScroller::grabGesture(_tree->viewport(), QScroller::TouchGesture);
+  _tree->viewport()->setAttribute(Qt::WA_AcceptTouchEvents);
+  _tree->viewport()->installEventFilter(this);
   auto* const done = new QPushButton(tr("Show"), this);
   auto* const top = new QHBoxLayout;
   top->addWidget(_words);
@@ -126,8 +130,44 @@ void RowChooser::keyPressEvent(QKeyEvent* event) {
   QWidget::keyPressEvent(event);
 }
 
+// A finger moves the list, and a tap chooses a row. The scroller gets the touches directly, since the toolkit
+// would set up a gesture recognizer for each list and never free it.
+void RowChooser::takeTouch(QTouchEvent& event) {
+  event.accept();  // so that the toolkit makes no mouse event from it
+  QScroller& scroller = *QScroller::scroller(_tree->viewport());
+  if (event.type() == QEvent::TouchCancel || event.points().isEmpty()) {
+    _tapBegan.reset();
+    scroller.stop();
+    return;
+  }
+  const QPointF position = event.points().front().position();
+  const auto time_ms = static_cast<qint64>(event.timestamp());
+  if (event.type() == QEvent::TouchBegin) {
+    const bool stopsMovement = scroller.state() == QScroller::Scrolling;
+    _tapBegan = stopsMovement ? std::nullopt : std::optional(position);
+    scroller.handleInput(QScroller::InputPress, position, time_ms);
+    return;
+  }
+  if (_tapBegan && (position - *_tapBegan).manhattanLength() >= QApplication::startDragDistance())
+    _tapBegan.reset();
+  const bool isEnd = event.type() == QEvent::TouchEnd;
+  scroller.handleInput(isEnd ? QScroller::InputRelease : QScroller::InputMove, position, time_ms);
+  if (!isEnd || !std::exchange(_tapBegan, std::nullopt)) return;
+  const QModelIndex index = _tree->indexAt(position.toPoint());
+  if (index.parent().isValid())
+    turn(index);
+  else
+    _tree->setExpanded(index, !_tree->isExpanded(index));
+}
+
 // Down goes from the words to the rows, where Space and Return choose.
 bool RowChooser::eventFilter(QObject* watched, QEvent* event) {
+  const bool isTouch = event->type() == QEvent::TouchBegin || event->type() == QEvent::TouchUpdate ||
+                       event->type() == QEvent::TouchEnd || event->type() == QEvent::TouchCancel;
+  if (isTouch && watched == _tree->viewport()) {
+    takeTouch(static_cast<QTouchEvent&>(*event));
+    return true;
+  }
   if (event->type() != QEvent::KeyPress) return QWidget::eventFilter(watched, event);
   const int key = static_cast<QKeyEvent*>(event)->key();
   if (watched == _words && key == Qt::Key_Down) {

@@ -2,15 +2,19 @@
 
 #include <QLabel>
 #include <QLineEdit>
+#include <QPointF>
 #include <QSortFilterProxyModel>
 #include <QStandardItemModel>
 #include <QTreeView>
 #include <QWidget>
 #include <functional>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "programs/varnel/trends/TrendSource.h"
+
+class QTouchEvent;
 
 namespace varnel {
 
@@ -42,6 +46,7 @@ class RowChooser final : public QWidget {
   QStandardItem* addGroup(const QString& title);
   static void addRow(QStandardItem& group, const TrendRow& row, Qt::CheckState state);
   void turn(const QModelIndex& index);
+  void takeTouch(QTouchEvent& event);
   void showFound();
 
   Wishes _wishes;
@@ -50,6 +55,7 @@ class RowChooser final : public QWidget {
   QLineEdit* _words;
   QTreeView* _tree;
   QLabel* _nothing;
+  std::optional<QPointF> _tapBegan;  // set while the touch may still become a tap
 };
 
 }  // namespace varnel

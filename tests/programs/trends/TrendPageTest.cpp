@@ -2,6 +2,8 @@
 
 #include <QImage>
 #include <QMenu>
+#include <QPointingDevice>
+#include <QScrollBar>
 #include <QSignalSpy>
 #include <QTest>
 #include <QToolTip>
@@ -11,6 +13,7 @@
 #include "programs/varnel/trends/TrendPageWidget.h"
 #include "tests/programs/trends/TrendHarness.h"
 #include "tests/support/Process.h"
+#include "tests/support/TestWidgets.h"
 #include "widgets/Colors.h"
 
 namespace varnel {
@@ -39,7 +42,7 @@ class TrendPageTest : public TrendHarness {
     for (const std::string& key : keys) page->addRow(key);
     page->resize(size);
     page->show();
-    EXPECT_TRUE(QTest::qWaitForWindowExposed(page.get()));
+    EXPECT_TRUE(QTest::qWaitForWindowExposed(page.get(), patience_ms));
     page->refresh();
     return *page;
   }
@@ -218,6 +221,42 @@ TEST_F(TrendPageTest, RowsAreChosenFromAListByUnit) {
   EXPECT_THAT(page->rows(), ElementsAre(level, quality));
   QTest::keyClick(&tree, Qt::Key_Space);
   EXPECT_THAT(page->rows(), ElementsAre(level));
+}
+
+TEST_F(TrendPageTest, ATapChoosesARowOfTheList) {
+  open();
+  page->chooseRows();
+  QTreeView& tree = page->chooser().tree();
+  const std::unique_ptr<QPointingDevice> finger(QTest::createTouchDevice());
+  const auto tap = [&](const QModelIndex& index) {
+    const QPoint place = tree.visualRect(index).center();
+    QTest::touchEvent(&tree, finger.get()).press(0, place, tree.viewport());
+    QTest::touchEvent(&tree, finger.get()).release(0, place, tree.viewport());
+  };
+  const QModelIndex unit = tree.model()->index(1, 0);
+  tap(tree.model()->index(0, 0, unit));
+  EXPECT_THAT(page->rows(), ElementsAre(level, quality));
+  tap(unit);
+  EXPECT_FALSE(tree.isExpanded(unit));
+  EXPECT_THAT(page->rows(), ElementsAre(level, quality));
+}
+
+TEST_F(TrendPageTest, AFingerMovesTheListOfRows) {
+  std::vector<ValueHistory::Reading> readings;
+  std::vector<std::string> keys;
+  for (int i = 0; i < 60; ++i) keys.push_back("/A/Row " + std::to_string(i));
+  for (const std::string& key : keys) readings.push_back(reading(key, "", "1"));
+  numbers.add(readings, {start + 602, 0});
+  open();
+  page->chooseRows();
+  QTreeView& tree = page->chooser().tree();
+  const std::unique_ptr<QPointingDevice> finger(QTest::createTouchDevice());
+  QTest::touchEvent(&tree, finger.get()).press(0, QPoint(100, 300), tree.viewport());
+  for (int y = 290; y >= 100; y -= 10)
+    QTest::touchEvent(&tree, finger.get()).move(0, QPoint(100, y), tree.viewport());
+  QTest::touchEvent(&tree, finger.get()).release(0, QPoint(100, 100), tree.viewport());
+  EXPECT_GT(tree.verticalScrollBar()->value(), 0);
+  EXPECT_THAT(page->rows(), ElementsAre(level)) << "it was no tap";
 }
 
 TEST_F(TrendPageTest, RowsOfThePictureComeFirstInTheList) {

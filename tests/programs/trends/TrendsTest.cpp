@@ -7,6 +7,7 @@
 
 #include "tests/programs/trends/TrendHarness.h"
 #include "tests/support/DictionaryOf.h"
+#include "tests/support/TestWidgets.h"
 #include "widgets/WindowWidget.h"
 
 namespace varnel {
@@ -22,7 +23,7 @@ class TrendsTest : public TrendHarness {
     for (int i = 0; i < 5; ++i) show(2 * i, "-85", "-9");
     trends.furnish(window);
     window.show();
-    EXPECT_TRUE(QTest::qWaitForWindowExposed(&window));
+    EXPECT_TRUE(QTest::qWaitForWindowExposed(&window, patience_ms));
   }
 
   WindowWidget window{{0, 0, 700, 500}, {}};
