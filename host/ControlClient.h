@@ -30,13 +30,19 @@ class ControlClient final {
   bool isWaiting() const { return !_waiting.empty(); }
 
  private:
+  struct Waiting {
+    Reply take;
+    bool isSent;  // false: no server was there
+  };
+
   bool connect();
   void takeReplies();
+  void giveUpUnsent();
   void giveUp();
 
   const RuntimeFolder _folder;
   std::unique_ptr<SocketConnection> _connection;
-  std::deque<Reply> _waiting;
+  std::deque<Waiting> _waiting;
   QObject _context;  // of calls that the event loop is to make
 };
 

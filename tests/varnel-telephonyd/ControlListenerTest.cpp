@@ -238,5 +238,20 @@ TEST_F(ControlListenerTest, ARequestToAServerThatIsNotThereOrHasGoneGetsNoReply)
   EXPECT_TRUE(runUntil([&] { return withReply == 2; }));
 }
 
+TEST_F(ControlListenerTest, ARequestThatFindsTheServerGetsItsOwnReplyAfterOneThatDidNot) {
+  ControlClient client{RuntimeFolder(_folder.path())};
+  std::string replies;
+  const auto note = [&replies](const std::string& name) {
+    return [&replies, name](const std::optional<ControlReply>& reply) {
+      replies += name + (reply ? " has a reply, " : " has none, ");
+    };
+  };
+  client.ask({}, note("first"));
+  const auto open = listener();
+  client.ask({}, note("second"));
+  EXPECT_TRUE(runUntil([&] { return !client.isWaiting(); }));
+  EXPECT_EQ(replies, "first has none, second has a reply, ");
+}
+
 }  // namespace
 }  // namespace varnel
