@@ -150,7 +150,11 @@ CellDimming RowFacts::dimmingOf(const Row& row) {
 
 bool RowFacts::isOld(const Time& writtenAt) {
   const Time old{writtenAt.seconds + oldAge.count(), writtenAt.nanoseconds};
-  if (_sources.clock.now() >= old) return true;
+  const Time now = _sources.clock.now();
+  if (now >= old) return true;
+  // The clock was set back since then, so nobody knows how long ago that was. A small step makes no value
+  // old.
+  if (now <= Time{writtenAt.seconds - oldAge.count(), writtenAt.nanoseconds}) return true;
   if (!_nextAging || old < *_nextAging) _nextAging = old;
   return false;
 }

@@ -128,6 +128,17 @@ TEST_F(RowFactsTest, AValueOfAMinuteIsDimmed) {
   EXPECT_EQ(of({"Cell"}).dimming, CellDimming::None) << "a section shows no value";
 }
 
+TEST_F(RowFactsTest, AValueOfBeforeTheClockWasSetFarBackIsDimmedUntilItComesAgain) {
+  follow("-84.0 dBm");
+  host.clock.set({start - 3600, 0});
+  EXPECT_EQ(of({"Cell", "RSRP"}).dimming, CellDimming::Value);
+  host.clock.set({start - 1, 0});
+  EXPECT_EQ(of({"Cell", "RSRP"}).dimming, CellDimming::None) << "a small step";
+  host.clock.set({start - 3600, 0});
+  follow("-85.0 dBm", start - 3600);
+  EXPECT_EQ(of({"Cell", "RSRP"}).dimming, CellDimming::None);
+}
+
 TEST_F(RowFactsTest, OfADisplayThatStandsStillEverythingIsDimmed) {
   follow("-84.0 dBm", start, Display::Standing);
   EXPECT_EQ(of({"Cell", "RSRP"}).dimming, CellDimming::All);
