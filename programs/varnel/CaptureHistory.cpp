@@ -14,6 +14,8 @@ namespace varnel {
 namespace {
 
 constexpr std::size_t longestReason = 500;
+// The last line says why.
+constexpr qsizetype mostBytesOfErrors = 8192;
 
 QString argument(const std::string& text) { return QFile::decodeName(QByteArray::fromStdString(text)); }
 
@@ -21,7 +23,12 @@ QString argument(const std::string& text) { return QFile::decodeName(QByteArray:
 std::string reasonIn(const QByteArray& errors) {
   const QByteArray last = errors.trimmed().split('\n').last();
   const qsizetype colon = last.indexOf(": ");
-  return printable(last.mid(colon < 0 ? 0 : colon + 2).toStdString()).substr(0, longestReason);
+  std::string reason = printable(last.mid(colon < 0 ? 0 : colon + 2).toStdString());
+  if (reason.size() <= longestReason) return reason;
+  std::size_t size = longestReason;
+  // A character of UTF-8 stays whole.
+  while (size > 0 && (reason[size] & 0xC0) == 0x80) --size;
+  return reason.substr(0, size);
 }
 
 }  // namespace
@@ -42,6 +49,7 @@ CaptureHistory::CaptureHistory(Wish wish)
                .progress = [this](double share) { _progress = share; },
                .end = [this](const std::string& why) { end(why); }}) {
   QObject::connect(&_process, &QProcess::readyReadStandardOutput, &_process, [this] { takeBytes(); });
+  QObject::connect(&_process, &QProcess::readyReadStandardError, &_process, [this] { takeErrors(); });
   QObject::connect(&_process, &QProcess::finished, &_process, [this] { processHasEnded(); });
   QObject::connect(&_process, &QProcess::errorOccurred, &_process, [this](QProcess::ProcessError error) {
     if (error == QProcess::FailedToStart) end("the program that reads it cannot be started; install it anew");
@@ -71,6 +79,11 @@ void CaptureHistory::takeBytes() {
   _process.kill();
 }
 
+void CaptureHistory::takeErrors() {
+  _errors += _process.readAllStandardError();
+  _errors = _errors.right(mostBytesOfErrors);
+}
+
 void CaptureHistory::takeGeneration(Time time, std::span<const ValueHistory::Reading> readings) {
   _numbers.add(readings, time);
   _isEmpty = false;
@@ -88,7 +101,8 @@ void CaptureHistory::takeEvent(DisplayEvent event) {
 void CaptureHistory::processHasEnded() {
   takeBytes();
   if (_state == State::Done) return;
-  const std::string reason = reasonIn(_process.readAllStandardError());
+  takeErrors();
+  const std::string reason = reasonIn(_errors);
   end(reason.empty() ? "the program that reads it has ended" : reason);
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QByteArray>
 #include <QProcess>
 #include <functional>
 #include <optional>
@@ -49,6 +50,7 @@ class CaptureHistory final {
   enum class State { Reading, Done };
 
   void takeBytes();
+  void takeErrors();
   void takeGeneration(Time time, std::span<const ValueHistory::Reading> readings);
   void takeEvent(DisplayEvent event);
   void processHasEnded();
@@ -63,8 +65,9 @@ class CaptureHistory final {
   bool _isDated = true;
   bool _isEmpty = true;
   double _progress = 0;
-  std::string _why;   // the capture was not read to its end; empty when it was
-  QProcess _process;  // last: its signals use the others
+  QByteArray _errors;  // the last ones that the process has written
+  std::string _why;    // the capture was not read to its end; empty when it was
+  QProcess _process;   // last: its signals use the others
 };
 
 }  // namespace varnel

@@ -94,6 +94,18 @@ TEST_F(CaptureHistoryTest, AMissingProgramIsToldInASentence) {
   EXPECT_THAT(history->remark(), HasSubstr("cannot be started"));
 }
 
+TEST_F(CaptureHistoryTest, OfManyErrorsTheLastOneIsToldInWholeCharacters) {
+  const std::string program = folder.file("program");
+  std::ofstream(program) << "#!/bin/sh\nyes 'program: an error' | head -n 100000 >&2\n"
+                            "printf 'program: x%s\\n' $(yes é | head -n 400 | tr -d '\\n') >&2\nexit 1\n";
+  std::filesystem::permissions(program, std::filesystem::perms::owner_all);
+  history.emplace(CaptureHistory::Wish{.path = path, .program = program});
+  EXPECT_TRUE(runUntil([this] { return !history->isReading(); }));
+  std::string reason = "x";
+  for (int i = 0; i < 249; ++i) reason += "é";
+  EXPECT_EQ(history->remark(), "The trends end where the file cannot be read any further: " + reason);
+}
+
 TEST_F(CaptureHistoryTest, ClosingEndsTheProgramAtOnce) {
   simulate(600s);
   history.emplace(CaptureHistory::Wish{.path = path, .program = VARNEL_NUMBERS_PROGRAM});
