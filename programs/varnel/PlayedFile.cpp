@@ -4,6 +4,7 @@
 #include <filesystem>
 #include <stdexcept>
 
+#include "host/Printable.h"
 #include "host/captures/Capture.h"
 
 namespace varnel {
@@ -54,8 +55,8 @@ void PlayedFile::play(const Options& options) {
 
 void PlayedFile::serverHasEnded(const std::string& file, const std::string& why) {
   if (_server->isReady())
-    return _services.link().setEndOfOwnServer("The server that plays " + file + " has ended: " + why +
-                                              "; start varnel again to see the file again");
+    return _services.link().setEndOfOwnServer("The server that plays " + printable(file) + " has ended: " +
+                                              printable(why) + "; start varnel again to see the file again");
   _trouble = why;
   _start.quit();
 }

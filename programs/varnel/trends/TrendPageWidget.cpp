@@ -14,6 +14,7 @@
 #include <algorithm>
 #include <set>
 
+#include "app/PrintableText.h"
 #include "programs/shared/FileDialogs.h"
 #include "programs/varnel/trends/TrendPicture.h"
 
@@ -350,7 +351,7 @@ void TrendPageWidget::save(Format format, const QString& path) {
       break;
   }
   const std::string error = _source.save(QFile::encodeName(path).toStdString(), bytes);
-  tell(error.empty() ? tr("Saved as %1.").arg(path) : QString::fromStdString(error));
+  tell(QString::fromStdString(error.empty() ? "Saved as " + printableText(path.toStdString()) + "." : error));
 }
 
 void TrendPageWidget::copyPicture() {

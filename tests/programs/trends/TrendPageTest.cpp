@@ -393,6 +393,12 @@ TEST_F(SavedTrend, TableHasWhatIsShown) {
   EXPECT_EQ(std::ranges::count(csv, '\n'), 62);
 }
 
+TEST_F(SavedTrend, AControlCharacterInTheNameOfTheFileIsShownAsAnEscape) {
+  open();
+  page->save(TrendPageWidget::Format::Csv, QString::fromStdString(folder.file("a\nb")));
+  EXPECT_THAT(page->remark().text().toStdString(), HasSubstr("Saved as " + folder.file("a\\x0ab") + "."));
+}
+
 TEST_F(SavedTrend, AFailureIsShown) {
   open();
   page->save(TrendPageWidget::Format::Csv, "/nowhere/at/all.csv");
