@@ -30,7 +30,9 @@ bool FileDrop::eventFilter(QObject*, QEvent* event) {
   auto& drop = static_cast<QDropEvent&>(*event);
   const std::string path = pathIn(*drop.mimeData());
   if (path.empty()) return false;
-  drop.acceptProposedAction();
+  // After a move the other program would delete the file.
+  drop.setDropAction(Qt::CopyAction);
+  drop.accept();
   if (event->type() == QEvent::Drop) _take(path);
   return true;
 }

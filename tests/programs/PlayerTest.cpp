@@ -433,6 +433,22 @@ TEST_F(PlayerTest, AFileIsDroppedOntoTheWindow) {
   EXPECT_FALSE(other.isAccepted());
 }
 
+TEST_F(PlayerTest, AFileThatAnotherProgramWouldMoveIsCopied) {
+  launch();
+  QMimeData data;
+  data.setUrls({QUrl::fromLocalFile(QString::fromStdString(snapshot({"-90 dBm"})))});
+  const Qt::DropActions both = Qt::CopyAction | Qt::MoveAction;
+  QDragEnterEvent enter({10, 10}, both, &data, Qt::LeftButton, Qt::ShiftModifier);
+  ASSERT_EQ(enter.proposedAction(), Qt::MoveAction);
+  QApplication::sendEvent(&window(), &enter);
+  EXPECT_TRUE(enter.isAccepted());
+  EXPECT_EQ(enter.dropAction(), Qt::CopyAction);
+  QDropEvent drop({10, 10}, both, &data, Qt::LeftButton, Qt::ShiftModifier);
+  QApplication::sendEvent(&window(), &drop);
+  EXPECT_TRUE(drop.isAccepted());
+  EXPECT_EQ(drop.dropAction(), Qt::CopyAction);
+}
+
 TEST_F(PlayerTest, APortThatCannotBeOpenedIsTold) {
   launch();
   _player->connectToPort(_files.file("no port"));
