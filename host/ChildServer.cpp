@@ -8,9 +8,11 @@
 
 #include <QProcessEnvironment>
 #include <QStandardPaths>
+#include <QTimer>
 #include <algorithm>
 #include <array>
 #include <cerrno>
+#include <chrono>
 #include <csignal>
 #include <stdexcept>
 #include <string_view>
@@ -25,6 +27,7 @@ namespace varnel {
 namespace {
 
 namespace fs = std::filesystem;
+using namespace std::chrono_literals;
 
 constexpr const char* programName = "varnel-telephonyd";
 constexpr std::string_view linePrefix = "varnel-telephonyd: ";
@@ -33,7 +36,7 @@ constexpr std::string_view socketOfStates = "notify";
 // The last line says why the server ended.
 constexpr std::size_t mostBytesOfLines = 8192;
 // A modem that is to be made quiet takes a while.
-constexpr int patienceAtEnd_ms = 3000;
+constexpr std::chrono::milliseconds patienceAtEnd = 3s;
 
 bool isProgram(const fs::path& path) {
   std::error_code failure;
@@ -103,7 +106,11 @@ ChildServer::ChildServer(const fs::path& program, const std::vector<std::string>
       },
       Qt::QueuedConnection);
   QObject::connect(
-      _process.get(), &QProcess::finished, _process.get(), [this] { end(whyItEnded()); },
+      _process.get(), &QProcess::finished, _process.get(),
+      [this] {
+        takeLines();
+        end(whyItEnded());
+      },
       Qt::QueuedConnection);
   _process->start(QString::fromStdString(program), all);
 }
@@ -111,10 +118,28 @@ ChildServer::ChildServer(const fs::path& program, const std::vector<std::string>
 ChildServer::~ChildServer() {
   _process->disconnect();
   if (_process->state() == QProcess::NotRunning) return;
-  _process->terminate();
-  if (_process->waitForFinished(patienceAtEnd_ms)) return;
+  askToEnd();
+  if (_process->waitForFinished(static_cast<int>(_patience->remainingTime()))) return;
   _process->kill();
-  _process->waitForFinished(patienceAtEnd_ms);
+  _process->waitForFinished(static_cast<int>(patienceAtEnd.count()));
+}
+
+void ChildServer::beginEnd(std::function<void()> gone) {
+  _hasEnded = true;
+  _process->disconnect();
+  QObject::connect(_process.get(), &QProcess::finished, _process.get(), gone, Qt::QueuedConnection);
+  if (_process->state() == QProcess::NotRunning) {
+    QMetaObject::invokeMethod(_process.get(), gone, Qt::QueuedConnection);
+    return;
+  }
+  askToEnd();
+  QTimer::singleShot(patienceAtEnd, _process.get(), [this] { _process->kill(); });
+}
+
+void ChildServer::askToEnd() {
+  if (_patience) return;
+  _patience = QDeadlineTimer(patienceAtEnd);
+  _process->terminate();
 }
 
 void ChildServer::takeState() {
@@ -147,7 +172,6 @@ std::string ChildServer::whyItEnded() const {
 
 void ChildServer::end(const std::string& why) {
   if (std::exchange(_hasEnded, true)) return;
-  takeLines();
   _handlers.ended(why);
 }
 

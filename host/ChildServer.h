@@ -1,10 +1,12 @@
 #pragma once
 
+#include <QDeadlineTimer>
 #include <QProcess>
 #include <QSocketNotifier>
 #include <filesystem>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -36,18 +38,25 @@ class ChildServer final {
               Handlers handlers);
   ChildServer(const ChildServer&) = delete;
   ChildServer& operator=(const ChildServer&) = delete;
-  /// Asks the server to end, waits up to three seconds for that, and then kills it.
+  /// Asks the server to end, waits up to three seconds for that, and then kills it. The seconds are those
+  /// since `beginEnd`.
   ~ChildServer();
+  /// Asks the server to end, and kills it after three seconds, but waits for nothing. The event loop calls
+  /// `gone` once there is no server; it calls the other handlers no more. Must not be called twice, nor by a
+  /// handler.
+  void beginEnd(std::function<void()> gone);
 
   RuntimeFolder folder() const { return _folder.path(); }
   /// Viewers can connect. Stays true when the server has ended.
   bool isReady() const { return _isReady; }
+  /// Also true after `beginEnd`.
   bool hasEnded() const { return _hasEnded; }
   qint64 processId() const { return _process->processId(); }
 
  private:
   void takeState();
   void takeLines();
+  void askToEnd();
   void end(const std::string& why);
   std::string whyItEnded() const;
 
@@ -56,7 +65,8 @@ class ChildServer final {
   FileDescriptor _states;  // the server tells here that it is ready
   std::unique_ptr<QSocketNotifier> _stateNotifier;
   std::unique_ptr<QProcess> _process;
-  std::string _lines;  // the last ones that the server has written to standard error
+  std::string _lines;                       // the last ones that the server has written to standard error
+  std::optional<QDeadlineTimer> _patience;  // with a server that was asked to end
   bool _isReady = false;
   bool _hasEnded = false;
 };

@@ -9,6 +9,7 @@
 #include <fstream>
 #include <memory>
 
+#include "host/EndingServers.h"
 #include "host/ServerControl.h"
 #include "tests/support/EventLoop.h"
 #include "tests/support/Process.h"
@@ -75,6 +76,52 @@ TEST_F(ChildServerTest, AServerThatTakesNoSignalsIsKilled) {
   _server.reset();
   EXPECT_FALSE(isRunning(process));
   EXPECT_TRUE(fs::is_empty(_session.path()));
+}
+
+TEST_F(ChildServerTest, TheEndIsNotWaitedFor) {
+  start({"--simulate", "kalvi-lte"});
+  ASSERT_TRUE(waitUntilReady());
+  const qint64 process = _server->processId();
+  EndingServers ending;
+  ending.add(std::move(_server));
+  EXPECT_EQ(ending.size(), 1u);
+  EXPECT_TRUE(runUntil([&] { return ending.size() == 0; }));
+  EXPECT_FALSE(isRunning(process));
+  EXPECT_TRUE(fs::is_empty(_session.path()));
+  EXPECT_FALSE(_why) << "it did not end by itself";
+}
+
+TEST_F(ChildServerTest, AServerThatTakesNoSignalsIsKilledWithoutWaiting) {
+  start({"--simulate", "kalvi-lte"});
+  ASSERT_TRUE(waitUntilReady());
+  const qint64 process = _server->processId();
+  ::kill(static_cast<pid_t>(process), SIGSTOP);
+  EndingServers ending;
+  ending.add(std::move(_server));
+  EXPECT_TRUE(isRunning(process)) << "three seconds are not over";
+  EXPECT_TRUE(runUntil([&] { return ending.size() == 0; }));
+  EXPECT_FALSE(isRunning(process));
+}
+
+TEST_F(ChildServerTest, ServersThatEndGoWithTheirList) {
+  start({"--simulate", "kalvi-lte"});
+  ASSERT_TRUE(waitUntilReady());
+  const qint64 process = _server->processId();
+  {
+    EndingServers ending;
+    ending.add(std::move(_server));
+  }
+  EXPECT_FALSE(isRunning(process));
+  EXPECT_TRUE(fs::is_empty(_session.path()));
+}
+
+TEST_F(ChildServerTest, AServerThatHasEndedIsLetGo) {
+  start({"--replay=/no such file"});
+  ASSERT_TRUE(waitUntilEnded());
+  EndingServers ending;
+  ending.add(std::move(_server));
+  ending.add(nullptr);
+  EXPECT_TRUE(runUntil([&] { return ending.size() == 0; }));
 }
 
 TEST_F(ChildServerTest, AFileThatIsNotThereIsTold) {
