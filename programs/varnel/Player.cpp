@@ -29,6 +29,8 @@ using Command = ControlRequest::Command;
 constexpr auto intervalOfPlaying = 500ms, intervalOfSeeking = 100ms, intervalOfJump = 50ms;
 // What was sent until a place has arrived then.
 constexpr auto timeToArrive = 150ms;
+// A server that takes longer is told of.
+constexpr auto timeToStart = 500ms;
 constexpr int stepOfSlider_ms = 5000;
 constexpr const char* automaticPort = "auto";
 
@@ -95,7 +97,12 @@ Player::Player(const Parts& parts) : _parts(parts) {
   _parts.app.setObserver([this] { applicationHasChanged(); });
 }
 
-Player::~Player() { _parts.app.setObserver({}); }
+Player::~Player() {
+  _parts.app.setObserver({});
+  // Both are asked to end before the first of them is waited for.
+  endServerOf(_starting);
+  endServerOf(_own);
+}
 
 void Player::furnish(WindowWidget& window) {
   _window = &window;
@@ -153,6 +160,7 @@ void Player::start(Own own) {
   const auto later = [this](std::function<void()> task) {
     _parts.services.queue().async(_whileAlive(std::move(task)));
   };
+  endServerOf(_starting);
   _starting = std::move(own);
   _starting.number = number;
   try {
@@ -167,13 +175,22 @@ void Player::start(Own own) {
   } catch (const std::runtime_error& error) {
     serverHasEnded(number, error.what());
   }
+  _parts.services.queue().after(timeToStart, _whileAlive([this, number] { startTakesLong(number); }));
   showBar();
   showStartPage();
 }
 
+// A pipe may be empty, and a disk may be far away.
+void Player::startTakesLong(unsigned number) {
+  if (number != _starting.number || !_starting.server) return;
+  _starting.isSlow = true;
+  showBar();
+}
+
 void Player::serverIsReady(unsigned number) {
   if (number != _starting.number) return;
-  const Own former = std::exchange(_own, std::exchange(_starting, {}));
+  endServerOf(_own);
+  _own = std::exchange(_starting, {});
   _displays.clear();
   _control = std::make_unique<ControlClient>(_own.server->folder());
   _status.reset();
@@ -193,8 +210,8 @@ void Player::serverIsReady(unsigned number) {
 void Player::serverHasEnded(unsigned number, const std::string& why) {
   if (number == _own.number) {
     _own.whyItEnded = why;
-    _parts.services.link().setEndOfOwnServer("The server of " + _own.name + " has ended: " + why +
-                                             "; start it again below");
+    _parts.services.link().setEndOfOwnServer("The server of " + printable(_own.name) +
+                                             " has ended: " + printable(why) + "; start it again below");
     _jump.reset();
     _parts.services.playedClock().stand();
     pollAsNeeded();
@@ -209,7 +226,11 @@ void Player::serverHasEnded(unsigned number, const std::string& why) {
         why);
 }
 
+// The user need not wait for that.
+void Player::endServerOf(Own& own) { _ending.add(std::move(own.server)); }
+
 void Player::giveUpStarting() {
+  endServerOf(_starting);
   _starting = {};
   if (_own.kind == Kind::Usual) {
     // It may have waited for that server.
@@ -235,10 +256,16 @@ std::optional<Time> Player::savedTime() const {
                                                                     : std::nullopt;
 }
 
+std::string Player::openFile() const {
+  return _own.kind == Kind::Replay || _own.kind == Kind::Snapshot ? _own.name : std::string();
+}
+
 void Player::leaveServer() {
+  endServerOf(_own);
   _own = {};
   setClock();
   tellOfCapture();
+  endServerOf(_starting);
   _starting = {};
   _displays.clear();
   _control.reset();
@@ -461,14 +488,16 @@ void Player::showBar() {
   _window->setBar(nullptr);
 }
 
-// A file and a simulation are there at once.
-bool Player::showsStart() const { return _starting.server && _starting.kind == Kind::Port; }
+// Most files and a simulation are there at once.
+bool Player::showsStart() const {
+  return _starting.server && (_starting.kind == Kind::Port || _starting.isSlow);
+}
 
 PlayBarState Player::barState() const {
   if (showsStart()) return stateOfStart();
   if (_own.kind == Kind::Snapshot) return stateOfSnapshot();
   if (!_own.whyItEnded) return stateOfStream();
-  PlayBarState state{.name = text(_own.name)};
+  PlayBarState state{.name = text(printable(_own.name))};
   state.message = text(printable(*_own.whyItEnded));
   state.message[0] = state.message[0].toUpper();
   state.remedy = QStringLiteral("Start again");

@@ -12,6 +12,7 @@
 #include "base/WhileAlive.h"
 #include "host/ChildServer.h"
 #include "host/ControlClient.h"
+#include "host/EndingServers.h"
 #include "programs/varnel/HostServices.h"
 #include "programs/varnel/SavedDisplays.h"
 #include "widgets/PlayBar.h"
@@ -69,6 +70,8 @@ class Player final {
   std::optional<Time> playedTime() const;
   /// The time of the snapshot's display that is shown; absent when none is.
   std::optional<Time> savedTime() const;
+  /// The capture that is played, or the snapshot whose displays are shown; empty when there is none.
+  std::string openFile() const;
   /// The user wants an empty display.
   void startOver();
 
@@ -83,15 +86,18 @@ class Player final {
     std::optional<Time> firstTime{};          // of the capture, if it is known
     bool keepsPanes = false;                  // when it is ready
     unsigned number = 0;                      // of the start
+    bool isSlow = false;                      // to start
     std::unique_ptr<ChildServer> server{};
     std::optional<std::string> whyItEnded{};
   };
 
   void start(Own own);
   void startAgain();
+  void startTakesLong(unsigned number);
   void serverIsReady(unsigned number);
   void serverHasEnded(unsigned number, const std::string& why);
   void giveUpStarting();
+  void endServerOf(Own& own);
   void showSaved(std::vector<Generation> displays, const std::string& name);
   void showDisplay(std::size_t number);
   void leaveServer();
@@ -135,6 +141,7 @@ class Player final {
   QString _folder;  // of the file that was opened last
 
   unsigned _starts = 0;
+  EndingServers _ending;              // those that were shown before
   Own _own, _starting;                // shown; to be shown when it is ready
   std::vector<Generation> _displays;  // of a snapshot
   NumberFormats _formats;             // of their numbers

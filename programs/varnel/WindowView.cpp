@@ -32,7 +32,8 @@ class WindowViewer final {
         _liveTrends({.numbers = _history,
                      .events = _events,
                      .name = [this] { return _app.technology(); },
-                     .clock = &_services.clock()}),
+                     .clock = &_services.clock(),
+                     .input = [this] { return _player.openFile(); }}),
         _trends({.live = _liveTrends,
                  .keyOf = [this](const NamePath& path) { return keyOf(path); },
                  .tellFailure =

@@ -3,6 +3,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <sys/stat.h>
+
 #include <QAction>
 #include <QDropEvent>
 #include <QMenu>
@@ -146,6 +148,9 @@ class PlayerTest : public testing::Test {
   std::string waitForAlert() {
     if (!runUntil([this] { return alert() != nullptr; })) return "no alert";
     return alert()->accessibleName().toStdString() + ": " + alert()->accessibleDescription().toStdString();
+  }
+  bool waitForServers(std::size_t count) {
+    return runUntil([count] { return servers().size() == count; });
   }
   // The servers that this process has started.
   static std::set<pid_t> servers() {
@@ -349,7 +354,7 @@ TEST_F(PlayerTest, AnotherFileEndsTheServerOfTheFirst) {
   _player->open(capture(30, "other.pcap"));
   ASSERT_TRUE(waitForBar([](const auto& state) { return state.length == 30'000; }));
   ASSERT_TRUE(waitForRow(section));
-  ASSERT_THAT(servers(), SizeIs(1));
+  EXPECT_TRUE(waitForServers(1));
   EXPECT_NE(servers(), first);
 }
 
@@ -367,17 +372,30 @@ TEST_F(PlayerTest, AServerThatIsKilledIsToldAndStartedAgain) {
   EXPECT_TRUE(
       runUntil([this, former = secondShown()] { return secondShown() >= 0 && secondShown() != former; }));
   EXPECT_EQ(title(), section);
-  EXPECT_THAT(servers(), testing::AllOf(SizeIs(1), testing::Not(Contains(first))));
+  EXPECT_TRUE(waitForServers(1));
+  EXPECT_THAT(servers(), testing::Not(Contains(first)));
 }
 
 TEST_F(PlayerTest, ClosingTheFileEndsItsServerAndReturnsToTheOffer) {
   launch(capture(60));
   ASSERT_TRUE(waitForRow(section));
   QTest::mouseClick(&bar()->closeButton(), Qt::LeftButton);
-  EXPECT_THAT(servers(), IsEmpty());
+  EXPECT_TRUE(waitForServers(0));
   EXPECT_TRUE(waitForStartPage());
   EXPECT_EQ(bar(), nullptr);
   EXPECT_THAT(rows(), IsEmpty());
+}
+
+// The server would end after three seconds by force.
+TEST_F(PlayerTest, ClosingTheFileDoesNotWaitForItsServer) {
+  launch(capture(60));
+  ASSERT_TRUE(waitForRow(section));
+  ASSERT_THAT(servers(), SizeIs(1));
+  ::kill(*servers().begin(), SIGSTOP);
+  QTest::mouseClick(&bar()->closeButton(), Qt::LeftButton);
+  EXPECT_THAT(servers(), SizeIs(1));
+  EXPECT_EQ(bar(), nullptr);
+  EXPECT_TRUE(waitForServers(0));
 }
 
 TEST_F(PlayerTest, ASnapshotIsWalkedThroughWithoutAServer) {
@@ -447,6 +465,30 @@ TEST_F(PlayerTest, AFileThatAnotherProgramWouldMoveIsCopied) {
   QApplication::sendEvent(&window(), &drop);
   EXPECT_TRUE(drop.isAccepted());
   EXPECT_EQ(drop.dropAction(), Qt::CopyAction);
+}
+
+TEST_F(PlayerTest, TheOpenFileIsThatOfASnapshotToo) {
+  launch();
+  EXPECT_EQ(_player->openFile(), "");
+  _player->open(snapshot({"-90 dBm"}));
+  EXPECT_EQ(_player->openFile(), _files.file("saved.varnel"));
+  _player->open(capture(60));
+  ASSERT_TRUE(waitForRow(section));
+  EXPECT_EQ(_player->openFile(), _files.file("walk.pcap"));
+  _player->close();
+  EXPECT_EQ(_player->openFile(), "");
+}
+
+TEST_F(PlayerTest, AFileThatGivesNothingCanBeCanceled) {
+  const std::string pipe = _files.file("pipe");
+  ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
+  launch(pipe);
+  ASSERT_TRUE(runUntil([this] { return bar() != nullptr; }));
+  EXPECT_EQ(bar()->state().message.toStdString(), "Opening " + pipe + "…");
+  EXPECT_EQ(bar()->state().remedy, "Cancel");
+  Q_EMIT bar()->remedyWanted();
+  EXPECT_TRUE(waitForStartPage());
+  EXPECT_EQ(bar(), nullptr);
 }
 
 TEST_F(PlayerTest, APortThatCannotBeOpenedIsTold) {
