@@ -4,8 +4,9 @@
 #include <QHostAddress>
 #include <QJsonDocument>
 #include <QJsonObject>
-#include <cmath>
-#include <limits>
+#include <utility>
+
+#include "programs/varnel-telephonyd/live/FixTime.h"
 
 namespace varnel {
 
@@ -24,17 +25,6 @@ std::optional<double> number(const QJsonObject& object, const char* key, double 
   return found >= least && found <= most ? std::optional(found) : std::nullopt;
 }
 
-// Property lists count seconds from 2001.
-std::optional<Date> dateOf(const QJsonValue& value) {
-  constexpr std::int64_t secondsUntil2001 = 978'307'200;
-  const QDateTime moment = QDateTime::fromString(value.toString().left(32), Qt::ISODateWithMs);
-  if (!moment.isValid()) return std::nullopt;
-  const std::int64_t milliseconds = moment.toMSecsSinceEpoch() - secondsUntil2001 * 1000;
-  if (milliseconds < 0 || milliseconds / 1000 > std::numeric_limits<std::int32_t>::max()) return std::nullopt;
-  return Date{static_cast<std::int32_t>(milliseconds / 1000),
-              static_cast<std::int32_t>(milliseconds % 1000 * 1000)};
-}
-
 }  // namespace
 
 std::optional<std::optional<Position>> positionInLine(const QByteArray& line) {
@@ -50,7 +40,8 @@ std::optional<std::optional<Position>> positionInLine(const QByteArray& line) {
     position.altitude_m = number(report, "altMSL", -1000, 100'000);
     if (!position.altitude_m) position.altitude_m = number(report, "alt", -1000, 100'000);
   }
-  position.time = dateOf(report.value(QLatin1String("time")));
+  position.fix = report.value(QLatin1String("time")).toString().left(32).toStdString();
+  position.time = dateOf(QDateTime::fromString(QString::fromStdString(position.fix), Qt::ISODateWithMs));
   return position;
 }
 
@@ -72,8 +63,14 @@ void PositionClient::connectToService() {
   _socket.connectToHost(QHostAddress(QHostAddress::LocalHost), _setup.port);
 }
 
-void PositionClient::connectLater() {
+void PositionClient::forget() {
+  _expiry.reset();
   if (std::exchange(_hasPosition, false)) _setup.moved(std::nullopt);
+}
+
+void PositionClient::connectLater() {
+  forget();
+  _fix.clear();
   _setup.queue.after(reconnectInterval, [this, life = std::weak_ptr(_life)] {
     if (!life.expired()) connectToService();
   });
@@ -96,8 +93,14 @@ void PositionClient::take(QByteArray bytes) {
 
 void PositionClient::takeLine(const QByteArray& line) {
   const auto position = positionInLine(line);
-  if (!position || (!*position && !_hasPosition)) return;
-  _hasPosition = position->has_value();
+  if (!position) return;
+  if (!*position) return forget();
+  // The service may repeat a fix while its receiver is silent.
+  const bool isOld = !(*position)->fix.empty() && (*position)->fix == _fix;
+  if (isOld) return;
+  _fix = (*position)->fix;
+  _expiry = _setup.queue.repeating(_setup.lifetime, [this] { forget(); });
+  _hasPosition = true;
   _setup.moved(*position);
 }
 

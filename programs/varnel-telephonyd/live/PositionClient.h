@@ -3,11 +3,13 @@
 #include <QByteArray>
 #include <QObject>
 #include <QTcpSocket>
+#include <chrono>
 #include <cstddef>
 #include <cstdint>
 #include <functional>
 #include <memory>
 #include <optional>
+#include <string>
 #include <string_view>
 
 #include "platform/MainQueue.h"
@@ -26,6 +28,8 @@ class PositionClient final {
   struct Setup {
     MainQueue& queue;
     std::uint16_t port = usualPort;
+    /// How long a position holds when no new one follows.
+    std::chrono::milliseconds lifetime{15'000};
     /// Called with each position, and with nothing when there is none any more.
     std::function<void(const std::optional<Position>& position)> moved;
   };
@@ -38,6 +42,7 @@ class PositionClient final {
  private:
   void connectToService();
   void connectLater();
+  void forget();
   void take(QByteArray bytes);
   void takeLine(const QByteArray& line);
 
@@ -46,6 +51,8 @@ class PositionClient final {
   QByteArray _line;         // the beginning of one that is not complete
   bool _isTooLong = false;  // the line is, and what follows until its end is left out
   bool _hasPosition = false;
+  std::string _fix;  // the time of the last position, as the service writes it
+  std::unique_ptr<RepeatingTimer> _expiry;
   std::shared_ptr<bool> _life = std::make_shared<bool>();  // for tasks that may run after this object
 };
 

@@ -57,11 +57,12 @@ TEST(PositionInLine, OtherLinesAreNone) {
 class PositionClientTest : public testing::Test {
  protected:
   PositionClientTest() { EXPECT_TRUE(_server.listen(QHostAddress::LocalHost)); }
-  void connectClient() {
-    _client = std::make_unique<PositionClient>(PositionClient::Setup{
-        .queue = _queue, .port = _server.serverPort(), .moved = [this](const auto& position) {
-          _positions.push_back(position);
-        }});
+  void connectClient(std::chrono::milliseconds lifetime = 60s) {
+    _client = std::make_unique<PositionClient>(
+        PositionClient::Setup{.queue = _queue,
+                              .port = _server.serverPort(),
+                              .lifetime = lifetime,
+                              .moved = [this](const auto& position) { _positions.push_back(position); }});
     EXPECT_TRUE(runUntil([this] { return _server.hasPendingConnections(); }));
     _connection.reset(_server.nextPendingConnection());
   }
@@ -101,6 +102,21 @@ TEST_F(PositionClientTest, WithoutAFixOrAServiceThereIsNoPosition) {
   ASSERT_TRUE(runUntil([&] { return _positions.size() == 3; }));
   _connection.reset();
   ASSERT_TRUE(runUntil([&] { return _positions.size() == 4; }));
+  EXPECT_FALSE(_positions[3]);
+}
+
+// The service goes on, but its receiver is silent, or repeats what it had.
+TEST_F(PositionClientTest, APositionThatIsNotNewIsForgotten) {
+  connectClient(100ms);
+  say("{\"class\":\"TPV\",\"mode\":2,\"time\":\"2026-11-22T14:00:05.000Z\",\"lat\":1,\"lon\":2}\n");
+  ASSERT_TRUE(runUntil([&] { return _positions.size() == 2; }));
+  EXPECT_TRUE(_positions[0]);
+  EXPECT_FALSE(_positions[1]);
+  say("{\"class\":\"TPV\",\"mode\":2,\"time\":\"2026-11-22T14:00:05.000Z\",\"lat\":1,\"lon\":2}\n"
+      "{\"class\":\"TPV\",\"mode\":2,\"time\":\"2026-11-22T14:00:06.000Z\",\"lat\":3,\"lon\":4}\n");
+  ASSERT_TRUE(runUntil([&] { return _positions.size() == 4; }));
+  ASSERT_TRUE(_positions[2]);
+  EXPECT_EQ(_positions[2]->latitude, 3);
   EXPECT_FALSE(_positions[3]);
 }
 
