@@ -267,7 +267,7 @@ int serve(int& argumentCount, char** arguments, Options options) {
   HostApplication application(argumentCount, arguments);
   std::unique_ptr<LivePort> livePort;
   std::unique_ptr<LiveModem> liveModem;
-  const SignalWatcher signals({SIGINT, SIGTERM},
+  const SignalWatcher signals({SIGINT, SIGTERM, SIGHUP},
                               [&](int /*signal*/) { end(application, livePort.get(), liveModem.get()); });
   const HostLog log({.programName = programName, .standardErrorLevel = options.logLevel});
   const RuntimeFolder folder = serversFolder(options.runtimeFolder, options.allowedGroup);
@@ -353,7 +353,7 @@ int serve(int& argumentCount, char** arguments, Options options) {
 // Plays the diagnostic port of a simulated modem for servers of other processes.
 int playPort(int& argumentCount, char** arguments, const Options& options) {
   HostApplication application(argumentCount, arguments);
-  const SignalWatcher signals({SIGINT, SIGTERM}, [&](int /*signal*/) { application.end(0); });
+  const SignalWatcher signals({SIGINT, SIGTERM, SIGHUP}, [&](int /*signal*/) { application.end(0); });
   EventLoopQueue queue;
   std::unique_ptr<SimulatedPort> port;
   PseudoTerminal terminal([&](ByteView bytes) { port->take(bytes); });
