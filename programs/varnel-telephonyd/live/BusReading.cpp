@@ -34,15 +34,15 @@ bool isArgument(const QVariant& value, const char* signature) {
          value.value<QDBusArgument>().currentSignature() == QString::fromLatin1(signature);
 }
 
-std::string printableText(const QString& text) {
+std::string printableText(const QString& text, std::size_t longest = longestText) {
   const std::string bytes = text.toStdString();
   const auto controls = [](unsigned char byte) { return byte < 0x20 || byte == 0x7F; };
-  return bytes.size() <= longestText && std::ranges::none_of(bytes, controls) ? bytes : std::string();
+  return bytes.size() <= longest && std::ranges::none_of(bytes, controls) ? bytes : std::string();
 }
 
 std::string objectPath(const QVariant& value) {
   if (value.metaType() != QMetaType::fromType<QDBusObjectPath>()) return {};
-  const std::string found = printableText(value.value<QDBusObjectPath>().path());
+  const std::string found = printableText(value.value<QDBusObjectPath>().path(), longestPath);
   return found == "/" ? std::string() : found;
 }
 
@@ -288,6 +288,12 @@ Location locationIn(const QVariant& value) {
 std::string text(const QVariantMap& entries, const char* key) {
   const QVariant value = valueOf(entries, key);
   return value.metaType() == QMetaType::fromType<QString>() ? printableText(value.toString()) : std::string();
+}
+
+std::string deviceOf(const QVariantMap& modemProperties) {
+  const QVariant value = valueOf(modemProperties, "Device");
+  if (value.metaType() != QMetaType::fromType<QString>()) return {};
+  return printableText(value.toString(), longestPath);
 }
 
 std::optional<std::int64_t> number(const QVariantMap& entries, const char* key) {
@@ -543,17 +549,29 @@ CellReading& servingCellIn(std::vector<CellReading>& cells, CellReading::Radio r
   return cells.emplace_back(CellReading{.radio = radio, .isServing = true});
 }
 
-// A cell with another identity keeps what it has: one of the two is older.
-void complete(CellReading& cell, const NetworkLocation& location) {
+template <class Number>
+bool differ(const std::optional<Number>& one, const std::optional<Number>& other) {
+  return one && other && *one != *other;
+}
+
+// The area of a cell of this radio.
+std::optional<std::uint32_t> areaOf(const NetworkLocation& location, CellReading::Radio radio) {
   using Radio = CellReading::Radio;
-  if (cell.identity && location.identity && *cell.identity != *location.identity) return;
-  const bool isTracked = cell.radio == Radio::LTE || cell.radio == Radio::NR;
+  if (radio == Radio::NR) return location.tac;
+  if (radio != Radio::LTE) return location.lac;
+  // A tracking area of NR is not one of LTE.
+  return location.tac.value_or(0) <= busReading::sixteenBits ? location.tac : std::nullopt;
+}
+
+// A cell of another network or area, or with another identity, keeps what it has: one of the two is older.
+void complete(CellReading& cell, const NetworkLocation& location) {
+  const auto area = areaOf(location, cell.radio);
+  const bool isOfOtherNetwork =
+      !cell.network.empty() && !location.network.empty() && cell.network != location.network;
+  if (isOfOtherNetwork || differ(cell.area, area) || differ(cell.identity, location.identity)) return;
   if (cell.network.empty()) cell.network = location.network;
   if (!cell.identity) cell.identity = location.identity;
-  if (cell.area) return;
-  cell.area = isTracked ? location.tac : location.lac;
-  // A tracking area of NR is not one of LTE.
-  if (cell.radio == Radio::LTE && cell.area.value_or(0) > busReading::sixteenBits) cell.area.reset();
+  if (!cell.area) cell.area = area;
 }
 
 std::uint64_t largestIdentityOf(CellReading::Radio radio) {

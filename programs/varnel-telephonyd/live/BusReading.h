@@ -21,14 +21,17 @@ using Interfaces = QMap<QString, QVariantMap>;
 using Objects = QMap<QString, Interfaces>;
 
 /// The most that are read of one kind.
-inline constexpr std::size_t mostObjects = 64, mostCells = 256, mostListed = 16, longestText = 128;
+inline constexpr std::size_t mostObjects = 64, mostCells = 256, mostListed = 16, longestText = 128,
+                             longestPath = 4095;
 
 /// A printable text of at most `longestText` bytes; empty for anything else.
 std::string text(const QVariantMap& entries, const char* key);
+/// The path of a modem's device; empty when the service tells none, or one that no file can have.
+std::string deviceOf(const QVariantMap& modemProperties);
 std::optional<std::int64_t> number(const QVariantMap& entries, const char* key);
 std::optional<double> real(const QVariantMap& entries, const char* key);
 std::optional<bool> boolean(const QVariantMap& entries, const char* key);
-/// Paths of objects; a path that is "/" stands for none.
+/// Paths of objects, of at most `longestPath` bytes; a path that is "/" stands for none.
 std::string path(const QVariantMap& entries, const char* key);
 std::vector<std::string> paths(const QVariantMap& entries, const char* key);
 /// A dictionary inside a property.

@@ -9,6 +9,8 @@
 #include "LogGenerator/KLV/Subscriber/SimFiles.h"
 #include "base/Dictionary.h"
 #include "platform/ModemReport.h"
+#include "programs/varnel-telephonyd/live/FixTime.h"
+#include "programs/varnel-telephonyd/live/ModemInterfaces.h"
 #include "programs/varnel-telephonyd/live/ServerRecords.h"
 
 namespace varnel {
@@ -17,19 +19,15 @@ using namespace std::chrono_literals;
 
 namespace {
 
-const QString modemInterface = QStringLiteral("org.freedesktop.ModemManager1.Modem");
-const QString networkInterface = QStringLiteral("org.freedesktop.ModemManager1.Modem.Modem3gpp");
-const QString locationInterface = QStringLiteral("org.freedesktop.ModemManager1.Modem.Location");
-const QString signalInterface = QStringLiteral("org.freedesktop.ModemManager1.Modem.Signal");
-const QString simInterface = QStringLiteral("org.freedesktop.ModemManager1.Sim");
-const QString bearerInterface = QStringLiteral("org.freedesktop.ModemManager1.Bearer");
-const QString keptInterfaces[] = {modemInterface, networkInterface, locationInterface, signalInterface};
+const QString keptInterfaces[] = {modemInterfaces::modem, modemInterfaces::network, modemInterfaces::location,
+                                  modemInterfaces::signal};
 
 constexpr std::uint32_t packetDataLogCode = 0xFF0002;
 // Signals come in bursts, and make one packet.
 constexpr std::chrono::milliseconds burst = 200ms;
 constexpr std::chrono::milliseconds patienceAtEnd = 2s;
 constexpr std::chrono::milliseconds lifetimeOfPosition = 15s;
+constexpr std::chrono::milliseconds rateRetryInterval = 60s;
 constexpr qsizetype mostProperties = 128;
 // In the enumeration of the location interface's sources.
 constexpr std::int64_t networkSource = 1, rawPositionSource = 2;
@@ -61,6 +59,11 @@ bool isUnsupported(const QDBusMessage& answer) {
          answer.errorName() == QStringLiteral("org.freedesktop.ModemManager1.Error.Core.Unsupported");
 }
 
+// Whether the service has made the error itself.
+bool isOfService(const QDBusMessage& answer) {
+  return answer.errorName().startsWith(QStringLiteral("org.freedesktop.ModemManager1."));
+}
+
 }  // namespace
 
 LiveModem::LiveModem(Setup setup)
@@ -74,7 +77,7 @@ LiveModem::LiveModem(Setup setup)
                      if (!life.expired()) updatePolling();
                    });
                  }}),
-      _bus(_setup.queue,
+      _bus(_setup.queue, _setup.answerPatience,
            {.serviceChanged = [this](ModemBus::Service service,
                                      const busReading::Objects& objects) { takeService(service, objects); },
             .added = [this](const std::string& object,
@@ -124,7 +127,7 @@ void LiveModem::takeService(ModemBus::Service service, const busReading::Objects
 // What is no modem is left out.
 void LiveModem::keep(const QString& object, const busReading::Interfaces& interfaces) {
   const bool hasRoom = _modems.size() < static_cast<qsizetype>(busReading::mostObjects);
-  if (!_modems.contains(object) && !(hasRoom && interfaces.contains(modemInterface))) return;
+  if (!_modems.contains(object) && !(hasRoom && interfaces.contains(modemInterfaces::modem))) return;
   busReading::Interfaces& kept = _modems[object];
   for (const QString& interface : keptInterfaces)
     if (interfaces.contains(interface)) merge(kept[interface], interfaces.value(interface));
@@ -144,14 +147,14 @@ void LiveModem::takeRemoved(const std::string& object) {
 }
 
 void LiveModem::takeChanged(const std::string& object, const QString& interface, const QVariantMap& changed) {
-  if (interface == bearerInterface) {
+  if (interface == modemInterfaces::bearer) {
     const auto bearer = _bearers.find(object);
     if (bearer == _bearers.end()) return;
     merge(bearer->second, changed);
     return sendLater();
   }
-  if (interface == simInterface && !_path.empty() &&
-      object == busReading::path(properties(modemInterface), "Sim")) {
+  if (interface == modemInterfaces::sim && !_path.empty() &&
+      object == busReading::path(properties(modemInterfaces::modem), "Sim")) {
     merge(_sim, changed);
     return sendLater();
   }
@@ -160,14 +163,14 @@ void LiveModem::takeChanged(const std::string& object, const QString& interface,
   if (modem == _modems.end() || !isKept) return;
   merge((*modem)[interface], changed);
   if (object != _path) return;
-  if (interface == modemInterface && changed.contains(QStringLiteral("Sim"))) askForSim();
-  if ((interface == modemInterface && changed.contains(QStringLiteral("Bearers"))) ||
-      (interface == networkInterface && changed.contains(QStringLiteral("InitialEpsBearer"))))
+  if (interface == modemInterfaces::modem && changed.contains(QStringLiteral("Sim"))) askForSim();
+  if ((interface == modemInterfaces::modem && changed.contains(QStringLiteral("Bearers"))) ||
+      (interface == modemInterfaces::network && changed.contains(QStringLiteral("InitialEpsBearer"))))
     askForBearers();
   // Somebody else has switched the signals off.
-  if (interface == signalInterface && busReading::number(changed, "Rate") == 0 && !_awaitsRate)
+  if (interface == modemInterfaces::signal && busReading::number(changed, "Rate") == 0 && !_awaitsRate)
     _rateBefore.reset();
-  if (interface == locationInterface && changed.contains(QStringLiteral("Location")))
+  if (interface == modemInterfaces::location && changed.contains(QStringLiteral("Location")))
     takeLocation(busReading::locationOf(changed.value(QStringLiteral("Location"))));
   update();
 }
@@ -177,7 +180,7 @@ std::string LiveModem::choice() const {
   std::string best;
   for (auto modem = _modems.begin(); modem != _modems.end(); ++modem) {
     std::string path = modem.key().toStdString();
-    const std::string device = busReading::text(modem.value().value(modemInterface), "Device");
+    const std::string device = busReading::deviceOf(modem.value().value(modemInterfaces::modem));
     if (!_device.empty() && device == _device) return path;
     const std::string& wanted = _setup.wanted;
     const bool isWanted =
@@ -193,7 +196,7 @@ void LiveModem::choose() {
   } else if (const std::string path = choice(); !path.empty()) {
     return takeUp(path);
   } else {
-    setStatus(_device.empty() ? statusWithoutModem(_setup.wanted) : statusOfLost(_name));
+    setStatus(_name.empty() ? statusWithoutModem(_setup.wanted) : statusOfLost(_name));
   }
   updatePolling();
   sendLater();
@@ -202,7 +205,7 @@ void LiveModem::choose() {
 void LiveModem::takeUp(const std::string& path) {
   _path = path;
   ++_choices;
-  _device = busReading::text(properties(modemInterface), "Device");
+  _device = busReading::deviceOf(properties(modemInterfaces::modem));
   _name = nameOfModem(path, _modems.value(QString::fromStdString(path)));
   askForSim();
   askForBearers();
@@ -220,6 +223,7 @@ void LiveModem::forget() {
   _cellInfo = CellInfo::IsAskedFor;
   _awaitsCells = _awaitsLocation = _awaitsRate = false;
   _isRateRefused = false;
+  _rateRetryAt.reset();
   _rateBefore.reset();
 }
 
@@ -235,7 +239,9 @@ void LiveModem::update() {
   setStatus(statusOf(_path, _modems.value(QString::fromStdString(_path))));
   if (!isUsable()) {
     _ownPosition.reset();
-    _isRateRefused = false;  // it may be taken when the modem is switched on
+    // It may be taken when the modem is switched on.
+    _isRateRefused = false;
+    _rateRetryAt.reset();
   }
   updatePolling();
   sendLater();
@@ -271,13 +277,14 @@ void LiveModem::updatePolling() {
 }
 
 void LiveModem::poll() {
+  updateRate();
   askForCells();
   askForLocation();
 }
 
 void LiveModem::askForCells() {
   if (_cellInfo != CellInfo::IsAskedFor || _awaitsCells) return;
-  _awaitsCells = _bus.call(_path, modemInterface, "GetCellInfo", {},
+  _awaitsCells = _bus.call(_path, modemInterfaces::modem, "GetCellInfo", {},
                            [this, choice = _choices](const QDBusMessage& answer) {
                              if (choice == _choices) takeCellInfo(answer);
                            });
@@ -285,11 +292,6 @@ void LiveModem::askForCells() {
 
 void LiveModem::takeCellInfo(const QDBusMessage& answer) {
   _awaitsCells = false;
-  if (!isWatched()) return;
-  auto cells = busReading::cellsOf(answer);
-  _hasFreshCells = cells.has_value();
-  // What was measured long ago is not shown.
-  _cells = cells ? *std::move(cells) : std::vector<CellReading>();
   if (isRefusal(answer)) {
     _cellInfo = CellInfo::IsRefused;
     tellOnce(
@@ -299,11 +301,16 @@ void LiveModem::takeCellInfo(const QDBusMessage& answer) {
     _cellInfo = CellInfo::IsNotOffered;
     tellOnce(_name + " does not tell its neighboring cells to ModemManager; the serving cell is shown");
   }
+  if (!isWatched()) return;
+  auto cells = busReading::cellsOf(answer);
+  _hasFreshCells = cells.has_value();
+  // What was measured long ago is not shown.
+  _cells = cells ? *std::move(cells) : std::vector<CellReading>();
   sendLater();
 }
 
 void LiveModem::askForLocation() {
-  const QVariantMap& location = properties(locationInterface);
+  const QVariantMap& location = properties(modemInterfaces::location);
   if (location.isEmpty() || _awaitsLocation) return;
   const std::int64_t wanted = networkSource | (_setup.tellsPosition ? rawPositionSource : 0);
   const std::int64_t enabled = busReading::number(location, "Enabled").value_or(wanted);
@@ -311,7 +318,7 @@ void LiveModem::askForLocation() {
     tellOnce("ModemManager does not tell the location of " + _name +
              " in the network; mmcli -m any --location-enable-3gpp switches it on");
   if ((enabled & wanted) == 0) return;
-  _awaitsLocation = _bus.call(_path, locationInterface, "GetLocation", {},
+  _awaitsLocation = _bus.call(_path, modemInterfaces::location, "GetLocation", {},
                               [this, choice = _choices](const QDBusMessage& answer) {
                                 if (choice != _choices) return;
                                 _awaitsLocation = false;
@@ -332,17 +339,20 @@ void LiveModem::takeLocation(const busReading::Location& location) {
   const bool isOld = location.position && _ownPosition && !location.position->fix.empty() &&
                      location.position->fix == _ownPosition->fix;
   if (!isOld) _ownPositionAt = _setup.uptime();
+  const std::optional<Date> time = isOld ? _ownPosition->time : std::nullopt;
   _ownPosition = location.position;
+  if (_ownPosition) _ownPosition->time = isOld ? time : dateOfFix(_ownPosition->fix, _setup.now());
 }
 
 void LiveModem::updateRate() {
-  const QVariantMap& signal = properties(signalInterface);
+  const QVariantMap& signal = properties(modemInterfaces::signal);
   if (signal.isEmpty() || _rateBefore || _awaitsRate || _isRateRefused) return;
+  if (_rateRetryAt && _setup.uptime() < *_rateRetryAt) return;
   const std::int64_t rate = busReading::number(signal, "Rate").value_or(0);
   const auto wanted = static_cast<std::uint32_t>(_setup.pollInterval.count());
   if (rate < 0 || rate > UINT32_MAX || (rate > 0 && rate <= wanted)) return;
   _awaitsRate = _bus.call(
-      _path, signalInterface, "Setup", {wanted},
+      _path, modemInterfaces::signal, "Setup", {wanted},
       [this, choice = _choices, rate = static_cast<std::uint32_t>(rate)](const QDBusMessage& answer) {
         if (choice == _choices) takeRateAnswer(answer, rate);
       });
@@ -358,25 +368,35 @@ void LiveModem::takeRateAnswer(const QDBusMessage& answer, std::uint32_t before)
     if (!restoreRate([this] { finish(); })) finish();
     return;
   }
-  _isRateRefused = true;
-  tellOnce(isRefusal(answer) ? "ModemManager does not let this user ask for levels; section AS A SERVICE of "
-                               "varnel-telephonyd(8) has a rule of polkit"
-                             : _name + " does not tell its levels to ModemManager");
+  _isRateRefused = isRefusal(answer) || isUnsupported(answer);
+  if (isRefusal(answer)) {
+    tellOnce(
+        "ModemManager does not let this user ask for levels; section AS A SERVICE of varnel-telephonyd(8) "
+        "has a rule of polkit");
+  } else if (isUnsupported(answer)) {
+    tellOnce(_name + " does not tell its levels to ModemManager");
+  } else {
+    _rateRetryAt = _setup.uptime() + rateRetryInterval;
+    // An answer that is lost says nothing about the modem: the bus or the service may just have gone.
+    if (isOfService(answer))
+      tellOnce(_name + " does not tell its levels to ModemManager now; the server asks again every minute");
+  }
 }
 
 bool LiveModem::restoreRate(std::function<void()> done) {
   if (!_rateBefore || _path.empty()) return false;
   const std::uint32_t rate = *std::exchange(_rateBefore, std::nullopt);
-  return _bus.call(_path, signalInterface, "Setup", {rate}, [done = std::move(done)](const QDBusMessage&) {
-    if (done) done();
-  });
+  return _bus.call(_path, modemInterfaces::signal, "Setup", {rate},
+                   [done = std::move(done)](const QDBusMessage&) {
+                     if (done) done();
+                   });
 }
 
 void LiveModem::askForSim() {
   _sim.clear();
-  const std::string sim = busReading::path(properties(modemInterface), "Sim");
+  const std::string sim = busReading::path(properties(modemInterfaces::modem), "Sim");
   if (sim.empty()) return;
-  _bus.getAll(sim, simInterface, [this, choice = _choices](const QDBusMessage& answer) {
+  _bus.getAll(sim, modemInterfaces::sim, [this, choice = _choices](const QDBusMessage& answer) {
     const auto found = busReading::propertiesOf(answer);
     if (choice != _choices || !found) return;
     merge(_sim, *found);
@@ -385,8 +405,8 @@ void LiveModem::askForSim() {
 }
 
 std::vector<std::string> LiveModem::bearerPaths() const {
-  std::vector<std::string> paths = busReading::paths(properties(modemInterface), "Bearers");
-  const std::string initial = busReading::path(properties(networkInterface), "InitialEpsBearer");
+  std::vector<std::string> paths = busReading::paths(properties(modemInterfaces::modem), "Bearers");
+  const std::string initial = busReading::path(properties(modemInterfaces::network), "InitialEpsBearer");
   if (!initial.empty() && std::ranges::find(paths, initial) == paths.end()) paths.push_back(initial);
   return paths;
 }
@@ -396,7 +416,7 @@ void LiveModem::askForBearers() {
   std::erase_if(_bearers,
                 [&](const auto& bearer) { return std::ranges::find(paths, bearer.first) == paths.end(); });
   for (const std::string& path : paths)
-    _bus.getAll(path, bearerInterface, [this, path, choice = _choices](const QDBusMessage& answer) {
+    _bus.getAll(path, modemInterfaces::bearer, [this, path, choice = _choices](const QDBusMessage& answer) {
       const auto found = busReading::propertiesOf(answer);
       if (choice != _choices || !found) return;
       const auto listed = bearerPaths();
@@ -409,7 +429,7 @@ void LiveModem::askForBearers() {
 // ---- Packets ----
 
 void LiveModem::sendLater() {
-  if (_device.empty() || _isSending || _isEnding) return;
+  if (_name.empty() || _isSending || _isEnding) return;  // no modem was chosen yet, or it waits already
   _isSending = true;
   _setup.queue.after(burst, [this, life = std::weak_ptr(_life)] {
     if (life.expired()) return;
@@ -428,10 +448,11 @@ void LiveModem::send() {
   std::vector<BearerReading> bearers;
   for (const auto& [path, properties] : _bearers) bearers.push_back(busReading::bearerOf(properties));
   _feed.send(packetDataLogCode, packetDataOf(bearers));
-  const Value files =
-      simFilesOf({.identifier = busReading::simIdentifierOf(_sim),
-                  .ownNumbers = busReading::textsOf(properties(modemInterface), "OwnNumbers")});
-  if (!files.dictionary()->empty()) _feed.send(simFilesLogCode, files);
+  const SimReading sim{.identifier = busReading::simIdentifierOf(_sim),
+                       .ownNumbers = busReading::textsOf(properties(modemInterfaces::modem), "OwnNumbers")};
+  // Empty texts take back those of a card that has gone.
+  _hasToldSim = _hasToldSim || !sim.identifier.empty() || !sim.ownNumbers.empty();
+  if (_hasToldSim) _feed.send(simFilesLogCode, simFilesOf(sim));
   _feed.send(modemReport::logCode, modemReportOf(modem),
              modem.position ? Repetition::IsSent : Repetition::IsLeftOut);
 }
@@ -439,14 +460,15 @@ void LiveModem::send() {
 ModemReading LiveModem::reading() const {
   ModemReading reading{.position = position()};
   if (!isUsable()) return reading;
-  const QVariantMap &modem = properties(modemInterface), &network = properties(networkInterface);
+  const QVariantMap &modem = properties(modemInterfaces::modem),
+                    &network = properties(modemInterfaces::network);
   const std::int64_t technologies = busReading::number(modem, "AccessTechnologies").value_or(0);
   reading.registrationState = busReading::number(network, "RegistrationState");
   reading.operatorName = busReading::text(network, "OperatorName");
   reading.network = busReading::text(network, "OperatorCode");
   reading.accessTechnologies = busReading::accessTechnologiesOf(technologies);
   reading.signalQuality = busReading::signalQualityOf(modem);
-  reading.cells = joined(_cells, busReading::signalsOf(properties(signalInterface)), _location,
+  reading.cells = joined(_cells, busReading::signalsOf(properties(modemInterfaces::signal)), _location,
                          busReading::servingRadioOf(technologies));
   return reading;
 }

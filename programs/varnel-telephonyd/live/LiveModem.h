@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QDateTime>
 #include <chrono>
 #include <cstdint>
 #include <functional>
@@ -32,9 +33,13 @@ class LiveModem final {
     /// The modem's index, the path of its object, or its device as ModemManager names it; empty: any.
     std::string wanted{};
     std::chrono::seconds pollInterval{5};
+    /// How long an answer of ModemManager may take. A later one counts as an error.
+    std::chrono::milliseconds answerPatience{10'000};
     /// Whether positions are told, from the modem or from gpsd. Without it nobody is asked for them.
     bool tellsPosition = false;
     std::uint16_t positionPort = PositionClient::usualPort;
+    /// The host's time in UTC, whose date goes with a fix that has a time of day alone.
+    std::function<QDateTime()> now = [] { return QDateTime::currentDateTimeUtc(); };
     /// Tells the server's user one sentence.
     std::function<void(const std::string& sentence)> tell;
   };
@@ -114,6 +119,7 @@ class LiveModem final {
 
   QVariantMap _sim;
   std::map<std::string, QVariantMap> _bearers;  // by path
+  bool _hasToldSim = false;                     // packets have named a card or its numbers
   std::vector<CellReading> _cells;              // of GetCellInfo
   bool _hasFreshCells = false;                  // since the last packets
   std::optional<NetworkLocation> _location;
@@ -123,7 +129,8 @@ class LiveModem final {
   CellInfo _cellInfo = CellInfo::IsAskedFor;
   bool _awaitsCells = false, _awaitsLocation = false, _awaitsRate = false;
   bool _isRateRefused = false;
-  std::optional<std::uint32_t> _rateBefore;  // absent unless this object has changed it
+  std::optional<std::chrono::milliseconds> _rateRetryAt;  // after an error that may pass
+  std::optional<std::uint32_t> _rateBefore;               // absent unless this object has changed it
   std::unique_ptr<RepeatingTimer> _polling;
   bool _isSending = false;  // packets will be made soon
   bool _isEnding = false;

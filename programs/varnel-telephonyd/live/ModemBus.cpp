@@ -7,6 +7,8 @@
 #include <QStringList>
 #include <utility>
 
+#include "programs/varnel-telephonyd/live/ModemInterfaces.h"
+
 namespace varnel {
 
 using namespace std::chrono_literals;
@@ -17,9 +19,8 @@ const QString service = QStringLiteral("org.freedesktop.ModemManager1");
 const QString rootPath = QStringLiteral("/org/freedesktop/ModemManager1");
 const QString objectManager = QStringLiteral("org.freedesktop.DBus.ObjectManager");
 const QString properties = QStringLiteral("org.freedesktop.DBus.Properties");
-const QString modemInterface = QStringLiteral("org.freedesktop.ModemManager1.Modem");
 
-constexpr std::chrono::milliseconds patience = 10s, busInterval = 5s;
+constexpr std::chrono::milliseconds busInterval = 5s;
 // A service that takes this many calls without an answer gets no more.
 constexpr std::size_t mostOpenCalls = 64;
 
@@ -34,8 +35,8 @@ bool hasSignature(const QDBusMessage& message, const char* signature) {
 
 }  // namespace
 
-ModemBus::ModemBus(MainQueue& queue, Handlers handlers)
-    : _queue(queue), _handlers(std::move(handlers)), _name(nameOfNext()), _bus(_name) {}
+ModemBus::ModemBus(MainQueue& queue, std::chrono::milliseconds patience, Handlers handlers)
+    : _queue(queue), _patience(patience), _handlers(std::move(handlers)), _name(nameOfNext()), _bus(_name) {}
 
 ModemBus::~ModemBus() { disconnectFromBus(); }
 
@@ -63,12 +64,13 @@ void ModemBus::connectToBus() {
 void ModemBus::send(const QDBusMessage& message, Answer answer) {
   _finished.clear();
   auto call =
-      std::make_unique<QDBusPendingCallWatcher>(_bus.asyncCall(message, static_cast<int>(patience.count())));
+      std::make_unique<QDBusPendingCallWatcher>(_bus.asyncCall(message, static_cast<int>(_patience.count())));
   QDBusPendingCallWatcher* const watcher = call.get();
   _open.emplace(watcher, std::move(call));
   connect(watcher, &QDBusPendingCallWatcher::finished, this,
           [this, watcher, answer = std::move(answer), life = _life] {
-            if (life == _life) answer(watcher->reply());
+            // A bus that has gone makes errors of its own.
+            if (life == _life && _bus.isConnected()) answer(watcher->reply());
             _finished.push_back(std::move(_open.extract(watcher).mapped()));
           });
 }
@@ -152,7 +154,7 @@ void ModemBus::takeAdded(const QDBusMessage& message) {
 
 void ModemBus::takeRemoved(const QDBusMessage& message) {
   if (!_hasAnswered || !hasSignature(message, "oas")) return;
-  if (!message.arguments().value(1).toStringList().contains(modemInterface)) return;
+  if (!message.arguments().value(1).toStringList().contains(modemInterfaces::modem)) return;
   _handlers.removed(message.arguments().value(0).value<QDBusObjectPath>().path().toStdString());
 }
 

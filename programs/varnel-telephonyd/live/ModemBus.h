@@ -40,15 +40,17 @@ class ModemBus final : public QObject {
     std::function<void(const std::string& object, const QString& interface, const QVariantMap& properties)>
         changed;
   };
-  /// Gets the answer, which may be an error. Never called after the service has gone, nor after `ModemBus`.
+  /// Gets the answer, which may be an error. Never called after the service or the bus has gone, nor after
+  /// `ModemBus`.
   using Answer = std::function<void(const QDBusMessage& answer)>;
 
-  ModemBus(MainQueue& queue, Handlers handlers);
+  /// The answer of a call that takes longer than the patience is an error.
+  ModemBus(MainQueue& queue, std::chrono::milliseconds patience, Handlers handlers);
   ~ModemBus() override;
 
   /// Connects, and calls the handlers from now on.
   void start();
-  /// Calls a method. After 10 s the answer is an error. Returns false, and calls nothing, when there is no
+  /// Calls a method. Returns false, and calls nothing, when there is no
   /// bus, or when the service has not answered many earlier calls.
   bool call(const std::string& object, const QString& interface, const char* method,
             const QVariantList& arguments, Answer answer);
@@ -71,6 +73,7 @@ class ModemBus final : public QObject {
   Q_SLOT void takeChanged(const QDBusMessage& message);
 
   MainQueue& _queue;
+  const std::chrono::milliseconds _patience;
   const Handlers _handlers;
   const QString _name;  // of the connection
   QDBusConnection _bus;

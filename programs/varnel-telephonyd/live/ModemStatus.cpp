@@ -2,14 +2,13 @@
 
 #include <utility>
 
+#include "programs/varnel-telephonyd/live/ModemInterfaces.h"
+
 namespace varnel {
 
 namespace {
 
 using Use = ModemStatus::Use;
-
-const QString modemInterface = QStringLiteral("org.freedesktop.ModemManager1.Modem");
-const QString networkInterface = QStringLiteral("org.freedesktop.ModemManager1.Modem.Modem3gpp");
 
 // In the service's enumeration of states. Those up to `connected` follow each other.
 enum State : std::int8_t {
@@ -44,7 +43,7 @@ std::string sentenceOfLock(const std::string& name, std::optional<std::int64_t> 
 
 std::string sentenceOfNetwork(const std::string& name, std::int64_t state,
                               const busReading::Interfaces& modem) {
-  const QVariantMap network = modem.value(networkInterface);
+  const QVariantMap network = modem.value(modemInterfaces::network);
   std::string operatorName = busReading::text(network, "OperatorName");
   if (operatorName.empty()) operatorName = busReading::text(network, "OperatorCode");
   return name + (state == Connected ? " is connected" : " is registered") +
@@ -77,7 +76,7 @@ ModemStatus statusOfLost(const std::string& name) {
 }
 
 std::string nameOfModem(const std::string& path, const busReading::Interfaces& modem) {
-  const QVariantMap properties = modem.value(modemInterface);
+  const QVariantMap properties = modem.value(modemInterfaces::modem);
   const std::string maker = busReading::text(properties, "Manufacturer"),
                     model = busReading::text(properties, "Model");
   if (maker.empty() && model.empty()) return "modem " + indexOf(path);
@@ -86,7 +85,7 @@ std::string nameOfModem(const std::string& path, const busReading::Interfaces& m
 }
 
 ModemStatus statusOf(const std::string& path, const busReading::Interfaces& modem) {
-  const QVariantMap properties = modem.value(modemInterface);
+  const QVariantMap properties = modem.value(modemInterfaces::modem);
   const std::string name = nameOfModem(path, modem);
   const std::int64_t state = busReading::number(properties, "State").value_or(0);
   switch (state) {

@@ -231,8 +231,8 @@ Value positionOf(const Position& position) {
 
 Value simFilesOf(const SimReading& sim) {
   Value files = Value::ofDictionary();
-  setText(*files.dictionary(), "kSimFile_ICCID", sim.identifier);
-  setText(*files.dictionary(), "kSimFile_MSISDN", listed(sim.ownNumbers));
+  files.dictionary()->set("kSimFile_ICCID", sim.identifier);
+  files.dictionary()->set("kSimFile_MSISDN", listed(sim.ownNumbers));
   return files;
 }
 

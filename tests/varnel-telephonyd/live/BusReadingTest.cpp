@@ -133,6 +133,14 @@ TEST(BusReading, ABearerThatIsNotConnectedHasNoAddresses) {
   EXPECT_EQ(bearer.ip4.address, "");
 }
 
+TEST(BusReading, ADeviceMayHaveALongPath) {
+  const QString longest = "/" + QString(4094, 'a');
+  EXPECT_EQ(busReading::deviceOf({{"Device", longest}}), longest.toStdString());
+  EXPECT_EQ(busReading::deviceOf({{"Device", longest + 'a'}}), "");
+  EXPECT_EQ(busReading::deviceOf({{"Device", "/sys/\x1b"}}), "");
+  EXPECT_EQ(busReading::deviceOf({{"Device", 1}}), "");
+}
+
 // ---- Joining what several interfaces tell ----
 
 const NetworkLocation place{.network = "26201", .lac = 1, .tac = 2, .identity = 3};
@@ -152,6 +160,16 @@ TEST(JoinedCells, ALocationCompletesTheServingCell) {
 TEST(JoinedCells, ALocationOfAnotherCellIsLeftOut) {
   const CellReading serving{.radio = Radio::LTE, .isServing = true, .identity = 4};
   EXPECT_THAT(joined({serving}, {}, place, Radio::LTE), ElementsAre(serving));
+}
+
+// Identities of cells are unique in a network alone.
+TEST(JoinedCells, ALocationInAnotherNetworkOrAreaIsLeftOut) {
+  const CellReading elsewhere{.radio = Radio::LTE, .isServing = true, .network = "26202", .identity = 3};
+  EXPECT_THAT(joined({elsewhere}, {}, place, Radio::LTE), ElementsAre(elsewhere));
+  const CellReading before{.radio = Radio::LTE, .isServing = true, .area = 1};
+  EXPECT_THAT(joined({before}, {}, place, Radio::LTE), ElementsAre(before));
+  const CellReading umts{.radio = Radio::UMTS, .isServing = true, .area = 2};
+  EXPECT_THAT(joined({umts}, {}, place, Radio::UMTS), ElementsAre(umts));
 }
 
 TEST(JoinedCells, ALocationAloneIsAServingCell) {

@@ -92,14 +92,21 @@ class LiveModemTest : public testing::Test {
   }
 
   enum class Positions { AreNotTold, AreTold };
-  void makeLive(const std::string& wanted = {}, Positions positions = Positions::AreNotTold) {
+  void makeLive(const std::string& wanted = {}, Positions positions = Positions::AreNotTold,
+                std::chrono::milliseconds answerPatience = 10s,
+                const std::function<std::chrono::milliseconds()>& uptime = now) {
     _live = std::make_unique<LiveModem>(
         LiveModem::Setup{.queue = _queue,
-                         .uptime = now,
+                         .uptime = uptime,
                          .wanted = wanted,
                          .pollInterval = 1s,
+                         .answerPatience = answerPatience,
                          .tellsPosition = positions == Positions::AreTold,
                          .positionPort = _positionService.serverPort(),
+                         .now =
+                             [] {
+                               return QDateTime({2026, 11, 22}, {14, 0}, Qt::UTC);
+                             },
                          .tell = [this](const std::string& sentence) { _told.push_back(sentence); }});
     _live->start();
   }
@@ -193,6 +200,22 @@ TEST_F(LiveModemTest, WithoutTheRightToAskForCellsTheServingCellIsShown) {
   EXPECT_EQ(_told.size(), 2u) << _told.back();
 }
 
+TEST_F(LiveModemTest, CellsThatWereRefusedAreNotAskedForAgain) {
+  startAll({"add", "0", "then", "cells", "0", "slowly-refused"});
+  const auto count = [&](const std::string& method) {
+    const std::string calls = _service.calls(), part = ' ' + method + '\n';
+    std::size_t found = 0;
+    for (std::size_t at = calls.find(part); at != std::string::npos; at = calls.find(part, at + 1)) ++found;
+    return found;
+  };
+  ASSERT_TRUE(runUntil([&] { return count("GetCellInfo") == 1; }));
+  _viewer.reset();  // before the answer
+  ASSERT_TRUE(runUntil([&] { return _told.size() == 2; }));
+  _viewer = std::make_unique<Viewer>(*_live);
+  ASSERT_TRUE(runUntil([&] { return count("GetLocation") == 2; }));
+  EXPECT_EQ(count("GetCellInfo"), 1u);
+}
+
 TEST_F(LiveModemTest, AnErrorShowsNoOldCells) {
   startAll({"add", "0", "then", "cells", "0", "gsm-neighbor"});
   ASSERT_TRUE(shows(cellMonitor, "ARFCN: 975"));
@@ -200,6 +223,16 @@ TEST_F(LiveModemTest, AnErrorShowsNoOldCells) {
   ASSERT_TRUE(runUntil([&] { return _viewer->last(cellMonitor).find("ARFCN: 975") == std::string::npos; }));
   _service.does({"cells", "0", "gsm-neighbor"});
   EXPECT_TRUE(shows(cellMonitor, "ARFCN: 975"));
+}
+
+TEST_F(LiveModemTest, WithoutAnAnswerThereAreNoOldCells) {
+  _service.start();
+  _service.does({"add", "0", "then", "cells", "0", "gsm-neighbor"});
+  makeLive("", Positions::AreNotTold, 2s);
+  _viewer = std::make_unique<Viewer>(*_live);
+  ASSERT_TRUE(shows(cellMonitor, "ARFCN: 975"));
+  _service.does({"cells", "0", "silent"});
+  EXPECT_TRUE(runUntil([&] { return _viewer->last(cellMonitor).find("ARFCN: 975") == std::string::npos; }));
 }
 
 TEST_F(LiveModemTest, TakesOnlyWhatIsOfItsKindAndInItsRange) {
@@ -224,6 +257,40 @@ TEST_F(LiveModemTest, ShowsCardAndConnections) {
   EXPECT_TRUE(shows(packetData, R"(Bytes Received: "6000000000")"));
   _service.does({"change", "0", "Modem", "Bearers=dbus.Array([], signature='o')"});
   EXPECT_TRUE(shows(packetData, "[]"));
+  // Empty texts empty the rows.
+  _service.does({"change", "0", "Modem", "Sim=dbus.ObjectPath('/')"});
+  EXPECT_TRUE(shows(simFiles, R"({kSimFile_ICCID: "", kSimFile_MSISDN: "+15550100"})"));
+  _service.does({"remove", "0"});
+  EXPECT_TRUE(shows(simFiles, R"({kSimFile_ICCID: "", kSimFile_MSISDN: ""})"));
+}
+
+TEST_F(LiveModemTest, AModemThatHasGoneLeavesNothingBehind) {
+  startAll({"card", "8949", "then", "bearer", "4", "then", "add", "0", "then", "cells", "0", "lte"});
+  ASSERT_TRUE(shows(cellMonitor, "LTE"));
+  ASSERT_TRUE(shows(packetData, "internet.example"));
+  ASSERT_TRUE(shows(simFiles, "8949"));
+  _service.does({"remove", "0"});
+  EXPECT_TRUE(shows(modemReport, "{Version: 1}"));
+  EXPECT_EQ(_viewer->last(cellMonitor), "[]");
+  EXPECT_EQ(_viewer->last(packetData), "[]");
+  EXPECT_EQ(_viewer->last(simFiles), R"({kSimFile_ICCID: "", kSimFile_MSISDN: ""})");
+}
+
+// A device behind many hubs.
+TEST_F(LiveModemTest, TheDeviceOfAModemMayHaveALongPath) {
+  const std::string device = "/sys/devices/" + std::string(200, 'a') + "/usb1/1-";
+  _service.start();
+  _service.does({"add", "0", "8", device + "1", "then", "add", "1", "8", device + "2"});
+  makeLive(device + "2");
+  _viewer = std::make_unique<Viewer>(*_live);
+  EXPECT_TRUE(shows(modemReport, "Test Net"));
+  EXPECT_EQ(_live->path(), "/org/freedesktop/ModemManager1/Modem/1");
+}
+
+// An older service may tell none.
+TEST_F(LiveModemTest, AModemNeedsNoDevice) {
+  startAll({"add", "0", "8", ""});
+  EXPECT_TRUE(shows(modemReport, "Test Net"));
 }
 
 // Where the modem's receiver says that it is.
@@ -246,7 +313,7 @@ TEST_F(LiveModemTest, ThePositionIsThatOfTheModemElseThatOfTheService) {
   makeLive("", Positions::AreTold);
   _viewer = std::make_unique<Viewer>(*_live);
   EXPECT_TRUE(shows(modemReport, R"(Position: {Latitude: 52.5000, Longitude: -13.2500, Altitude: 34.0000, )"
-                                 R"(Source: "GNSS"}})"));
+                                 R"(Time: date 817041600s 0us, Source: "GNSS"}})"));
   ASSERT_TRUE(runUntil([&] { return _positionService.hasPendingConnections(); }));
   const std::unique_ptr<QTcpSocket> connection(_positionService.nextPendingConnection());
   connection->write("{\"class\":\"TPV\",\"mode\":2,\"lat\":1.5,\"lon\":2.5}\n");
@@ -329,6 +396,27 @@ TEST_F(LiveModemTest, ARateThatIsRefusedIsToldOnce) {
   EXPECT_TRUE(runUntil([&] { return _told.size() >= 2; }));
   EXPECT_THAT(_told, Contains("ModemManager does not let this user ask for levels; section AS A SERVICE of "
                               "varnel-telephonyd(8) has a rule of polkit"));
+}
+
+TEST_F(LiveModemTest, ARateThatFailsOnceIsAskedForAgain) {
+  _service.start();
+  _service.does({"add", "0", "then", "rate", "0", "failed"});
+  std::chrono::milliseconds later = 0ms;
+  makeLive({}, Positions::AreNotTold, 10s, [&] { return now() + later; });
+  _viewer = std::make_unique<Viewer>(*_live);
+  ASSERT_TRUE(runUntil([&] { return _told.size() == 2; }));
+  EXPECT_EQ(_told[1],
+            "Maker M1 does not tell its levels to ModemManager now; the server asks again every minute");
+  _service.does({"rate", "0"});
+  const std::string before = _service.calls();
+  later = 61s;
+  EXPECT_TRUE(
+      runUntil([&] { return _service.calls().find(" Setup 1\n", before.size()) != std::string::npos; }));
+  bool hasEnded = false;
+  runFor(100ms);
+  _live->end([&] { hasEnded = true; });
+  EXPECT_TRUE(runUntil([&] { return hasEnded; }));
+  EXPECT_THAT(_service.calls(), HasSubstr(" Setup 0\n"));
 }
 
 TEST_F(LiveModemTest, EachStateOfAModemHasOneSentence) {
