@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <charconv>
 #include <chrono>
+#include <cstdint>
+#include <limits>
 #include <utility>
-
-#include "app/RowCourse.h"
 
 namespace varnel {
 
@@ -52,6 +52,7 @@ void RowFacts::follow(Node root, Display display) {
   _summaries.clear();
   _nextAging.reset();
   _display = display;
+  _editionOfCourses = editionOfCourses();
   _root = std::move(root);
   _changes.follow(_root);
 }
@@ -59,7 +60,9 @@ void RowFacts::follow(Node root, Display display) {
 bool RowFacts::haveChanged(Display display) {
   const bool isOtherDisplay = std::exchange(_display, display) != display;
   const bool isAging = _nextAging && _sources.clock.now() >= *_nextAging;
-  if (!isOtherDisplay && !isAging) return false;
+  const auto edition = editionOfCourses();
+  const bool areOtherCourses = std::exchange(_editionOfCourses, edition) != edition;
+  if (!isOtherDisplay && !isAging && !areOtherCourses) return false;
   _nextAging.reset();
   return true;
 }
@@ -67,7 +70,11 @@ bool RowFacts::haveChanged(Display display) {
 CellFacts RowFacts::of(const Row& row) {
   CellFacts facts;
   if (_changes.contains(row.node)) facts.change = CellChange::Changed;
-  if (_sources.history) facts.course = recentCourse(*_sources.history, row.node);
+  if (_sources.courses) {
+    facts.course = _sources.courses->course(row.node);
+  } else if (_sources.history) {
+    facts.course = recentCourse(*_sources.history, row.node);
+  }
   if (!_sources.answers) return facts;
   facts.dimming = dimmingOf(row);
   if (row.node.value()) {
@@ -149,12 +156,13 @@ CellDimming RowFacts::dimmingOf(const Row& row) {
 }
 
 bool RowFacts::isOld(const Time& writtenAt) {
+  const auto age = durationBetween(writtenAt, _sources.clock.now());
+  // When it lies in the future, the clock was set back since then, so nobody knows how long ago that was. A
+  // small step makes no value old.
+  if (age >= oldAge || age <= -oldAge) return true;
+  // A capture can say any time.
+  if (writtenAt.seconds > std::numeric_limits<std::int64_t>::max() - oldAge.count()) return false;
   const Time old{writtenAt.seconds + oldAge.count(), writtenAt.nanoseconds};
-  const Time now = _sources.clock.now();
-  if (now >= old) return true;
-  // The clock was set back since then, so nobody knows how long ago that was. A small step makes no value
-  // old.
-  if (now <= Time{writtenAt.seconds - oldAge.count(), writtenAt.nanoseconds}) return true;
   if (!_nextAging || old < *_nextAging) _nextAging = old;
   return false;
 }

@@ -9,6 +9,7 @@
 #include "LogGenerator/NumberFormats.h"
 #include "app/RecordSummary.h"
 #include "app/RowAnswers.h"
+#include "app/RowCourse.h"
 #include "app/TreeChanges.h"
 #include "app/TreeSearch.h"
 #include "app/ValueHistory.h"
@@ -27,6 +28,7 @@ class RowFacts {
     const Clock& clock;
     const ValueHistory* history = nullptr;  ///< null: no courses
     const RowAnswers* answers = nullptr;    ///< null: changes and courses only
+    const RowCourses* courses = nullptr;    ///< null: those of the history
   };
   /// Whether messages go on changing the display.
   enum class Display { Renewed, Standing };
@@ -62,6 +64,7 @@ class RowFacts {
   RecordSummary summaryOf(const Row& record);
   CellDimming dimmingOf(const Row& row);
   bool isOld(const Time& writtenAt);
+  unsigned editionOfCourses() const { return _sources.courses ? _sources.courses->edition() : 0; }
 
   Sources _sources;
   NumberFormats _formats;
@@ -69,6 +72,7 @@ class RowFacts {
   Node _root;
   TreeChanges _changes;
   Display _display = Display::Renewed;
+  unsigned _editionOfCourses = 0;
   std::optional<Time> _nextAging;  // the first moment when a value that is shown becomes old
   std::unordered_map<const VarnelModelNode*, RecordSummaries> _summaries;  // by list of the tree
 };

@@ -27,7 +27,7 @@ VarnelPaneController& varnelPane(PaneController& controller) {
 
 VarnelApp::VarnelApp(const Host& host)
     : _host(host),
-      _facts({host.model.generator.clock, host.history, host.answers}),
+      _facts({host.model.generator.clock, host.history, host.answers, host.courses}),
       _notices(host.model, host.wayToStartOver, [this] { showNotice(); }) {}
 
 VarnelApp::~VarnelApp() = default;

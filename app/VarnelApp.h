@@ -43,6 +43,8 @@ class VarnelApp final : public VarnelModelObserver, public NavigationStackDelega
     EventHistory* events = nullptr;
     /// What to tell of rows beside their texts: levels, summaries, ages. Null when nobody shows that.
     const RowAnswers* answers = nullptr;
+    /// What the rows show of their courses; null: those of the history.
+    const RowCourses* courses = nullptr;
     /// The clock of the status and of saved snapshots, when that of the model shows the time of a capture;
     /// null: the model's.
     const Clock* usersClock = nullptr;

@@ -70,10 +70,14 @@ void Trends::refresh() {
   if (page()) page()->refresh();
 }
 
+const CaptureHistory* Trends::capture() const {
+  const bool isThere = _capture && (_capture->isReading() || !_capture->isEmpty());
+  return isThere ? _capture.get() : nullptr;
+}
+
 HistoryTrends& Trends::source() {
   if (_saved) return _saved->trends();
-  const bool isThere = _capture && (_capture->isReading() || !_capture->isEmpty());
-  return isThere ? _capture->trends() : _host.live;
+  return capture() ? _capture->trends() : _host.live;
 }
 
 void Trends::openCapture(CaptureHistory::Wish wish) {

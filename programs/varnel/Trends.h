@@ -44,6 +44,8 @@ class Trends final {
   void openSaved(SavedHistory::Wish wish);
   /// Shows the courses of the display again.
   void closeFile();
+  /// The history of that capture. Null when there is none, or when it is no capture.
+  const CaptureHistory* capture() const;
 
   /// Null while no page with courses is open.
   TrendPage* page() const { return _page && _window && _window->page() == _page ? _page.data() : nullptr; }

@@ -8,6 +8,7 @@
 #include "app/VarnelApp.h"
 #include "host/SignalWatcher.h"
 #include "host/StateFolder.h"
+#include "programs/varnel/CaptureCourses.h"
 #include "programs/varnel/HistoryTrends.h"
 #include "programs/varnel/HostServices.h"
 #include "programs/varnel/Player.h"
@@ -40,6 +41,15 @@ class WindowViewer final {
                      [this](const std::string& why) {
                        _userInterface.showAlert({"No Trends", why, "OK"});
                      }}),
+        _courses(
+            {.displays = _history,
+             .clock = _services.playedClock(),
+             .capture =
+                 [this] {
+                   const CaptureHistory* const capture = _trends.capture();
+                   if (!capture || capture->isEmpty()) return std::optional<CaptureCourses::Capture>();
+                   return std::optional(CaptureCourses::Capture{&capture->numbers(), !capture->isReading()});
+                 }}),
         _app({.model = _services.model(),
               .files = _services.files(),
               .preferences = _services.preferences(),
@@ -47,6 +57,7 @@ class WindowViewer final {
               .history = &_history,
               .events = &_events,
               .answers = &_answers,
+              .courses = &_courses,
               .usersClock = &_services.clock()}),
         _rowCommands(_app, _answers),
         _player({_services, _app, _userInterface, options,
@@ -124,6 +135,7 @@ class WindowViewer final {
   RowAnswers _answers;
   HistoryTrends _liveTrends;
   Trends _trends;
+  CaptureCourses _courses;
   VarnelApp _app;
   RowCommands _rowCommands;
   Player _player;

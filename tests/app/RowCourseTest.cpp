@@ -65,6 +65,28 @@ TEST_F(RowCourseTest, OfAStandingNumberStandsUntilFourMinutesAreOver) {
   EXPECT_EQ(course(), (std::vector<std::optional<double>>(24, 8)));
 }
 
+TEST_F(RowCourseTest, AtAnEarlierPointKnowsNothingLater) {
+  for (int second = 0; second <= 40; second += 2) add(second, std::to_string(second));
+  const auto series = history.seriesOfKey("/Cell/Level");
+  ASSERT_TRUE(series);
+  const auto values = recentCourse(history, *series, std::chrono::milliseconds(24'500));
+  ASSERT_EQ(values.size(), 24u);
+  EXPECT_EQ(values[20], 0);
+  EXPECT_EQ(values[21], 10);
+  EXPECT_EQ(values[22], 20);
+  EXPECT_EQ(values[23], 24);
+  EXPECT_EQ(recentCourse(history, *series, std::chrono::seconds(40)), course());
+}
+
+TEST_F(RowCourseTest, FourMinutesAfterTheLastSampleThereIsNone) {
+  add(0, "1");
+  add(2, "2");
+  const auto series = history.seriesOfKey("/Cell/Level");
+  ASSERT_TRUE(series);
+  EXPECT_EQ(recentCourse(history, *series, std::chrono::seconds(242)).back(), 2);
+  EXPECT_THAT(recentCourse(history, *series, std::chrono::seconds(243)), IsEmpty());
+}
+
 TEST_F(RowCourseTest, ATextHasNoCourse) {
   add(0, "1");
   EXPECT_THAT(recentCourse(history, row(1)), IsEmpty());

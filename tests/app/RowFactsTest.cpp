@@ -166,6 +166,22 @@ TEST_F(RowFactsTest, ChangeWhenAShownValueBecomesOld) {
   EXPECT_FALSE(facts.haveChanged(Display::Renewed)) << "it is old already";
 }
 
+TEST_F(RowFactsTest, CoursesThatAreKnownElsewhereReplaceThoseOfTheHistory) {
+  struct Elsewhere final : RowCourses {
+    std::vector<std::optional<double>> course(const VarnelModelNode&) const override { return {-90, -80}; }
+    unsigned edition() const override { return number; }
+    unsigned number = 0;
+  } elsewhere;
+  RowFacts knowing({host.clock, &history, &answers, &elsewhere});
+  follow("-84.0 dBm");
+  knowing.follow(tree, Display::Renewed);
+  EXPECT_THAT(knowing.of(row({"Cell", "RSRP"})).course, ElementsAre(-90, -80));
+  EXPECT_FALSE(knowing.haveChanged(Display::Renewed));
+  elsewhere.number = 1;
+  EXPECT_TRUE(knowing.haveChanged(Display::Renewed));
+  EXPECT_FALSE(knowing.haveChanged(Display::Renewed));
+}
+
 TEST_F(RowFactsTest, AnExplanationTellsMeaningLevelAgeAndChange) {
   follow("-84.0 dBm");
   follow("-85.0 dBm");
