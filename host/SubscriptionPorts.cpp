@@ -23,11 +23,12 @@ MessagePorts::LocalPortCreation SubscriptionPorts::createLocalPort(std::string_v
                                                                    LocalPort::MessageHandler handler) {
   std::optional<SubscriptionFilter> filter;
   if (_wanted) filter.emplace(_wanted);
-  const auto take = [filter, &monitor = _monitor, handler = std::move(handler)](
+  const auto take = [this, filter, handler = std::move(handler)](
                         std::int32_t identifier, ByteView data) mutable -> std::optional<Bytes> {
     const auto subscription = subscriptionOf(data);
     if (filter && !filter->takes(subscription)) return std::nullopt;
-    if (subscription && isShown(identifier, data)) monitor.subscriptionIsShown(*subscription);
+    if (subscription && isShown(identifier, data)) _monitor.subscriptionIsShown(*subscription);
+    ++_messagesTaken;
     return handler(identifier, data);
   };
   return _ports.createLocalPort(name, take);

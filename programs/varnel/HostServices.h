@@ -38,6 +38,8 @@ class HostServices final {
   const Clock& clock() const { return _clock; }
   /// The clock of the models. It shows the machine's time until it follows a capture.
   PlayedClock& playedClock() { return _playedClock; }
+  /// How many messages the models' channels have taken so far.
+  std::uint64_t messagesTaken() const { return _portsOfSubscription.messagesTaken(); }
   Preferences& preferences() { return _preferences; }
 
  private:

@@ -30,8 +30,11 @@ Time laterBy(std::chrono::nanoseconds duration, Time time) {
   const auto seconds = std::chrono::floor<std::chrono::seconds>(duration);
   const std::int64_t nanoseconds = time.nanoseconds + (duration - seconds).count();
   constexpr std::int64_t nanosecondsPerSecond = 1'000'000'000;
-  return {time.seconds + seconds.count() + nanoseconds / nanosecondsPerSecond,
-          static_cast<std::int32_t>(nanoseconds % nanosecondsPerSecond)};
+  const std::int64_t more = seconds.count() + nanoseconds / nanosecondsPerSecond;
+  std::int64_t sum = 0;
+  // A capture can say any time.
+  if (__builtin_add_overflow(time.seconds, more, &sum)) return time;
+  return {sum, static_cast<std::int32_t>(nanoseconds % nanosecondsPerSecond)};
 }
 
 void PlayedClock::follow(Time told, double speed) {

@@ -10,7 +10,7 @@
 
 namespace varnel {
 
-/// The moment that comes so much later.
+/// The moment that comes so much later; the same one when no number holds that.
 Time laterBy(std::chrono::nanoseconds duration, Time time);
 
 /// The host's clock; while a capture is played, the capture's. A server tells now and then how far it is, and

@@ -26,9 +26,10 @@ using namespace std::chrono_literals;
 using Button = PlayBarState::Button;
 using Command = ControlRequest::Command;
 
-constexpr auto intervalOfPlaying = 500ms, intervalOfSeeking = 100ms, intervalOfJump = 50ms;
-// What was sent until a place has arrived then.
-constexpr auto timeToArrive = 150ms;
+constexpr auto intervalOfPlaying = 500ms, intervalOfSeeking = 100ms, intervalOfJump = 20ms;
+// When nothing comes for so long, everything that was sent has arrived. It is looked at only so often.
+constexpr auto timeToArrive = 10ms;
+constexpr unsigned mostLooks = 100;
 // A server that takes longer is told of.
 constexpr auto timeToStart = 500ms;
 constexpr int stepOfSlider_ms = 5000;
@@ -194,7 +195,7 @@ void Player::serverIsReady(unsigned number) {
   _displays.clear();
   _control = std::make_unique<ControlClient>(_own.server->folder());
   _status.reset();
-  _jump.reset();
+  forgetJump();
   _parts.services.connectTo(_own.server->folder());
   setClock();
   if (_own.keepsPanes) {
@@ -212,7 +213,7 @@ void Player::serverHasEnded(unsigned number, const std::string& why) {
     _own.whyItEnded = why;
     _parts.services.link().setEndOfOwnServer("The server of " + printable(_own.name) +
                                              " has ended: " + printable(why) + "; start it again below");
-    _jump.reset();
+    forgetJump();
     _parts.services.playedClock().stand();
     pollAsNeeded();
     return showBar();
@@ -270,7 +271,7 @@ void Player::leaveServer() {
   _displays.clear();
   _control.reset();
   _status.reset();
-  _jump.reset();
+  forgetJump();
   pollAsNeeded();
 }
 
@@ -302,9 +303,8 @@ void Player::close() {
 void Player::startOver() {
   if (_own.kind == Kind::Snapshot) return showDisplay(_display);
   if (_own.whyItEnded) return startAgain();
-  _jump.reset();
-  if (_own.kind == Kind::Replay) _jump = 0;  // until the server has the new link alone
-  _jumpIsSent = _jumpIsTaken = false;
+  endJump();
+  if (_own.kind == Kind::Replay) setJump(JumpStages(0));  // until the server has the new link alone
   setClock();
   _wasConnected = false;  // the new link is asked how far the stream is
   _parts.app.startOver();
@@ -323,9 +323,19 @@ void Player::applicationHasChanged() {
 }
 
 void Player::play() {
+  if (_jump && _status->isPaused) {
+    _goesOnAfterJump = true;
+    return showBar();
+  }
   if (!isAtEnd()) return ask({.command = Command::Continue});
   if (_status->isPaused) ask({.command = Command::Continue});
-  startOverFor(0);
+  startOverFor(JumpStages(0));
+}
+
+void Player::pause() {
+  const bool isHeld = std::exchange(_goesOnAfterJump, false) && _jump;
+  if (!isHeld) return ask({.command = Command::Pause});
+  showBar();
 }
 
 void Player::setSpeed(double speed) { ask({.command = Command::SetSpeed, .speed = speed}); }
@@ -336,33 +346,49 @@ void Player::jump(int place) {
   // At the very start nothing would have arrived.
   const int wanted = std::max(place, 1);
   // The stream has gone on since its last status.
-  const double margin_ms = _status->isPaused ? 0 : 2000 * _status->speed;
+  const double margin_ms = isPaused() ? 0 : 2000 * _status->speed;
   const bool isAhead = !_jump && wanted > milliseconds(*_status->position) + margin_ms;
-  _timeOfJump = timeAt(wanted);
-  _timeOfJumpIsKnown = false;
-  if (!isAhead) return startOverFor(wanted);
-  _jump = wanted;
-  sendJump();
+  if (!isAhead) return startOverFor(JumpStages(wanted));
+  setJump(JumpStages(wanted));
+  hold();
+  beginStages();
   showBar();
 }
 
-// The messages before a place come at once, and tell no times. So the clock shows the place's time before
-// they come.
-std::optional<Time> Player::timeAt(int place) const {
-  if (!_status->time || !_status->position) return std::nullopt;
-  return laterBy(std::chrono::milliseconds(place) - *_status->position, *_status->time);
+// Between two stages nothing else may come, and the stream must not overtake the jump.
+void Player::hold() {
+  if (isPaused()) return;
+  _goesOnAfterJump = true;
+  ask({.command = Command::Pause});
+  _status->isPaused = true;
 }
 
-// The guess is wrong where the capture has long pauses, or where its clock was set.
-bool Player::hasArrivedElsewhere() const {
-  if (_timeOfJumpIsKnown || !_timeOfJump || !_status->time) return false;
-  return std::chrono::abs(durationBetween(*_timeOfJump, *_status->time)) > PlayedClock::longestPause * 2;
+void Player::setJump(const JumpStages& stages) {
+  _jump = stages;
+  _step = Step::AwaitsChannel;
+  ++_jumps;
 }
+
+void Player::forgetJump() {
+  _jump.reset();
+  _goesOnAfterJump = false;
+}
+
+void Player::endJump() {
+  _jump.reset();
+  if (!_goesOnAfterJump || !_control) return;
+  _control->ask({.command = Command::Continue}, [this](const std::optional<ControlReply>& reply) {
+    if (!_jump) _goesOnAfterJump = false;
+    take(reply);
+  });
+}
+
+bool Player::isPaused() const { return _status->isPaused && !_goesOnAfterJump; }
 
 // A display is made of all messages before it, so an earlier one needs a new model.
-void Player::startOverFor(int place) {
-  _jump = place;
-  _jumpIsSent = _jumpIsTaken = false;
+void Player::startOverFor(const JumpStages& stages) {
+  setJump(stages);
+  if (stages.place() > 0) hold();
   _wasConnected = false;
   setClock();
   _parts.app.startOverInPlace();
@@ -373,20 +399,58 @@ void Player::startOverFor(int place) {
 void Player::setClock() {
   PlayedClock& clock = _parts.services.playedClock();
   if (_own.kind != Kind::Replay) return clock.followHost();
-  const auto time = _jump.value_or(0) > 0 ? _timeOfJump : _own.firstTime;
+  const auto time = _own.firstTime || !_status ? _own.firstTime : _status->firstTime;
   if (time) return clock.standAt(*time);
   if (!_jump) clock.followHost();
 }
 
-void Player::sendJump() {
-  _jumpIsSent = true;
-  _jumpIsTaken = false;
-  if (_timeOfJump) _parts.services.playedClock().standAt(*_timeOfJump);
-  const ControlRequest request{.command = Command::Seek, .place = std::chrono::milliseconds(*_jump)};
-  _control->ask(request, [this](const std::optional<ControlReply>& reply) {
-    _jumpIsTaken = true;
+void Player::beginStages() {
+  _jump->begin(milliseconds(*_status->position));
+  sendStage();
+}
+
+void Player::sendStage() {
+  _step = Step::IsSent;
+  if (_status->time && _status->position) {
+    const Time time = _jump->expect(milliseconds(*_status->position), *_status->time);
+    _parts.services.playedClock().standAt(time);
+  }
+  const ControlRequest request{.command = Command::Seek, .place = std::chrono::milliseconds(_jump->next())};
+  _control->ask(request, [this, number = _jumps](const std::optional<ControlReply>& reply) {
+    if (_jump && number == _jumps) _step = Step::IsTaken;
     take(reply);
   });
+}
+
+void Player::followJump(const ServerStatus* status) {
+  if (_step == Step::AwaitsChannel && status) return takeChannel(*status);
+  if (_step != Step::IsTaken || (status && status->isSeeking)) return;
+  if (!status) return endJump();
+  _step = Step::Arrives;
+  awaitArrival(0);
+}
+
+// The server has sent a stage.
+void Player::awaitArrival(unsigned looks) {
+  const auto taken = _parts.services.messagesTaken();
+  const auto look = [this, number = _jumps, taken, looks] {
+    if (!_jump || number != _jumps) return;
+    if (taken != _parts.services.messagesTaken() && looks < mostLooks) return awaitArrival(looks + 1);
+    stageHasArrived();
+  };
+  _parts.services.queue().after(timeToArrive, _whileAlive(look));
+}
+
+void Player::stageHasArrived() {
+  _jump->reach(_status->time);
+  if (!_jump->isDone()) return sendStage();
+  // Else what has come would be taken for much older than it is.
+  if (const auto again = _jump->repetition()) return startOverFor(*again);
+  endJump();
+  _parts.app.refresh();
+  followPlaying();
+  showBar();
+  pollAsNeeded();
 }
 
 void Player::ask(const ControlRequest& request) {
@@ -403,18 +467,7 @@ void Player::poll() {
 void Player::take(const std::optional<ControlReply>& reply) {
   const auto* const status = reply ? std::get_if<ServerStatus>(&*reply) : nullptr;
   if (status) _status = *status;
-  if (_jump && _jumpIsTaken && !(status && status->isSeeking)) {
-    if (status && hasArrivedElsewhere()) {
-      // Else what has come would be taken for much older, or newer, than it is.
-      _timeOfJump = status->time;
-      _timeOfJumpIsKnown = true;
-      return startOverFor(*_jump);
-    }
-    _jump.reset();
-    _parts.services.queue().after(timeToArrive, _whileAlive([this] { _parts.app.refresh(); }));
-  } else if (_jump && !_jumpIsSent && status) {
-    takeChannel(*status);
-  }
+  if (_jump) followJump(status);
   followPlaying();
   showBar();
   pollAsNeeded();
@@ -422,15 +475,15 @@ void Player::take(const std::optional<ControlReply>& reply) {
 
 void Player::followPlaying() {
   if (_own.kind != Kind::Replay || _jump || !_status || !_status->time || _own.whyItEnded) return;
-  const bool stands = _status->isPaused || _status->isSeeking || isAtEnd();
+  const bool stands = isPaused() || _status->isSeeking || isAtEnd();
   _parts.services.playedClock().follow(*_status->time, stands ? 0 : _status->speed);
 }
 
 // The new model's channel has a stream, and that of the former model has gone.
 void Player::takeChannel(const ServerStatus& status) {
   if (!_parts.app.isConnected() || status.channels != 1 || !status.position) return;
-  if (*_jump > 0) return sendJump();
-  _jump.reset();
+  if (_jump->place() > 0) return beginStages();
+  endJump();
 }
 
 bool Player::isAtEnd() const {
@@ -440,10 +493,10 @@ bool Player::isAtEnd() const {
 
 std::optional<std::chrono::milliseconds> Player::pollInterval() const {
   if (!_control || _own.whyItEnded || !_status) return std::nullopt;
-  if (_jump && !_jumpIsSent) return intervalOfJump;
-  if (_jump || _status->isSeeking) return intervalOfSeeking;
+  if (_jump) return intervalOfJump;
+  if (_status->isSeeking) return intervalOfSeeking;
   if (_own.kind == Kind::Replay && !_status->length) return intervalOfPlaying;
-  if (_status->isPaused || isAtEnd()) return std::nullopt;
+  if (isPaused() || isAtEnd()) return std::nullopt;
   return intervalOfPlaying;
 }
 
@@ -461,7 +514,7 @@ PlayBar& Player::bar() {
   PlayBar& added = *made;
   QObject::connect(&added, &PlayBar::playWanted, &added, [this] { play(); });
   QObject::connect(&added, &PlayBar::againWanted, &added, [this] { play(); });
-  QObject::connect(&added, &PlayBar::pauseWanted, &added, [this] { ask({.command = Command::Pause}); });
+  QObject::connect(&added, &PlayBar::pauseWanted, &added, [this] { pause(); });
   QObject::connect(&added, &PlayBar::speedWanted, &added, [this](double speed) { setSpeed(speed); });
   QObject::connect(&added, &PlayBar::dragged, &added, [this](int place) { dragTo(place); });
   QObject::connect(&added, &PlayBar::jumpWanted, &added, [this](int place) { jump(place); });
@@ -527,9 +580,9 @@ PlayBarState Player::stateOfStream() const {
   PlayBarState state{.name = name};
   if (_own.kind == Kind::Port) state.progress = QStringLiteral("Port %1").arg(name);
   if (_own.kind == Kind::Port || !_status) return state;
-  state.button = isAtEnd() ? Button::Again : _status->isPaused ? Button::Play : Button::Pause;
+  state.button = isAtEnd() ? Button::Again : isPaused() ? Button::Play : Button::Pause;
   state.speed = _status->speed;
-  const int position = _jump ? *_jump : milliseconds(_status->position.value_or(0ms));
+  const int position = _jump ? _jump->place() : milliseconds(_status->position.value_or(0ms));
   if (_own.kind == Kind::Simulation) {
     state.progress = QStringLiteral("Simulated · %1").arg(duration(position));
     return state;

@@ -14,6 +14,7 @@
 #include "host/ControlClient.h"
 #include "host/EndingServers.h"
 #include "programs/varnel/HostServices.h"
+#include "programs/varnel/JumpStages.h"
 #include "programs/varnel/SavedDisplays.h"
 #include "widgets/PlayBar.h"
 #include "widgets/StartPage.h"
@@ -77,6 +78,9 @@ class Player final {
 
  private:
   enum class Kind { Usual, Replay, Simulation, Port, Snapshot };
+  // How far the next stage of a jump is: it awaits the channel of a new model, the server has the request,
+  // the server has replied, what it has sent arrives.
+  enum class Step { AwaitsChannel, IsSent, IsTaken, Arrives };
   // A server of the viewer's own, or none.
   struct Own {
     Kind kind = Kind::Usual;
@@ -106,14 +110,21 @@ class Player final {
 
   void applicationHasChanged();
   void play();
+  void pause();
   void setSpeed(double speed);
   void dragTo(int place);
   void jump(int place);
-  void startOverFor(int place);
+  void hold();
+  void setJump(const JumpStages& stages);
+  void forgetJump();
+  void endJump();
+  void startOverFor(const JumpStages& stages);
   void setClock();
-  std::optional<Time> timeAt(int place) const;
-  bool hasArrivedElsewhere() const;
-  void sendJump();
+  void beginStages();
+  void sendStage();
+  void followJump(const ServerStatus* status);
+  void awaitArrival(unsigned looks);
+  void stageHasArrived();
   void ask(const ControlRequest& request);
   void poll();
   void take(const std::optional<ControlReply>& reply);
@@ -122,6 +133,7 @@ class Player final {
   void pollAsNeeded();
   std::optional<std::chrono::milliseconds> pollInterval() const;
   bool isAtEnd() const;
+  bool isPaused() const;
 
   void showBar();
   bool showsStart() const;
@@ -151,11 +163,10 @@ class Player final {
   std::optional<ServerStatus> _status;
   std::unique_ptr<RepeatingTimer> _polling;
   std::chrono::milliseconds _pollingInterval{};
-  std::optional<int> _jump;         // a place that is not reached yet
-  bool _jumpIsSent = false;         // to the server
-  bool _jumpIsTaken = false;        // the server has replied
-  std::optional<Time> _timeOfJump;  // of the place, if it is known or can be guessed
-  bool _timeOfJumpIsKnown = false;
+  std::optional<JumpStages> _jump;  // to a place that is not reached yet
+  Step _step = Step::AwaitsChannel;
+  unsigned _jumps = 0;
+  bool _goesOnAfterJump = false;  // the stream is held for a jump alone
   bool _wasConnected = false;
   bool _hasLooked = false;  // the application has tried to connect
   WhileAlive _whileAlive;

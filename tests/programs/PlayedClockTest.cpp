@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <limits>
+
+#include "LogGenerator/Radios/SeenCells.h"
 #include "tests/support/FakeClock.h"
 
 namespace varnel {
@@ -119,6 +122,52 @@ TEST_F(PlayedClockTest, StandsWhenTheCaptureIsNoLongerPlayed) {
   EXPECT_EQ(clock.now(), (Time{2'000'000'000, 0}));
 }
 
+TEST_F(PlayedClockTest, NeighborsAgeAsFastAsTheCaptureIsPlayed) {
+  Section section;
+  section.bind(Value::ofDictionary());
+  SeenCells cells([](const Dictionary&) { return std::optional<CellPlace>(); });
+  const auto count = [&] {
+    cells.begin(section, clock.now());
+    cells.show(section);
+    const Array* const list = section.container().dictionary()->get(SeenCells::listEntry).array();
+    return list ? list->size() : 0;
+  };
+  clock.follow(at(0), 8);
+  cells.begin(section, clock.now());
+  cells.see({1, 16})->set("Physical Cell ID", "16");
+  for (const int second : {8, 16, 24}) {
+    uptime += 1s;
+    clock.follow(at(second), 8);
+    EXPECT_EQ(count(), 1u) << second;
+  }
+  uptime += 625ms;
+  EXPECT_EQ(count(), 1u) << "29 s";
+  clock.follow(at(29), 0);
+  uptime += std::chrono::hours(1);
+  EXPECT_EQ(count(), 1u) << "paused";
+  clock.follow(at(29), 8);
+  uptime += 125ms;
+  EXPECT_EQ(count(), 0u) << "30 s";
+}
+
+TEST_F(PlayedClockTest, NeighborsStayWhenAJumpGoesBack) {
+  Section section;
+  section.bind(Value::ofDictionary());
+  SeenCells cells([](const Dictionary&) { return std::optional<CellPlace>(); });
+  clock.standAt(at(300));
+  cells.begin(section, clock.now());
+  cells.see({1, 16});
+  cells.show(section);
+  const Array& list = *section.container().dictionary()->get(SeenCells::listEntry).array();
+  clock.standAt(at(20));
+  cells.begin(section, clock.now());
+  EXPECT_EQ(list.size(), 1u);
+  clock.standAt(at(50));
+  cells.begin(section, clock.now());
+  cells.show(section);
+  EXPECT_EQ(section.container().dictionary()->get(SeenCells::listEntry).array()->size(), 0u);
+}
+
 TEST_F(PlayedClockTest, HasTheHostsTimeZone) {
   host.setZone({7200, false});
   clock.follow(at(10), 1);
@@ -128,6 +177,9 @@ TEST_F(PlayedClockTest, HasTheHostsTimeZone) {
 TEST_F(PlayedClockTest, KeepsNanosecondsInRange) {
   EXPECT_EQ(laterBy(600ms, {10, 500'000'000}), (Time{11, 100'000'000}));
   EXPECT_EQ(laterBy(-600ms, {10, 500'000'000}), (Time{9, 900'000'000}));
+  constexpr Time last{std::numeric_limits<std::int64_t>::max(), 500'000'000};
+  EXPECT_EQ(laterBy(600ms, last), last);
+  EXPECT_EQ(laterBy(200ms, last), (Time{last.seconds, 700'000'000}));
 }
 
 }  // namespace

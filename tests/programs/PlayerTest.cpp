@@ -18,9 +18,12 @@
 #include <utility>
 #include <vector>
 
+#include "app/RowAnswers.h"
 #include "app/Snapshot.h"
 #include "base/PropertyList.h"
 #include "host/CaptureWriter.h"
+#include "programs/varnel/CaptureCourses.h"
+#include "programs/varnel/CaptureHistory.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/EventLoop.h"
 #include "tests/support/Process.h"
@@ -50,10 +53,19 @@ class PlayerTest : public testing::Test {
     ::setenv("TZ", "UTC", 1);
     _options.deviceRoot = _device.path().string();
     _services.emplace(_options, _application);
+    _answers.emplace(_services->model().generator.resources, _services->playedClock(), _history);
+    _courses.emplace(CaptureCourses::Sources{_history, _services->playedClock(), [this] {
+                                               return _whole ? std::optional(CaptureCourses::Capture{
+                                                                   &_whole->numbers(), !_whole->isReading()})
+                                                             : std::nullopt;
+                                             }});
     _app.emplace(VarnelApp::Host{.model = _services->model(),
                                  .files = _services->files(),
                                  .preferences = _services->preferences(),
                                  .userInterface = _userInterface,
+                                 .history = &_history,
+                                 .answers = &*_answers,
+                                 .courses = &*_courses,
                                  .usersClock = &_services->clock()});
     _player.emplace(
         Player::Parts{*_services, *_app, _userInterface, _options, {}, [this](const Player::Saved& saved) {
@@ -65,14 +77,16 @@ class PlayerTest : public testing::Test {
 
   // A capture with a packet per second, the first of them at 2023-11-14 22:13:20. The LTE technology shows
   // the second, up to 255, as the number of antennas. From second 30 on, the clock may have leapt ahead.
-  std::string capture(int seconds, const std::string& name = "walk.pcap", int leap = 0) const {
+  // After the last value, the packets say something else.
+  std::string capture(int seconds, const std::string& name = "walk.pcap", int leap = 0,
+                      int lastValue = 1000) const {
     const std::string path = _files.file(name);
     CaptureWriter writer(path, ExistingRecording::Replaced, "kalvi-lte");
     for (int second = 0; second <= seconds; ++second) {
       Bytes message(22, 0);
       message[0] = 1;
       message[1] = 21;
-      message[3] = 0xC1;
+      message[3] = second <= lastValue ? 0xC1 : 0xC3;
       message[4] = 0xB0;
       message[13] = 1;
       message[20] = static_cast<std::uint8_t>(second);
@@ -130,6 +144,30 @@ class PlayerTest : public testing::Test {
       if (row.starts_with(start)) return std::atoi(row.c_str() + start.size());
     return -1;
   }
+  // What the row of the number shows beside its texts.
+  CellFacts factsShown() {
+    for (const RowWidget* row : pane().tableWidget().visibleRows())
+      if (row->name() == "Num Tx Antennas") return row->facts();
+    return {};
+  }
+  // The moment when it was written, in seconds of the capture.
+  std::int64_t secondWritten() {
+    const auto* const row =
+        dynamic_cast<const VarnelModelLeafNode*>(_app->nodeAt({section, "Num Tx Antennas"}));
+    return row && row->writtenAt() ? row->writtenAt()->seconds - 1'700'000'000 : -1;
+  }
+  void pausePlaying() {
+    ASSERT_TRUE(waitForBar([](const auto& state) { return !state.clock.isEmpty() && state.length > 0; }));
+    QTest::mouseClick(&bar()->playButton(), Qt::LeftButton);
+    ASSERT_TRUE(waitForBar([](const auto& state) { return state.button == PlayBarState::Button::Play; }));
+  }
+  void jumpTo(int second) {
+    Q_EMIT bar()->jumpWanted(second * 1000 + 500);
+    ASSERT_TRUE(waitForBar([&](const auto& state) { return state.place == second * 1000; })) << barTexts();
+    bool isShown = false;
+    _services->queue().async([&isShown] { isShown = true; });
+    ASSERT_TRUE(runUntil([&isShown] { return isShown; }));
+  }
   PlayBar* bar() { return dynamic_cast<PlayBar*>(window().bar()); }
   bool waitForBar(const std::function<bool(const PlayBarState& state)>& condition) {
     return runUntil([&] { return bar() && condition(bar()->state()); });
@@ -164,6 +202,10 @@ class PlayerTest : public testing::Test {
   Options _options;
   WidgetUserInterface _userInterface{{.startOver = [this] { _player->startOver(); }}};
   std::optional<HostServices> _services;
+  ValueHistory _history;
+  std::optional<CaptureHistory> _whole;
+  std::optional<RowAnswers> _answers;
+  std::optional<CaptureCourses> _courses;
   std::optional<VarnelApp> _app;
   std::vector<Player::Saved> _saved;
   std::optional<Player> _player;
@@ -278,6 +320,97 @@ TEST_F(PlayerTest, AJumpOverALeapOfTheClockStampsValuesWithTheTimeOfItsPlace) {
   const auto written = static_cast<const VarnelModelLeafNode*>(row)->writtenAt();
   ASSERT_TRUE(written);
   EXPECT_NEAR(static_cast<double>(written->seconds), 1'700'001'050, 2);
+}
+
+TEST_F(PlayerTest, AfterAJumpValuesAreAboutAsOldAsInTheCapture) {
+  launch(capture(200, "walk.pcap", 0, 20));
+  openRow(section);
+  pausePlaying();
+  jumpTo(150);
+  EXPECT_EQ(secondShown(), 20);
+  EXPECT_EQ(secondWritten(), 30) << "the end of a stage";
+  EXPECT_EQ(factsShown().dimming, CellDimming::Value);
+  jumpTo(70);
+  EXPECT_EQ(secondShown(), 20);
+  EXPECT_EQ(secondWritten(), 25);
+  EXPECT_EQ(factsShown().dimming, CellDimming::None);
+  jumpTo(90);
+  EXPECT_EQ(secondWritten(), 25) << "nothing new has come";
+  EXPECT_EQ(factsShown().dimming, CellDimming::Value);
+  jumpTo(10);
+  EXPECT_EQ(secondShown(), 10);
+  EXPECT_EQ(secondWritten(), 10);
+  EXPECT_EQ(factsShown().dimming, CellDimming::None);
+}
+
+TEST_F(PlayerTest, NothingBecomesOldWhileTheFileIsPaused) {
+  launch(capture(200, "walk.pcap", 0, 20));
+  openRow(section);
+  pausePlaying();
+  Q_EMIT bar()->speedWanted(1000);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return state.speed == 1000; }));
+  jumpTo(40);
+  const Time before = _services->playedClock().now();
+  EXPECT_EQ(factsShown().dimming, CellDimming::None);
+  // Played at this speed, the value would be old.
+  QTest::qWait(100);
+  _app->refresh();
+  EXPECT_EQ(_services->playedClock().now(), before);
+  EXPECT_EQ(factsShown().dimming, CellDimming::None);
+  EXPECT_EQ(secondShown(), 20);
+  QTest::mouseClick(&bar()->playButton(), Qt::LeftButton);
+  EXPECT_TRUE(runUntil([this] {
+    _app->refresh();
+    return factsShown().dimming == CellDimming::Value;
+  }));
+}
+
+TEST_F(PlayerTest, AJumpWhileTheFileIsPlayedGoesOnThere) {
+  launch(capture(200));
+  openRow(section);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return !state.clock.isEmpty() && state.length > 0; }));
+  for (const int place : {150'500, 100'500}) {
+    Q_EMIT bar()->jumpWanted(place);
+    EXPECT_EQ(bar()->state().button, PlayBarState::Button::Pause);
+    EXPECT_TRUE(waitForBar([&](const auto& state) {
+      return state.place > place && state.place < place + 40'000;
+    })) << barTexts();
+    EXPECT_EQ(bar()->state().button, PlayBarState::Button::Pause);
+    EXPECT_TRUE(runUntil([&] { return secondShown() > place / 1000; }));
+    EXPECT_LT(secondShown(), place / 1000 + 40);
+  }
+}
+
+TEST_F(PlayerTest, APauseDuringAJumpIsThatOfItsPlace) {
+  launch(capture(200));
+  openRow(section);
+  ASSERT_TRUE(waitForBar([](const auto& state) { return !state.clock.isEmpty() && state.length > 0; }));
+  Q_EMIT bar()->jumpWanted(150'500);
+  QTest::mouseClick(&bar()->playButton(), Qt::LeftButton);
+  EXPECT_EQ(bar()->state().button, PlayBarState::Button::Play);
+  EXPECT_TRUE(waitForBar([](const auto& state) { return state.place == 150'000; })) << barTexts();
+  EXPECT_TRUE(runUntil([this] { return secondShown() == 150; }));
+  EXPECT_EQ(bar()->state().button, PlayBarState::Button::Play);
+}
+
+TEST_F(PlayerTest, AfterAJumpARowHasItsCourseUpToThere) {
+  const std::string path = capture(200);
+  _whole.emplace(CaptureHistory::Wish{.path = path, .program = VARNEL_NUMBERS_PROGRAM});
+  ASSERT_TRUE(runUntil([this] { return !_whole->isReading(); }));
+  ASSERT_EQ(_whole->remark(), "");
+  launch(path);
+  openRow(section);
+  pausePlaying();
+  for (const int second : {150, 60}) {
+    jumpTo(second);
+    const auto course = factsShown().course;
+    ASSERT_THAT(course, SizeIs(24));
+    ASSERT_TRUE(course[23]);
+    EXPECT_NEAR(*course[23], second, 2);
+    ASSERT_TRUE(course[18]);
+    EXPECT_NEAR(*course[18], second - 50, 10);
+    EXPECT_EQ(course[23 - second / 10 - 2], std::nullopt) << "before the file";
+  }
 }
 
 TEST_F(PlayerTest, TheEndIsShownAndTheCaptureIsPlayedAgain) {
