@@ -34,10 +34,11 @@ std::string TextPage::text() const {
 }
 
 TextViewer::TextViewer(const ModelServices& services, DeviceFiles& files, TextOutput& output,
-                       std::string wayToStartOver)
+                       std::string wayToStartOver, const Clock* usersClock)
     : _services(services),
       _files(files),
       _output(output),
+      _usersClock(usersClock ? *usersClock : services.generator.clock),
       _notices(services, std::move(wayToStartOver), [this] { showIfNew(); }) {
   startOver();
 }
@@ -57,8 +58,7 @@ void TextViewer::afterUpdates(unsigned count, std::function<void()> task) {
 }
 
 void TextViewer::save() {
-  const auto writing =
-      saveSnapshotWithoutDescription(_files, _services.generator.clock, _model->getSaveContents());
+  const auto writing = saveSnapshotWithoutDescription(_files, _usersClock, _model->getSaveContents());
   if (writing) {
     _notices.snapshotWasWritten(*writing);
   } else {
@@ -69,7 +69,7 @@ void TextViewer::save() {
 void TextViewer::updateViewControllerFromModel() {
   const auto root = _model->topLevelNodes();
   if (_model->isConnected()) {
-    _updateMessage = updateMessage(_services.generator.clock);
+    _updateMessage = updateMessage(_usersClock);
     _page.status = *_updateMessage;
   } else {
     _page.status = notConnectedStatus;

@@ -36,9 +36,9 @@ class TextOutput {
 class TextViewer final : public VarnelModelObserver {
  public:
   /// Shows the first status. The model connects once the main queue runs. `wayToStartOver` is what users have
-  /// to do, such as "press R".
+  /// to do, such as "press R". `usersClock` is the clock of the status and of snapshots; null: the model's.
   TextViewer(const ModelServices& services, DeviceFiles& files, TextOutput& output,
-             std::string wayToStartOver);
+             std::string wayToStartOver, const Clock* usersClock = nullptr);
 
   /// Calls the task once, after this many refreshes were shown.
   void afterUpdates(unsigned count, std::function<void()> task);
@@ -59,6 +59,7 @@ class TextViewer final : public VarnelModelObserver {
   ModelServices _services;
   DeviceFiles& _files;
   TextOutput& _output;
+  const Clock& _usersClock;
   TextPage _page;   // the page to show next
   TextPage _shown;  // the page shown last
   NoticeKeeper _notices;

@@ -1,6 +1,7 @@
 #include "programs/varnel/PlayedFile.h"
 
 #include <QCoreApplication>
+#include <chrono>
 #include <filesystem>
 #include <stdexcept>
 
@@ -8,6 +9,12 @@
 #include "host/captures/Capture.h"
 
 namespace varnel {
+
+namespace {
+
+constexpr std::chrono::milliseconds intervalOfPlaying(500);
+
+}  // namespace
 
 std::vector<std::string> argumentsForReplay(const Options& options, const std::string& capture,
                                             const std::optional<std::string>& technology) {
@@ -47,13 +54,37 @@ void PlayedFile::play(const Options& options) {
   const int status = _start.exec();
   if (!_trouble.empty()) throw std::runtime_error(_trouble);
   _services.connectTo(_server->folder());
+  _firstTime = firstTimeOf(*options.file);
+  _control = std::make_unique<ControlClient>(_server->folder());
+  startOver();
   if (_server->isReady()) return;
   // The wish to end has ended the wait alone.
   QMetaObject::invokeMethod(
       QCoreApplication::instance(), [status] { QCoreApplication::exit(status); }, Qt::QueuedConnection);
 }
 
+void PlayedFile::startOver() {
+  if (!_control) return;
+  if (_firstTime) _services.playedClock().standAt(*_firstTime);
+  _polling = _services.queue().repeating(intervalOfPlaying, [this] { followPlaying(); });
+}
+
+void PlayedFile::followPlaying() {
+  if (_control->isWaiting()) return;
+  _control->ask({}, [this](const std::optional<ControlReply>& reply) { take(reply); });
+}
+
+void PlayedFile::take(const std::optional<ControlReply>& reply) {
+  const auto* const status = reply ? std::get_if<ServerStatus>(&*reply) : nullptr;
+  if (!status || !status->time) return;
+  const bool isAtEnd = status->position && status->length && *status->position >= *status->length;
+  _services.playedClock().follow(*status->time, isAtEnd || status->isPaused ? 0 : status->speed);
+  if (isAtEnd) _polling.reset();
+}
+
 void PlayedFile::serverHasEnded(const std::string& file, const std::string& why) {
+  _polling.reset();
+  _services.playedClock().stand();
   if (_server->isReady())
     return _services.link().setEndOfOwnServer("The server that plays " + printable(file) + " has ended: " +
                                               printable(why) + "; start varnel again to see the file again");

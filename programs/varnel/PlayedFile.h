@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "host/ChildServer.h"
+#include "host/ControlClient.h"
 #include "programs/varnel/HostServices.h"
 #include "programs/varnel/SavedDisplays.h"
 
@@ -22,7 +23,7 @@ std::vector<std::string> argumentsForReplay(const Options& options, const std::s
 std::optional<Time> firstTimeOf(const std::string& capture);
 
 /// The file that the command line names, for a viewer that shows nothing else: the displays of a snapshot, or
-/// a capture that is played by a server of the viewer's own.
+/// a capture that is played by a server of the viewer's own. The clock of the models follows the capture.
 class PlayedFile final {
  public:
   /// Without a file in the options does nothing. For a capture runs the event loop until models can connect
@@ -34,17 +35,24 @@ class PlayedFile final {
 
   /// The displays of a snapshot, the oldest first; empty when the file is none.
   const std::vector<Generation>& displays() const { return _displays; }
+  /// A new model gets the capture from its start. Call this before it connects.
+  void startOver();
 
  private:
   void serverHasEnded(const std::string& file, const std::string& why);
 
   void play(const Options& options);
+  void followPlaying();
+  void take(const std::optional<ControlReply>& reply);
 
   HostServices& _services;
   std::vector<Generation> _displays;
   QEventLoop _start;
   std::string _trouble;  // why the server has ended before it was ready
   std::unique_ptr<ChildServer> _server;
+  std::optional<Time> _firstTime;  // of the capture, if it is known
+  std::unique_ptr<ControlClient> _control;
+  std::unique_ptr<RepeatingTimer> _polling;  // absent at the end of the capture
 };
 
 }  // namespace varnel

@@ -127,8 +127,13 @@ class TerminalViewer final {
              .redraw = [this] { _screen->redraw(); }},
             [this](const CellGrid& grid) { _screen->show(grid); }, _screen->glyphs()),
         _answers(_services.model().generator.resources, _services.model().generator.clock, _history),
-        _app({_services.model(_held.lines()), _services.files(), _services.preferences(), _userInterface,
-              "press R", &_history}),
+        _app({.model = _services.model(_held.lines()),
+              .files = _services.files(),
+              .preferences = _services.preferences(),
+              .userInterface = _userInterface,
+              .wayToStartOver = "press R",
+              .history = &_history,
+              .usersClock = &_services.clock()}),
         _input(STDIN_FILENO, QSocketNotifier::Read),
         _trimming(_services.queue().repeating(intervalOfTrimming, [this] { _held.trim(); })) {
     QObject::connect(&_input, &QSocketNotifier::activated, &_input, [this] { takeKeys(); });
@@ -147,7 +152,11 @@ class TerminalViewer final {
   }
 
  private:
-  void startOver() { _file.displays().empty() ? _app.startOver() : showSaved(); }
+  void startOver() {
+    if (!_file.displays().empty()) return showSaved();
+    _file.startOver();
+    _app.startOver();
+  }
   // The last display of the snapshot.
   void showSaved() {
     const Generation& saved = _file.displays().back();
@@ -246,7 +255,7 @@ class TerminalViewer final {
   const SignalWatcher _watcher;  // before the screen: a signal must not end the program while it is in use
   HeldLines _held;
   HostServices _services;
-  const PlayedFile _file;
+  PlayedFile _file;
   std::optional<CursesScreen> _screen;
   TerminalUserInterface _userInterface;
   ValueHistory _history;

@@ -38,7 +38,7 @@ int viewAsText(int& argumentCount, char** arguments, const Options& options,
   HostApplication host(argumentCount, arguments);
   StandardOutput output;
   HostServices services(options, application);
-  const PlayedFile file(options, services);
+  PlayedFile file(options, services);
   int status = 0;
   output.setEndHandler([&](int error) {
     if (error != 0) {
@@ -53,10 +53,14 @@ int viewAsText(int& argumentCount, char** arguments, const Options& options,
     return status;
   }
   std::optional<TextViewer> viewer;
+  const auto startOver = [&] {
+    file.startOver();
+    viewer->startOver();
+  };
   const KeyWatcher keys([&](char key) {
     switch (std::toupper(static_cast<unsigned char>(key))) {
       case 'R':
-        viewer->startOver();
+        startOver();
         break;
       case 'S':
         viewer->save();
@@ -66,12 +70,12 @@ int viewAsText(int& argumentCount, char** arguments, const Options& options,
     }
   });
   viewer.emplace(services.model(output.lines()), services.files(), output,
-                 keys.isWatching() ? "press R" : "send it SIGUSR1");
+                 keys.isWatching() ? "press R" : "send it SIGUSR1", &services.clock());
   if (options.updates) viewer->afterUpdates(*options.updates, [&] { host.end(status); });
   const SignalWatcher watcher({SIGINT, SIGTERM, SIGHUP, SIGUSR1, SIGUSR2, SIGWINCH}, [&](int signal) {
     switch (signal) {
       case SIGUSR1:
-        viewer->startOver();
+        startOver();
         break;
       case SIGUSR2:
         viewer->save();

@@ -22,6 +22,7 @@ using testing::ElementsAre;
 using testing::EndsWith;
 using testing::HasSubstr;
 using testing::IsEmpty;
+using testing::Not;
 using testing::SizeIs;
 using testing::StartsWith;
 
@@ -70,6 +71,23 @@ class TextViewerTest : public testing::Test {
 };
 
 TEST_F(TextViewerTest, TheFirstPageIsTheStatusAlone) { EXPECT_THAT(pages(), ElementsAre("Connecting...\n")); }
+
+TEST_F(TextViewerTest, TheStatusHasTheTimeOfTheUsersClock) {
+  FakeClock users;
+  users.set({1709298309, 0});
+  users.setZone({7200, false});
+  RecordedPages otherPages;
+  FakeQueue otherQueue;
+  MemoryPorts otherPorts;
+  otherPorts.answer = ports.answer;
+  TextViewer other({otherPorts, telephony, otherQueue, host.services, writeXmlPropertyList, &link}, files,
+                   otherPages, "press R", &users);
+  otherQueue.run();
+  otherPorts.deliver(channel, 0, antennas(2));
+  otherQueue.advance(2s);
+  ASSERT_THAT(otherPages.pages, Not(IsEmpty()));
+  EXPECT_THAT(otherPages.pages.back(), StartsWith("Updated 2024-03-01 at 15:05:09\n"));
+}
 
 TEST_F(TextViewerTest, ConnectsOnceTheQueueRuns) {
   EXPECT_EQ(telephony.attempts, 0u);

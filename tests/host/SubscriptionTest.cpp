@@ -95,6 +95,7 @@ TEST(SubscriptionPorts, DeliverOneSubscriptionAndWhatNamesNone) {
   EXPECT_EQ(handed.deliver(8, unnamed), Bytes{8});
   EXPECT_EQ(handed.deliver(9, plain), Bytes{9});
   EXPECT_THAT(delivered, ElementsAre(second, unnamed, plain));
+  EXPECT_EQ(ports.messagesTaken(), 3u);
   EXPECT_EQ(ports.createRemotePort("commands"), nullptr);
   EXPECT_EQ(handed.lastName, "commands");
   EXPECT_EQ(monitor.linkReport().mixture, "");

@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "app/Snapshot.h"
 #include "host/CaptureWriter.h"
 #include "tests/support/Process.h"
 
@@ -16,6 +17,7 @@ namespace {
 
 namespace fs = std::filesystem;
 using testing::HasSubstr;
+using testing::Not;
 using testing::StartsWith;
 using Texts = std::vector<std::string>;
 
@@ -103,6 +105,25 @@ TEST_F(OpenFileEndToEnd, AsTextASnapshotIsAllOfItsDisplays) {
   const auto first = viewer({path, "--updates", "1"});
   ASSERT_TRUE(first->waitForEnd());
   EXPECT_EQ(first->output(), "Display of 2023-11-14 at 22:13:20\nRSRP  -90 dBm\n");
+}
+
+TEST_F(OpenFileEndToEnd, AsTextADisplayHasTheTimeOfTheCaptureAndTheStatusThatOfTheUser) {
+  fs::create_directories(_device.path().string() + std::string(internalDeviceMarker));
+  const fs::path folder = _device.path().string() + std::string(snapshotFolder);
+  fs::create_directories(folder);
+  const auto varnel = viewer({captureOf("kalvi-lte")});
+  ASSERT_TRUE(shows(*varnel, "\nServing Cell Info\n"));
+  EXPECT_THAT(varnel->output(), HasSubstr("\nUpdated "));
+  EXPECT_THAT(varnel->output(), Not(HasSubstr("\nUpdated 2023-11-14 ")));
+  varnel->signal(SIGUSR2);
+  std::string saved;
+  ASSERT_TRUE(eventually([&] {
+    for (const auto& entry : fs::directory_iterator(folder)) saved = contentsOf(entry.path());
+    return saved.ends_with("</plist>\n");
+  })) << varnel->output();
+  EXPECT_THAT(saved, HasSubstr("<string>2023-11-14 22:13:20 +0000</string>"));
+  EXPECT_THAT(saved, HasSubstr("<key>Timestamp</key>"));
+  EXPECT_FALSE(fs::exists(folder / "VarnelSnapshot-1700000000.varnel"));
 }
 
 TEST_F(OpenFileEndToEnd, AFileMayBeNamedLikeAnOption) {
