@@ -78,7 +78,7 @@ class TerminalRow final : public CellView {
   void setAccessory(CellAccessory accessory) override { _accessory = accessory; }
   void setText(std::string_view text) override;
   void setTextFont(const Font& font) override { _textFont = font; }
-  void setFacts(CellFacts facts) override {
+  void setFacts(CellFacts&& facts) override {
     _change = facts.change;
     _course = std::move(facts.course);
   }

@@ -127,7 +127,7 @@ void RowWidget::setTextFont(const Font& font) {
   update();
 }
 
-void RowWidget::setFacts(CellFacts facts) {
+void RowWidget::setFacts(CellFacts&& facts) {
   if (facts == _facts) return;
   _facts = std::move(facts);
   _sparkline.setCourse(_facts.course);

@@ -38,7 +38,7 @@ class RowWidget final : public QWidget, public CellView {
   void setAccessory(CellAccessory accessory) override;
   void setText(std::string_view text) override;
   void setTextFont(const Font& font) override;
-  void setFacts(CellFacts facts) override;
+  void setFacts(CellFacts&& facts) override;
   const CellFacts& facts() const { return _facts; }
 
   /// The index of the row in the table.

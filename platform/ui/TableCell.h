@@ -73,7 +73,7 @@ class CellView {
   virtual void setTextFont(const Font& font) = 0;
 
   /// What may be shown beside the texts. A host that shows nothing of it need not keep it.
-  virtual void setFacts(CellFacts) {}
+  virtual void setFacts(CellFacts&& /*facts*/) {}
 };
 
 /// A cell: its view, and what its maker keeps with it.

@@ -73,7 +73,7 @@ class RecordingCellView final : public CellView {
   void setAccessory(CellAccessory accessory) override { this->accessory = accessory; }
   void setText(std::string_view text) override { this->text = text; }
   void setTextFont(const Font& font) override { textFont = font; }
-  void setFacts(CellFacts facts) override { this->facts = std::move(facts); }
+  void setFacts(CellFacts&& facts) override { this->facts = std::move(facts); }
 
   const CellStyle style;
   std::vector<std::unique_ptr<RecordingLabel>> labels;

@@ -47,12 +47,12 @@ class TestRows : public TableViewDelegate {
     cell->key().setText(row.name);
     cell->cellView().setAccessory(row.value ? CellAccessory::None : CellAccessory::DisclosureIndicator);
     if (cell->value()) cell->value()->setText(row.value.value_or(""));
-    cell->cellView().setFacts(row.facts);
+    cell->cellView().setFacts(CellFacts(row.facts));
     row.value ? cell->setLayout() : cell->setLayoutKey();
     return cell;
   }
   void tableView_showFactsInCell(TableView&, TableCell& cell, const IndexPath& path) override {
-    cell.cellView().setFacts(rows.at(path.row).facts);
+    cell.cellView().setFacts(CellFacts(rows.at(path.row).facts));
   }
   std::string tableView_explanationOfRow(TableView&, const IndexPath& path) override {
     explained.push_back(path.row);
