@@ -69,7 +69,8 @@ class LTEIndex final : public ClassIndex {
 
  private:
   Shared& _shared;
-  std::unique_ptr<lte::ServingCell> _servingCell = create<lte::ServingCell>(_shared.cellMonitor);
+  std::unique_ptr<lte::ServingCell> _servingCell =
+      create<lte::ServingCell>(_shared.cellMonitor, _shared.modemReports);
   std::unique_ptr<lte::Measurements> _measurements = create<lte::Measurements>();
   std::unique_ptr<lte::Carriers> _carriers = create<lte::Carriers>();
   std::unique_ptr<lte::Neighbors> _neighbors = create<lte::Neighbors>(_shared.cellMonitor);

@@ -24,10 +24,22 @@ std::optional<Number> shownNumber(const Value& shown) {
   return number;
 }
 
+/// The text of a key section's entry; empty when there is none.
+inline std::string_view textShown(const Section& section, std::string_view entry) {
+  const Dictionary* const entries = section.container().dictionary();
+  const std::string* const text = entries ? entries->get(entry).string() : nullptr;
+  return text ? std::string_view(*text) : std::string_view();
+}
+
+/// The number at the beginning of the text of a key section's entry. Absent when there is none.
+inline std::optional<std::uint32_t> numberShown(const Section& section, std::string_view entry) {
+  const Dictionary* const entries = section.container().dictionary();
+  return entries ? shownNumber<std::uint32_t>(entries->get(entry)) : std::nullopt;
+}
+
 /// Whether a key section's entry shows another number than this. An entry without a number does not.
 inline bool showsAnotherNumber(const Section& section, std::string_view entry, std::uint32_t number) {
-  const Dictionary* const entries = section.container().dictionary();
-  const auto shown = entries ? shownNumber<std::uint32_t>(entries->get(entry)) : std::nullopt;
+  const auto shown = numberShown(section, entry);
   return shown && *shown != number;
 }
 

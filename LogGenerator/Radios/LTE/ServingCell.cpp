@@ -1,5 +1,6 @@
 #include "LogGenerator/Radios/LTE/ServingCell.h"
 
+#include <algorithm>
 #include <optional>
 #include <span>
 #include <string>
@@ -121,14 +122,36 @@ consteval Source sourceOf(std::span<const Field> fields, std::string_view label)
     if (field.label == label) return field.source;
   throw "the table has no such entry";
 }
+consteval bool tells(std::span<const Field> fields, std::string_view label) {
+  return std::ranges::find(fields, label, &Field::label) != fields.end();
+}
+
+// What tells one cell from another. A channel can have several cells, and a base station may give all of its
+// channels the same physical cell.
+struct Identity {
+  std::optional<std::uint32_t> physicalCell, earfcn, cell;
+};
+
+// Whether the section's rows are about this cell. Where nothing tells, they are not.
+bool shows(const Section& section, const Identity& identity) {
+  enum class Answer { Unknown, Same, Other };
+  const auto compare = [&](std::string_view entry, std::optional<std::uint32_t> number) {
+    const auto shown = numberShown(section, entry);
+    if (!number || !shown) return Answer::Unknown;
+    return *shown == *number ? Answer::Same : Answer::Other;
+  };
+  const Answer physicalCell = compare(physicalCellEntry, identity.physicalCell);
+  const Answer channel = compare(channelEntry, identity.earfcn);
+  const Answer cell = compare(identityEntry, identity.cell);
+  if (physicalCell == Answer::Other || channel == Answer::Other || cell == Answer::Other) return false;
+  return cell == Answer::Same || (physicalCell == Answer::Same && channel == Answer::Same);
+}
 
 // What is known of another cell says nothing about this one.
-void forgetOtherCell(Section& section, std::optional<std::uint32_t> physicalCell,
-                     std::optional<std::uint32_t> earfcn) {
-  const bool isOther = (physicalCell && showsAnotherNumber(section, physicalCellEntry, *physicalCell)) ||
-                       (earfcn && showsAnotherNumber(section, channelEntry, *earfcn));
-  if (!isOther) return;
-  for (const std::string_view entry : entriesOfACell) section.setText(entry, {});
+void forgetOtherCell(Section& section, const Identity& identity) {
+  if (shows(section, identity)) return;
+  for (const std::string_view entry : entriesOfACell)
+    if (!textShown(section, entry).empty()) section.setText(entry, {});
 }
 
 // The fields, and the frequency of their channel number. Returns this number.
@@ -137,7 +160,12 @@ std::uint32_t showFields(Section& section, const Packet& body) {
   constexpr Source physicalCell = sourceOf(fields, physicalCellEntry);
   constexpr Source channel = sourceOf(fields, channelEntry);
   const std::uint32_t earfcn = rawValue(body, channel);
-  forgetOtherCell(section, rawValue(body, physicalCell), earfcn);
+  Identity identity{rawValue(body, physicalCell), earfcn, std::nullopt};
+  if constexpr (tells(fields, identityEntry)) {
+    constexpr Source cell = sourceOf(fields, identityEntry);
+    identity.cell = rawValue(body, cell);
+  }
+  forgetOtherCell(section, identity);
   section.show(body, fields);
   section.setText(frequencyEntry, channels::lteDownlinkFrequency(earfcn));
   return earfcn;
@@ -178,35 +206,47 @@ void showNumber(Section& section, std::string_view entry, std::optional<std::uin
   if (number) section.setText(entry, std::to_string(*number));
 }
 
-void showNetwork(Section& section, const Dictionary& cell) {
+// The cell monitor tells the network's code as a number, so a leading 0 of three digits is not in it. Another
+// source may have told them.
+void showNetwork(Section& section, const Dictionary& cell, const std::string& shownBefore) {
   const auto country = numberOf(cell, cellMonitor::mcc), network = numberOf(cell, cellMonitor::mnc);
   if (!country || !network) return;
-  section.setText(networkEntry, plmnText(*country, *network, *network < 100 ? 2 : 3));
+  const std::string ofThreeDigits = plmnText(*country, *network, 3);
+  const bool hasTwoDigits = *network < 100 && shownBefore != ofThreeDigits;
+  section.setText(networkEntry, hasTwoDigits ? plmnText(*country, *network, 2) : ofThreeDigits);
 }
 
 void showMonitoredCell(Section& section, const Dictionary& cell) {
-  const auto physicalCell = numberOf(cell, cellMonitor::physicalCellIdentity);
-  const auto earfcn = numberOf(cell, cellMonitor::uarfcn);
-  forgetOtherCell(section, physicalCell, earfcn);
-  showNumber(section, physicalCellEntry, physicalCell);
-  showNumber(section, channelEntry, earfcn);
-  if (earfcn) section.setText(frequencyEntry, channels::lteDownlinkFrequency(*earfcn));
+  const Identity identity{numberOf(cell, cellMonitor::physicalCellIdentity),
+                          numberOf(cell, cellMonitor::uarfcn), numberOf(cell, cellMonitor::cellIdentity)};
+  const std::string networkBefore(textShown(section, networkEntry));
+  forgetOtherCell(section, identity);
+  showNumber(section, physicalCellEntry, identity.physicalCell);
+  showNumber(section, channelEntry, identity.earfcn);
+  if (identity.earfcn) section.setText(frequencyEntry, channels::lteDownlinkFrequency(*identity.earfcn));
   showNumber(section, bandEntry, numberOf(cell, cellMonitor::bandInfo));
   showNumber(section, areaEntry, numberOf(cell, cellMonitor::trackingAreaCode));
-  if (const auto identity = numberOf(cell, cellMonitor::cellIdentity)) {
-    showNumber(section, identityEntry, identity);
-    showNumber(section, basestationEntry, *identity >> 8);
-    showNumber(section, sectorEntry, *identity & 0xFF);
+  if (identity.cell) {
+    showNumber(section, identityEntry, identity.cell);
+    showNumber(section, basestationEntry, *identity.cell >> 8);
+    showNumber(section, sectorEntry, *identity.cell & 0xFF);
   }
-  showNetwork(section, cell);
+  showNetwork(section, cell, networkBefore);
+}
+
+// "310-012" of "310-12"; empty for a code of three digits.
+std::string withThreeDigits(std::string_view network) {
+  constexpr std::size_t sizeWithTwoDigits = std::string_view("310-12").size(), country = 3;
+  if (network.size() != sizeWithTwoDigits) return {};
+  return std::string(network.substr(0, country)) + "-0" + std::string(network.substr(country + 1));
 }
 
 }  // namespace
 
 ServingCell::ServingCell() : VersionedDecoder("Serving Cell", layouts), _cellMonitor(_ownCellMonitor) {}
 
-ServingCell::ServingCell(CellMonitorReader& cellMonitor)
-    : VersionedDecoder("Serving Cell", layouts), _cellMonitor(cellMonitor) {}
+ServingCell::ServingCell(CellMonitorReader& cellMonitor, const modem::ReportReader& modemReports)
+    : VersionedDecoder("Serving Cell", layouts), _cellMonitor(cellMonitor), _modemReports(&modemReports) {}
 
 void ServingCell::listNumberFormats(SectionFormats& formats) const {
   formats.add(frequencyEntry, channels::frequencyFormat);
@@ -223,6 +263,14 @@ void ServingCell::updateWithOther(const Packet& packet, std::uint32_t /*logCode*
   if (!cells) return;
   const Dictionary* const cell = firstCellOfKind(*cells, cellMonitor::lte, cellMonitor::serving);
   if (cell) showMonitoredCell(sectionRef, *cell);
+}
+
+void ServingCell::prepareDisplay(const Time& /*now*/) {
+  const std::string whole = withThreeDigits(textShown(sectionRef, networkEntry));
+  if (whole.empty() || !_modemReports) return;
+  const auto report = _modemReports->last();
+  if (report && report->isKnown && modem::network(*report->entries) == whole)
+    sectionRef.setText(networkEntry, whole);
 }
 
 }  // namespace varnel::lte

@@ -32,6 +32,10 @@ std::optional<Report> ReportReader::read(const Packet& packet) {
     _content.reset();  // frees the memory for the new one
     _content = readPropertyList(payload);
   }
+  return last();
+}
+
+std::optional<Report> ReportReader::last() const {
   const Dictionary* const entries = _content ? _content->dictionary() : nullptr;
   if (!entries) return std::nullopt;
   const auto version =

@@ -29,6 +29,8 @@ class ReportReader {
  public:
   /// Nothing when the payload is no property list, no dictionary, or has no version.
   std::optional<Report> read(const Packet& packet);
+  /// The packet that was read last, once more; nothing when none was.
+  std::optional<Report> last() const;
 
  private:
   std::optional<Bytes> _payload;  // absent until a packet was read

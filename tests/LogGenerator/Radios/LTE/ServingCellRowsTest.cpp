@@ -5,6 +5,7 @@
 #include <string>
 
 #include "LogGenerator/NumberFormats.h"
+#include "tests/LogGenerator/Radios/Modem/ModemReports.h"
 #include "tests/support/CellMonitorRecords.h"
 #include "tests/support/Describe.h"
 #include "tests/support/PacketBuilder.h"
@@ -141,9 +142,9 @@ TEST_F(LTEServingCellRows, TheCellMonitorsNetworkCodeBelow100HasTwoDigits) {
 
 TEST_F(LTEServingCellRows, TheCellMonitorLeavesWhatItDoesNotKnow) {
   decode(servingCell().bytes());
-  decode(cellMonitorMessage({cellRecord(
-      "LTE", "Serving",
-      {number("PhysicalCellIdentity", 101), number("TrackingAreaCode", -1), number("MCC", 310)})}));
+  decode(cellMonitorMessage({cellRecord("LTE", "Serving",
+                                        {number("PhysicalCellIdentity", 101), number("UARFCN", 1300),
+                                         number("TrackingAreaCode", -1), number("MCC", 310)})}));
   EXPECT_EQ(shown("Tracking Area Code"), "30000");
   EXPECT_EQ(shown("PLMN"), "262-02");
 }
@@ -154,6 +155,103 @@ TEST_F(LTEServingCellRows, AnotherCellOfTheCellMonitorEmptiesTheRest) {
   EXPECT_EQ(shown("Physical Cell ID"), "5");
   EXPECT_EQ(shown("EARFCN"), "");
   EXPECT_EQ(shown("Uplink Bandwidth"), "");
+}
+
+TEST_F(LTEServingCellRows, ARecordWithTheCellIdentityAloneTellsWhetherItIsTheSameCell) {
+  decode(servingCell().bytes());
+  decode(masterInformation().bytes());
+  decode(cellMonitorMessage({cellRecord("LTE", "Serving", {number("CellIdentity", 0x1234567)})}));
+  EXPECT_EQ(shown("Physical Cell ID"), "101");
+  EXPECT_EQ(shown("Antennas"), "4");
+
+  decode(cellMonitorMessage({cellRecord("LTE", "Serving", {number("CellIdentity", 0x1234566)})}));
+  for (const char* entry : {"Physical Cell ID", "EARFCN", "Downlink Frequency", "Band", "Downlink Bandwidth",
+                            "PLMN", "Tracking Area Code", "Antennas", "System Frame Number"})
+    EXPECT_EQ(shown(entry), "") << entry;
+  EXPECT_EQ(shown("Cell Identity"), "19088742");
+  EXPECT_EQ(shown("eNB"), "74565");
+  EXPECT_EQ(shown("Cell"), "102");
+}
+
+TEST_F(LTEServingCellRows, ARecordThatDoesNotTellItsCellStandsAlone) {
+  for (const auto& entries :
+       {number("TrackingAreaCode", 30000), number("PhysicalCellIdentity", 101), number("UARFCN", 1300)}) {
+    decode(servingCell().bytes());
+    decode(cellMonitorMessage({cellRecord("LTE", "Serving", {entries})}));
+    for (const char* entry : {"Cell Identity", "eNB", "Cell", "PLMN", "Uplink Bandwidth"})
+      EXPECT_EQ(shown(entry), "") << entries.key << ", " << entry;
+  }
+}
+
+TEST_F(LTEServingCellRows, APacketAfterARecordWithoutItsChannelKeepsNothingOfTheRecord) {
+  decode(cellMonitorMessage({cellRecord("LTE", "Serving",
+                                        {number("CellIdentity", 0x7654321), number("TrackingAreaCode", 9),
+                                         number("MCC", 310), number("MNC", 260)})}));
+  decode(masterInformation().bytes());
+  EXPECT_EQ(shown("Physical Cell ID"), "101");
+  for (const char* entry : {"Cell Identity", "eNB", "Cell", "Tracking Area Code", "PLMN"})
+    EXPECT_EQ(shown(entry), "") << entry;
+}
+
+TEST_F(LTEServingCellRows, AnotherCellIdentityOnTheSameChannelIsAnotherCell) {
+  decode(masterInformation().bytes());
+  decode(servingCell().bytes());
+  decode(servingCell().u32(header + 13, 0x7654321).bytes());
+  EXPECT_EQ(shown("Cell Identity"), "124076833");
+  EXPECT_EQ(shown("Antennas"), "");
+}
+
+TEST_F(LTEServingCellRows, WhatIsEmptiedGetsNoRowsThatWereNotThere) {
+  decode(masterInformation().bytes());
+  decode(cellMonitorMessage({cellRecord("LTE", "Serving", {number("CellIdentity", 7)})}));
+  EXPECT_EQ(section.dictionary()->get("Access Barring").string(), nullptr);
+}
+
+TEST_F(LTEServingCellRows, TheNetworkOfTheCellMonitorKeepsTheThreeDigitsThatAPacketTold) {
+  decode(servingCell().u16(header + 23, 310).u8(header + 25, 3).u16(header + 26, 12).bytes());
+  EXPECT_EQ(shown("PLMN"), "310-012");
+  const Bytes record = cellMonitorMessage(
+      {cellRecord("LTE", "Serving", {number("CellIdentity", 5), number("MCC", 310), number("MNC", 12)})});
+  decode(record);
+  EXPECT_EQ(shown("PLMN"), "310-012");
+  decode(cellMonitorMessage({cellRecord("LTE", "Serving", {number("MCC", 310), number("MNC", 13)})}));
+  EXPECT_EQ(shown("PLMN"), "310-13");
+}
+
+class LTEServingCellWithReports : public LTEServingCellRows {
+ protected:
+  LTEServingCellWithReports() { reporting.updateSectionRef(section); }
+
+  std::string shownNetwork(std::uint16_t country, std::uint16_t network) {
+    const Bytes record =
+        cellMonitorMessage({cellRecord("LTE", "Serving", {number("MCC", country), number("MNC", network)})});
+    reporting.updateWithData_logCode(Packet(record), 0xFF0001);
+    reporting.prepareDisplay({});
+    return shown("PLMN");
+  }
+
+  CellMonitorReader records;
+  modem::ReportReader reports;
+  ServingCell reporting{records, reports};
+};
+
+TEST_F(LTEServingCellWithReports, TheModemReportTellsHowManyDigitsTheNetworkHas) {
+  EXPECT_EQ(shownNetwork(310, 12), "310-12") << "before any report";
+  const Bytes report = modemReportOf({{"PLMN", "310012"}});
+  reports.read(Packet(report));
+  reporting.prepareDisplay({});
+  EXPECT_EQ(shown("PLMN"), "310-012");
+  EXPECT_EQ(shownNetwork(310, 12), "310-012");
+  EXPECT_EQ(shownNetwork(310, 13), "310-13") << "another network";
+  EXPECT_EQ(shownNetwork(310, 260), "310-260");
+}
+
+TEST_F(LTEServingCellWithReports, AReportWithTwoDigitsOrOfAnUnknownVersionChangesNothing) {
+  Value unknown = dictionaryOf({{"Version", Value::ofInteger(2)}, {"PLMN", "310012"}});
+  for (const Bytes& report : {modemReportOf({{"PLMN", "31012"}}), serverMessage(0xFF0003, unknown)}) {
+    reports.read(Packet(report));
+    EXPECT_EQ(shownNetwork(310, 12), "310-12");
+  }
 }
 
 TEST_F(LTEServingCellRows, ACellMonitorPacketThatIsNoListChangesNothing) {
