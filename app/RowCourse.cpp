@@ -1,11 +1,115 @@
 #include "app/RowCourse.h"
 
+#include <unordered_set>
+
 namespace varnel {
 
 namespace {
 
 constexpr std::size_t columns = 24;
 constexpr ValueHistory::Duration columnLength = std::chrono::seconds(10);
+
+// In any section: none of these names is that of a measure elsewhere.
+const std::unordered_set<std::string_view>& identities() {
+  static const std::unordered_set<std::string_view> all = {
+      // Packets
+      "Version",
+      // Cells
+      "Base Station ID",
+      "BCC",
+      "BSIC",
+      "BSIC ID",
+      "Cell",
+      "Cell ID",
+      "Cell Identity",
+      "Cell Scrambling Code",
+      "eNB",
+      "NCC",
+      "Physical Cell ID",
+      "Pilot",
+      "PN",
+      "PSC",
+      "Scrambling Code",
+      "Serving Cell",
+      "Serving Cell ID",
+      "Serving Physical Cell ID",
+      "Serving Pilot PN Offset",
+      "SSB",
+      // Channels and bands
+      "ARFCN",
+      "Band",
+      "Band Class",
+      "Band Indicator",
+      "Carrier",
+      "Channel",
+      "Downlink Frequency",
+      "Downlink UARFCN",
+      "Download Frequency",
+      "E ARFCN",
+      "E-ARFCN",
+      "EARFCN",
+      "Freq Band Indicator",
+      "Frequency",
+      "MA Dedicated ARFCN",
+      "NR-ARFCN",
+      "Rx0 Band Class",
+      "Rx0 Channel",
+      "Rx1 Band Class",
+      "Rx1 Channel",
+      "Serving EARFCN",
+      "U ARFCN",
+      "UARFCN",
+      "Upload Frequency",
+      "Uplink EARFCN",
+      "Uplink Frequency",
+      "Uplink NR-ARFCN",
+      "Uplink UARFCN",
+      // Networks and areas
+      "AMF Pointer",
+      "AMF Region",
+      "AMF Set",
+      "Color Code",
+      "LAC",
+      "Local Area Code",
+      "Location Area Code",
+      "MME Code",
+      "MME Group",
+      "Mobile Country Code",
+      "Mobile Network Code",
+      "Network ID",
+      "Packet Zone ID",
+      "Protocol Revision",
+      "Routing Area Code",
+      "System ID",
+      "Tracking Area Code",
+      "URA ID",
+      // Phones
+      "5G-TMSI",
+      "C-RNTI",
+      "EF-ICCID",
+      "EF-MSISDN",
+      "M-TMSI",
+      "Number",
+      "P-TMSI",
+      "RA-RNTI",
+      "Temporary C-RNTI",
+      "TMSI",
+      "UATI24",
+      // Parts of a connection
+      "Bearer ID",
+      "CCTRCH ID",
+      "Connection ID",
+      "Context ID",
+      "Preamble",
+      "Process ID",
+      "Root Sequence",
+      "Timeslot",
+      "Transport Channel ID",
+      "TRCH ID",
+      "TSNUM",
+  };
+  return all;
+}
 
 // The last moment within the length of the line at which the value became another one, or came back; the
 // last sample's when it stood all the time, so that the line is flat. Nothing without samples.
@@ -20,6 +124,8 @@ std::optional<ValueHistory::Duration> lastChange(const ValueHistory& history, Va
 }
 
 }  // namespace
+
+bool isIdentity(std::string_view rowName) { return identities().contains(rowName); }
 
 std::vector<std::optional<double>> recentCourse(const ValueHistory& history, const VarnelModelNode& row) {
   const auto series = history.seriesOf(row);

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <optional>
+#include <string_view>
 #include <vector>
 
 #include "app/ValueHistory.h"
@@ -28,5 +29,9 @@ class RowCourses {
   /// Another number than before when rows have other courses now, though the display is the same.
   virtual unsigned edition() const = 0;
 };
+
+/// Whether the number of a row with this name only tells one thing from another, such as a cell or a channel,
+/// and measures nothing. Its course is not shown beside it.
+bool isIdentity(std::string_view rowName);
 
 }  // namespace varnel

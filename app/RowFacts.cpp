@@ -70,11 +70,7 @@ bool RowFacts::haveChanged(Display display) {
 CellFacts RowFacts::of(const Row& row) {
   CellFacts facts;
   if (_changes.contains(row.node)) facts.change = CellChange::Changed;
-  if (_sources.courses) {
-    facts.course = _sources.courses->course(row.node);
-  } else if (_sources.history) {
-    facts.course = recentCourse(*_sources.history, row.node);
-  }
+  if (!isIdentity(row.node.displayName())) facts.course = courseOf(row.node);
   if (!_sources.answers) return facts;
   facts.dimming = dimmingOf(row);
   if (row.node.value()) {
@@ -85,6 +81,11 @@ CellFacts RowFacts::of(const Row& row) {
     facts.level = cellLevel(summary.level);
   }
   return facts;
+}
+
+std::vector<std::optional<double>> RowFacts::courseOf(const VarnelModelNode& row) const {
+  if (_sources.courses) return _sources.courses->course(row);
+  return _sources.history ? recentCourse(*_sources.history, row) : std::vector<std::optional<double>>();
 }
 
 std::string RowFacts::explanation(const Row& row) {

@@ -5,6 +5,7 @@
 #include <string>
 #include <string_view>
 #include <unordered_map>
+#include <vector>
 
 #include "LogGenerator/NumberFormats.h"
 #include "app/RecordSummary.h"
@@ -59,6 +60,7 @@ class RowFacts {
     std::optional<Explanation::Limits> limits;
   };
 
+  std::vector<std::optional<double>> courseOf(const VarnelModelNode& row) const;
   const Kind& kindOf(const Row& row);
   std::optional<RecordSummaries::Level> levelIn(const Row& leaf);
   RecordSummary summaryOf(const Row& record);

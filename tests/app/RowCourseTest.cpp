@@ -92,5 +92,12 @@ TEST_F(RowCourseTest, ATextHasNoCourse) {
   EXPECT_THAT(recentCourse(history, row(1)), IsEmpty());
 }
 
+TEST(RowIdentity, IsANameAndNoMeasure) {
+  for (const char* name : {"Tracking Area Code", "NR-ARFCN", "Band", "PN", "C-RNTI"})
+    EXPECT_TRUE(isIdentity(name)) << name;
+  for (const char* name : {"RSRP", "RSSI", "Timing Advance", "QCI", "Rank", ""})
+    EXPECT_FALSE(isIdentity(name)) << name;
+}
+
 }  // namespace
 }  // namespace varnel

@@ -117,6 +117,16 @@ TEST_F(RowFactsTest, ANumberHasACourse) {
   EXPECT_THAT(of({"Cell"}).course, IsEmpty());
 }
 
+TEST_F(RowFactsTest, AnIdentityHasNoCourseThoughItsTrendCanBeAskedFor) {
+  follow("-84.0 dBm");
+  for (const NamePath& path : {NamePath{"Cell", "Band"}, NamePath{"Neighbors", "Cells", "0", "EARFCN"},
+                               NamePath{"Neighbors", "Cells", "0", "Physical Cell ID"}}) {
+    EXPECT_THAT(of(path).course, IsEmpty()) << path.back();
+    EXPECT_TRUE(history.seriesOf(row(path).node)) << path.back();
+  }
+  EXPECT_THAT(of({"Neighbors", "Cells", "0", "RSRP"}).course, SizeIs(24));
+}
+
 TEST_F(RowFactsTest, AValueOfAMinuteIsDimmed) {
   follow("-84.0 dBm");
   host.clock.set({start + 59, 999'999'999});
@@ -176,6 +186,7 @@ TEST_F(RowFactsTest, CoursesThatAreKnownElsewhereReplaceThoseOfTheHistory) {
   follow("-84.0 dBm");
   knowing.follow(tree, Display::Renewed);
   EXPECT_THAT(knowing.of(row({"Cell", "RSRP"})).course, ElementsAre(-90, -80));
+  EXPECT_THAT(knowing.of(row({"Cell", "Band"})).course, IsEmpty()) << "an identity";
   EXPECT_FALSE(knowing.haveChanged(Display::Renewed));
   elsewhere.number = 1;
   EXPECT_TRUE(knowing.haveChanged(Display::Renewed));
