@@ -47,9 +47,14 @@ const std::string* textOf(const VarnelModelNode& record, std::string_view name) 
   return nullptr;
 }
 
+// A number below zero has the same sign everywhere in a summary.
 std::string labeled(std::string_view label, std::string_view value) {
   std::string text(label);
   if (!text.empty()) text += ' ';
+  if (value.size() > 1 && value[0] == '-' && value[1] >= '0' && value[1] <= '9') {
+    text += minus;
+    value.remove_prefix(1);
+  }
   return text.append(value);
 }
 

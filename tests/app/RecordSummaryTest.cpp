@@ -86,7 +86,7 @@ TEST(RecordSummary, OfRecordsWithoutALevelSaysWhatElseTheyShow) {
   EXPECT_THAT(summaryIn("GSM Neighbor Cell List",
                         {dictionaryOf({{"ARFCN", "13"}, {"BSIC Valid", "0"}, {"RSSI", "-76"}})})
                   .parts,
-              ElementsAre("ARFCN 13", "RSSI -76"));
+              ElementsAre("ARFCN 13", "RSSI \u221276"));
   EXPECT_THAT(
       summaryIn("TRCH BLER", {dictionaryOf({{"TRCH ID", "1"}, {"TRCH BLER Measurement", "25"}})}).parts,
       ElementsAre("TrCH 1", "BLER 25"));
@@ -110,6 +110,8 @@ TEST(RecordSummary, OfRecordsThatNothingIsKnownAboutIsTheirBeginning) {
                         {dictionaryOf({{"Mobile Country Code", "1"}, {"Mobile Network Code", "100"}})})
                   .parts,
               ElementsAre("MCC 1", "MNC 100"));
+  EXPECT_THAT(summaryIn("Things", {dictionaryOf({{"A", "-1.5 kHz"}, {"B", "-"}})}).parts,
+              ElementsAre("A \u22121.5 kHz", "B -"));
   EXPECT_THAT(summaryIn("Things", {dictionaryOf({{"A", ""}, {"B", "2"}, {"C", "3"}, {"D", "4"}})}).parts,
               ElementsAre("B 2", "C 3"));
   EXPECT_THAT(summaryIn("Things", {dictionaryOf({{"A", ""}})}).parts, IsEmpty());
