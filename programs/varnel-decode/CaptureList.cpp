@@ -41,6 +41,15 @@ std::string asFile(std::string_view name) { return name == "-" ? "./-" : std::st
 
 // What a list with sizes begins with. Each of its other entries is a size in bytes, a space, and a name.
 constexpr std::string_view sizedListMark = "varnel-list 1";
+// What it begins with in any version.
+constexpr std::string_view anySizedListMark = "varnel-list ";
+
+// The digits of the version in the first entry of a list with sizes; empty for another list.
+std::string_view versionIn(std::string_view firstEntry) {
+  if (!firstEntry.starts_with(anySizedListMark)) return {};
+  const std::string_view version = firstEntry.substr(anySizedListMark.size());
+  return version.substr(0, std::min(version.find_first_not_of("0123456789"), version.size()));
+}
 
 // Takes the size from the beginning of an entry.
 std::uint64_t takeSize(std::string_view& entry, const std::string& listName) {
@@ -66,7 +75,12 @@ CaptureList capturesIn(std::string_view list, const std::string& listName) {
   const char separator = list.find('\0') == std::string_view::npos ? '\n' : '\0';
   std::vector<std::string_view> names;
   names.reserve(static_cast<std::size_t>(std::ranges::count(list, separator)) + 1);
-  const bool hasSizes = separator == '\0' && list.substr(0, list.find(separator)) == sizedListMark;
+  const std::string_view first =
+      separator == '\0' ? list.substr(0, list.find(separator)) : std::string_view();
+  const bool hasSizes = first == sizedListMark;
+  if (const std::string_view version = versionIn(first); !hasSizes && !version.empty())
+    throw std::runtime_error(listName + " is a list with sizes of version " + std::string(version) +
+                             ", which this program does not know; write it again with its --write-list");
   std::vector<std::uint64_t> sizes;
   if (hasSizes) {
     list.remove_prefix(sizedListMark.size() + 1);

@@ -26,7 +26,7 @@ struct CaptureList {
 /// The names in a list. If the list has a NUL character, each name ends with NUL, otherwise with a newline. A
 /// name that occurs again is left out, and so are empty names. The name "-" is that of a file. Throws
 /// std::runtime_error for a name that no file can have, because it is too long, and for a list with sizes
-/// that is damaged.
+/// that is damaged, or has a version that is not known.
 CaptureList capturesIn(std::string_view list, const std::string& listName);
 
 /// Reads such a list; "-" is standard input. Throws std::runtime_error also when it cannot be read.

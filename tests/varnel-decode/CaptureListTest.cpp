@@ -84,6 +84,29 @@ TEST(CaptureList, AnEntryWithoutASizeMeansThatTheListIsDamaged) {
     EXPECT_THROW(capturesIn(list, "list"), std::runtime_error);
 }
 
+TEST(CaptureList, AListWithSizesOfAnotherVersionIsNotTakenForNames) {
+  try {
+    capturesIn(
+        "varnel-list 2\0"
+        "12 a\0"sv,
+        "all.list");
+    FAIL() << "it was taken";
+  } catch (const std::runtime_error& error) {
+    EXPECT_STREQ(error.what(),
+                 "all.list is a list with sizes of version 2, which this program does not know; write it "
+                 "again with its --write-list");
+  }
+  for (const std::string_view list : {"varnel-list 10\0"
+                                      "12 a\0"sv,
+                                      "varnel-list 1.1\0"
+                                      "12 a\0"sv,
+                                      "varnel-list 1 \0"
+                                      "12 a\0"sv})
+    EXPECT_THROW(capturesIn(list, "list"), std::runtime_error);
+  EXPECT_THAT(namesIn("varnel-list of may\0./varnel-list 2\0"sv),
+              ElementsAre("varnel-list of may", "./varnel-list 2"));
+}
+
 TEST(CaptureParts, APartIsANumberAndHowManyThereAre) {
   const auto part = partNamed("2/8");
   ASSERT_TRUE(part);
