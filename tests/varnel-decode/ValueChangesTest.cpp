@@ -169,6 +169,32 @@ TEST(ValueChanges, AStationIsThatOfTheChannelOnWhichItWasHeard) {
                                            ShownCell{"CDMA2000 base station", "425", "2"}));
 }
 
+TEST(ValueChanges, APilotIsOfANewChannelOnlyWhenItsPacketHasCome) {
+  const auto display = [](const char* channel, const char* pilot, const char* level) {
+    Value evdo = section({{"Channel", channel}});
+    evdo.dictionary()->set("Active Set", section({{pilot, level}}));
+    return displayOf("EV-DO", evdo);
+  };
+  ValueChanges changes;
+  changes.take(at(2, display("777", "84", "-5.00 dB")));
+  changes.take(at(4, display("802", "84", "-5.50 dB")));
+  changes.take(at(6, display("802", "84", "-5.50 dB")));
+  changes.take(at(8, display("802", "168", "-9.00 dB")));
+  EXPECT_THAT(changes.cells(),
+              ElementsAre(ShownCell{"CDMA2000", "777", "84"}, ShownCell{"CDMA2000", "802", "168"}));
+  changes.take(at(10, display("802", "84", "-7.00 dB")));
+  EXPECT_EQ(changes.cells().count({"CDMA2000", "802", "84"}), 1u);
+}
+
+TEST(ValueChanges, TheServingPilotComesWithItsChannel) {
+  ValueChanges changes;
+  for (const char* channel : {"777", "802"})
+    changes.take(
+        at(2, displayOf("EV-DO", section({{"Channel", channel}, {"Serving Pilot PN Offset", "32"}}))));
+  EXPECT_THAT(changes.cells(),
+              ElementsAre(ShownCell{"CDMA2000", "777", "32"}, ShownCell{"CDMA2000", "802", "32"}));
+}
+
 TEST(ValueChanges, WithoutAChannelOrANumberThereIsNoCellOfCdma) {
   ValueChanges changes;
   Value display = displayOf("Network", section({{"Base Station ID", "4660"}}));

@@ -130,6 +130,7 @@ struct ValueChanges::Node {
   std::optional<std::string> text{};
   std::size_t path = noPath;
   std::uint32_t seenAt = UINT32_MAX, changedAt = UINT32_MAX;
+  std::optional<std::uint32_t> replacedAt{};  // when it last got a text after an earlier one
   bool isShown = false;
 };
 
@@ -243,6 +244,8 @@ std::optional<std::size_t> ValueChanges::pathOf(Node& leaf) {
 }
 
 void ValueChanges::addChange(Node& leaf, std::optional<std::string_view> text) {
+  const bool isFirst = leaf.changedAt == UINT32_MAX;
+  if (text && !isFirst) leaf.replacedAt = _now;
   if (text)
     leaf.text = *text;
   else
@@ -280,15 +283,23 @@ const ValueChanges::Node* ValueChanges::channelOf(const Node& identity, std::siz
   return nullptr;
 }
 
+// Whether a cell is shown for the first time, or again.
+bool ValueChanges::isSeenNow(const Node& identity, const Node& channel, std::size_t radio) const {
+  const bool hasNewIdentity = identity.changedAt == _now, hasNewChannel = channel.changedAt == _now;
+  // Pilots and system information come in packets of their own, later than a new channel. Until then, those
+  // of the old one are still shown.
+  if (identity.isPilot && channel.replacedAt) return hasNewIdentity && *channel.replacedAt < _now;
+  if (Radio(radio) == Radio::CDMAStation) return hasNewIdentity;
+  return hasNewIdentity || hasNewChannel;
+}
+
 void ValueChanges::seeCell(const Node& identity) {
   for (const Radio radio : radios) {
     const bool isOfRadio =
         identity.isPilot ? radio == Radio::CDMA : names(identityEntries, identity.name, radio);
     if (!isOfRadio) continue;
     const Node* const channel = channelOf(identity, static_cast<std::size_t>(radio));
-    // System information comes later than a new channel, and is still that of the old one.
-    const bool isWithChannel = radio != Radio::CDMAStation && channel && channel->changedAt == _now;
-    if (!channel || (identity.changedAt != _now && !isWithChannel)) continue;
+    if (!channel || !isSeenNow(identity, *channel, static_cast<std::size_t>(radio))) continue;
     const auto number = EntryFormats().number(*channel->text);
     const std::string name = identityIn(identity.isPilot ? identity.name : *identity.text, radio);
     if (number.empty() || (radio == Radio::CDMA && !isNumber(name))) continue;

@@ -87,6 +87,7 @@ class ValueChanges final : public GenerationSink {
   void addChange(Node& leaf, std::optional<std::string_view> text);
   void seeCell(const Node& identity);
   static const Node* channelOf(const Node& identity, std::size_t radio);
+  bool isSeenNow(const Node& identity, const Node& channel, std::size_t radio) const;
   std::optional<std::size_t> pathOf(Node& leaf);
   void spill();
 
