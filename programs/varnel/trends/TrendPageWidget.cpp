@@ -199,8 +199,10 @@ bool TrendPageWidget::choose(const std::string& key, bool isWanted) {
   const auto found = std::ranges::find(_keys, key);
   if (isWanted == (found != _keys.end())) return true;
   const std::string refusal = isWanted ? refusalOf(key) : std::string();
-  tell(QString::fromStdString(refusal));
-  if (!refusal.empty()) return false;
+  if (!refusal.empty()) {
+    tell(QString::fromStdString(refusal));
+    return false;
+  }
   if (isWanted) {
     _keys.push_back(key);
   } else {
@@ -209,6 +211,7 @@ bool TrendPageWidget::choose(const std::string& key, bool isWanted) {
   _source.rememberRows(_keys);
   _view->setRows(_keys);
   fitTable();
+  tell({});
   return true;
 }
 

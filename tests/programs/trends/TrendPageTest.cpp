@@ -306,6 +306,10 @@ TEST_F(TrendPageTest, APictureHasRoomForEightRowsAndFourUnits) {
 TEST_F(TrendPageTest, WithoutARowThePageSaysWhatToDo) {
   open({});
   EXPECT_THAT(page->remark().text().toStdString(), HasSubstr("has no row yet"));
+  page->addRow(level);
+  EXPECT_EQ(page->remark().text(), "");
+  page->removeRow(level);
+  EXPECT_THAT(page->remark().text().toStdString(), HasSubstr("has no row yet"));
 }
 
 TEST_F(TrendPageTest, ARowThatHasGoneKeepsItsPlace) {
