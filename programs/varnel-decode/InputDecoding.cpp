@@ -1,5 +1,7 @@
 #include "programs/varnel-decode/InputDecoding.h"
 
+#include <unistd.h>
+
 #include <algorithm>
 #include <cstdio>
 #include <filesystem>
@@ -33,6 +35,7 @@
 #include "programs/varnel-decode/Picture.h"
 #include "programs/varnel-decode/ProgramError.h"
 #include "programs/varnel-decode/ProgressBar.h"
+#include "programs/varnel-decode/RadioSummary.h"
 #include "programs/varnel-decode/RecordOutputs.h"
 #include "programs/varnel-decode/StandardOutput.h"
 #include "programs/varnel-decode/Subscriptions.h"
@@ -390,7 +393,7 @@ class InputDecoding {
   void writeSummary(const Value& display) const {
     switch (_options.output) {
       case Output::Display:
-        writeOutput(stdout, heading() + _options.writeDisplay(display));
+        writeOutput(stdout, heading() + withSummary(display));
         break;
       case Output::StatisticsTable:
         writeOutput(stdout, heading() + _statistics.asTable());
@@ -403,6 +406,15 @@ class InputDecoding {
       case Output::Events:
         break;
     }
+  }
+
+  // A summary stands where the reader looks first: a terminal shows the end of a long text.
+  std::string withSummary(const Value& display) const {
+    const std::string text = _options.writeDisplay(display);
+    const std::string summary =
+        _options.writeDisplay == displayAsText ? radioSummary(display) : std::string();
+    if (summary.empty()) return text;
+    return ::isatty(STDOUT_FILENO) ? text + "\n" + summary : summary + "\n" + text;
   }
 
   std::string heading() const {
