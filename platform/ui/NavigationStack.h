@@ -56,7 +56,9 @@ class NavigationStackDelegate {
                                                                     Animation animation) = 0;
 };
 
-/// Panes on top of each other. Only the top one is visible, and the user can go back to the one below.
+/// Panes on top of each other. Only the top one has appeared, and the user can go back to the one below. A
+/// host with much room may draw that one beside the top one, which changes no call. When the user chooses a
+/// row there, the stack first pops to that pane, and then calls its delegate.
 ///
 /// When the top pane changes, the stack calls, in this order: `viewWillDisappear` of the old top pane,
 /// `viewWillAppear` of the new one, and the delegate with the new one. During these calls `controllers`
