@@ -18,17 +18,27 @@ constexpr int margin = 12;
 constexpr double titleSize = 17, explanationSize = 14, menuSize = 15;
 constexpr int offerHeight = 64;
 
-// Something to choose, with a line that explains it. Its text is the title.
+// Something to choose, with a sentence that explains it, in as many lines as it needs. Its text is the title.
 class OfferButton final : public QAbstractButton {
  public:
   OfferButton(const QString& title, QString explanation) : _explanation(std::move(explanation)) {
     setText(title);
     setAccessibleDescription(_explanation);
     setFocusPolicy(Qt::StrongFocus);
-    setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
+    QSizePolicy policy(QSizePolicy::Expanding, QSizePolicy::Preferred);
+    policy.setHeightForWidth(true);
+    setSizePolicy(policy);
   }
-  QSize sizeHint() const override { return {widestColumn, offerHeight}; }
+  QSize sizeHint() const override { return {widestColumn, heightForWidth(widestColumn)}; }
   QSize minimumSizeHint() const override { return {0, offerHeight}; }
+  int heightForWidth(int width) const override {
+    const QFontMetrics metrics(qtFont(Font::system(explanationSize)));
+    const auto heightIn = [&](int room) {
+      return metrics.boundingRect(QRect(0, 0, room, QWIDGETSIZE_MAX), Qt::TextWordWrap, _explanation)
+          .height();
+    };
+    return offerHeight + heightIn(width - 2 * margin) - heightIn(QWIDGETSIZE_MAX);
+  }
 
  protected:
   void paintEvent(QPaintEvent*) override {
@@ -39,10 +49,13 @@ class OfferButton final : public QAbstractButton {
     painter.setPen(QPen(hasFocus() ? accent : separatorColor(palette()), hasFocus() ? 2 : 1));
     painter.drawRoundedRect(QRectF(rect()).adjusted(1, 1, -1, -1), 6, 6);
     const QRect room = rect().adjusted(margin, margin / 2, -margin, -margin / 2);
-    paintLine(painter, {room.left(), room.top(), room.width(), room.height() / 2}, text(),
+    const int titleHeight = (offerHeight - margin) / 2;
+    paintLine(painter, {room.left(), room.top(), room.width(), titleHeight}, text(),
               Font::boldSystem(titleSize), accent);
-    paintLine(painter, {room.left(), room.top() + room.height() / 2, room.width(), room.height() / 2},
-              _explanation, Font::system(explanationSize), palette().color(QPalette::Text));
+    painter.setFont(qtFont(Font::system(explanationSize)));
+    painter.setPen(palette().color(QPalette::Text));
+    painter.drawText(room.adjusted(0, titleHeight, 0, 0),
+                     Qt::AlignLeading | Qt::AlignVCenter | Qt::TextWordWrap, _explanation);
   }
   void keyPressEvent(QKeyEvent* event) override {
     if (event->key() == Qt::Key_Return || event->key() == Qt::Key_Enter) return click();

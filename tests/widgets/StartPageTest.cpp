@@ -7,7 +7,9 @@
 #include <QSignalSpy>
 #include <QTest>
 
+#include "platform/ui/Font.h"
 #include "tests/support/TestWidgets.h"
+#include "widgets/QtValues.h"
 
 namespace varnel {
 namespace {
@@ -48,6 +50,20 @@ TEST_F(StartPageTest, OffersFitIntoASmallWindow) {
     const QRect place(button->mapTo(&page, QPoint()), button->size());
     EXPECT_TRUE(page.rect().contains(place)) << title.toStdString();
   }
+}
+
+// An offer is 64 high with one line of explanation.
+TEST_F(StartPageTest, AnExplanationHasAsManyLinesAsItNeeds) {
+  QAbstractButton& file = *offer("Open a file…");
+  const QFontMetrics metrics(qtFont(Font::system(14)));
+  const int whole = metrics.horizontalAdvance(file.accessibleDescription());
+  table.resize(whole + 100, 600);
+  QCoreApplication::processEvents();
+  EXPECT_EQ(file.height(), 64);
+  table.resize(whole, 600);
+  QCoreApplication::processEvents();
+  EXPECT_GE(file.height(), 64 + metrics.height());
+  EXPECT_LT(file.height(), 64 + 2 * metrics.height());
 }
 
 TEST_F(StartPageTest, AModemIsChosenFromAMenu) {
