@@ -66,6 +66,10 @@ QColor selectionColor(const QPalette& palette) {
   return blend(palette.color(QPalette::Base), palette.color(QPalette::Highlight), 0.3);
 }
 
+QColor paleSelectionColor(const QPalette& palette) {
+  return blend(palette.color(QPalette::Base), palette.color(QPalette::Highlight), 0.1);
+}
+
 QColor accentColor(const QPalette& palette, const QColor& ground) {
   return withContrast(readable, palette.color(QPalette::Highlight), palette.color(QPalette::WindowText),
                       ground);

@@ -23,6 +23,8 @@ QColor markColor(const QPalette& palette);
 QColor quietTextColor(const QPalette& palette);
 /// The ground of the selected row. The text on it keeps its color.
 QColor selectionColor(const QPalette& palette);
+/// The same in a pane without the keyboard.
+QColor paleSelectionColor(const QPalette& palette);
 /// Text that is out of date. It is still easy to read.
 QColor dimmedTextColor(const QPalette& palette, const QColor& ground);
 /// A color for marks on this ground: nearer to the text's color, as far as the mark would not be seen well.

@@ -48,9 +48,11 @@ bool hasKeyboard(const PaneWidget& pane) { return pane.isAncestorOf(QApplication
 NavigationWidget::NavigationWidget(std::shared_ptr<PaneController> root) {
   _controllers.push_back(std::move(root));
   adopt(0);
+  connect(qApp, &QApplication::focusChanged, this, [this] { showPaneWithKeyboard(); });
 }
 
 NavigationWidget::~NavigationWidget() {
+  disconnect(qApp, nullptr, this, nullptr);
   // Their widgets do not belong to this one.
   if (_modal) screenOf(*_modal).leave();
   for (const auto& controller : _controllers) release(*controller);
@@ -152,6 +154,7 @@ void NavigationWidget::arrange() {
     }
   }
   if (ModalScreenWidget* screen = modalScreen()) screen->raise();
+  showPaneWithKeyboard();
   if (losesKeyboard) takeKeyboard();
 }
 
@@ -245,10 +248,19 @@ std::vector<std::string> NavigationWidget::pathOfFocus() const {
   return path;
 }
 
-// When no pane has the keyboard, the top one counts.
+bool NavigationWidget::hasRowWithFocus() const { return !paneAt(paneWithKeyboard()).pathOfFocus().empty(); }
+
+// When no pane has the keyboard, the top one counts. A window that is not active keeps its pane.
 std::size_t NavigationWidget::paneWithKeyboard() const {
   const PaneWidget* const beside = paneBeside();
-  return _controllers.size() - (beside && hasKeyboard(*beside) ? 2 : 1);
+  return _controllers.size() - (beside && beside->isAncestorOf(window()->focusWidget()) ? 2 : 1);
+}
+
+// The commands of rows are for the pane with the keyboard.
+void NavigationWidget::showPaneWithKeyboard() {
+  if (_isChoosing) return;
+  const std::size_t marked = paneWithKeyboard();
+  for (std::size_t index = 0; index < _controllers.size(); ++index) paneAt(index).setPale(index != marked);
 }
 
 void NavigationWidget::setRecordSource(const RecordSource& source) {

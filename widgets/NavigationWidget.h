@@ -63,6 +63,8 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   /// The names from below the root to the current row of the pane with the keyboard focus; without such a
   /// row, to the pane's own node. When no pane has the focus, the top one counts.
   std::vector<std::string> pathOfFocus() const;
+  /// Whether `pathOfFocus` leads to a row.
+  bool hasRowWithFocus() const;
   /// Null while no screen is presented.
   ModalScreenWidget* modalScreen() const;
 
@@ -85,6 +87,7 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   void goBackFrom(std::size_t index);
   bool showRowsAgain(const QKeyEvent& event);
   std::size_t paneWithKeyboard() const;
+  void showPaneWithKeyboard();
   bool moveKeyboard(const QKeyEvent& event);
   PaneWidget& paneAt(std::size_t index) const;
   std::vector<std::string> pathOf(std::size_t index) const;

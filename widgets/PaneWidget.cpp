@@ -56,6 +56,7 @@ void PaneWidget::showRecords() {
   _records = new RecordTableWidget([this](std::size_t place) { _table.chooseRow(place); });
   _records->setAccessibleName(_header.title());
   _records->markOpen(_openRow);
+  _records->setPale(_isPale);
   _column.insertWidget(_column.indexOf(&_table), _records, 1);
   refreshRecords();
   if (!_records) return;
@@ -84,6 +85,12 @@ void PaneWidget::markOpenRow(const QString& name) {
   _openRow = name;
   _table.markOpenRow(name);
   if (_records) _records->markOpen(name);
+}
+
+void PaneWidget::setPale(bool isPale) {
+  _isPale = isPale;
+  _table.setPale(isPale);
+  if (_records) _records->setPale(isPale);
 }
 
 void PaneWidget::takeKeyboard(Qt::FocusReason reason) {

@@ -59,6 +59,8 @@ class PaneWidget final : public QWidget, public TablePane {
   void showRows();
   /// Marks the row with this name as open beside the pane; null for none.
   void markOpenRow(const QString& name);
+  /// Paler marks of rows: commands are for a row of another pane.
+  void setPale(bool isPale);
   /// Gives the keyboard focus to what is shown of the list.
   void takeKeyboard(Qt::FocusReason reason);
   /// The names from this pane's node to what has the keyboard focus: the current row, and in the table with
@@ -82,6 +84,7 @@ class PaneWidget final : public QWidget, public TablePane {
   RecordSource _source;
   bool _offersRecords = false;
   QString _openRow;
+  bool _isPale = false;
   RecordTableWidget* _records = nullptr;  // a child
 };
 

@@ -151,10 +151,17 @@ void RecordTableWidget::contextMenuEvent(QContextMenuEvent* event) {
   event->ignore();
 }
 
+void RecordTableWidget::setPale(bool isPale) {
+  if (isPale == _isPale) return;
+  _isPale = isPale;
+  viewport()->update();
+}
+
 void RecordTableWidget::initViewItemOption(QStyleOptionViewItem* option) const {
   QTableView::initViewItemOption(option);
   // As in rows: the text on the ground of the selection keeps its color.
-  option->palette.setColor(QPalette::Highlight, selectionColor(palette()));
+  option->palette.setColor(QPalette::Highlight,
+                           _isPale ? paleSelectionColor(palette()) : selectionColor(palette()));
   option->palette.setColor(QPalette::HighlightedText, palette().color(QPalette::Text));
 }
 

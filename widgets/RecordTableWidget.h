@@ -27,6 +27,8 @@ class RecordTableWidget final : public QTableView {
   /// Shows these records. The current one stays current as long as the list has one of its identity.
   void showRecords(RecordList list);
   void markOpen(const QString& name) { _model.markOpen(name); }
+  /// A paler mark of the current record: commands are for a row elsewhere.
+  void setPale(bool isPale);
   /// Makes the record at this place of the list the current one.
   void makeCurrent(std::size_t place);
   /// The place of the current record in its list.
@@ -54,6 +56,7 @@ class RecordTableWidget final : public QTableView {
   Chosen _chosen;
   std::set<int> _columnsOfUser;  // those to which the user has given a width
   bool _isWidening = false;
+  bool _isPale = false;
   TouchScrolling _touch;
 };
 

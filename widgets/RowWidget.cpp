@@ -206,7 +206,8 @@ void RowWidget::scrollSidewaysTo(double position) {
 void RowWidget::paintEvent(QPaintEvent*) {
   QPainter painter(this);
   const bool isMarked = _emphasis.isSelected || _emphasis.isOpen;
-  const QColor ground = isMarked ? selectionColor(palette()) : palette().color(QPalette::Base);
+  const QColor mark = _emphasis.isPale ? paleSelectionColor(palette()) : selectionColor(palette());
+  const QColor ground = isMarked ? mark : palette().color(QPalette::Base);
   painter.fillRect(rect(), ground);
   // The first letters of a text decide about its direction, not the desktop's language.
   painter.setLayoutDirection(Qt::LayoutDirectionAuto);

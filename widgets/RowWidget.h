@@ -25,6 +25,8 @@ class RowWidget final : public QWidget, public CellView {
     bool hasFocusFrame = false;
     bool isOpen = false;  ///< the pane to which it leads is beside its table
 
+    bool isPale = false;  ///< commands are for a row elsewhere
+
     friend bool operator==(const Emphasis&, const Emphasis&) = default;
   };
 

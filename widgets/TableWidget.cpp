@@ -64,6 +64,12 @@ void TableWidget::markOpenRow(const QString& name) {
   showEmphasis();
 }
 
+void TableWidget::setPale(bool isPale) {
+  if (isPale == _isPale) return;
+  _isPale = isPale;
+  showEmphasis();
+}
+
 void TableWidget::setDelegate(TableViewDelegate* delegate) {
   _delegate = delegate;
   if (!_delegate && _isLoaded) load();
@@ -423,8 +429,10 @@ void TableWidget::showEmphasis() {
 
 RowWidget::Emphasis TableWidget::emphasisOf(const RowWidget& row) const {
   const bool isCurrent = _current == row.row();
-  return {isCurrent && _currentIsSelected, isCurrent && _keysAreUsed && hasFocus(),
-          !_openRow.isNull() && row.name() == _openRow};
+  // A row that is not selected has no other mark.
+  const bool needsFrame = _keysAreUsed || !_currentIsSelected;
+  return {isCurrent && _currentIsSelected, isCurrent && needsFrame && hasFocus(),
+          !_openRow.isNull() && row.name() == _openRow, _isPale};
 }
 
 void TableWidget::mousePressEvent(QMouseEvent* event) {

@@ -58,6 +58,8 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   /// Marks the row with this name: its pane is open beside this one. Right then leaves this table for that
   /// pane, except on another row that leads to a pane. Null: no pane is open beside this one.
   void markOpenRow(const QString& name);
+  /// Paler marks of the current row and the open one: commands are for a row elsewhere.
+  void setPale(bool isPale);
 
   /// The rows on the screen, from top to bottom.
   std::vector<RowWidget*> visibleRows() const;
@@ -132,6 +134,7 @@ class TableWidget final : public QAbstractScrollArea, public TableView {
   CellPool _pool;
   std::optional<std::size_t> _current;
   bool _currentIsSelected = false;
+  bool _isPale = false;
   bool _keysAreUsed = false;  // keys were used last, not mouse or touch: the current row gets a frame
   std::optional<MousePress> _press;
   TouchScrolling _touch;

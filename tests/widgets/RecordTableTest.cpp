@@ -10,6 +10,7 @@
 #include <QToolTip>
 
 #include "tests/support/TestWidgets.h"
+#include "widgets/Colors.h"
 #include "widgets/RecordTableWidget.h"
 
 namespace varnel {
@@ -169,6 +170,18 @@ TEST_F(RecordTableWidgetTest, TheCurrentRecordStaysCurrentThroughRefreshesAndSor
   EXPECT_EQ(table.currentPlace(), 0u);
   EXPECT_EQ(table.currentIndex().row(), 1);
   EXPECT_EQ(table.currentColumn(), "RSRP");
+}
+
+TEST_F(RecordTableWidgetTest, TheMarkOfTheCurrentRecordIsPalerWhileCommandsAreForAnotherRow) {
+  table.showRecords(cells({cell("0", "16", -84)}));
+  table.makeCurrent(0);
+  const auto ground = [this] {
+    const QPoint corner = table.visualRect(table.model()->index(0, 1)).topRight() + QPoint(-2, 2);
+    return table.viewport()->grab().toImage().pixelColor(corner).name().toStdString();
+  };
+  EXPECT_EQ(ground(), selectionColor(table.palette()).name().toStdString());
+  table.setPale(true);
+  EXPECT_EQ(ground(), paleSelectionColor(table.palette()).name().toStdString());
 }
 
 TEST_F(RecordTableWidgetTest, SSortsByTheCurrentColumnAndThenTheOtherWayRound) {

@@ -119,6 +119,17 @@ TEST_F(RowWidgetTest, AChangedRowHasADotBeforeItsText) {
   EXPECT_EQ(contrastIn(row, changeMark), 1);
 }
 
+TEST_F(RowWidgetTest, TheMarkOfTheCurrentRowIsPalerWhileCommandsAreForAnother) {
+  RowWidget& row = showSection("Cell", {});
+  const auto ground = [&row] { return row.grab().toImage().pixelColor(2, 2).name().toStdString(); };
+  table.selectRow({0, 0});
+  EXPECT_EQ(ground(), selectionColor(row.palette()).name().toStdString());
+  table.setPale(true);
+  EXPECT_EQ(ground(), paleSelectionColor(row.palette()).name().toStdString());
+  table.setPale(false);
+  EXPECT_EQ(ground(), selectionColor(row.palette()).name().toStdString());
+}
+
 TEST_F(RowWidgetTest, ALevelIsANumberOfBars) {
   RowWidget& row = show("RSRP", "-97.25 dBm");
   EXPECT_EQ(filledBars(row, endOfLevelMark), 0);

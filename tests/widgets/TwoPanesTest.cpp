@@ -337,5 +337,44 @@ TEST_F(TwoPanesTest, RowsAreAtMost800WideAndStandInTheMiddle) {
   EXPECT_EQ(at(1).table().visibleRows().front()->geometry(), QRect(176, 0, 800, 50));
 }
 
+// The right pane has the keyboard, so its row is the one that commands apply to.
+TEST_F(TwoPanesTest, TheRowsOfThePaneWithoutTheKeyboardArePale) {
+  show(1200, 700);
+  click(*root, 0);
+  ASSERT_TRUE(hasKeyboard(at(1)));
+  EXPECT_TRUE(root->table().visibleRows().at(0)->emphasis().isPale);
+  EXPECT_FALSE(at(1).table().visibleRows().at(0)->emphasis().isPale);
+  press(Qt::Key_Left);
+  ASSERT_TRUE(hasKeyboard(*root));
+  EXPECT_FALSE(root->table().visibleRows().at(0)->emphasis().isPale);
+  EXPECT_TRUE(at(1).table().visibleRows().at(0)->emphasis().isPale);
+  resize(600);
+  EXPECT_FALSE(at(1).table().visibleRows().at(0)->emphasis().isPale) << "it is alone";
+}
+
+TEST_F(TwoPanesTest, WhenNoPaneHasTheKeyboardCommandsAreForTheOneOnTheRight) {
+  auto bar = std::make_unique<QWidget>();
+  bar->setFocusPolicy(Qt::StrongFocus);
+  QWidget& beneath = *bar;
+  window.setBar(std::move(bar));
+  show(1200, 700);
+  click(*root, 0);
+  press(Qt::Key_Left);
+  beneath.setFocus();
+  ASSERT_TRUE(beneath.hasFocus());
+  EXPECT_THAT(window.pathOfFocus(), ElementsAre("A"));
+  EXPECT_TRUE(root->table().visibleRows().at(0)->emphasis().isPale);
+  EXPECT_FALSE(at(1).table().visibleRows().at(0)->emphasis().isPale);
+}
+
+// A click on a leaf selects nothing, but commands apply to its row from then on.
+TEST_F(TwoPanesTest, ALeafThatWasClickedHasTheFrame) {
+  show(360, 640);
+  click(*root, 3);
+  const RowWidget::Emphasis& leaf = root->table().visibleRows().at(3)->emphasis();
+  EXPECT_FALSE(leaf.isSelected);
+  EXPECT_TRUE(leaf.hasFocusFrame);
+}
+
 }  // namespace
 }  // namespace varnel
