@@ -283,6 +283,10 @@ bool NavigationWidget::toggleRecordTable() {
   return false;
 }
 
+bool NavigationWidget::offersRecordTable() const {
+  return paneAt(paneWithKeyboard()).offersRecords() || topPane().offersRecords();
+}
+
 // Escape in a table with columns does not go back yet.
 bool NavigationWidget::showRowsAgain(const QKeyEvent& event) {
   PaneWidget& pane = paneAt(paneWithKeyboard());

@@ -58,6 +58,8 @@ class NavigationWidget final : public QWidget, public NavigationStack {
   /// Shows the list of the pane with the keyboard, else of the top pane, as a table with columns, or as rows
   /// again. False when neither is a list of records.
   bool toggleRecordTable();
+  /// Whether `toggleRecordTable` would do something now.
+  bool offersRecordTable() const;
   /// The pane on the left of the top one; null while there is none.
   PaneWidget* paneBeside() const;
   /// The names from below the root to the current row of the pane with the keyboard focus; without such a

@@ -1,6 +1,7 @@
 #include "widgets/RowMenu.h"
 
 #include <QContextMenuEvent>
+#include <QScreen>
 
 namespace varnel {
 
@@ -43,7 +44,27 @@ void RowMenu::openAt(const QPoint& place, Items items) {
   }
   _menu->addSeparator();
   _menu->addActions(_lastActions);
+  offerWhatApplies();
+  showKeysIfTheyFit();
   _menu->popup(place);
+}
+
+// An action is enabled again as soon as the menu goes, since its keys may say why it does nothing.
+void RowMenu::offerWhatApplies() {
+  for (QAction* const action : _menu->actions()) {
+    if (action->isSeparator() || _window.offers(*action)) continue;
+    action->setEnabled(false);
+    connect(_menu, &QMenu::aboutToHide, action, [action] { action->setEnabled(true); });
+  }
+}
+
+// Keys that are cut at the edge of the screen would tell nobody anything.
+void RowMenu::showKeysIfTheyFit() {
+  const auto showKeys = [this](bool areShown) {
+    for (QAction* const action : _menu->actions()) action->setShortcutVisibleInContextMenu(areShown);
+  };
+  showKeys(true);
+  if (_menu->sizeHint().width() > _window.screen()->availableGeometry().width()) showKeys(false);
 }
 
 // The widgets below the mouse have no use for the event, so the window gets it.

@@ -42,6 +42,9 @@ class RowMenu final : public QObject {
   bool eventFilter(QObject* watched, QEvent* event) override;
 
  private:
+  void offerWhatApplies();
+  void showKeysIfTheyFit();
+
   WindowWidget& _window;
   const QList<QAction*> _lastActions;
   QList<QAction*> _rowActions;

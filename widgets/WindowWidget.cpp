@@ -62,6 +62,11 @@ QAction& WindowWidget::addCommand(const QString& text, const QList<QKeySequence>
   return *action;
 }
 
+bool WindowWidget::offers(const QAction& action) const {
+  const auto condition = _conditions.find(&action);
+  return condition == _conditions.end() || condition->second();
+}
+
 bool WindowWidget::isCovered() const {
   if (_root && _root->modalScreen()) return true;
   return std::ranges::any_of(children(),

@@ -4,6 +4,7 @@
 #include <QPointer>
 #include <QWidget>
 #include <functional>
+#include <map>
 #include <memory>
 #include <string>
 #include <utility>
@@ -37,6 +38,12 @@ class WindowWidget final : public QWidget, public Window {
   /// Adds an action that the keys cause: the first of them is its usual key. It does nothing while a save
   /// screen or an alert has the keyboard.
   QAction& addCommand(const QString& text, const QList<QKeySequence>& keys, std::function<void()> act);
+  /// Menus show the action as one that cannot be chosen while this says no. Its keys act all the same.
+  void offerOnlyIf(const QAction& action, std::function<bool()> applies) {
+    _conditions.insert_or_assign(&action, std::move(applies));
+  }
+  /// Whether menus offer the action now.
+  bool offers(const QAction& action) const;
   /// Lays a page with this content above the stack, in place of an earlier page. It covers the whole stack.
   void showPage(const QString& title, std::unique_ptr<QWidget> content);
   /// True while a save screen or an alert has the keyboard.
@@ -75,6 +82,7 @@ class WindowWidget final : public QWidget, public Window {
   QSize ordinarySize() const;
 
   Wishes _wishes;
+  std::map<const QAction*, std::function<bool()>> _conditions;
   std::function<void(const QSize&)> _leavingObserver;
   QPointer<NavigationWidget> _root;
   PageWidget* _page = nullptr;  // a child

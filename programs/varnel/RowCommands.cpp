@@ -25,6 +25,10 @@ void confirm(WindowWidget& window, const QString& copied) {
   QToolTip::showText(placeOfFocus(window), plainTooltip(QStringLiteral("Copied: ") + first), &window);
 }
 
+void tellNothingToCopy(WindowWidget& window) {
+  QToolTip::showText(placeOfFocus(window), QStringLiteral("No row is chosen"), &window);
+}
+
 }  // namespace
 
 RowCommands::RowCommands(VarnelApp& app, const RowAnswers& answers) : _app(app), _answers(answers) {
@@ -37,12 +41,13 @@ void RowCommands::addTo(WindowWidget& window) {
   window.addCommand(QStringLiteral("Find a row"),
                     {QKeySequence(Qt::CTRL | Qt::Key_F), QKeySequence(Qt::Key_Slash)}, [this] { find(); });
   menu->setRowActions(
-      {addCopy(QStringLiteral("Copy the value"), {QKeySequence(Qt::CTRL | Qt::Key_C)}, copied(copyOfValue)),
-       addCopy(QStringLiteral("Copy the row"), {QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_C)},
+      {addCopy(Subject::Row, QStringLiteral("Copy the value"), {QKeySequence(Qt::CTRL | Qt::Key_C)},
+               copied(copyOfValue)),
+       addCopy(Subject::Row, QStringLiteral("Copy the row"), {QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_C)},
                copied(copyOfRow)),
-       addCopy(QStringLiteral("Copy the section as text"), {}, copied(copyOfSectionAsText)),
-       addCopy(QStringLiteral("Copy the section as JSON"), {}, copied(copyOfSectionAsJson)),
-       addCopy(QStringLiteral("Copy the path"), {}, [](const NamePath& names) {
+       addCopy(Subject::Section, QStringLiteral("Copy the section as text"), {}, copied(copyOfSectionAsText)),
+       addCopy(Subject::Section, QStringLiteral("Copy the section as JSON"), {}, copied(copyOfSectionAsJson)),
+       addCopy(Subject::Section, QStringLiteral("Copy the path"), {}, [](const NamePath& names) {
          return names.empty() ? std::string("/") : RowAnswers::pathOf(names);
        })});
   window.addCommand(QStringLiteral("Help"), {QKeySequence(Qt::Key_F1), QKeySequence(Qt::Key_Question)},
@@ -55,15 +60,18 @@ void RowCommands::addTo(WindowWidget& window) {
   menu->leaveOut(open);
 }
 
-QAction* RowCommands::addCopy(const QString& text, const QList<QKeySequence>& keys,
+QAction* RowCommands::addCopy(Subject subject, const QString& text, const QList<QKeySequence>& keys,
                               std::function<std::string(const NamePath&)> contents) {
-  return &_window->addCommand(text, keys, [this, contents = std::move(contents)] {
+  QAction& action = _window->addCommand(text, keys, [this, subject, contents = std::move(contents)] {
+    if (!has(subject)) return tellNothingToCopy(*_window);
     const std::string text = contents(names());
     if (text.empty()) return;
     const QString copied = QString::fromStdString(text);
     QGuiApplication::clipboard()->setText(copied);
     confirm(*_window, copied);
   });
+  _window->offerOnlyIf(action, [this, subject] { return has(subject); });
+  return &action;
 }
 
 std::function<std::string(const NamePath&)> RowCommands::copied(Copy copy) const {
@@ -80,6 +88,15 @@ NamePath RowCommands::names() const {
     return row ? row->path : NamePath();
   }
   return _window->pathOfFocus();
+}
+
+// A pane without a current row is still a section.
+bool RowCommands::has(Subject subject) const {
+  if (!_app.hasDisplay()) return false;
+  if (subject == Subject::Section) return true;
+  if (const auto* const page = qobject_cast<SearchPage*>(_window->page()))
+    return page->currentRow().has_value();
+  return _window->stack() && _window->stack()->hasRowWithFocus();
 }
 
 void RowCommands::find() {

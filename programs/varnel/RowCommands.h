@@ -25,12 +25,16 @@ class RowCommands final {
  private:
   using Copy = std::string (*)(const VarnelModelNode& root, const NamePath& names);
 
-  QAction* addCopy(const QString& text, const QList<QKeySequence>& keys,
+  // What a copy is of.
+  enum class Subject { Row, Section };
+
+  QAction* addCopy(Subject subject, const QString& text, const QList<QKeySequence>& keys,
                    std::function<std::string(const NamePath& names)> contents);
   std::function<std::string(const NamePath& names)> copied(Copy copy) const;
   void find();
   void help();
   NamePath names() const;
+  bool has(Subject subject) const;
   void followDisplay() const;
 
   VarnelApp& _app;

@@ -26,10 +26,14 @@ void Trends::furnish(WindowWidget& window) {
     show(_window->pathOfFocus());
   });
   trend.setObjectName(QLatin1String(TableWidget::courseCommand));
-  window.addCommand(QObject::tr("Add this row to the last trend"), {Qt::SHIFT | Qt::Key_T}, [this] {
-    if (page()) return page()->chooseRows();
-    showAlso(_window->pathOfFocus());
-  });
+  const auto hasCourse = [this] { return keyOf(_window->pathOfFocus()).has_value(); };
+  window.offerOnlyIf(trend, hasCourse);
+  const QAction& addition =
+      window.addCommand(QObject::tr("Add this row to the last trend"), {Qt::SHIFT | Qt::Key_T}, [this] {
+        if (page()) return page()->chooseRows();
+        showAlso(_window->pathOfFocus());
+      });
+  window.offerOnlyIf(addition, hasCourse);
 }
 
 void Trends::show(const NamePath& path) { open(path, Picture::New); }

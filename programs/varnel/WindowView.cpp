@@ -1,5 +1,6 @@
 #include "programs/varnel/WindowView.h"
 
+#include <QToolTip>
 #include <csignal>
 
 #include "app/EventHistory.h"
@@ -14,6 +15,7 @@
 #include "programs/varnel/Player.h"
 #include "programs/varnel/RowCommands.h"
 #include "programs/varnel/Trends.h"
+#include "widgets/RowMenu.h"
 #include "widgets/WidgetApplication.h"
 #include "widgets/WidgetUserInterface.h"
 
@@ -94,10 +96,13 @@ class WindowViewer final {
   // What the user can do in the window beyond the screens of the application.
   void furnish(WindowWidget& window) {
     _rowCommands.addTo(window);
-    window.addCommand(QObject::tr("Show a list as a table, or as rows again"), {Qt::CTRL | Qt::Key_T},
-                      [&window] {
-                        if (!window.page() && window.stack()) window.stack()->toggleRecordTable();
-                      });
+    const QAction& table = window.addCommand(
+        QObject::tr("Show a list as a table, or as rows again"), {Qt::CTRL | Qt::Key_T}, [&window] {
+          if (window.page() || !window.stack() || window.stack()->toggleRecordTable()) return;
+          QToolTip::showText(placeOfFocus(window), QObject::tr("Only a list can be shown as a table"),
+                             &window);
+        });
+    window.offerOnlyIf(table, [&window] { return window.stack() && window.stack()->offersRecordTable(); });
     _trends.furnish(window);
     _player.furnish(window);
   }

@@ -325,6 +325,28 @@ TEST_F(WindowEndToEnd, TheRowWithTheFocusIsCopiedInEveryForm) {
   EXPECT_THAT(copyOf("Copy the section as JSON"), testing::HasSubstr("\"Average RSRP\":\"" + value + "\""));
 }
 
+TEST_F(WindowEndToEnd, WithoutARowItsValueIsNotCopiedAndTheMenuDoesNotOfferIt) {
+  simulate("7");
+  launch();
+  ASSERT_TRUE(runUntil([this] { return isUpdated() && hasRow(measurements); }, patience));
+  const auto offered = [this] {
+    Texts texts;
+    for (QAction* const action : window().actions())
+      if (action->text().startsWith("Copy") && window().offers(*action))
+        texts.push_back(action->text().toStdString());
+    return texts;
+  };
+  const Texts ofSection{"Copy the section as text", "Copy the section as JSON", "Copy the path"};
+  EXPECT_EQ(offered(), ofSection);
+  QGuiApplication::clipboard()->setText("before");
+  press(Qt::Key_C, Qt::ControlModifier);
+  EXPECT_EQ(copied(), "before");
+  press(Qt::Key_Down);
+  EXPECT_THAT(offered(), SizeIs(5));
+  press(Qt::Key_C, Qt::ControlModifier | Qt::ShiftModifier);
+  EXPECT_EQ(copied(), pane().tableWidget().currentRow()->name().toStdString());
+}
+
 TEST_F(WindowEndToEnd, TheMenuBelongsToTheRowUnderTheMouseAndHasEverything) {
   simulate("7");
   launch();

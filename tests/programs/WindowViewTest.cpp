@@ -9,14 +9,18 @@
 #include <csignal>
 #include <cstdlib>
 #include <functional>
+#include <set>
+#include <string>
 
 #include "tests/support/Process.h"
+#include "widgets/RowMenu.h"
 
 namespace varnel {
 namespace {
 
 using namespace std::chrono_literals;
 using testing::HasSubstr;
+using testing::UnorderedElementsAre;
 
 // What the user does as soon as the window is open.
 std::function<void(QWidget& window)> deed;
@@ -85,6 +89,19 @@ TEST_F(WindowViewTest, TheWindowsSizeIsKeptForTheNextRun) {
     window.close();
   });
   EXPECT_EQ(contentsOf(_state.path() / "varnel/window-size"), "500 450\n");
+}
+
+TEST_F(WindowViewTest, WithoutADisplayOnlyWhatAppliesCanBeChosenInTheMenu) {
+  std::set<std::string> offered;
+  statusAfter([&offered](QWidget& window) {
+    auto& menu = *window.findChild<RowMenu*>();
+    menu.open();
+    for (const QAction* const action : menu.menu()->actions())
+      if (!action->isSeparator() && action->isEnabled()) offered.insert(action->text().toStdString());
+    menu.menu()->close();
+    window.close();
+  });
+  EXPECT_THAT(offered, UnorderedElementsAre("Find a row", "Help", "Open a file", "Start over", "Quit"));
 }
 
 }  // namespace

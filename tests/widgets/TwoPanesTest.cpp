@@ -6,6 +6,7 @@
 #include "tests/support/TestWidgets.h"
 #include "widgets/NavigationWidget.h"
 #include "widgets/PanePlaces.h"
+#include "widgets/RowMenu.h"
 
 namespace varnel {
 namespace {
@@ -374,6 +375,38 @@ TEST_F(TwoPanesTest, ALeafThatWasClickedHasTheFrame) {
   const RowWidget::Emphasis& leaf = root->table().visibleRows().at(3)->emphasis();
   EXPECT_FALSE(leaf.isSelected);
   EXPECT_TRUE(leaf.hasFocusFrame);
+}
+
+TEST_F(TwoPanesTest, TheMenuOffersWhatAppliesAndKeysActAllTheSame) {
+  bool applies = false;
+  RowMenu menu(window);
+  QAction& action = window.addCommand("Trend", {Qt::Key_T}, [] {});
+  window.offerOnlyIf(action, [&applies] { return applies; });
+  show(360, 640);
+  menu.open();
+  EXPECT_FALSE(action.isEnabled());
+  menu.menu()->close();
+  EXPECT_TRUE(action.isEnabled());
+  QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+  ASSERT_FALSE(menu.menu());
+  applies = true;
+  menu.open();
+  EXPECT_TRUE(action.isEnabled());
+  menu.menu()->close();
+}
+
+TEST_F(TwoPanesTest, TheMenuLeavesKeysOutThatDoNotFitOnTheScreen) {
+  RowMenu menu(window);
+  QAction& action = window.addCommand("Trend", {Qt::Key_T}, [] {});
+  show(360, 640);
+  menu.open();
+  EXPECT_TRUE(action.isShortcutVisibleInContextMenu());
+  menu.menu()->close();
+  QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+  window.addCommand(QString(400, u'W'), {}, [] {});
+  menu.open();
+  EXPECT_FALSE(action.isShortcutVisibleInContextMenu());
+  menu.menu()->close();
 }
 
 }  // namespace

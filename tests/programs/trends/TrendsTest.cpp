@@ -8,6 +8,7 @@
 #include "tests/programs/trends/TrendHarness.h"
 #include "tests/support/DictionaryOf.h"
 #include "tests/support/TestWidgets.h"
+#include "widgets/NavigationWidget.h"
 #include "widgets/WindowWidget.h"
 
 namespace varnel {
@@ -62,6 +63,23 @@ TEST_F(TrendsTest, ARowThatShowsNoNumberAtPresentHasTheCourseThatItHad) {
   show(22, "-85");
   trends.show({"LTE", "Connection", "Count"});
   EXPECT_THAT(trends.page()->rows(), ElementsAre("/LTE/Connection/Count"));
+}
+
+TEST_F(TrendsTest, MenusOfferATrendOfARowWithNumbersOnly) {
+  std::vector<std::string> calls;
+  const auto pane = std::make_shared<TestController>("LTE", calls);
+  TestRows rows({{"RSRP", "-85 dBm"}, {"Neighbors"}});
+  pane->widget().tableWidget().setDelegate(&rows);
+  NavigationWidget stack(pane);
+  window.setRoot(stack);
+  TableWidget& table = pane->widget().tableWidget();
+  const QAction& trend = *window.findChild<QAction*>(QLatin1String(TableWidget::courseCommand));
+  EXPECT_FALSE(window.offers(trend)) << "no row is chosen";
+  QTest::keyClick(&table, Qt::Key_Down);
+  EXPECT_TRUE(window.offers(trend));
+  QTest::keyClick(&table, Qt::Key_Down);
+  EXPECT_FALSE(window.offers(trend)) << "a section";
+  pane->widget().tableWidget().setDelegate(nullptr);
 }
 
 TEST_F(TrendsTest, ARowWithoutACourseLetsTheUserChoose) {
