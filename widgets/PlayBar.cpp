@@ -182,6 +182,10 @@ void PlayBar::setState(const PlayBarState& state) {
   QAccessible::updateAccessibility(&spoken);
 }
 
+void PlayBar::setWayToClose(const QString& text) {
+  if (text != _close->text()) _close->setGlyph(GlyphButton::Glyph::Close, text);
+}
+
 // What had the keyboard is hidden. The toolkit would give it to the button that closes everything.
 void PlayBar::passKeyboardOn() {
   for (QWidget* const next : std::initializer_list<QWidget*>{_play, _remedy})

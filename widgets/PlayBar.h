@@ -38,6 +38,8 @@ class PlayBar final : public QWidget {
 
   void setState(const PlayBarState& state);
   const PlayBarState& state() const { return _state; }
+  /// What the button at the end does; by default it closes the file.
+  void setWayToClose(const QString& text);
   /// Tells how far a place is while the user moves the slider.
   void setProgress(const QString& progress);
   QSize sizeHint() const override;

@@ -109,12 +109,15 @@ void Player::furnish(WindowWidget& window) {
   _window = &window;
   window.addCommand(QStringLiteral("Open a file"), {QKeySequence(Qt::CTRL | Qt::Key_O)},
                     [this] { chooseFile(); });
-  window.addCommand(QStringLiteral("Play or pause"), {QKeySequence(Qt::CTRL | Qt::Key_P)}, [this] {
-    if (_window && _window->bar()) bar().playButton().click();
+  const QAction& play =
+      window.addCommand(QStringLiteral("Play or pause"), {QKeySequence(Qt::CTRL | Qt::Key_P)}, [this] {
+        if (_window && _window->bar()) bar().playButton().click();
+      });
+  window.offerOnlyIf(play, [this] { return _window->bar() && bar().playButton().isVisible(); });
+  _close = &window.addCommand(wayToClose(), {QKeySequence(Qt::CTRL | Qt::Key_W)}, [this] {
+    if (hasOwn()) close();
   });
-  window.addCommand(QStringLiteral("Close the file"), {QKeySequence(Qt::CTRL | Qt::Key_W)}, [this] {
-    if (_own.kind != Kind::Usual) close();
-  });
+  window.offerOnlyIf(*_close, [this] { return hasOwn(); });
   new FileDrop(window, [this](const std::string& path) { open(path); });
 }
 
@@ -536,10 +539,30 @@ void Player::dragTo(int place) {
 
 void Player::showBar() {
   if (!_window) return;
-  const bool isNeeded = _own.kind != Kind::Usual || showsStart();
-  if (isNeeded) return bar().setState(barState());
+  _close->setText(wayToClose());
+  if (hasOwn()) {
+    bar().setState(barState());
+    return bar().setWayToClose(wayToClose());
+  }
   _window->setBar(nullptr);
 }
+
+QString Player::wayToClose() const {
+  switch (_own.kind == Kind::Usual ? _starting.kind : _own.kind) {
+    case Kind::Simulation:
+      return QStringLiteral("End the simulated modem");
+    case Kind::Port:
+      return QStringLiteral("Leave the port");
+    case Kind::Snapshot:
+      return QStringLiteral("Close the snapshot");
+    case Kind::Usual:
+    case Kind::Replay:
+      break;
+  }
+  return QStringLiteral("Close the file");
+}
+
+bool Player::hasOwn() const { return _own.kind != Kind::Usual || showsStart(); }
 
 // Most files and a simulation are there at once.
 bool Player::showsStart() const {

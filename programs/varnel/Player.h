@@ -137,7 +137,9 @@ class Player final {
 
   void showBar();
   bool showsStart() const;
+  bool hasOwn() const;
   PlayBar& bar();
+  QString wayToClose() const;
   PlayBarState barState() const;
   PlayBarState stateOfStart() const;
   PlayBarState stateOfSnapshot() const;
@@ -149,6 +151,7 @@ class Player final {
 
   const Parts _parts;
   QPointer<WindowWidget> _window;
+  QAction* _close = nullptr;  // of the window
   QPointer<StartPage> _startPage;
   QString _folder;  // of the file that was opened last
 

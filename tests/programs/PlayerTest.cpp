@@ -117,6 +117,20 @@ class PlayerTest : public testing::Test {
     _player->begin();
     ASSERT_TRUE(QTest::qWaitForWindowActive(&window(), patience_ms));
   }
+  QAction* command(Qt::Key key) {
+    for (QAction* const action : window().actions())
+      if (action->shortcuts().contains(QKeySequence(Qt::CTRL | key))) return action;
+    return nullptr;
+  }
+  // As the button of the bar and the command of the window say it.
+  Texts waysToClose() {
+    return {bar()->closeButton().toolTip().toStdString(), command(Qt::Key_W)->text().toStdString()};
+  }
+  bool offers(const std::string& text) {
+    for (const QAction* const action : window().actions())
+      if (action->text().toStdString() == text) return window().offers(*action);
+    return false;
+  }
   WindowWidget& window() { return static_cast<WindowWidget&>(*_app->window()); }
   PaneWidget& pane() { return window().stack()->topPane(); }
   std::string title() { return pane().header().title().toStdString(); }
@@ -245,6 +259,8 @@ TEST_F(PlayerTest, ASimulatedModemIsChosenFromAMenuAndTheOfferGoes) {
   EXPECT_EQ(pane().tableWidget().hasFocus(), true);
   ASSERT_TRUE(waitForBar([](const auto& state) { return state.button == PlayBarState::Button::Pause; }));
   EXPECT_THAT(barTexts(), HasSubstr("Simulated · 0:0"));
+  EXPECT_THAT(waysToClose(), ElementsAre("End the simulated modem", "End the simulated modem"));
+  EXPECT_TRUE(offers("End the simulated modem"));
   EXPECT_FALSE(bar()->slider().isVisible());
 }
 
@@ -455,6 +471,8 @@ TEST_F(PlayerTest, AModemsPortIsShown) {
   ASSERT_TRUE(waitForRow("SIM 1"));
   EXPECT_EQ(barTexts(), "Port " + port);
   EXPECT_FALSE(bar()->playButton().isVisible());
+  EXPECT_THAT(waysToClose(), ElementsAre("Leave the port", "Leave the port"));
+  EXPECT_FALSE(offers("Play or pause"));
 }
 
 TEST_F(PlayerTest, AFileThatCannotBeOpenedIsToldAndTheWindowOffersWhatItOffered) {
@@ -512,7 +530,12 @@ TEST_F(PlayerTest, AServerThatIsKilledIsToldAndStartedAgain) {
 TEST_F(PlayerTest, ClosingTheFileEndsItsServerAndReturnsToTheOffer) {
   launch(capture(60));
   ASSERT_TRUE(waitForRow(section));
+  EXPECT_THAT(waysToClose(), ElementsAre("Close the file", "Close the file"));
+  EXPECT_TRUE(offers("Close the file"));
+  EXPECT_TRUE(offers("Play or pause"));
   QTest::mouseClick(&bar()->closeButton(), Qt::LeftButton);
+  EXPECT_FALSE(offers("Close the file")) << "there is none";
+  EXPECT_FALSE(offers("Play or pause"));
   EXPECT_TRUE(waitForServers(0));
   EXPECT_TRUE(waitForStartPage());
   EXPECT_EQ(bar(), nullptr);
@@ -535,6 +558,7 @@ TEST_F(PlayerTest, ASnapshotIsWalkedThroughWithoutAServer) {
   launch(snapshot({"-90 dBm", "-91 dBm", "-92 dBm"}));
   openRow("Cell");
   EXPECT_THAT(rows(), ElementsAre("RSRP: -92 dBm"));
+  EXPECT_THAT(waysToClose(), ElementsAre("Close the snapshot", "Close the snapshot"));
   EXPECT_EQ(barTexts(), "2023-11-14 22:13:22 | Display 3 of 3");
   EXPECT_EQ(pane().toolbar().findChild<QLabel*>()->text(), "Display of 2023-11-14 at 22:13:22");
   EXPECT_FALSE(bar()->playButton().isVisible());
