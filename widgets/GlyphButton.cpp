@@ -36,6 +36,12 @@ QPainterPath cross() {
   return path;
 }
 
+QPainterPath dots() {
+  QPainterPath path;
+  for (const double middle : {-7, 0, 7}) path.addEllipse(QPointF(middle, 0), 2, 2);
+  return path;
+}
+
 // Most of a circle; its end has an arrowhead.
 QPainterPath turn() {
   constexpr double radius = 7;
@@ -83,6 +89,8 @@ void GlyphButton::paintEvent(QPaintEvent*) {
       return painter.drawPath(turn());
     case Glyph::Close:
       return painter.drawPath(cross());
+    case Glyph::Menu:
+      return painter.fillPath(dots(), color);
   }
 }
 

@@ -6,8 +6,10 @@ namespace varnel {
 
 /// A button that is a painted sign, large enough for a finger. Its text is for tooltips and screen readers.
 class GlyphButton final : public QAbstractButton {
+  Q_OBJECT
+
  public:
-  enum class Glyph { Play, Pause, Again, Close };
+  enum class Glyph { Play, Pause, Again, Close, Menu };
 
   explicit GlyphButton(QWidget* parent = nullptr);
 

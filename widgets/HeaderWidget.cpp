@@ -1,5 +1,7 @@
 #include "widgets/HeaderWidget.h"
 
+#include <QContextMenuEvent>
+#include <QCoreApplication>
 #include <QPainter>
 #include <array>
 #include <cmath>
@@ -13,6 +15,8 @@ namespace {
 
 constexpr int barHeight = 48;
 constexpr int inset = 10;
+constexpr int menuWidth = 40, menuHeight = 44;
+constexpr int overlap = 8;  // of the empty edges of two buttons
 constexpr std::array<double, 3> titleSizes = {17, 15, 13};
 
 int widthOf(const QString& text, double size) {
@@ -26,7 +30,8 @@ HeaderWidget::HeaderWidget(QWidget* parent)
     : QWidget(parent),
       _back(TextButton::Mark::Back, this),
       _title(this),
-      _side(TextButton::Mark::None, this) {
+      _side(TextButton::Mark::None, this),
+      _menu(this) {
   setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Fixed);
   _back.hide();
   _title.setTextFormat(Qt::PlainText);
@@ -39,6 +44,11 @@ HeaderWidget::HeaderWidget(QWidget* parent)
     // A copy: the action may end in another one.
     if (const auto action = _sideAction) action();
   });
+  _menu.setGlyph(GlyphButton::Glyph::Menu, tr("Menu: what can be done with the row, and keys"));
+  // The row that has the keyboard keeps it when the mouse presses the button.
+  _menu.setFocusPolicy(Qt::TabFocus);
+  _menu.hide();
+  connect(&_menu, &QAbstractButton::clicked, this, [this] { askForMenu(); });
 }
 
 void HeaderWidget::setTitle(const QString& title) {
@@ -70,6 +80,20 @@ void HeaderWidget::showSideButton(const std::optional<SideButton>& button) {
   arrange();
 }
 
+void HeaderWidget::showMenuButton(bool isShown) {
+  if (isShown == _hasMenuButton) return;
+  _hasMenuButton = isShown;
+  _menu.setVisible(isShown);
+  arrange();
+}
+
+// What is around the pane opens it, as for a finger that rests.
+void HeaderWidget::askForMenu() {
+  const QPoint place = _menu.geometry().bottomLeft();
+  QContextMenuEvent wish(QContextMenuEvent::Other, place, mapToGlobal(place));
+  QCoreApplication::sendEvent(this, &wish);
+}
+
 QSize HeaderWidget::sizeHint() const { return {320, barHeight}; }
 
 void HeaderWidget::resizeEvent(QResizeEvent* event) {
@@ -91,7 +115,9 @@ bool HeaderWidget::arrangeWith(BackButton backButton, double titleSize) {
   if (backButton == BackButton::Whole) backWidth = _back.sizeHint().width();
   if (backButton == BackButton::Mark) backWidth = _back.minimumSizeHint().width();
   const QSize side = _side.sizeHint();
-  _side.setGeometry(width() - side.width(), (barHeight - side.height()) / 2, side.width(), side.height());
+  _menu.setGeometry(width() - menuWidth, (barHeight - menuHeight) / 2, menuWidth, menuHeight);
+  const int endOfSide = width() - (_hasMenuButton ? menuWidth - overlap : 0);
+  _side.setGeometry(endOfSide - side.width(), (barHeight - side.height()) / 2, side.width(), side.height());
   const int titleWidth = widthOf(_wholeTitle, titleSize);
   _back.setGeometry(0, (barHeight - _back.sizeHint().height()) / 2, backWidth, _back.sizeHint().height());
   _title.setGeometry(titleRoom(backWidth, titleWidth));
@@ -107,7 +133,10 @@ void HeaderWidget::showAsMuchAsFits(const QFont& font) {
   _title.setToolTip(fitting == _wholeTitle ? QString() : plainTooltip(_wholeTitle));
 }
 
-int HeaderWidget::rightInset() const { return _hasSideButton ? _side.sizeHint().width() : inset; }
+int HeaderWidget::rightInset() const {
+  if (_hasSideButton) return width() - _side.x();
+  return _hasMenuButton ? menuWidth : inset;
+}
 
 // In the middle of the bar, or as near to it as the buttons allow.
 QRect HeaderWidget::titleRoom(int backWidth, int titleWidth) const {

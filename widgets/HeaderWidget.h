@@ -5,14 +5,15 @@
 #include <functional>
 #include <optional>
 
+#include "widgets/GlyphButton.h"
 #include "widgets/TextButton.h"
 
 namespace varnel {
 
 /// The bar above a pane. Its title is in the middle. The back button on the left has the title of the pane to
-/// which it leads. On the right there may be a button for another way to show the pane. When all do not fit,
-/// first the title gets smaller letters, then the back button loses its text, then the title is cut at its
-/// end. Its tooltip then shows all of it.
+/// which it leads. On the right there may be a button for another way to show the pane, and one for the menu.
+/// When all do not fit, first the title gets smaller letters, then the back button loses its text, then the
+/// title is cut at its end. Its tooltip then shows all of it.
 class HeaderWidget final : public QWidget {
  public:
   explicit HeaderWidget(QWidget* parent = nullptr);
@@ -35,6 +36,9 @@ class HeaderWidget final : public QWidget {
   /// Called when the user presses the button on the right.
   void setSideAction(std::function<void()> action) { _sideAction = std::move(action); }
 
+  /// A button at the right end, which asks for the menu of the window as a finger that rests does.
+  void showMenuButton(bool isShown);
+
   QSize sizeHint() const override;
 
  protected:
@@ -44,6 +48,7 @@ class HeaderWidget final : public QWidget {
  private:
   enum class BackButton { Hidden, Mark, Whole };
 
+  void askForMenu();
   void arrange();
   bool arrangeWith(BackButton backButton, double titleSize);
   void showAsMuchAsFits(const QFont& font);
@@ -54,10 +59,12 @@ class HeaderWidget final : public QWidget {
   QLabel _title;
   QString _wholeTitle;
   TextButton _side;
+  GlyphButton _menu;
   std::function<void()> _backAction;
   std::function<void()> _sideAction;
   bool _leadsBack = false;
   bool _hasSideButton = false;
+  bool _hasMenuButton = false;
 };
 
 }  // namespace varnel

@@ -83,11 +83,12 @@ QString HelpPage::sheet(const QString& about) const {
             QStringLiteral("</b>&nbsp;</td><td>") + key.deed.toHtmlEscaped() + QStringLiteral("</td></tr>");
   }
   html += QStringLiteral("</table><p>");
-  html += QStringLiteral(
-              "The right mouse button, and a finger that rests on a row, open a menu with what can be done "
-              "with the "
-              "row. A click on the title bar's arrow goes back.")
-              .toHtmlEscaped();
+  html +=
+      QStringLiteral(
+          "The right mouse button, a finger that rests on a row, and the three dots in the title bar open "
+          "a menu with what can be done. With two panes, it is for the row of the pane with the keyboard; "
+          "marks in the other pane are paler. A click on the title bar's arrow goes back.")
+          .toHtmlEscaped();
   return html + QStringLiteral("</p>");
 }
 

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "widgets/QtValues.h"
+#include "widgets/RowMenu.h"
 
 namespace varnel {
 
@@ -129,6 +130,8 @@ void PaneWidget::resignFirstResponder() {
 
 void PaneWidget::showAs(Role role, bool hasToolbar) {
   _toolbar.setVisible(hasToolbar && role == Role::Top);
+  const bool hasMenu = window()->findChild<RowMenu*>(QString(), Qt::FindDirectChildrenOnly);
+  _header.showMenuButton(hasMenu && role == Role::Top);
   _notice.setShownElsewhere(role == Role::Beside);
 }
 

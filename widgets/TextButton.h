@@ -6,6 +6,8 @@ namespace varnel {
 
 /// A button that is a text in the accent color, large enough for a finger.
 class TextButton final : public QAbstractButton {
+  Q_OBJECT
+
  public:
   enum class Mark {
     None,

@@ -93,5 +93,18 @@ TEST_F(HeaderWidgetTest, TitlesAreNoMarkUp) {
   EXPECT_TRUE(back().shortcut().isEmpty());
 }
 
+TEST_F(HeaderWidgetTest, TheMenuIsAtTheEndAndCoversNothing) {
+  header.showMenuButton(true);
+  header.showSideButton(HeaderWidget::SideButton{"Table", "Show a table"});
+  show("Neighbor Cells", "Varnel", 360);
+  const auto& menu = *header.findChild<GlyphButton*>();
+  EXPECT_EQ(menu.geometry(), QRect(320, 2, 40, 44));
+  EXPECT_TRUE(titleIsWhole());
+  EXPECT_EQ(header.title(), label().text());
+  EXPECT_FALSE(label().geometry().intersects(menu.geometry()));
+  EXPECT_FALSE(label().geometry().intersects(back().geometry()));
+  EXPECT_FALSE(menu.toolTip().isEmpty());
+}
+
 }  // namespace
 }  // namespace varnel

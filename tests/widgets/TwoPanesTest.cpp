@@ -377,6 +377,30 @@ TEST_F(TwoPanesTest, ALeafThatWasClickedHasTheFrame) {
   EXPECT_TRUE(leaf.hasFocusFrame);
 }
 
+TEST_F(TwoPanesTest, TheButtonOfTheTopPaneOpensTheMenu) {
+  const RowMenu menu(window);
+  show(1200, 700);
+  click(*root, 0);
+  const auto button = [](PaneWidget& pane) {
+    const auto buttons = pane.header().findChildren<GlyphButton*>();
+    return buttons.size() == 1 ? buttons.front() : nullptr;
+  };
+  ASSERT_TRUE(button(root->widget()) && button(at(1).widget()));
+  EXPECT_FALSE(button(root->widget())->isVisible()) << "one menu for both panes";
+  GlyphButton& shown = *button(at(1).widget());
+  ASSERT_TRUE(shown.isVisible());
+  QTest::mouseClick(&shown, Qt::LeftButton);
+  ASSERT_TRUE(menu.menu());
+  EXPECT_TRUE(hasKeyboard(at(1))) << "the menu belongs to its row";
+  menu.menu()->close();
+}
+
+TEST_F(TwoPanesTest, WithoutAMenuThereIsNoButtonForIt) {
+  show(360, 640);
+  for (const GlyphButton* button : root->widget().header().findChildren<GlyphButton*>())
+    EXPECT_FALSE(button->isVisible());
+}
+
 TEST_F(TwoPanesTest, TheMenuOffersWhatAppliesAndKeysActAllTheSame) {
   bool applies = false;
   RowMenu menu(window);
