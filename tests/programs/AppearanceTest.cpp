@@ -22,6 +22,7 @@
 #include "tests/support/ViewerInMemory.h"
 #include "widgets/Colors.h"
 #include "widgets/QtValues.h"
+#include "widgets/SlideOverlay.h"
 
 namespace varnel {
 namespace {
@@ -66,11 +67,20 @@ class Appearance : public testing::Test {
     _viewer->app.goTo(path);
     settle();
   }
-  static void press(Qt::Key key, Qt::KeyboardModifiers modifiers = Qt::NoModifier) {
+  void press(Qt::Key key, Qt::KeyboardModifiers modifiers = Qt::NoModifier) {
     QTest::keyClick(QApplication::focusWidget(), key, modifiers);
     settle();
   }
-  static void settle() { QTest::qWait(400); }  // a pane may still be sliding in
+  // Nothing slides any more, what has changed has its place, and what was closed is gone.
+  void settle() {
+    ASSERT_TRUE(QTest::qWaitFor([this] { return !slides(); }, patience_ms));
+    QCoreApplication::processEvents();
+    QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+  }
+  bool slides() {
+    const auto all = window().findChildren<QWidget*>();
+    return std::ranges::any_of(all, [](QWidget* each) { return dynamic_cast<SlideOverlay*>(each); });
+  }
 
   WindowWidget& window() { return static_cast<WindowWidget&>(*_viewer->app.window()); }
   PaneWidget& pane() { return window().stack()->topPane(); }

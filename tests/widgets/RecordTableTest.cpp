@@ -5,10 +5,10 @@
 #include <QContextMenuEvent>
 #include <QHeaderView>
 #include <QHelpEvent>
-#include <QPointingDevice>
 #include <QScrollBar>
 #include <QToolTip>
 
+#include "tests/support/Finger.h"
 #include "tests/support/TestWidgets.h"
 #include "widgets/Colors.h"
 #include "widgets/RecordTableWidget.h"
@@ -277,19 +277,13 @@ TEST_F(RecordTableWidgetTest, AWideTableIsScrolledSidewaysByTouch) {
   table.showRecords(list);
   QCoreApplication::processEvents();
   ASSERT_GT(table.horizontalScrollBar()->maximum(), 300);
-  const std::unique_ptr<QPointingDevice> finger(QTest::createTouchDevice());
-  QTest::touchEvent(&table, finger.get()).press(0, QPoint(300, 100), table.viewport());
-  for (int step = 1; step <= 10; ++step) {
-    QTest::qWait(10);
-    QTest::touchEvent(&table, finger.get()).move(0, QPoint(300 - 20 * step, 100), table.viewport());
-  }
-  QTest::touchEvent(&table, finger.get()).release(0, QPoint(100, 100), table.viewport());
-  EXPECT_GT(table.horizontalScrollBar()->value(), 100);
+  Finger finger(*table.viewport());
+  finger.drag({300, 100}, {100, 100});
+  EXPECT_TRUE(QTest::qWaitFor([this] { return table.horizontalScrollBar()->value() > 100; }, patience_ms));
   EXPECT_THAT(chosen, IsEmpty());
-  QTest::qWait(600);  // the movement ends
-  QTest::touchEvent(&table, finger.get()).press(0, QPoint(100, 60), table.viewport());
-  QTest::touchEvent(&table, finger.get()).release(0, QPoint(100, 60), table.viewport());
-  EXPECT_EQ(chosen.size(), table.indexAt({100, 60}).isValid() ? 1u : 0u);
+  ASSERT_TRUE(finger.waitForRest());
+  finger.tap({100, table.rowHeight(0) / 2});
+  EXPECT_THAT(chosen, ElementsAre(0));
 }
 
 }  // namespace

@@ -3,9 +3,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <QPointingDevice>
 #include <QScrollBar>
 
+#include "tests/support/Finger.h"
 #include "tests/support/TestWidgets.h"
 
 namespace varnel {
@@ -107,27 +107,14 @@ TEST_F(SearchPageTest, AClickGoesThere) {
 }
 
 TEST_F(SearchPageTest, ATapGoesThereAndAFingerScrolls) {
-  const std::unique_ptr<QPointingDevice> finger(QTest::createTouchDevice());
+  Finger finger(*list().viewport());
   const QPoint middle = list().viewport()->rect().center();
-  QTest::touchEvent(&page, finger.get()).press(0, middle, list().viewport());
-  for (int step = 1; step <= 10; ++step) {
-    QTest::qWait(10);
-    QTest::touchEvent(&page, finger.get()).move(0, middle - QPoint(0, 20 * step), list().viewport());
-  }
-  QTest::touchEvent(&page, finger.get()).release(0, middle - QPoint(0, 200), list().viewport());
-  EXPECT_GT(list().verticalScrollBar()->value(), 100);
+  finger.drag(middle, middle - QPoint(0, 200));
+  EXPECT_TRUE(QTest::qWaitFor([this] { return list().verticalScrollBar()->value() > 100; }, patience_ms));
   EXPECT_THAT(chosen, IsEmpty());
-  // A tap while the list still moves stops it.
-  EXPECT_TRUE(QTest::qWaitFor(
-      [&] {
-        const int former = list().verticalScrollBar()->value();
-        QTest::qWait(100);
-        return list().verticalScrollBar()->value() == former;
-      },
-      patience_ms));
+  ASSERT_TRUE(finger.waitForRest());
   const auto aimed = list().indexAt(middle);
-  QTest::touchEvent(&page, finger.get()).press(0, middle, list().viewport());
-  QTest::touchEvent(&page, finger.get()).release(0, middle, list().viewport());
+  finger.tap(middle);
   EXPECT_THAT(chosen, ElementsAre(std::to_string(aimed.row())));
 }
 

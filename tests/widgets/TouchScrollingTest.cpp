@@ -4,15 +4,16 @@
 #include <gtest/gtest.h>
 
 #include <QContextMenuEvent>
-#include <QPointingDevice>
 #include <QScrollBar>
-#include <QStyleHints>
+#include <chrono>
 
+#include "tests/support/Finger.h"
 #include "tests/support/TestWidgets.h"
 
 namespace varnel {
 namespace {
 
+using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
@@ -34,30 +35,20 @@ class TouchScrollingTest : public testing::Test {
     table.show();
     EXPECT_TRUE(QTest::qWaitForWindowExposed(&table, patience_ms));
   }
-  // A finger goes from one place to the other in ten steps of 10 ms.
-  void drag(const QPoint& from, const QPoint& to) {
-    QTest::touchEvent(&table, finger.get()).press(0, from, table.viewport());
-    for (int step = 1; step <= 10; ++step) {
-      QTest::qWait(10);
-      QTest::touchEvent(&table, finger.get()).move(0, from + (to - from) * step / 10, table.viewport());
-    }
-    QTest::touchEvent(&table, finger.get()).release(0, to, table.viewport());
-  }
-
-  std::unique_ptr<QPointingDevice> finger{QTest::createTouchDevice()};
   TestRows delegate{leaves(100, std::string(200, 'x'))};
   TableWidget table;
+  Finger finger{*table.viewport()};
 };
 
 TEST_F(TouchScrollingTest, AFingerUpScrollsTheTableDown) {
-  drag({100, 350}, {100, 150});
+  finger.drag({100, 350}, {100, 150});
   EXPECT_GT(table.verticalScrollBar()->value(), 100);
   EXPECT_THAT(delegate.chosen, IsEmpty());
   for (const RowWidget* row : table.visibleRows()) EXPECT_EQ(row->sidewaysPosition(), 0);
 }
 
 TEST_F(TouchScrollingTest, AFingerSidewaysScrollsItsRowOnly) {
-  drag({300, 75}, {100, 80});
+  finger.drag({300, 75}, {100, 80});
   EXPECT_GT(table.visibleRows().at(1)->sidewaysPosition(), 100);
   EXPECT_EQ(table.visibleRows().at(0)->sidewaysPosition(), 0);
   EXPECT_EQ(table.verticalScrollBar()->value(), 0);
@@ -67,12 +58,13 @@ TEST_F(TouchScrollingTest, AFingerSidewaysScrollsItsRowOnly) {
 TEST_F(TouchScrollingTest, AFingerThatRestsAsksForTheMenuOfItsRow) {
   MenuWishes wishes;
   table.installEventFilter(&wishes);
-  QTest::touchEvent(&table, finger.get()).press(0, QPoint(100, 125), table.viewport());
+  Finger::restAfter(100ms);
+  finger.press({100, 125});
   EXPECT_TRUE(QTest::qWaitFor([&] { return !wishes.places.empty(); }, patience_ms));
   EXPECT_THAT(wishes.places, ElementsAre(QPoint(100, 125)));
   EXPECT_EQ(table.currentRow()->row(), 2u);
   EXPECT_TRUE(table.currentRow()->emphasis().hasFocusFrame);
-  QTest::touchEvent(&table, finger.get()).release(0, QPoint(100, 125), table.viewport());
+  finger.release({100, 125});
   QTest::qWait(20);
   EXPECT_THAT(delegate.chosen, IsEmpty()) << "it was no tap";
 }
@@ -80,15 +72,16 @@ TEST_F(TouchScrollingTest, AFingerThatRestsAsksForTheMenuOfItsRow) {
 TEST_F(TouchScrollingTest, AFingerThatMovesAsksForNoMenu) {
   MenuWishes wishes;
   table.installEventFilter(&wishes);
-  QTest::touchEvent(&table, finger.get()).press(0, QPoint(100, 125), table.viewport());
-  QTest::touchEvent(&table, finger.get()).move(0, QPoint(100, 325), table.viewport());
-  QTest::qWait(2 * QGuiApplication::styleHints()->mousePressAndHoldInterval());
+  Finger::restAfter(50ms);
+  finger.press({100, 125});
+  finger.move({100, 325});
+  QTest::qWait(200);
   EXPECT_THAT(wishes.places, IsEmpty());
 }
 
 TEST_F(TouchScrollingTest, ATapChoosesItsRowOnce) {
-  QTest::touchEvent(&table, finger.get()).press(0, QPoint(100, 125), table.viewport());
-  QTest::touchEvent(&table, finger.get()).release(0, QPoint(101, 126), table.viewport());
+  finger.press({100, 125});
+  finger.release({101, 126});
   EXPECT_TRUE(QTest::qWaitFor([&] { return !delegate.chosen.empty(); }, patience_ms));
   QTest::qWait(20);
   EXPECT_THAT(delegate.chosen, ElementsAre(2));
