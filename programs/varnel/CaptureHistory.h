@@ -25,7 +25,8 @@ class CaptureHistory final {
     std::string program{};  ///< that decodes; empty for the one that comes with the viewer
   };
 
-  /// A whole day and a half, if its rows are not very many.
+  /// Samples do not go for their age. `ValueHistory::mostGenerations` are 36 hours, since a display is made
+  /// every two seconds. Rows that are very many fill the memory sooner.
   static constexpr ValueHistory::Limits limits{.length = std::chrono::hours(24 * 365),
                                                .bytes = std::size_t{64} << 20};
 
