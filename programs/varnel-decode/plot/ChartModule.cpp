@@ -23,8 +23,8 @@
 #include <span>
 #include <vector>
 
-#include "programs/shared/TimeTicks.h"
 #include "programs/shared/Legend.h"
+#include "programs/shared/TimeTicks.h"
 
 namespace varnel {
 

@@ -44,7 +44,7 @@ class TrendChart final : public QChart {
 
   TrendLook _look;
   QCategoryAxis* _time;
-  QLineSeries* _carrier;  // of the axis of time, when there is no row
+  QLineSeries* _carrier;         // of the axis of time, when there is no row
   std::vector<TimeTick> _ticks;  // that the axis of time has
   std::vector<UnitAxis> _units;
   TrendLines* _lines;
