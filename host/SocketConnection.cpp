@@ -4,6 +4,7 @@
 #include <sys/socket.h>
 #include <sys/un.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <stdexcept>
 #include <string>
@@ -148,6 +149,19 @@ void SocketConnection::send(const Frame& frame) {
   _outgoing.clear();
   appendFrame(_outgoing, frame);
   _socket->write(reinterpret_cast<const char*>(_outgoing.data()), static_cast<qint64>(_outgoing.size()));
+}
+
+void SocketConnection::sendAtOnce(const Frame& frame) {
+  if (!isOpen()) return;
+  _outgoing.clear();
+  appendFrame(_outgoing, frame);
+  const ssize_t sent = ::send(static_cast<int>(_socket->socketDescriptor()), _outgoing.data(),
+                              _outgoing.size(), MSG_NOSIGNAL | MSG_DONTWAIT);
+  // What the peer has left can still be read. A failed write of the toolkit's would discard it.
+  if (sent < 0 && (errno == EPIPE || errno == ECONNRESET)) return;
+  const auto begin = static_cast<std::size_t>(std::max<ssize_t>(sent, 0));
+  _socket->write(reinterpret_cast<const char*>(_outgoing.data() + begin),
+                 static_cast<qint64>(_outgoing.size() - begin));
 }
 
 bool SocketConnection::hasRoom() const { return _socket->bytesToWrite() < sendBufferSize; }

@@ -66,6 +66,9 @@ class SocketConnection final {
   /// Queues a frame. The event loop and every wait send what is queued, as much as possible at a time. A peer
   /// that leaves no room is dropped. Does nothing once the connection has ended.
   void send(const Frame& frame);
+  /// Sends a frame at once; no other may be queued. If the peer has gone, what it has left can still be read,
+  /// which `send` may lose.
+  void sendAtOnce(const Frame& frame);
   /// True while so little waits to be sent that the caller may queue more.
   bool hasRoom() const;
   /// True while something that was queued is not sent yet.

@@ -61,7 +61,7 @@ class SocketTelephonyConnection final : public TelephonyConnection {
     const QDeadlineTimer deadline(_replyTimeout);
     const auto request = logChannelRequest(localPortName);
     if (!request) return {protocol::malformedRequest, std::nullopt};
-    connection->send({0, FrameMark::Request, *request});
+    connection->sendAtOnce({0, FrameMark::Request, *request});
     do {
       while (const auto frame = connection->nextFrame()) {
         if (frame->mark == FrameMark::Reply) return logChannel(frame->payload);

@@ -94,7 +94,7 @@ void CaptureHistory::takeGeneration(Time time, std::span<const ValueHistory::Rea
 void CaptureHistory::takeEvent(DisplayEvent event) {
   const auto newest = _numbers.whole().end;
   const auto since = durationBetween(_numbers.timeAt(newest), event.time);
-  const bool isSoon = since > since.zero() && since <= ValueHistory::longestStep;
+  const bool isSoon = since > std::chrono::nanoseconds::zero() && since <= ValueHistory::longestStep;
   _events.add(std::move(event), isSoon ? newest + since : newest);
 }
 
