@@ -124,7 +124,7 @@ ChildServer::~ChildServer() {
   _process->waitForFinished(static_cast<int>(patienceAtEnd.count()));
 }
 
-void ChildServer::beginEnd(std::function<void()> gone) {
+void ChildServer::beginEnd(const std::function<void()>& gone) {
   _hasEnded = true;
   _process->disconnect();
   QObject::connect(_process.get(), &QProcess::finished, _process.get(), gone, Qt::QueuedConnection);

@@ -44,7 +44,7 @@ class ChildServer final {
   /// Asks the server to end, and kills it after three seconds, but waits for nothing. The event loop calls
   /// `gone` once there is no server; it calls the other handlers no more. Must not be called twice, nor by a
   /// handler.
-  void beginEnd(std::function<void()> gone);
+  void beginEnd(const std::function<void()>& gone);
 
   RuntimeFolder folder() const { return _folder.path(); }
   /// Viewers can connect. Stays true when the server has ended.

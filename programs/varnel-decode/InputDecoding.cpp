@@ -410,7 +410,7 @@ class InputDecoding {
 
   // A summary stands where the reader looks first: a terminal shows the end of a long text.
   std::string withSummary(const Value& display) const {
-    const std::string text = _options.writeDisplay(display);
+    std::string text = _options.writeDisplay(display);
     const std::string summary =
         _options.writeDisplay == displayAsText ? radioSummary(display) : std::string();
     if (summary.empty()) return text;

@@ -200,18 +200,18 @@ CellLevels levelsOf(const QVariantMap& entries) {
 // ---- Technologies ----
 
 struct Technology {
-  int bit;
   const char* name;
+  int bit;
   Radio radio;
 };
 // In the service's enumeration of access technologies.
 constexpr Technology technologies[] = {
-    {1, "GSM", Radio::GSM},           {2, "GSM Compact", Radio::GSM},   {3, "GPRS", Radio::GSM},
-    {4, "EDGE", Radio::GSM},          {5, "UMTS", Radio::UMTS},         {6, "HSDPA", Radio::UMTS},
-    {7, "HSUPA", Radio::UMTS},        {8, "HSPA", Radio::UMTS},         {9, "HSPA+", Radio::UMTS},
-    {10, "1xRTT", Radio::CDMA2000},   {11, "EV-DO 0", Radio::CDMA2000}, {12, "EV-DO A", Radio::CDMA2000},
-    {13, "EV-DO B", Radio::CDMA2000}, {14, "LTE", Radio::LTE},          {15, "5GNR", Radio::NR},
-    {16, "LTE-M", Radio::LTE},        {17, "NB-IoT", Radio::LTE},
+    {"GSM", 1, Radio::GSM},           {"GSM Compact", 2, Radio::GSM},   {"GPRS", 3, Radio::GSM},
+    {"EDGE", 4, Radio::GSM},          {"UMTS", 5, Radio::UMTS},         {"HSDPA", 6, Radio::UMTS},
+    {"HSUPA", 7, Radio::UMTS},        {"HSPA", 8, Radio::UMTS},         {"HSPA+", 9, Radio::UMTS},
+    {"1xRTT", 10, Radio::CDMA2000},   {"EV-DO 0", 11, Radio::CDMA2000}, {"EV-DO A", 12, Radio::CDMA2000},
+    {"EV-DO B", 13, Radio::CDMA2000}, {"LTE", 14, Radio::LTE},          {"5GNR", 15, Radio::NR},
+    {"LTE-M", 16, Radio::LTE},        {"NB-IoT", 17, Radio::LTE},
 };
 
 bool hasBit(std::int64_t mask, int bit) { return (mask >> bit & 1) != 0; }

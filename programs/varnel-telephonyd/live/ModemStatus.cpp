@@ -77,8 +77,8 @@ ModemStatus statusOfLost(const std::string& name) {
 
 std::string nameOfModem(const std::string& path, const busReading::Interfaces& modem) {
   const QVariantMap properties = modem.value(modemInterfaces::modem);
-  const std::string maker = busReading::text(properties, "Manufacturer"),
-                    model = busReading::text(properties, "Model");
+  const std::string maker = busReading::text(properties, "Manufacturer");
+  std::string model = busReading::text(properties, "Model");
   if (maker.empty() && model.empty()) return "modem " + indexOf(path);
   if (maker.empty() || model.starts_with(maker)) return model;
   return model.empty() ? maker : maker + ' ' + model;
