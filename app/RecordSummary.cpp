@@ -82,7 +82,7 @@ std::string shortText(const RecordSummaries::Level& level) {
   const std::string number(level.number);
   const int decimals = number.find('.') == std::string::npos ? 0 : 1;
   char digits[64];
-  std::snprintf(digits, sizeof digits, "%.*f", decimals, std::abs(std::strtod(number.c_str(), nullptr)));
+  std::snprintf(digits, sizeof digits, "%.*f", decimals, std::fabs(std::strtod(number.c_str(), nullptr)));
   std::string text(digits);
   const bool isZero = std::ranges::all_of(text, [](char c) { return c == '0' || c == '.'; });
   if (number.starts_with('-') && !isZero) text.insert(0, minus);

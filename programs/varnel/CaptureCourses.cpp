@@ -36,7 +36,7 @@ std::optional<ValueHistory::Duration> CaptureCourses::pointAt(const ValueHistory
   const auto end = numbers.whole().end;
   if (_search && _search->numbers == &numbers && _search->end == end) {
     const auto since = durationBetween(_search->time, time);
-    if (since >= 0s && since < lengthOfSearch)
+    if (since >= std::chrono::seconds::zero() && since < lengthOfSearch)
       return _search->point ? std::optional(*_search->point + since) : std::nullopt;
   }
   _search = Search{&numbers, end, time, numbers.pointAt(time)};

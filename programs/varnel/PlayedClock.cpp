@@ -48,7 +48,8 @@ void PlayedClock::follow(Time told, double speed) {
       // No other message has come: the capture has a pause.
       played.from = shown;
       played.begin = std::max(moment, _played->begin);
-    } else if (ahead > 0ns && ahead <= std::max(lead(speed), lead(_played->speed))) {
+    } else if (ahead > std::chrono::nanoseconds::zero() &&
+               ahead <= std::max(lead(speed), lead(_played->speed))) {
       // Instead of stepping back, it waits for the capture.
       played.from = shown;
       if (speed > 0) played.begin += times(ahead, 1 / speed, std::chrono::hours(24));
@@ -68,7 +69,7 @@ void PlayedClock::stand() {
 
 Time PlayedClock::now() const {
   if (!_played) return _host.now();
-  const auto passed = std::max(_uptime() - _played->begin, 0ns);
+  const auto passed = std::max(_uptime() - _played->begin, std::chrono::nanoseconds::zero());
   const auto most = durationBetween(_played->from, _played->last);
   return laterBy(times(passed, _played->speed, most), _played->from);
 }

@@ -8,8 +8,10 @@
 #include <QEvent>
 #include <QTcpServer>
 #include <QTcpSocket>
+#include <algorithm>
 #include <cstdlib>
 #include <filesystem>
+#include <limits>
 #include <map>
 #include <memory>
 #include <string>
@@ -495,6 +497,17 @@ TEST_F(LiveModemTest, ABusThatIsBackWithTheServiceHasIt) {
 // LiveEndToEndTest makes more, with the real service.
 constexpr int rounds = 20;
 
+// The least memory of the last rounds, and the most of the first ones: what a round holds for a moment counts
+// for neither. The very first rounds make what stays.
+struct MemoryOfRounds {
+  void note(int round, std::size_t used) {
+    if (round < rounds / 4) return;
+    if (round < rounds / 2) early = std::max(early, used);
+    if (round >= rounds * 3 / 4) late = std::min(late, used);
+  }
+  std::size_t early = 0, late = std::numeric_limits<std::size_t>::max();
+};
+
 std::size_t openFiles() {
   const std::filesystem::directory_iterator files("/proc/self/fd");
   return static_cast<std::size_t>(std::distance(begin(files), end(files)));
@@ -503,25 +516,29 @@ std::size_t openFiles() {
 TEST_F(LiveModemTest, AModemThatComesAndGoesIsAlwaysBack) {
   startAll({"add", "0", "then", "cells", "0", "lte"});
   ASSERT_TRUE(shows(modemReport, "EARFCN: 66986"));
-  std::size_t files = 0, memory = 0;
+  std::size_t files = 0;
+  MemoryOfRounds memory;
   for (int round = 0; round < rounds; ++round) {
     _service.does({"remove", "0"});
     ASSERT_TRUE(isSo("Maker M1 has gone; plug it in again")) << round;
     ASSERT_TRUE(runUntil([&] { return _viewer->last(modemReport) == "{Version: 1}"; })) << round;
     _service.does({"add", "0", "then", "cells", "0", "lte"});
     ASSERT_TRUE(shows(modemReport, "EARFCN: 66986")) << round;
-    if (round == rounds / 4) files = openFiles(), memory = usedMemory();
+    memory.note(round, usedMemory());
+    if (round == rounds / 4) files = openFiles();
   }
   EXPECT_LE(openFiles(), files);
-  EXPECT_LE(usedMemory(), memory + 20'000);
+  EXPECT_LE(memory.late, memory.early + 10'000);
 }
 
 TEST_F(LiveModemTest, AServiceThatIsStoppedAndStartedIsAlwaysBack) {
   startAll({"add", "0", "then", "cells", "0", "lte"});
-  std::size_t files = 0, memory = 0;
+  std::size_t files = 0;
+  MemoryOfRounds memory;
   for (int round = 0; round < rounds; ++round) {
     ASSERT_TRUE(shows(modemReport, "EARFCN: 66986")) << round;
-    if (round == rounds / 4) files = openFiles(), memory = usedMemory();
+    memory.note(round, usedMemory());
+    if (round == rounds / 4) files = openFiles();
     _service.stop();
     ASSERT_TRUE(isSo("ModemManager does not run; type sudo systemctl start ModemManager")) << round;
     ASSERT_TRUE(runUntil([&] { return _viewer->last(modemReport) == "{Version: 1}"; })) << round;
@@ -530,7 +547,7 @@ TEST_F(LiveModemTest, AServiceThatIsStoppedAndStartedIsAlwaysBack) {
   }
   EXPECT_TRUE(shows(modemReport, "EARFCN: 66986"));
   EXPECT_LE(openFiles(), files);
-  EXPECT_LE(usedMemory(), memory + 20'000);
+  EXPECT_LE(memory.late, memory.early + 10'000);
 }
 
 }  // namespace
