@@ -14,7 +14,7 @@ constexpr int spokes = 12;
 constexpr std::chrono::milliseconds fastStep(83);  // one turn per second
 // After this, the notice says why it takes so long, and the wheel need not wake the machine so often.
 constexpr int stepsAtFullSpeed = 3 * spokes;
-constexpr std::chrono::milliseconds slowStep(1000);
+constexpr std::chrono::milliseconds slowStep(2000);
 
 }  // namespace
 
