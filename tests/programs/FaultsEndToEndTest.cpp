@@ -122,7 +122,9 @@ TEST_F(FaultsEndToEnd, AChannelThatEndsIsOpenedAgainAtOnceEachTime) {
   const auto varnel = viewer();
   EXPECT_TRUE(logs(*varnel, "<3> ***** INVALIDATED 0x", 3));
   EXPECT_TRUE(logs(*varnel, streaming, 4));
-  EXPECT_EQ(logged(*varnel, noPorts), 0u);
+  // A viewer that was faster than its server has failed once before.
+  const std::string error = varnel->error();
+  EXPECT_EQ(error.find(noPorts, error.find(streaming)), std::string::npos) << error;
 }
 
 TEST_F(FaultsEndToEnd, AServerThatCrashesIsAbortedAndItsViewerStreamsFromTheNextOne) {
