@@ -8,6 +8,7 @@
 
 #include "LogGenerator/KLV/CellMonitor.h"
 #include "LogGenerator/NumberFormats.h"
+#include "LogGenerator/PacketVersion.h"
 #include "LogGenerator/Radios/ChannelText.h"
 #include "LogGenerator/Radios/Plmn.h"
 #include "LogGenerator/Radios/ShownNumber.h"
@@ -27,27 +28,6 @@ constexpr std::string_view physicalCellEntry = "Physical Cell ID", channelEntry 
                            antennasEntry = "Antennas", frameEntry = "System Frame Number",
                            accessEntry = "Allowed Access", modeEntry = "Operation Mode",
                            rasterEntry = "Raster Offset", barringEntry = "Access Barring";
-// All but the version.
-constexpr std::string_view entriesOfACell[] = {physicalCellEntry,
-                                               channelEntry,
-                                               frequencyEntry,
-                                               uplinkChannelEntry,
-                                               uplinkFrequencyEntry,
-                                               bandEntry,
-                                               bandwidthEntry,
-                                               networkEntry,
-                                               areaEntry,
-                                               identityEntry,
-                                               basestationEntry,
-                                               uplinkBandwidthEntry,
-                                               sectorEntry,
-                                               antennasEntry,
-                                               frameEntry,
-                                               accessEntry,
-                                               modeEntry,
-                                               rasterEntry,
-                                               barringEntry};
-
 constexpr Format channelNumber = integer("%u");
 
 // ---- The master information block ----
@@ -149,9 +129,12 @@ bool shows(const Section& section, const Identity& identity) {
 
 // What is known of another cell says nothing about this one.
 void forgetOtherCell(Section& section, const Identity& identity) {
-  if (shows(section, identity)) return;
-  for (const std::string_view entry : entriesOfACell)
-    if (!textShown(section, entry).empty()) section.setText(entry, {});
+  const Dictionary* const entries = section.container().dictionary();
+  if (!entries || shows(section, identity)) return;
+  for (const auto& [key, value] : *entries) {
+    const std::string* const text = value.string();
+    if (text && !text->empty() && key != versionEntry) section.setText(key, {});
+  }
 }
 
 // The fields, and the frequency of their channel number. Returns this number.
