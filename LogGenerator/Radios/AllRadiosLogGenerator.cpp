@@ -29,6 +29,11 @@ Value dictionaryAt(Dictionary& entries, std::string_view key) {
 
 AllRadiosLogGenerator::AllRadiosLogGenerator(const Services& services) : KLVLogGenerator(services) {}
 
+AllRadiosLogGenerator::~AllRadiosLogGenerator() {
+  const Time now = services().clock.now();
+  for (auto& [number, subscription] : _subscriptions) subscription.groups.prepareDisplay(now);
+}
+
 const Value& AllRadiosLogGenerator::displayTemplate() const {
   if (!_template) {
     _template = services().resources.propertyList(templateName);

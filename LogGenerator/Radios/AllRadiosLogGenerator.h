@@ -23,6 +23,8 @@ class AllRadiosLogGenerator final : public KLVLogGenerator {
   static constexpr std::size_t mostSubscriptions = 8;
 
   explicit AllRadiosLogGenerator(const Services& services);
+  /// Writes what came since the last display, so that the next generator goes on with all of it.
+  ~AllRadiosLogGenerator() override;
   static std::unique_ptr<LogGenerator> generator(const Services& services);
 
   void updateState_withData(Dictionary& state, ByteView data) override;

@@ -3,6 +3,7 @@
 #include <array>
 #include <cstddef>
 #include <optional>
+#include <string_view>
 #include <utility>
 
 #include "LogGenerator/Radios/MessageSection.h"
@@ -10,8 +11,8 @@
 namespace varnel {
 
 /// The section "Last Messages": the last 50 messages of all radios, the newest first, and the version of the
-/// last packet that has one. A modem may send thousands of messages per second, so `prepareDisplay` makes the
-/// list. A list that the section already holds goes on.
+/// last packet that has one. A modem may send thousands of messages per second, so `prepareDisplay` writes
+/// both. A list that the section already holds goes on.
 class LastMessages final : public MessageSection {
  public:
   static constexpr std::size_t greatestCount = 50;
@@ -34,14 +35,12 @@ class LastMessages final : public MessageSection {
   using Version = std::pair<PacketVersion, bool>;
 
   void take(const AirMessageReading& reading) override;
-  bool showsVersion() const;
-  void showVersion();
-  static Value recordOf(const Received& received);
+  static Value recordOf(const Received& received, std::string_view time);
 
   // A ring of the messages since the last display.
   std::array<Received, greatestCount> _received;
   std::size_t _next = 0, _count = 0;
-  std::optional<Version> _version;
+  std::optional<Version> _version;  // of the last packet since then
 };
 
 }  // namespace varnel

@@ -3,17 +3,18 @@
 #include <cstddef>
 #include <cstdint>
 #include <functional>
+#include <string>
 #include <string_view>
 #include <unordered_map>
+#include <vector>
 
-#include "LogGenerator/BoundEntry.h"
 #include "LogGenerator/Radios/MessageSection.h"
 
 namespace varnel {
 
 /// The section "Counts": how many messages of each name there were. An entry is a radio, a protocol and a
 /// name. Counts that the section already holds go on. It has at most 200 such entries; messages of further
-/// names count as "Other".
+/// names count as "Other". The entries are written when a display is prepared.
 class MessageCounts final : public MessageSection {
  public:
   static constexpr std::size_t greatestCount = 200;
@@ -21,7 +22,6 @@ class MessageCounts final : public MessageSection {
   MessageCounts() : MessageSection(sectionName) {}
   explicit MessageCounts(MessageFeed& feed) : MessageSection(sectionName, feed) {}
 
-  /// Notes when the entries were written.
   void prepareDisplay(const Time& now) override;
 
  private:
@@ -43,16 +43,15 @@ class MessageCounts final : public MessageSection {
     }
   };
   struct Count {
-    BoundEntry entry;
-    std::size_t position = 0;  // where the entry was last
-    bool isWritten = false;    // since the last display
+    std::string entry;
+    std::uint64_t number = 0;  // since the last display
   };
 
   void take(const AirMessageReading& reading) override;
-  static void set(Count& count, Dictionary& entries, std::uint64_t number);
+  void add(const Count& count, const Dictionary& entries);
 
-  std::unordered_map<Kind, Count, Hash> _counts;
-  Count _others{BoundEntry("Other")};
+  std::vector<Count> _counts;  // in the order in which their names first came
+  std::unordered_map<Kind, std::size_t, Hash> _positions;
 };
 
 }  // namespace varnel

@@ -165,6 +165,18 @@ TEST_F(AllRadiosLogGeneratorTest, ANewGeneratorGoesOnWithTheDisplay) {
   EXPECT_EQ(shown("/SIM 2/LTE/Serving Cell/Physical Cell ID"), "20");
 }
 
+TEST_F(AllRadiosLogGeneratorTest, ANewGeneratorGoesOnWithWhatCameSinceTheLastDisplay) {
+  const Bytes attachRequest = PacketBuilder(0xB0ED, 19).u8(13, 1).u8(17, 0x07).u8(18, 0x41).bytes();
+  take(attachRequest);
+  EXPECT_THAT(groups(), ElementsAre("Messages"));
+  take(attachRequest);
+  reconnect();
+  take(attachRequest);
+  EXPECT_THAT(groups(), ElementsAre("Messages"));
+  EXPECT_EQ(shown("/Messages/Counts/LTE NAS Attach request"), "3");
+  EXPECT_EQ(shown("/Messages/Last Messages/Messages/2/Name"), "Attach request");
+}
+
 TEST_F(AllRadiosLogGeneratorTest, TheDisplayOfAnotherTechnologyStands) {
   auto other =
       LogGenerator::generatorFromTechnology(std::string(technology::kalviGSMUMTS), services.services);

@@ -80,8 +80,8 @@ TEST_F(LastMessagesTest, AnUnknownVersionIsShownAndAddsNoMessage) {
   Bytes packet = lteRRCPacket(9, {0x20});
   packet.at(13) = 37;
   decode(packet, 0xB0C0);
-  EXPECT_EQ(described(section.dictionary()->get("Version")), quoted("37 (not known)"));
   EXPECT_TRUE(list().empty());
+  EXPECT_EQ(described(section.dictionary()->get("Version")), quoted("37 (not known)"));
   EXPECT_EQ(decoder.fateOf(Packet(packet), 0xB0C0),
             (MessageFate{MessageFate::Outcome::UnknownVersion, 0xB0C0, PacketVersion{37}}));
 }

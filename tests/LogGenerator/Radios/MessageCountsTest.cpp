@@ -18,7 +18,15 @@ class MessageCountsTest : public testing::Test {
   void decode(const Bytes& packet, std::uint32_t logCode) {
     decoder.updateWithData_logCode(Packet(packet), logCode);
   }
-  std::string shown(std::string_view entry) const { return described(section.dictionary()->get(entry)); }
+  // Prepares the display.
+  std::string shown() {
+    decoder.prepareDisplay({});
+    return described(section);
+  }
+  std::string shown(std::string_view entry) {
+    decoder.prepareDisplay({});
+    return described(section.dictionary()->get(entry));
+  }
 
   MessageFeed feed;
   MessageCounts decoder{feed};
@@ -32,8 +40,7 @@ TEST_F(MessageCountsTest, EachNameOfEachRadioIsCounted) {
   decode(lteRRCPacket(7, {0x40, 0x00}), 0xB0C0);
   decode(lteNASPacket(0xB0ED, {0x07, 0x41}), 0xB0ED);
   decode(gsmRRPacket(0x0D), 0x512F);
-  EXPECT_EQ(described(section),
-            R"({LTE RRC Paging: "2", LTE NAS Attach request: "1", GSM RR Channel Release: "1"})");
+  EXPECT_EQ(shown(), R"({LTE RRC Paging: "2", LTE NAS Attach request: "1", GSM RR Channel Release: "1"})");
 }
 
 TEST_F(MessageCountsTest, CountsThatTheSectionHoldsGoOn) {
@@ -44,13 +51,14 @@ TEST_F(MessageCountsTest, CountsThatTheSectionHoldsGoOn) {
   next.updateSectionRef(section);
   const Bytes packet = lteRRCPacket(7, {0x40});
   next.updateWithData_logCode(Packet(packet), 0xB0C0);
+  next.prepareDisplay({});
   EXPECT_EQ(shown("LTE RRC Paging"), R"("43")");
 }
 
 TEST_F(MessageCountsTest, OneNameFromTwoChannelsIsOneEntry) {
   decode(lteRRCPacket(9, {0x30}), 0xB0C0);   // DL-DCCH, 0 0110
   decode(lteRRCPacket(49, {0x30}), 0xB0C0);  // DL-DCCH-NB, 0 011
-  EXPECT_EQ(described(section), R"({LTE RRC SecurityModeCommand: "2"})");
+  EXPECT_EQ(shown(), R"({LTE RRC SecurityModeCommand: "2"})");
 }
 
 TEST_F(MessageCountsTest, FurtherNamesThan200CountAsOther) {
@@ -68,7 +76,7 @@ TEST_F(MessageCountsTest, AnUnknownVersionCountsNothing) {
   Bytes packet = lteRRCPacket(7, {0x40});
   packet.at(13) = 37;
   decode(packet, 0xB0C0);
-  EXPECT_EQ(described(section), "{}");
+  EXPECT_EQ(shown(), "{}");
 }
 
 TEST_F(MessageCountsTest, TheDisplayTellsWhenAnEntryWasWritten) {
