@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <string>
+#include <vector>
+
 #include "tests/support/AirMessages.h"
 #include "tests/support/Describe.h"
 
@@ -55,6 +58,18 @@ TEST_F(LastMessagesTest, WhatAMessageDoesNotTellIsLeftOut) {
   EXPECT_EQ(described(list().front()),
             R"({Time: "2020-05-08 17:25:09.250 +0000", Radio: "LTE", Protocol: "NAS", Direction: "Uplink", )"
             R"(Name: "Attach request", Length: "2"})");
+}
+
+TEST_F(LastMessagesTest, EachMessageShowsItsOwnMillisecond) {
+  for (const Time time : {Time{1588958709, 250'000'000}, Time{1588958709, 7'999'999}, Time{1588958710, 0}}) {
+    decoder.section().setTime(time);
+    decode(lteNASPacket(0xB0ED, {0x07, 0x41}), 0xB0ED);
+  }
+  std::vector<std::string> times;
+  for (const Value& record : list()) times.push_back(described(record.dictionary()->get("Time")));
+  EXPECT_EQ(times, (std::vector<std::string>{quoted("2020-05-08 17:25:10.000 +0000"),
+                                             quoted("2020-05-08 17:25:09.007 +0000"),
+                                             quoted("2020-05-08 17:25:09.250 +0000")}));
 }
 
 TEST_F(LastMessagesTest, AMessageOfUMTSShowsItsScramblingCode) {
