@@ -30,8 +30,10 @@ Value dictionaryAt(Dictionary& entries, std::string_view key) {
 AllRadiosLogGenerator::AllRadiosLogGenerator(const Services& services) : KLVLogGenerator(services) {}
 
 AllRadiosLogGenerator::~AllRadiosLogGenerator() {
-  const Time now = services().clock.now();
-  for (auto& [number, subscription] : _subscriptions) subscription.groups.prepareDisplay(now);
+  // At the time of the last message: a display that nobody renews keeps the cells that were seen then.
+  for (auto& [number, subscription] : _subscriptions) {
+    if (const auto time = subscription.groups.lastTaken()) subscription.groups.prepareDisplay(*time);
+  }
 }
 
 const Value& AllRadiosLogGenerator::displayTemplate() const {

@@ -165,6 +165,7 @@ bool RadioGroups::take(const LogMessage& message, ByteView bytes) {
   if (found == _takers.end()) return false;
   bool isTaken = false;
   const Time now = _services.clock.now();
+  _lastTaken = now;
   for (const auto& [index, subscriber, messages] : found->second.deliveries) {
     Group& group = _groups[index];
     if (!group.isBound) bindSections(group);

@@ -40,6 +40,8 @@ class RadioGroups final : public WriteTimes {
   MessageFate fateOf(const LogMessage& message, ByteView bytes) const;
   /// A display is about to be made.
   void prepareDisplay(const Time& now);
+  /// When the last message came that a decoder takes; absent before the first.
+  std::optional<Time> lastTaken() const { return _lastTaken; }
 
   /// All codes of the bound sections, the groups in the template's order.
   std::vector<std::uint32_t> logCodes() const;
@@ -88,6 +90,7 @@ class RadioGroups final : public WriteTimes {
   std::unordered_map<std::uint32_t, Takers> _takers;
   std::unordered_map<const void*, const Section*> _sections;  // by container
   Value _display, _c2kState;
+  std::optional<Time> _lastTaken;
 };
 
 }  // namespace varnel

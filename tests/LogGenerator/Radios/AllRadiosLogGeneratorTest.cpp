@@ -177,6 +177,15 @@ TEST_F(AllRadiosLogGeneratorTest, ANewGeneratorGoesOnWithWhatCameSinceTheLastDis
   EXPECT_EQ(shown("/Messages/Last Messages/Messages/2/Name"), "Attach request");
 }
 
+TEST_F(AllRadiosLogGeneratorTest, AGeneratorThatEndsLaterLeavesTheCellsOfItsLastMessage) {
+  services.clock.set({1'600'000'000, 0});
+  take(PacketBuilder(0xB179, 53).u8(13, 4).u32(21, 6200).u8(37, 1).u16(41, 8).u16(43, 1600).bytes());
+  EXPECT_THAT(groups(), ElementsAre("LTE"));
+  services.clock.set({1'600'003'600, 0});
+  generator.reset();
+  EXPECT_EQ(shown("/LTE/Neighbors/Cells/0/Physical Cell ID"), "8");
+}
+
 TEST_F(AllRadiosLogGeneratorTest, TheDisplayOfAnotherTechnologyStands) {
   auto other =
       LogGenerator::generatorFromTechnology(std::string(technology::kalviGSMUMTS), services.services);
